@@ -1,0 +1,1 @@
+# Package: headers, library, find_package(basalt) and basalt.pc.

@@ -1,0 +1,13 @@
+/// @file
+/// Every family.
+#ifndef BASALT_BASALT_H
+#define BASALT_BASALT_H
+
+#include "basalt/frame.h"
+#include "basalt/geo.h"
+#include "basalt/memory.h"
+#include "basalt/platform.h"
+#include "basalt/sparse.h"
+#include "basalt/version.h"
+
+#endif

@@ -1,0 +1,10 @@
+/// @file
+/// The platform's types and calls that a host handles.
+#ifndef BASALT_PLATFORM_H
+#define BASALT_PLATFORM_H
+
+#include "basalt/platform/cstring.h"
+#include "basalt/platform/error.h"
+#include "basalt/platform/types.h"
+
+#endif

@@ -1,0 +1,122 @@
+// The sparse array from ten thousand to a hundred million cells: time per operation, and bytes per cell of
+// the whole process. A square of cells is filled row by row or in a scattered order.
+#include <benchmark/benchmark.h>
+#include <malloc.h>
+
+#include <array>
+#include <chrono>
+#include <cmath>
+#include <cstdint>
+#include <fstream>
+#include <memory>
+#include <string>
+
+#include "basalt/memory.h"
+#include "basalt/sparse.h"
+
+namespace {
+
+using Record = std::array<double, 4>;
+using Clock = std::chrono::steady_clock;
+using vex_util::Sparse2DArray;
+
+// The i-th of side * side cells. A stride coprime to the count reaches each cell once, far from the last.
+class Order {
+public:
+    Order(std::uint64_t side, bool scattered) : m_side(side), m_count(side * side) {
+        if (scattered) {
+            m_stride = static_cast<std::uint64_t>(static_cast<double>(m_count) * 0.6180339887498949) | 1U;
+            while (gcd(m_stride, m_count) != 1) {
+                m_stride += 2;
+            }
+        }
+    }
+    std::uint64_t Count() const { return m_count; }
+    template <class Work>
+    void ForEach(Work work) const {
+        std::uint64_t cell = 0;
+        for (std::uint64_t i = 0; i < m_count; ++i) {
+            work(static_cast<int>(cell % m_side), static_cast<int>(cell / m_side));
+            cell += m_stride;
+            cell -= cell >= m_count ? m_count : 0;
+        }
+    }
+
+private:
+    static std::uint64_t gcd(std::uint64_t a, std::uint64_t b) { return b == 0 ? a : gcd(b, a % b); }
+
+    std::uint64_t m_side;
+    std::uint64_t m_count;
+    std::uint64_t m_stride = 1;
+};
+
+double resident_bytes() {
+    malloc_trim(0);
+    std::ifstream status("/proc/self/statm");
+    long total = 0;
+    long resident = 0;
+    status >> total >> resident;
+    return static_cast<double>(resident) * 4096.0;
+}
+
+bool add_element(int, int, const void* element, const void* context) {
+    *static_cast<double*>(const_cast<void*>(context)) += static_cast<const double*>(element)[2];
+    return true;
+}
+
+template <class Work>
+double nanoseconds(Work work) {
+    const auto start = Clock::now();
+    work();
+    return std::chrono::duration<double, std::nano>(Clock::now() - start).count();
+}
+
+// One pass over the life of an array; the row's own time is the insertion's, the rest stand in counters.
+void life(benchmark::State& state, std::uint64_t side, bool scattered) {
+    const Order order(side, scattered);
+    const auto count = static_cast<double>(order.Count());
+    for (auto _ : state) {
+        const double before = resident_bytes();
+        Sparse2DArray array(sizeof(Record), 16, 64);
+        const double insert = nanoseconds([&] {
+            order.ForEach([&](int x, int y) {
+                const Record record = {static_cast<double>(x), static_cast<double>(y), 1.0, 0.0};
+                array.Insert(x, y, record.data());
+            });
+        });
+        state.counters["bytes_per_cell"] = (resident_bytes() - before) / count;
+        double sum = 0;
+        state.counters["find_ns"] =
+            nanoseconds([&] {
+                order.ForEach([&](int x, int y) { sum += static_cast<const double*>(array.Find(x, y))[2]; });
+            }) /
+            count;
+        state.counters["visit_ns"] = nanoseconds([&] { array.IterateAll(add_element, &sum); }) / count;
+        if (sum != 2 * count) {
+            state.SkipWithError("cells are missing");
+        }
+        state.counters["remove_ns"] =
+            nanoseconds([&] { order.ForEach([&](int x, int y) { array.Remove(x, y); }); }) / count;
+        state.SetIterationTime(insert / count * 1e-9);
+    }
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    for (const bool scattered : {false, true}) {
+        for (int exponent = 4; exponent <= 8; ++exponent) {
+            const auto side = static_cast<std::uint64_t>(std::llround(std::pow(10.0, exponent / 2.0)));
+            const std::string row =
+                std::string(scattered ? "scattered" : "row by row") + ", 10^" + std::to_string(exponent);
+            benchmark::RegisterBenchmark((row + " cells/basalt").c_str(),
+                                         [=](benchmark::State& state) { life(state, side, scattered); })
+                ->UseManualTime()
+                ->Unit(benchmark::kNanosecond)
+                ->Iterations(1);
+        }
+    }
+    benchmark::Initialize(&argc, argv);
+    benchmark::RunSpecifiedBenchmarks();
+    return 0;
+}

@@ -1,0 +1,72 @@
+#include "src/sparse/block_pool.h"
+
+#include <algorithm>
+#include <cstring>
+#include <limits>
+
+#include "src/platform/large_pages.h"
+
+namespace vex_util {
+namespace {
+
+constexpr std::size_t CACHE_LINE = 64;
+
+// A new slab adds an eighth to what is there: few slabs, little idle room.
+constexpr std::size_t GROWTH_DIVISOR = 8;
+
+// Larger blocks cannot exist: their bytes would not fit the address space.
+constexpr std::size_t MOST_CELLS = std::numeric_limits<std::ptrdiff_t>::max() / (4 * sizeof(void*));
+
+}  // namespace
+
+std::size_t BlockPool::BlockBytes() const noexcept {
+    const std::size_t bytes = FilledWords() * sizeof(std::uint64_t) + m_cellsPerBlock * sizeof(void*);
+    // Whole cache lines once a block is large enough for the rounding not to show.
+    return bytes < 4 * CACHE_LINE ? bytes : (bytes + CACHE_LINE - 1) & ~(CACHE_LINE - 1);
+}
+
+void BlockPool::AddSlab() {
+    if (m_cellsPerBlock > MOST_CELLS) {
+        throw std::bad_alloc();
+    }
+    const std::size_t blockBytes = BlockBytes();
+    std::size_t bytes = std::max(blockBytes, m_bytes / GROWTH_DIVISOR);
+    std::align_val_t alignment{CACHE_LINE};
+    if (bytes >= basalt::platform::LARGE_PAGE_BYTES / 4) {
+        // Page faults on ordinary pages would cost more than everything an insertion does.
+        bytes = (bytes + basalt::platform::LARGE_PAGE_BYTES - 1) & ~(basalt::platform::LARGE_PAGE_BYTES - 1);
+        alignment = std::align_val_t{basalt::platform::LARGE_PAGE_BYTES};
+    }
+    if (m_slabs.size() == m_slabs.capacity()) {
+        m_slabs.reserve(2 * m_slabs.size() + 8);
+    }
+    void* const memory = ::operator new[](bytes, alignment);
+    if (alignment == std::align_val_t{basalt::platform::LARGE_PAGE_BYTES}) {
+        basalt::platform::advise_large_pages(memory, bytes);
+    }
+    m_slabs.push_back({memory, bytes, alignment});
+    m_next = static_cast<char*>(memory);
+    m_left = bytes / blockBytes;
+    m_bytes += bytes;
+}
+
+Block BlockPool::TakeReserved() noexcept {
+    const std::size_t bytes = BlockBytes();
+    char* const memory = m_next;
+    std::memset(memory, 0, bytes);
+    m_next += bytes;
+    --m_left;
+    return {reinterpret_cast<void**>(memory)};
+}
+
+void BlockPool::Clear() noexcept {
+    for (const Slab& slab : m_slabs) {
+        ::operator delete[](slab.memory, slab.alignment);
+    }
+    m_slabs.clear();
+    m_next = nullptr;
+    m_left = 0;
+    m_bytes = 0;
+}
+
+}  // namespace vex_util

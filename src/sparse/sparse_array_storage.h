@@ -1,0 +1,35 @@
+// The parts of a sparse array.
+#ifndef BASALT_SRC_SPARSE_SPARSE_ARRAY_STORAGE_H
+#define BASALT_SRC_SPARSE_SPARSE_ARRAY_STORAGE_H
+
+#include <atomic>
+#include <cstdint>
+#include <vector>
+
+#include "basalt/sparse.h"
+#include "src/sparse/lock.h"
+#include "src/sparse/sparse_contents.h"
+
+namespace vex_util {
+
+// All of it is touched under the lock alone, but for the selection-dirty flag.
+struct Sparse2DArray::Storage {
+    Storage(std::size_t elementSize, std::size_t blockSide, std::size_t elementsPerChunk)
+        : contents(elementSize, blockSide, elementsPerChunk) {}
+    Storage(const Storage& source)
+        : contents(source.contents),
+          selection(source.selection),
+          selectionDirty(source.selectionDirty.load(std::memory_order_relaxed)) {}
+    Storage& operator=(const Storage&) = delete;
+
+    CriticalSectionWrapper lock;
+    SparseContents contents;
+    std::vector<int> selection;    // identifiers of the selected blocks, in the tree's order
+    std::vector<int> found;        // the next selection while it is being searched for
+    std::uint64_t generation = 0;  // counts what ends a visit: clearing and assignment
+    std::atomic<bool> selectionDirty{false};
+};
+
+}  // namespace vex_util
+
+#endif

@@ -1,0 +1,227 @@
+/// @file
+/// The two questions asked of every edge of a polygon, each in a portable form and in vector lanes: how many
+/// edges cross the ray from a point towards east, and which edges may have the point in their tolerance band.
+/// Both forms give the same answer for every input; edges run from vertex i - 1 to vertex i.
+#ifndef BASALT_SRC_GEO_POLYGON_EDGES_H
+#define BASALT_SRC_GEO_POLYGON_EDGES_H
+
+#include <cmath>
+
+#include "basalt/geo.h"
+
+#if defined(__x86_64__)
+#define BASALT_HAS_AVX2_FORM 1
+#include <immintrin.h>
+#else
+#define BASALT_HAS_AVX2_FORM 0
+#endif
+
+namespace basalt::geo {
+
+enum class VertexTest { NO, YES };
+
+/// Whether the edge from j to i straddles the point's northing (the lower end counts, the upper does not) and
+/// passes east of the point. Ends of a straddling edge differ in northing, so the denominator is never 0.
+inline bool crosses_east_of(const geo_nee& j, const geo_nee& i, const geo_nee& point) {
+    const bool straddles = (i.north <= point.north && point.north < j.north) ||
+                           (j.north <= point.north && point.north < i.north);
+    return straddles &&
+           (j.east - i.east) * (point.north - i.north) / (j.north - i.north) + i.east > point.east;
+}
+
+/// 1 when an odd number of edges crosses east of the point or, if asked, when the point is a vertex. n >= 1.
+template <VertexTest TEST>
+int crossing_parity_portable(int n, const geo_nee* polygon, const geo_nee& point) {
+    int inside = 0;
+    const geo_nee* j = polygon + (n - 1);
+    for (const geo_nee* i = polygon; i != polygon + n; j = i++) {
+        if (TEST == VertexTest::YES && i->north == point.north && i->east == point.east) {
+            return 1;
+        }
+        inside ^= static_cast<int>(crosses_east_of(*j, *i, point));
+    }
+    return inside;
+}
+
+/// Bounds for the band of an edge. The exact test accepts a point only within `tolerance` of the edge's
+/// rectangle, give or take what its own rounding adds: about 1e-15 of the edge's length while sine, cosine
+/// and arc tangent are good to a few last places, and nothing above 1e-160 where squares underflow. Turned by
+/// the edge's bearing the rectangle reaches at most sqrt(2) tolerances beyond the ends along either axis.
+/// Every number here is generous against that, so a point outside the margin is one the exact test would
+/// refuse.
+inline constexpr double BAND_REACH = 1.5;
+inline constexpr double BAND_ROUNDING = 1e-12;
+inline constexpr double BAND_UNDERFLOW = 1e-150;
+
+/// Fixed part of the margin around an edge's bounding box; the rest grows with the edge.
+inline double band_reach(double tolerance) {
+    return BAND_REACH * tolerance + BAND_UNDERFLOW;
+}
+
+/// Whether the band of edge a-b may hold the point. Differences, not bounds, are compared with the margin:
+/// those keep their relative accuracy far from the origin. With NaN anywhere the exact test refuses, so
+/// either answer is right; infinite edges and tolerances make the margin infinite or NaN, which keeps the
+/// edge.
+inline bool may_be_in_band(const geo_nee& a, const geo_nee& b, const geo_nee& point, double reach) {
+    const double margin = reach + BAND_ROUNDING * (std::abs(a.north - b.north) + std::abs(a.east - b.east));
+    const double north_a = a.north - point.north;
+    const double north_b = b.north - point.north;
+    const double east_a = a.east - point.east;
+    const double east_b = b.east - point.east;
+    return !((north_a > margin && north_b > margin) || (north_a < -margin && north_b < -margin) ||
+             (east_a > margin && east_b > margin) || (east_a < -margin && east_b < -margin));
+}
+
+/// Whether edge i - 1, i has the point in its band.
+inline bool is_in_band(const geo_nee* i, const geo_nee& point, double tolerance) {
+    return geo_point_on_line(i[0], i[-1], point, tolerance) == 1;
+}
+
+/// Whether the point lies in the band of an edge, the closing edge left out. tolerance >= 0.
+inline bool is_in_a_band_portable(int n, const geo_nee* polygon, const geo_nee& point, double tolerance) {
+    const double reach = band_reach(tolerance);
+    for (int i = 1; i < n; ++i) {
+        if (may_be_in_band(polygon[i - 1], polygon[i], point, reach) &&
+            is_in_band(polygon + i, point, tolerance)) {
+            return true;
+        }
+    }
+    return false;
+}
+
+#if BASALT_HAS_AVX2_FORM
+
+#define BASALT_AVX2 [[gnu::target("avx2")]]
+#define BASALT_AVX2_INLINE [[gnu::target("avx2"), gnu::always_inline]] inline
+
+/// Four vertices, a lane each.
+struct Quad {
+    __m256d north;
+    __m256d east;
+};
+
+/// Loads the north and east of each vertex as a pair and never touches an elevation.
+BASALT_AVX2_INLINE Quad load_quad(const geo_nee* v) {
+    const __m256d even = _mm256_set_m128d(_mm_loadu_pd(&v[2].north), _mm_loadu_pd(&v[0].north));
+    const __m256d odd = _mm256_set_m128d(_mm_loadu_pd(&v[3].north), _mm_loadu_pd(&v[1].north));
+    return {_mm256_unpacklo_pd(even, odd), _mm256_unpackhi_pd(even, odd)};
+}
+
+BASALT_AVX2_INLINE unsigned lane_bits(__m256d mask) {
+    return static_cast<unsigned>(_mm256_movemask_pd(mask));
+}
+
+/// What a run of up to sixteen vertices shows, bit k for the k-th.
+struct RunBits {
+    unsigned not_above;  ///< northing at most that of the point
+    bool on_vertex;
+};
+
+template <VertexTest TEST, int QUADS>
+BASALT_AVX2_INLINE RunBits classify(const geo_nee* vertices, const Quad& point) {
+    RunBits bits = {0, false};
+    __m256d same = _mm256_setzero_pd();
+    for (int q = 0; q < QUADS; ++q) {
+        const Quad v = load_quad(vertices + 4 * q);
+        bits.not_above |= lane_bits(_mm256_cmp_pd(v.north, point.north, _CMP_LE_OQ)) << 4 * q;
+        if (TEST == VertexTest::YES) {
+            same = _mm256_or_pd(same, _mm256_and_pd(_mm256_cmp_pd(v.north, point.north, _CMP_EQ_OQ),
+                                                    _mm256_cmp_pd(v.east, point.east, _CMP_EQ_OQ)));
+        }
+    }
+    bits.on_vertex = TEST == VertexTest::YES && lane_bits(same) != 0;
+    return bits;
+}
+
+/// Parity of crossings over the edges that end at the vertices marked in `ends`, counted from vertex `first`.
+inline int parity_of(unsigned ends, int first, int n, const geo_nee* polygon, const geo_nee& point) {
+    int parity = 0;
+    for (; ends != 0; ends &= ends - 1) {
+        const int i = first + __builtin_ctz(ends);
+        parity ^= static_cast<int>(crosses_east_of(polygon[i == 0 ? n - 1 : i - 1], polygon[i], point));
+    }
+    return parity;
+}
+
+/// As crossing_parity_portable(). Only edges whose ends differ in `not_above` can straddle; they are few, and
+/// a branch per sixteen vertices finds them. n >= 4.
+template <VertexTest TEST>
+BASALT_AVX2 int crossing_parity_avx2(int n, const geo_nee* polygon, const geo_nee& point) {
+    const Quad p = {_mm256_set1_pd(point.north), _mm256_set1_pd(point.east)};
+    unsigned previous = polygon[n - 1].north <= point.north ? 1 : 0;
+    int inside = 0;
+    int i = 0;
+    for (; i <= n - 16; i += 16) {
+        const RunBits run = classify<TEST, 4>(polygon + i, p);
+        if (run.on_vertex) {
+            return 1;
+        }
+        const unsigned ends = (run.not_above ^ (run.not_above << 1 | previous)) & 0xFFFF;
+        inside ^= parity_of(ends, i, n, polygon, point);
+        previous = run.not_above >> 15;
+    }
+    for (; i <= n - 4; i += 4) {
+        const RunBits run = classify<TEST, 1>(polygon + i, p);
+        if (run.on_vertex) {
+            return 1;
+        }
+        inside ^= parity_of((run.not_above ^ (run.not_above << 1 | previous)) & 0xF, i, n, polygon, point);
+        previous = run.not_above >> 3;
+    }
+    if (i < n) {
+        // The last one to three vertices, seen again through the last whole quad; what is done is masked off.
+        const RunBits run = classify<TEST, 1>(polygon + (n - 4), p);
+        if (run.on_vertex) {
+            return 1;
+        }
+        const unsigned fresh = 0xFU << (i - (n - 4)) & 0xF;
+        inside ^= parity_of((run.not_above ^ run.not_above << 1) & fresh, n - 4, n, polygon, point);
+    }
+    return inside;
+}
+
+/// may_be_in_band() of the four edges that end at vertices i[0] to i[3], a bit each.
+BASALT_AVX2_INLINE unsigned may_be_in_bands(const geo_nee* i, const Quad& point, double reach) {
+    const Quad a = load_quad(i - 1);
+    const Quad b = load_quad(i);
+    const __m256d sign = _mm256_set1_pd(-0.0);
+    const __m256d extent = _mm256_add_pd(_mm256_andnot_pd(sign, _mm256_sub_pd(a.north, b.north)),
+                                         _mm256_andnot_pd(sign, _mm256_sub_pd(a.east, b.east)));
+    const __m256d margin =
+        _mm256_add_pd(_mm256_set1_pd(reach), _mm256_mul_pd(_mm256_set1_pd(BAND_ROUNDING), extent));
+    const __m256d north_a = _mm256_sub_pd(a.north, point.north);
+    const __m256d north_b = _mm256_sub_pd(b.north, point.north);
+    const __m256d east_a = _mm256_sub_pd(a.east, point.east);
+    const __m256d east_b = _mm256_sub_pd(b.east, point.east);
+    // How far the nearer end lies beyond the point, on the axis where that is most.
+    const __m256d beyond = _mm256_max_pd(_mm256_min_pd(north_a, north_b), _mm256_min_pd(east_a, east_b));
+    const __m256d before = _mm256_min_pd(_mm256_max_pd(north_a, north_b), _mm256_max_pd(east_a, east_b));
+    const __m256d gap = _mm256_max_pd(beyond, _mm256_xor_pd(sign, before));
+    return lane_bits(_mm256_cmp_pd(gap, margin, _CMP_NGT_UQ));
+}
+
+/// As is_in_a_band_portable(). n >= 5.
+BASALT_AVX2 inline bool is_in_a_band_avx2(int n, const geo_nee* polygon, const geo_nee& point,
+                                          double tolerance) {
+    const Quad p = {_mm256_set1_pd(point.north), _mm256_set1_pd(point.east)};
+    const double reach = band_reach(tolerance);
+    for (int i = 1; i < n; i += 4) {
+        // The last quad may reach back over edges already seen; asking twice changes nothing.
+        const geo_nee* first = polygon + (i <= n - 4 ? i : n - 4);
+        for (unsigned ends = may_be_in_bands(first, p, reach); ends != 0; ends &= ends - 1) {
+            if (is_in_band(first + __builtin_ctz(ends), point, tolerance)) {
+                return true;
+            }
+        }
+    }
+    return false;
+}
+
+#undef BASALT_AVX2
+#undef BASALT_AVX2_INLINE
+
+#endif
+
+}  // namespace basalt::geo
+
+#endif

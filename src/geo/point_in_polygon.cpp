@@ -16,7 +16,7 @@ bool can_use_avx2() {
 template <VertexTest TEST>
 int crossing_parity(int n, const geo_nee* polygon, const geo_nee& point) {
 #if BASALT_HAS_AVX2_FORM
-    if (n >= 4 && can_use_avx2()) {
+    if (n >= 5 && can_use_avx2()) {
         return crossing_parity_avx2<TEST>(n, polygon, point);
     }
 #endif

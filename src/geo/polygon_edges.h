@@ -20,8 +20,12 @@ namespace basalt::geo {
 
 enum class VertexTest { NO, YES };
 
+/// Stands for the rise of a level edge where one is divided by; metres.
+inline constexpr double LEVEL_EDGE_RISE = 1e-8;
+
 /// Whether the edge from j to i straddles the point's northing (the lower end counts, the upper does not) and
-/// passes east of the point. Ends of a straddling edge differ in northing, so the denominator is never 0.
+/// passes east of the point. Ends of a straddling edge differ in northing, so LEVEL_EDGE_RISE has no use
+/// here.
 inline bool crosses_east_of(const geo_nee& j, const geo_nee& i, const geo_nee& point) {
     const bool straddles = (i.north <= point.north && point.north < j.north) ||
                            (j.north <= point.north && point.north < i.north);
@@ -111,73 +115,77 @@ BASALT_AVX2_INLINE unsigned lane_bits(__m256d mask) {
     return static_cast<unsigned>(_mm256_movemask_pd(mask));
 }
 
-/// What a run of up to sixteen vertices shows, bit k for the k-th.
-struct RunBits {
-    unsigned not_above;  ///< northing at most that of the point
+/// crosses_east_of() of the four edges that end at vertices i[0] to i[3], a bit each.
+BASALT_AVX2_INLINE unsigned cross_east_of(const geo_nee* i, const Quad& point) {
+    const Quad a = load_quad(i - 1);
+    const Quad b = load_quad(i);
+    const __m256d straddles = _mm256_or_pd(_mm256_and_pd(_mm256_cmp_pd(b.north, point.north, _CMP_LE_OQ),
+                                                         _mm256_cmp_pd(point.north, a.north, _CMP_LT_OQ)),
+                                           _mm256_and_pd(_mm256_cmp_pd(a.north, point.north, _CMP_LE_OQ),
+                                                         _mm256_cmp_pd(point.north, b.north, _CMP_LT_OQ)));
+    // Level edges do not straddle; the stand-in keeps a host that traps division by zero out of trouble.
+    const __m256d rise = _mm256_blendv_pd(_mm256_sub_pd(a.north, b.north), _mm256_set1_pd(LEVEL_EDGE_RISE),
+                                          _mm256_cmp_pd(a.north, b.north, _CMP_EQ_OQ));
+    const __m256d run = _mm256_mul_pd(_mm256_sub_pd(a.east, b.east), _mm256_sub_pd(point.north, b.north));
+    const __m256d crossing = _mm256_add_pd(_mm256_div_pd(run, rise), b.east);
+    return lane_bits(_mm256_and_pd(straddles, _mm256_cmp_pd(crossing, point.east, _CMP_GT_OQ)));
+}
+
+/// The walk along the vertices that crossing_parity_avx2() makes.
+struct Walk {
+    unsigned not_above;  ///< whether the last vertex seen is at most as far north as the point
+    unsigned crossings;  ///< parity of crossings, spread over four bits
     bool on_vertex;
 };
 
+/// Goes on over 4 * QUADS vertices. Only edges whose ends differ in `not_above` can straddle; they are few,
+/// so one branch a step passes over the rest. Edges that end before vertex `fresh` of the first quad are not
+/// counted.
 template <VertexTest TEST, int QUADS>
-BASALT_AVX2_INLINE RunBits classify(const geo_nee* vertices, const Quad& point) {
-    RunBits bits = {0, false};
+BASALT_AVX2_INLINE void step(Walk& walk, const geo_nee* vertices, const Quad& point, int fresh = 0) {
+    unsigned not_above = 0;
     __m256d same = _mm256_setzero_pd();
     for (int q = 0; q < QUADS; ++q) {
         const Quad v = load_quad(vertices + 4 * q);
-        bits.not_above |= lane_bits(_mm256_cmp_pd(v.north, point.north, _CMP_LE_OQ)) << 4 * q;
+        not_above |= lane_bits(_mm256_cmp_pd(v.north, point.north, _CMP_LE_OQ)) << 4 * q;
         if (TEST == VertexTest::YES) {
             same = _mm256_or_pd(same, _mm256_and_pd(_mm256_cmp_pd(v.north, point.north, _CMP_EQ_OQ),
                                                     _mm256_cmp_pd(v.east, point.east, _CMP_EQ_OQ)));
         }
     }
-    bits.on_vertex = TEST == VertexTest::YES && lane_bits(same) != 0;
-    return bits;
-}
-
-/// Parity of crossings over the edges that end at the vertices marked in `ends`, counted from vertex `first`.
-inline int parity_of(unsigned ends, int first, int n, const geo_nee* polygon, const geo_nee& point) {
-    int parity = 0;
-    for (; ends != 0; ends &= ends - 1) {
-        const int i = first + __builtin_ctz(ends);
-        parity ^= static_cast<int>(crosses_east_of(polygon[i == 0 ? n - 1 : i - 1], polygon[i], point));
+    walk.on_vertex = TEST == VertexTest::YES && lane_bits(same) != 0;
+    const unsigned counted = (1U << 4 * QUADS) - (1U << fresh);
+    const unsigned ends = (not_above ^ (not_above << 1 | walk.not_above)) & counted;
+    if (ends != 0) {
+        for (int q = 0; q < QUADS; ++q) {
+            if ((ends >> 4 * q & 0xF) != 0) {
+                walk.crossings ^= cross_east_of(vertices + 4 * q, point) & counted >> 4 * q;
+            }
+        }
     }
-    return parity;
+    walk.not_above = not_above >> (4 * QUADS - 1);
 }
 
-/// As crossing_parity_portable(). Only edges whose ends differ in `not_above` can straddle; they are few, and
-/// a branch per sixteen vertices finds them. n >= 4.
+/// As crossing_parity_portable(). n >= 5.
 template <VertexTest TEST>
 BASALT_AVX2 int crossing_parity_avx2(int n, const geo_nee* polygon, const geo_nee& point) {
     const Quad p = {_mm256_set1_pd(point.north), _mm256_set1_pd(point.east)};
-    unsigned previous = polygon[n - 1].north <= point.north ? 1 : 0;
-    int inside = 0;
-    int i = 0;
-    for (; i <= n - 16; i += 16) {
-        const RunBits run = classify<TEST, 4>(polygon + i, p);
-        if (run.on_vertex) {
-            return 1;
-        }
-        const unsigned ends = (run.not_above ^ (run.not_above << 1 | previous)) & 0xFFFF;
-        inside ^= parity_of(ends, i, n, polygon, point);
-        previous = run.not_above >> 15;
+    const geo_nee& first = polygon[0];
+    Walk walk = {first.north <= point.north ? 1U : 0U,
+                 crosses_east_of(polygon[n - 1], first, point) ? 1U : 0U,
+                 TEST == VertexTest::YES && first.north == point.north && first.east == point.east};
+    int i = 1;
+    for (; i <= n - 16 && !walk.on_vertex; i += 16) {
+        step<TEST, 4>(walk, polygon + i, p);
     }
-    for (; i <= n - 4; i += 4) {
-        const RunBits run = classify<TEST, 1>(polygon + i, p);
-        if (run.on_vertex) {
-            return 1;
-        }
-        inside ^= parity_of((run.not_above ^ (run.not_above << 1 | previous)) & 0xF, i, n, polygon, point);
-        previous = run.not_above >> 3;
+    for (; i <= n - 4 && !walk.on_vertex; i += 4) {
+        step<TEST, 1>(walk, polygon + i, p);
     }
-    if (i < n) {
-        // The last one to three vertices, seen again through the last whole quad; what is done is masked off.
-        const RunBits run = classify<TEST, 1>(polygon + (n - 4), p);
-        if (run.on_vertex) {
-            return 1;
-        }
-        const unsigned fresh = 0xFU << (i - (n - 4)) & 0xF;
-        inside ^= parity_of((run.not_above ^ run.not_above << 1) & fresh, n - 4, n, polygon, point);
+    if (i < n && !walk.on_vertex) {
+        // The last one to three vertices, reached through the last whole quad.
+        step<TEST, 1>(walk, polygon + (n - 4), p, i - (n - 4));
     }
-    return inside;
+    return walk.on_vertex ? 1 : __builtin_parity(walk.crossings);
 }
 
 /// may_be_in_band() of the four edges that end at vertices i[0] to i[3], a bit each.

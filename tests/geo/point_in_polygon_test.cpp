@@ -29,7 +29,7 @@ int in_poly(const Polygon& polygon, const geo_nee& point) {
     bool agree = geo_point_in_poly(n, polygon.data(), &point) == expected;
     agree = agree && crossing_parity_portable<VertexTest::YES>(n, polygon.data(), point) == expected;
 #if BASALT_HAS_AVX2_FORM
-    if (n >= 4 && __builtin_cpu_supports("avx2")) {
+    if (n >= 5 && __builtin_cpu_supports("avx2")) {
         agree = agree && crossing_parity_avx2<VertexTest::YES>(n, polygon.data(), point) == expected;
     }
 #endif

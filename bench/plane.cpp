@@ -1,0 +1,204 @@
+// Point in polygon, with and without a tolerance band, beside the plain loop, Boost.Geometry and GEOS. Before
+// a row is timed, its answers for all points are compared with the library's.
+#include <benchmark/benchmark.h>
+
+#include <cmath>
+#include <numbers>
+#include <vector>
+
+#include "basalt/geo.h"
+#include "tests/geo/plain_forms.h"
+
+#if __has_include(<boost/geometry.hpp>)
+#define HAS_BOOST_GEOMETRY 1
+#include <boost/geometry.hpp>
+#include <boost/geometry/geometries/point_xy.hpp>
+#include <boost/geometry/geometries/ring.hpp>
+#endif
+#ifdef BENCH_HAS_GEOS
+#include <geos_c.h>
+#endif
+
+namespace {
+
+constexpr double TOLERANCE = 0.05;
+constexpr int POINTS = 1024;
+
+/// A parcel: a closed outline with wavy sides around a survey grid's usual coordinates, and points all about
+/// it.
+struct Scene {
+    std::vector<geo_nee> polygon;
+    std::vector<geo_nee> points;
+
+    explicit Scene(int n) {
+        plain::Random random(42);
+        for (int i = 0; i < n; ++i) {
+            const double angle = 2.0 * std::numbers::pi * i / n;
+            const double r = 400.0 + 80.0 * std::sin(5.0 * angle) + random.real(-100.0, 100.0) / n;
+            polygon.push_back({5.8e6 + r * std::cos(angle), 3.5e5 - r * std::sin(angle), 0.0});
+        }
+        for (int i = 0; i < POINTS; ++i) {
+            points.push_back({5.8e6 + random.real(-500.0, 500.0), 3.5e5 + random.real(-500.0, 500.0), 0.0});
+        }
+    }
+
+    int size() const { return static_cast<int>(polygon.size()); }
+};
+
+/// Times `ask` over the scene's points, one a turn; `expected` is the library's own answer.
+template <typename Ask, typename Expected>
+void run(benchmark::State& state, const Scene& scene, const Ask& ask, const Expected& expected) {
+    for (const geo_nee& point : scene.points) {
+        if (ask(point) != expected(point)) {
+            state.SkipWithError("answers differ");
+            return;
+        }
+    }
+    std::size_t at = 0;
+    for ([[maybe_unused]] auto _ : state) {
+        benchmark::DoNotOptimize(ask(scene.points[at]));
+        at = (at + 1) % POINTS;
+    }
+}
+
+int size_of(const benchmark::State& state) {
+    return static_cast<int>(state.range(0));
+}
+
+auto in_poly(const Scene& scene) {
+    return [&scene](const geo_nee& p) { return geo_point_in_poly(scene.size(), scene.polygon.data(), &p); };
+}
+
+auto in_band(const Scene& scene) {
+    return [&scene](const geo_nee& p) {
+        return geo_point_in_poly_2(scene.size(), scene.polygon.data(), &p, TOLERANCE);
+    };
+}
+
+void in_polygon_basalt(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    run(state, scene, in_poly(scene), in_poly(scene));
+}
+
+void in_polygon_plain_loop(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    run(
+        state, scene,
+        [&](const geo_nee& p) { return plain::point_in_poly(scene.size(), scene.polygon.data(), p); },
+        in_poly(scene));
+}
+
+void in_band_basalt(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    run(state, scene, in_band(scene), in_band(scene));
+}
+
+void in_band_plain_loop(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    run(
+        state, scene,
+        [&](const geo_nee& p) {
+            return plain::point_in_poly_2(scene.size(), scene.polygon.data(), p, TOLERANCE);
+        },
+        in_band(scene));
+}
+
+#ifdef HAS_BOOST_GEOMETRY
+
+using BoostPoint = boost::geometry::model::d2::point_xy<double>;
+using BoostRing = boost::geometry::model::ring<BoostPoint, true, false>;
+
+BoostRing boost_ring(const Scene& scene) {
+    BoostRing ring;
+    for (const geo_nee& v : scene.polygon) {
+        ring.emplace_back(v.east, v.north);
+    }
+    boost::geometry::correct(ring);
+    return ring;
+}
+
+void in_polygon_boost(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    const BoostRing ring = boost_ring(scene);
+    run(
+        state, scene,
+        [&](const geo_nee& p) {
+            return static_cast<int>(boost::geometry::within(BoostPoint(p.east, p.north), ring));
+        },
+        in_poly(scene));
+}
+
+void in_band_boost(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    const BoostRing ring = boost_ring(scene);
+    run(
+        state, scene,
+        [&](const geo_nee& p) {
+            return static_cast<int>(boost::geometry::distance(BoostPoint(p.east, p.north), ring) <=
+                                    TOLERANCE);
+        },
+        in_band(scene));
+}
+
+#endif
+
+#ifdef BENCH_HAS_GEOS
+
+void in_polygon_geos_prepared(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    const GEOSContextHandle_t context = GEOS_init_r();
+    const auto length = static_cast<unsigned>(scene.size());
+    GEOSCoordSequence* outline = GEOSCoordSeq_create_r(context, length + 1, 2);
+    for (unsigned i = 0; i <= length; ++i) {
+        const geo_nee& v = scene.polygon[i % length];
+        GEOSCoordSeq_setXY_r(context, outline, i, v.east, v.north);
+    }
+    GEOSGeometry* ring = GEOSGeom_createLinearRing_r(context, outline);
+    GEOSGeometry* polygon = GEOSGeom_createPolygon_r(context, ring, nullptr, 0);
+    const GEOSPreparedGeometry* prepared = GEOSPrepare_r(context, polygon);
+    // Points are made ahead: only the question is timed.
+    std::vector<GEOSGeometry*> points;
+    for (const geo_nee& p : scene.points) {
+        points.push_back(GEOSGeom_createPointFromXY_r(context, p.east, p.north));
+    }
+    run(
+        state, scene,
+        [&](const geo_nee& p) {
+            const GEOSGeometry* point = points[static_cast<std::size_t>(&p - scene.points.data())];
+            return static_cast<int>(GEOSPreparedContains_r(context, prepared, point));
+        },
+        in_poly(scene));
+    for (GEOSGeometry* point : points) {
+        GEOSGeom_destroy_r(context, point);
+    }
+    GEOSPreparedGeom_destroy_r(context, prepared);
+    GEOSGeom_destroy_r(context, polygon);
+    GEOS_finish_r(context);
+}
+
+#endif
+
+void polygon_sizes(benchmark::internal::Benchmark* row) {
+    row->Arg(10)->Arg(100)->Arg(1000)->Arg(10000);
+}
+void band_sizes(benchmark::internal::Benchmark* row) {
+    row->Arg(100)->Arg(1000);
+}
+
+BENCHMARK(in_polygon_basalt)->Apply(polygon_sizes);
+BENCHMARK(in_polygon_plain_loop)->Apply(polygon_sizes);
+#ifdef HAS_BOOST_GEOMETRY
+BENCHMARK(in_polygon_boost)->Apply(polygon_sizes);
+#endif
+#ifdef BENCH_HAS_GEOS
+BENCHMARK(in_polygon_geos_prepared)->Apply(polygon_sizes);
+#endif
+BENCHMARK(in_band_basalt)->Apply(band_sizes);
+BENCHMARK(in_band_plain_loop)->Apply(band_sizes);
+#ifdef HAS_BOOST_GEOMETRY
+BENCHMARK(in_band_boost)->Apply(band_sizes);
+#endif
+
+}  // namespace
+
+BENCHMARK_MAIN();

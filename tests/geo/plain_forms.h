@@ -1,0 +1,126 @@
+// The polygon and chain predicates written out as slow, obvious loops, and a generator that gives the same
+// numbers on every compiler. The fast forms are held against these.
+#ifndef BASALT_TESTS_GEO_PLAIN_FORMS_H
+#define BASALT_TESTS_GEO_PLAIN_FORMS_H
+
+#include <cmath>
+#include <cstddef>
+#include <cstdint>
+#include <vector>
+
+#include "basalt/geo.h"
+
+namespace plain {
+
+inline void cross(const geo_nee& vj, const geo_nee& vi, const geo_nee& p, int& inside) {
+    if ((vi.north <= p.north && p.north < vj.north) || (vj.north <= p.north && p.north < vi.north)) {
+        const double denominator = vj.north == vi.north ? 1e-8 : vj.north - vi.north;
+        const double crossing = (vj.east - vi.east) * (p.north - vi.north) / denominator + vi.east;
+        if (crossing > p.east) {
+            inside = inside == 0 ? 1 : 0;
+        }
+    }
+}
+
+inline int point_in_poly(int n, const geo_nee* polygon, const geo_nee& p) {
+    if (n < 1) {
+        return 0;
+    }
+    int inside = 0;
+    int j = n - 1;
+    for (int i = 0; i < n; ++i) {
+        if (p.east == polygon[i].east && p.north == polygon[i].north) {
+            return 1;
+        }
+        cross(polygon[j], polygon[i], p, inside);
+        j = i;
+    }
+    return inside;
+}
+
+inline int point_on_line(const geo_nee& a, const geo_nee& b, const geo_nee& p, double tolerance) {
+    const double pi = 3.141592653589793;
+    const double theta = geo_normalised_bearing(geo_grid_bearing(a, b) - geo_grid_bearing(a, p));
+    const double d = geo_horz_dist(a, p);
+    const double along = std::cos(theta > pi ? 6.283185307179586 - theta : theta) * d;
+    if (along < -tolerance) {
+        return 0;
+    }
+    if (along > geo_horz_dist(a, b) + tolerance) {
+        return 0;
+    }
+    const double offset = std::fabs(std::sin(theta > pi ? theta - 6.283185307179586 : theta) * d);
+    return offset <= tolerance ? 1 : 0;
+}
+
+inline int point_in_poly_2(int n, const geo_nee* polygon, const geo_nee& p, double tolerance) {
+    if (n < 1) {
+        return 0;
+    }
+    int inside = 0;
+    int j = n - 1;
+    for (int i = 0; i < n; ++i) {
+        if (point_on_line(polygon[i], polygon[j], p, tolerance) == 1) {
+            return 1;
+        }
+        cross(polygon[j], polygon[i], p, inside);
+        j = i;
+    }
+    return inside;
+}
+
+inline int point_on_polyline(int n, const geo_nee* v, const geo_nee& p, double tolerance) {
+    for (int i = 0; i < n; ++i) {
+        const geo_nee& a = v[i];
+        const geo_nee& b = v[(i + 1) % n];
+        if ((p.east == a.east && p.north == a.north) || (p.east == b.east && p.north == b.north)) {
+            return 1;
+        }
+        const double length2 =
+            (a.north - b.north) * (a.north - b.north) + (a.east - b.east) * (a.east - b.east);
+        const double dist =
+            std::fabs((b.north - p.north) * (a.east - p.east) - (b.east - p.east) * (a.north - p.north)) /
+            std::sqrt(length2);
+        const double pa2 = (a.north - p.north) * (a.north - p.north) + (a.east - p.east) * (a.east - p.east);
+        const double pb2 = (b.north - p.north) * (b.north - p.north) + (b.east - p.east) * (b.east - p.east);
+        if (dist < tolerance && pa2 < length2 + tolerance * tolerance &&
+            pb2 < length2 + tolerance * tolerance) {
+            return 1;
+        }
+    }
+    return 0;
+}
+
+inline int lines_cross(const geo_nee& p1, const geo_nee& p2, const geo_nee& q1, const geo_nee& q2) {
+    const auto side_p = [&](const geo_nee& x) {
+        return (p2.east - p1.east) * x.north - (p2.north - p1.north) * x.east;
+    };
+    const auto side_q = [&](const geo_nee& x) {
+        return (q2.east - q1.east) * x.north - (q2.north - q1.north) * x.east;
+    };
+    if ((side_p(p1) > side_p(q1)) == (side_p(p1) > side_p(q2))) {
+        return 0;
+    }
+    return (side_q(q1) > side_q(p1)) != (side_q(q1) > side_q(p2)) ? 1 : 0;
+}
+
+/// Knuth's MMIX generator; the low bits are poor, so the high ones are used.
+class Random {
+public:
+    explicit Random(std::uint64_t seed) : m_state(seed) {}
+
+    std::uint32_t bits() {
+        m_state = m_state * 6364136223846793005U + 1442695040888963407U;
+        return static_cast<std::uint32_t>(m_state >> 32);
+    }
+    int below(int n) { return static_cast<int>(bits() % static_cast<std::uint32_t>(n)); }
+    /// In [low, high); exact steps of 2^-32 of the range.
+    double real(double low, double high) { return low + (high - low) * (bits() * 0x1p-32); }
+
+private:
+    std::uint64_t m_state;
+};
+
+}  // namespace plain
+
+#endif

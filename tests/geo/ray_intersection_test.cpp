@@ -1,0 +1,94 @@
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <limits>
+#include <numbers>
+#include <string>
+
+#include "basalt/geo.h"
+#include "tests/geo/plain_forms.h"
+
+namespace {
+
+constexpr double PI = std::numbers::pi;
+
+TEST(RayIntersection, FactsOfMeetingAndMissing) {
+    struct Fact {
+        const char* what;
+        geo_nee p1, p2;
+        double bearing1, bearing2;
+        int met;
+        double north, east;
+    };
+    const Fact facts[] = {
+        {"north and east", {0, 0, 1}, {10, -10, 2}, 0, PI / 2, 1, 10, 0},
+        {"second points away", {0, 0, 1}, {10, -10, 2}, 0, 1.5 * PI, 0, 0, 0},
+        {"first points away", {0, 0, 1}, {10, -10, 2}, PI, PI / 2, 0, 0, 0},
+        {"second runs south", {10, -10, 0}, {20, 0, 0}, PI / 2, PI, 1, 10, 0},
+        {"diagonals", {0, 0, 0}, {0, 10, 0}, PI / 4, 1.75 * PI, 1, 5, 5},
+        {"bearings of several turns", {0, 0, 0}, {0, 10, 0}, PI / 4 + 8 * PI, -PI / 4, 1, 5, 5},
+        {"equal bearings", {0, 0, 0}, {10, 10, 0}, 1, 1, 0, 0, 0},
+        {"opposite bearings", {0, 0, 0}, {10, 0, 0}, 0, PI, 0, 0, 0},
+        {"nearly parallel", {0, 0, 0}, {0, 1, 0}, 1, 1 + 4.8e-7, 0, 0, 0},
+        {"behind ray 2, but at the start of ray 1", {5, 5, 0}, {5, 15, 0}, PI / 4, PI / 2, 1, 5, 5},
+        {"behind ray 1, but at the start of ray 2", {5, 15, 0}, {5, 5, 0}, PI / 2, PI / 4, 1, 5, 5},
+    };
+    for (const Fact& fact : facts) {
+        SCOPED_TRACE(fact.what);
+        geo_nee out = {1, 1, 1};
+        ASSERT_EQ(geo_grid_bb_intersect(fact.p1, fact.p2, fact.bearing1, fact.bearing2, out), fact.met);
+        EXPECT_NEAR(out.north, fact.met == 1 ? fact.north : GEO_NULL, 1e-12);
+        EXPECT_NEAR(out.east, fact.met == 1 ? fact.east : GEO_NULL, 1e-12);
+        EXPECT_EQ(out.elevation, GEO_NULL);
+        if (fact.met == 0) {
+            EXPECT_EQ(out.north, GEO_NULL);
+            EXPECT_EQ(out.east, GEO_NULL);
+        }
+    }
+}
+
+TEST(RayIntersection, FindsATargetSightedFromTwoStations) {
+    const std::uint64_t seed = 7;
+    SCOPED_TRACE("seed " + std::to_string(seed));
+    plain::Random random(seed);
+    for (int i = 0; i < 5000; ++i) {
+        const auto point = [&] { return geo_nee{random.real(0, 1000), random.real(0, 1000), 0.0}; };
+        const geo_nee p1 = point();
+        const geo_nee p2 = point();
+        const geo_nee target = point();
+        const double angle = geo_grid_divergence(target, p1, target, p2);
+        if (angle < 0.05 || angle > PI - 0.05) {
+            continue;
+        }
+        const double bearing1 = geo_grid_bearing(p1, target);
+        const double bearing2 = geo_grid_bearing(p2, target);
+        geo_nee out = {};
+        ASSERT_EQ(geo_grid_bb_intersect(p1, p2, bearing1, bearing2, out), 1);
+        ASSERT_NEAR(out.north, target.north, 2e-7);
+        ASSERT_NEAR(out.east, target.east, 2e-7);
+        ASSERT_EQ(geo_grid_bb_intersect(p1, p2, bearing1 + PI, bearing2, out), 0);
+    }
+}
+
+TEST(RayIntersection, WritesOverItsOwnStart) {
+    geo_nee p1 = {0, 0, 1};
+    const geo_nee p2 = {10, -10, 2};
+    EXPECT_EQ(geo_grid_bb_intersect(p1, p2, 0, PI / 2, p1), 1);
+    EXPECT_EQ(p1.north, 10.0);
+    EXPECT_EQ(p1.east, 0.0);
+}
+
+TEST(RayIntersection, RefusesBearingsThatAreNotFinite) {
+    const geo_nee p1 = {0, 0, 0};
+    const geo_nee p2 = {10, -10, 0};
+    const double inf = std::numeric_limits<double>::infinity();
+    for (const double bad : {inf, -inf, std::nan("")}) {
+        geo_nee out = {};
+        EXPECT_EQ(geo_grid_bb_intersect(p1, p2, bad, 1.0, out), 0);
+        EXPECT_EQ(geo_grid_bb_intersect(p1, p2, 1.0, bad, out), 0);
+        EXPECT_EQ(geo_grid_bb_intersect(p1, p2, bad, bad, out), 0);
+        EXPECT_EQ(out.north, GEO_NULL);
+    }
+}
+
+}  // namespace

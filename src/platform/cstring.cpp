@@ -188,9 +188,7 @@ int CString::Insert(int position, const wchar_t* text) {
 }
 
 int CString::Delete(int position, int count) {
-    if (position >= 0) {
-        m_text.erase(clamp_to_size(position, m_text.size()), clamp_to_size(count, m_text.size()));
-    }
+    m_text.erase(clamp_to_size(position, m_text.size()), clamp_to_size(count, m_text.size()));
     return GetLength();
 }
 
@@ -230,15 +228,17 @@ int CString::Remove(wchar_t character) noexcept {
 }
 
 CString& CString::MakeLower() {
+    const CodePage& code_page = active_code_page();
     for (wchar_t& ch : m_text) {
-        ch = active_code_page().to_lower(ch);
+        ch = code_page.to_lower(ch);
     }
     return *this;
 }
 
 CString& CString::MakeUpper() {
+    const CodePage& code_page = active_code_page();
     for (wchar_t& ch : m_text) {
-        ch = active_code_page().to_upper(ch);
+        ch = code_page.to_upper(ch);
     }
     return *this;
 }

@@ -168,7 +168,9 @@ private:
                 if (const auto* const text = static_cast<const char*>(argument.pointer()); by_pointer) {
                     write_address(conversion, reinterpret_cast<std::uintptr_t>(text));
                 } else {
-                    write_narrow_text(conversion, text);
+                    write_text(conversion, text != nullptr
+                                               ? basalt::platform::widen(cut(text, conversion.precision))
+                                               : std::wstring(NULL_TEXT));
                 }
                 break;
             case Kind::POINTER:
@@ -179,7 +181,7 @@ private:
 
     static constexpr std::wstring_view NULL_TEXT = L"(null)";
 
-    // At most `precision` characters: with one, the text need not end in a zero.
+    // At most `precision` units; where that many are there, no zero need follow them.
     template <class Character>
     static std::basic_string_view<Character> cut(const Character* text, int precision) {
         if (precision == NO_PRECISION) {
@@ -190,19 +192,6 @@ private:
             ++end;
         }
         return {text, static_cast<std::size_t>(end - text)};
-    }
-
-    void write_narrow_text(const Conversion& conversion, const char* text) {
-        if (text == nullptr) {
-            write_text(conversion, NULL_TEXT);
-            return;
-        }
-        constexpr int MAX_BYTES = 16;  // of one character, in any encoding
-        const bool is_limited = conversion.precision >= 0 && conversion.precision < 1'000'000;
-        const std::wstring wide = basalt::platform::widen(
-            cut(text, is_limited ? conversion.precision * MAX_BYTES : conversion.precision));
-        write_text(conversion, std::wstring_view(wide).substr(
-                                   0, is_limited ? static_cast<std::size_t>(conversion.precision) : wide.npos));
     }
 
     void write_text(const Conversion& conversion, std::wstring_view text) {
@@ -242,15 +231,14 @@ private:
         const unsigned bytes = conversion.integer_bytes != 0 ? conversion.integer_bytes : own_bytes;
         const unsigned unused_bits = 64 - 8 * bytes;
         const std::uint64_t pattern = static_cast<std::uint64_t>(argument.integer()) << unused_bits;
-        if (is_in(conversion.type, L"uoxX")) {
-            write_number(conversion, "ll", static_cast<char>(conversion.type),
-                         static_cast<unsigned long long>(pattern >> unused_bits));
-        } else if (!argument.is_signed() && argument.size() == 8 && conversion.integer_bytes == 0 &&
-                   !is_in(conversion.type, L"di")) {
-            write_number(conversion, "ll", 'u', static_cast<unsigned long long>(pattern));
-        } else {
+        const char plain_type = argument.is_signed() ? 'd' : 'u';
+        const char type =
+            is_in(conversion.type, L"diuoxX") ? static_cast<char>(conversion.type) : plain_type;
+        if (type == 'd' || type == 'i') {
             write_number(conversion, "ll", 'd',
                          static_cast<long long>(static_cast<std::int64_t>(pattern) >> unused_bits));
+        } else {
+            write_number(conversion, "ll", type, static_cast<unsigned long long>(pattern >> unused_bits));
         }
     }
 
@@ -278,15 +266,16 @@ private:
             }
             return static_cast<std::size_t>(length);
         };
-        std::string text(64, '\0');
-        const std::size_t length = print(text.data(), text.size());
-        if (length >= text.size()) {
-            text.resize(length + 1);
-            print(text.data(), text.size());
-        }
-        text.resize(length);
+        std::array<char, 64> usual;
+        const std::size_t length = print(usual.data(), usual.size());
         // A locale's decimal point may be any character of its encoding.
-        m_result.append(basalt::platform::widen(text));
+        if (length < usual.size()) {
+            m_result.append(basalt::platform::widen({usual.data(), length}));
+        } else {
+            std::string longer(length, '\0');
+            print(longer.data(), length + 1);
+            m_result.append(basalt::platform::widen(longer));
+        }
     }
 
     const wchar_t* m_format;

@@ -89,7 +89,7 @@ public:
     CString& operator+=(const CString& other);
     CString& operator+=(const wchar_t* other);
     CString& operator+=(wchar_t character);
-    /// Both return the new length. Delete leaves the text alone for a negative position.
+    /// Insert and Delete return the new length.
     int Insert(int position, wchar_t character);
     int Insert(int position, const wchar_t* text);
     int Delete(int position, int count = 1);
@@ -125,7 +125,8 @@ public:
     /// Makes the text of a format and arguments: `%[flags][width][.precision][size]type` with the types
     /// d i u o x X, e E f F g G a A, c C, s S, p, and `%%`; `*` takes a width or precision from the arguments.
     /// Sizes are hh h l ll w I I32 I64; hh, h and I32 narrow an integer, the others keep its own width. `p` writes
-    /// 16 upper-case digits. Precision limits a text's characters. A decimal point is that of the process's locale.
+    /// 16 upper-case digits. Precision limits a wide text's characters and a narrow text's bytes. A decimal point
+    /// is that of the process's locale.
     ///
     /// Arguments bring their types along: a text is written as what it is, wide (CString too) or narrow, by %s
     /// and %S alike. An argument that does not suit its type is written in its plain form, a missing one not at

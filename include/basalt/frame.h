@@ -24,11 +24,12 @@
 /// There is no code 8. Codes compare by magnitude: a later release of the NT family has a higher code.
 using basalt_os = std::uint32_t;
 
-/// Handheld platform code: 0 not determined, 1 the desktop. The capability queries below also know 3, 5 to 11,
-/// 13 and 14, which no detection of this library yields.
+/// Handheld platform code: 0 not determined, 1 the desktop. The capability queries below also know 3, 5 to
+/// 11, 13 and 14, which no detection of this library yields.
 using basalt_hh = std::uint32_t;
 
-/// Language setting, a plain code of the host's; here only 15 (the default) and 0 (read as 15) have a meaning.
+/// Language setting, a plain code of the host's; here only 15 (the default) and 0 (read as 15) have a
+/// meaning.
 using basalt_language = std::uint32_t;
 
 /// The operating system's release code.
@@ -92,8 +93,9 @@ BASALT_API int _taskbarheight();
 /// A pseudo-random number for names that need to be unlikely, not secret.
 ///
 /// Reseeds the C library's generator (`srand`) with the system's millisecond tick count whenever that has
-/// changed since the last call, then draws from it (`rand`): calls within one millisecond continue a sequence,
-/// and the same tick count gives the same sequence in every process. The host's own use of `rand` is disturbed.
+/// changed since the last call, then draws from it (`rand`): calls within one millisecond continue a
+/// sequence, and the same tick count gives the same sequence in every process. The host's own use of `rand`
+/// is disturbed.
 /// @return the draw modulo 65535: 0 to 65534 (up to 32767 where the generator itself goes no further).
 /// Threads: thread-safe; the sequence is shared, so which thread gets which number of it is open.
 BASALT_API std::uint16_t _random_uint16();

@@ -97,9 +97,13 @@ basalt_language _languageVersion() {
     return stored == 0 ? basalt::frame::DEFAULT_LANGUAGE : stored;
 }
 
-void _setLanguageVersion(basalt_language language) { environment.language.store(language); }
+void _setLanguageVersion(basalt_language language) {
+    environment.language.store(language);
+}
 
-int _taskbarheight() { return 26; }
+int _taskbarheight() {
+    return 26;
+}
 
 std::uint16_t _random_uint16() {
     const DWORD tick = GetTickCount();

@@ -17,16 +17,16 @@ struct Release {
 };
 
 constexpr Release RELEASES[] = {
-    {VER_PLATFORM_WIN32s, ANY, 0, ANY, 1},            // Win32s
-    {VER_PLATFORM_WIN32_WINDOWS, ANY, 0, 0, 2},       // Windows 95
-    {VER_PLATFORM_WIN32_WINDOWS, ANY, 10, 10, 3},     // Windows 98
-    {VER_PLATFORM_WIN32_WINDOWS, ANY, 90, 90, 4},     // Windows Me
-    {VER_PLATFORM_WIN32_NT, 4, 0, ANY, 5},            // Windows NT 4.0
-    {VER_PLATFORM_WIN32_NT, 5, 0, 0, 6},              // Windows 2000
-    {VER_PLATFORM_WIN32_NT, 5, 1, 2, 7},              // Windows XP, Server 2003
-    {VER_PLATFORM_WIN32_NT, 6, 0, 0, 9},              // Windows Vista, Server 2008
-    {VER_PLATFORM_WIN32_NT, 6, 1, 1, 10},             // Windows 7
-    {VER_PLATFORM_WIN32_NT, 6, 2, 2, 11},             // Windows 8
+    {VER_PLATFORM_WIN32s, ANY, 0, ANY, 1},         // Win32s
+    {VER_PLATFORM_WIN32_WINDOWS, ANY, 0, 0, 2},    // Windows 95
+    {VER_PLATFORM_WIN32_WINDOWS, ANY, 10, 10, 3},  // Windows 98
+    {VER_PLATFORM_WIN32_WINDOWS, ANY, 90, 90, 4},  // Windows Me
+    {VER_PLATFORM_WIN32_NT, 4, 0, ANY, 5},         // Windows NT 4.0
+    {VER_PLATFORM_WIN32_NT, 5, 0, 0, 6},           // Windows 2000
+    {VER_PLATFORM_WIN32_NT, 5, 1, 2, 7},           // Windows XP, Server 2003
+    {VER_PLATFORM_WIN32_NT, 6, 0, 0, 9},           // Windows Vista, Server 2008
+    {VER_PLATFORM_WIN32_NT, 6, 1, 1, 10},          // Windows 7
+    {VER_PLATFORM_WIN32_NT, 6, 2, 2, 11},          // Windows 8
 };
 
 bool is_release(const OSVERSIONINFOW& version, const Release& release) {

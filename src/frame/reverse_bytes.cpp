@@ -4,9 +4,15 @@
 
 namespace {
 
-std::uint64_t reversed(std::uint64_t word) { return __builtin_bswap64(word); }
-std::uint32_t reversed(std::uint32_t word) { return __builtin_bswap32(word); }
-std::uint8_t reversed(std::uint8_t byte) { return byte; }
+std::uint64_t reversed(std::uint64_t word) {
+    return __builtin_bswap64(word);
+}
+std::uint32_t reversed(std::uint32_t word) {
+    return __builtin_bswap32(word);
+}
+std::uint8_t reversed(std::uint8_t byte) {
+    return byte;
+}
 
 // Exchanges the words at the two ends of [begin, end), each reversed, and moves inwards. Both are read
 // before either is written, so they may overlap: with fewer than two words left this ends the work.

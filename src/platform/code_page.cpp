@@ -38,7 +38,9 @@ const char* environment_locale_name() {
     return nullptr;
 }
 
-locale_t open_locale(const char* name) { return newlocale(LC_CTYPE_MASK, name, nullptr); }
+locale_t open_locale(const char* name) {
+    return newlocale(LC_CTYPE_MASK, name, nullptr);
+}
 
 }  // namespace
 

@@ -43,8 +43,12 @@ private:
 // The environment's, opened at the first use and closed at unload.
 const CodePage& active_code_page();
 
-inline std::wstring widen(std::string_view text) { return active_code_page().widen(text); }
-inline std::string narrow(std::wstring_view text) { return active_code_page().narrow(text); }
+inline std::wstring widen(std::string_view text) {
+    return active_code_page().widen(text);
+}
+inline std::string narrow(std::wstring_view text) {
+    return active_code_page().narrow(text);
+}
 
 // The two conversions by way of a locale's own routines, one character at a time: what CodePage does for
 // every encoding but UTF-8.

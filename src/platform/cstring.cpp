@@ -32,7 +32,9 @@ void require_length(std::size_t length) {
     }
 }
 
-int sign(int comparison) { return (comparison > 0) - (comparison < 0); }
+int sign(int comparison) {
+    return (comparison > 0) - (comparison < 0);
+}
 
 template <class Matches>
 void trim_left(std::wstring& text, Matches matches) {
@@ -106,7 +108,9 @@ CString CString::Right(int count) const {
     return part;
 }
 
-CString CString::Mid(int first) const { return Mid(first, std::numeric_limits<int>::max()); }
+CString CString::Mid(int first) const {
+    return Mid(first, std::numeric_limits<int>::max());
+}
 
 CString CString::Mid(int first, int count) const {
     CString part;
@@ -131,7 +135,9 @@ int CString::FindOneOf(const wchar_t* characters) const noexcept {
     return position_or_none(m_text.find_first_of(view_of(characters)));
 }
 
-int CString::Compare(const wchar_t* other) const noexcept { return sign(m_text.compare(view_of(other))); }
+int CString::Compare(const wchar_t* other) const noexcept {
+    return sign(m_text.compare(view_of(other)));
+}
 
 int CString::CompareNoCase(const wchar_t* other) const {
     const CodePage& code_page = active_code_page();
@@ -243,9 +249,13 @@ CString& CString::MakeUpper() {
     return *this;
 }
 
-CString& CString::Trim() { return TrimRight().TrimLeft(); }
+CString& CString::Trim() {
+    return TrimRight().TrimLeft();
+}
 
-CString& CString::Trim(wchar_t character) { return TrimRight(character).TrimLeft(character); }
+CString& CString::Trim(wchar_t character) {
+    return TrimRight(character).TrimLeft(character);
+}
 
 CString& CString::Trim(const wchar_t* characters) {
     const auto matches = is_one_of(characters);

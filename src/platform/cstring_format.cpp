@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 #include <cstdio>
+#include <cstdlib>
 #include <limits>
 #include <stdexcept>
 #include <string_view>
@@ -17,6 +18,9 @@ using Kind = Argument::Kind;
 
 constexpr int NO_PRECISION = -1;
 
+// Largest width, and precision of a number: a format may not ask for gigabytes of blanks.
+constexpr int MAX_FIELD = 1'000'000;
+
 struct Conversion {
     bool left = false;  // '-'
     bool plus = false;
@@ -29,7 +33,9 @@ struct Conversion {
     wchar_t type = L'\0';        // 0: the format ended first
 };
 
-bool is_in(wchar_t ch, std::wstring_view set) { return ch != L'\0' && set.find(ch) != set.npos; }
+bool is_in(wchar_t ch, std::wstring_view set) {
+    return ch != L'\0' && set.find(ch) != set.npos;
+}
 
 class Formatter {
 public:
@@ -59,12 +65,9 @@ private:
     Conversion read_conversion() {
         Conversion conversion;
         read_flags(conversion);
-        if (const int width = read_number(); width < 0) {
-            conversion.left = true;
-            conversion.width = -width;
-        } else {
-            conversion.width = width;
-        }
+        const int width = read_number();
+        conversion.left = conversion.left || width < 0;
+        conversion.width = std::min(std::abs(width), MAX_FIELD);
         if (*m_format == L'.') {
             ++m_format;
             conversion.precision = std::max(read_number(), NO_PRECISION);
@@ -232,8 +235,7 @@ private:
         const unsigned unused_bits = 64 - 8 * bytes;
         const std::uint64_t pattern = static_cast<std::uint64_t>(argument.integer()) << unused_bits;
         const char plain_type = argument.is_signed() ? 'd' : 'u';
-        const char type =
-            is_in(conversion.type, L"diuoxX") ? static_cast<char>(conversion.type) : plain_type;
+        const char type = is_in(conversion.type, L"diuoxX") ? static_cast<char>(conversion.type) : plain_type;
         if (type == 'd' || type == 'i') {
             write_number(conversion, "ll", 'd',
                          static_cast<long long>(static_cast<std::int64_t>(pattern) >> unused_bits));
@@ -258,9 +260,9 @@ private:
             .append("*.*")
             .append(size)
             .append(1, type);
+        const int precision = std::min(conversion.precision, MAX_FIELD);
         const auto print = [&](char* text, std::size_t room) {
-            const int length =
-                std::snprintf(text, room, format.c_str(), conversion.width, conversion.precision, number);
+            const int length = std::snprintf(text, room, format.c_str(), conversion.width, precision, number);
             if (length < 0) {
                 throw std::length_error("CString::Format");
             }

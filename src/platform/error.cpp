@@ -49,9 +49,13 @@ void write_as_utf8(const wchar_t* text) {
 
 }  // namespace
 
-DWORD GetLastError() { return last_error; }
+DWORD GetLastError() {
+    return last_error;
+}
 
-void SetLastError(DWORD code) { last_error = code; }
+void SetLastError(DWORD code) {
+    last_error = code;
+}
 
 void OutputDebugStringW(const wchar_t* text) {
     if (text == nullptr) {

@@ -73,6 +73,8 @@ DWORD error_from_errno(int number) {
     }
 }
 
-void set_last_error_from_errno() { SetLastError(error_from_errno(errno)); }
+void set_last_error_from_errno() {
+    SetLastError(error_from_errno(errno));
+}
 
 }  // namespace basalt::platform

@@ -1,10 +1,7 @@
 #include "src/platform/error_message.h"
 
 #include <algorithm>
-#include <array>
-#include <charconv>
 #include <cstdlib>
-#include <cwchar>
 #include <iterator>
 #include <string_view>
 
@@ -67,14 +64,19 @@ static_assert(std::is_sorted(std::begin(MESSAGES), std::end(MESSAGES),
 
 constexpr std::wstring_view UNKNOWN_ERROR = L"Unknown error ";
 
-// The code in decimal digits, at most ten of them.
-struct DecimalDigits {
-    explicit DecimalDigits(DWORD code)
-        : end(std::to_chars(digits.data(), digits.data() + digits.size(), code).ptr) {}
+constexpr std::size_t MAX_DIGITS = 10;
 
-    std::array<char, 10> digits;
-    char* end;
-};
+// Writes the code in decimal and answers the end. Not std::to_chars, whose table would be exported.
+wchar_t* write_decimal(DWORD code, wchar_t* text) {
+    wchar_t digits[MAX_DIGITS];
+    wchar_t* const end = std::end(digits);
+    wchar_t* first = end;
+    do {
+        *--first = static_cast<wchar_t>(L'0' + code % 10);
+        code /= 10;
+    } while (code != 0);
+    return std::copy(first, end, text);
+}
 
 }  // namespace
 
@@ -91,10 +93,7 @@ DWORD FormatMessageW(DWORD flags, const void* /*source*/, DWORD code, DWORD lang
                                          [](const Message& m, DWORD wanted) { return m.code < wanted; });
     const bool is_known = known != std::end(MESSAGES) && known->code == code;
     const std::wstring_view text = is_known ? known->text : UNKNOWN_ERROR;
-    const DecimalDigits number(code);
-
-    const std::size_t longest = text.size() + number.digits.size();
-    const std::size_t room = std::max<std::size_t>(size, longest + 1);
+    const std::size_t room = std::max<std::size_t>(size, text.size() + MAX_DIGITS + 1);
     auto* const message = static_cast<wchar_t*>(std::malloc(room * sizeof(wchar_t)));
     if (message == nullptr) {
         SetLastError(ERROR_NOT_ENOUGH_MEMORY);
@@ -102,7 +101,7 @@ DWORD FormatMessageW(DWORD flags, const void* /*source*/, DWORD code, DWORD lang
     }
     wchar_t* end = std::copy(text.begin(), text.end(), message);
     if (!is_known) {
-        end = std::copy(number.digits.data(), static_cast<const char*>(number.end), end);
+        end = write_decimal(code, end);
     }
     *end = L'\0';
     *buffer = message;

@@ -20,8 +20,8 @@ inline constexpr DWORD FORMAT_MESSAGE_FROM_SYSTEM = 0x1000;
 // Failure: 0 with ERROR_INVALID_PARAMETER for other flags, another language or a null buffer, with
 // ERROR_NOT_ENOUGH_MEMORY when there is no room for the text.
 // Threads: thread-safe.
-DWORD FormatMessageW(DWORD flags, const void* source, DWORD code, DWORD language, wchar_t** buffer, DWORD size,
-                     void* arguments);
+DWORD FormatMessageW(DWORD flags, const void* source, DWORD code, DWORD language, wchar_t** buffer,
+                     DWORD size, void* arguments);
 
 // Releases a buffer of FormatMessageW; null is allowed. Result: null, always.
 // Threads: thread-safe.

@@ -104,13 +104,13 @@ TEST_F(Environment, handheld_capabilities) {
         bool takes_generation_flag, takes_rtk_flag;
     };
     constexpr Row ROWS[] = {
-        {1, false, false, false, true, false, false}, {2, false, false, false, true, false, false},
-        {3, false, true, false, true, false, false},  {4, false, false, false, true, false, false},
-        {5, true, false, false, true, false, false},  {6, true, false, false, true, true, false},
-        {7, false, true, true, true, false, false},   {8, true, false, false, false, false, false},
+        {1, false, false, false, true, false, false},  {2, false, false, false, true, false, false},
+        {3, false, true, false, true, false, false},   {4, false, false, false, true, false, false},
+        {5, true, false, false, true, false, false},   {6, true, false, false, true, true, false},
+        {7, false, true, true, true, false, false},    {8, true, false, false, false, false, false},
         {9, false, false, false, false, false, false}, {10, false, true, false, true, false, false},
-        {11, false, true, false, true, false, true},  {12, false, false, false, true, false, false},
-        {13, false, false, false, true, true, false}, {14, false, true, false, true, false, false},
+        {11, false, true, false, true, false, true},   {12, false, false, false, true, false, false},
+        {13, false, false, false, true, true, false},  {14, false, true, false, true, false, false},
         {15, false, false, false, true, false, false},
     };
     for (const Row& row : ROWS) {

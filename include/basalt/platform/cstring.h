@@ -18,9 +18,8 @@
 /// outside the text is brought to the nearest end, unless said otherwise, and is never an error. Narrow text
 /// is in the active code page: the encoding of the environment's locale, UTF-8 where that names none.
 ///
-/// Bad input: no call fails; std::bad_alloc and std::length_error (more than 2^31 - 1 characters) leave the text
-/// as it was.
-/// Threads: reentrant; one object is used by one thread at a time, or by many for reading.
+/// Bad input: no call fails; std::bad_alloc and std::length_error (more than 2^31 - 1 characters) leave the
+/// text as it was. Threads: reentrant; one object is used by one thread at a time, or by many for reading.
 class BASALT_API CString {
 public:
     class FormatArgument;
@@ -123,14 +122,15 @@ public:
     /// @}
 
     /// Makes the text of a format and arguments: `%[flags][width][.precision][size]type` with the types
-    /// d i u o x X, e E f F g G a A, c C, s S, p, and `%%`; `*` takes a width or precision from the arguments.
-    /// Sizes are hh h l ll w I I32 I64; hh, h and I32 narrow an integer, the others keep its own width. `p` writes
-    /// 16 upper-case digits. Precision limits a wide text's characters and a narrow text's bytes. A decimal point
-    /// is that of the process's locale.
+    /// d i u o x X, e E f F g G a A, c C, s S, p, and `%%`; `*` takes a width or precision from the
+    /// arguments. Sizes are hh h l ll w I I32 I64; hh, h and I32 narrow an integer, the others keep its own
+    /// width. `p` writes 16 upper-case digits. Precision limits a wide text's characters and a narrow text's
+    /// bytes. A width, and a number's precision, ends at 1,000,000. A decimal point is that of the process's
+    /// locale.
     ///
-    /// Arguments bring their types along: a text is written as what it is, wide (CString too) or narrow, by %s
-    /// and %S alike. An argument that does not suit its type is written in its plain form, a missing one not at
-    /// all, an unknown type as it stands. Arguments may come from the object itself.
+    /// Arguments bring their types along: a text is written as what it is, wide (CString too) or narrow, by
+    /// %s and %S alike. An argument that does not suit its type is written in its plain form, a missing one
+    /// not at all, an unknown type as it stands. Arguments may come from the object itself.
     template <class... Arguments>
     void Format(const wchar_t* format, const Arguments&... arguments) {
         CString text;

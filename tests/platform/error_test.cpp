@@ -122,7 +122,7 @@ TEST(DebugOutput, standard_error_gets_utf8_and_nothing_else_changes) {
     std::string expected;
     // Longer than any buffer on the way, with characters of one to four bytes at every offset, and two that
     // UTF-8 does not have.
-    for (int i = 0; i < 60'000; ++i) {
+    for (std::size_t i = 0; i < 60'000; ++i) {
         text += L"aé€\x1F600\xD800\x110000"[i % 6];
         expected += std::array{"a", "\xC3\xA9", "\xE2\x82\xAC", "\xF0\x9F\x98\x80", "?", "?"}[i % 6];
     }

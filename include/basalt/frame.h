@@ -1,5 +1,8 @@
 /// @file
 /// Environment queries: operating-system and handheld codes, language, display and two small utilities.
+///
+/// None of them fails, takes a lock or throws. What is determined once is stored for the life of the library
+/// in the process; two threads that make the first query at once both get, and store, the same answer.
 #ifndef BASALT_FRAME_H
 #define BASALT_FRAME_H
 
@@ -7,26 +10,100 @@
 
 #include "basalt/export.h"
 
-/// Operating-system release code. Codes compare by magnitude; there is no code 8.
+/// Operating-system release code:
+///
+/// | code | release                    | code | release                        |
+/// |-----:|----------------------------|-----:|--------------------------------|
+/// | 0    | not determined             | 6    | Windows 2000                   |
+/// | 1    | Win32s                     | 7    | Windows XP, Server 2003        |
+/// | 2    | Windows 95                 | 9    | Windows Vista, Server 2008     |
+/// | 3    | Windows 98                 | 10   | Windows 7                      |
+/// | 4    | Windows Me                 | 11   | Windows 8                      |
+/// | 5    | Windows NT 4.0             |      |                                |
+///
+/// There is no code 8. Codes compare by magnitude: a later release of the NT family has a higher code.
 using basalt_os = std::uint32_t;
-/// Handheld platform code; 0 is not determined, 1 the desktop.
+
+/// Handheld platform code: 0 not determined, 1 the desktop. The capability queries below also know 3, 5 to
+/// 11, 13 and 14, which no detection of this library yields.
 using basalt_hh = std::uint32_t;
-/// Language setting; 15 is the default.
+
+/// Language setting, a plain code of the host's; here only 15 (the default) and 0 (read as 15) have a
+/// meaning.
 using basalt_language = std::uint32_t;
 
+/// The operating system's release code.
+/// @return the code, detected at the first call and stored; 0 when the release is none of the known ones, and
+/// the next call detects again. A system other than those reports itself as code 11.
+/// Threads: thread-safe.
 BASALT_API basalt_os _operatingsystem();
+
+/// The operating system's version number, which no detection sets.
+/// @return 0, always; every call runs the detection of _operatingsystem() again.
+/// Threads: thread-safe.
 BASALT_API int _operatingsystemversion();
+
+/// The handheld platform's code.
+/// @return 1, the desktop, stored at the first call.
+/// Threads: thread-safe.
 BASALT_API basalt_hh _handheldVersion();
+
+/// Whether the handheld runs the new generation of its system: the stored flag (false; nothing in the library
+/// sets it) on handhelds 6 and 13, false on every other.
+/// Threads: thread-safe.
 BASALT_API bool _isNewLumoOS();
+
+/// Whether the handheld can carry a KV7 radio built in: handhelds 5, 6 and 8.
+/// Threads: thread-safe.
 BASALT_API bool _handheldCanHaveInBuildKV7Radio();
+
+/// Whether the handheld can carry a modem built in: handhelds 3, 7, 10, 11 and 14.
+/// Threads: thread-safe.
 BASALT_API bool _handheldCanHaveInBuildModem();
+
+/// Whether the handheld can carry a Kestra RTK receiver built in: handheld 7, and handheld 11 with the stored
+/// option flag (false; nothing in the library sets it).
+/// Threads: thread-safe.
 BASALT_API bool _handheldCanHaveInBuildKestraRTK();
+
+/// Whether texts are shown in the default font size: everywhere but on handhelds 8 and 9.
+/// Threads: thread-safe.
 BASALT_API bool _isDefaultFontSize();
+
+/// The display's resolution factor.
+/// @return 1.0, stored at the first call.
+/// Threads: thread-safe.
 BASALT_API double _checkForHighResolution();
+
+/// The language setting.
+/// @return the code last set; 15 before any setting and for a setting of 0.
+/// Threads: thread-safe.
 BASALT_API basalt_language _languageVersion();
+
+/// Sets the language.
+/// @param language any code, stored without a check; 0 brings the default 15 back
+/// Threads: thread-safe.
 BASALT_API void _setLanguageVersion(basalt_language language);
+
+/// Height of the task bar.
+/// @return 26 (pixels).
+/// Threads: thread-safe.
 BASALT_API int _taskbarheight();
+
+/// A pseudo-random number for names that need to be unlikely, not secret.
+///
+/// Reseeds the C library's generator (`srand`) with the system's millisecond tick count whenever that has
+/// changed since the last call, then draws from it (`rand`): calls within one millisecond continue a
+/// sequence, and the same tick count gives the same sequence in every process. The host's own use of `rand`
+/// is disturbed.
+/// @return the draw modulo 65535: 0 to 65534 (up to 32767 where the generator itself goes no further).
+/// Threads: thread-safe; the sequence is shared, so which thread gets which number of it is open.
 BASALT_API std::uint16_t _random_uint16();
+
+/// Reverses the order of bytes in place: the first becomes the last.
+/// @param data the bytes, of any record, at any alignment; may be null when count is 0
+/// @param count number of bytes; 0 and 1 change nothing
+/// Threads: reentrant; nobody else may use the bytes meanwhile.
 BASALT_API void _reversebytes(void* data, std::uint32_t count);
 
 #endif

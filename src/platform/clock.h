@@ -4,7 +4,9 @@
 
 #include "basalt/platform/types.h"
 
-// Milliseconds of the machine's monotonic clock, cut to 32 bits; the same for every process.
+// Milliseconds of the machine's monotonic clock in their low 32 bits, so the count starts over every 49.7
+// days. All processes read the same clock. Never fails.
+// Threads: thread-safe.
 DWORD GetTickCount();
 
 #endif

@@ -1,0 +1,138 @@
+#include "src/platform/code_page.h"
+
+#include <langinfo.h>
+
+#include <algorithm>
+#include <climits>
+#include <cstdlib>
+#include <cwchar>
+#include <cwctype>
+
+namespace basalt::platform {
+
+namespace {
+
+constexpr char UTF8_LOCALE[] = "C.UTF-8";
+
+// Puts a locale in force for the calling thread and the one before back at the end.
+class ScopedLocale {
+public:
+    explicit ScopedLocale(locale_t locale) : m_before(uselocale(locale)) {}
+    ~ScopedLocale() { uselocale(m_before); }
+    ScopedLocale(const ScopedLocale&) = delete;
+    ScopedLocale& operator=(const ScopedLocale&) = delete;
+
+private:
+    locale_t m_before;
+};
+
+// The name of the environment's locale; null where it names none or the one without an encoding.
+const char* environment_locale_name() {
+    for (const char* const variable : {"LC_ALL", "LC_CTYPE", "LANG"}) {
+        const char* const value = std::getenv(variable);
+        if (value != nullptr && *value != '\0') {
+            const std::string_view name = value;
+            return name == "C" || name == "POSIX" ? nullptr : value;
+        }
+    }
+    return nullptr;
+}
+
+locale_t open_locale(const char* name) {
+    return newlocale(LC_CTYPE_MASK, name, nullptr);
+}
+
+}  // namespace
+
+CodePage::CodePage(const char* locale_name)
+    : m_locale(locale_name != nullptr ? open_locale(locale_name) : nullptr), m_is_utf8(m_locale == nullptr) {
+    if (m_locale == nullptr) {
+        m_locale = open_locale(UTF8_LOCALE);
+    } else {
+        m_is_utf8 = std::string_view(nl_langinfo_l(CODESET, m_locale)) == "UTF-8";
+    }
+}
+
+CodePage::~CodePage() {
+    if (m_locale != nullptr) {
+        freelocale(m_locale);
+    }
+}
+
+std::wstring CodePage::widen(std::string_view text) const {
+    return m_is_utf8 ? wide_from_utf8(text) : widen_by_locale(text, m_locale);
+}
+
+std::string CodePage::narrow(std::wstring_view text) const {
+    return m_is_utf8 ? utf8_from_wide(text) : narrow_by_locale(text, m_locale);
+}
+
+wchar_t CodePage::to_lower(wchar_t ch) const {
+    if (m_locale != nullptr) {
+        return static_cast<wchar_t>(towlower_l(static_cast<wint_t>(ch), m_locale));
+    }
+    return ch >= L'A' && ch <= L'Z' ? ch - L'A' + L'a' : ch;
+}
+
+wchar_t CodePage::to_upper(wchar_t ch) const {
+    if (m_locale != nullptr) {
+        return static_cast<wchar_t>(towupper_l(static_cast<wint_t>(ch), m_locale));
+    }
+    return ch >= L'a' && ch <= L'z' ? ch - L'a' + L'A' : ch;
+}
+
+bool CodePage::is_space(wchar_t ch) const {
+    if (m_locale != nullptr) {
+        return iswspace_l(static_cast<wint_t>(ch), m_locale) != 0;
+    }
+    return ch == L' ' || (ch >= L'\t' && ch <= L'\r');
+}
+
+const CodePage& active_code_page() {
+    static const CodePage environment(environment_locale_name());
+    return environment;
+}
+
+std::wstring widen_by_locale(std::string_view text, locale_t locale) {
+    const ScopedLocale scope(locale);
+    std::wstring result;
+    result.reserve(text.size());
+    std::mbstate_t state{};
+    while (!text.empty()) {
+        wchar_t ch = L'\0';
+        const std::size_t length = std::mbrtowc(&ch, text.data(), text.size(), &state);
+        // The two failures, invalid and cut short, are the two largest counts. A lead byte in front of
+        // ordinary text may answer either, so neither swallows more than the one byte.
+        if (length > text.size() || !is_unicode_scalar(ch)) {
+            result.push_back(REPLACEMENT_CHARACTER);
+            text.remove_prefix(1);
+            state = {};
+        } else {
+            result.push_back(ch);
+            // A zero character answers 0 and has one byte.
+            text.remove_prefix(std::max<std::size_t>(length, 1));
+        }
+    }
+    return result;
+}
+
+std::string narrow_by_locale(std::wstring_view text, locale_t locale) {
+    const ScopedLocale scope(locale);
+    std::string result;
+    result.reserve(text.size());
+    std::mbstate_t state{};
+    for (const wchar_t ch : text) {
+        char bytes[MB_LEN_MAX];
+        constexpr auto FAILED = static_cast<std::size_t>(-1);
+        const std::size_t length = is_unicode_scalar(ch) ? std::wcrtomb(bytes, ch, &state) : FAILED;
+        if (length == FAILED) {
+            result.push_back('?');
+            state = {};
+        } else {
+            result.append(bytes, length);
+        }
+    }
+    return result;
+}
+
+}  // namespace basalt::platform

@@ -1,0 +1,305 @@
+#include "basalt/platform/cstring.h"
+
+#include <algorithm>
+#include <limits>
+#include <stdexcept>
+#include <string_view>
+
+#include "src/platform/code_page.h"
+
+using basalt::platform::active_code_page;
+using basalt::platform::CodePage;
+
+namespace {
+
+constexpr auto MAX_LENGTH = static_cast<std::size_t>(std::numeric_limits<int>::max());
+
+std::wstring_view view_of(const wchar_t* text) {
+    return text != nullptr ? std::wstring_view(text) : std::wstring_view();
+}
+
+std::size_t clamp_to_size(int position, std::size_t size) {
+    return std::min(static_cast<std::size_t>(std::max(position, 0)), size);
+}
+
+int position_or_none(std::size_t position) {
+    return position == std::wstring::npos ? -1 : static_cast<int>(position);
+}
+
+void require_length(std::size_t length) {
+    if (length > MAX_LENGTH) {
+        throw std::length_error("CString");
+    }
+}
+
+int sign(int comparison) {
+    return (comparison > 0) - (comparison < 0);
+}
+
+template <class Matches>
+void trim_left(std::wstring& text, Matches matches) {
+    text.erase(text.begin(), std::find_if_not(text.begin(), text.end(), matches));
+}
+
+template <class Matches>
+void trim_right(std::wstring& text, Matches matches) {
+    text.erase(std::find_if_not(text.rbegin(), text.rend(), matches).base(), text.end());
+}
+
+auto is_white_space() {
+    return [&code_page = active_code_page()](wchar_t ch) { return code_page.is_space(ch); };
+}
+
+// Over a copy of the characters: they may belong to the text being trimmed.
+auto is_one_of(const wchar_t* characters) {
+    return [set = std::wstring(view_of(characters))](wchar_t ch) { return set.find(ch) != set.npos; };
+}
+
+auto is_equal_to(wchar_t character) {
+    return [character](wchar_t ch) { return ch == character; };
+}
+
+}  // namespace
+
+CString::CString(const wchar_t* text) {
+    const std::wstring_view characters = view_of(text);
+    append(characters.data(), characters.size());
+}
+
+CString::CString(const wchar_t* text, int length) {
+    if (text != nullptr && length > 0) {
+        m_text.assign(text, static_cast<std::size_t>(length));
+    }
+}
+
+CString::CString(const char* text) {
+    if (text != nullptr) {
+        const std::wstring wide = basalt::platform::widen(text);
+        append(wide.data(), wide.size());
+    }
+}
+
+CString::CString(const char* text, int length) {
+    if (text != nullptr && length > 0) {
+        m_text = basalt::platform::widen({text, static_cast<std::size_t>(length)});
+    }
+}
+
+CString::CString(wchar_t character, int repeat)
+    : m_text(static_cast<std::size_t>(std::max(repeat, 0)), character) {}
+
+CString::CString(char character, int repeat)
+    : CString(basalt::platform::widen({&character, 1}).front(), repeat) {}
+
+CString& CString::operator=(wchar_t character) {
+    m_text.assign(1, character);
+    return *this;
+}
+
+CString CString::Left(int count) const {
+    CString part;
+    part.m_text.assign(m_text, 0, clamp_to_size(count, m_text.size()));
+    return part;
+}
+
+CString CString::Right(int count) const {
+    CString part;
+    part.m_text.assign(m_text, m_text.size() - clamp_to_size(count, m_text.size()));
+    return part;
+}
+
+CString CString::Mid(int first) const {
+    return Mid(first, std::numeric_limits<int>::max());
+}
+
+CString CString::Mid(int first, int count) const {
+    CString part;
+    part.m_text.assign(m_text, clamp_to_size(first, m_text.size()), clamp_to_size(count, m_text.size()));
+    return part;
+}
+
+int CString::Find(wchar_t character, int start) const noexcept {
+    return start < 0 ? -1 : position_or_none(m_text.find(character, static_cast<std::size_t>(start)));
+}
+
+int CString::Find(const wchar_t* text, int start) const noexcept {
+    const bool can_match = text != nullptr && start >= 0;
+    return can_match ? position_or_none(m_text.find(text, static_cast<std::size_t>(start))) : -1;
+}
+
+int CString::ReverseFind(wchar_t character) const noexcept {
+    return position_or_none(m_text.rfind(character));
+}
+
+int CString::FindOneOf(const wchar_t* characters) const noexcept {
+    return position_or_none(m_text.find_first_of(view_of(characters)));
+}
+
+int CString::Compare(const wchar_t* other) const noexcept {
+    return sign(m_text.compare(view_of(other)));
+}
+
+int CString::CompareNoCase(const wchar_t* other) const {
+    const CodePage& code_page = active_code_page();
+    const std::wstring_view others = view_of(other);
+    const std::size_t shared = std::min(m_text.size(), others.size());
+    for (std::size_t i = 0; i < shared; ++i) {
+        const wchar_t a = code_page.to_lower(m_text[i]);
+        const wchar_t b = code_page.to_lower(others[i]);
+        if (a != b) {
+            return a < b ? -1 : 1;
+        }
+    }
+    return (m_text.size() > shared) - (others.size() > shared);
+}
+
+void CString::SetAt(int position, wchar_t character) noexcept {
+    if (position >= 0 && static_cast<std::size_t>(position) < m_text.size()) {
+        m_text[static_cast<std::size_t>(position)] = character;
+    }
+}
+
+void CString::append(const wchar_t* text, std::size_t length) {
+    require_length(m_text.size() + length);
+    m_text.append(text, length);
+}
+
+CString& CString::operator+=(const CString& other) {
+    append(other.m_text.data(), other.m_text.size());
+    return *this;
+}
+
+CString& CString::operator+=(const wchar_t* other) {
+    const std::wstring_view text = view_of(other);
+    append(text.data(), text.size());
+    return *this;
+}
+
+CString& CString::operator+=(wchar_t character) {
+    append(&character, 1);
+    return *this;
+}
+
+int CString::Insert(int position, wchar_t character) {
+    require_length(m_text.size() + 1);
+    m_text.insert(clamp_to_size(position, m_text.size()), 1, character);
+    return GetLength();
+}
+
+int CString::Insert(int position, const wchar_t* text) {
+    const std::wstring_view characters = view_of(text);
+    require_length(m_text.size() + characters.size());
+    m_text.insert(clamp_to_size(position, m_text.size()), characters);
+    return GetLength();
+}
+
+int CString::Delete(int position, int count) {
+    m_text.erase(clamp_to_size(position, m_text.size()), clamp_to_size(count, m_text.size()));
+    return GetLength();
+}
+
+int CString::Replace(wchar_t old_character, wchar_t new_character) noexcept {
+    int count = 0;
+    for (wchar_t& ch : m_text) {
+        if (ch == old_character && old_character != new_character) {
+            ch = new_character;
+            ++count;
+        }
+    }
+    return count;
+}
+
+int CString::Replace(const wchar_t* old_text, const wchar_t* new_text) {
+    const std::wstring_view old_part = view_of(old_text);
+    const std::wstring_view new_part = view_of(new_text);
+    if (old_part.empty()) {
+        return 0;
+    }
+    std::wstring result;
+    int count = 0;
+    std::size_t done = 0;
+    for (std::size_t match; (match = m_text.find(old_part, done)) != m_text.npos; ++count) {
+        result.append(m_text, done, match - done).append(new_part);
+        require_length(result.size());
+        done = match + old_part.size();
+    }
+    result.append(m_text, done);
+    require_length(result.size());
+    m_text.swap(result);
+    return count;
+}
+
+int CString::Remove(wchar_t character) noexcept {
+    return static_cast<int>(std::erase(m_text, character));
+}
+
+CString& CString::MakeLower() {
+    const CodePage& code_page = active_code_page();
+    for (wchar_t& ch : m_text) {
+        ch = code_page.to_lower(ch);
+    }
+    return *this;
+}
+
+CString& CString::MakeUpper() {
+    const CodePage& code_page = active_code_page();
+    for (wchar_t& ch : m_text) {
+        ch = code_page.to_upper(ch);
+    }
+    return *this;
+}
+
+CString& CString::Trim() {
+    return TrimRight().TrimLeft();
+}
+
+CString& CString::Trim(wchar_t character) {
+    return TrimRight(character).TrimLeft(character);
+}
+
+CString& CString::Trim(const wchar_t* characters) {
+    const auto matches = is_one_of(characters);
+    trim_right(m_text, matches);
+    trim_left(m_text, matches);
+    return *this;
+}
+
+CString& CString::TrimLeft() {
+    trim_left(m_text, is_white_space());
+    return *this;
+}
+
+CString& CString::TrimLeft(wchar_t character) {
+    trim_left(m_text, is_equal_to(character));
+    return *this;
+}
+
+CString& CString::TrimLeft(const wchar_t* characters) {
+    trim_left(m_text, is_one_of(characters));
+    return *this;
+}
+
+CString& CString::TrimRight() {
+    trim_right(m_text, is_white_space());
+    return *this;
+}
+
+CString& CString::TrimRight(wchar_t character) {
+    trim_right(m_text, is_equal_to(character));
+    return *this;
+}
+
+CString& CString::TrimRight(const wchar_t* characters) {
+    trim_right(m_text, is_one_of(characters));
+    return *this;
+}
+
+wchar_t* CString::GetBuffer(int least_length) {
+    m_text.resize(std::max(m_text.size(), static_cast<std::size_t>(std::max(least_length, 0))));
+    return m_text.data();
+}
+
+void CString::ReleaseBuffer(int length) noexcept {
+    const std::size_t end = length < 0 ? m_text.find(L'\0') : static_cast<std::size_t>(length);
+    m_text.resize(std::min(end, m_text.size()));
+}

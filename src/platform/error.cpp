@@ -1,8 +1,81 @@
 #include "basalt/platform/error.h"
 
-#include <cstdio>
-namespace { thread_local DWORD last_error = 0; basalt::platform::DebugOutputHandler handler = nullptr; }
-DWORD GetLastError() { return last_error; }
-void SetLastError(DWORD code) { last_error = code; }
-void OutputDebugStringW(const wchar_t* text) { if (handler) handler(text); else std::fprintf(stderr, "%ls", text); }
-namespace basalt::platform { DebugOutputHandler SetDebugOutputHandler(DebugOutputHandler h) { auto o = handler; handler = h; return o; } }
+#include <unistd.h>
+
+#include <array>
+#include <atomic>
+#include <cerrno>
+#include <cstddef>
+
+#include "src/platform/utf8.h"
+
+using basalt::platform::DebugOutputHandler;
+
+namespace {
+
+// Plain data: a thread_local with a destructor would keep the library from being unloaded.
+constinit thread_local DWORD last_error = ERROR_SUCCESS;
+
+constinit std::atomic<DebugOutputHandler> debug_output_handler = nullptr;
+
+// Straight to the descriptor: the host's stdio buffers, their locks and their orientation stay untouched.
+void write_to_standard_error(const char* bytes, std::size_t count) {
+    while (count > 0) {
+        const ssize_t written = ::write(STDERR_FILENO, bytes, count);
+        if (written < 0 && errno == EINTR) {
+            continue;
+        }
+        if (written <= 0) {
+            return;
+        }
+        bytes += written;
+        count -= static_cast<std::size_t>(written);
+    }
+}
+
+// Through a buffer on the stack, since the failure being reported may be a lack of memory.
+void write_as_utf8(const wchar_t* text) {
+    std::array<char, 1024> buffer;
+    std::size_t used = 0;
+    for (; *text != L'\0'; ++text) {
+        if (buffer.size() - used < basalt::platform::MAX_UTF8_BYTES) {
+            write_to_standard_error(buffer.data(), used);
+            used = 0;
+        }
+        used += basalt::platform::encode_utf8(*text, buffer.data() + used);
+    }
+    write_to_standard_error(buffer.data(), used);
+}
+
+}  // namespace
+
+DWORD GetLastError() {
+    return last_error;
+}
+
+void SetLastError(DWORD code) {
+    last_error = code;
+}
+
+void OutputDebugStringW(const wchar_t* text) {
+    if (text == nullptr) {
+        return;
+    }
+    const int errno_before = errno;
+    const DWORD error_before = last_error;
+    if (const DebugOutputHandler handler = debug_output_handler.load(std::memory_order_acquire)) {
+        handler(text);
+    } else {
+        write_as_utf8(text);
+    }
+    last_error = error_before;
+    errno = errno_before;
+}
+
+namespace basalt::platform {
+
+DebugOutputHandler SetDebugOutputHandler(DebugOutputHandler handler) {
+    return debug_output_handler.exchange(handler, std::memory_order_acq_rel);
+}
+
+}  // namespace basalt::platform

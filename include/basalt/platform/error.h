@@ -1,36 +1,88 @@
 /// @file
-/// Last error of the calling thread and the debugger output.
+/// Last error of the calling thread, result codes and the debugger output.
 #ifndef BASALT_PLATFORM_ERROR_H
 #define BASALT_PLATFORM_ERROR_H
 
 #include "basalt/export.h"
 #include "basalt/platform/types.h"
 
+/// @name Error codes, with their published values
+/// @{
 inline constexpr DWORD ERROR_SUCCESS = 0;
+inline constexpr DWORD ERROR_INVALID_FUNCTION = 1;
 inline constexpr DWORD ERROR_FILE_NOT_FOUND = 2;
 inline constexpr DWORD ERROR_PATH_NOT_FOUND = 3;
 inline constexpr DWORD ERROR_TOO_MANY_OPEN_FILES = 4;
 inline constexpr DWORD ERROR_ACCESS_DENIED = 5;
 inline constexpr DWORD ERROR_INVALID_HANDLE = 6;
 inline constexpr DWORD ERROR_NOT_ENOUGH_MEMORY = 8;
+inline constexpr DWORD ERROR_OUTOFMEMORY = 14;
+inline constexpr DWORD ERROR_NOT_SAME_DEVICE = 17;
+inline constexpr DWORD ERROR_NO_MORE_FILES = 18;
+inline constexpr DWORD ERROR_WRITE_PROTECT = 19;
+inline constexpr DWORD ERROR_GEN_FAILURE = 31;
+inline constexpr DWORD ERROR_SHARING_VIOLATION = 32;
+inline constexpr DWORD ERROR_LOCK_VIOLATION = 33;
+inline constexpr DWORD ERROR_NOT_SUPPORTED = 50;
+inline constexpr DWORD ERROR_DEV_NOT_EXIST = 55;
+inline constexpr DWORD ERROR_FILE_EXISTS = 80;
 inline constexpr DWORD ERROR_INVALID_PARAMETER = 87;
 inline constexpr DWORD ERROR_DISK_FULL = 112;
 inline constexpr DWORD ERROR_INSUFFICIENT_BUFFER = 122;
+inline constexpr DWORD ERROR_INVALID_NAME = 123;
+inline constexpr DWORD ERROR_DIR_NOT_EMPTY = 145;
+inline constexpr DWORD ERROR_BUSY = 170;
+inline constexpr DWORD ERROR_ALREADY_EXISTS = 183;
+inline constexpr DWORD ERROR_FILENAME_EXCED_RANGE = 206;
+inline constexpr DWORD ERROR_FILE_TOO_LARGE = 223;
+inline constexpr DWORD ERROR_DIRECTORY = 267;
+inline constexpr DWORD ERROR_INVALID_ADDRESS = 487;
+inline constexpr DWORD ERROR_ARITHMETIC_OVERFLOW = 534;
+inline constexpr DWORD ERROR_OPERATION_ABORTED = 995;
+inline constexpr DWORD ERROR_NOACCESS = 998;
+inline constexpr DWORD ERROR_FILE_INVALID = 1006;
+inline constexpr DWORD ERROR_NO_UNICODE_TRANSLATION = 1113;
+inline constexpr DWORD ERROR_IO_DEVICE = 1117;
+inline constexpr DWORD ERROR_NO_SYSTEM_RESOURCES = 1450;
+inline constexpr DWORD ERROR_COMMITMENT_LIMIT = 1455;
+inline constexpr DWORD ERROR_TIMEOUT = 1460;
+inline constexpr DWORD ERROR_CANT_RESOLVE_FILENAME = 1921;
+/// @}
 
-/// The calling thread's last error code.
+/// The calling thread's last error code: what the last failed call of the platform layer on this thread
+/// left behind, 0 on a thread where none has failed. Successful calls leave it alone.
+/// Threads: thread-safe; each thread has its own.
 BASALT_API DWORD GetLastError();
-/// Sets the calling thread's last error code.
+
+/// Sets the calling thread's last error code; any value is kept as given.
+/// Threads: thread-safe; each thread has its own.
 BASALT_API void SetLastError(DWORD code);
 
-/// Writes text to the debugger output: the handler set below, by default standard error.
+/// An error code as a result code: 0x80070000 with the code's low 16 bits. A code that is 0, or already a
+/// negative result code, comes back as it is.
+/// Threads: reentrant.
+constexpr HRESULT HRESULT_FROM_WIN32(DWORD code) {
+    const bool is_result = static_cast<HRESULT>(code) <= 0;
+    return static_cast<HRESULT>(is_result ? code : 0x80070000U | (code & 0xFFFFU));
+}
+
+/// Writes text to the debugger output: to the handler set below, or else as UTF-8 to standard error.
+/// @param text the text, written as it is without a line end added; null writes nothing
+/// What the output does with it is not reported. Last error and errno are as before the call.
+/// Threads: thread-safe; texts of up to about 200 characters are written whole.
 BASALT_API void OutputDebugStringW(const wchar_t* text);
 
 namespace basalt::platform {
 
-/// Receives each piece of debugger output, on the thread that wrote it.
+/// Receives each piece of debugger output, on the thread that wrote it. The text is never null and is
+/// valid during the call; the handler may not throw and may be called by several threads at once.
 using DebugOutputHandler = void (*)(const wchar_t* text);
 
-/// Replaces the debugger output's handler and answers the one before; null means standard error.
+/// Replaces the debugger output's handler.
+/// @param handler the new handler; null is standard error
+/// @return the handler before, null for standard error. A call already under way on another thread may
+/// still reach it.
+/// Threads: thread-safe.
 BASALT_API DebugOutputHandler SetDebugOutputHandler(DebugOutputHandler handler);
 
 }  // namespace basalt::platform

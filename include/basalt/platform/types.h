@@ -1,16 +1,22 @@
 /// @file
-/// The platform's integer types, with their published sizes.
+/// The platform's integer types, with their published sizes on every system.
 #ifndef BASALT_PLATFORM_TYPES_H
 #define BASALT_PLATFORM_TYPES_H
 
 #include <cstdint>
 
+/// Truth value of a platform call: 0 is failure, anything else success.
 using BOOL = int;
 using BYTE = std::uint8_t;
 using WORD = std::uint16_t;
 using UINT = std::uint32_t;
 using DWORD = std::uint32_t;
 using LONG = std::int32_t;
+/// Result code: negative is failure.
+using HRESULT = std::int32_t;
+/// Reference to an object of the platform layer; null or all ones where a call says so.
 using HANDLE = void*;
+
+static_assert(sizeof(BOOL) == 4, "platform records hold their truth values in 32 bits");
 
 #endif

@@ -1,0 +1,46 @@
+// The frame's process-wide settings as stored, for the code that reads them without a query, and for tests.
+#ifndef BASALT_SRC_FRAME_ENVIRONMENT_STATE_H
+#define BASALT_SRC_FRAME_ENVIRONMENT_STATE_H
+
+#include <atomic>
+#include <cstdint>
+
+#include "basalt/frame.h"
+
+namespace basalt::frame {
+
+inline constexpr basalt_language DEFAULT_LANGUAGE = 15;
+
+// Marks the resolution factor as not determined; compared exactly.
+inline constexpr double RESOLUTION_NOT_DETERMINED = 2e-308;
+
+// A value that all threads may read and write, with no order among different values: two threads that make
+// a first query at once both store the same answer.
+template <class T>
+class Setting {
+public:
+    constexpr explicit Setting(T start) : m_value(start) {}
+    T load() const { return m_value.load(std::memory_order_relaxed); }
+    void store(T value) { m_value.store(value, std::memory_order_relaxed); }
+
+private:
+    std::atomic<T> m_value;
+};
+
+struct EnvironmentState {
+    Setting<basalt_os> os_code{0};               // 0: not determined
+    Setting<std::int32_t> os_version_number{0};  // no detection of this library sets it
+    Setting<basalt_hh> handheld_code{0};         // 0: not determined
+    Setting<bool> new_generation{false};         // no detection of this library sets it
+    Setting<bool> rtk_option{false};             // no detection of this library sets it
+    Setting<basalt_language> language{DEFAULT_LANGUAGE};
+    Setting<double> resolution_factor{RESOLUTION_NOT_DETERMINED};
+    Setting<std::uint32_t> last_random_seed{0};  // tick count last given to the random generator
+};
+
+// Constant-initialised: fresh at every load, and nothing to clean up at unload.
+extern EnvironmentState environment;
+
+}  // namespace basalt::frame
+
+#endif

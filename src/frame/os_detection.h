@@ -1,0 +1,19 @@
+// Detection of the operating-system release.
+#ifndef BASALT_SRC_FRAME_OS_DETECTION_H
+#define BASALT_SRC_FRAME_OS_DETECTION_H
+
+#include "basalt/frame.h"
+#include "src/platform/version_query.h"
+
+namespace basalt::frame {
+
+// The release code of a version record, 0 for a combination that is not in the table.
+basalt_os release_code(const OSVERSIONINFOW& version);
+
+// Asks the platform for its version and stores the release code. A failed query or an unlisted version
+// leaves the stored code as it was. The stored version number becomes 0 either way.
+void detect_operating_system();
+
+}  // namespace basalt::frame
+
+#endif

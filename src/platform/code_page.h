@@ -1,0 +1,60 @@
+// The active code page: the encoding of narrow text, taken from the environment's locale.
+//
+// It is the encoding named by LC_ALL, LC_CTYPE or LANG (the first that is not empty) when the process first
+// asks, and UTF-8 when none is set, when it is "C" or "POSIX" and when the named locale is not installed.
+// The locale the host may have set for its process or thread is neither read nor changed.
+#ifndef BASALT_SRC_PLATFORM_CODE_PAGE_H
+#define BASALT_SRC_PLATFORM_CODE_PAGE_H
+
+#include <locale.h>
+
+#include <string>
+#include <string_view>
+
+#include "src/platform/utf8.h"
+
+namespace basalt::platform {
+
+// One locale's encoding and character classes. Every operation is thread-safe and takes counted text, in
+// which a zero is a character like any other.
+class CodePage {
+public:
+    // By the name of an installed locale; any other name, or null, is UTF-8. "C" is the locale of that name.
+    explicit CodePage(const char* locale_name);
+    ~CodePage();
+    CodePage(const CodePage&) = delete;
+    CodePage& operator=(const CodePage&) = delete;
+
+    // REPLACEMENT_CHARACTER for each byte that belongs to no character, a character cut short at the end too.
+    std::wstring widen(std::string_view text) const;
+    // '?' for each character that the encoding lacks.
+    std::string narrow(std::wstring_view text) const;
+
+    wchar_t to_lower(wchar_t ch) const;
+    wchar_t to_upper(wchar_t ch) const;
+    bool is_space(wchar_t ch) const;
+
+private:
+    // Null only where not even the system's UTF-8 locale is installed: ASCII classes then.
+    locale_t m_locale;
+    bool m_is_utf8;
+};
+
+// The environment's, opened at the first use and closed at unload.
+const CodePage& active_code_page();
+
+inline std::wstring widen(std::string_view text) {
+    return active_code_page().widen(text);
+}
+inline std::string narrow(std::wstring_view text) {
+    return active_code_page().narrow(text);
+}
+
+// The two conversions by way of a locale's own routines, one character at a time: what CodePage does for
+// every encoding but UTF-8.
+std::wstring widen_by_locale(std::string_view text, locale_t locale);
+std::string narrow_by_locale(std::wstring_view text, locale_t locale);
+
+}  // namespace basalt::platform
+
+#endif

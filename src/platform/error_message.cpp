@@ -1,0 +1,114 @@
+#include "src/platform/error_message.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <iterator>
+#include <string_view>
+
+#include "basalt/platform/error.h"
+
+namespace {
+
+constexpr DWORD SUPPORTED_FLAGS =
+    FORMAT_MESSAGE_ALLOCATE_BUFFER | FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS;
+
+struct Message {
+    DWORD code;
+    std::wstring_view text;
+};
+
+// In ascending order of the codes.
+constexpr Message MESSAGES[] = {
+    {ERROR_SUCCESS, L"No error."},
+    {ERROR_INVALID_FUNCTION, L"The operation is not a valid one."},
+    {ERROR_FILE_NOT_FOUND, L"The file does not exist."},
+    {ERROR_PATH_NOT_FOUND, L"A folder of the path does not exist."},
+    {ERROR_TOO_MANY_OPEN_FILES, L"Too many files are open."},
+    {ERROR_ACCESS_DENIED, L"Access is not allowed."},
+    {ERROR_INVALID_HANDLE, L"The handle is not valid."},
+    {ERROR_NOT_ENOUGH_MEMORY, L"There is not enough memory."},
+    {ERROR_OUTOFMEMORY, L"Memory is exhausted."},
+    {ERROR_NOT_SAME_DEVICE, L"The two files are on different devices."},
+    {ERROR_NO_MORE_FILES, L"There are no further files."},
+    {ERROR_WRITE_PROTECT, L"The medium is read-only."},
+    {ERROR_GEN_FAILURE, L"The system reported a failure that has no code of its own."},
+    {ERROR_SHARING_VIOLATION, L"The file is in use and not shared."},
+    {ERROR_LOCK_VIOLATION, L"Part of the file is locked by somebody else."},
+    {ERROR_NOT_SUPPORTED, L"The operation is not supported."},
+    {ERROR_DEV_NOT_EXIST, L"The device does not exist."},
+    {ERROR_FILE_EXISTS, L"The file exists already."},
+    {ERROR_INVALID_PARAMETER, L"An argument is not valid."},
+    {ERROR_DISK_FULL, L"The disk is full."},
+    {ERROR_INSUFFICIENT_BUFFER, L"The buffer is too small."},
+    {ERROR_INVALID_NAME, L"The name is not valid."},
+    {ERROR_DIR_NOT_EMPTY, L"The folder is not empty."},
+    {ERROR_BUSY, L"The object is busy."},
+    {ERROR_ALREADY_EXISTS, L"An object of this name exists already."},
+    {ERROR_FILENAME_EXCED_RANGE, L"The name is too long."},
+    {ERROR_FILE_TOO_LARGE, L"The file is too large."},
+    {ERROR_DIRECTORY, L"The name is not that of a folder."},
+    {ERROR_INVALID_ADDRESS, L"The address is not valid."},
+    {ERROR_ARITHMETIC_OVERFLOW, L"A number does not fit in its type."},
+    {ERROR_OPERATION_ABORTED, L"The operation was interrupted."},
+    {ERROR_NOACCESS, L"The memory at the address cannot be accessed."},
+    {ERROR_FILE_INVALID, L"The file was changed from outside and is no longer valid."},
+    {ERROR_NO_UNICODE_TRANSLATION, L"A character has no counterpart in the encoding."},
+    {ERROR_IO_DEVICE, L"The device failed to read or write."},
+    {ERROR_NO_SYSTEM_RESOURCES, L"The system is short of resources."},
+    {ERROR_COMMITMENT_LIMIT, L"The system cannot provide more memory."},
+    {ERROR_TIMEOUT, L"The operation took too long."},
+    {ERROR_CANT_RESOLVE_FILENAME, L"The name cannot be followed to a file."},
+};
+static_assert(std::is_sorted(std::begin(MESSAGES), std::end(MESSAGES),
+                             [](const Message& a, const Message& b) { return a.code < b.code; }));
+
+constexpr std::wstring_view UNKNOWN_ERROR = L"Unknown error ";
+
+constexpr std::size_t MAX_DIGITS = 10;
+
+// Writes the code in decimal and answers the end. Not std::to_chars, whose table would be exported.
+wchar_t* write_decimal(DWORD code, wchar_t* text) {
+    wchar_t digits[MAX_DIGITS];
+    wchar_t* const end = std::end(digits);
+    wchar_t* first = end;
+    do {
+        *--first = static_cast<wchar_t>(L'0' + code % 10);
+        code /= 10;
+    } while (code != 0);
+    return std::copy(first, end, text);
+}
+
+}  // namespace
+
+DWORD FormatMessageW(DWORD flags, const void* /*source*/, DWORD code, DWORD language, wchar_t** buffer,
+                     DWORD size, void* /*arguments*/) {
+    if (buffer != nullptr) {
+        *buffer = nullptr;
+    }
+    if (flags != SUPPORTED_FLAGS || language != 0 || buffer == nullptr) {
+        SetLastError(ERROR_INVALID_PARAMETER);
+        return 0;
+    }
+    const auto* known = std::lower_bound(std::begin(MESSAGES), std::end(MESSAGES), code,
+                                         [](const Message& m, DWORD wanted) { return m.code < wanted; });
+    const bool is_known = known != std::end(MESSAGES) && known->code == code;
+    const std::wstring_view text = is_known ? known->text : UNKNOWN_ERROR;
+    const std::size_t room = std::max<std::size_t>(size, text.size() + MAX_DIGITS + 1);
+    auto* const message = static_cast<wchar_t*>(std::malloc(room * sizeof(wchar_t)));
+    if (message == nullptr) {
+        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
+        return 0;
+    }
+    wchar_t* end = std::copy(text.begin(), text.end(), message);
+    if (!is_known) {
+        end = write_decimal(code, end);
+    }
+    *end = L'\0';
+    *buffer = message;
+    return static_cast<DWORD>(end - message);
+}
+
+void* LocalFree(void* block) {
+    std::free(block);
+    return nullptr;
+}

@@ -1,0 +1,34 @@
+// UTF-8 and wide text, whatever the locale: file names and debugger output.
+#ifndef BASALT_SRC_PLATFORM_UTF8_H
+#define BASALT_SRC_PLATFORM_UTF8_H
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+namespace basalt::platform {
+
+// What stands for a byte that is not part of a character.
+inline constexpr wchar_t REPLACEMENT_CHARACTER = L'\xFFFD';
+
+inline constexpr std::size_t MAX_UTF8_BYTES = 4;
+
+// Whether the value is a character: neither a surrogate nor beyond 0x10FFFF.
+constexpr bool is_unicode_scalar(wchar_t ch) {
+    const auto value = static_cast<char32_t>(ch);
+    return value < 0xD800 || (value >= 0xE000 && value <= 0x10FFFF);
+}
+
+// Writes one character's bytes ('?' when it is none) and answers their count, 1 to 4.
+std::size_t encode_utf8(wchar_t ch, char* bytes);
+
+// Every character in its bytes, zeros included; '?' for a value that is no character.
+std::string utf8_from_wide(std::wstring_view text);
+
+// Every byte sequence in its character, zeros included; REPLACEMENT_CHARACTER for each byte that belongs to
+// none (overlong forms, surrogates, values beyond 0x10FFFF and a character cut short at the end as well).
+std::wstring wide_from_utf8(std::string_view text);
+
+}  // namespace basalt::platform
+
+#endif

@@ -1,0 +1,159 @@
+#include "src/platform/code_page.h"
+
+#include <gtest/gtest.h>
+
+#include <clocale>
+#include <cstdlib>
+#include <filesystem>
+#include <memory>
+#include <random>
+
+namespace {
+
+using namespace basalt::platform;
+using namespace std::string_literals;
+
+struct Pair {
+    std::string narrow;
+    std::wstring wide;
+};
+
+TEST(Utf8, characters_of_every_length) {
+    for (const auto& [narrow, wide] : {
+             Pair{"", L""},
+             Pair{"plain ASCII, longer than eight", L"plain ASCII, longer than eight"},
+             Pair{"a\0b"s, L"a\0b"s},
+             Pair{"\x7F\xC2\x80\xDF\xBF", L"\x7F\x80\x7FF"s},
+             Pair{"\xE0\xA0\x80\xED\x9F\xBF\xEE\x80\x80\xEF\xBF\xBF", L"\x800\xD7FF\xE000\xFFFF"s},
+             Pair{"\xF0\x90\x80\x80\xF4\x8F\xBF\xBF", L"\x10000\x10FFFF"s},
+         }) {
+        EXPECT_EQ(wide_from_utf8(narrow), wide);
+        EXPECT_EQ(utf8_from_wide(wide), narrow);
+    }
+}
+
+TEST(Utf8, each_byte_of_no_character_is_replaced) {
+    for (const auto& [narrow, wide] : {
+             Pair{"\x80", L"\xFFFD"},
+             Pair{"a\xE9z", L"a\xFFFDz"},                // a lone lead byte before ordinary text
+             Pair{"\xE2\x82", L"\xFFFD\xFFFD"},          // split at the end
+             Pair{"\xE2\x82\x41", L"\xFFFD\xFFFD\x41"},  // split before ordinary text
+             Pair{"\xF0\x9F\x98\xE2\x82\xAC", L"\xFFFD\xFFFD\xFFFD\x20AC"},
+             Pair{"\xC0\x80", L"\xFFFD\xFFFD"},                      // overlong
+             Pair{"\xE0\x9F\xBF", L"\xFFFD\xFFFD\xFFFD"},            // overlong
+             Pair{"\xF0\x8F\xBF\xBF", L"\xFFFD\xFFFD\xFFFD\xFFFD"},  // overlong
+             Pair{"\xED\xA0\x80", L"\xFFFD\xFFFD\xFFFD"},            // surrogate
+             Pair{"\xF4\x90\x80\x80", L"\xFFFD\xFFFD\xFFFD\xFFFD"},  // beyond 0x10FFFF
+             Pair{"\xFF\xFE\xF8", L"\xFFFD\xFFFD\xFFFD"},
+         }) {
+        EXPECT_EQ(wide_from_utf8(narrow), wide);
+    }
+    EXPECT_EQ(utf8_from_wide(L"\xD800|\xDFFF|\x110000|"s + static_cast<wchar_t>(-1)), "?|?|?|?");
+}
+
+// The coder against the system's own, on bytes that are likely to form and to break characters.
+TEST(Utf8, agrees_with_the_systems_conversion) {
+    const std::unique_ptr<std::remove_pointer_t<locale_t>, decltype(&freelocale)> locale(
+        newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr), freelocale);
+    if (locale == nullptr) {
+        GTEST_SKIP() << "the system's UTF-8 locale is not installed";
+    }
+    const unsigned seed = std::random_device{}();
+    SCOPED_TRACE(seed);
+    std::mt19937 random(seed);
+    constexpr std::string_view BYTES =
+        "A\x80\x8F\x90\x9F\xA0\xBF\xC1\xC2\xDF\xE0\xE2\xED\xEF\xF0\xF3\xF4\xF5";
+    for (int round = 0; round < 20'000; ++round) {
+        std::string narrow;
+        std::wstring wide;
+        for (auto left = random() % 24; left > 0; --left) {
+            narrow += BYTES[random() % BYTES.size()];
+            wide += static_cast<wchar_t>(random() >> (random() % 32));
+        }
+        ASSERT_EQ(wide_from_utf8(narrow), widen_by_locale(narrow, locale.get()));
+        ASSERT_EQ(utf8_from_wide(wide), narrow_by_locale(wide, locale.get()));
+    }
+}
+
+TEST(CodePage, plain_c_locale_knows_ascii_alone) {
+    const CodePage ascii("C");
+    EXPECT_EQ(ascii.widen("a\0\xC3\xA9z"s), L"a\0\xFFFD\xFFFDz"s);
+    EXPECT_EQ(ascii.narrow(L"a\0é\x416z"s), "a\0??z"s);
+    EXPECT_EQ(ascii.to_upper(L'z'), L'Z');
+    EXPECT_EQ(ascii.to_upper(L'é'), L'é');
+}
+
+TEST(CodePage, missing_locale_is_utf8) {
+    for (const char* const name : {static_cast<const char*>(nullptr), "no_SUCH.locale"}) {
+        const CodePage utf8(name);
+        EXPECT_EQ(utf8.widen("\xE2\x82\xAC"), L"\x20AC");
+        EXPECT_EQ(utf8.narrow(L"\x20AC"), "\xE2\x82\xAC");
+        EXPECT_EQ(utf8.to_lower(L'Ž'), L'ž');
+        EXPECT_EQ(utf8.to_upper(L'ж'), L'Ж');
+        EXPECT_TRUE(utf8.is_space(L'\x2003'));
+    }
+}
+
+// Encodings other than UTF-8, from locales made here where the system has the parts.
+TEST(CodePage, single_and_double_byte_encodings) {
+    const std::filesystem::path folder =
+        std::filesystem::temp_directory_path() / ("basalt_locales_" + std::to_string(std::random_device{}()));
+    std::filesystem::create_directory(folder);
+    const auto make = [&](const char* charmap) {
+        const std::string command = "localedef -c -i POSIX -f " + std::string(charmap) + " '" +
+                                    (folder / charmap).string() + "' >/dev/null 2>&1";
+        return std::system(command.c_str()) != -1 && std::filesystem::exists(folder / charmap / "LC_CTYPE");
+    };
+    const bool made = make("ISO-8859-15") && make("EUC-JP");
+    // In a process of its own, since the C library keeps some memory for each locale opened by LOCPATH.
+    const auto convert = [&] {
+        setenv("LOCPATH", folder.c_str(), 1);
+        const CodePage latin("ISO-8859-15");
+        EXPECT_EQ(latin.widen("\xA4 \xE9"), L"\x20AC \xE9");
+        EXPECT_EQ(latin.narrow(L"\x20AC \xE9 \x416"), "\xA4 \xE9 ?");
+        const CodePage japanese("EUC-JP");
+        EXPECT_EQ(japanese.widen("a\xC6\xFC\xB1"), L"a\x65E5\xFFFD") << "the last character is split";
+        EXPECT_EQ(japanese.narrow(L"a\x65E5\xD800z"), "a\xC6\xFC?z");
+        std::_Exit(testing::Test::HasFailure() ? 1 : 0);
+    };
+    if (made) {
+        GTEST_FLAG_SET(death_test_style, "fast");
+        EXPECT_EXIT(convert(), testing::ExitedWithCode(0), "");
+    }
+    std::filesystem::remove_all(folder);
+    if (!made) {
+        GTEST_SKIP() << "localedef cannot make the locales";
+    }
+}
+
+TEST(CodePage, locale_of_the_process_and_thread_stays) {
+    const std::string process_before = std::setlocale(LC_ALL, nullptr);
+    const locale_t thread_before = uselocale(nullptr);
+    CodePage("C").widen("\xFF");
+    CodePage("C").narrow(L"\x20AC");
+    widen("\xE2\x82\xAC");
+    EXPECT_EQ(std::setlocale(LC_ALL, nullptr), process_before);
+    EXPECT_EQ(uselocale(nullptr), thread_before);
+}
+
+// The environment is read once a process, so each case asks in a process of its own.
+TEST(CodePage, environment_names_the_encoding) {
+    struct Row {
+        const char *all, *ctype, *lang;
+        bool is_utf8;
+    };
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    const auto check = [](const Row& row) {
+        setenv("LC_ALL", row.all, 1);
+        setenv("LC_CTYPE", row.ctype, 1);
+        setenv("LANG", row.lang, 1);
+        std::exit(narrow(L"\x20AC") == (row.is_utf8 ? "\xE2\x82\xAC" : "?") ? 0 : 1);
+    };
+    for (const Row& row : {Row{"", "", "", true}, Row{"C", "", "", true}, Row{"POSIX", "", "", true},
+                           Row{"", "C.UTF-8", "C", true}, Row{"", "", "no_SUCH.locale", true}}) {
+        EXPECT_EXIT(check(row), testing::ExitedWithCode(0), "")
+            << row.all << '|' << row.ctype << '|' << row.lang;
+    }
+}
+
+}  // namespace

@@ -50,6 +50,10 @@ step_fuzz() {
     done
 }
 
+if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit holds
+    "step_$2"
+    exit
+fi
 steps=("$@")
 if [ ${#steps[@]} -eq 0 ]; then
     steps=(format includes clang headers tidy elsewhere package symbols docs asan tsan fuzz)
@@ -60,8 +64,8 @@ for step in "${steps[@]}"; do
     declare -F "step_$step" >/dev/null || { echo "check.sh: no such step: $step" >&2; exit 2; }
     echo "== $step"
     started=$SECONDS
-    # a function called in a condition would run without errexit, so each step is a shell of its own
-    (set -euo pipefail; "step_$step") >"build/check-$step.log" 2>&1 && failed= || failed=yes
+    failed=
+    bash scripts/check.sh --step "$step" >"build/check-$step.log" 2>&1 || failed=yes
     tail -n 12 "build/check-$step.log"
     if [ -n "$failed" ]; then
         grep -nE 'error|FAILED|warning' "build/check-$step.log" | head -n 40 || true

@@ -1,0 +1,215 @@
+#include "src/sparse/rtree.h"
+
+#include <bit>
+#include <limits>
+#include <utility>
+
+#include "src/sparse/rtree_split.h"
+#include "src/sparse/rtree_volume.h"
+
+namespace vex_util {
+
+using namespace rtree;
+
+namespace {
+
+constexpr float INFINITE = std::numeric_limits<float>::infinity();
+
+unsigned valid_bits(const Node& node) {
+    return (1u << node.count) - 1;
+}
+
+// The entry that grows least to take in the rectangle; of equals the one of smaller volume, then the earlier.
+int choose_subtree(const Node& node, const Rect4& rect) {
+    Float4 volume[2], increase[2];
+    for (int half = 0; half < 2; ++half) {
+        const Rect4 entry = load_rects(node, 4 * half);
+        volume[half] = spherical_volume(entry);
+        increase[half] = spherical_volume(combine(rect, entry)) - volume[half];
+        const Int4 index = Int4{0, 1, 2, 3} + 4 * half;
+        increase[half] = index < node.count ? increase[half] : all4(INFINITE);
+    }
+    const Float4 least = least4(min4(increase[0], increase[1]));
+    const Int4 tied[2] = {increase[0] == least, increase[1] == least};
+    for (int half = 0; half < 2; ++half)
+        volume[half] = tied[half] ? volume[half] : all4(INFINITE);
+    const Float4 smallest = least4(min4(volume[0], volume[1]));
+    return std::countr_zero(bits4(volume[0] == smallest) | bits4(volume[1] == smallest) << 4);
+}
+
+// The query in lanes, against a node's entries.
+struct Query {
+    Int4 minX, minY, maxX, maxY;
+
+    unsigned meets(const Node& node) const { return bits4(meeting(node, 0)) | bits4(meeting(node, 4)) << 4; }
+
+    // Complement of the entries whose corners both lie within the query's.
+    unsigned sticks_out(const Node& node) const {
+        return bits4(outside(node, 0)) | bits4(outside(node, 4)) << 4;
+    }
+
+private:
+    Int4 meeting(const Node& node, int i) const {
+        return ~((load4(node.minX + i) > maxX) | (minX > load4(node.maxX + i)) |
+                 (load4(node.minY + i) > maxY) | (minY > load4(node.maxY + i)));
+    }
+
+    Int4 outside(const Node& node, int i) const {
+        return (load4(node.minX + i) < minX) | (load4(node.maxX + i) > maxX) | (load4(node.minY + i) < minY) |
+               (load4(node.maxY + i) > maxY);
+    }
+};
+
+// Gathers identifiers and hands them on in large pieces: a vector's own growth is paid once per piece.
+class ResultWriter {
+public:
+    explicit ResultWriter(std::vector<int>& results) : m_results(results) {}
+
+    void add(const Node& leaf, unsigned entries) {
+        make_room();
+        for (; entries; entries &= entries - 1)
+            m_buffer[m_count++] = static_cast<int>(leaf.slot[std::countr_zero(entries)]);
+    }
+
+    void add_all(const Node& leaf) {
+        make_room();
+        std::memcpy(m_buffer + m_count, leaf.slot, sizeof leaf.slot);
+        m_count += leaf.count;
+    }
+
+    void flush() {
+        m_results.insert(m_results.end(), m_buffer, m_buffer + m_count);
+        m_count = 0;
+    }
+
+private:
+    static constexpr int SIZE = 512;
+
+    void make_room() {
+        if (m_count > SIZE - MAX_ENTRIES)
+            flush();
+    }
+
+    std::vector<int>& m_results;
+    int m_count = 0;
+    int m_buffer[SIZE];
+};
+
+}  // namespace
+
+slRTree::slRTree() {
+    m_nodes.reserve(1);
+    plant();
+}
+
+slRTree::~slRTree() = default;
+
+void slRTree::plant() noexcept {
+    m_root = m_nodes.take();
+    m_nodes[m_root].clear(0);
+    m_level = 0;
+    m_inverted = false;
+}
+
+// A split of every node on the path, and a new root.
+void slRTree::Reserve() {
+    m_nodes.reserve(static_cast<std::size_t>(m_level) + 2);
+}
+
+void slRTree::Insert(const int min[2], const int max[2], const int& identifier) {
+    Reserve();
+    Entry entry{{min[0], min[1], max[0], max[1]}, static_cast<std::uint32_t>(identifier)};
+    m_inverted |= min[0] > max[0] || min[1] > max[1];
+    const Rect4 rect = all4(entry.rect);
+
+    struct Step {
+        Node* node;
+        int child;
+    };
+    Step path[MAX_LEVEL];
+    int depth = 0;
+    Node* node = &m_nodes[m_root];
+    while (node->level > 0) {
+        const int i = choose_subtree(*node, rect);
+        Node* child = &m_nodes[node->slot[i]];
+        child->prefetch();
+        // Enlarged on the way down; a split below sets the true cover on the way up.
+        node->set_rect(i, combine(entry.rect, node->rect(i)));
+        path[depth++] = {node, i};
+        node = child;
+    }
+
+    while (node->count == MAX_ENTRIES) {
+        const NodeRef siblingRef = m_nodes.take();
+        Node& sibling = m_nodes[siblingRef];
+        split(*node, entry, sibling);
+        entry = {sibling.cover(), siblingRef};
+        if (depth == 0) {
+            const NodeRef newRoot = m_nodes.take();
+            Node& root = m_nodes[newRoot];
+            root.clear(++m_level);
+            root.append({node->cover(), m_root});
+            m_root = newRoot;
+            node = &root;
+            break;
+        }
+        const Step& parent = path[--depth];
+        parent.node->set_rect(parent.child, node->cover());
+        node = parent.node;
+    }
+    node->append(entry);
+}
+
+int slRTree::Search(const int min[2], const int max[2], std::vector<int>& results) const {
+    results.clear();
+    const Query query{all4(min[0]), all4(min[1]), all4(max[0]), all4(max[1])};
+    ResultWriter writer(results);
+
+    // What lies within the query is not tested again. Corners within say nothing about a rectangle that has a
+    // min above its max, so a tree that holds one is tested to the leaves.
+    struct Visit {
+        const Node* node;
+        bool within;
+    };
+    Visit stack[MAX_LEVEL * (MAX_ENTRIES - 1) + 1];
+    int top = 0;
+    stack[top++] = {&m_nodes[m_root], false};
+    while (top > 0) {
+        const auto [node, within] = stack[--top];
+        unsigned chosen = valid_bits(*node);
+        if (!within)
+            chosen &= query.meets(*node);
+        if (node->level == 0) {
+            if (chosen == valid_bits(*node))
+                writer.add_all(*node);
+            else
+                writer.add(*node, chosen);
+            continue;
+        }
+        const unsigned partly = within ? 0 : m_inverted ? ~0u : query.sticks_out(*node);
+        // The last goes on first, so that they come off in index order.
+        while (chosen) {
+            const int i = 31 - std::countl_zero(chosen);
+            chosen ^= 1u << i;
+            const Node* child = &m_nodes[node->slot[i]];
+            child->prefetch();
+            stack[top++] = {child, (partly >> i & 1) == 0};
+        }
+    }
+    writer.flush();
+    return static_cast<int>(results.size());
+}
+
+void slRTree::RemoveAll() noexcept {
+    m_nodes.reset();
+    plant();
+}
+
+void slRTree::swap(slRTree& other) noexcept {
+    m_nodes.swap(other.m_nodes);
+    std::swap(m_root, other.m_root);
+    std::swap(m_level, other.m_level);
+    std::swap(m_inverted, other.m_inverted);
+}
+
+}  // namespace vex_util

@@ -1,0 +1,86 @@
+// Rectangles and nodes of the R-tree.
+#ifndef BASALT_SRC_SPARSE_RTREE_NODE_H
+#define BASALT_SRC_SPARSE_RTREE_NODE_H
+
+#include <algorithm>
+#include <cstdint>
+
+namespace vex_util::rtree {
+
+inline constexpr int MAX_ENTRIES = 8;
+inline constexpr int MIN_ENTRIES = 4;
+
+// Every node below the root holds MIN_ENTRIES or more, so that 32-bit references end before this level does.
+inline constexpr int MAX_LEVEL = 17;
+
+// Both corners are inclusive; a min above a max is kept as given.
+struct Rect {
+    int minX, minY, maxX, maxY;
+
+    bool operator==(const Rect&) const = default;
+};
+
+inline Rect combine(const Rect& a, const Rect& b) {
+    return {std::min(a.minX, b.minX), std::min(a.minY, b.minY), std::max(a.maxX, b.maxX),
+            std::max(a.maxY, b.maxY)};
+}
+
+// A node's place in the pool: it survives copying the whole pool, which an address does not.
+using NodeRef = std::uint32_t;
+
+// A rectangle with an identifier (in a leaf) or the child it covers (above).
+struct Entry {
+    Rect rect;
+    std::uint32_t slot;
+};
+
+// Laid out by coordinate, so that one comparison of lanes tests four entries; three cache lines.
+struct alignas(64) Node {
+    int minX[MAX_ENTRIES], minY[MAX_ENTRIES], maxX[MAX_ENTRIES], maxY[MAX_ENTRIES];
+    std::uint32_t slot[MAX_ENTRIES];
+    int count;
+    int level;
+
+    void clear(int newLevel) {
+        count = 0;
+        level = newLevel;
+    }
+
+    Rect rect(int i) const { return {minX[i], minY[i], maxX[i], maxY[i]}; }
+
+    void set_rect(int i, const Rect& r) {
+        minX[i] = r.minX;
+        minY[i] = r.minY;
+        maxX[i] = r.maxX;
+        maxY[i] = r.maxY;
+    }
+
+    // Asks for room: count below MAX_ENTRIES.
+    void append(const Entry& entry) {
+        set_rect(count, entry.rect);
+        slot[count] = entry.slot;
+        ++count;
+    }
+
+    Rect cover() const {
+        if (count == 0)
+            return {0, 0, 0, 0};
+        Rect r = rect(0);
+        for (int i = 1; i < count; ++i)
+            r = combine(r, rect(i));
+        return r;
+    }
+
+    // All three lines at once: a walk that waits for one would otherwise wait for each.
+    void prefetch() const {
+        __builtin_prefetch(minX);
+        __builtin_prefetch(maxX);
+        __builtin_prefetch(slot);
+    }
+};
+
+static_assert(sizeof(Node) == 192);
+
+}  // namespace vex_util::rtree
+
+#endif

@@ -17,12 +17,14 @@ constexpr std::size_t SINGLE_FROM = std::size_t{1} << 20;
 // Heaps with a maximum up to this have one region, of that very size: nothing is lost between regions.
 constexpr std::size_t ONE_REGION_UP_TO = std::size_t{64} << 20;
 
+constexpr std::size_t SMALLEST_PAGE = 4096;  // of any system; asking for the true one costs a call
+
 constexpr std::size_t ATTEMPTS_BEFORE_GROWTH = 8;
 constexpr std::size_t ALL = ~std::size_t{0};
 
 // Blocks that may join up in one region must have a list.
 static_assert(ONE_REGION_UP_TO < FreeLists::SIZE_LIMIT);
-static_assert(sizeof(PrivateHeap) <= 4096, "an unused heap is to cost one page");
+static_assert(sizeof(PrivateHeap) <= SMALLEST_PAGE, "an unused heap is to cost one page");
 
 std::size_t record_bytes() {
     const std::size_t page = page_size();
@@ -49,7 +51,7 @@ PrivateHeap* PrivateHeap::create(std::size_t maximum) {
 }
 
 PrivateHeap* PrivateHeap::from_handle(void* handle) {
-    if (handle == nullptr || (reinterpret_cast<std::uintptr_t>(handle) & (page_size() - 1)) != 0) {
+    if (handle == nullptr || (reinterpret_cast<std::uintptr_t>(handle) & (SMALLEST_PAGE - 1)) != 0) {
         return nullptr;
     }
     auto* heap = static_cast<PrivateHeap*>(handle);
@@ -227,7 +229,7 @@ void PrivateHeap::put_back(Block* block, const Region& region) {
     const std::uint64_t head = head_of(block);
     std::size_t size = size_of(head);
     std::uint64_t last = head & LAST_OF_REGION;
-    forbid_access(payload_of(block), size - HEAD_BYTES);
+    forbid_access(block, size);  // the head too: the end cut off a block had none
     set_head(block, size);  // whatever becomes of it, it is no live block any more
     if (last == 0) {
         Block* after = successor(block, size);

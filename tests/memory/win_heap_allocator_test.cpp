@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <cstring>
 #include <string>
 #include <type_traits>
@@ -223,9 +224,6 @@ TEST(HeapAllocator, IsMallocAndReportsNothing) {
     std::free(block);
     base.Free(std::malloc(10));
     base.Free(nullptr);
-#ifndef BASALT_ADDRESS_SANITIZER
-    EXPECT_EQ(base.Alloc(BEYOND), nullptr);
-#endif
     EXPECT_EQ(output.take(), Pieces{});
 }
 

@@ -13,6 +13,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/heap_inspection.h"
+#include "src/platform/heap_sanitizer.h"
 #include "tests/support/system_failures.h"
 
 namespace {
@@ -58,6 +59,9 @@ public:
         m_blocks.emplace(begin, std::pair(size, fill));
     }
     static void expect_fill(const unsigned char* block, std::size_t size, unsigned char fill) {
+        if (size == 0) {
+            return;
+        }
         const std::vector<unsigned char> expected(size, fill);
         ASSERT_EQ(std::memcmp(block, expected.data(), size), 0);
     }
@@ -196,7 +200,7 @@ bool exercise(bool& sound_throughout) {
                 } else {
                     refused = true;
                 }
-                const std::vector<unsigned char> expected(size, 0x5A);
+                const std::vector<unsigned char> expected(size + 1, 0x5A);
                 sound_throughout &= std::memcmp(blocks.back(), expected.data(), size) == 0;
             }
             sound_throughout &= inspect_heap(heap.handle).live_blocks == blocks.size();
@@ -369,5 +373,32 @@ TEST(Heap, GrowsInPlaceIntoAFreeNeighbour) {
     EXPECT_LT(static_cast<char*>(next), static_cast<char*>(block) + 100) << "the cut end is free again";
     EXPECT_NE(heap.resize(block, 1000), block);
 }
+
+#ifdef BASALT_ADDRESS_SANITIZER
+TEST(Heap, TheSanitizerWatchesOverrunsAndUsesAfterFree) {
+    const Heap heap(0);
+    for (const std::size_t size : {std::size_t{0}, std::size_t{13}, std::size_t{2048}, 2 * MIB}) {
+        SCOPED_TRACE(size);
+        auto* block = static_cast<char*>(heap.take(size));
+        EXPECT_EQ(__asan_region_is_poisoned(block, size), nullptr);
+        for (const char* outside : {block - 8, block - 1, block + size, block + size + 15}) {
+            EXPECT_TRUE(__asan_address_is_poisoned(outside));
+        }
+        block = static_cast<char*>(heap.resize(block, size + 100));
+        EXPECT_EQ(__asan_region_is_poisoned(block, size + 100), nullptr);
+        EXPECT_TRUE(__asan_address_is_poisoned(block + size + 100));
+        block = static_cast<char*>(heap.resize(block, 7));
+        EXPECT_TRUE(__asan_address_is_poisoned(block + 7));
+        heap.free(block);
+        EXPECT_TRUE(size >= MIB || __asan_address_is_poisoned(block));
+    }
+}
+
+// The leak check at the program's end fails when this block counts as lost.
+TEST(Heap, WhatItsBlocksPointToIsNoLeak) {
+    static const HANDLE kept = HeapCreate(0, 0, 0);
+    *static_cast<char**>(HeapAlloc(kept, 0, 8)) = new char[777];
+}
+#endif
 
 }  // namespace

@@ -1,9 +1,99 @@
 #include "src/platform/heap.h"
 
-#include <cstdlib>
-HANDLE HeapCreate(DWORD, std::size_t, std::size_t) { return std::malloc(1); }
-BOOL HeapDestroy(HANDLE heap) { std::free(heap); return 1; }
-void* HeapAlloc(HANDLE, DWORD, std::size_t size) { return std::malloc(size); }
-void* HeapReAlloc(HANDLE, DWORD, void* block, std::size_t size) { return std::realloc(block, size); }
-BOOL HeapFree(HANDLE, DWORD, void* block) { std::free(block); return 1; }
-std::size_t HeapCompact(HANDLE, DWORD) { return 0; }
+#include "src/platform/pages.h"
+#include "src/platform/private_heap.h"
+
+using basalt::platform::page_size;
+using basalt::platform::PrivateHeap;
+
+namespace {
+
+// The heap of a valid call; otherwise null with the last error set.
+PrivateHeap* checked(HANDLE handle, DWORD flags) {
+    PrivateHeap* heap = PrivateHeap::from_handle(handle);
+    if (heap == nullptr) {
+        SetLastError(ERROR_INVALID_HANDLE);
+        return nullptr;
+    }
+    if (flags != 0) {
+        SetLastError(ERROR_INVALID_PARAMETER);
+        return nullptr;
+    }
+    return heap;
+}
+
+}  // namespace
+
+HANDLE HeapCreate(DWORD options, std::size_t initialSize, std::size_t maximumSize) {
+    if (options != 0 || (maximumSize != 0 && initialSize > maximumSize)) {
+        SetLastError(ERROR_INVALID_PARAMETER);
+        return nullptr;
+    }
+    const std::size_t page = page_size();
+    // Within a page of 2^64 this comes to 0: no limit, as good as that one.
+    const std::size_t rounded = (maximumSize / page + (maximumSize % page != 0)) * page;
+    PrivateHeap* heap = PrivateHeap::create(rounded);
+    if (heap == nullptr) {
+        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
+    }
+    return heap;
+}
+
+BOOL HeapDestroy(HANDLE heap) {
+    PrivateHeap* valid = checked(heap, 0);
+    if (valid == nullptr) {
+        return 0;
+    }
+    valid->destroy();
+    return 1;
+}
+
+void* HeapAlloc(HANDLE heap, DWORD flags, std::size_t size) {
+    PrivateHeap* valid = checked(heap, flags);
+    if (valid == nullptr) {
+        return nullptr;
+    }
+    void* block = valid->allocate(size);
+    if (block == nullptr) {
+        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
+    }
+    return block;
+}
+
+void* HeapReAlloc(HANDLE heap, DWORD flags, void* block, std::size_t size) {
+    PrivateHeap* valid = checked(heap, flags);
+    if (valid == nullptr) {
+        return nullptr;
+    }
+    DWORD error = ERROR_SUCCESS;
+    void* resized = valid->resize(block, size, error);
+    if (resized == nullptr) {
+        SetLastError(error);
+    }
+    return resized;
+}
+
+BOOL HeapFree(HANDLE heap, DWORD flags, void* block) {
+    PrivateHeap* valid = checked(heap, flags);
+    if (valid == nullptr) {
+        return 0;
+    }
+    const DWORD error = valid->release(block);
+    if (error != ERROR_SUCCESS) {
+        SetLastError(error);
+        return 0;
+    }
+    return 1;
+}
+
+std::size_t HeapCompact(HANDLE heap, DWORD flags) {
+    PrivateHeap* valid = checked(heap, flags);
+    if (valid == nullptr) {
+        return 0;
+    }
+    const std::size_t largest = valid->compact();
+    if (largest == 0) {
+        SetLastError(ERROR_SUCCESS);
+    }
+    return largest;
+}

@@ -1,0 +1,55 @@
+// The table of a heap's regions, ordered by address: which region holds a pointer, if any.
+#ifndef BASALT_SRC_PLATFORM_HEAP_REGIONS_H
+#define BASALT_SRC_PLATFORM_HEAP_REGIONS_H
+
+#include <array>
+#include <cstddef>
+#include <span>
+
+namespace basalt::platform {
+
+struct Region {
+    std::byte* begin;
+    std::size_t size;  // bytes
+    bool single;       // holds one large block and nothing else
+};
+
+class RegionTable {
+public:
+    RegionTable() = default;
+    RegionTable(const RegionTable&) = delete;
+    RegionTable& operator=(const RegionTable&) = delete;
+    ~RegionTable();
+
+    std::span<const Region> all() const { return {m_regions, m_count}; }
+
+    // The region a pointer lies in, or null. Neighbouring calls mostly ask for the same region.
+    const Region* find(const void* pointer) const {
+        const auto* address = static_cast<const std::byte*>(pointer);
+        const Region& recent = m_regions[m_recent];
+        if (m_recent < m_count && address >= recent.begin && address < recent.begin + recent.size) {
+            return &recent;
+        }
+        return search(address);
+    }
+
+    // Makes sure the next insert() finds room; false when the system has no memory.
+    bool reserve_one();
+    void insert(const Region& region);
+    void erase(const std::byte* begin);
+
+private:
+    const Region* search(const std::byte* address) const;
+
+    static constexpr std::size_t INLINE_REGIONS = 40;  // heaps up to about 1 GiB need no table of their own
+
+    std::array<Region, INLINE_REGIONS> m_inline{};
+    Region* m_regions = m_inline.data();
+    std::size_t m_count = 0;
+    std::size_t m_capacity = INLINE_REGIONS;
+    mutable std::size_t m_recent = 0;
+};
+
+}  // namespace basalt::platform
+
+#endif

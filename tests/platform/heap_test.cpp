@@ -1,0 +1,404 @@
+#include "src/platform/heap.h"
+
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cstdint>
+#include <cstring>
+#include <map>
+#include <random>
+#include <thread>
+#include <utility>
+#include <vector>
+
+#include "basalt/platform/error.h"
+#include "src/platform/heap_inspection.h"
+#include "src/platform/heap_sanitizer.h"
+#include "tests/support/system_failures.h"
+
+namespace {
+
+using basalt::platform::HeapReport;
+using basalt::platform::inspect_heap;
+using basalt::test::mapped_balance;
+using basalt::test::SystemFailure;
+
+constexpr std::size_t KIB = 1024;
+constexpr std::size_t MIB = 1024 * KIB;
+constexpr std::size_t MIXED_SIZES[] = {0, 1, 24, 25, 100, 2048, 4 * KIB, 60 * KIB, 300 * KIB, MIB, 3 * MIB};
+
+struct Heap {
+    explicit Heap(std::size_t maximum) : handle(HeapCreate(0, 0, maximum)) {}
+    ~Heap() { HeapDestroy(handle); }
+    Heap(const Heap&) = delete;
+    Heap& operator=(const Heap&) = delete;
+    void* take(std::size_t size) const { return HeapAlloc(handle, 0, size); }
+    void* resize(void* block, std::size_t size) const { return HeapReAlloc(handle, 0, block, size); }
+    BOOL free(void* block) const { return HeapFree(handle, 0, block); }
+    HANDLE handle;
+};
+
+HeapReport sound(HANDLE heap) {
+    const HeapReport report = inspect_heap(heap);
+    EXPECT_STREQ(report.fault, nullptr);
+    return report;
+}
+
+// The model: every live block, its size, and the byte it is filled with.
+class Model {
+public:
+    void add(void* block, std::size_t size) {
+        ASSERT_EQ(reinterpret_cast<std::uintptr_t>(block) % 16, 0U);
+        auto* begin = static_cast<unsigned char*>(block);
+        const auto after = m_blocks.lower_bound(begin);
+        ASSERT_TRUE(after == m_blocks.end() || begin + size <= after->first);
+        ASSERT_TRUE(after == m_blocks.begin() ||
+                    std::prev(after)->first + std::prev(after)->second.first <= begin);
+        const auto fill = static_cast<unsigned char>(++m_fill);
+        std::memset(begin, fill, size);
+        m_blocks.emplace(begin, std::pair(size, fill));
+    }
+    static void expect_fill(const unsigned char* block, std::size_t size, unsigned char fill) {
+        if (size == 0) {
+            return;
+        }
+        const std::vector<unsigned char> expected(size, fill);
+        ASSERT_EQ(std::memcmp(block, expected.data(), size), 0);
+    }
+    auto pick(std::uint64_t random) {
+        return std::next(m_blocks.begin(), static_cast<long>(random % size()));
+    }
+    void erase(std::map<unsigned char*, std::pair<std::size_t, unsigned char>>::iterator at) {
+        m_blocks.erase(at);
+    }
+    std::size_t size() const { return m_blocks.size(); }
+
+private:
+    std::map<unsigned char*, std::pair<std::size_t, unsigned char>> m_blocks;
+    unsigned m_fill = 0;
+};
+
+void run_randomly(const Heap& heap, std::mt19937_64& random, int steps) {
+    Model model;
+    for (int step = 0; step < steps; ++step) {
+        const auto choice = random() % 100;
+        std::size_t size = MIXED_SIZES[random() % std::size(MIXED_SIZES)] + random() % 64;
+        if (size > 64 * KIB && random() % 8 != 0) {
+            size %= 512;
+        }
+        if (choice < 45 || model.size() == 0) {
+            if (void* block = heap.take(size)) {
+                model.add(block, size);
+            } else {
+                EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
+            }
+        } else {
+            const auto at = model.pick(random());
+            const auto [old_size, fill] = at->second;
+            Model::expect_fill(at->first, old_size, fill);
+            if (choice < 75) {
+                EXPECT_EQ(heap.free(at->first), 1);
+                model.erase(at);
+            } else if (choice < 98) {
+                if (void* block = heap.resize(at->first, size)) {
+                    Model::expect_fill(static_cast<unsigned char*>(block), std::min(size, old_size), fill);
+                    model.erase(at);
+                    model.add(block, size);
+                } else {
+                    Model::expect_fill(at->first, old_size, fill);
+                }
+            } else {
+                const std::size_t largest = HeapCompact(heap.handle, 0);
+                EXPECT_EQ(largest, sound(heap.handle).largest_free);
+            }
+        }
+        if (step % 64 == 0) {
+            ASSERT_EQ(sound(heap.handle).live_blocks, model.size());
+        }
+    }
+    while (model.size() != 0) {
+        const auto at = model.pick(random());
+        Model::expect_fill(at->first, at->second.first, at->second.second);
+        EXPECT_EQ(heap.free(at->first), 1);
+        model.erase(at);
+    }
+    const HeapReport report = sound(heap.handle);
+    EXPECT_EQ(report.live_blocks, 0U);
+    EXPECT_LE(report.regions, 1U) << "a heap without blocks keeps one region at most";
+}
+
+TEST(Heap, FollowsTheModelUnderRandomUse) {
+    const auto seed = std::random_device{}();
+    SCOPED_TRACE(testing::Message() << "seed " << seed);
+    std::mt19937_64 random(seed);
+    for (const std::size_t maximum : {std::size_t{0}, 64 * KIB, 3 * MIB + 1, 80 * MIB}) {
+        SCOPED_TRACE(testing::Message() << "maximum " << maximum);
+        const long before = mapped_balance();
+        {
+            const Heap heap(maximum);
+            run_randomly(heap, random, 6000);
+        }
+        EXPECT_EQ(mapped_balance(), before);
+    }
+}
+
+TEST(Heap, EightThreadsShareOne) {
+    const Heap heap(0);
+    std::vector<std::thread> threads;
+    for (unsigned number = 1; number <= 8; ++number) {
+        threads.emplace_back([&heap, number] {
+            std::mt19937_64 random(number);
+            std::array<std::pair<unsigned char*, std::size_t>, 32> blocks{};
+            for (int step = 0; step < 3000; ++step) {
+                auto& [block, size] = blocks[random() % blocks.size()];
+                for (std::size_t i = 0; i < size; i += 64) {
+                    ASSERT_EQ(block[i], number);
+                }
+                if (random() % 2 == 0) {
+                    ASSERT_EQ(heap.free(std::exchange(block, nullptr)), 1);
+                    size = 0;
+                } else {
+                    size = random() % 4000;
+                    void* fresh = block != nullptr ? heap.resize(block, size) : heap.take(size);
+                    ASSERT_NE(fresh, nullptr);
+                    block = static_cast<unsigned char*>(fresh);
+                    std::memset(block, static_cast<int>(number), size);
+                }
+                if (step % 1000 == 0) {
+                    HeapCompact(heap.handle, 0);
+                    ASSERT_STREQ(inspect_heap(heap.handle).fault, nullptr);
+                }
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    sound(heap.handle);
+}
+
+// Everything a heap asks of the system, with every answer checked; false when something was refused.
+bool exercise(bool& sound_throughout) {
+    const Heap heap(0);
+    if (heap.handle == nullptr) {
+        sound_throughout = GetLastError() == ERROR_NOT_ENOUGH_MEMORY;
+        return false;
+    }
+    bool refused = false;
+    std::vector<void*> blocks;
+    for (int round = 0; round < 3; ++round) {
+        for (const std::size_t size : MIXED_SIZES) {
+            SetLastError(ERROR_SUCCESS);
+            void* block = heap.take(size);
+            refused |= block == nullptr;
+            sound_throughout &= block != nullptr || GetLastError() == ERROR_NOT_ENOUGH_MEMORY;
+            if (block != nullptr) {
+                std::memset(block, 0x5A, size);
+                blocks.push_back(block);
+                if (void* larger = heap.resize(block, 2 * size + MIB / 2)) {
+                    blocks.back() = larger;
+                } else {
+                    refused = true;
+                }
+                const std::vector<unsigned char> expected(size + 1, 0x5A);
+                sound_throughout &= std::memcmp(blocks.back(), expected.data(), size) == 0;
+            }
+            sound_throughout &= inspect_heap(heap.handle).live_blocks == blocks.size();
+        }
+    }
+    for (void* block : blocks) {
+        if (heap.free(block) == 0) {
+            refused = true;
+            sound_throughout &= GetLastError() == ERROR_NOT_ENOUGH_MEMORY && heap.free(block) == 1;
+        }
+        sound_throughout &= inspect_heap(heap.handle).fault == nullptr;
+    }
+    HeapCompact(heap.handle, 0);
+    const HeapReport report = inspect_heap(heap.handle);
+    sound_throughout &= report.fault == nullptr && report.live_blocks == 0;
+    return !refused;
+}
+
+TEST(Heap, SurvivesEachSystemCallFailing) {
+    int failures = 0;
+    for (int nth = 1;; ++nth) {
+        SCOPED_TRACE(nth);
+        bool sound_throughout = true;
+        const SystemFailure failure(nth);
+        exercise(sound_throughout);
+        EXPECT_TRUE(sound_throughout);
+        if (!SystemFailure::struck()) {
+            break;
+        }
+        ++failures;
+    }
+    EXPECT_GT(failures, 20);
+}
+
+TEST(Heap, MapsNothingMoreOnceTheSystemRefuses) {
+    const Heap heap(0);
+    void* block = heap.take(100);
+    std::memset(block, 7, 100);
+    const HeapReport before = sound(heap.handle);
+    const long balance = mapped_balance();
+    {
+        const SystemFailure failure(1, SystemFailure::Then::STAYS);
+        for (const std::size_t size : {100 * KIB, 900 * KIB, 5 * MIB}) {
+            EXPECT_EQ(heap.take(size), nullptr);
+            EXPECT_EQ(heap.resize(block, size), nullptr);
+            EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
+        }
+        EXPECT_NE(heap.take(1000), nullptr) << "what is there is still handed out";
+    }
+    EXPECT_EQ(mapped_balance(), balance);
+    EXPECT_EQ(sound(heap.handle).mapped, before.mapped);
+    Model::expect_fill(static_cast<unsigned char*>(block), 100, 7);
+}
+
+TEST(Heap, MaximumBoundsWhatIsMapped) {
+    for (const std::size_t maximum : {std::size_t{1}, 64 * KIB, 10 * MIB, 70 * MIB}) {
+        SCOPED_TRACE(maximum);
+        const Heap heap(maximum);
+        const std::size_t pages = (maximum + 4095) / 4096 * 4096;
+        EXPECT_EQ(heap.take(pages), nullptr);
+        EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
+        std::vector<void*> blocks;
+        while (void* block = heap.take(1000)) {
+            blocks.push_back(block);
+        }
+        const HeapReport report = sound(heap.handle);
+        EXPECT_EQ(report.mapped, pages);
+        EXPECT_GE(blocks.size(), pages / 1100) << "most of it is handed out";
+        for (void* block : blocks) {
+            EXPECT_EQ(heap.free(block), 1);
+        }
+    }
+    const Heap heap(2 * MIB);
+    void* whole = heap.take(2 * MIB - 64);
+    EXPECT_NE(whole, nullptr) << "single blocks may be as large as the maximum allows";
+    EXPECT_EQ(heap.take(4000), nullptr);
+    EXPECT_EQ(heap.free(whole), 1);
+    EXPECT_NE(heap.take(HeapCompact(heap.handle, 0)), nullptr);
+}
+
+TEST(Heap, RefusesAbsurdSizes) {
+    const Heap heap(0);
+    void* block = heap.take(10);
+    for (const std::size_t size :
+         {SIZE_MAX, SIZE_MAX - 7, SIZE_MAX - 4096, SIZE_MAX / 2, std::size_t{1} << 47}) {
+        SetLastError(ERROR_SUCCESS);
+        EXPECT_EQ(heap.take(size), nullptr);
+        EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
+        EXPECT_EQ(heap.resize(block, size), nullptr);
+    }
+    EXPECT_EQ(heap.free(block), 1);
+    const Heap boundless(SIZE_MAX);
+    EXPECT_NE(boundless.take(5 * MIB), nullptr);
+}
+
+TEST(Heap, TellsWhatIsNoLiveBlock) {
+    const Heap heap(0);
+    const Heap other(0);
+    auto* first = static_cast<char*>(heap.take(100));
+    auto* second = static_cast<char*>(heap.take(100));
+    void* foreign = other.take(100);
+    void* large = heap.take(4 * MIB);
+    EXPECT_EQ(heap.free(nullptr), 1);
+    EXPECT_EQ(heap.free(second), 1);
+    EXPECT_EQ(heap.free(large), 1);
+    int local = 0;
+    for (void* wrong :
+         {static_cast<void*>(second), large, static_cast<void*>(first + 16), foreign,
+          static_cast<void*>(first + 1), static_cast<void*>(first - 16), static_cast<void*>(&local)}) {
+        SetLastError(ERROR_SUCCESS);
+        EXPECT_EQ(heap.free(wrong), 0);
+        EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+        EXPECT_EQ(heap.resize(wrong, 10), nullptr);
+    }
+    EXPECT_EQ(heap.resize(nullptr, 10), nullptr);
+    EXPECT_EQ(sound(heap.handle).live_blocks, 1U);
+}
+
+TEST(Heap, RefusesWhatIsNoHeap) {
+    alignas(4096) static char page[4096];
+    for (HANDLE wrong : {HANDLE{nullptr}, static_cast<HANDLE>(page), static_cast<HANDLE>(page + 8)}) {
+        SetLastError(ERROR_SUCCESS);
+        EXPECT_EQ(HeapAlloc(wrong, 0, 1), nullptr);
+        EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
+        EXPECT_EQ(HeapFree(wrong, 0, nullptr), 0);
+        EXPECT_EQ(HeapReAlloc(wrong, 0, page, 1), nullptr);
+        EXPECT_EQ(HeapCompact(wrong, 0), 0U);
+        EXPECT_EQ(HeapDestroy(wrong), 0);
+        EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
+    }
+    EXPECT_EQ(HeapCreate(1, 0, 0), nullptr);
+    EXPECT_EQ(HeapCreate(0, 2, 1), nullptr);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+}
+
+TEST(Heap, ChunksComeInRisingOrderAndGoBackToTheSystem) {
+    const Heap heap(0);
+    std::vector<void*> chunks;
+    int falls = 0;
+    for (int i = 0; i < 20000; ++i) {
+        chunks.push_back(heap.take(2048));
+        falls += i > 0 && chunks[static_cast<std::size_t>(i)] < chunks[static_cast<std::size_t>(i) - 1];
+    }
+    EXPECT_LE(static_cast<std::size_t>(falls), sound(heap.handle).regions);
+    for (void* chunk : chunks) {
+        heap.free(chunk);
+    }
+    EXPECT_EQ(sound(heap.handle).regions, 1U);
+}
+
+TEST(Heap, CompactAnswersTheLargestFreeBlock) {
+    const Heap heap(0);
+    SetLastError(ERROR_ACCESS_DENIED);
+    EXPECT_EQ(HeapCompact(heap.handle, 0), 0U) << "nothing was taken yet";
+    EXPECT_EQ(GetLastError(), ERROR_SUCCESS);
+    void* block = heap.take(20 * KIB);
+    const std::size_t beside = HeapCompact(heap.handle, 0);
+    EXPECT_GT(beside, 40 * KIB);
+    EXPECT_LT(beside, 44 * KIB);
+    heap.free(block);
+    EXPECT_GT(HeapCompact(heap.handle, 0), 60 * KIB) << "a used heap keeps a region";
+}
+
+TEST(Heap, GrowsInPlaceIntoAFreeNeighbour) {
+    const Heap heap(0);
+    void* block = heap.take(1000);
+    EXPECT_EQ(heap.resize(block, 30000), block);
+    EXPECT_EQ(heap.resize(block, 10), block);
+    void* next = heap.take(10);
+    EXPECT_LT(static_cast<char*>(next), static_cast<char*>(block) + 100) << "the cut end is free again";
+    EXPECT_NE(heap.resize(block, 1000), block);
+}
+
+#ifdef BASALT_ADDRESS_SANITIZER
+TEST(Heap, TheSanitizerWatchesOverrunsAndUsesAfterFree) {
+    const Heap heap(0);
+    for (const std::size_t size : {std::size_t{0}, std::size_t{13}, std::size_t{2048}, 2 * MIB}) {
+        SCOPED_TRACE(size);
+        auto* block = static_cast<char*>(heap.take(size));
+        EXPECT_EQ(__asan_region_is_poisoned(block, size), nullptr);
+        for (const char* outside : {block - 8, block - 1, block + size, block + size + 15}) {
+            EXPECT_TRUE(__asan_address_is_poisoned(outside));
+        }
+        block = static_cast<char*>(heap.resize(block, size + 100));
+        EXPECT_EQ(__asan_region_is_poisoned(block, size + 100), nullptr);
+        EXPECT_TRUE(__asan_address_is_poisoned(block + size + 100));
+        block = static_cast<char*>(heap.resize(block, 7));
+        EXPECT_TRUE(__asan_address_is_poisoned(block + 7));
+        heap.free(block);
+        EXPECT_TRUE(size >= MIB || __asan_address_is_poisoned(block));
+    }
+}
+
+// The leak check at the program's end fails when this block counts as lost.
+TEST(Heap, WhatItsBlocksPointToIsNoLeak) {
+    static const HANDLE kept = HeapCreate(0, 0, 0);
+    *static_cast<char**>(HeapAlloc(kept, 0, 8)) = new char[777];
+}
+#endif
+
+}  // namespace

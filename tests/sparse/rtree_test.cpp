@@ -7,6 +7,7 @@
 #include <climits>
 #include <functional>
 #include <new>
+#include <ostream>
 #include <random>
 #include <string>
 #include <vector>
@@ -34,7 +35,8 @@ Ids search(const Tree& tree, const Rect& r) {
     const int min[2] = {r.minX, r.minY};
     const int max[2] = {r.maxX, r.maxY};
     Ids ids{-77};
-    EXPECT_EQ(tree.Search(min, max, ids), static_cast<int>(ids.size()));
+    const int found = tree.Search(min, max, ids);
+    EXPECT_EQ(found, static_cast<int>(ids.size()));
     return ids;
 }
 
@@ -94,6 +96,8 @@ struct Kind {
     const char* name;
     int count;
     std::function<Rect(Random&, int)> rect;
+
+    friend void PrintTo(const Kind& kind, std::ostream* out) { *out << kind.name; }
 };
 
 int extreme(Random& random) {

@@ -1,0 +1,308 @@
+#include "src/sparse/rtree.h"
+
+#include <gtest/gtest.h>
+
+#include <bit>
+#include <cctype>
+#include <climits>
+#include <functional>
+#include <new>
+#include <ostream>
+#include <random>
+#include <string>
+#include <vector>
+
+#include "src/sparse/rtree_volume.h"
+#include "tests/sparse/rtree_inspector.h"
+#include "tests/sparse/rtree_model.h"
+#include "tests/support/failing_new.h"
+
+namespace vex_util {
+namespace {
+
+using rtree::Rect;
+using Ids = std::vector<int>;
+
+template <class Tree>
+void insert(Tree& tree, const Rect& r, int id) {
+    const int min[2] = {r.minX, r.minY};
+    const int max[2] = {r.maxX, r.maxY};
+    tree.Insert(min, max, id);
+}
+
+template <class Tree>
+Ids search(const Tree& tree, const Rect& r) {
+    const int min[2] = {r.minX, r.minY};
+    const int max[2] = {r.maxX, r.maxY};
+    Ids ids{-77};
+    const int found = tree.Search(min, max, ids);
+    EXPECT_EQ(found, static_cast<int>(ids.size()));
+    return ids;
+}
+
+Rect block(int bx, int by) {
+    return {16 * bx, 16 * by, 16 * bx + 15, 16 * by + 15};
+}
+
+constexpr Rect EVERYTHING{INT_MIN, INT_MIN, INT_MAX, INT_MAX};
+
+TEST(RTree, VolumesOfKnownRectangles) {
+    const auto volume = [](const Rect& r) { return rtree::spherical_volume(rtree::all4(r))[0]; };
+    EXPECT_NEAR(volume({0, 0, 15, 15}), 353.4292, 5e-5);
+    EXPECT_NEAR(volume({0, 0, 31, 15}), 931.4823, 5e-5);
+    EXPECT_EQ(volume({7, -9, 7, -9}), 0);
+    EXPECT_EQ(std::bit_cast<unsigned>(rtree::UNIT_SPHERE_VOLUME), 0x40490FDCu);
+}
+
+TEST(RTree, NinthOfARowSplitsTheRoot) {
+    slRTree tree;
+    for (int i = 0; i < 9; ++i)
+        insert(tree, block(i, 0), i);
+    EXPECT_EQ(RTreeInspector::dump(tree),
+              "L1{0 0 79 15 L0{0 0 15 15 #0 16 0 31 15 #1 32 0 47 15 #2 48 0 63 15 #3 64 0 79 15 #4 }"
+              "80 0 143 15 L0{80 0 95 15 #5 96 0 111 15 #6 112 0 127 15 #7 128 0 143 15 #8 }}");
+}
+
+TEST(RTree, SquareOfBlocks) {
+    slRTree tree;
+    for (int i = 0; i < 25; ++i)
+        insert(tree, block(i % 5, i / 5), i);
+    EXPECT_EQ(search(tree, EVERYTHING), (Ids{2,  3,  4,  7,  8,  0,  1,  5,  6,  10, 9,  12, 13,
+                                             14, 11, 15, 16, 20, 21, 22, 17, 18, 19, 23, 24}));
+    EXPECT_EQ(search(tree, {20, 20, 40, 40}), (Ids{7, 6, 12, 11}));
+    EXPECT_EQ(RTreeInspector::check(tree), "");
+}
+
+TEST(RTree, SharedEdgesMeetAndInvertedQueriesAreAppliedAsGiven) {
+    slRTree tree;
+    insert(tree, {0, 0, 15, 15}, 5);
+    EXPECT_EQ(search(tree, {15, 0, 15, 0}), Ids{5});
+    EXPECT_EQ(search(tree, {-3, 15, 0, 99}), Ids{5});
+    EXPECT_EQ(search(tree, {16, 0, 20, 20}), Ids{});
+    EXPECT_EQ(search(tree, {10, 0, 5, 15}), Ids{5});
+    EXPECT_EQ(search(tree, {16, 0, 5, 15}), Ids{});
+    EXPECT_EQ(search(tree, {10, 0, -1, 15}), Ids{});
+    const slRTree empty;
+    EXPECT_EQ(search(empty, EVERYTHING), Ids{});
+}
+
+using Random = std::mt19937;
+
+int draw(Random& random, int from, int to) {
+    return std::uniform_int_distribution<int>(from, to)(random);
+}
+
+struct Kind {
+    const char* name;
+    int count;
+    std::function<Rect(Random&, int)> rect;
+
+    friend void PrintTo(const Kind& kind, std::ostream* out) { *out << kind.name; }
+};
+
+int extreme(Random& random) {
+    const int values[] = {INT_MIN, INT_MIN + 1, -1, 0, 1, 16777217, INT_MAX - 1, INT_MAX};
+    return values[draw(random, 0, 7)];
+}
+
+const Kind KINDS[] = {
+    {"row of blocks", 3000, [](Random&, int i) { return block(i, -2); }},
+    {"blocks row by row", 3600, [](Random&, int i) { return block(i % 60 - 30, i / 60 - 30); }},
+    {"scattered blocks", 6000, [](Random& r, int) { return block(draw(r, -900, 900), draw(r, -900, 900)); }},
+    {"blocks of few places", 3000, [](Random& r, int) { return block(draw(r, -3, 3), draw(r, -3, 3)); }},
+    {"one block again and again", 600, [](Random&, int) { return block(1, 1); }},
+    // Nine of these are their own cover, whose volume swallows the 1 below it: no pair of seeds is found.
+    {"one huge rectangle again and again", 600,
+     [](Random&, int) {
+         return Rect{-9000, -9000, 9000, 9000};
+     }},
+    {"clusters", 4000,
+     [](Random& r, int i) {
+         const int c = i / 100 * 7919 % 5000;
+         return block(c + draw(r, -4, 4), 3 * c + draw(r, -4, 4));
+     }},
+    {"single cells", 4000,
+     [](Random& r, int) {
+         const int x = draw(r, -99, 99), y = draw(r, -99, 99);
+         return Rect{x, y, x, y};
+     }},
+    {"rectangles beyond float's whole numbers", 4000,
+     [](Random& r, int) {
+         const int x = draw(r, INT_MIN, INT_MAX - 99999), y = draw(r, INT_MIN, INT_MAX - 99999);
+         return Rect{x, y, x + draw(r, 0, 99999), y + draw(r, 0, 99999)};
+     }},
+    {"extreme coordinates in any order", 3000,
+     [](Random& r, int) {
+         return Rect{extreme(r), extreme(r), extreme(r), extreme(r)};
+     }},
+    {"some inverted", 3000,
+     [](Random& r, int) {
+         const int x = draw(r, -2000, 2000), y = draw(r, -2000, 2000);
+         return Rect{x, y, x + draw(r, -9, 40), y + draw(r, -9, 40)};
+     }},
+};
+
+class RTreeAgainstModel : public testing::TestWithParam<Kind> {};
+
+TEST_P(RTreeAgainstModel, SameStructureAndSameOrder) {
+    const unsigned seed = std::random_device{}();
+    SCOPED_TRACE(seed);
+    Random random(seed);
+    const Kind& kind = GetParam();
+    slRTree tree;
+    RTreeModel model;
+    std::vector<Rect> rects;
+    for (int i = 0; i < kind.count; ++i) {
+        rects.push_back(kind.rect(random, i));
+        insert(tree, rects.back(), i);
+        insert(model, rects.back(), i);
+        if (i < 100 || i % 500 == 0) {
+            ASSERT_EQ(RTreeInspector::dump(tree), model.dump()) << i;
+        }
+    }
+    ASSERT_EQ(RTreeInspector::dump(tree), model.dump());
+    ASSERT_EQ(RTreeInspector::check(tree), "");
+    const auto any = [&] { return rects[static_cast<std::size_t>(draw(random, 0, kind.count - 1))]; };
+    for (int i = 0; i < 1000; ++i) {
+        // From the corners of two entries: edges are shared often, and windows of every size come up.
+        const Rect a = any(), b = any();
+        const Rect query = i % 4 == 0 ? Rect{a.minX, a.maxY, b.maxX, b.minY} : rtree::combine(a, b);
+        ASSERT_EQ(search(tree, query), search(model, query));
+    }
+    EXPECT_EQ(search(tree, EVERYTHING), search(model, EVERYTHING));
+}
+
+INSTANTIATE_TEST_SUITE_P(Kinds, RTreeAgainstModel, testing::ValuesIn(KINDS), [](const auto& kind) {
+    std::string name = kind.param.name;
+    std::erase_if(name, [](char c) { return !std::isalnum(static_cast<unsigned char>(c)); });
+    return name;
+});
+
+void fill(slRTree& tree, int from, int to) {
+    for (int i = from; i < to; ++i)
+        insert(tree, block(i * 37 % 61, i * 53 % 67), i);
+}
+
+TEST(RTree, CopyHasTheSameStructureAndNoSharedNode) {
+    slRTree tree;
+    fill(tree, 0, 2000);
+    const std::string before = RTreeInspector::dump(tree);
+    slRTree copy(tree);
+    EXPECT_EQ(RTreeInspector::dump(copy), before);
+    fill(copy, 2000, 4000);
+    EXPECT_EQ(RTreeInspector::dump(tree), before);
+    fill(tree, 2000, 4000);
+    EXPECT_EQ(RTreeInspector::dump(copy), RTreeInspector::dump(tree));
+    tree.RemoveAll();
+    EXPECT_EQ(search(copy, EVERYTHING).size(), 4000u);
+    EXPECT_EQ(RTreeInspector::check(copy), "");
+}
+
+TEST(RTree, SwapAndRemoveAll) {
+    slRTree a, b;
+    insert(a, {5, 5, -5, -5}, 1);  // inverted: a tree keeps that in mind
+    fill(b, 0, 500);
+    const std::string of_a = RTreeInspector::dump(a), of_b = RTreeInspector::dump(b);
+    a.swap(b);
+    EXPECT_EQ(RTreeInspector::dump(a), of_b);
+    EXPECT_EQ(RTreeInspector::dump(b), of_a);
+    EXPECT_EQ(RTreeInspector::check(b), "");
+    a.RemoveAll();
+    EXPECT_EQ(RTreeInspector::dump(a), "L0{}");
+    EXPECT_EQ(search(a, EVERYTHING), Ids{});
+    fill(a, 0, 500);
+    EXPECT_EQ(RTreeInspector::dump(a), of_b);
+}
+
+TEST(RTree, FailedInsertLeavesTheTreeAsItWas) {
+    slRTree tree;
+    RTreeModel model;
+    int failures = 0;
+    for (int i = 0; i < 3000; ++i) {
+        const Rect r = block(i * 37 % 61, i * 53 % 67);
+        for (long nth = 1;; ++nth) {
+            bool threw = false;
+            {
+                FailAllocation guard(nth);
+                try {
+                    insert(tree, r, i);
+                } catch (const std::bad_alloc&) {
+                    threw = true;
+                }
+            }
+            if (!threw)
+                break;
+            ++failures;
+            ASSERT_EQ(RTreeInspector::dump(tree), model.dump());
+        }
+        insert(model, r, i);
+    }
+    EXPECT_GT(failures, 3);
+    EXPECT_EQ(RTreeInspector::dump(tree), model.dump());
+}
+
+TEST(RTree, InsertAfterReserveCannotFail) {
+    slRTree tree;
+    for (int i = 0; i < 5000; ++i) {
+        tree.Reserve();
+        bool fired;
+        {
+            FailAllocation guard(1, true);
+            insert(tree, block(i * 37 % 61, i * 53 % 67), i);
+            fired = guard.fired();
+        }
+        ASSERT_FALSE(fired) << i;
+    }
+}
+
+// Runs the action with its nth allocation failing, for every n it has, and answers how many those were.
+long fail_each(const std::function<void()>& action) {
+    for (long nth = 1;; ++nth) {
+        const long before = live_allocations();
+        bool fired = false, threw = false;
+        {
+            FailAllocation guard(nth);
+            try {
+                action();
+            } catch (const std::bad_alloc&) {
+                threw = true;
+            }
+            fired = guard.fired();
+        }
+        EXPECT_EQ(fired, threw);
+        EXPECT_EQ(live_allocations(), before);
+        if (!fired)
+            return nth - 1;
+    }
+}
+
+TEST(RTree, FailedCopySearchAndConstructionLeakNothing) {
+    slRTree tree;
+    fill(tree, 0, 4000);
+    const std::string before = RTreeInspector::dump(tree);
+    EXPECT_GT(fail_each([&] { slRTree copy(tree); }), 3);
+    EXPECT_GT(fail_each([&] {
+                  Ids ids;
+                  const int min[2] = {0, 0}, max[2] = {5000, 5000};
+                  tree.Search(min, max, ids);
+              }),
+              1);
+    EXPECT_GE(fail_each([] { slRTree empty; }), 1);
+    EXPECT_EQ(RTreeInspector::dump(tree), before);
+}
+
+TEST(RTree, ClearingAllocatesNothing) {
+    slRTree tree;
+    fill(tree, 0, 4000);
+    bool fired;
+    {
+        FailAllocation guard(1, true);
+        tree.RemoveAll();
+        fired = guard.fired();
+    }
+    EXPECT_FALSE(fired);
+    EXPECT_EQ(RTreeInspector::dump(tree), "L0{}");
+}
+
+}  // namespace
+}  // namespace vex_util

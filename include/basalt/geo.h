@@ -149,6 +149,8 @@ BASALT_API geo_vector& geo_vector_reverse(geo_vector& v);
 BASALT_API void geo_vector_add(geo_vector& a, geo_vector& b, geo_vector& sum);
 
 /// Midpoint of two points.
+/// @param a one point
+/// @param b the other
 /// @param[out] out the midpoint. All three fields are #GEO_NULL when a north or east of either point is; the
 /// elevation alone is when only an elevation is.
 BASALT_API void geo_grid_centroid(const geo_nee& a, const geo_nee& b, geo_nee& out);

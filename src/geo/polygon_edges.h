@@ -24,8 +24,7 @@ enum class VertexTest { NO, YES };
 inline constexpr double LEVEL_EDGE_RISE = 1e-8;
 
 /// Whether the edge from j to i straddles the point's northing (the lower end counts, the upper does not) and
-/// passes east of the point. Ends of a straddling edge differ in northing, so LEVEL_EDGE_RISE has no use
-/// here.
+/// passes east of the point. A level edge never straddles, so nothing is divided by 0.
 inline bool crosses_east_of(const geo_nee& j, const geo_nee& i, const geo_nee& point) {
     const bool straddles = (i.north <= point.north && point.north < j.north) ||
                            (j.north <= point.north && point.north < i.north);
@@ -47,12 +46,11 @@ int crossing_parity_portable(int n, const geo_nee* polygon, const geo_nee& point
     return inside;
 }
 
-/// Bounds for the band of an edge. The exact test accepts a point only within `tolerance` of the edge's
-/// rectangle, give or take what its own rounding adds: about 1e-15 of the edge's length while sine, cosine
-/// and arc tangent are good to a few last places, and nothing above 1e-160 where squares underflow. Turned by
-/// the edge's bearing the rectangle reaches at most sqrt(2) tolerances beyond the ends along either axis.
-/// Every number here is generous against that, so a point outside the margin is one the exact test would
-/// refuse.
+/// Bounds for the band of an edge. The exact test accepts a point only in the rectangle that reaches
+/// `tolerance` beyond the edge, give or take its own rounding: some 1e-14 of edge and tolerance while the C
+/// library's sine, cosine and arc tangent are good to a few last places, and 1e-161 m where squares
+/// underflow. A turned rectangle reaches at most sqrt(2) tolerances beyond the ends along either axis. The
+/// numbers are generous against all that, so a point outside the margin is one the exact test would refuse.
 inline constexpr double BAND_REACH = 1.5;
 inline constexpr double BAND_ROUNDING = 1e-12;
 inline constexpr double BAND_UNDERFLOW = 1e-150;
@@ -63,9 +61,8 @@ inline double band_reach(double tolerance) {
 }
 
 /// Whether the band of edge a-b may hold the point. Differences, not bounds, are compared with the margin:
-/// those keep their relative accuracy far from the origin. With NaN anywhere the exact test refuses, so
-/// either answer is right; infinite edges and tolerances make the margin infinite or NaN, which keeps the
-/// edge.
+/// they keep their relative accuracy far from the origin. With NaN anywhere the exact test refuses, so either
+/// answer is right; infinite edges and tolerances make the margin infinite or NaN, which keeps the edge.
 inline bool may_be_in_band(const geo_nee& a, const geo_nee& b, const geo_nee& point, double reach) {
     const double margin = reach + BAND_ROUNDING * (std::abs(a.north - b.north) + std::abs(a.east - b.east));
     const double north_a = a.north - point.north;

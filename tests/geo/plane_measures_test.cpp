@@ -135,6 +135,7 @@ TEST(Divergence, IsTheSmallerAngle) {
     EXPECT_NEAR(geo_grid_divergence(0.1, 2 * PI - 0.1), 0.2, 1e-15);
     EXPECT_NEAR(geo_grid_divergence(2 * PI - 0.1, 0.1), 0.2, 1e-15);
     EXPECT_EQ(geo_grid_divergence(0.0, PI), PI);
+    EXPECT_LE(geo_grid_divergence(std::nextafter(PI, 4.0), 0.0), PI);
     EXPECT_EQ(geo_grid_divergence(GEO_NULL, 1.0), GEO_NULL);
     EXPECT_EQ(geo_grid_divergence(1.0, GEO_NULL), GEO_NULL);
     EXPECT_EQ(geo_grid_divergence(150.0, 0.0), 2 * PI - 150.0);

@@ -198,6 +198,8 @@ TEST(PointInPolygonBand, SquareFacts) {
     // Bands end square: the corner of the band reaches sqrt(2) tolerances.
     EXPECT_EQ(in_band(square, {10.9, 10.9, 0}, 1.0), 1);
     EXPECT_EQ(in_band(square, {11.1, 10.9, 0}, 1.0), 0);
+    // Squares of tiny distances underflow, so the exact test sees a point beside a vertex as the vertex.
+    EXPECT_EQ(in_band(Polygon(7, {0, 0, 0}), {1e-170, -1e-170, 0}, 0.0), 1);
     // Without a band the vertex at the north-east is outside by its crossings.
     EXPECT_EQ(in_band(square, {10, 10, 0}, -1.0), 0);
     EXPECT_EQ(in_band(square, {10, 10, 0}, NOT_A_NUMBER), 0);

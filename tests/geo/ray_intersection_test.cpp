@@ -29,7 +29,6 @@ TEST(RayIntersection, FactsOfMeetingAndMissing) {
         {"bearings of several turns", {0, 0, 0}, {0, 10, 0}, PI / 4 + 8 * PI, -PI / 4, 1, 5, 5},
         {"equal bearings", {0, 0, 0}, {10, 10, 0}, 1, 1, 0, 0, 0},
         {"opposite bearings", {0, 0, 0}, {10, 0, 0}, 0, PI, 0, 0, 0},
-        {"nearly parallel", {0, 0, 0}, {0, 1, 0}, 1, 1 + 4.8e-7, 0, 0, 0},
         {"behind ray 2, but at the start of ray 1", {5, 5, 0}, {5, 15, 0}, PI / 4, PI / 2, 1, 5, 5},
         {"behind ray 1, but at the start of ray 2", {5, 15, 0}, {5, 5, 0}, PI / 2, PI / 4, 1, 5, 5},
     };
@@ -67,6 +66,30 @@ TEST(RayIntersection, FindsATargetSightedFromTwoStations) {
         ASSERT_NEAR(out.north, target.north, 2e-7);
         ASSERT_NEAR(out.east, target.east, 2e-7);
         ASSERT_EQ(geo_grid_bb_intersect(p1, p2, bearing1 + PI, bearing2, out), 0);
+    }
+}
+
+TEST(RayIntersection, RefusesBelowATenthOfAnArcSecond) {
+    geo_nee out = {};
+    for (const double turn : {0.0, PI}) {
+        const double other = 1.0 + turn;
+        EXPECT_EQ(geo_grid_bb_intersect({0, 0, 0}, {0, 1, 0}, 1.0 + 4.84e-7, other, out), 0);
+        EXPECT_EQ(geo_grid_bb_intersect({0, 1, 0}, {0, 0, 0}, other, 1.0 + 4.84e-7, out), 0);
+    }
+    EXPECT_EQ(geo_grid_bb_intersect({0, 0, 0}, {0, 1, 0}, 1.0 + 4.86e-7, 1.0, out), 1);
+}
+
+TEST(RayIntersection, KeepsTheEastingOfARunAlongTheNorthAxis) {
+    const geo_nee station = {5800000.3, 350000.1, 0};
+    const double slight = 4.8e-7;
+    geo_nee out = {};
+    for (const double off : {0.0, slight, -slight}) {
+        EXPECT_EQ(geo_grid_bb_intersect(station, {5800000.3, 349990.1, 0}, off, 0.7, out), 1);
+        EXPECT_EQ(out.east, station.east);
+        EXPECT_EQ(geo_grid_bb_intersect({5800000.3, 349990.1, 0}, station, 2.3, PI + off, out), 1);
+        EXPECT_EQ(out.east, station.east);
+        EXPECT_EQ(geo_grid_bb_intersect(station, {5800000.3, 349990.1, 0}, PI + off, 2.3, out), 1);
+        EXPECT_EQ(out.east, station.east);
     }
 }
 

@@ -200,10 +200,10 @@ int CString::Delete(int position, int count) {
 
 int CString::Replace(wchar_t old_character, wchar_t new_character) noexcept {
     int count = 0;
-    for (wchar_t& ch : m_text) {
-        if (ch == old_character && old_character != new_character) {
-            ch = new_character;
-            ++count;
+    if (old_character != new_character) {
+        for (wchar_t& ch : m_text) {
+            count += ch == old_character;
+            ch = ch == old_character ? new_character : ch;
         }
     }
     return count;

@@ -4,12 +4,11 @@
 #define BASALT_PLATFORM_CSTRING_H
 
 #include <cstddef>
-#include <cstdint>
 #include <string>
-#include <type_traits>
 #include <utility>
 
 #include "basalt/export.h"
+#include "basalt/platform/format_argument.h"
 
 /// Wide text with value semantics, one unit a character, counted: it may hold zeros, though whatever takes or
 /// gives a plain pointer ends at the first.
@@ -22,11 +21,10 @@
 /// text as it was. Threads: reentrant; one object is used by one thread at a time, or by many for reading.
 class BASALT_API CString {
 public:
-    class FormatArgument;
-
     /// @name Construction
     /// A negative length or repeat count gives the empty text.
     /// @{
+
     /// The empty text.
     CString() noexcept = default;
     /// The empty text.
@@ -49,6 +47,7 @@ public:
 
     /// @name Reading
     /// @{
+
     /// The number of characters.
     int GetLength() const noexcept { return static_cast<int>(m_text.size()); }
     /// Whether there is no character.
@@ -68,6 +67,7 @@ public:
 
     /// @name Parts, as a text of their own
     /// @{
+
     /// The first `count` characters.
     CString Left(int count) const;
     /// The last `count` characters.
@@ -82,6 +82,7 @@ public:
     /// The position of the first match at or after `start`, or of the last match; -1 when there is none, also
     /// for a start outside the text and a null pointer. The empty text is found at every start.
     /// @{
+
     /// The first such character.
     int Find(wchar_t character, int start = 0) const noexcept;
     /// The first such text.
@@ -95,6 +96,7 @@ public:
     /// @name Comparison
     /// -1, 0 or 1 as this text comes before, is or comes after the other.
     /// @{
+
     /// By the characters' codes.
     int Compare(const wchar_t* other) const noexcept;
     /// By the codes of the lower-case forms, in the environment's locale.
@@ -103,6 +105,7 @@ public:
 
     /// @name Changing
     /// @{
+
     /// Becomes the empty text.
     void Empty() noexcept { m_text.clear(); }
     /// Replaces the character at a position; outside the text nothing changes.
@@ -152,6 +155,7 @@ public:
 
     /// @name Direct access
     /// @{
+
     /// Room for at least `least_length` characters and a zero, holding the text; the caller may write there
     /// until ReleaseBuffer, and uses no other member meanwhile.
     wchar_t* GetBuffer(int least_length = 0);
@@ -182,6 +186,7 @@ public:
     /// @name Joining and comparing
     /// By the characters' codes.
     /// @{
+
     /// The two, joined.
     friend CString operator+(CString a, const CString& b) { return std::move(a += b); }
     /// The two, joined.
@@ -235,70 +240,16 @@ public:
 
 private:
     void append(const wchar_t* text, std::size_t length);
-    void append_formatted(const wchar_t* format, const FormatArgument* arguments, std::size_t count);
+    void append_formatted(const wchar_t* format, const basalt::platform::FormatArgument* arguments,
+                          std::size_t count);
 
     std::wstring m_text;
-};
-
-/// One argument of CString::Format, made by itself of a number, character, enumerator, text or pointer.
-class CString::FormatArgument {
-public:
-    /// What the argument is.
-    enum class Kind : unsigned char {
-        INTEGER,      ///< a number without fraction, a character or an enumerator
-        FLOATING,     ///< any other number
-        WIDE_TEXT,    ///< a wide text or null
-        NARROW_TEXT,  ///< a narrow text or null
-        POINTER       ///< any other pointer
-    };
-
-    /// A number without fraction, a character or an enumerator.
-    template <class T, std::enable_if_t<std::is_integral_v<T> || std::is_enum_v<T>, int> = 0>
-    FormatArgument(T value) noexcept
-        : m_kind(Kind::INTEGER),
-          m_is_signed(std::is_enum_v<T> || std::is_signed_v<T>),
-          m_size(sizeof(T)),
-          m_integer(static_cast<std::int64_t>(value)) {}
-    /// A number.
-    FormatArgument(double value) noexcept : m_kind(Kind::FLOATING), m_floating(value) {}
-    /// A wide text, not copied.
-    FormatArgument(const wchar_t* text) noexcept : m_kind(Kind::WIDE_TEXT), m_pointer(text) {}
-    /// A narrow text, not copied.
-    FormatArgument(const char* text) noexcept : m_kind(Kind::NARROW_TEXT), m_pointer(text) {}
-    /// A text, not copied.
-    FormatArgument(const CString& text) noexcept : FormatArgument(text.GetString()) {}
-    /// A pointer.
-    FormatArgument(const void* pointer) noexcept : m_kind(Kind::POINTER), m_pointer(pointer) {}
-    /// The null pointer.
-    FormatArgument(std::nullptr_t) noexcept : FormatArgument(static_cast<const void*>(nullptr)) {}
-
-    /// What the argument is.
-    Kind kind() const noexcept { return m_kind; }
-    /// Whether an integer's type has a sign.
-    bool is_signed() const noexcept { return m_is_signed; }
-    /// Bytes of the integer's type.
-    unsigned size() const noexcept { return m_size; }
-    /// The integer; one of 64 bits without a sign by its bit pattern.
-    std::int64_t integer() const noexcept { return m_integer; }
-    /// The number.
-    double floating() const noexcept { return m_floating; }
-    /// The text or pointer.
-    const void* pointer() const noexcept { return m_pointer; }
-
-private:
-    Kind m_kind;
-    bool m_is_signed = false;
-    unsigned char m_size = 0;
-    union {
-        std::int64_t m_integer;
-        double m_floating;
-        const void* m_pointer;
-    };
 };
 
 template <class... Arguments>
 void CString::AppendFormat(const wchar_t* format, const Arguments&... arguments) {
     // One more than there are, since an array may not be empty.
+    using basalt::platform::FormatArgument;
     const FormatArgument all[] = {FormatArgument(arguments)..., FormatArgument(nullptr)};
     append_formatted(format, all, sizeof...(arguments));
 }

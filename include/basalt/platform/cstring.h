@@ -18,7 +18,9 @@
 /// is in the active code page: the encoding of the environment's locale, UTF-8 where that names none.
 ///
 /// Bad input: no call fails; std::bad_alloc and std::length_error (more than 2^31 - 1 characters) leave the
-/// text as it was. Threads: reentrant; one object is used by one thread at a time, or by many for reading.
+/// text as it was.
+///
+/// Threads: reentrant; one object is used by one thread at a time, or by many for reading.
 class BASALT_API CString {
 public:
     /// @name Construction

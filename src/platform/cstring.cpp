@@ -7,9 +7,6 @@
 
 #include "src/platform/code_page.h"
 
-using basalt::platform::active_code_page;
-using basalt::platform::CodePage;
-
 namespace {
 
 constexpr auto MAX_LENGTH = static_cast<std::size_t>(std::numeric_limits<int>::max());
@@ -34,29 +31,6 @@ void require_length(std::size_t length) {
 
 int sign(int comparison) {
     return (comparison > 0) - (comparison < 0);
-}
-
-template <class Matches>
-void trim_left(std::wstring& text, Matches matches) {
-    text.erase(text.begin(), std::find_if_not(text.begin(), text.end(), matches));
-}
-
-template <class Matches>
-void trim_right(std::wstring& text, Matches matches) {
-    text.erase(std::find_if_not(text.rbegin(), text.rend(), matches).base(), text.end());
-}
-
-auto is_white_space() {
-    return [&code_page = active_code_page()](wchar_t ch) { return code_page.is_space(ch); };
-}
-
-// Over a copy of the characters: they may belong to the text being trimmed.
-auto is_one_of(const wchar_t* characters) {
-    return [set = std::wstring(view_of(characters))](wchar_t ch) { return set.find(ch) != set.npos; };
-}
-
-auto is_equal_to(wchar_t character) {
-    return [character](wchar_t ch) { return ch == character; };
 }
 
 }  // namespace
@@ -139,20 +113,6 @@ int CString::Compare(const wchar_t* other) const noexcept {
     return sign(m_text.compare(view_of(other)));
 }
 
-int CString::CompareNoCase(const wchar_t* other) const {
-    const CodePage& code_page = active_code_page();
-    const std::wstring_view others = view_of(other);
-    const std::size_t shared = std::min(m_text.size(), others.size());
-    for (std::size_t i = 0; i < shared; ++i) {
-        const wchar_t a = code_page.to_lower(m_text[i]);
-        const wchar_t b = code_page.to_lower(others[i]);
-        if (a != b) {
-            return a < b ? -1 : 1;
-        }
-    }
-    return (m_text.size() > shared) - (others.size() > shared);
-}
-
 void CString::SetAt(int position, wchar_t character) noexcept {
     if (position >= 0 && static_cast<std::size_t>(position) < m_text.size()) {
         m_text[static_cast<std::size_t>(position)] = character;
@@ -200,10 +160,10 @@ int CString::Delete(int position, int count) {
 
 int CString::Replace(wchar_t old_character, wchar_t new_character) noexcept {
     int count = 0;
-    for (wchar_t& ch : m_text) {
-        if (ch == old_character && old_character != new_character) {
-            ch = new_character;
-            ++count;
+    if (old_character != new_character) {
+        for (wchar_t& ch : m_text) {
+            count += ch == old_character;
+            ch = ch == old_character ? new_character : ch;
         }
     }
     return count;
@@ -231,67 +191,6 @@ int CString::Replace(const wchar_t* old_text, const wchar_t* new_text) {
 
 int CString::Remove(wchar_t character) noexcept {
     return static_cast<int>(std::erase(m_text, character));
-}
-
-CString& CString::MakeLower() {
-    const CodePage& code_page = active_code_page();
-    for (wchar_t& ch : m_text) {
-        ch = code_page.to_lower(ch);
-    }
-    return *this;
-}
-
-CString& CString::MakeUpper() {
-    const CodePage& code_page = active_code_page();
-    for (wchar_t& ch : m_text) {
-        ch = code_page.to_upper(ch);
-    }
-    return *this;
-}
-
-CString& CString::Trim() {
-    return TrimRight().TrimLeft();
-}
-
-CString& CString::Trim(wchar_t character) {
-    return TrimRight(character).TrimLeft(character);
-}
-
-CString& CString::Trim(const wchar_t* characters) {
-    const auto matches = is_one_of(characters);
-    trim_right(m_text, matches);
-    trim_left(m_text, matches);
-    return *this;
-}
-
-CString& CString::TrimLeft() {
-    trim_left(m_text, is_white_space());
-    return *this;
-}
-
-CString& CString::TrimLeft(wchar_t character) {
-    trim_left(m_text, is_equal_to(character));
-    return *this;
-}
-
-CString& CString::TrimLeft(const wchar_t* characters) {
-    trim_left(m_text, is_one_of(characters));
-    return *this;
-}
-
-CString& CString::TrimRight() {
-    trim_right(m_text, is_white_space());
-    return *this;
-}
-
-CString& CString::TrimRight(wchar_t character) {
-    trim_right(m_text, is_equal_to(character));
-    return *this;
-}
-
-CString& CString::TrimRight(const wchar_t* characters) {
-    trim_right(m_text, is_one_of(characters));
-    return *this;
 }
 
 wchar_t* CString::GetBuffer(int least_length) {

@@ -13,7 +13,7 @@
 
 namespace {
 
-using Argument = CString::FormatArgument;
+using Argument = basalt::platform::FormatArgument;
 using Kind = Argument::Kind;
 
 constexpr int NO_PRECISION = -1;
@@ -288,7 +288,7 @@ private:
 
 }  // namespace
 
-void CString::append_formatted(const wchar_t* format, const FormatArgument* arguments, std::size_t count) {
+void CString::append_formatted(const wchar_t* format, const Argument* arguments, std::size_t count) {
     if (format != nullptr) {
         const std::wstring text = Formatter(format, arguments, count).run();
         append(text.data(), text.size());

@@ -4,12 +4,11 @@
 #define BASALT_PLATFORM_CSTRING_H
 
 #include <cstddef>
-#include <cstdint>
 #include <string>
-#include <type_traits>
 #include <utility>
 
 #include "basalt/export.h"
+#include "basalt/platform/format_argument.h"
 
 /// Wide text with value semantics, one unit a character, counted: it may hold zeros, though whatever takes or
 /// gives a plain pointer ends at the first.
@@ -19,45 +18,65 @@
 /// is in the active code page: the encoding of the environment's locale, UTF-8 where that names none.
 ///
 /// Bad input: no call fails; std::bad_alloc and std::length_error (more than 2^31 - 1 characters) leave the
-/// text as it was. Threads: reentrant; one object is used by one thread at a time, or by many for reading.
+/// text as it was.
+///
+/// Threads: reentrant; one object is used by one thread at a time, or by many for reading.
 class BASALT_API CString {
 public:
-    class FormatArgument;
-
     /// @name Construction
     /// A negative length or repeat count gives the empty text.
     /// @{
+
+    /// The empty text.
     CString() noexcept = default;
+    /// The empty text.
     CString(std::nullptr_t) noexcept {}
+    /// A wide text up to its zero.
     CString(const wchar_t* text);
+    /// `length` wide characters, zeros included.
     CString(const wchar_t* text, int length);
+    /// A narrow text up to its zero.
     CString(const char* text);
+    /// `length` bytes of narrow text, zeros included.
     CString(const char* text, int length);
+    /// One character, `repeat` times.
     explicit CString(wchar_t character, int repeat = 1);
+    /// One narrow character, `repeat` times.
     explicit CString(char character, int repeat = 1);
+    /// Becomes the one character.
     CString& operator=(wchar_t character);
     /// @}
 
     /// @name Reading
     /// @{
+
+    /// The number of characters.
     int GetLength() const noexcept { return static_cast<int>(m_text.size()); }
+    /// Whether there is no character.
     bool IsEmpty() const noexcept { return m_text.empty(); }
     /// The text with a zero after it, valid until the object is next changed.
     const wchar_t* GetString() const noexcept { return m_text.c_str(); }
+    /// What GetString gives.
     operator const wchar_t*() const noexcept { return m_text.c_str(); }
     /// The character at a position; 0 outside the text.
     wchar_t GetAt(std::ptrdiff_t position) const noexcept {
         return static_cast<std::size_t>(position) < m_text.size() ? m_text[static_cast<std::size_t>(position)]
                                                                   : L'\0';
     }
+    /// What GetAt gives.
     wchar_t operator[](std::ptrdiff_t position) const noexcept { return GetAt(position); }
     /// @}
 
     /// @name Parts, as a text of their own
     /// @{
+
+    /// The first `count` characters.
     CString Left(int count) const;
+    /// The last `count` characters.
     CString Right(int count) const;
+    /// The characters from position `first` to the end.
     CString Mid(int first) const;
+    /// `count` characters from position `first`.
     CString Mid(int first, int count) const;
     /// @}
 
@@ -65,55 +84,80 @@ public:
     /// The position of the first match at or after `start`, or of the last match; -1 when there is none, also
     /// for a start outside the text and a null pointer. The empty text is found at every start.
     /// @{
+
+    /// The first such character.
     int Find(wchar_t character, int start = 0) const noexcept;
+    /// The first such text.
     int Find(const wchar_t* text, int start = 0) const noexcept;
+    /// The last such character.
     int ReverseFind(wchar_t character) const noexcept;
     /// The first of any of the characters given.
     int FindOneOf(const wchar_t* characters) const noexcept;
     /// @}
 
     /// @name Comparison
-    /// -1, 0 or 1 as this text comes before, is or comes after the other, by the characters' codes; without
-    /// regard to case, by their lower-case forms in the environment's locale.
+    /// -1, 0 or 1 as this text comes before, is or comes after the other.
     /// @{
+
+    /// By the characters' codes.
     int Compare(const wchar_t* other) const noexcept;
+    /// By the codes of the lower-case forms, in the environment's locale.
     int CompareNoCase(const wchar_t* other) const;
     /// @}
 
     /// @name Changing
     /// @{
+
+    /// Becomes the empty text.
     void Empty() noexcept { m_text.clear(); }
-    /// Outside the text: nothing changes.
+    /// Replaces the character at a position; outside the text nothing changes.
     void SetAt(int position, wchar_t character) noexcept;
+    /// Appends a text.
     CString& operator+=(const CString& other);
+    /// Appends a text up to its zero.
     CString& operator+=(const wchar_t* other);
+    /// Appends a character.
     CString& operator+=(wchar_t character);
-    /// Insert and Delete return the new length.
+    /// Puts a character in front of a position; gives the new length.
     int Insert(int position, wchar_t character);
+    /// Puts a text in front of a position; gives the new length.
     int Insert(int position, const wchar_t* text);
+    /// Takes `count` characters out; gives the new length.
     int Delete(int position, int count = 1);
-    /// The number of matches, found from the left without overlap. An empty old text matches nothing.
+    /// Replaces each such character; gives their number, 0 for the same character twice.
     int Replace(wchar_t old_character, wchar_t new_character) noexcept;
+    /// Replaces each such text, found from the left without overlap; gives their number. An empty old text is
+    /// found nowhere.
     int Replace(const wchar_t* old_text, const wchar_t* new_text);
-    /// The number of characters taken out.
+    /// Takes every such character out; gives their number.
     int Remove(wchar_t character) noexcept;
-    /// Character by character, in the environment's locale.
+    /// Each character to lower case, in the environment's locale.
     CString& MakeLower();
+    /// Each character to upper case, in the environment's locale.
     CString& MakeUpper();
-    /// White space, or the characters given, off both ends or one.
+    /// Takes white space off both ends.
     CString& Trim();
+    /// Takes a character off both ends.
     CString& Trim(wchar_t character);
+    /// Takes any of the characters off both ends.
     CString& Trim(const wchar_t* characters);
+    /// Takes white space off the front.
     CString& TrimLeft();
+    /// Takes a character off the front.
     CString& TrimLeft(wchar_t character);
+    /// Takes any of the characters off the front.
     CString& TrimLeft(const wchar_t* characters);
+    /// Takes white space off the end.
     CString& TrimRight();
+    /// Takes a character off the end.
     CString& TrimRight(wchar_t character);
+    /// Takes any of the characters off the end.
     CString& TrimRight(const wchar_t* characters);
     /// @}
 
     /// @name Direct access
     /// @{
+
     /// Room for at least `least_length` characters and a zero, holding the text; the caller may write there
     /// until ReleaseBuffer, and uses no other member meanwhile.
     wchar_t* GetBuffer(int least_length = 0);
@@ -141,80 +185,73 @@ public:
     template <class... Arguments>
     void AppendFormat(const wchar_t* format, const Arguments&... arguments);
 
+    /// @name Joining and comparing
+    /// By the characters' codes.
+    /// @{
+
+    /// The two, joined.
     friend CString operator+(CString a, const CString& b) { return std::move(a += b); }
+    /// The two, joined.
     friend CString operator+(CString a, const wchar_t* b) { return std::move(a += b); }
+    /// The two, joined.
     friend CString operator+(const wchar_t* a, const CString& b) { return CString(a) + b; }
+    /// The two, joined.
     friend CString operator+(CString a, wchar_t b) { return std::move(a += b); }
+    /// The two, joined.
     friend CString operator+(wchar_t a, const CString& b) { return CString(a) + b; }
 
+    /// Whether the texts are the same.
     friend bool operator==(const CString& a, const CString& b) noexcept { return a.m_text == b.m_text; }
+    /// Whether the texts differ.
     friend bool operator!=(const CString& a, const CString& b) noexcept { return a.m_text != b.m_text; }
+    /// Whether the first comes before the second.
     friend bool operator<(const CString& a, const CString& b) noexcept { return a.m_text < b.m_text; }
+    /// Whether the first comes after the second.
     friend bool operator>(const CString& a, const CString& b) noexcept { return a.m_text > b.m_text; }
+    /// Whether the first does not come after the second.
     friend bool operator<=(const CString& a, const CString& b) noexcept { return a.m_text <= b.m_text; }
+    /// Whether the first does not come before the second.
     friend bool operator>=(const CString& a, const CString& b) noexcept { return a.m_text >= b.m_text; }
 
+    /// Whether the texts are the same.
     friend bool operator==(const CString& a, const wchar_t* b) noexcept { return a.Compare(b) == 0; }
+    /// Whether the texts differ.
     friend bool operator!=(const CString& a, const wchar_t* b) noexcept { return a.Compare(b) != 0; }
+    /// Whether the first comes before the second.
     friend bool operator<(const CString& a, const wchar_t* b) noexcept { return a.Compare(b) < 0; }
+    /// Whether the first comes after the second.
     friend bool operator>(const CString& a, const wchar_t* b) noexcept { return a.Compare(b) > 0; }
+    /// Whether the first does not come after the second.
     friend bool operator<=(const CString& a, const wchar_t* b) noexcept { return a.Compare(b) <= 0; }
+    /// Whether the first does not come before the second.
     friend bool operator>=(const CString& a, const wchar_t* b) noexcept { return a.Compare(b) >= 0; }
 
+    /// Whether the texts are the same.
     friend bool operator==(const wchar_t* a, const CString& b) noexcept { return b == a; }
+    /// Whether the texts differ.
     friend bool operator!=(const wchar_t* a, const CString& b) noexcept { return b != a; }
+    /// Whether the first comes before the second.
     friend bool operator<(const wchar_t* a, const CString& b) noexcept { return b > a; }
+    /// Whether the first comes after the second.
     friend bool operator>(const wchar_t* a, const CString& b) noexcept { return b < a; }
+    /// Whether the first does not come after the second.
     friend bool operator<=(const wchar_t* a, const CString& b) noexcept { return b >= a; }
+    /// Whether the first does not come before the second.
     friend bool operator>=(const wchar_t* a, const CString& b) noexcept { return b <= a; }
+    /// @}
 
 private:
     void append(const wchar_t* text, std::size_t length);
-    void append_formatted(const wchar_t* format, const FormatArgument* arguments, std::size_t count);
+    void append_formatted(const wchar_t* format, const basalt::platform::FormatArgument* arguments,
+                          std::size_t count);
 
     std::wstring m_text;
-};
-
-/// One argument of CString::Format, made by itself of a number, character, enumerator, text or pointer.
-class CString::FormatArgument {
-public:
-    enum class Kind : unsigned char { INTEGER, FLOATING, WIDE_TEXT, NARROW_TEXT, POINTER };
-
-    template <class T, std::enable_if_t<std::is_integral_v<T> || std::is_enum_v<T>, int> = 0>
-    FormatArgument(T value) noexcept
-        : m_kind(Kind::INTEGER),
-          m_is_signed(std::is_enum_v<T> || std::is_signed_v<T>),
-          m_size(sizeof(T)),
-          m_integer(static_cast<std::int64_t>(value)) {}
-    FormatArgument(double value) noexcept : m_kind(Kind::FLOATING), m_floating(value) {}
-    FormatArgument(const wchar_t* text) noexcept : m_kind(Kind::WIDE_TEXT), m_pointer(text) {}
-    FormatArgument(const char* text) noexcept : m_kind(Kind::NARROW_TEXT), m_pointer(text) {}
-    FormatArgument(const CString& text) noexcept : FormatArgument(text.GetString()) {}
-    FormatArgument(const void* pointer) noexcept : m_kind(Kind::POINTER), m_pointer(pointer) {}
-    FormatArgument(std::nullptr_t) noexcept : FormatArgument(static_cast<const void*>(nullptr)) {}
-
-    Kind kind() const noexcept { return m_kind; }
-    bool is_signed() const noexcept { return m_is_signed; }
-    /// Bytes of the integer's type.
-    unsigned size() const noexcept { return m_size; }
-    std::int64_t integer() const noexcept { return m_integer; }
-    double floating() const noexcept { return m_floating; }
-    const void* pointer() const noexcept { return m_pointer; }
-
-private:
-    Kind m_kind;
-    bool m_is_signed = false;
-    unsigned char m_size = 0;
-    union {
-        std::int64_t m_integer;
-        double m_floating;
-        const void* m_pointer;
-    };
 };
 
 template <class... Arguments>
 void CString::AppendFormat(const wchar_t* format, const Arguments&... arguments) {
     // One more than there are, since an array may not be empty.
+    using basalt::platform::FormatArgument;
     const FormatArgument all[] = {FormatArgument(arguments)..., FormatArgument(nullptr)};
     append_formatted(format, all, sizeof...(arguments));
 }

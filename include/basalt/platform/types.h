@@ -7,10 +7,15 @@
 
 /// Truth value of a platform call: 0 is failure, anything else success.
 using BOOL = int;
+/// 8 bits, unsigned.
 using BYTE = std::uint8_t;
+/// 16 bits, unsigned.
 using WORD = std::uint16_t;
+/// 32 bits, unsigned.
 using UINT = std::uint32_t;
+/// 32 bits, unsigned.
 using DWORD = std::uint32_t;
+/// 32 bits, signed, although `long` has 64 here.
 using LONG = std::int32_t;
 /// Result code: negative is failure.
 using HRESULT = std::int32_t;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <utility>
 
 #include "number_text.h"
 
@@ -17,16 +18,13 @@ public:
         m_text += title + "\n";
     }
     void line(const std::string& label, const std::string& value, const std::string& rest = {}) {
-        constexpr std::size_t LABEL = 22;
         constexpr std::size_t VALUE = 18;
-        m_text += "  " + label + std::string(label.size() < LABEL ? LABEL - label.size() : 1, ' ');
-        m_text += std::string(value.size() < VALUE ? VALUE - value.size() : 0, ' ') + value;
-        m_text += rest.empty() ? "\n" : " " + rest + "\n";
+        text(label, std::string(VALUE - std::min(value.size(), VALUE), ' ') + value +
+                        (rest.empty() ? "" : " " + rest));
     }
     void text(const std::string& label, const std::string& words) {
         constexpr std::size_t LABEL = 22;
-        m_text +=
-            "  " + label + std::string(label.size() < LABEL ? LABEL - label.size() : 1, ' ') + words + "\n";
+        m_text += "  " + label + std::string(LABEL - std::min(label.size(), LABEL), ' ') + words + "\n";
     }
     std::string take() { return std::move(m_text); }
 

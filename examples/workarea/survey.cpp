@@ -1,8 +1,11 @@
 #include "survey.h"
 
 #include <algorithm>
+#include <cmath>
 #include <tuple>
+#include <utility>
 
+#include "exact_sum.h"
 #include "progress.h"
 
 namespace {
@@ -39,26 +42,79 @@ private:
     std::vector<double> m_areas;
 };
 
-/// The visit's order is the array's business; ties go to the southernmost, then westernmost cell.
-void widen(Survey& survey, const Extreme& cell) {
-    const auto place = [](const Extreme& e) { return std::tie(e.y, e.x); };
-    const bool first = survey.inside == 1;
-    Extreme& lowest = survey.lowest;
-    Extreme& highest = survey.highest;
-    if (first || cell.elevation < lowest.elevation ||
-        (cell.elevation == lowest.elevation && place(cell) < place(lowest))) {
-        lowest = cell;
+/// Volumes against a grade.
+class Earthwork {
+public:
+    explicit Earthwork(double grade) : m_grade(grade) {}
+    void add(double elevation, double cell_area) {
+        const double above = elevation - m_grade;
+        (above > 0.0 ? m_cut : m_fill).add(std::abs(above) * cell_area);
     }
-    if (first || cell.elevation > highest.elevation ||
-        (cell.elevation == highest.elevation && place(cell) < place(highest))) {
-        highest = cell;
+    void store(Survey& survey) const {
+        survey.grade = m_grade;
+        survey.cut = m_cut.value();
+        survey.fill = m_fill.value();
     }
-}
 
-void add_earthwork(Survey& survey, double elevation, double cell_area) {
-    const double above = elevation - survey.grade;
-    (above > 0.0 ? survey.cut : survey.fill) += (above > 0.0 ? above : -above) * cell_area;
-}
+private:
+    double m_grade;
+    ExactSum m_cut;
+    ExactSum m_fill;
+};
+
+/// Area, elevations and slopes of the cells that count.
+class Measures {
+public:
+    void add(int x, int y, const CellRecord& record, double cell_area) {
+        ++m_cells;
+        const double elevation = record.point.elevation;
+        m_area.add(cell_area);
+        m_elevation.add(elevation * cell_area);
+        widen({elevation, x, y});
+        if ((record.flags & CellRecord::SLOPE_UNKNOWN) == 0) {
+            const auto slope = static_cast<double>(record.slope);
+            ++m_with_slope;
+            m_slope_area.add(cell_area);
+            m_slope.add(slope * cell_area);
+            m_steepest = std::max(m_steepest, slope);
+        }
+    }
+    void store(Survey& survey) const {
+        survey.inside = m_cells;
+        survey.with_slope = m_with_slope;
+        survey.area = m_area.value();
+        survey.lowest = m_lowest;
+        survey.highest = m_highest;
+        survey.mean_elevation = m_cells > 0 ? m_elevation.value() / m_area.value() : 0.0;
+        survey.mean_slope = m_with_slope > 0 ? m_slope.value() / m_slope_area.value() : 0.0;
+        survey.steepest = m_steepest;
+    }
+
+private:
+    /// The visit's order is the array's business; ties go to the southernmost, then westernmost cell.
+    void widen(const Extreme& cell) {
+        const auto place = [](const Extreme& e) { return std::tie(e.y, e.x); };
+        const auto ties = [&](const Extreme& e) {
+            return cell.elevation == e.elevation && place(cell) < place(e);
+        };
+        if (m_cells == 1 || cell.elevation < m_lowest.elevation || ties(m_lowest)) {
+            m_lowest = cell;
+        }
+        if (m_cells == 1 || cell.elevation > m_highest.elevation || ties(m_highest)) {
+            m_highest = cell;
+        }
+    }
+
+    std::int64_t m_cells = 0;
+    std::int64_t m_with_slope = 0;
+    ExactSum m_area;
+    ExactSum m_elevation;
+    ExactSum m_slope_area;
+    ExactSum m_slope;
+    Extreme m_lowest;
+    Extreme m_highest;
+    double m_steepest = 0.0;
+};
 
 }  // namespace
 
@@ -68,10 +124,8 @@ Survey survey_cells(WorkArea& area, const CellBox& view, const std::vector<geo_n
     const RowAreas areas(area, view);
     Survey survey;
     survey.grade_given = grade.has_value();
-    survey.grade = grade.value_or(0.0);
-    double elevation_sum = 0.0;
-    double slope_sum = 0.0;
-    double slope_area = 0.0;
+    Measures measures;
+    Earthwork earthwork(grade.value_or(0.0));
     std::pair<int, int> block;  // blocks come whole, one after the other
     Progress progress("Visiting", std::min(area.cells(), view.cells()));
     area.visit_selected([&](int x, int y, const CellRecord& record) {
@@ -88,35 +142,20 @@ Survey survey_cells(WorkArea& area, const CellBox& view, const std::vector<geo_n
         if (!filter.inside_boundary(record.point)) {
             return;
         }
-        ++survey.inside;
-        const double cell_area = areas[y];
-        const double elevation = record.point.elevation;
-        survey.area += cell_area;
-        elevation_sum += elevation * cell_area;
-        widen(survey, {elevation, x, y});
-        if ((record.flags & CellRecord::SLOPE_UNKNOWN) == 0) {
-            const auto slope = static_cast<double>(record.slope);
-            ++survey.with_slope;
-            slope_area += cell_area;
-            slope_sum += slope * cell_area;
-            survey.steepest = std::max(survey.steepest, slope);
-        }
+        measures.add(x, y, record, areas[y]);
         if (grade) {
-            add_earthwork(survey, elevation, cell_area);
+            earthwork.add(record.point.elevation, areas[y]);
         }
     });
-    if (survey.inside == 0) {
-        return survey;
-    }
-    survey.mean_elevation = elevation_sum / survey.area;
-    survey.mean_slope = slope_area > 0.0 ? slope_sum / slope_area : 0.0;
-    if (!grade) {
-        survey.grade = survey.mean_elevation;
+    measures.store(survey);
+    if (!grade && survey.inside > 0) {
+        earthwork = Earthwork(survey.mean_elevation);
         area.visit_selected([&](int x, int y, const CellRecord& record) {
             if (filter.in_view(x, y) && filter.inside_boundary(record.point)) {
-                add_earthwork(survey, record.point.elevation, areas[y]);
+                earthwork.add(record.point.elevation, areas[y]);
             }
         });
     }
+    earthwork.store(survey);
     return survey;
 }

@@ -21,8 +21,8 @@ SyntheticTerrain::SyntheticTerrain(std::int64_t cells) : m_cells_left(cells) {
     m_frame.south = 36.5;
     m_frame.cell_size = 1e-5;
     for (int x = 0; x < m_frame.columns; ++x) {
-        m_ridges.push_back(80.0 * wave(x, 1370.0));
-        m_knolls.push_back(20.0 * wave(x, 211.0));
+        m_ridges.push_back(60.0 * wave(x, 1370.0));
+        m_knolls.push_back(6.0 * wave(x, 211.0));
     }
 }
 

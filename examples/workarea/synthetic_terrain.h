@@ -7,7 +7,7 @@
 
 #include "terrain_source.h"
 
-/// Smooth hills between 200 and 400 m over a nearly square grid of cells of 0.00001 degrees, the same on
+/// Smooth hills between 230 and 370 m over a nearly square grid of cells of 0.00001 degrees, the same on
 /// every run. Exactly `cells` cells have an elevation: the southernmost row may end early.
 class SyntheticTerrain : public TerrainSource {
 public:

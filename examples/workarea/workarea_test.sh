@@ -2,9 +2,9 @@
 # The program from the outside: figures against what awk makes of the same files, and every refusal.
 # Usage: workarea_test.sh PROGRAM DATA_DIRECTORY
 set -u
-program=$1
-terrain=$2/jacksboro.asc
-boundary=$2/boundary.csv
+program=$(realpath "$1")
+terrain=$(realpath "$2")/jacksboro.asc
+boundary=$(realpath "$2")/boundary.csv
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 cd "$work" || exit 1
@@ -260,6 +260,7 @@ for cells in 1 2 3 1000 100003; do
     is "Cells counted" $cells
 done
 near "Mean elevation" 300 100
+near "Cut less fill" 0 0
 
 if [ -w /dev/full ]; then
     "$program" plain.asc >/dev/full 2>err

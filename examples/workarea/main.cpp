@@ -1,0 +1,127 @@
+// Area, elevations, slope and earthwork of a work area, computed over a sparse array of terrain cells.
+
+#include <basalt/version.h>
+
+#include <cerrno>
+#include <chrono>
+#include <cstdio>
+#include <exception>
+#include <memory>
+#include <new>
+#include <string>
+#include <system_error>
+#include <vector>
+
+#include "boundary_reader.h"
+#include "esri_grid_reader.h"
+#include "input_error.h"
+#include "options.h"
+#include "process.h"
+#include "report.h"
+#include "survey.h"
+#include "synthetic_terrain.h"
+#include "terrain_loader.h"
+#include "view.h"
+#include "work_area.h"
+
+namespace {
+
+enum ExitCode { SUCCESS = 0, FAILURE = 1, BAD_INPUT = 2 };
+
+std::unique_ptr<TerrainSource> open_terrain(const Options& options) {
+    if (options.synthetic) {
+        return std::make_unique<SyntheticTerrain>(*options.synthetic);
+    }
+    return std::make_unique<EsriGridReader>(options.terrain);
+}
+
+std::vector<geo_nee> in_plane(const std::vector<Place>& places, const LocalPlane& plane) {
+    std::vector<geo_nee> points;
+    points.reserve(places.size());
+    for (const Place& place : places) {
+        points.push_back(plane.to_grid(place.longitude, place.latitude, GEO_NULL));
+    }
+    return points;
+}
+
+template <typename Work>
+double seconds_for(Work work) {
+    const auto start = std::chrono::steady_clock::now();
+    work();
+    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+}
+
+/// Why no cell counts, for the message.
+std::string nothing_found(const Options& options, const Survey& survey) {
+    if (survey.in_view > 0) {
+        return *options.boundary + ": no cell of the view lies inside the boundary";
+    }
+    return options.terrain + ": no cell " + (options.view ? "of the view " : "") + "has an elevation";
+}
+
+std::string measure(const Options& options) {
+    // Small inputs first: a mistake in them is told before a large terrain is read.
+    const std::vector<Place> places =
+        options.boundary ? read_boundary(*options.boundary) : std::vector<Place>();
+    const std::unique_ptr<TerrainSource> terrain = open_terrain(options);
+    const CellBox view =
+        options.view ? cells_in_view(terrain->frame(), *options.view) : whole_grid(terrain->frame());
+
+    WorkArea area(terrain->frame());
+    const std::vector<geo_nee> boundary = in_plane(places, area.plane());
+    Outcome outcome{options, area, boundary, view, {}, {}, 0.0, 0.0, std::nullopt, std::nullopt};
+    const std::optional<std::int64_t> memory_before = resident_memory();
+    outcome.load = load_terrain(*terrain, area);
+    const std::optional<std::int64_t> memory_after = resident_memory();
+    if (memory_before && memory_after) {
+        outcome.memory_grown = *memory_after - *memory_before;
+    }
+
+    outcome.select_seconds = seconds_for([&] { area.select(view); });
+    outcome.visit_seconds =
+        seconds_for([&] { outcome.survey = survey_cells(area, view, boundary, options.grade); });
+    if (outcome.survey.inside == 0) {
+        throw InputError(nothing_found(options, outcome.survey));
+    }
+    outcome.memory_peak = peak_resident_memory();
+    return write_report(outcome);
+}
+
+std::string run(const std::vector<std::string>& arguments) {
+    const Options options = parse_options(arguments);
+    if (options.help) {
+        return USAGE;
+    }
+    if (options.version) {
+        return "workarea " BASALT_VERSION "\n";
+    }
+    return measure(options);
+}
+
+int complain(const std::string& message, ExitCode code) {
+    std::fprintf(stderr, "workarea: %s\n", message.c_str());
+    return code;
+}
+
+/// A full disk shows only when the buffer is flushed.
+int print(const std::string& text) {
+    if (std::fwrite(text.data(), 1, text.size(), stdout) != text.size() || std::fflush(stdout) != 0) {
+        return complain("cannot write to standard output: " + std::generic_category().message(errno),
+                        FAILURE);
+    }
+    return SUCCESS;
+}
+
+}  // namespace
+
+int main(int count, char** arguments) {
+    try {
+        return print(run(std::vector<std::string>(arguments + (count > 0 ? 1 : 0), arguments + count)));
+    } catch (const InputError& error) {
+        return complain(error.what(), BAD_INPUT);
+    } catch (const std::bad_alloc&) {
+        return complain("out of memory", FAILURE);
+    } catch (const std::exception& error) {
+        return complain(error.what(), FAILURE);
+    }
+}

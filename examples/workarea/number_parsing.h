@@ -1,0 +1,48 @@
+// Numbers from text the same way in every locale.
+#ifndef WORKAREA_NUMBER_PARSING_H
+#define WORKAREA_NUMBER_PARSING_H
+
+#include <charconv>
+#include <cmath>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+
+/// The number that `text` as a whole spells (`-1.5`, `+2e3`, also `nan` and `inf`); nothing if it spells none
+/// or one outside the range of the type.
+template <typename Number>
+std::optional<Number> parse_any_number(std::string_view text) {
+    // from_chars knows no leading plus, which surveying exports like to write.
+    if (text.size() > 1 && text[0] == '+' && text[1] != '-' && text[1] != '+') {
+        text.remove_prefix(1);
+    }
+    Number value{};
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
+    if (error != std::errc() || end != text.data() + text.size()) {
+        return std::nullopt;
+    }
+    return value;
+}
+
+/// As parse_any_number, finite numbers only.
+inline std::optional<double> parse_number(std::string_view text) {
+    const std::optional<double> value = parse_any_number<double>(text);
+    return value && std::isfinite(*value) ? value : std::nullopt;
+}
+
+inline std::optional<std::int64_t> parse_integer(std::string_view text) {
+    return parse_any_number<std::int64_t>(text);
+}
+
+/// `text` in quotes for a message: shortened, and nothing in it that could disturb a terminal.
+inline std::string quoted(std::string_view text) {
+    constexpr std::size_t LONGEST = 40;
+    std::string shown = "'";
+    for (const char c : text.substr(0, LONGEST)) {
+        shown += (c >= ' ' && c <= '~') ? c : '?';
+    }
+    return shown + (text.size() > LONGEST ? "...'" : "'");
+}
+
+#endif

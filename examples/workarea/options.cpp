@@ -1,0 +1,141 @@
+#include "options.h"
+
+#include <cmath>
+#include <string_view>
+#include <utility>
+
+#include "input_error.h"
+#include "number_parsing.h"
+#include "synthetic_terrain.h"
+
+const char* const USAGE =
+    "Usage: workarea TERRAIN.asc [OPTION]...\n"
+    "       workarea --synthetic N [OPTION]...\n"
+    "\n"
+    "Reads a terrain (an ESRI ASCII grid in geographic degrees), keeps its cells in a sparse array, and "
+    "reports\n"
+    "area, elevations, slope and earthwork of the cells inside a view and a boundary.\n"
+    "\n"
+    "  --boundary FILE      count only cells whose centre lies inside this polygon; one longitude,latitude a "
+    "line\n"
+    "  --view W,S,E,N       count only cells whose centre lies in this rectangle, edges included, in "
+    "degrees\n"
+    "                       (default: the whole grid)\n"
+    "  --grade ELEVATION    cut and fill against this elevation in metres (default: the mean elevation)\n"
+    "  --synthetic N        a generated terrain of N cells, at most 100000000, instead of a file\n"
+    "  --help               print this and exit\n"
+    "  --version            print the version and exit\n"
+    "\n"
+    "Exit status: 0 success, 1 the report could not be written or memory ran out, 2 bad arguments or "
+    "input.\n";
+
+namespace {
+
+DegreeBox parse_view(std::string_view text) {
+    const std::string given(text);
+    double value[4] = {};
+    for (int i = 0; i < 4; ++i) {
+        const std::size_t comma = text.find(',');
+        const std::optional<double> number = parse_number(text.substr(0, comma));
+        if (!number || (comma == std::string_view::npos) != (i == 3)) {
+            throw InputError("--view takes four numbers W,S,E,N, not " + quoted(given));
+        }
+        value[i] = *number;
+        text.remove_prefix(i == 3 ? text.size() : comma + 1);
+    }
+    const DegreeBox box = {value[0], value[1], value[2], value[3]};
+    if (!(box.west < box.east)) {
+        throw InputError("--view " + quoted(given) + ": W must be less than E");
+    }
+    if (!(box.south < box.north)) {
+        throw InputError("--view " + quoted(given) + ": S must be less than N");
+    }
+    return box;
+}
+
+double parse_grade(std::string_view text) {
+    const std::optional<double> value = parse_number(text);
+    if (!value || std::abs(*value) > LARGEST_ELEVATION) {
+        throw InputError("--grade takes an elevation in metres, not " + quoted(text));
+    }
+    return *value;
+}
+
+std::int64_t parse_cells(std::string_view text) {
+    const std::optional<std::int64_t> cells = parse_integer(text);
+    if (!cells || *cells < 1 || *cells > SyntheticTerrain::LARGEST) {
+        throw InputError("--synthetic takes a whole number from 1 to " +
+                         std::to_string(SyntheticTerrain::LARGEST) + ", not " + quoted(text));
+    }
+    return *cells;
+}
+
+/// Stores a value once.
+template <typename Value>
+void set_once(std::optional<Value>& option, Value value, std::string_view name) {
+    if (option) {
+        throw InputError("option " + std::string(name) + " is given twice");
+    }
+    option = std::move(value);
+}
+
+void set_option(Options& options, std::string_view name, const std::string& value) {
+    if (name == "--boundary") {
+        set_once(options.boundary, value, name);
+    } else if (name == "--view") {
+        set_once(options.view, parse_view(value), name);
+    } else if (name == "--grade") {
+        set_once(options.grade, parse_grade(value), name);
+    } else {
+        set_once(options.synthetic, parse_cells(value), name);
+    }
+}
+
+bool takes_value(std::string_view name) {
+    return name == "--boundary" || name == "--view" || name == "--grade" || name == "--synthetic";
+}
+
+}  // namespace
+
+Options parse_options(const std::vector<std::string>& arguments) {
+    Options options;
+    bool only_files = false;
+    for (std::size_t i = 0; i < arguments.size(); ++i) {
+        const std::string& argument = arguments[i];
+        if (!only_files && argument == "--") {
+            only_files = true;
+        } else if (only_files || argument.size() < 2 || argument[0] != '-') {
+            if (argument.empty()) {
+                throw InputError("the terrain's file name is empty");
+            }
+            if (!options.terrain.empty()) {
+                throw InputError("one terrain file only, but " + quoted(argument) + " is a second one");
+            }
+            options.terrain = argument;
+        } else if (argument == "--help") {
+            options.help = true;
+            return options;
+        } else if (argument == "--version") {
+            options.version = true;
+            return options;
+        } else {
+            const std::size_t equals = argument.find('=');
+            const std::string name = argument.substr(0, equals);
+            if (!takes_value(name)) {
+                throw InputError("unknown option " + quoted(argument) + " (--help lists them)");
+            }
+            if (equals == std::string::npos && i + 1 == arguments.size()) {
+                throw InputError("option " + name + " needs a value");
+            }
+            set_option(options, name,
+                       equals != std::string::npos ? argument.substr(equals + 1) : arguments[++i]);
+        }
+    }
+    if (options.terrain.empty() && !options.synthetic) {
+        throw InputError("no terrain file given (--help shows how)");
+    }
+    if (!options.terrain.empty() && options.synthetic) {
+        throw InputError("--synthetic replaces the terrain file; both are given");
+    }
+    return options;
+}

@@ -1,0 +1,34 @@
+#include "progress.h"
+
+#include <algorithm>
+#include <cstdio>
+#include <utility>
+
+#include "process.h"
+
+Progress::Progress(std::string step, std::int64_t total)
+    : m_step(std::move(step)),
+      m_total(std::max<std::int64_t>(total, 1)),
+      m_on_terminal(standard_error_is_terminal()),
+      m_next(Clock::now() + std::chrono::milliseconds(500)) {}
+
+Progress::~Progress() {
+    if (m_shown) {
+        std::fputs("\r\033[K", stderr);
+    }
+}
+
+void Progress::update(std::int64_t done) {
+    if (!m_on_terminal) {
+        return;
+    }
+    const Clock::time_point now = Clock::now();
+    if (now < m_next) {
+        return;
+    }
+    m_next = now + std::chrono::milliseconds(100);
+    m_shown = true;
+    const int percent = static_cast<int>(100.0 * static_cast<double>(done) / static_cast<double>(m_total));
+    std::fprintf(stderr, "\r\033[K%s %d %%", m_step.c_str(), percent);
+    std::fflush(stderr);
+}

@@ -1,0 +1,31 @@
+// The report an engineer reads.
+#ifndef WORKAREA_REPORT_H
+#define WORKAREA_REPORT_H
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "boundary_reader.h"
+#include "options.h"
+#include "survey.h"
+#include "terrain_loader.h"
+
+/// Everything the report speaks of.
+struct Outcome {
+    const Options& options;
+    const WorkArea& area;
+    const std::vector<geo_nee>& boundary;  ///< in the local plane; empty without one
+    CellBox view;
+    Survey survey;
+    LoadTimes load;
+    double select_seconds;
+    double visit_seconds;
+    std::optional<std::int64_t> memory_grown;  ///< resident bytes, by loading
+    std::optional<std::int64_t> memory_peak;   ///< resident bytes
+};
+
+std::string write_report(const Outcome& outcome);
+
+#endif

@@ -1,0 +1,289 @@
+#!/usr/bin/env bash
+# The program from the outside: figures against what awk makes of the same files, and every refusal.
+# Usage: workarea_test.sh PROGRAM DATA_DIRECTORY
+set -u
+program=$(realpath "$1")
+terrain=$(realpath "$2")/jacksboro.asc
+boundary=$(realpath "$2")/boundary.csv
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+cd "$work" || exit 1
+failures=0
+
+fail() {
+    echo "FAILED: $*"
+    failures=$((failures + 1))
+}
+
+# run ARGUMENT...: report in `out`, messages in `err`, exit code in `code`
+run() {
+    "$program" "$@" >out 2>err
+    code=$?
+}
+
+succeeds() {
+    run "$@"
+    [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
+}
+
+# figure LABEL: the first number on the report's line that begins with the label, separators removed
+figure() {
+    awk -v label="$1" 'index($0, "  " label) == 1 {
+        rest = substr($0, length(label) + 3); gsub(",", "", rest); split(rest, word, " "); print word[1]; exit }' out
+}
+
+# near LABEL EXPECTED TOLERANCE
+near() {
+    awk -v a="$(figure "$1")" -v b="$2" -v t="$3" 'BEGIN { exit !(a != "" && a - b <= t && b - a <= t) }' ||
+        fail "$1: $(figure "$1"), expected $2"
+}
+
+# is LABEL EXPECTED
+is() {
+    [ "$(figure "$1")" = "$2" ] || fail "$1: $(figure "$1"), expected $2"
+}
+
+# refused MESSAGE ARGUMENT...: one line that ends so, nothing on standard output, exit code 2
+refused() {
+    local message=$1
+    shift
+    run "$@"
+    [ $code -eq 2 ] || fail "exit $code, not 2, from $*"
+    [ ! -s out ] || fail "output from $*"
+    [ "$(cat err)" = "workarea: $message" ] || fail "$*: $(cat err); expected: $message"
+}
+
+# model VIEW GRADE [BOUNDARY]: count, minimum, maximum, mean, area, slope %, cut and fill of the sample terrain.
+# The whole grid is held, so slopes and positions come straight from their definitions; the boundary test counts
+# windings, not crossings.
+model() {
+    awk -v view="$1" -v grade="$2" -v boundary="${3:-}" -v OFMT=%.12g '
+        function left(i, j) { return (bx[j] - bx[i]) * (lat - by[i]) - (lon - bx[i]) * (by[j] - by[i]) }
+        function winding(   i, j, w) {
+            for (i = 0; i < n; i++) {
+                j = (i + 1) % n
+                if (by[i] <= lat && by[j] > lat && left(i, j) > 0) w++
+                if (by[i] > lat && by[j] <= lat && left(i, j) < 0) w--
+            }
+            return w
+        }
+        BEGIN {
+            rows = n = 0
+            while (boundary != "" && (getline line < boundary) > 0)
+                if (line ~ /^-/) { split(line, p, ","); bx[n] = p[1] + 0; by[n++] = p[2] + 0 }
+            split(view, v, ",")
+        }
+        NF == 2 { head[$1] = $2; next }
+        { for (x = 1; x <= NF; x++) z[rows, x] = $x; columns = NF; rows++ }
+        END {
+            pi = atan2(0, -1); size = head["cellsize"]; e2 = 0.00669437999014
+            middle = (head["yllcorner"] + rows * size / 2) * pi / 180
+            w = sqrt(1 - e2 * sin(middle) ^ 2)
+            dn = 6378137 * (1 - e2) / w ^ 3 * size * pi / 180
+            de = 6378137 / w * cos(middle) * size * pi / 180
+            for (r = 0; r < rows; r++) for (x = 1; x <= columns; x++) {
+                lon = head["xllcorner"] + (x - 0.5) * size
+                lat = head["yllcorner"] + (rows - r - 0.5) * size
+                if (lon < v[1] || lat < v[2] || lon > v[3] || lat > v[4] || (n && !winding())) continue
+                h = z[r, x]; count++; sum += h
+                if (count == 1 || h < low) low = h
+                if (count == 1 || h > high) high = h
+                if (h > grade) cut += h - grade; else fill += grade - h
+                a = x > 1 ? x - 1 : x; b = x < columns ? x + 1 : x
+                c = r > 0 ? r - 1 : r; d = r < rows - 1 ? r + 1 : r
+                slope += sqrt(((z[r, b] - z[r, a]) / ((b - a) * de)) ^ 2 + ((z[c, x] - z[d, x]) / ((d - c) * dn)) ^ 2)
+            }
+            print count, low, high, sum / count, count * de * dn, 100 * slope / count, cut * de * dn, fill * de * dn
+        }' "$terrain"
+}
+
+# matches COUNT LOW HIGH MEAN AREA SLOPE CUT FILL
+matches() {
+    is "Cells counted" "$1"
+    near "Lowest" "$2" 0
+    near "Highest" "$3" 0
+    near "Mean elevation" "$4" 0.000501
+    near "Area" "$5" 0.1
+    near "Mean slope" "$6" 0.00501
+    near "Cut " "$7" 2
+    near "Fill" "$8" 2
+}
+
+everything=-90,30,-80,40
+window=-84.3,36.5,-84.2,36.6
+
+succeeds "$terrain" --grade 500
+matches $(model $everything 500)
+is "Grid" 138632
+is "Cells with elevation" 138632
+is "Blocks selected" 572 # 26 x 22
+is "Grade" 500.000
+succeeds "$terrain" --view $everything # cut to the grid
+is "Cells counted" 138632
+
+succeeds "$terrain" --view $window --grade=612.5
+matches $(model $window 612.5)
+is "Cells in view" "$(figure "Cells counted")"
+
+succeeds "$terrain" --boundary "$boundary" --grade 500
+matches $(model $everything 500 "$boundary")
+
+succeeds "$terrain" --boundary "$boundary" --view $window
+mean=$(model $window 0 "$boundary" | cut -d' ' -f4)
+matches $(model $window "$mean" "$boundary")
+near "Grade" "$(figure "Mean elevation")" 0
+near "Cut less fill" 0 0
+grep -q "the mean elevation (no --grade given)" out || fail "the default grade is not named"
+
+# A 4 x 3 grid at the equator with one cell missing, in the forms the format allows. 10, 20, ... 110 has mean 60.
+cat >plain.asc <<'GRID'
+ncols 4
+nrows 3
+xllcorner 10
+yllcorner -1.5
+cellsize 1
+NODATA_value -1
+10 20 30 40
+50 60 70 80
+90 100 110 -1
+GRID
+sed 's/^\(.*\)$/\1\r/' plain.asc >crlf.asc
+{ printf '\xef\xbb\xbf'; sed -n 6p plain.asc; sed -n 5p plain.asc; echo "YLLCENTER -1"; echo "XllCenter +10.5"; echo; \
+    echo "NROWS 3"; echo " nCols   4"; sed -n '7,$p' plain.asc; printf '\n\n'; } >shuffled.asc
+sed '/NODATA/d; s/-1$/-9999/' plain.asc | head -c -1 >default.asc
+sed 's/-1$/nan/; s/^10 /nan /' plain.asc >nan.asc
+succeeds plain.asc
+sed '/Source/d; /^Store/,$d' out >expected
+for form in crlf shuffled default; do
+    succeeds $form.asc
+    sed '/Source/d; /^Store/,$d' out | cmp -s - expected || fail "$form.asc reads otherwise than plain.asc"
+done
+is "Cells counted" 11
+is "Mean elevation" 60.000
+is "Steepest slope" 0.04 # 40 m over one degree north
+grep -q "Highest *110.000 m  at 12.500000, -1.000000" out || fail "the highest cell is elsewhere"
+succeeds nan.asc
+is "Cells counted" 10
+succeeds plain.asc --view 10.5,-1,11.5,0 # edges through cell centres
+is "Cells counted" 4
+
+sed '7,$s/[0-9-]\+/5/g' plain.asc >flat.asc
+succeeds flat.asc # ties go south, then west
+grep -q "Lowest *5.000 m  at 10.500000, -1.000000" out || fail "the lowest of equal cells is elsewhere"
+grep -q "Highest *5.000 m  at 10.500000, -1.000000" out || fail "the highest of equal cells is elsewhere"
+sed 's/cellsize 1/cellsize 1e-9/' plain.asc >tiny.asc
+succeeds tiny.asc --grade 100
+is "Cut less fill" 0 # not -0
+
+# Bad terrains. edit SCRIPT: plain.asc changed by sed into bad.asc
+edit() { sed "$1" plain.asc >bad.asc; }
+edit 's/60/6O/'; refused "bad.asc:8:4: '6O' is not a number" bad.asc
+edit 's/60/60,5/'; refused "bad.asc:8:4: '60,5' is not a number" bad.asc
+edit 's/60/inf/'; refused "bad.asc:8:4: 'inf' is no elevation in metres, nor the header's NODATA_value" bad.asc
+edit 's/60/-32768/'; refused "bad.asc:8:4: '-32768' is no elevation in metres, nor the header's NODATA_value" bad.asc
+edit 's/60 //'; refused "bad.asc:8:9: the row ends after 3 of 4 values" bad.asc
+edit 's/60/60 65/'; refused "bad.asc:8:13: more values than ncols says (4)" bad.asc
+edit '$d'; refused "bad.asc:9: the file ends after 2 of 3 rows" bad.asc
+edit '$s/$/\n1 2 3 4/'; refused "bad.asc:10: more rows than nrows says (3)" bad.asc
+edit '7,$d'; refused "bad.asc:7: the file ends after 0 of 3 rows" bad.asc
+edit 's/ncols 4/ncols 2000000000/; s/cellsize 1/cellsize 1e-9/'
+refused "bad.asc:7:12: the row ends after 4 of 2000000000 values" bad.asc
+edit 's/ncols 4/ncols 4.5/'; refused "bad.asc:1:7: ncols must be a whole number from 1 to 2147483647, not '4.5'" bad.asc
+edit 's/nrows 3/nrows 0/'; refused "bad.asc:2:7: nrows must be a whole number from 1 to 2147483647, not '0'" bad.asc
+edit 's/size 1/size -1/'; refused "bad.asc:5:10: cellsize must be 1e-9 degrees or more, not '-1'" bad.asc
+edit 's/corner 10/corner ten/'; refused "bad.asc:3:11: xllcorner must be a number, not 'ten'" bad.asc
+edit 's/corner 10/corner/'; refused "bad.asc:3:10: header key xllcorner has no value" bad.asc
+edit 's/corner 10/corner 10 11/'; refused "bad.asc:3:14: header key xllcorner has more than one value" bad.asc
+edit '2s/$/\nncols 4/'; refused "bad.asc:3:1: header key ncols is given twice" bad.asc
+edit '2s/$/\ncolour red/'; refused "bad.asc:3:1: unknown header key 'colour'" bad.asc
+edit '/cellsize/d'; refused "bad.asc:6: the header lacks cellsize" bad.asc
+edit '/xll/d'; refused "bad.asc:6: the header lacks xllcorner or xllcenter" bad.asc
+edit '2s/$/\nyllcenter 1/'; refused "bad.asc:8: the header gives both yllcorner and yllcenter" bad.asc
+edit 's/-1.5/4071000/'; refused "bad.asc: the grid's corner and cell size are not geographic degrees" bad.asc
+edit 's/-1.5/86.99/; s/cellsize 1/cellsize 2/'; refused "bad.asc: the grid's corner and cell size are not geographic degrees" bad.asc
+edit 's/-1.5/89.9/; s/cellsize 1/cellsize 0.01/'
+refused "bad.asc: the grid's middle is within a degree of a pole, where a local scale fails" bad.asc
+edit '7,$s/[0-9-]\+/-1/g'; refused "bad.asc: no cell has an elevation" bad.asc
+: >bad.asc; refused "bad.asc:1: the header lacks ncols" bad.asc
+head -c 5000 /dev/zero >bad.asc
+refused "bad.asc:1:1: not text: '????????????????????????????????????????...' has no end" bad.asc
+refused "nowhere.asc: cannot be opened: No such file or directory" nowhere.asc
+refused ".: cannot be read: Is a directory" .
+
+{ printf '\xef\xbb\xbf'; sed 's/ncols/mcols/' plain.asc; } >bad.asc
+refused "bad.asc:1:1: unknown header key 'mcols'" bad.asc
+{ sed 's/ncols 4/ncols 200000/; s/nrows 3/nrows 1/; s/cellsize 1/cellsize 1e-6/; 7,$d' plain.asc
+    awk 'BEGIN { for (i = 1; i < 200000; i++) printf "1000 "; print "?" }'; } >bad.asc # a row longer than a piece
+refused "bad.asc:7:999996: '?' is not a number" bad.asc
+
+# Boundaries. 10,-1.5 to 12,0.5 holds the two western columns of the two southern rows.
+border() { printf "$1" >border.csv; }
+border 'x,y\r\n# corner posts\r\n 10 , -1.5 # first\r\n\r\n12,-1.5\r\n+12,0.5\r\n10,0.5\r\n10,-1.5\r\n'
+succeeds plain.asc --boundary border.csv
+is "Cells counted" 4
+is "Boundary vertices" 4
+is "Mean elevation" 75.000
+border '10,-1.5\n12,-1.5\n'
+refused "border.csv:3: a boundary needs three points or more, not 2" plain.asc --boundary border.csv
+border '10,-1.5\n12,-1.5\n10,-1.5'
+refused "border.csv:3: a boundary needs three points or more, not 2" plain.asc --boundary border.csv
+border '10,0\n11,1\n12,2\n'
+refused "border.csv:4: the boundary's points lie in one line and enclose nothing" plain.asc --boundary border.csv
+border '10,0\n11,east\n12,2\n'
+refused "border.csv:2: latitude 'east' is not a number" plain.asc --boundary border.csv
+border '10,0\n,1\n12,2\n'
+refused "border.csv:2: longitude '' is not a number" plain.asc --boundary border.csv
+border '10,0\n11\n12,2\n'
+refused "border.csv:2: expected longitude,latitude but found '11'" plain.asc --boundary border.csv
+border '10,0\n11,2,300\n12,2\n'
+refused "border.csv:2: expected longitude,latitude but found '11,2,300'" plain.asc --boundary border.csv
+border '10,0\n11,91\n12,2\n'
+refused "border.csv:2: latitude '91' is not in degrees" plain.asc --boundary border.csv
+border '50,0\n51,0\n51,1\n'
+refused "border.csv: no cell of the view lies inside the boundary" plain.asc --boundary border.csv
+refused "none.csv: cannot be opened: No such file or directory" plain.asc --boundary none.csv
+
+# The command line
+refused "no terrain file given (--help shows how)"
+refused "unknown option '--colour' (--help lists them)" plain.asc --colour
+refused "unknown option '-v' (--help lists them)" -v
+refused "option --view needs a value" plain.asc --view
+refused "option --boundary needs a value" plain.asc --boundary
+refused "option --grade is given twice" plain.asc --grade 1 --grade 2
+refused "one terrain file only, but 'b.asc' is a second one" a.asc b.asc
+refused "--grade takes an elevation in metres, not '5m'" plain.asc --grade 5m
+refused "--view takes four numbers W,S,E,N, not '1,2,3'" plain.asc --view 1,2,3
+refused "--view takes four numbers W,S,E,N, not '1,2,3,4,5'" plain.asc --view 1,2,3,4,5
+refused "--view takes four numbers W,S,E,N, not '1,2,3,nan'" plain.asc --view 1,2,3,nan
+refused "--view '11,-1,11,1': W must be less than E" plain.asc --view 11,-1,11,1
+refused "--view '10,1,11,-1': S must be less than N" plain.asc --view 10,1,11,-1
+refused "--view lies outside the grid, which is 10.000000,-1.500000,14.000000,1.500000" plain.asc --view 20,0,21,1
+refused "--view is too small: no cell centre lies in it" plain.asc --view 10.6,0,10.7,1
+refused "plain.asc: no cell of the view has an elevation" plain.asc --view 13,-1.5,14,-0.5
+refused "--synthetic takes a whole number from 1 to 100000000, not '0'" --synthetic 0
+refused "--synthetic takes a whole number from 1 to 100000000, not '1e3'" --synthetic 1e3
+refused "--synthetic replaces the terrain file; both are given" plain.asc --synthetic 10
+cp plain.asc -- -odd.asc
+succeeds -- -odd.asc
+succeeds --help
+grep -q '^Usage: workarea' out || fail "--help shows no usage"
+succeeds --version
+grep -Eq '^workarea [0-9]+\.[0-9]+\.[0-9]+$' out || fail "--version shows no version"
+
+for cells in 1 2 3 1000 100003; do
+    succeeds --synthetic $cells
+    is "Cells counted" $cells
+done
+near "Mean elevation" 300 100
+near "Cut less fill" 0 0
+
+if [ -w /dev/full ]; then
+    "$program" plain.asc >/dev/full 2>err
+    code=$?
+    [ $code -eq 1 ] || fail "exit $code, not 1, on a full disk"
+    [ "$(cat err)" = "workarea: cannot write to standard output: No space left on device" ] ||
+        fail "on a full disk: $(cat err)"
+fi
+
+[ $failures -eq 0 ] && echo "all passed"
+exit $((failures != 0))

@@ -1,5 +1,4 @@
 // Message texts of error codes: FormatMessageW and LocalFree, for the one use this project has for them.
-// System message texts.
 #ifndef BASALT_SRC_PLATFORM_ERROR_MESSAGE_H
 #define BASALT_SRC_PLATFORM_ERROR_MESSAGE_H
 
@@ -27,8 +26,5 @@ DWORD FormatMessageW(DWORD flags, const void* source, DWORD code, DWORD language
 // Releases a buffer of FormatMessageW; null is allowed. Result: null, always.
 // Threads: thread-safe.
 void* LocalFree(void* block);
-DWORD FormatMessageW(DWORD flags, const void* source, DWORD code, DWORD language, wchar_t** buffer,
-                     DWORD size, void* arguments);
-void* LocalFree(void* memory);
 
 #endif

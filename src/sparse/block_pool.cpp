@@ -4,10 +4,12 @@
 #include <cstring>
 #include <limits>
 
-#include "src/platform/large_pages.h"
+#include "src/platform/pages.h"
 
 namespace vex_util {
 namespace {
+
+using basalt::platform::LARGE_PAGE;
 
 constexpr std::size_t CACHE_LINE = 64;
 
@@ -32,17 +34,18 @@ void BlockPool::AddSlab() {
     const std::size_t blockBytes = BlockBytes();
     std::size_t bytes = std::max(blockBytes, m_bytes / GROWTH_DIVISOR);
     std::align_val_t alignment{CACHE_LINE};
-    if (bytes >= basalt::platform::LARGE_PAGE_BYTES / 4) {
+    const bool large = bytes >= LARGE_PAGE / 4;
+    if (large) {
         // Page faults on ordinary pages would cost more than everything an insertion does.
-        bytes = (bytes + basalt::platform::LARGE_PAGE_BYTES - 1) & ~(basalt::platform::LARGE_PAGE_BYTES - 1);
-        alignment = std::align_val_t{basalt::platform::LARGE_PAGE_BYTES};
+        bytes = (bytes + LARGE_PAGE - 1) & ~(LARGE_PAGE - 1);
+        alignment = std::align_val_t{LARGE_PAGE};
     }
     if (m_slabs.size() == m_slabs.capacity()) {
         m_slabs.reserve(2 * m_slabs.size() + 8);
     }
     void* const memory = ::operator new[](bytes, alignment);
-    if (alignment == std::align_val_t{basalt::platform::LARGE_PAGE_BYTES}) {
-        basalt::platform::advise_large_pages(memory, bytes);
+    if (large) {
+        basalt::platform::prefer_large_pages(static_cast<std::byte*>(memory), bytes);
     }
     m_slabs.push_back({memory, bytes, alignment});
     m_next = static_cast<char*>(memory);

@@ -199,6 +199,7 @@ bool exercise(bool& sound_throughout) {
                 blocks.push_back(block);
                 if (void* larger = heap.resize(block, 2 * size + MIB / 2)) {
                     blocks.back() = larger;
+                    static_cast<char*>(larger)[2 * size + MIB / 2 - 1] = 1;  // up to its end
                 } else {
                     refused = true;
                 }

@@ -304,14 +304,16 @@ TEST(Heap, TellsWhatIsNoLiveBlock) {
     const Heap other(0);
     auto* first = static_cast<char*>(heap.take(100));
     auto* second = static_cast<char*>(heap.take(100));
+    void* third = heap.take(100);
     void* foreign = other.take(100);
     void* large = heap.take(4 * MIB);
     EXPECT_EQ(heap.free(nullptr), 1);
     EXPECT_EQ(heap.free(second), 1);
+    EXPECT_EQ(heap.free(third), 1) << "joins the one before";
     EXPECT_EQ(heap.free(large), 1);
     int local = 0;
     for (void* wrong :
-         {static_cast<void*>(second), large, static_cast<void*>(first + 16), foreign,
+         {static_cast<void*>(second), third, large, static_cast<void*>(first + 16), foreign,
           static_cast<void*>(first + 1), static_cast<void*>(first - 16), static_cast<void*>(&local)}) {
         SetLastError(ERROR_SUCCESS);
         EXPECT_EQ(heap.free(wrong), 0);

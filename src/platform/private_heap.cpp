@@ -230,7 +230,7 @@ void PrivateHeap::put_back(Block* block, const Region& region) {
     std::size_t size = size_of(head);
     std::uint64_t last = head & LAST_OF_REGION;
     forbid_access(block, size);  // the head too: the end cut off a block had none
-    set_head(block, size);  // whatever becomes of it, it is no live block any more
+    set_head(block, size);       // whatever becomes of it, it is no live block any more
     if (last == 0) {
         Block* after = successor(block, size);
         const std::uint64_t head_after = head_of(after);

@@ -28,6 +28,9 @@ public:
             add_slab();
     }
 
+    // How many more nodes take() gives before the pool has to grow.
+    std::size_t spare() const { return m_spare; }
+
     // Asks for a reserved node; its contents are whatever they were.
     NodeRef take() noexcept;
 

@@ -26,6 +26,17 @@ struct RTreeInspector {
         return check(tree, tree.m_root, seen);
     }
 
+    static int level(const slRTree& tree) { return tree.m_level; }
+
+    // Uses up free nodes until only so many are left before the pool has to grow; only where the next
+    // insertion could split the root, since each growth is larger than the last.
+    static void leave_spare(slRTree& tree, int count) {
+        if (tree.m_nodes[tree.m_root].count < rtree::MAX_ENTRIES)
+            return;
+        while (tree.m_nodes.spare() > static_cast<std::size_t>(count))
+            tree.m_nodes.take();
+    }
+
 private:
     static void dump(const slRTree& tree, rtree::NodeRef ref, std::string& text) {
         const rtree::Node& node = tree.m_nodes[ref];

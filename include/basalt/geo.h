@@ -57,7 +57,9 @@ inline constexpr double GEO_INFINITY = 2e100;
 /// Bearing in [0, 2 pi) of an angle, by adding or subtracting 2 pi.
 /// @param angle radians, any sign
 /// @return the normalised bearing. A negative angle so small that adding 2 pi rounds to 2 pi gives 0; -0
-/// stays -0. Bad input: #GEO_NULL, NaN and angles beyond +-100 come back unchanged.
+/// stays -0.
+///
+/// Bad input: #GEO_NULL, NaN and angles beyond +-100 come back unchanged.
 BASALT_API double geo_normalised_bearing(double angle);
 
 /// Horizontal distance between two points: sqrt(de^2 + dn^2), metres, not negative.
@@ -74,11 +76,15 @@ BASALT_API double geo_vert_dist(const geo_nee& from, const geo_nee& to);
 BASALT_API double geo_slope_dist(const geo_nee& a, const geo_nee& b);
 
 /// Whether two points are equal within 0.5 mm (strictly less) in each of north, east and elevation.
-/// @return 1 or 0. Bad input: NaN, or the same infinity in both points, is not equal: 0.
+/// @return 1 or 0
+///
+/// Bad input: NaN, or the same infinity in both points, is not equal: 0.
 BASALT_API int nee_equal(const geo_nee& a, const geo_nee& b);
 
 /// Whether two distances, in metres, are equal within 0.5 mm (strictly less), or both are #GEO_NULL.
-/// A single #GEO_NULL takes part as its value, which is next to 0. Bad input: as for nee_equal().
+/// A single #GEO_NULL takes part as its value, which is next to 0.
+///
+/// Bad input: as for nee_equal().
 BASALT_API bool geo_dist_equal(double a, double b);
 
 /// Bearing of the line between two points.
@@ -99,8 +105,9 @@ BASALT_API double geo_gradient2(const geo_nee& from, const geo_nee& to);
 /// @param bearing1 radians
 /// @param bearing2 radians
 /// @return radians in [0, pi]; the same for exchanged arguments to within rounding
+///
 /// Bad input: #GEO_NULL if either is. Bearings more than 100 apart are not reduced: with d = bearing1 -
-/// bearing2 the result is then 2 pi - d (negative) for d > 100 and d for d < -100; normalise such bearings
+/// bearing2 the result is 2 pi - d for d > 100 and d for d < -100, negative both; normalise such bearings
 /// first.
 BASALT_API double geo_grid_divergence(double bearing1, double bearing2);
 
@@ -114,6 +121,7 @@ BASALT_API double geo_grid_divergence(const geo_nee& a1, const geo_nee& a2, cons
 /// @param bearing1 radians
 /// @param bearing2 radians
 /// @return normalised bearing, radians in [0, 2 pi)
+///
 /// Bad input: bearings more than 100 apart are not reduced, so halfway is then not along the smaller turn,
 /// and a result beyond +-100 is not normalised. #GEO_NULL counts as 0.
 BASALT_API double geo_bisected_bearing(double bearing1, double bearing2);
@@ -165,13 +173,15 @@ BASALT_API double geo_triangle_area(const geo_nee& a, const geo_nee& b, const ge
 /// @{
 
 /// Whether a point lies in a polygon: even-odd rule, by a ray from the point towards increasing east.
-/// @param n count of vertices; 1 and 2 hold their vertices only
+/// @param n count of vertices; 1 and 2 enclose nothing but their vertices, to within rounding
 /// @param polygon vertices in either order; the outline may cross or touch itself
 /// @param point the point asked about
 /// @return 1 inside or exactly on a vertex, else 0. A point on an edge gets what the rounded crossings give;
-/// use geo_point_in_poly_2() where the outline belongs to the polygon. Bad input: an edge with a NaN northing
-/// is not crossed; a NaN easting at an edge gives no crossing. Source: M. Shimrat, "Algorithm 112: Position
-/// of point relative to polygon", CACM 5(8), 1962.
+/// use geo_point_in_poly_2() where the outline belongs to the polygon.
+///
+/// Bad input: an edge with NaN in it is not crossed; a point with NaN is outside.
+///
+/// Source: M. Shimrat, "Algorithm 112: Position of point relative to polygon", CACM 5(8), 1962.
 BASALT_API int geo_point_in_poly(int n, const geo_nee* polygon, const geo_nee* point);
 
 /// Whether a point lies in a polygon or within a tolerance of its outline.
@@ -181,6 +191,7 @@ BASALT_API int geo_point_in_poly(int n, const geo_nee* polygon, const geo_nee* p
 /// @param tolerance width of the band along every edge, metres; its ends are square, as in
 /// geo_point_on_line()
 /// @return 1 inside or in the band, else 0
+///
 /// Bad input: a negative or NaN tolerance leaves the crossings alone (no exact vertex test here); otherwise
 /// as geo_point_in_poly() and geo_point_on_line().
 BASALT_API int geo_point_in_poly_2(int n, const geo_nee* polygon, const geo_nee* point, double tolerance);
@@ -192,7 +203,9 @@ BASALT_API int geo_point_in_poly_2(int n, const geo_nee* polygon, const geo_nee*
 /// @param point the point asked about
 /// @param tolerance metres; all bounds are inclusive. With 0, rounding misses most points on an oblique
 /// segment: give at least a few units in the last place of the coordinates, 1e-6 m on national grids.
-/// @return 1 or 0. Bad input: 0 for a negative or NaN tolerance and for NaN coordinates.
+/// @return 1 or 0
+///
+/// Bad input: 0 for a negative or NaN tolerance and for NaN coordinates.
 BASALT_API int geo_point_on_line(const geo_nee& a, const geo_nee& b, const geo_nee& point, double tolerance);
 
 /// Whether a point lies within a tolerance of a closed chain of segments, the last of which runs from the
@@ -202,13 +215,16 @@ BASALT_API int geo_point_on_line(const geo_nee& a, const geo_nee& b, const geo_n
 /// @param point the point asked about
 /// @param tolerance metres, exclusive: distance to the line below it, and squared distance to both ends below
 /// squared length plus squared tolerance. A vertex always matches exactly, whatever the tolerance.
-/// @return 1 or 0. Bad input: with a negative or NaN tolerance only exact vertices match.
+/// @return 1 or 0
+///
+/// Bad input: with a negative or NaN tolerance only exact vertices match.
 BASALT_API int geo_point_on_polyline(int n, const geo_nee* vertices, const geo_nee* point, double tolerance);
 
 /// Whether segment p1-p2 crosses segment q1-q2, by the sides their ends lie on.
 /// @return 1 or 0. An end exactly on the other line counts to one fixed side of it, so a touch is a crossing
-/// or not depending on the directions; collinear segments never cross. Bad input: a segment of length 0 is
-/// not crossed; a NaN end counts as lying on the line.
+/// or not depending on the directions; collinear segments never cross.
+///
+/// Bad input: a segment of length 0 is not crossed; a NaN end counts as lying on the line.
 BASALT_API int geo_lines_cross(const geo_nee& p1, const geo_nee& p2, const geo_nee& q1, const geo_nee& q2);
 
 /// Intersection of two rays, each from a point along a bearing.
@@ -218,8 +234,10 @@ BASALT_API int geo_lines_cross(const geo_nee& p1, const geo_nee& p2, const geo_n
 /// @param bearing2 radians, likewise
 /// @param[out] out the intersection; elevation #GEO_NULL. All #GEO_NULL when there is none.
 /// @return 1 when the rays meet, or meet behind a start that is closer to the point than 4.8e-7 m on both
-/// axes; 0 when they do not, or are within 0.1 arc-second of parallel or opposite Bad input: a bearing that
-/// is not finite gives 0; so does a NaN coordinate, unless the lines meet at a start.
+/// axes; 0 when they do not, or are within 0.1 arc-second of parallel or opposite
+///
+/// Bad input: a bearing that is not finite gives 0; so does a NaN coordinate, unless the lines meet at a
+/// start.
 BASALT_API int geo_grid_bb_intersect(const geo_nee& p1, const geo_nee& p2, double bearing1, double bearing2,
                                      geo_nee& out);
 

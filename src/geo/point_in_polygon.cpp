@@ -5,13 +5,11 @@ using namespace basalt::geo;
 
 namespace {
 
-bool can_use_avx2() {
 #if BASALT_HAS_AVX2_FORM
+bool can_use_avx2() {
     return __builtin_cpu_supports("avx2") != 0;
-#else
-    return false;
-#endif
 }
+#endif
 
 template <VertexTest TEST>
 int crossing_parity(int n, const geo_nee* polygon, const geo_nee& point) {

@@ -23,7 +23,9 @@ std::string number_text(double value, int decimals) {
         std::to_chars(text, text + sizeof text, std::abs(value), std::chars_format::fixed, decimals);
     const std::string digits(text, result.ptr);
     const bool zero = digits.find_first_not_of("0.") == std::string::npos;
-    return (value < 0.0 && !zero ? "-" : "") + grouped(digits);
+    std::string signed_digits(value < 0.0 && !zero ? "-" : "");
+    signed_digits += grouped(digits);
+    return signed_digits;
 }
 
 std::string number_text(std::int64_t value) {

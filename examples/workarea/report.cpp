@@ -42,7 +42,7 @@ std::string percent(double part) {
 
 std::string slope_angle(double slope) {
     constexpr double DEGREES_PER_RADIAN = 180.0 / 3.141592653589793;
-    return "% (" + number_text(std::atan(slope) * DEGREES_PER_RADIAN, 2) + " deg)";
+    return std::string("% (") + number_text(std::atan(slope) * DEGREES_PER_RADIAN, 2) + " deg)";
 }
 
 std::string at_cell(const GridFrame& frame, const Extreme& cell) {
@@ -104,7 +104,7 @@ void write_view(Sheet& sheet, const Outcome& o) {
     if (!o.boundary.empty()) {
         sheet.text("Boundary", *o.options.boundary);
         sheet.line("Boundary vertices", number_text(static_cast<std::int64_t>(o.boundary.size())),
-                   "(" + number_text(polygon_area(o.boundary), 0) + " m2, perimeter " +
+                   std::string("(") + number_text(polygon_area(o.boundary), 0) + " m2, perimeter " +
                        number_text(perimeter(o.boundary), 1) + " m)");
     }
     sheet.line("Cells counted", number_text(s.inside));

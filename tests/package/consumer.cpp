@@ -25,5 +25,8 @@ int main() {
     const geo_nee b{3.0, 4.0, 0.0};
     std::printf("basalt %s: %d cells, %g m, language %u\n", BASALT_VERSION, count, geo_horz_dist(a, b),
                 static_cast<unsigned>(_languageVersion()));
-    return count == 1024 && geo_horz_dist(a, b) == 5.0 && vex_lib::vlSharedMemoryHeap::GetHeapHandle() != nullptr ? 0 : 1;
+    return count == 1024 && geo_horz_dist(a, b) == 5.0 &&
+                   vex_lib::vlSharedMemoryHeap::GetHeapHandle() != nullptr
+               ? 0
+               : 1;
 }

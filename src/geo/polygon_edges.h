@@ -143,7 +143,7 @@ BASALT_AVX2_INLINE void step(Walk& walk, const geo_nee* vertices, const Quad& po
     unsigned not_above = 0;
     __m256d same = _mm256_setzero_pd();
     for (int q = 0; q < QUADS; ++q) {
-        const Quad v = load_quad(vertices + 4 * q);
+        const Quad v = load_quad(vertices + std::ptrdiff_t{4} * q);
         not_above |= lane_bits(_mm256_cmp_pd(v.north, point.north, _CMP_LE_OQ)) << 4 * q;
         if (TEST == VertexTest::YES) {
             same = _mm256_or_pd(same, _mm256_and_pd(_mm256_cmp_pd(v.north, point.north, _CMP_EQ_OQ),
@@ -156,7 +156,7 @@ BASALT_AVX2_INLINE void step(Walk& walk, const geo_nee* vertices, const Quad& po
     if (ends != 0) {
         for (int q = 0; q < QUADS; ++q) {
             if ((ends >> 4 * q & 0xF) != 0) {
-                walk.crossings ^= cross_east_of(vertices + 4 * q, point) & counted >> 4 * q;
+                walk.crossings ^= cross_east_of(vertices + std::ptrdiff_t{4} * q, point) & counted >> 4 * q;
             }
         }
     }

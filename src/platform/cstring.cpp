@@ -178,7 +178,7 @@ int CString::Replace(const wchar_t* old_text, const wchar_t* new_text) {
     std::wstring result;
     int count = 0;
     std::size_t done = 0;
-    for (std::size_t match; (match = m_text.find(old_part, done)) != m_text.npos; ++count) {
+    for (std::size_t match; (match = m_text.find(old_part, done)) != std::wstring::npos; ++count) {
         result.append(m_text, done, match - done).append(new_part);
         require_length(result.size());
         done = match + old_part.size();

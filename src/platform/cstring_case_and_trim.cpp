@@ -31,7 +31,8 @@ auto is_white_space() {
 
 // Over a copy of the characters: they may belong to the text being trimmed.
 auto is_one_of(const wchar_t* characters) {
-    return [set = std::wstring(view_of(characters))](wchar_t ch) { return set.find(ch) != set.npos; };
+    return
+        [set = std::wstring(view_of(characters))](wchar_t ch) { return set.find(ch) != std::wstring::npos; };
 }
 
 auto is_equal_to(wchar_t character) {

@@ -34,7 +34,7 @@ struct Conversion {
 };
 
 bool is_in(wchar_t ch, std::wstring_view set) {
-    return ch != L'\0' && set.find(ch) != set.npos;
+    return ch != L'\0' && set.find(ch) != std::wstring_view::npos;
 }
 
 class Formatter {

@@ -172,7 +172,7 @@ const Region* PrivateHeap::region_of_live(void* payload) const {
         return nullptr;
     }
     Block* block = block_of(payload);
-    const std::size_t offset = static_cast<std::size_t>(bytes_of(block) - region->begin);
+    const auto offset = static_cast<std::size_t>(bytes_of(block) - region->begin);
     if (offset < HEAD_BYTES || offset >= region->size) {
         return nullptr;
     }

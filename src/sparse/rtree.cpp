@@ -16,7 +16,7 @@ namespace {
 constexpr float INFINITE = std::numeric_limits<float>::infinity();
 
 unsigned valid_bits(const Node& node) {
-    return (1u << node.count) - 1;
+    return (1U << node.count) - 1;
 }
 
 // The entry that grows least to take in the rectangle; of equals the one of smaller volume, then the earlier.
@@ -31,8 +31,9 @@ int choose_subtree(const Node& node, const Rect4& rect) {
     }
     const Float4 least = least4(min4(increase[0], increase[1]));
     const Int4 tied[2] = {increase[0] == least, increase[1] == least};
-    for (int half = 0; half < 2; ++half)
+    for (int half = 0; half < 2; ++half) {
         volume[half] = tied[half] ? volume[half] : all4(INFINITE);
+    }
     const Float4 smallest = least4(min4(volume[0], volume[1]));
     return std::countr_zero(bits4(volume[0] == smallest) | bits4(volume[1] == smallest) << 4);
 }
@@ -89,8 +90,9 @@ private:
     static constexpr int SIZE = 512;
 
     void make_room() {
-        if (m_count > SIZE - MAX_ENTRIES)
+        if (m_count > SIZE - MAX_ENTRIES) {
             flush();
+        }
     }
 
     std::vector<int>& m_results;
@@ -106,7 +108,7 @@ public:
     // What lies within the query is not tested again. Corners within say nothing about a rectangle that has a
     // min above its max, so a tree that holds one is tested to the leaves.
     Walk(const NodePool& nodes, bool inverted, const Query& query, std::vector<int>& results)
-        : m_nodes(nodes), m_alwaysPartly(inverted ? ~0u : 0), m_query(query), m_writer(results) {}
+        : m_nodes(nodes), m_alwaysPartly(inverted ? ~0U : 0), m_query(query), m_writer(results) {}
 
     void run(NodeRef root) {
         const Visit start{&m_nodes[root], false};
@@ -148,17 +150,19 @@ private:
                 count = 0;
             }
         }
-        if (count > 0)
+        if (count > 0) {
             visit(next, count);
+        }
     }
 
     void visit_leaves(const Visit* wave, int size) {
         for (int k = 0; k < size; ++k) {
             const Node& leaf = *wave[k].node;
-            if (wave[k].within)
+            if (wave[k].within) {
                 m_writer.add_all(leaf);
-            else
+            } else {
                 m_writer.add(leaf, valid_bits(leaf) & m_query.meets(leaf));
+            }
         }
     }
 

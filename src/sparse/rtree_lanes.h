@@ -11,8 +11,8 @@
 
 namespace vex_util::rtree {
 
-typedef float Float4 __attribute__((vector_size(16)));
-typedef int Int4 __attribute__((vector_size(16)));
+using Float4 __attribute__((vector_size(16))) = float;
+using Int4 __attribute__((vector_size(16))) = int;
 
 inline Int4 load4(const int* p) {
     Int4 v;

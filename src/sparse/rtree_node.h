@@ -63,11 +63,13 @@ struct alignas(64) Node {
     }
 
     Rect cover() const {
-        if (count == 0)
+        if (count == 0) {
             return {0, 0, 0, 0};
+        }
         Rect r = rect(0);
-        for (int i = 1; i < count; ++i)
+        for (int i = 1; i < count; ++i) {
             r = combine(r, rect(i));
+        }
         return r;
     }
 

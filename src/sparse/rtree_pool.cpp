@@ -35,17 +35,20 @@ void NodePool::swap(NodePool& other) noexcept {
 
 NodeRef NodePool::take() noexcept {
     // Reserving ahead can leave the current slab with a few nodes and a fresh one behind it.
-    while (m_slabs[m_current].used == m_slabs[m_current].capacity)
+    while (m_slabs[m_current].used == m_slabs[m_current].capacity) {
         ++m_current;
+    }
     --m_spare;
     return static_cast<NodeRef>(m_current << SLAB_BITS | m_slabs[m_current].used++);
 }
 
 void NodePool::reset() noexcept {
-    if (m_slabs.empty())
+    if (m_slabs.empty()) {
         return;
-    for (std::size_t i = 1; i < m_slabs.size(); ++i)
+    }
+    for (std::size_t i = 1; i < m_slabs.size(); ++i) {
         release_slab(m_slabs[i]);
+    }
     m_slabs.resize(1, Slab{});
     m_slabs[0].used = 0;
     m_current = 0;
@@ -61,10 +64,12 @@ void NodePool::release_slab(const Slab& slab) noexcept {
 }
 
 void NodePool::add_slab() {
-    if (m_slabs.size() == MAX_SLABS)
+    if (m_slabs.size() == MAX_SLABS) {
         throw std::bad_alloc();
-    if (m_slabs.size() == m_slabs.capacity())
+    }
+    if (m_slabs.size() == m_slabs.capacity()) {
         m_slabs.reserve(m_slabs.size() * 2 + 4);
+    }
     // Each slab doubles the pool until slabs are as large as they get.
     const std::size_t capacity = std::clamp(m_capacity, FIRST_SLAB, static_cast<std::size_t>(SLAB_MASK) + 1);
     m_slabs.push_back({allocate_slab(capacity), capacity, 0});
@@ -73,8 +78,9 @@ void NodePool::add_slab() {
 }
 
 void NodePool::release_all() noexcept {
-    for (const Slab& slab : m_slabs)
+    for (const Slab& slab : m_slabs) {
         release_slab(slab);
+    }
 }
 
 }  // namespace vex_util::rtree

@@ -24,8 +24,9 @@ public:
 
     // Makes the next `count` calls of take() sure to succeed; throws std::bad_alloc with nothing changed.
     void reserve(std::size_t count) {
-        while (m_spare < count)
+        while (m_spare < count) {
             add_slab();
+        }
     }
 
     // How many more nodes take() gives before the pool has to grow.

@@ -8,7 +8,7 @@
 namespace vex_util::rtree {
 
 // 0x40490FDC, one unit in the last place above the float nearest to pi.
-inline constexpr float UNIT_SPHERE_VOLUME = 3.141593f;
+inline constexpr float UNIT_SPHERE_VOLUME = 3.141593F;
 
 // Four rectangles with their coordinates already rounded to float. Rounding keeps order, so the least of the
 // rounded values is the rounded least value: combining after the rounding gives the same volume.
@@ -33,8 +33,8 @@ inline Rect4 load_rects(const Node& node, int first) {
 
 // The order of these roundings is part of the tree's behaviour: ties are decided by exact equality.
 inline Float4 spherical_volume(const Rect4& r) {
-    const Float4 h0 = (r.maxX - r.minX) * 0.5f;
-    const Float4 h1 = (r.maxY - r.minY) * 0.5f;
+    const Float4 h0 = (r.maxX - r.minX) * 0.5F;
+    const Float4 h1 = (r.maxY - r.minY) * 0.5F;
     const Float4 radius = sqrt4(h0 * h0 + h1 * h1);
     return (radius * radius) * UNIT_SPHERE_VOLUME;
 }

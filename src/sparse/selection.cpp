@@ -45,7 +45,8 @@ bool Sparse2DArray::Select(const int* const min, const int* const max) {
 void Sparse2DArray::IterateSelected(bool (*visit)(int, int, const void*, const void*), const void* context) {
     const AutoCriticalSection locked(m_storage->lock);
     const std::vector<int>& selection = m_storage->selection;
-    for (std::size_t i = 0; i < selection.size(); ++i) {
+    // By position: a callback that selects again changes the list under the loop.
+    for (std::size_t i = 0; i < selection.size(); ++i) {  // NOLINT(modernize-loop-convert)
         if (!visit_block(*m_storage, static_cast<std::size_t>(selection[i]), visit, context)) {
             return;
         }

@@ -78,10 +78,12 @@ class BASALT_API vlSharedMemoryHeap {
 public:
     /// As Alloc(); file and line are ignored.
     static void* operator new(std::size_t size) noexcept;
+    /// The same; file and line are ignored.
     static void* operator new(std::size_t size, const char* file, int line) noexcept;
 
     /// As Free(); file and line are ignored.
     static void operator delete(void* block) noexcept;
+    /// The same; file and line are ignored.
     static void operator delete(void* block, const char* file, int line) noexcept;
 
     /// vlWinHeapAllocator::Alloc() of the shared heap.

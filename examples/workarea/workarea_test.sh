@@ -1,5 +1,7 @@
 #!/usr/bin/env bash
 # The program from the outside: figures against what awk makes of the same files, and every refusal.
+# awk reads and writes numbers as the files do, whatever the locale.
+awk() { LC_ALL=C command awk "$@"; }
 # Usage: workarea_test.sh PROGRAM DATA_DIRECTORY
 set -u
 program=$(realpath "$1")

@@ -1,8 +1,8 @@
 #!/usr/bin/env bash
 # The program from the outside: figures against what awk makes of the same files, and every refusal.
+# Usage: workarea_test.sh PROGRAM DATA_DIRECTORY
 # awk reads and writes numbers as the files do, whatever the locale.
 awk() { LC_ALL=C command awk "$@"; }
-# Usage: workarea_test.sh PROGRAM DATA_DIRECTORY
 set -u
 program=$(realpath "$1")
 terrain=$(realpath "$2")/jacksboro.asc

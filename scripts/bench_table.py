@@ -1,22 +1,40 @@
 #!/usr/bin/env python3
 """Turns benchmark results into a table: our median, each peer's median and the ratio peer / ours.
 
-Rows are named "<row>/<who>", with who = basalt for ours.
+Benchmarks are named "<row>/<who>[/<argument>...]", with who = basalt for ours; arguments become part of the
+row. Fails when a name is no such name, a row has no figure of ours, or a benchmark reported an error, such as
+answers that differ from a peer's.
+
 Usage: bench_table.py RESULTS.json
 """
 import json
 import os
 import sys
 
+NANOSECONDS = {"ns": 1.0, "us": 1e3, "ms": 1e6, "s": 1e9}
+HOW_TIMED = {"real_time", "manual_time", "process_time"}
+
+
+def split_name(name):
+    row, _, rest = name.partition("/")
+    who, *rest = rest.split("/")
+    if not who:
+        sys.exit(f"{name}: a benchmark is named <row>/<who>")
+    arguments = [part.replace(":", " ") for part in rest
+                 if part not in HOW_TIMED and not part.startswith(("iterations:", "repeats:"))]
+    return ", ".join([row.replace("_", " "), *arguments]), who.replace("_", " ")
+
 
 def medians(benchmarks):
     rows = {}
     for entry in benchmarks:
+        if entry.get("error_occurred"):
+            sys.exit(f"{entry['name']}: {entry['error_message']}")
         if entry.get("aggregate_name", "median") != "median":
             continue
-        row, who = entry["run_name"].split("/")[:2]
+        row, who = split_name(entry["run_name"])
         counters = {k: v for k, v in entry.items() if k.endswith("_ns") or k == "bytes_per_cell"}
-        rows.setdefault(row, {})[who] = (entry["real_time"], counters)
+        rows.setdefault(row, {})[who] = (entry["real_time"] * NANOSECONDS[entry["time_unit"]], counters)
     return rows
 
 
@@ -25,7 +43,7 @@ def number(value):
 
 
 def main():
-    if len(sys.argv) != 2:
+    if len(sys.argv) != 2 or sys.argv[1].startswith("-"):
         sys.exit(__doc__)
     with open(sys.argv[1], encoding="utf-8") as file:
         results = json.load(file)
@@ -35,13 +53,16 @@ def main():
     print("| row | basalt | peer | peer's figure | ratio |")
     print("|---|---:|---|---:|---:|")
     for row, figures in medians(results["benchmarks"]).items():
-        ours, counters = figures.pop("basalt", (None, {}))
+        if "basalt" not in figures:
+            sys.exit(f"{row}: no figure of basalt to set beside {', '.join(figures)}")
+        ours, counters = figures.pop("basalt")
         label = row + "".join(f"; {name} {number(value)}" for name, value in counters.items())
-        if not figures and ours is not None:
+        if not figures:
             print(f"| {label} | {number(ours)} | | | |")
         for who, (theirs, _) in figures.items():
-            ratio = f"{theirs / ours:.2f}" if ours else ""
-            print(f"| {label} | {number(ours) if ours is not None else ''} | {who} | {number(theirs)} | {ratio} |")
+            ratio = f"{theirs / ours:.2f}" if ours > 0 else ""
+            print(f"| {label} | {number(ours)} | {who} | {number(theirs)} | {ratio} |")
 
 
-main()
+if __name__ == "__main__":
+    main()

@@ -19,6 +19,17 @@ write_basic_package_version_file(${PROJECT_BINARY_DIR}/basalt-config-version.cma
 install(FILES ${PROJECT_BINARY_DIR}/basalt-config.cmake ${PROJECT_BINARY_DIR}/basalt-config-version.cmake
   DESTINATION ${config_dir})
 
+# The installed tree may be moved as a whole: basalt.pc finds the rest from where it stands, as the CMake package does.
+set(pc_libdir "${CMAKE_INSTALL_FULL_LIBDIR}")
+set(pc_includedir "${CMAKE_INSTALL_FULL_INCLUDEDIR}")
+set(pc_prefix "${CMAKE_INSTALL_PREFIX}")
+if(NOT IS_ABSOLUTE "${CMAKE_INSTALL_LIBDIR}" AND NOT IS_ABSOLUTE "${CMAKE_INSTALL_INCLUDEDIR}")
+  file(RELATIVE_PATH up "${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig" "${CMAKE_INSTALL_PREFIX}")
+  string(REGEX REPLACE "/$" "" up "${up}")
+  set(pc_prefix "\${pcfiledir}/${up}")
+  set(pc_libdir "\${prefix}/${CMAKE_INSTALL_LIBDIR}")
+  set(pc_includedir "\${prefix}/${CMAKE_INSTALL_INCLUDEDIR}")
+endif()
 if(BUILD_SHARED_LIBS)
   set(pc_static_libs "")
 else()

@@ -1,33 +1,57 @@
 #!/usr/bin/env bash
-# Installs the library and builds an outside program against it: find_package, a bare compiler line with
-# pkg-config, and as a subproject; each shared and static.
+# Installs the library, moves the installed tree, and builds outside programs against it: by find_package, by a
+# bare compiler line with pkg-config (the README's program too), and as a subproject; each shared and static.
 # Usage: scripts/check_package.sh
 set -euo pipefail
-cd "$(dirname "$0")/.."
+. "$(dirname "$0")/packages.sh"
+show_help "$@"
 
-work=build/package
+work=$PWD/build/package
 rm -rf "$work"
 mkdir -p "$work"
-for shared in ON OFF; do
-    prefix=$PWD/$work/root-$shared
-    {
-        cmake -S . -B "$work/library-$shared" -G Ninja -DCMAKE_BUILD_TYPE=Release -DBUILD_SHARED_LIBS=$shared \
-            -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DCMAKE_INSTALL_PREFIX="$prefix"
-        cmake --build "$work/library-$shared" --target install
+awk '/^```cpp/ {inside = 1; next} /^```/ {inside = 0} inside' README.md >"$work/readme.cpp"
+[ -s "$work/readme.cpp" ] || { echo "README.md shows no program"; exit 1; }
+warnings=(-Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
 
-        cmake -S tests/package/find_package -B "$work/found-$shared" -G Ninja -DCMAKE_PREFIX_PATH="$prefix"
-        cmake --build "$work/found-$shared"
+build() {  # source directory, build directory, cmake options
+    cmake -S "$1" -B "$2" -G Ninja -DCMAKE_BUILD_TYPE=Release "${@:3}"
+    cmake --build "$2"
+}
 
-        cmake -S tests/package/subdirectory -B "$work/sub-$shared" -G Ninja -DBUILD_SHARED_LIBS=$shared \
-            -DBASALT_SOURCE_DIR="$PWD"
-        cmake --build "$work/sub-$shared"
+check() {  # ON or OFF: shared or static
+    local kind=$1 staged=$work/staged-$1 prefix=$work/moved-$1 libdir=lib
+    [ "$kind" = ON ] || libdir=lib/some/where
+    build . "$work/library-$kind" -DBUILD_SHARED_LIBS="$kind" -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF \
+        -DCMAKE_INSTALL_PREFIX="$staged" -DCMAKE_INSTALL_LIBDIR="$libdir"
+    cmake --install "$work/library-$kind"
+    mv "$staged" "$prefix"
+    if grep -rIl "$PWD" "$prefix"; then
+        echo "the installed files name the place they were built or installed in"
+        return 1
+    fi
 
-        pc=$(find "$prefix" -name pkgconfig)
-        # shellcheck disable=SC2046
-        PKG_CONFIG_PATH=$pc g++ -std=c++17 tests/package/consumer.cpp -o "$work/bare-$shared" \
-            $(PKG_CONFIG_PATH=$pc pkg-config --cflags --libs basalt)
-    } >"$work/log-$shared" 2>&1 || { cat "$work/log-$shared"; exit 1; }
-    "$work/found-$shared/consumer"
-    "$work/sub-$shared/consumer"
-    LD_LIBRARY_PATH=$(dirname "$pc") "$work/bare-$shared"
+    build tests/package/find_package "$work/found-$kind" -DCMAKE_PREFIX_PATH="$prefix" \
+        -DCMAKE_CXX_FLAGS="${warnings[*]}" -Dbasalt_DIR="$prefix/$libdir/cmake/basalt"
+    build tests/package/subdirectory "$work/sub-$kind" -DBUILD_SHARED_LIBS="$kind" -DBASALT_SOURCE_DIR="$PWD"
+
+    local flags
+    flags=$(PKG_CONFIG_PATH=$prefix/$libdir/pkgconfig pkg-config --cflags --libs basalt)
+    for source in tests/package/consumer.cpp "$work/readme.cpp"; do
+        # shellcheck disable=SC2086  # the flags are words
+        g++ -std=c++17 "${warnings[@]}" "$source" -o "$work/bare-$kind-$(basename "$source" .cpp)" $flags
+    done
+}
+
+for kind in ON OFF; do
+    # in a shell of its own and outside any condition, where errexit holds
+    set +e
+    (set -e; check "$kind") >"$work/log-$kind" 2>&1
+    failed=$?
+    set -e
+    [ $failed -eq 0 ] || { cat "$work/log-$kind"; exit 1; }
+    "$work/found-$kind/consumer"
+    "$work/sub-$kind/consumer"
+    for program in consumer readme; do
+        LD_LIBRARY_PATH=$work/moved-$kind/lib "$work/bare-$kind-$program"
+    done
 done

@@ -1,42 +1,55 @@
 #!/usr/bin/env bash
-# The deeper checks: format, include directions, headers, symbols, Clang, clang-tidy, sanitizers, another time
-# zone and locale, documentation, the package, and a minute of each fuzzer. Stops at the first that fails.
-# Usage: scripts/check.sh [step ...]             all steps, or only those named
+# The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
+# locale, results to the bit, the package, exported symbols, sanitizers, documentation, a minute of each fuzzer.
+# Stops at the first step that fails.
+# Usage: scripts/check.sh [step ...]             all steps, or only those named:
+#        format includes clang headers tidy elsewhere package symbols exact asan tsan docs fuzz
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
 
 step_format() { git ls-files '*.h' '*.cpp' | xargs clang-format --dry-run -Werror; }
 step_includes() { python3 scripts/check_includes.py; }
-step_clang() {
-    cmake --preset clang >/dev/null
-    cmake --build --preset clang
-    ctest --preset clang -j "$(nproc)" | tail -n 4
+test_with() {  # preset
+    cmake --preset "$1"
+    cmake --build --preset "$1"
+    ctest --preset "$1" -j "$(nproc)"
 }
+step_clang() { test_with clang; }
 step_headers() { scripts/check_headers.sh build/clang; }
 step_tidy() {
-    git ls-files 'src/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/clang --quiet 2>/dev/null
-}
-step_asan() {
-    cmake --preset asan >/dev/null
-    cmake --build --preset asan
-    ctest --preset asan -j "$(nproc)" | tail -n 4
-}
-step_tsan() {
-    cmake --preset tsan >/dev/null
-    cmake --build --preset tsan
-    TSAN_OPTIONS=halt_on_error=1 ctest --preset tsan -j "$(nproc)" | tail -n 4
+    git ls-files 'src/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/clang --quiet
 }
 step_elsewhere() {
-    # a time zone with half hours, and a locale whose decimal sign is a comma
-    mkdir -p build/locale
-    localedef -i de_DE -f UTF-8 build/locale/de_DE.UTF-8 2>/dev/null || true
-    TZ=Asia/Kathmandu LOCPATH=$PWD/build/locale LC_ALL=de_DE.UTF-8 ctest --preset clang -j "$(nproc)" | tail -n 4
+    # a time zone off the full hour, on both sides of the year's changes; a locale whose decimal sign is a comma
+    localedef -i de_DE -f UTF-8 build/de_DE.UTF-8 || [ -d build/de_DE.UTF-8 ]
+    TZ='<+1245>-12:45<+1345>,M9.5.0/2:45,M4.1.0/3:45' LOCPATH=$PWD/build LC_ALL=de_DE.UTF-8 \
+        ctest --preset clang -j "$(nproc)"
 }
 step_package() { scripts/check_package.sh; }
-step_symbols() { scripts/check_symbols.sh build/package/library-ON/src/libbasalt.so; }
+installed=build/package/library-ON/src  # what the package step built
+step_symbols() {
+    [ -d $installed ] || step_package
+    scripts/check_symbols.sh $installed/libbasalt.so
+}
+step_exact() {
+    # one number folded from thousands of results: whoever compiles it, and as the optimised library gives it
+    local test=tests/geo/exact_results_test.cpp program=build/exact_results
+    for compiler in g++ clang++; do
+        for level in -O0 -O2 -O3; do
+            $compiler -std=c++20 $level -ffp-contract=off -I. -Iinclude src/geo/*.cpp $test -o $program \
+                -lgtest -lgtest_main
+            $program --gtest_brief=1
+        done
+    done
+    [ -d $installed ] || step_package
+    g++ -std=c++20 -ffp-contract=off -I. -Iinclude $test -o $program -lgtest -lgtest_main -L$installed -lbasalt
+    LD_LIBRARY_PATH=$installed $program --gtest_brief=1
+}
+step_asan() { test_with asan; }
+step_tsan() { TSAN_OPTIONS=halt_on_error=1 test_with tsan; }
 step_docs() {
-    cmake -S . -B build/docs -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_DOCS=ON >/dev/null
+    cmake -S . -B build/docs -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_DOCS=ON
     cmake --build build/docs --target docs
 }
 step_fuzz() {
@@ -57,9 +70,9 @@ if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit 
 fi
 steps=("$@")
 if [ ${#steps[@]} -eq 0 ]; then
-    steps=(format includes clang headers elsewhere package symbols asan tsan docs fuzz)
+    steps=(format includes clang headers tidy elsewhere package symbols exact asan tsan docs fuzz)
 fi
-need_packages "${BUILD_PACKAGES[@]}" "${TEST_PACKAGES[@]}" "${CHECK_PACKAGES[@]}" git
+need_packages "${BUILD_PACKAGES[@]}" "${TEST_PACKAGES[@]}" "${CHECK_PACKAGES[@]}"
 mkdir -p build
 for step in "${steps[@]}"; do
     declare -F "step_$step" >/dev/null || { echo "check.sh: no such step: $step" >&2; exit 2; }
@@ -67,12 +80,13 @@ for step in "${steps[@]}"; do
     started=$SECONDS
     failed=
     bash scripts/check.sh --step "$step" >"build/check-$step.log" 2>&1 || failed=yes
-    tail -n 12 "build/check-$step.log"
     if [ -n "$failed" ]; then
+        tail -n 60 "build/check-$step.log"
         grep -nE 'error|FAILED|warning' "build/check-$step.log" | head -n 40 || true
         echo "check.sh: $step failed; its whole output is in build/check-$step.log" >&2
         exit 1
     fi
+    tail -n 4 "build/check-$step.log"
     echo "   $((SECONDS - started)) s"
 done
 echo "All checks passed."

@@ -27,7 +27,8 @@ def split_name(name):
 
 def medians(benchmarks):
     rows = {}
-    for entry in benchmarks:
+    # measured in random turns; told in the order in which they are written
+    for entry in sorted(benchmarks, key=lambda e: (e["family_index"], e["per_family_instance_index"])):
         if entry.get("error_occurred"):
             sys.exit(f"{entry['name']}: {entry['error_message']}")
         if entry.get("aggregate_name", "median") != "median":

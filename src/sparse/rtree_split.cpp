@@ -62,7 +62,7 @@ struct Seeds {
 // The first pair with the largest waste. Where no pair's waste is above the start value (nine equal
 // rectangles so large that the 1 is rounded away) entry 0 is both seeds.
 Seeds pick_seeds(const Candidates& c) {
-    Float4 worst = all4(-total_cover_volume(c) - 1.0f);
+    Float4 worst = all4(-total_cover_volume(c) - 1.0F);
     Int4 worstPair = all4(0);
     for (int a = 0; a < TOTAL - 1; ++a) {
         const Rect4 rect = c.one(a);
@@ -79,8 +79,9 @@ Seeds pick_seeds(const Candidates& c) {
     const unsigned largest = bits4(worst == greatest4(worst));
     int pair = std::numeric_limits<int>::max();
     for (int lane = 0; lane < 4; ++lane) {
-        if (largest >> lane & 1)
+        if (largest >> lane & 1) {
             pair = std::min(pair, worstPair[lane]);
+        }
     }
     return {pair / 16, pair % 16};
 }
@@ -95,8 +96,9 @@ struct Group {
         cover = count == 0 ? c.one(i) : combine(c.one(i), cover);
         ++count;
         const Float4 volume = spherical_volume(cover);
-        for (int v = 0; v < PADDED / 4; ++v)
+        for (int v = 0; v < PADDED / 4; ++v) {
             growth[v] = spherical_volume(combine(c.rects(4 * v), cover)) - volume;
+        }
     }
 };
 
@@ -106,25 +108,26 @@ unsigned distribute(const Candidates& c) {
     Group groups[2];
     groups[0].add(c, seeds.first);
     groups[1].add(c, seeds.second);
-    unsigned unassigned = ((1u << TOTAL) - 1) & ~(1u << seeds.first) & ~(1u << seeds.second);
-    unsigned second = 1u << seeds.second;
+    unsigned unassigned = ((1U << TOTAL) - 1) & ~(1U << seeds.first) & ~(1U << seeds.second);
+    unsigned second = 1U << seeds.second;
 
     while (groups[0].count < FULL_GROUP && groups[1].count < FULL_GROUP) {
         Float4 difference[PADDED / 4];
-        Float4 biggest = all4(-1.0f);
+        Float4 biggest = all4(-1.0F);
         unsigned prefersSecond = 0;
         for (int v = 0; v < PADDED / 4; ++v) {
             const Float4 d = groups[1].growth[v] - groups[0].growth[v];
             const Int4 lane = Int4{1, 2, 4, 8} << (4 * v);
             const Int4 open = (all4(static_cast<int>(unassigned)) & lane) != 0;
-            prefersSecond |= bits4(d < 0.0f) << (4 * v);
-            difference[v] = open ? max4(d, -d) : all4(-1.0f);
+            prefersSecond |= bits4(d < 0.0F) << (4 * v);
+            difference[v] = open ? max4(d, -d) : all4(-1.0F);
             biggest = max4(biggest, difference[v]);
         }
         biggest = greatest4(biggest);
         unsigned tied = 0;
-        for (int v = 0; v < PADDED / 4; ++v)
+        for (int v = 0; v < PADDED / 4; ++v) {
             tied |= bits4(difference[v] == biggest) << (4 * v);
+        }
         tied &= unassigned;
 
         // The first of the tied, unless a later one goes to the group that has fewer.
@@ -135,9 +138,10 @@ unsigned distribute(const Candidates& c) {
             choice = toSmaller ? toSmaller : tied;
         }
         const int i = std::countr_zero(choice);
-        const unsigned bit = 1u << i;
-        if (prefersSecond & bit)
+        const unsigned bit = 1U << i;
+        if (prefersSecond & bit) {
             second |= bit;
+        }
         groups[prefersSecond & bit ? 1 : 0].add(c, i);
         unassigned &= ~bit;
     }

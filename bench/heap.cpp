@@ -107,17 +107,17 @@ void lock_pair(benchmark::State& state) {
     }
 }
 
-#define BASALT_COMPARE(work)                      \
-    BENCHMARK_TEMPLATE(work, PrivateHeap);        \
-    BENCHMARK_TEMPLATE(work, Malloc);             \
-    BENCHMARK_TEMPLATE(work, UnsynchronizedPool); \
-    BENCHMARK_TEMPLATE(work, SynchronizedPool)
+#define BASALT_COMPARE(work)                                               \
+    BENCHMARK_TEMPLATE(work, PrivateHeap)->Name(#work "/basalt");          \
+    BENCHMARK_TEMPLATE(work, Malloc)->Name(#work "/malloc");               \
+    BENCHMARK_TEMPLATE(work, UnsynchronizedPool)->Name(#work "/pmr_pool"); \
+    BENCHMARK_TEMPLATE(work, SynchronizedPool)->Name(#work "/pmr_synchronized_pool")
 
 BASALT_COMPARE(chunks);
 BASALT_COMPARE(chunk_exchange);
 BASALT_COMPARE(small_mix);
-BENCHMARK_TEMPLATE(lock_pair, basalt::platform::Lock);
-BENCHMARK_TEMPLATE(lock_pair, std::mutex);
+BENCHMARK_TEMPLATE(lock_pair, basalt::platform::Lock)->Name("lock_pair/basalt");
+BENCHMARK_TEMPLATE(lock_pair, std::mutex)->Name("lock_pair/std_mutex");
 
 }  // namespace
 

@@ -185,18 +185,18 @@ void band_sizes(benchmark::internal::Benchmark* row) {
     row->Arg(100)->Arg(1000);
 }
 
-BENCHMARK(in_polygon_basalt)->Apply(polygon_sizes);
-BENCHMARK(in_polygon_plain_loop)->Apply(polygon_sizes);
+BENCHMARK(in_polygon_basalt)->Name("in_polygon/basalt")->Apply(polygon_sizes);
+BENCHMARK(in_polygon_plain_loop)->Name("in_polygon/plain_loop")->Apply(polygon_sizes);
 #ifdef HAS_BOOST_GEOMETRY
-BENCHMARK(in_polygon_boost)->Apply(polygon_sizes);
+BENCHMARK(in_polygon_boost)->Name("in_polygon/boost")->Apply(polygon_sizes);
 #endif
 #ifdef BENCH_HAS_GEOS
-BENCHMARK(in_polygon_geos_prepared)->Apply(polygon_sizes);
+BENCHMARK(in_polygon_geos_prepared)->Name("in_polygon/geos_prepared")->Apply(polygon_sizes);
 #endif
-BENCHMARK(in_band_basalt)->Apply(band_sizes);
-BENCHMARK(in_band_plain_loop)->Apply(band_sizes);
+BENCHMARK(in_band_basalt)->Name("in_band/basalt")->Apply(band_sizes);
+BENCHMARK(in_band_plain_loop)->Name("in_band/plain_loop")->Apply(band_sizes);
 #ifdef HAS_BOOST_GEOMETRY
-BENCHMARK(in_band_boost)->Apply(band_sizes);
+BENCHMARK(in_band_boost)->Name("in_band/boost")->Apply(band_sizes);
 #endif
 
 }  // namespace

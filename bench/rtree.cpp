@@ -190,14 +190,14 @@ void window_sizes(benchmark::internal::Benchmark* b) {
     b->ArgNames({"across", "down"})->Args({5, 2})->Args({40, 25});
 }
 
-BENCHMARK(insert)->Apply(insert_sizes);
+BENCHMARK(insert)->Name("insert/basalt")->Apply(insert_sizes);
 #if HAVE_BOOST
-BENCHMARK(boost_insert)->Apply(insert_sizes);
+BENCHMARK(boost_insert)->Name("insert/boost")->Apply(insert_sizes);
 #endif
-BENCHMARK(window)->Apply(window_sizes);
+BENCHMARK(window)->Name("window/basalt")->Apply(window_sizes);
 #if HAVE_BOOST
-BENCHMARK_CAPTURE(boost_window, inserted, false)->Apply(window_sizes);
-BENCHMARK_CAPTURE(boost_window, packed, true)->Apply(window_sizes);
+BENCHMARK_CAPTURE(boost_window, inserted, false)->Name("window/boost_inserted")->Apply(window_sizes);
+BENCHMARK_CAPTURE(boost_window, packed, true)->Name("window/boost_packed")->Apply(window_sizes);
 #endif
 
 }  // namespace

@@ -52,6 +52,7 @@ private:
 
 double resident_bytes() {
     malloc_trim(0);
+    vex_lib::vlSharedMemoryHeap::Compact();
     std::ifstream status("/proc/self/statm");
     long total = 0;
     long resident = 0;

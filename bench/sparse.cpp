@@ -29,6 +29,7 @@
 #include <openvdb/openvdb.h>
 #endif
 
+#include "basalt/memory.h"
 #include "basalt/sparse.h"
 #include "src/sparse/lock.h"
 
@@ -275,9 +276,10 @@ void add_visit_rows() {
     }
 }
 
-// Resident bytes of this process, with what the C library keeps free given back first.
+// Resident bytes of this process, with what the heaps keep free given back first.
 double resident_bytes() {
     malloc_trim(0);
+    vex_lib::vlSharedMemoryHeap::Compact();
     std::ifstream status("/proc/self/statm");
     long total = 0;
     long resident = 0;

@@ -86,6 +86,7 @@ HeapReport inspect_heap(void* handle) {
     const std::lock_guard guard(heap.m_lock);
     HeapReport report;
     std::size_t shared = 0;
+    std::size_t idle = 0;
     const std::byte* end_before = nullptr;
     for (const Region& region : heap.m_regions.all()) {
         if (region.begin < end_before) {
@@ -100,6 +101,7 @@ HeapReport inspect_heap(void* handle) {
         ++report.regions;
         report.mapped += region.size;
         shared += region.single ? 0 : region.size;
+        idle += heap.is_idle_region(block_at(region.begin + HEAD_BYTES)) ? region.size : 0;
     }
     report.fault = check_lists(heap.m_free, heap.m_regions, report.free_blocks);
     if (report.fault != nullptr) {
@@ -107,9 +109,8 @@ HeapReport inspect_heap(void* handle) {
     }
     if (report.mapped != heap.m_mapped || shared != heap.m_mapped_shared || heap.m_mapped > heap.m_maximum) {
         report.fault = "the count of mapped bytes is wrong";
-    } else if (heap.m_spare != nullptr &&
-               (!is_free(head_of(heap.m_spare)) || !is_last(head_of(heap.m_spare)))) {
-        report.fault = "the spare region is in use";
+    } else if (idle != heap.m_idle) {
+        report.fault = "the count of bytes in wholly free regions is wrong";
     }
     return report;
 }

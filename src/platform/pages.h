@@ -10,6 +10,7 @@
 namespace basalt::platform {
 
 inline constexpr std::size_t LARGE_PAGE = std::size_t{2} << 20;
+inline constexpr std::size_t SMALLEST_PAGE = 4096;  // of any system; asking for the true one costs a call
 
 std::size_t page_size() noexcept;
 

@@ -17,8 +17,6 @@ constexpr std::size_t SINGLE_FROM = std::size_t{1} << 20;
 // Heaps with a maximum up to this have one region, of that very size: nothing is lost between regions.
 constexpr std::size_t ONE_REGION_UP_TO = std::size_t{64} << 20;
 
-constexpr std::size_t SMALLEST_PAGE = 4096;  // of any system; asking for the true one costs a call
-
 constexpr std::size_t ATTEMPTS_BEFORE_GROWTH = 8;
 constexpr std::size_t ALL = ~std::size_t{0};
 
@@ -152,9 +150,7 @@ std::size_t PrivateHeap::compact() {
                 next = next_of(block);
                 const std::size_t size = size_of(head_of(block));
                 // A heap that was used keeps its last region, so that it has a free block to answer with.
-                if (m_mapped_shared == size + REGION_OVERHEAD) {
-                    m_spare = block;
-                } else if (drop_free_region(block)) {
+                if (m_mapped_shared != size + REGION_OVERHEAD && drop_free_region(block)) {
                     continue;
                 }
                 discard_pages(bytes_of(block) + MIN_BLOCK, bytes_of(block) + size - HEAD_BYTES);
@@ -205,8 +201,8 @@ void PrivateHeap::carve(Block* block, std::size_t need) {
     std::size_t size = size_of(head);
     std::uint64_t last = head & LAST_OF_REGION;
     m_free.remove(block, size);
-    if (block == m_spare) {
-        m_spare = nullptr;
+    if (is_idle_region(block)) {
+        m_idle -= size + REGION_OVERHEAD;
     }
     Block* after = successor(block, size);
     if (size - need >= MIN_BLOCK) {
@@ -254,7 +250,7 @@ void PrivateHeap::put_back(Block* block, const Region& region) {
     }
     m_free.insert(block, size);
     if (size == region.size - REGION_OVERHEAD) {
-        keep_as_spare(block);
+        keep_idle_region(block, region.size);
     }
 }
 

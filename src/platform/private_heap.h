@@ -58,8 +58,9 @@ private:
     bool resize_in_place(Block* block, std::size_t need, const Region& region);
     bool resize_single(Block*& block, std::size_t need, const Region& region);
 
-    bool keep_as_spare(Block* block);
-    bool drop_spare();
+    bool is_idle_region(const Block* block) const;
+    void keep_idle_region(Block* block, std::size_t bytes);
+    bool drop_idle_regions();
     bool drop_free_region(Block* block);
     bool unmap_region(const Region& region);
 
@@ -68,7 +69,7 @@ private:
     std::uint64_t m_tag;  // marks the heads of this heap's live blocks
     Lock m_lock;
     FreeLists m_free;
-    Block* m_spare = nullptr;   // the one wholly free region kept for the next allocations
+    std::size_t m_idle = 0;     // bytes of the wholly free regions kept for the next allocations
     std::size_t m_single_from;  // blocks of this size and above get a region of their own
     std::size_t m_maximum;
     std::size_t m_mapped = 0;         // bytes of all regions

@@ -1,6 +1,7 @@
 // How a private heap takes regions from the system and gives them back.
 #include <algorithm>
 #include <bit>
+#include <cstdint>
 
 #include "src/platform/pages.h"
 #include "src/platform/private_heap.h"
@@ -10,6 +11,10 @@ namespace {
 
 constexpr std::size_t SMALLEST_REGION = std::size_t{64} << 10;
 constexpr std::size_t LARGEST_REGION = std::size_t{32} << 20;
+
+// Wholly free regions are kept up to this: a heap that is emptied and filled again finds its pages warm. What
+// the system hands out fresh costs more than all the rest of an allocation.
+constexpr std::size_t MOST_IDLE = LARGEST_REGION;
 
 std::size_t whole_pages(std::size_t size) {
     const std::size_t page = page_size();
@@ -26,7 +31,7 @@ std::byte* map_region(std::size_t size) {
 // A listed free block of at least this size in a new region, or null. Each region doubles the heap.
 Block* PrivateHeap::map_shared_region(std::size_t need) {
     const std::size_t least = whole_pages(need + REGION_OVERHEAD);
-    if (!admits(least) && !(drop_spare() && admits(least))) {
+    if (!admits(least) && !(drop_idle_regions() && admits(least))) {
         return nullptr;
     }
     if (!m_regions.reserve_one()) {
@@ -51,6 +56,7 @@ Block* PrivateHeap::map_shared_region(std::size_t need) {
     }
     Block* block = add_region(begin, size, false);
     m_mapped_shared += size;
+    m_idle += size;
     set_head(block, (size - REGION_OVERHEAD) | LAST_OF_REGION);
     m_free.insert(block, size - REGION_OVERHEAD);
     return block;
@@ -59,7 +65,7 @@ Block* PrivateHeap::map_shared_region(std::size_t need) {
 // A live block in a region of its own, or null.
 Block* PrivateHeap::map_single_region(std::size_t need) {
     const std::size_t size = whole_pages(need + REGION_OVERHEAD);
-    if (!admits(size) && !(drop_spare() && admits(size))) {
+    if (!admits(size) && !(drop_idle_regions() && admits(size))) {
         return nullptr;
     }
     if (!m_regions.reserve_one()) {
@@ -91,7 +97,7 @@ bool PrivateHeap::resize_single(Block*& block, std::size_t need, const Region& r
     if (size == old.size) {
         return true;
     }
-    if (size > old.size && !admits(size - old.size) && !(drop_spare() && admits(size - old.size))) {
+    if (size > old.size && !admits(size - old.size) && !(drop_idle_regions() && admits(size - old.size))) {
         return false;
     }
     leave_region(old.begin, old.size);
@@ -109,42 +115,51 @@ bool PrivateHeap::resize_single(Block*& block, std::size_t need, const Region& r
     return true;
 }
 
-// Of wholly free regions the heap keeps the largest one, so that use that swings about a region's end
-// does not map and unmap it each time. False when both had to be kept.
-bool PrivateHeap::keep_as_spare(Block* block) {
-    if (m_spare == nullptr) {
-        m_spare = block;
-        return true;
+// Whether a free block is all there is in its region. Only a region's first block lies where it does in a
+// page.
+bool PrivateHeap::is_idle_region(const Block* block) const {
+    const std::uint64_t head = head_of(block);
+    if (!is_free(head) || !is_last(head) ||
+        (reinterpret_cast<std::uintptr_t>(block) & (SMALLEST_PAGE - 1)) != HEAD_BYTES) {
+        return false;
     }
-    Block* smaller = block;
-    if (size_of(head_of(m_spare)) < size_of(head_of(block))) {
-        smaller = m_spare;
-        m_spare = block;
-    }
-    return drop_free_region(smaller);
+    return size_of(head) == m_regions.find(block)->size - REGION_OVERHEAD;
 }
 
-bool PrivateHeap::drop_spare() {
-    return m_spare != nullptr && drop_free_region(m_spare);
+void PrivateHeap::keep_idle_region(Block* block, std::size_t bytes) {
+    m_idle += bytes;
+    if (m_idle > MOST_IDLE) {
+        drop_free_region(block);
+    }
+}
+
+// False when there is none, or the system refuses them all.
+bool PrivateHeap::drop_idle_regions() {
+    const std::size_t idle_before = m_idle;
+    for (std::size_t i = m_regions.all().size(); i > 0 && m_idle > 0; --i) {
+        const Region& region = m_regions.all()[i - 1];
+        Block* first = block_at(region.begin + HEAD_BYTES);
+        if (!region.single && is_free(head_of(first))) {
+            drop_free_region(first);
+        }
+    }
+    return m_idle < idle_before;
 }
 
 // Unmaps the region of a listed free block if the block is all there is in it.
 bool PrivateHeap::drop_free_region(Block* block) {
-    const std::size_t size = size_of(head_of(block));
-    const Region* region = m_regions.find(block);
-    if (size != region->size - REGION_OVERHEAD) {
+    if (!is_idle_region(block)) {
         return false;
     }
+    const std::size_t size = size_of(head_of(block));
     m_free.remove(block, size);
-    const std::size_t bytes = region->size;
-    if (!unmap_region(*region)) {
+    const std::size_t bytes = size + REGION_OVERHEAD;
+    if (!unmap_region(*m_regions.find(block))) {
         m_free.insert(block, size);
         return false;
     }
     m_mapped_shared -= bytes;
-    if (block == m_spare) {
-        m_spare = nullptr;
-    }
+    m_idle -= bytes;
     return true;
 }
 

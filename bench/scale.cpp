@@ -1,18 +1,16 @@
 // The sparse array from ten thousand to a hundred million cells: time per operation, and bytes per cell of
 // the whole process. A square of cells is filled row by row or in a scattered order.
 #include <benchmark/benchmark.h>
-#include <malloc.h>
 
 #include <array>
 #include <chrono>
 #include <cmath>
 #include <cstdint>
-#include <fstream>
 #include <memory>
 #include <string>
 
-#include "basalt/memory.h"
 #include "basalt/sparse.h"
+#include "bench/resident_memory.h"
 
 namespace {
 
@@ -50,16 +48,6 @@ private:
     std::uint64_t m_stride = 1;
 };
 
-double resident_bytes() {
-    malloc_trim(0);
-    vex_lib::vlSharedMemoryHeap::Compact();
-    std::ifstream status("/proc/self/statm");
-    long total = 0;
-    long resident = 0;
-    status >> total >> resident;
-    return static_cast<double>(resident) * 4096.0;
-}
-
 bool add_element(int, int, const void* element, const void* context) {
     *static_cast<double*>(const_cast<void*>(context)) += static_cast<const double*>(element)[2];
     return true;
@@ -77,7 +65,7 @@ void life(benchmark::State& state, std::uint64_t side, bool scattered) {
     const Order order(side, scattered);
     const auto count = static_cast<double>(order.Count());
     for (auto _ : state) {
-        const double before = resident_bytes();
+        const double before = bench::resident_bytes();
         Sparse2DArray array(sizeof(Record), 16, 64);
         const double insert = nanoseconds([&] {
             order.ForEach([&](int x, int y) {
@@ -85,7 +73,7 @@ void life(benchmark::State& state, std::uint64_t side, bool scattered) {
                 array.Insert(x, y, record.data());
             });
         });
-        state.counters["bytes_per_cell"] = (resident_bytes() - before) / count;
+        state.counters["bytes_per_cell"] = (bench::resident_bytes() - before) / count;
         double sum = 0;
         state.counters["find_ns"] =
             nanoseconds([&] {

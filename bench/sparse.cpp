@@ -1,7 +1,6 @@
 // The sparse array beside a locked flat hash map and a sparse volume. Times are per element unless the row
 // says otherwise; every peer's contents are compared with ours before anything is timed.
 #include <benchmark/benchmark.h>
-#include <malloc.h>
 
 #include <algorithm>
 #include <array>
@@ -10,7 +9,6 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
-#include <fstream>
 #include <functional>
 #include <memory>
 #include <mutex>
@@ -29,8 +27,8 @@
 #include <openvdb/openvdb.h>
 #endif
 
-#include "basalt/memory.h"
 #include "basalt/sparse.h"
+#include "bench/resident_memory.h"
 #include "src/sparse/lock.h"
 
 namespace {
@@ -276,17 +274,6 @@ void add_visit_rows() {
     }
 }
 
-// Resident bytes of this process, with what the heaps keep free given back first.
-double resident_bytes() {
-    malloc_trim(0);
-    vex_lib::vlSharedMemoryHeap::Compact();
-    std::ifstream status("/proc/self/statm");
-    long total = 0;
-    long resident = 0;
-    status >> total >> resident;
-    return static_cast<double>(resident) * 4096.0;
-}
-
 template <class Store>
 void add_memory_row(const std::string& row, const std::vector<Cell>& cells) {
     const auto shared = std::make_shared<std::vector<Cell>>(cells);
@@ -294,9 +281,9 @@ void add_memory_row(const std::string& row, const std::vector<Cell>& cells) {
         (row + "/" + Store::NAME).c_str(),
         [=](benchmark::State& state) {
             for (auto _ : state) {
-                const double before = resident_bytes();
+                const double before = bench::resident_bytes();
                 auto store = filled<Store>(*shared);
-                const double bytes = resident_bytes() - before;
+                const double bytes = bench::resident_bytes() - before;
                 state.SetIterationTime(bytes / static_cast<double>(shared->size()) * 1e-9);
             }
         })

@@ -30,7 +30,8 @@ public:
 /// once, without a visit to any of them.
 ///
 /// The heap grows in regions that double it (up to 32 MiB each); blocks of 1 MiB and more are mapped alone
-/// and go back to the system when freed, as do regions that become wholly free, but for one.
+/// and go back to the system when freed. Regions that become wholly free are kept for the next use up to
+/// 32 MiB; beyond that they go back, and Compact() gives back the rest.
 /// Threads: thread-safe; destruction must be the last call.
 class BASALT_API vlWinHeapAllocator : public vlAllocator {
 public:
@@ -76,12 +77,12 @@ private:
 /// Threads: thread-safe.
 class BASALT_API vlSharedMemoryHeap {
 public:
-    /// As Alloc(); file and line are ignored.
+    /// As Alloc().
     static void* operator new(std::size_t size) noexcept;
     /// The same; file and line are ignored.
     static void* operator new(std::size_t size, const char* file, int line) noexcept;
 
-    /// As Free(); file and line are ignored.
+    /// As Free().
     static void operator delete(void* block) noexcept;
     /// The same; file and line are ignored.
     static void operator delete(void* block, const char* file, int line) noexcept;

@@ -6,6 +6,7 @@
 #define BASALT_SRC_GEO_POLYGON_EDGES_H
 
 #include <cmath>
+#include <cstddef>
 
 #include "basalt/geo.h"
 

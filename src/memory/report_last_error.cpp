@@ -4,18 +4,13 @@
 #include "src/platform/error_message.h"
 
 namespace vex_lib {
-namespace {
-
-constexpr DWORD ALLOCATE_BUFFER = 0x0100;
-constexpr DWORD IGNORE_INSERTS = 0x0200;
-constexpr DWORD FROM_SYSTEM = 0x1000;
-
-}  // namespace
 
 void ReportLastError() {
     const DWORD code = GetLastError();
     wchar_t* message = nullptr;
-    FormatMessageW(ALLOCATE_BUFFER | FROM_SYSTEM | IGNORE_INSERTS, nullptr, code, 0, &message, 0, nullptr);
+    FormatMessageW(
+        FORMAT_MESSAGE_ALLOCATE_BUFFER | FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS, nullptr,
+        code, 0, &message, 0, nullptr);
     OutputDebugStringW(L"ERROR:");
     OutputDebugStringW(message != nullptr ? message : L"");
     OutputDebugStringW(L"\n");

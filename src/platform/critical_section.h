@@ -8,30 +8,22 @@
 
 #include <atomic>
 #include <cstdint>
+#include <new>
+
+#include "src/platform/lock.h"
 
 struct CRITICAL_SECTION {
-    std::atomic<std::uint32_t> held{0};     // 1 while owned; the word that waiting threads sleep on
-    std::atomic<std::uint32_t> waiting{0};  // threads asleep or about to be
+    basalt::platform::Lock lock;
     std::atomic<const void*> owner{nullptr};
     std::uint32_t depth = 0;  // entries of the owner; touched by the owner alone
 };
 
-namespace basalt::platform {
-
-void wait_for_critical_section(CRITICAL_SECTION& section) noexcept;
-void wake_critical_section_waiter(CRITICAL_SECTION& section) noexcept;
-
-}  // namespace basalt::platform
-
 inline void InitializeCriticalSection(CRITICAL_SECTION* section) {
-    section->held.store(0, std::memory_order_relaxed);
-    section->waiting.store(0, std::memory_order_relaxed);
-    section->owner.store(nullptr, std::memory_order_relaxed);
-    section->depth = 0;
+    new (section) CRITICAL_SECTION;
 }
 
 inline void DeleteCriticalSection(CRITICAL_SECTION* section) {
-    InitializeCriticalSection(section);
+    section->~CRITICAL_SECTION();
 }
 
 inline void EnterCriticalSection(CRITICAL_SECTION* section) {
@@ -42,25 +34,15 @@ inline void EnterCriticalSection(CRITICAL_SECTION* section) {
         ++section->depth;
         return;
     }
-    if (section->held.exchange(1, std::memory_order_acquire) != 0) {
-        basalt::platform::wait_for_critical_section(*section);
-    }
+    section->lock.lock();
     section->owner.store(self, std::memory_order_relaxed);
     section->depth = 1;
 }
 
 inline void LeaveCriticalSection(CRITICAL_SECTION* section) {
-    if (--section->depth != 0) {
-        return;
-    }
-    section->owner.store(nullptr, std::memory_order_relaxed);
-    // A plain store and a load instead of a second locked instruction: half the price of a pair. The
-    // processor may run the load before the store is seen; a thread about to sleep makes up for it with a
-    // barrier on every thread of the process.
-    section->held.store(0, std::memory_order_release);
-    std::atomic_signal_fence(std::memory_order_seq_cst);
-    if (section->waiting.load(std::memory_order_relaxed) != 0) {
-        basalt::platform::wake_critical_section_waiter(*section);
+    if (--section->depth == 0) {
+        section->owner.store(nullptr, std::memory_order_relaxed);
+        section->lock.unlock();
     }
 }
 

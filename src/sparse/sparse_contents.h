@@ -15,8 +15,9 @@
 
 namespace vex_util {
 
-// A value without a lock that is built aside and swapped in whole. Every operation that can fail throws
-// std::bad_alloc and leaves everything as it was: room is made everywhere first, then all is entered.
+// A value without a lock that is built aside and swapped in whole. An insertion that fails throws
+// std::bad_alloc and leaves everything as it was: room is made everywhere first, then all is entered. A
+// copy that fails leaves an object that is good for destruction alone.
 class SparseContents {
 public:
     struct ListedBlock {

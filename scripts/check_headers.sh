@@ -4,7 +4,7 @@
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-for header in include/basalt/*.h include/basalt/platform/*.h; do
+for header in include/basalt/*.h include/basalt/*/*.h; do
     for standard in c++17 c++20; do
         for compiler in g++ clang++; do
             echo "#include \"${header#include/}\"" |

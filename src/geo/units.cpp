@@ -1,0 +1,1 @@
+#include "basalt/geo/units.h"

@@ -1,0 +1,1 @@
+#include "basalt/platform/calendar.h"

@@ -70,8 +70,8 @@ TEST(Ellipsoid, RefusesWhatIsNoPlaceAndWritesNothing) {
     for (const geo_vector bad : {geo_vector{NOT_A_NUMBER, 1, 1},
                                  {1, NOT_A_NUMBER, 1},
                                  {1, 1, NOT_A_NUMBER},
-                                 geo_vector{1, 1, 1},
-                                 geo_vector{20e3, 0, 20e3}}) {
+                                 geo_vector{43e3, 0, 1},
+                                 geo_vector{0, -60e3, 20e3}}) {
         EXPECT_EQ(_xyz2llh(&bad, &llh, 5e-10), 0) << bad.x << " " << bad.y << " " << bad.z;
     }
     EXPECT_EQ(llh.latitude, 1.0);

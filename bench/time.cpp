@@ -100,15 +100,17 @@ void row(const char* name, std::vector<Input> inputs, Ask ask, Expected expected
 using Six = std::array<double, 6>;
 
 struct Dms {
-    int degrees, minutes;
+    long degrees, minutes;
     double seconds;
     bool operator==(const Dms&) const = default;
 };
 
 Dms library_dms(double radians) {
-    Dms d = {};
-    _radtodms(radians, &d.degrees, &d.minutes, &d.seconds);
-    return d;
+    int degrees = 0;
+    int minutes = 0;
+    double seconds = 0.0;
+    _radtodms(radians, &degrees, &minutes, &seconds);
+    return {degrees, minutes, seconds};
 }
 
 Dms plain_dms(double radians) {
@@ -116,9 +118,9 @@ Dms plain_dms(double radians) {
     double t = std::fabs(d) * 3600.0 + 5e-6;
     Dms result = {};
     result.degrees = static_cast<int>(t / 3600.0);
-    t -= result.degrees * 3600.0;
+    t -= static_cast<double>(result.degrees) * 3600.0;
     result.minutes = static_cast<int>(t / 60.0);
-    result.seconds = t - result.minutes * 60.0 - 5e-6;
+    result.seconds = t - static_cast<double>(result.minutes) * 60.0 - 5e-6;
     result.degrees = d >= 0.0 ? result.degrees : -result.degrees;
     return result;
 }

@@ -48,16 +48,17 @@ constexpr MonthStart month_start(int month) {
     return {static_cast<std::uint32_t>(367 * (month - 2 - 12 * a) / 12) - DATE_TO_MJD, -a};
 }
 
+/// Two divisions less for the months there are; at this level, since g++ builds a local table anew each call.
+constexpr std::array<MonthStart, 13> MONTH_STARTS = [] {
+    std::array<MonthStart, 13> starts = {};
+    for (int m = 0; m <= 12; ++m) {
+        starts[static_cast<std::size_t>(m)] = month_start(m);
+    }
+    return starts;
+}();
+
 constexpr std::uint32_t days_since_1858(std::uint16_t year, std::uint16_t month, std::uint16_t day) {
-    // Two divisions less for the months there are.
-    constexpr std::array<MonthStart, 13> STARTS = [] {
-        std::array<MonthStart, 13> starts = {};
-        for (int m = 0; m <= 12; ++m) {
-            starts[static_cast<std::size_t>(m)] = month_start(m);
-        }
-        return starts;
-    }();
-    const MonthStart start = month <= 12 ? STARTS[month] : month_start(month);
+    const MonthStart start = month <= 12 ? MONTH_STARTS[month] : month_start(month);
     const auto y = static_cast<std::uint32_t>(year - start.before);
     return day + start.days - 3 * ((y + 4900) / 100) / 4 + 1461 * (y + 4800) / 4;
 }

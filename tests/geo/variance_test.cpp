@@ -28,7 +28,7 @@ Six to_neu(const geo_vector& at, const Six& covariance) {
 TEST(Variance, KeepsAnIsotropicOneInEveryFrame) {
     for (const geo_vector& at : {geo_vector{A, 0.0, 0.0}, {4.0e6, -1.5e6, 4.7e6}, {1.0, 2.0, -6.4e6}}) {
         const Six out = to_neu(at, {4.0, 4.0, 4.0, 0.0, 0.0, 0.0});
-        for (int i = 0; i < 6; ++i) {
+        for (std::size_t i = 0; i < 6; ++i) {
             EXPECT_NEAR(out[i], i < 3 ? 4.0 : 0.0, 1e-14) << i;
         }
     }

@@ -120,14 +120,14 @@ void EsriGridReader::read_header() {
     // A grid in metres read as degrees would give plausible nonsense. A global grid may overshoot its limits
     // by the rounding of a cell size such as 0.000833333.
     constexpr double SLACK = 1e-3;
-    constexpr double FARTHEST_MIDDLE = 89.0;
+    constexpr double WIDEST = 90.0;
     if (m_frame.south < -90.0 - SLACK || m_frame.north() > 90.0 + SLACK || m_frame.west < -360.0 - SLACK ||
         m_frame.east() > 360.0 + SLACK || m_frame.columns * m_frame.cell_size > 360.0 + SLACK) {
         throw InputError(m_scanner.path(), "the grid's corner and cell size are not geographic degrees");
     }
-    if (std::abs(0.5 * (m_frame.south + m_frame.north())) > FARTHEST_MIDDLE) {
+    if (std::max(m_frame.columns, m_frame.rows) * m_frame.cell_size > WIDEST) {
         throw InputError(m_scanner.path(),
-                         "the grid's middle is within a degree of a pole, where a local scale fails");
+                         "the grid is more than 90 degrees wide or high, too much for one plane");
     }
 }
 

@@ -4,32 +4,29 @@
 
 #include <basalt/geo.h>
 
-/// A plane of metres north and east of an origin, by a plain local scale: the lengths of a degree on the
-/// WGS84 ellipsoid along the meridian and along the parallel of the origin.
+/// A plane of metres north and east that touches the WGS84 ellipsoid at an origin, all other places dropped
+/// on it along the origin's plumb line.
 ///
-/// Good to a few ppm along the origin's parallel. Away from it the scale east is off by about 0.157
-/// tan(latitude) ppm for each metre north or south, with opposite signs on the two sides: at latitude 36 a
-/// work area 2 km high is within 120 ppm at its edges, one 30 km high within 0.2 % (east_scale_error says how
-/// much). With the origin at the work area's middle latitude most of this cancels in areas and volumes.
+/// Lengths at the origin are true. Towards or away from it they come out short by about d^2 / 2 R^2 at a
+/// distance d: 1 ppm at 9 km, 120 ppm at 100 km; lengths across that direction stay true to the second order.
 /// Lengths are those on the ellipsoid: 500 m above it the ground is 78 ppm longer.
-///
-/// Source of the radii of curvature: Torge, Geodesy, 2001, section 4.1.
 class LocalPlane {
 public:
     /// Origin in degrees.
     LocalPlane(double longitude, double latitude);
 
-    /// Grid point of a place in degrees, elevation in metres taken over as it is.
+    /// Grid point of a place in degrees. Its elevation is the place's own, in metres, not what is left above
+    /// the plane: that falls away with the earth's curvature, 8 cm at 1 km, and heights are what earthwork
+    /// counts.
     geo_nee to_grid(double longitude, double latitude, double elevation) const;
 
-    /// Relative error of lengths east at a latitude in degrees: positive where the plane stretches.
-    double east_scale_error(double latitude) const;
+    /// How much too short lengths towards the origin are at a place in degrees: 0 at the origin.
+    double shortening(double longitude, double latitude) const;
 
 private:
-    double m_longitude;
-    double m_latitude;
-    double m_metres_north;  // per degree
-    double m_metres_east;
+    geo_nee local(double longitude, double latitude) const;
+
+    geo_vector m_origin;  // Cartesian
 };
 
 #endif

@@ -51,9 +51,11 @@ std::string at_cell(const GridFrame& frame, const Extreme& cell) {
 
 void write_terrain(Sheet& sheet, const Outcome& o) {
     const GridFrame& frame = o.area.frame();
-    const geo_nee first = o.area.centre(0, 0, 0.0);
-    const double east = geo_horz_dist(first, o.area.centre(1, 0, 0.0));
-    const double north = geo_horz_dist(first, o.area.centre(0, 1, 0.0));
+    const int x = frame.columns / 2;
+    const int y = frame.rows / 2;
+    const geo_nee middle = o.area.centre(x, y, 0.0);
+    const double east = geo_horz_dist(middle, o.area.centre(x + 1, y, 0.0));
+    const double north = geo_horz_dist(middle, o.area.centre(x, y + 1, 0.0));
     constexpr double SECONDS_PER_DEGREE = 3600.0;
     sheet.section("Terrain");
     sheet.text("Source", o.options.synthetic ? "generated" : o.options.terrain);
@@ -65,9 +67,13 @@ void write_terrain(Sheet& sheet, const Outcome& o) {
     sheet.line("Cells with elevation", number_text(o.area.cells()));
     sheet.line("Cell side", number_text(frame.cell_size * SECONDS_PER_DEGREE, 3),
                "arc-seconds: " + number_text(east, 3) + " m east, " + number_text(north, 3) + " m north");
-    const double error = std::max(std::abs(o.area.plane().east_scale_error(frame.south)),
-                                  std::abs(o.area.plane().east_scale_error(frame.north())));
-    sheet.line("Scale error east", number_text(error * MEGA, 0), "ppm at most, at the south and north edges");
+    double shortest = 0.0;
+    for (const double longitude : {frame.west, frame.east()}) {
+        for (const double latitude : {frame.south, frame.north()}) {
+            shortest = std::max(shortest, o.area.plane().shortening(longitude, latitude));
+        }
+    }
+    sheet.line("Lengths too short by", number_text(shortest * MEGA, 1), "ppm at most, at the corners");
 }
 
 /// Area by the cross products of neighbouring vertices, taken from the first vertex.

@@ -38,9 +38,10 @@ Gradient gradient(double before, double here, double after, double step) {
 
 void store_row(WorkArea& area, int y, const std::vector<double>& north, const std::vector<double>& row,
                const std::vector<double>& south) {
-    const geo_nee first = area.centre(0, y, 0.0);
-    const double step_east = geo_horz_dist(first, area.centre(1, y, 0.0));
-    const double step_north = geo_horz_dist(first, area.centre(0, y + 1, 0.0));
+    const int middle = area.frame().columns / 2;
+    const geo_nee first = area.centre(middle, y, 0.0);
+    const double step_east = geo_horz_dist(first, area.centre(middle + 1, y, 0.0));
+    const double step_north = geo_horz_dist(first, area.centre(middle, y + 1, 0.0));
     const std::size_t columns = row.size();
     for (std::size_t i = 0; i < columns; ++i) {
         if (!has_elevation(row[i])) {

@@ -12,10 +12,12 @@ geo_nee WorkArea::centre(int x, int y, double elevation) const {
 double WorkArea::cell_area(int y) const {
     const double south = m_frame.south + y * m_frame.cell_size;
     const double north = m_frame.south + (y + 1) * m_frame.cell_size;
-    const double east = m_frame.west + m_frame.cell_size;
-    const geo_nee south_west = m_plane.to_grid(m_frame.west, south, 0.0);
+    // The row's cells are equal on the ellipsoid; in the plane the middle one is the least shortened.
+    const double west = m_frame.west + (m_frame.columns / 2) * m_frame.cell_size;
+    const double east = m_frame.west + (m_frame.columns / 2 + 1) * m_frame.cell_size;
+    const geo_nee south_west = m_plane.to_grid(west, south, 0.0);
     const geo_nee south_east = m_plane.to_grid(east, south, 0.0);
-    const geo_nee north_west = m_plane.to_grid(m_frame.west, north, 0.0);
+    const geo_nee north_west = m_plane.to_grid(west, north, 0.0);
     const geo_nee north_east = m_plane.to_grid(east, north, 0.0);
     return geo_triangle_area(south_west, south_east, north_east) +
            geo_triangle_area(south_west, north_east, north_west);

@@ -70,11 +70,16 @@ double smallest_radius(const Element& element, double from, double to) {
     return element.radius;
 }
 
-/// Length of arc whose chord stands off by the sagitta.
-double arc_within(double radius, double sagitta) {
+/// Into how many pieces a length has to be cut so that their chords stay within the sagitta.
+double pieces_within(double sagitta, double radius, double length) {
+    if (radius == GEO_INFINITY) {
+        return 1.0;
+    }
     // From the radius on a half turn would do; half the chord is then the radius itself.
     const double half = sagitta < radius ? geo_arc_to_chord(radius, sagitta) : radius;
-    return geo_arc_angle_to_length(2.0 * std::asin(half / radius), radius);
+    const double piece = geo_arc_angle_to_length(2.0 * std::asin(half / radius), radius);
+    constexpr double ROUNDING = 1e-9;
+    return std::max(1.0, std::ceil(length / piece - ROUNDING));
 }
 
 double stand_off(double radius, double arc) {
@@ -142,16 +147,14 @@ std::vector<ChainagePoint> set_out_axis(const Alignment& alignment, double inter
         const std::vector<double> at = stops(chainage, element.length, interval);
         for (std::size_t i = 1; i < at.size(); ++i) {
             const double gap = at[i] - at[i - 1];
-            const double radius = smallest_radius(element, at[i - 1], at[i]);
-            const double pieces = radius == GEO_INFINITY
-                                      ? 1.0
-                                      : std::max(1.0, std::ceil(gap / arc_within(radius, sagitta) - 1e-9));
-            last_stand_off = stand_off(radius, gap / pieces);
+            const double pieces = pieces_within(sagitta, smallest_radius(element, at[i - 1], at[i]), gap);
             for (double piece = 1.0; piece <= pieces; piece += 1.0) {
+                const double length = at[i - 1] + gap * (piece / pieces);
+                last_stand_off =
+                    stand_off(smallest_radius(element, length - gap / pieces, length), gap / pieces);
                 if (i + 1 == at.size() && piece == pieces) {
                     break;  // the element's end, which is the next one's start
                 }
-                const double length = at[i - 1] + gap * (piece / pieces);
                 points.push_back(
                     {chainage + length, along(element, start, alignment.grade, length), "", last_stand_off});
             }

@@ -129,25 +129,29 @@ private:
         }
     }
 
-    geo_hvd read_observation(bool second_face) const {
-        geo_hvd obs = {};
-        const char* const angle = "an angle from 0 to below 360 degrees, as 12.5 or 12-30-00";
-        const auto angle_at = [&](std::size_t index) {
-            const std::optional<double> value = parse_angle(m_csv.text(index, angle));
-            if (!value) {
-                m_csv.fail(index, angle);
-            }
-            return *value;
-        };
-        obs.horizontal = angle_at(3);
-        obs.vertical = angle_at(4);
-        const double low = second_face ? 181.0 : 1.0;
-        if (obs.vertical < low * RADIANS_PER_DEGREE || obs.vertical > (low + 178.0) * RADIANS_PER_DEGREE) {
-            m_csv.fail(4, second_face ? "a zenith angle from 181 to 359 degrees on face 2"
-                                      : "a zenith angle from 1 to 179 degrees on face 1");
+    double angle_at(std::size_t index) const {
+        const char* const expected = "an angle from 0 to below 360 degrees, as 12.5 or 12-30-00";
+        const std::optional<double> angle = parse_angle(m_csv.text(index, expected));
+        if (!angle) {
+            m_csv.fail(index, expected);
         }
-        obs.distance = m_csv.number(5, "a slope distance from 0.01 to 100000 metres", 0.01, LONGEST_SIGHT);
-        return obs;
+        return *angle;
+    }
+
+    /// The face of the current line, which its zenith angle has to agree with.
+    bool is_second_face(double zenith) const {
+        const char* const faces = "face 1 or 2";
+        const std::string_view face = m_csv.text(6, faces);
+        if (face != "1" && face != "2") {
+            m_csv.fail(6, faces);
+        }
+        const bool second = face == "2";
+        const double low = second ? 181.0 : 1.0;
+        if (zenith < low * RADIANS_PER_DEGREE || zenith > (low + 178.0) * RADIANS_PER_DEGREE) {
+            m_csv.fail(4, second ? "a zenith angle from 181 to 359 degrees on face 2"
+                                 : "a zenith angle from 1 to 179 degrees on face 1");
+        }
+        return second;
     }
 
     void read_sight(SightKind kind) {
@@ -156,12 +160,11 @@ private:
         }
         const std::string target = name(1, "the name of a target");
         const double height = m_csv.number(2, "a target height in metres", -LARGEST_HEIGHT, LARGEST_HEIGHT);
-        const char* const faces = "face 1 or 2";
-        const std::string_view face = m_csv.text(6, faces);
-        if (face != "1" && face != "2") {
-            m_csv.fail(6, faces);
-        }
-        const geo_hvd obs = read_observation(face == "2");
+        geo_hvd obs = {};
+        obs.horizontal = angle_at(3);
+        obs.vertical = angle_at(4);
+        obs.distance = m_csv.number(5, "a slope distance from 0.01 to 100000 metres", 0.01, LONGEST_SIGHT);
+        const bool second_face = is_second_face(obs.vertical);
         m_csv.expect_end(7);
         check_target(kind, target);
 
@@ -177,7 +180,7 @@ private:
         if (sight->height != height) {
             m_csv.fail(2, "the same target height as on the other face");
         }
-        std::optional<geo_hvd>& slot = face == "2" ? sight->face2 : sight->face1;
+        std::optional<geo_hvd>& slot = second_face ? sight->face2 : sight->face1;
         if (slot) {
             m_csv.fail(6, "one reading a face to " + in_quotes(target));
         }

@@ -1,3 +1,4 @@
+#include <cstddef>
 #include <initializer_list>
 
 #include "number_text.h"
@@ -47,7 +48,8 @@ std::string fields(std::initializer_list<std::string> values) {
 
 std::string setting_out_fields(const Results& results, const ResultPoint& point) {
     if (!point.setting_out) {
-        return ",,,,,,";
+        constexpr std::size_t FIELDS = 7;
+        return std::string(FIELDS, ',');
     }
     const SettingOut& out = *point.setting_out;
     const Setup& setup = results.book.setups[out.setup];

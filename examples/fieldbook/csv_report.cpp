@@ -1,4 +1,3 @@
-#include <cstddef>
 #include <initializer_list>
 
 #include "number_text.h"
@@ -48,8 +47,7 @@ std::string fields(std::initializer_list<std::string> values) {
 
 std::string setting_out_fields(const Results& results, const ResultPoint& point) {
     if (!point.setting_out) {
-        constexpr std::size_t FIELDS = 7;
-        return std::string(FIELDS, ',');
+        return ",,,,,,,";  // seven empty fields
     }
     const SettingOut& out = *point.setting_out;
     const Setup& setup = results.book.setups[out.setup];

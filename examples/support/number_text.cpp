@@ -19,7 +19,7 @@ std::string unsigned_text(double value, int decimals) {
     char text[400];  // the largest double has 309 digits
     const auto result =
         std::to_chars(text, text + sizeof text, std::abs(value), std::chars_format::fixed, decimals);
-    return std::string(text, result.ptr);
+    return {text, result.ptr};
 }
 
 std::string sign_of(double value, const std::string& digits) {

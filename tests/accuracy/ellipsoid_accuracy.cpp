@@ -1,4 +1,4 @@
-#include <array>
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 
@@ -44,10 +44,11 @@ void forward(const std::vector<ReferenceRow>& rows) {
 }
 
 void backward(const std::vector<ReferenceRow>& rows, double tolerance, const char* toleranceText) {
-    const std::vector<std::string> quantities = {"latitude, rad", "longitude, rad", "horizontal, m",
-                                                 "height, m"};
+    const std::vector<std::string> quantities = {"latitude, rad", "longitude, rad x cos latitude",
+                                                 "horizontal, m", "height, m"};
     ErrorTable byHeight(HEIGHT_BANDS, HEIGHT_BOUNDS, quantities);
     ErrorTable byLatitude(LATITUDE_BANDS, LATITUDE_BOUNDS, quantities);
+    long double outermostRefused = 0.0L;
     for (const ReferenceRow& row : rows) {
         const geo_vector xyz = {static_cast<double>(row[3]), static_cast<double>(row[4]),
                                 static_cast<double>(row[5])};
@@ -56,6 +57,7 @@ void backward(const std::vector<ReferenceRow>& rows, double tolerance, const cha
         geo_llh llh = {};
         if (_xyz2llh(&xyz, &llh, tolerance) == 0) {
             byHeight.add_refusal(height);
+            outermostRefused = std::max(outermostRefused, std::hypot(row[3], row[4], row[5]));
             if (height >= LOWEST) {
                 byLatitude.add_refusal(latitude);
             }
@@ -79,6 +81,7 @@ void backward(const std::vector<ReferenceRow>& rows, double tolerance, const cha
     }
     std::printf("### Cartesian to geodetic, `_xyz2llh`, tolerance %s\n", toleranceText);
     byHeight.print("height");
+    std::printf("The outermost point refused lies %.0Lf km from the centre.\n\n", outermostRefused / 1000.0L);
     std::printf("By latitude, heights from -11 km to 20,000 km:\n");
     byLatitude.print("latitude, either side");
 }

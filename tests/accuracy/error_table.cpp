@@ -61,17 +61,22 @@ void ErrorTable::add_refusal(double value) {
 }
 
 void ErrorTable::print(const char* bandTitle) const {
-    std::printf("\n| %s | cases | refused |", bandTitle);
+    const bool refusing =
+        std::any_of(m_bands.begin(), m_bands.end(), [](const Band& band) { return band.refusals != 0; });
+    std::printf("\n| %s | cases |%s", bandTitle, refusing ? " refused |" : "");
     for (const std::string& quantity : m_quantities) {
         std::printf(" %s |", quantity.c_str());
     }
-    std::printf("\n|---|---|---|");
+    std::printf("\n|---|---|%s", refusing ? "---|" : "");
     for (std::size_t i = 0; i < m_quantities.size(); ++i) {
         std::printf("---|");
     }
     std::printf("\n");
     for (const Band& band : m_bands) {
-        std::printf("| %s | %d | %d |", band.name.c_str(), band.count, band.refusals);
+        std::printf("| %s | %d |", band.name.c_str(), band.count);
+        if (refusing) {
+            std::printf(" %d |", band.refusals);
+        }
         for (const ErrorSizes& sizes : band.sizes) {
             std::printf(" %s |", sizes.text().c_str());
         }

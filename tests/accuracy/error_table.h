@@ -30,6 +30,7 @@ public:
     /// The errors of a value of the band variable; values outside all bands are left out.
     void add(double value, const std::vector<long double>& errors);
     void add_refusal(double value);
+    /// The column of refusals is left out when there are none.
     void print(const char* bandTitle) const;
 
 private:

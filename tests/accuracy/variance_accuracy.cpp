@@ -1,7 +1,9 @@
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <cstdio>
 #include <random>
+#include <utility>
 
 #include "basalt/geo/variance.h"
 #include "tests/accuracy/accuracy.h"

@@ -21,9 +21,9 @@ columns() { tr -s ' \t' ',' ; }
 write_points() {  # count, file
     "$accuracy" points "$1" >"$build/points.txt"
     {
-        echo "# Made by CartConvert -p 12 ($geographiclib, WGS84)."
+        echo "# Made by CartConvert -p 10 ($geographiclib, WGS84)."
         echo "# Columns: latitude, longitude (degrees), height, x, y, z (metres)."
-        paste -d' ' "$build/points.txt" <(CartConvert -p 12 <"$build/points.txt") | columns
+        paste -d' ' "$build/points.txt" <(CartConvert -p 10 <"$build/points.txt") | columns
     } >"$2"
 }
 

@@ -52,8 +52,8 @@ void backward(const std::vector<ReferenceRow>& rows, double tolerance, const cha
     for (const ReferenceRow& row : rows) {
         const geo_vector xyz = {static_cast<double>(row[3]), static_cast<double>(row[4]),
                                 static_cast<double>(row[5])};
-        const double height = static_cast<double>(row[2]);
-        const double latitude = static_cast<double>(std::abs(row[0]));
+        const auto height = static_cast<double>(row[2]);
+        const auto latitude = static_cast<double>(std::abs(row[0]));
         geo_llh llh = {};
         if (_xyz2llh(&xyz, &llh, tolerance) == 0) {
             byHeight.add_refusal(height);

@@ -19,7 +19,7 @@ const std::vector<double> DISTANCE_BOUNDS = {1.0, 10.0, 100.0, 1e3, 1e4, 1e5, 1e
 /// A point whose foot and distance are known: from the middle of the line, a tenth of its length to the
 /// right.
 void crosstrack(const ReferenceRow& row, const geo_llh& start, const geo_llh& end, ErrorTable& table) {
-    const double length = static_cast<double>(row[3]);
+    const auto length = static_cast<double>(row[3]);
     const double offset = length / 10.0;
     double azimuth = 0.0;
     geo_llh middle = {};
@@ -41,7 +41,7 @@ void measure_geodesic(const std::vector<ReferenceRow>& rows) {
     for (const ReferenceRow& row : rows) {
         const geo_llh start = {static_cast<double>(radians_of(row[0])),
                                static_cast<double>(radians_of(row[1])), 0.0};
-        const double distance = static_cast<double>(row[3]);
+        const auto distance = static_cast<double>(row[3]);
         double azimuth = 0.0;
         geo_llh end = {};
         geo_vincenty_direct(start, static_cast<double>(radians_of(row[2])), distance, azimuth, end);

@@ -55,7 +55,7 @@ TEST(ReferenceValues, CartesianToGeodeticIsRightWithinItsTolerance) {
     for (const double tolerance : {5e-10, 5e-9}) {
         for (const ReferenceRow& row : rows) {
             const geo_vector xyz = vector_of(row);
-            const double height = static_cast<double>(row[2]);
+            const auto height = static_cast<double>(row[2]);
             // Deeper down the iteration slows until it refuses.
             if (height < -5000e3) {
                 continue;

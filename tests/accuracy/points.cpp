@@ -1,0 +1,80 @@
+#include <array>
+#include <cmath>
+#include <cstdio>
+#include <random>
+
+#include "tests/accuracy/accuracy.h"
+
+namespace accuracy {
+
+namespace {
+
+/// The standard's distributions differ between libraries, its generators do not.
+class Random {
+public:
+    double between(double low, double high) {
+        return low + (high - low) * static_cast<double>(m_engine() >> 11) * 0x1p-53;
+    }
+    int below(int count) { return static_cast<int>(between(0.0, count)); }
+
+private:
+    std::mt19937_64 m_engine{20261124};
+};
+
+double latitude(Random& random) {
+    constexpr double RAD = 57.29577951308232;
+    const double sign = random.below(2) == 0 ? 1.0 : -1.0;
+    switch (random.below(8)) {
+        case 0:
+            return sign * std::pow(10.0, random.between(-9.0, 0.0));
+        case 1:
+            return sign * (80.0 + random.between(-0.01, 0.01));
+        case 2:
+            return sign * (90.0 - std::pow(10.0, random.between(-9.0, 1.0)));
+        case 3:
+            return sign * std::array{0.0, 45.0, 80.0, 90.0}[static_cast<std::size_t>(random.below(4))];
+        default:
+            return std::asin(random.between(-1.0, 1.0)) * RAD;
+    }
+}
+
+double longitude(Random& random) {
+    switch (random.below(8)) {
+        case 0:
+            return std::array{-180.0, -90.0, 0.0, 90.0, 180.0}[static_cast<std::size_t>(random.below(5))];
+        case 1:
+            return (random.below(2) == 0 ? 180.0 : -180.0) *
+                   (1.0 - std::pow(10.0, random.between(-12.0, -2.0)));
+        default:
+            return random.between(-180.0, 180.0);
+    }
+}
+
+}  // namespace
+
+void print_points(int count) {
+    // Each height band the tables tell apart is met equally often, the deep ones less.
+    constexpr std::array BOUNDS = {-6350e3, -6200e3, -6100e3, -6000e3, -1000e3, -11e3,
+                                   0.0,     1e3,     10e3,    100e3,   1000e3,  20000e3};
+    Random random;
+    for (int i = 0; i < count; ++i) {
+        const int band = i % 4 == 0 ? random.below(5) : 5 + random.below(6);
+        const double height = random.between(BOUNDS[static_cast<std::size_t>(band)],
+                                             BOUNDS[static_cast<std::size_t>(band) + 1]);
+        const double lat = latitude(random);
+        std::printf("%.14f %.14f %.7f\n", lat, longitude(random), height);
+    }
+}
+
+void print_lines(int count) {
+    Random random;
+    for (int i = 0; i < count; ++i) {
+        const double azimuth =
+            random.below(8) == 0 ? -180.0 + 90.0 * random.below(5) : random.between(-180.0, 180.0);
+        const double distance = 2.0 * std::pow(10.0, random.between(-0.30103, 7.0));
+        const double lat = latitude(random);
+        std::printf("%.14f %.14f %.14f %.9f\n", lat, longitude(random), azimuth, distance);
+    }
+}
+
+}  // namespace accuracy

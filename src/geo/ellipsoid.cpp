@@ -162,7 +162,8 @@ int _xyz2llh(const geo_vector* xyz, geo_llh* llh, double tolerance) {
     }
     const double p = std::sqrt(xyz->x * xyz->x + xyz->y * xyz->y);
     geo_llh result = {};
-    // First, so that its arctangent fills the time the roots and divisions of the latitude wait for each other.
+    // First, so that its arctangent fills the time the roots and divisions of the latitude wait for each
+    // other.
     result.longitude = std::atan2(xyz->y, xyz->x);
     if (!convert_quickly(p, xyz->z, tolerance, result) && !convert_plainly(p, xyz->z, tolerance, result)) {
         return 0;

@@ -1,0 +1,8 @@
+/// @file
+/// Support utilities: timers.
+#ifndef BASALT_UTIL_H
+#define BASALT_UTIL_H
+
+#include "basalt/util/timers.h"
+
+#endif

@@ -1,8 +1,9 @@
 /// @file
-/// Support utilities: timers.
+/// Support utilities: file log and timers.
 #ifndef BASALT_UTIL_H
 #define BASALT_UTIL_H
 
+#include "basalt/util/file_logger.h"
 #include "basalt/util/timers.h"
 
 #endif

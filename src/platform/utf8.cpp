@@ -94,6 +94,17 @@ std::string utf8_from_wide(std::wstring_view text) {
     return result;
 }
 
+char* write_utf8(std::wstring_view text, char* bytes) {
+    for (const wchar_t ch : text) {
+        if (static_cast<char32_t>(ch) < 0x80) {
+            *bytes++ = static_cast<char>(ch);
+        } else {
+            bytes += encode_utf8(ch, bytes);
+        }
+    }
+    return bytes;
+}
+
 std::wstring wide_from_utf8(std::string_view text) {
     std::wstring result;
     result.reserve(text.size());

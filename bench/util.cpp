@@ -6,10 +6,22 @@
 #include <cwchar>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <memory>
+#include <random>
 #include <string>
+#include <vector>
 
 #include "basalt/util.h"
+#include "tests/util/plain_hex.h"
+
+#ifdef BENCH_HAS_ABSL
+#include <absl/strings/escaping.h>
+#endif
+#if __has_include(<boost/algorithm/hex.hpp>)
+#define HAS_BOOST_HEX 1
+#include <boost/algorithm/hex.hpp>
+#endif
 
 #ifdef BENCH_HAS_SPDLOG
 #include <spdlog/sinks/basic_file_sink.h>
@@ -17,6 +29,85 @@
 #endif
 
 namespace {
+
+using Bytes = std::vector<unsigned char>;
+
+Bytes some_bytes(const benchmark::State& state) {
+    std::mt19937 random(1);
+    Bytes bytes(static_cast<std::size_t>(state.range(0)));
+    for (unsigned char& byte : bytes) {
+        byte = static_cast<unsigned char>(random());
+    }
+    return bytes;
+}
+
+template <class Encode>
+void run_encode(benchmark::State& state, const Encode& encode) {
+    const Bytes bytes = some_bytes(state);
+    if (encode(bytes) != basalt::VectorToHexString(bytes)) {
+        state.SkipWithError("answers differ");
+        return;
+    }
+    for ([[maybe_unused]] auto _ : state) {
+        benchmark::DoNotOptimize(encode(bytes));
+    }
+}
+
+template <class Decode>
+void run_decode(benchmark::State& state, const Decode& decode) {
+    const Bytes bytes = some_bytes(state);
+    const std::string text = basalt::VectorToHexString(bytes);
+    const auto decoded = decode(text);
+    if (!std::equal(bytes.begin(), bytes.end(), decoded.begin(), decoded.end(),
+                    [](unsigned char a, auto b) { return a == static_cast<unsigned char>(b); })) {
+        state.SkipWithError("answers differ");
+        return;
+    }
+    for ([[maybe_unused]] auto _ : state) {
+        benchmark::DoNotOptimize(decode(text));
+    }
+}
+
+void hex_encode_basalt(benchmark::State& state) {
+    run_encode(state, basalt::VectorToHexString);
+}
+void hex_encode_table_loop(benchmark::State& state) {
+    run_encode(state, plain::encode_hex);
+}
+void hex_decode_basalt(benchmark::State& state) {
+    run_decode(state, basalt::HexStringToVector);
+}
+void hex_decode_table_loop(benchmark::State& state) {
+    run_decode(state, plain::decode_hex);
+}
+#ifdef BENCH_HAS_ABSL
+void hex_encode_abseil(benchmark::State& state) {
+    run_encode(state, [](const Bytes& bytes) {
+        return absl::BytesToHexString({reinterpret_cast<const char*>(bytes.data()), bytes.size()});
+    });
+}
+void hex_decode_abseil(benchmark::State& state) {
+    run_decode(state, [](const std::string& text) { return absl::HexStringToBytes(text); });
+}
+#endif
+#ifdef HAS_BOOST_HEX
+void hex_encode_boost(benchmark::State& state) {
+    run_encode(state, [](const Bytes& bytes) {
+        std::string digits;
+        digits.reserve(2 * bytes.size());
+        boost::algorithm::hex_lower(bytes, std::back_inserter(digits));
+        return digits;
+    });
+}
+void hex_decode_boost(benchmark::State& state) {
+    run_decode(state, [](const std::string& text) {
+        Bytes bytes;
+        bytes.reserve(text.size() / 2);
+        boost::algorithm::unhex(text, std::back_inserter(bytes));
+        return bytes;
+    });
+}
+#endif
 
 constexpr char LINE[] = "2021-02-01 12:00:00.250 RTK fixed, 14 satellites, age 0.8 s, HDOP 0.7, 3.1 mm";
 
@@ -96,6 +187,27 @@ void log_line_spdlog(benchmark::State& state) {
         return [log = std::make_shared<spdlog::logger>("bench", sink)] { log->info(LINE); };
     });
 }
+#endif
+
+void sizes(benchmark::internal::Benchmark* row) {
+    row->ArgName("bytes")->Arg(6)->Arg(65536);
+}
+
+BENCHMARK(hex_encode_basalt)->Name("hex_encode/basalt")->Apply(sizes);
+BENCHMARK(hex_encode_table_loop)->Name("hex_encode/table_loop")->Apply(sizes);
+#ifdef BENCH_HAS_ABSL
+BENCHMARK(hex_encode_abseil)->Name("hex_encode/abseil")->Apply(sizes);
+#endif
+#ifdef HAS_BOOST_HEX
+BENCHMARK(hex_encode_boost)->Name("hex_encode/boost")->Apply(sizes);
+#endif
+BENCHMARK(hex_decode_basalt)->Name("hex_decode/basalt")->Apply(sizes);
+BENCHMARK(hex_decode_table_loop)->Name("hex_decode/table_loop")->Apply(sizes);
+#ifdef BENCH_HAS_ABSL
+BENCHMARK(hex_decode_abseil)->Name("hex_decode/abseil")->Apply(sizes);
+#endif
+#ifdef HAS_BOOST_HEX
+BENCHMARK(hex_decode_boost)->Name("hex_decode/boost")->Apply(sizes);
 #endif
 
 // A fixed number of lines, so that every file has the same size.

@@ -1,9 +1,10 @@
 /// @file
-/// Support utilities: file log and timers.
+/// Support utilities: file log, hexadecimal text and timers.
 #ifndef BASALT_UTIL_H
 #define BASALT_UTIL_H
 
 #include "basalt/util/file_logger.h"
+#include "basalt/util/hex.h"
 #include "basalt/util/timers.h"
 
 #endif

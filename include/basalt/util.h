@@ -1,10 +1,11 @@
 /// @file
-/// Support utilities: file log, hexadecimal text and timers.
+/// Support utilities: file log, hexadecimal text, timers and version information.
 #ifndef BASALT_UTIL_H
 #define BASALT_UTIL_H
 
 #include "basalt/util/file_logger.h"
 #include "basalt/util/hex.h"
 #include "basalt/util/timers.h"
+#include "basalt/util/version_info.h"
 
 #endif

@@ -5,23 +5,20 @@
 #include <stdio_ext.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <cerrno>
 #include <climits>
 #include <string>
 
 #include "src/platform/code_page.h"
-#include "src/platform/utf8.h"
+#include "src/platform/system_file_name.h"
 
 namespace {
 
-// The system's form of a narrow path: file names are UTF-8 whatever the code page.
-std::string system_path(const char* path) {
+// Bytes that are no text cannot be told in another encoding, so such a name is left as it is.
+std::string file_name(const char* path) {
     const std::wstring wide = basalt::platform::widen(path);
     const bool is_text = wide.find(basalt::platform::REPLACEMENT_CHARACTER) == std::wstring::npos;
-    std::string name = is_text ? basalt::platform::utf8_from_wide(wide) : path;
-    std::replace(name.begin(), name.end(), '\\', '/');
-    return name;
+    return is_text ? basalt::platform::system_file_name(wide) : path;
 }
 
 }  // namespace
@@ -35,7 +32,7 @@ int fopen_s(std::FILE** stream, const char* path, const char* mode) {
         return EINVAL;
     }
     const int file =
-        ::open(system_path(path).c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_APPEND | O_CLOEXEC, 0666);
+        ::open(file_name(path).c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_APPEND | O_CLOEXEC, 0666);
     if (file < 0) {
         return errno;
     }

@@ -7,8 +7,8 @@
 
 // Opens a file for writing: created, or emptied when it exists. What is written goes to the file's end as it
 // then is, so two streams on one file do not overwrite each other. A child process does not inherit it.
-// The path is narrow text in the active code page, either separator; bytes that are no character of it go to
-// the system as they are. The mode is "w", the only one there is.
+// The path is narrow text in the active code page, either separator; a path with bytes that are no
+// character of it goes to the system as it is. The mode is "w", the only one there is.
 // Failure: an errno value (EINVAL for a null argument or another mode) and a null stream; 0 is success.
 // Threads: reentrant.
 int fopen_s(std::FILE** stream, const char* path, const char* mode);

@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "basalt/util.h"
+#include "tests/support/failing_new.h"
 #include "tests/util/plain_hex.h"
 
 #ifdef BENCH_HAS_ABSL

@@ -31,6 +31,7 @@ constinit double HiResTimer::s_llFrequency = 0.0;
 
 HiResTimer::HiResTimer() : HiResTimer(CString(), false) {}
 
+// NOLINTNEXTLINE(modernize-pass-by-value): the published signature
 HiResTimer::HiResTimer(const CString& name, bool flag) : m_name(name), m_flag(flag) {
     determine_tick_length();
     Reset();

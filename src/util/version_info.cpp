@@ -100,6 +100,9 @@ void VersionInfo::take_texts() {
     }
 }
 
+// The published signatures are not const.
+// NOLINTBEGIN(readability-make-member-function-const)
+
 int VersionInfo::GetMajorVersion() {
     return m_major;
 }
@@ -145,3 +148,5 @@ CString VersionInfo::GetVersionString() {
     text.Format(L"%s %02d.%02d.%02d.%02d", m_product_name, m_major, m_minor, m_schema, m_build);
     return text;
 }
+
+// NOLINTEND(readability-make-member-function-const)

@@ -14,6 +14,10 @@ std::int64_t read_counter() {
     return count.QuadPart;
 }
 
+double seconds(std::int64_t ticks) {
+    return static_cast<double>(ticks) * HiResTimer::s_llFrequency;
+}
+
 // Stored within the one initialisation that every constructor waits for, so that no timer reads the shared
 // value while another thread writes it.
 void determine_tick_length() {
@@ -41,13 +45,9 @@ void HiResTimer::Reset() {
     m_start = read_counter();
 }
 
-double HiResTimer::read_ticks() {
-    m_last_reading = read_counter();
-    return static_cast<double>(m_last_reading - m_start);
-}
-
 float HiResTimer::GetElapsedS() {
-    return static_cast<float>(read_ticks() * s_llFrequency);
+    m_last_reading = read_counter();
+    return static_cast<float>(seconds(m_last_reading - m_start));
 }
 
 float HiResTimer::GetElapsed() {
@@ -55,7 +55,8 @@ float HiResTimer::GetElapsed() {
 }
 
 unsigned long HiResTimer::GetElapsedMs() {
-    const auto milliseconds = static_cast<std::int64_t>(read_ticks() * s_llFrequency * 1000.0);
+    m_last_reading = read_counter();
+    const auto milliseconds = static_cast<std::int64_t>(seconds(m_last_reading - m_start) * 1000.0);
     return static_cast<std::uint32_t>(milliseconds);
 }
 

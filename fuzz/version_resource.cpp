@@ -29,11 +29,8 @@ void query(const Bytes& block, const wchar_t* path, std::size_t unit) {
     const auto* const first = static_cast<const unsigned char*>(value);
     require(first >= block.data() && first <= block.data() + block.size());
     const auto room = static_cast<std::size_t>(block.data() + block.size() - first);
-    // A text where another value is looked for has its length in units.
-    require(length <= room);
-    if (length * unit <= room) {
-        require(basalt::platform::wide_from_utf16(value, length * unit / 2).size() <= length);
-    }
+    require(length * unit <= room);
+    require(basalt::platform::wide_from_utf16(value, length * unit / 2).size() <= length);
 }
 
 void query_all(const Bytes& block) {

@@ -16,13 +16,23 @@ constexpr std::size_t align_4(std::size_t offset) {
     return (offset + 3) & ~std::size_t{3};
 }
 
+constexpr std::wstring_view STRINGS = L"\\StringFileInfo\\";
+
+constexpr wchar_t lower(wchar_t ch) {
+    return ch >= L'A' && ch <= L'Z' ? ch - L'A' + L'a' : ch;
+}
+
+bool is_same_key(std::wstring_view a, std::wstring_view b) {
+    return std::equal(a.begin(), a.end(), b.begin(), b.end(),
+                      [](wchar_t x, wchar_t y) { return lower(x) == lower(y); });
+}
+
 // A node by its offsets from the block's start.
 struct Node {
     std::size_t key;
     std::size_t key_length;  // units
     std::size_t value;
     std::size_t value_size;  // bytes
-    bool is_text;
     std::size_t children;
     std::size_t end;
 };
@@ -57,12 +67,12 @@ public:
         }
         node.key_length = (terminator - node.key) / 2;
         node.value = std::min(align_4(terminator + 2), node.end);
-        node.is_text = word(offset + 4) == 1;
-        node.value_size = word(offset + 2) * (node.is_text ? 2 : 1);
+        const bool is_text = word(offset + 4) == 1;
+        node.value_size = word(offset + 2) * (is_text ? 2 : 1);
         const std::size_t room = node.end - node.value;
         if (node.value_size > room) {
             // Some tools count a text's bytes; it still ends at its terminator.
-            if (!node.is_text) {
+            if (!is_text) {
                 return std::nullopt;
             }
             node.value_size = room & ~std::size_t{1};
@@ -85,18 +95,13 @@ public:
     }
 
 private:
-    static wchar_t lower(wchar_t ch) { return ch >= L'A' && ch <= L'Z' ? ch - L'A' + L'a' : ch; }
-
     bool has_key(const Node& node, std::wstring_view key) const {
-        if (node.key_length != key.size()) {
-            return false;
+        std::size_t i = 0;
+        while (i < node.key_length && i < key.size() &&
+               lower(static_cast<wchar_t>(word(node.key + 2 * i))) == lower(key[i])) {
+            ++i;
         }
-        for (std::size_t i = 0; i < key.size(); ++i) {
-            if (lower(static_cast<wchar_t>(word(node.key + 2 * i))) != lower(key[i])) {
-                return false;
-            }
-        }
-        return true;
+        return i == node.key_length && i == key.size();
     }
 
     const unsigned char* m_bytes;
@@ -133,7 +138,9 @@ BOOL VerQueryValueW(const void* block, const wchar_t* path, void** value, UINT* 
         return 0;
     }
     *value = const_cast<unsigned char*>(nodes.at(node->value));
-    *length = static_cast<UINT>(node->is_text ? node->value_size / 2 : node->value_size);
+    // Where it stands says what it is. The node may say something else, and the caller would read too far.
+    const std::size_t unit = is_same_key(keys.substr(0, STRINGS.size()), STRINGS) ? 2 : 1;
+    *length = static_cast<UINT>(node->value_size / unit);
     return 1;
 }
 

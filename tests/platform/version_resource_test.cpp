@@ -42,6 +42,12 @@ std::wstring text_at(const Bytes& block, const wchar_t* path) {
     return found ? wide_from_utf16(found->value, found->length) : L"(none)";
 }
 
+// A resource with nothing but these below StringFileInfo, and where the first of them stands.
+Bytes below_strings(const std::vector<VersionNode>& nodes) {
+    return block_of({u"VS_VERSION_INFO", {}, false, {{u"StringFileInfo", {}, true, nodes}}});
+}
+constexpr std::size_t FIRST_BELOW_STRINGS = 40 + 36;
+
 TEST(VersionQuery, finds_values_by_their_path) {
     const Bytes block = block_of(survey_resource());
     for (const wchar_t* const root : {L"\\", L""}) {
@@ -68,15 +74,17 @@ TEST(VersionQuery, finds_values_by_their_path) {
 
 TEST(VersionQuery, text_ends_at_its_terminator_or_where_its_length_says) {
     const auto block_with = [](const Bytes& value, std::size_t claimed) {
-        Bytes block =
-            block_of({u"VS_VERSION_INFO", {}, false, {{u"Key", value, true, {text_node(u"x", u"y")}}}});
-        put_word(block, 40 + 2, claimed);
+        Bytes block = below_strings({{u"Key", value, true, {text_node(u"x", u"y")}}});
+        put_word(block, FIRST_BELOW_STRINGS + 2, claimed);
         return block;
     };
-    EXPECT_EQ(text_at(block_with(utf16(u"ab"), 2), L"\\Key"), L"ab") << "no terminator";
-    EXPECT_EQ(text_at(block_with(utf16(u"abcd"), 3), L"\\Key"), L"abc") << "cut by its length";
-    EXPECT_EQ(text_at(block_with(utf16({u'a', u'b', 0, u'd'}), 4), L"\\Key"), L"ab") << "ends early";
-    EXPECT_EQ(text_at(block_with(utf16({u'a', u'b', 0, 0}), 0xFFFF), L"\\Key"), L"ab") << "claims too much";
+    EXPECT_EQ(text_at(block_with(utf16(u"ab"), 2), L"\\StringFileInfo\\Key"), L"ab") << "no terminator";
+    EXPECT_EQ(text_at(block_with(utf16(u"abcd"), 3), L"\\StringFileInfo\\Key"), L"abc")
+        << "cut by its length";
+    EXPECT_EQ(text_at(block_with(utf16({u'a', u'b', 0, u'd'}), 4), L"\\StringFileInfo\\Key"), L"ab")
+        << "ends early";
+    EXPECT_EQ(text_at(block_with(utf16({u'a', u'b', 0, 0}), 0xFFFF), L"\\StringFileInfo\\Key"), L"ab")
+        << "claims too much";
     const Bytes halves = utf16({0xDC00, u'a', 0xD83C, u'b', 0xD83C});
     EXPECT_EQ(wide_from_utf16(halves.data(), 5),
               L"\xFFFD"
@@ -84,13 +92,21 @@ TEST(VersionQuery, text_ends_at_its_terminator_or_where_its_length_says) {
               L"b\xFFFD");
 }
 
+TEST(VersionQuery, length_of_a_text_that_says_it_is_none_is_in_units_all_the_same) {
+    VersionNode resource = survey_resource();
+    resource.children[0].children[1].children[0].is_text = false;
+    resource.children.resize(1);
+    resource.children[0].children[1].children.resize(1);  // nothing follows what could be read too far
+    const Bytes block = block_of(resource);
+    EXPECT_EQ(query(block, PRODUCT_NAME)->length, 7U);
+    EXPECT_EQ(text_at(block, PRODUCT_NAME), L"Survey");
+}
+
 TEST(VersionQuery, nodes_that_do_not_fit_end_the_search) {
     // Two children; the first one's length is spoilt, and with it the way to the second.
-    const VersionNode root = {
-        u"VS_VERSION_INFO", {}, false, {text_node(u"A", u"first"), text_node(u"B", u"second")}};
-    const Bytes good = block_of(root);
-    EXPECT_EQ(text_at(good, L"\\B"), L"second");
-    const std::size_t first = 40;
+    const Bytes good = below_strings({text_node(u"A", u"first"), text_node(u"B", u"second")});
+    EXPECT_EQ(text_at(good, L"\\StringFileInfo\\B"), L"second");
+    const std::size_t first = FIRST_BELOW_STRINGS;
     const std::size_t length = good[first];
     struct Row {
         std::size_t length;
@@ -105,8 +121,8 @@ TEST(VersionQuery, nodes_that_do_not_fit_end_the_search) {
         SCOPED_TRACE(row.length);
         Bytes block = good;
         put_word(block, first, row.length);
-        EXPECT_EQ(text_at(block, L"\\A"), row.a);
-        EXPECT_EQ(text_at(block, L"\\B"), row.b);
+        EXPECT_EQ(text_at(block, L"\\StringFileInfo\\A"), row.a);
+        EXPECT_EQ(text_at(block, L"\\StringFileInfo\\B"), row.b);
     }
     Bytes block = block_of(survey_resource());
     put_word(block, 2, 0xFFFF);

@@ -1,5 +1,11 @@
 #include "src/platform/file_name.h"
 
+#include <unistd.h>
+
+#include <cerrno>
+
+#include "basalt/platform/error.h"
+#include "src/platform/error_from_errno.h"
 #include "src/platform/utf8.h"
 
 namespace basalt::platform {
@@ -41,6 +47,15 @@ std::wstring wide_from_file_name(std::string_view name) {
         wide.push_back(static_cast<wchar_t>(value < 0x80 ? value : 0xDC00 + value));
     }
     return wide;
+}
+
+DWORD error_of_path(const std::string& path, int number) {
+    if (number != ENOENT) {
+        return error_from_errno(number);
+    }
+    const std::size_t separator = path.find_last_of('/');
+    const std::string folder = separator == path.npos ? "." : path.substr(0, separator + 1);
+    return path.empty() || access(folder.c_str(), F_OK) != 0 ? ERROR_PATH_NOT_FOUND : ERROR_FILE_NOT_FOUND;
 }
 
 }  // namespace basalt::platform

@@ -12,6 +12,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
+#include "src/platform/file_name.h"
 #include "src/platform/file_size_signal.h"
 #include "src/platform/pages.h"
 
@@ -61,16 +62,6 @@ DWORD lock_alone(int descriptor, struct stat& status) noexcept {
     return status.st_nlink > 0 ? ERROR_SUCCESS : ERROR_FILE_NOT_FOUND;
 }
 
-// The published codes tell a missing file from a missing folder.
-DWORD error_at(const std::string& path, int number) {
-    if (number != ENOENT) {
-        return error_from_errno(number);
-    }
-    const std::size_t separator = path.find_last_of('/');
-    const std::string folder = separator == path.npos ? "." : path.substr(0, separator + 1);
-    return path.empty() || access(folder.c_str(), F_OK) != 0 ? ERROR_PATH_NOT_FOUND : ERROR_FILE_NOT_FOUND;
-}
-
 }  // namespace
 
 DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
@@ -84,7 +75,7 @@ DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
     for (int attempt = 0; attempt < MAX_ATTEMPTS; ++attempt) {
         const int descriptor = open_descriptor(path, creates ? O_RDWR | O_CREAT | O_EXCL : O_RDWR);
         if (descriptor < 0) {
-            return error_at(path, errno);
+            return error_of_path(path, errno);
         }
         struct stat status = {};
         const DWORD error = lock_alone(descriptor, status);
@@ -195,17 +186,17 @@ void OpenFile::delete_at_exit() noexcept {
 DWORD delete_file(const std::string& path) {
     struct stat status = {};
     if (lstat(path.c_str(), &status) != 0) {
-        return error_at(path, errno);
+        return error_of_path(path, errno);
     }
     if (S_ISDIR(status.st_mode)) {
         return ERROR_ACCESS_DENIED;
     }
     if (!S_ISREG(status.st_mode)) {
-        return unlink(path.c_str()) == 0 ? ERROR_SUCCESS : error_at(path, errno);
+        return unlink(path.c_str()) == 0 ? ERROR_SUCCESS : error_of_path(path, errno);
     }
     const int descriptor = open_descriptor(path, O_WRONLY | O_NOFOLLOW);
     if (descriptor < 0) {
-        return error_at(path, errno);
+        return error_of_path(path, errno);
     }
     DWORD error = lock_alone(descriptor, status);
     if (error == ERROR_SUCCESS && unlink(path.c_str()) != 0) {

@@ -6,7 +6,6 @@
 #include "basalt/platform/calendar.h"
 #include "basalt/platform/cstring.h"
 #include "basalt/platform/error.h"
-#include "basalt/platform/file_time.h"
 #include "basalt/platform/types.h"
 
 #endif

@@ -2,7 +2,7 @@
 #ifndef BASALT_SRC_PLATFORM_FILE_SEARCH_H
 #define BASALT_SRC_PLATFORM_FILE_SEARCH_H
 
-#include "basalt/platform/file_time.h"
+#include "basalt/platform/calendar.h"
 #include "basalt/platform/types.h"
 #include "src/platform/handle.h"
 

@@ -2,9 +2,7 @@
 
 #include <unistd.h>
 
-#include <algorithm>
 #include <atomic>
-#include <cstdlib>
 #include <cwchar>
 #include <string>
 #include <string_view>
@@ -41,23 +39,6 @@ UINT next_start() {
 }
 
 }  // namespace
-
-DWORD GetTempPathW(DWORD length, wchar_t* buffer) {
-    return or_out_of_memory(DWORD{0}, [&] {
-        const char* const configured = std::getenv("TMPDIR");
-        const bool is_set = configured != nullptr && *configured != '\0';
-        std::wstring folder = basalt::platform::wide_from_file_name(is_set ? configured : "/tmp");
-        if (!is_separator(folder.back())) {
-            folder += L'/';
-        }
-        const auto needed = static_cast<DWORD>(folder.size());
-        if (needed >= length) {
-            return needed + 1;
-        }
-        std::wmemcpy(buffer, folder.c_str(), folder.size() + 1);
-        return needed;
-    });
-}
 
 UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique, wchar_t* name) {
     if (folder == nullptr || prefix == nullptr || unique != 0 || name == nullptr) {

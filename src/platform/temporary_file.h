@@ -1,17 +1,9 @@
-// The folder for temporary files, and new names in it.
+// Temporary files under new names.
 #ifndef BASALT_SRC_PLATFORM_TEMPORARY_FILE_H
 #define BASALT_SRC_PLATFORM_TEMPORARY_FILE_H
 
 #include "basalt/platform/types.h"
-
-inline constexpr DWORD MAX_PATH = 260;  // characters, the terminator included
-
-// The folder for temporary files, with a separator at its end: TMPDIR, or /tmp when that is unset or empty,
-// asked anew at each call. Whether it exists is not looked at.
-// The length without the terminator; when `length` characters do not hold it, the length needed with the
-// terminator, and the buffer is as it was; 0 on failure (ERROR_NOT_ENOUGH_MEMORY).
-// Threads: thread-safe, as long as nobody changes the environment.
-DWORD GetTempPathW(DWORD length, wchar_t* buffer);
+#include "src/platform/temporary_folder.h"
 
 // Creates a new, empty file that only this user may open, and closes it. Its name is the folder, a separator
 // where that has none, up to three characters of the prefix, a number in up to four hexadecimal digits and

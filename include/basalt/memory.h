@@ -10,5 +10,7 @@
 #include "basalt/memory/allocators.h"
 #include "basalt/memory/block_allocator.h"
 #include "basalt/memory/buffer.h"
+#include "basalt/memory/memory_map.h"
+#include "basalt/memory/page_sources.h"
 
 #endif

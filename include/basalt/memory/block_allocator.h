@@ -56,10 +56,12 @@ private:
 
     Segment* create_segment();
     void destroy_segment(Segment* segment);
-    Segment* find_segment(const char* block) const;
+    Segment* find_segment(const void* block) const;
+    bool add_chunk(Segment* segment);
+    bool reserve_index_entry();
 
-    Segment* m_empty = nullptr;         // no block in use, latest first
-    Segment* m_partial = nullptr;       // blocks to hand out: those of the first
+    Segment* m_empty = nullptr;          // no block in use, latest first
+    Segment* m_partial = nullptr;        // blocks to hand out: those of the first
     SegmentIndex* m_segments = nullptr;  // all, by address; those on neither list are full
     std::uint32_t m_segment_size;
     std::uint32_t m_block_size;

@@ -9,12 +9,10 @@
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
-#include <functional>
 #include <memory>
 #include <regex>
 #include <set>
 #include <string>
-#include <thread>
 #include <type_traits>
 #include <vector>
 
@@ -252,24 +250,6 @@ TEST(MemoryMap, clean_up_deletes_what_nobody_holds) {
     }
     EXPECT_EQ(left.size(), 1U);
     bytes(map)[SIZE - 1] = 'x';
-}
-
-TEST(MemoryMap, clean_up_beside_creation_never_takes_a_living_file) {
-    const ScratchFolder folder;
-    const auto make = [&folder](int& lost) {
-        for (int i = 0; i < 300; ++i) {
-            const CMemoryMap map(4096);
-            const std::size_t files = folder.names().size();
-            lost += files == 0 ? 1 : 0;
-            CMemoryMap::CleanUp();
-        }
-    };
-    int lost = 0, lost_too = 0;
-    std::thread other(make, std::ref(lost_too));
-    make(lost);
-    other.join();
-    EXPECT_EQ(lost + lost_too, 0);
-    EXPECT_EQ(folder.names(), Names{});
 }
 
 TEST(MemoryMap, every_failing_call_is_made_up_for_by_the_heap) {

@@ -33,6 +33,6 @@ void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offse
 
 // Unmaps a view by its address, even when its mapping and file are closed. 1, or 0: ERROR_INVALID_ADDRESS
 // when there is no such view, ERROR_NOT_ENOUGH_MEMORY when the system refuses (the view stays).
-BOOL UnmapViewOfFile(const void* view);
+BOOL UnmapViewOfFile(const void* address);
 
 #endif

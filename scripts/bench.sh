@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # Measures the library beside its peers in one run and prints a table of medians and ratios (peer / ours).
-# Usage: scripts/bench.sh [subject ...]          subjects are the files of bench/: plane rtree sparse heap ...
+# Usage: scripts/bench.sh [subject ...]          subjects are the files of bench/: plane rtree sparse memory ...
 # REPETITIONS (5) and MIN_TIME (0.1 seconds a repetition) may be set; a longer run is a quieter one.
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"

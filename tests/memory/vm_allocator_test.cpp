@@ -1,0 +1,356 @@
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <map>
+#include <random>
+#include <string>
+#include <type_traits>
+#include <utility>
+#include <vector>
+
+#include "basalt/memory.h"
+#include "tests/memory/plain_block_allocator.h"
+#include "tests/support/heap_calls.h"
+#include "tests/support/scratch_folder.h"
+#include "tests/support/system_failures.h"
+
+namespace {
+
+using basalt::test::HeapFailure;
+using basalt::test::PlainBlockAllocator;
+using basalt::test::ScratchFolder;
+using basalt::test::SystemFailure;
+using vex_lib::vlVmAllocator;
+
+constexpr std::uintptr_t PAGE = 4096;
+
+std::uintptr_t number_of(const void* address) {
+    return reinterpret_cast<std::uintptr_t>(address);
+}
+
+// Drives an allocator and the plain rules alike, and compares every address.
+class Pair {
+public:
+    Pair(unsigned long segment_size, unsigned long block_size)
+        : m_segment_size(segment_size),
+          m_block_size(block_size),
+          m_allocator(segment_size, block_size),
+          m_plain(segment_size, block_size) {}
+
+    void alloc() {
+        auto* const block = static_cast<char*>(m_allocator.Alloc(m_block_size));
+        ASSERT_NE(block, nullptr);
+        const PlainBlockAllocator::Place place = m_plain.alloc();
+        if (place.segment == m_bases.size()) {
+            ASSERT_EQ(place.offset, 0U);
+            ASSERT_EQ(number_of(block) % PAGE, 0U);
+            m_bases.push_back(block);
+            const bool is_new = m_segments.emplace(number_of(block), place.segment).second;
+            ASSERT_TRUE(is_new);
+        }
+        ASSERT_EQ(block, m_bases[place.segment] + place.offset);
+        // Over the whole block, so that any overlap, with bookkeeping too, shows when it is freed.
+        std::memset(block, stamp_of(block), m_block_size);
+        m_live.push_back(block);
+    }
+
+    void free_live(std::size_t index) {
+        char* const block = m_live[index];
+        for (std::size_t i = 0; i < m_block_size; ++i) {
+            ASSERT_EQ(static_cast<unsigned char>(block[i]), stamp_of(block));
+        }
+        const std::size_t before = m_live.size();
+        free_at(block);
+        ASSERT_EQ(m_live.size(), before - 1);
+        m_freed = block;
+    }
+
+    // What is no block in use, as a rule: freed already, inside one, just outside of a view (where another
+    // may begin), in none.
+    void free_nonsense(std::size_t choice) {
+        char* const base = m_bases[choice / 8 % m_bases.size()];
+        switch (choice % 8) {
+            case 0:
+                m_allocator.Free(nullptr);
+                break;
+            case 1:
+                m_allocator.Free(&choice);
+                break;
+            case 2:
+                free_at(base + m_segment_size);
+                break;
+            case 3:
+                free_at(base - 1);
+                break;
+            case 4:
+                free_at(base + choice / 64 % m_segment_size);
+                break;
+            default:
+                if (m_freed != nullptr) {
+                    free_at(m_freed);
+                }
+        }
+    }
+
+    std::size_t live() const { return m_live.size(); }
+    std::size_t segments() const { return m_bases.size(); }
+
+private:
+    static unsigned char stamp_of(const char* block) {
+        return static_cast<unsigned char>(number_of(block) * 31 >> 3);
+    }
+
+    void free_at(char* address) {
+        const auto after = m_segments.upper_bound(number_of(address));
+        if (after != m_segments.begin()) {
+            const auto& [base, segment] = *std::prev(after);
+            if (m_plain.free({segment, number_of(address) - base})) {
+                std::erase(m_live, address);
+            }
+        }
+        m_allocator.Free(address);
+    }
+
+    unsigned long m_segment_size, m_block_size;
+    vlVmAllocator m_allocator;
+    PlainBlockAllocator m_plain;
+    std::vector<char*> m_bases;
+    std::map<std::uintptr_t, std::size_t> m_segments;  // by base
+    std::vector<char*> m_live;
+    char* m_freed = nullptr;
+};
+
+struct Sizes {
+    unsigned long segment, block;
+    std::size_t most_live;
+    int steps;
+};
+
+class VmAllocatorOrder : public testing::TestWithParam<Sizes> {};
+
+TEST_P(VmAllocatorOrder, is_that_of_the_lists) {
+    const Sizes& sizes = GetParam();
+    const ScratchFolder folder;
+    const unsigned seed = std::random_device()();
+    SCOPED_TRACE(testing::Message() << "seed " << seed);
+    std::mt19937 random(seed);
+    Pair pair(sizes.segment, sizes.block);
+    bool grows = true;
+    for (int step = 0; step < sizes.steps && !testing::Test::HasFatalFailure(); ++step) {
+        if (pair.live() == 0 || pair.live() >= sizes.most_live) {
+            grows = pair.live() == 0;
+        }
+        const std::size_t draw = random();
+        if (draw % 50 == 0 && pair.segments() != 0) {
+            pair.free_nonsense(random());
+        } else if ((draw % 4 != 0) == grows) {
+            pair.alloc();
+        } else if (pair.live() != 0) {
+            const std::size_t newest = pair.live() - 1;
+            const std::size_t choices[] = {0, newest, newest, random() % pair.live()};
+            pair.free_live(choices[random() % 4]);
+        }
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Sizes, VmAllocatorOrder,
+                         testing::Values(Sizes{100, 30, 200, 20'000},          // does not divide
+                                         Sizes{4096, 4096, 60, 5'000},         // one block a file
+                                         Sizes{8191, 4096, 40, 5'000},         // the same, with a rest
+                                         Sizes{1, 1, 40, 5'000},               // the smallest
+                                         Sizes{3 * 4096, 4096, 100, 20'000},   // several
+                                         Sizes{33 * 100, 100, 400, 40'000},    // a second word of bits
+                                         Sizes{1 << 20, 65537, 100, 2'000},    // blocks beyond a page
+                                         Sizes{70'000, 4, 40'000, 120'000}));  // a second chunk of state
+
+TEST(VmAllocator, refuses_what_it_does_not_serve) {
+    const ScratchFolder folder;
+    vlVmAllocator allocator(100, 30);
+    EXPECT_TRUE(folder.names().empty()) << "no file before the first block";
+    for (const std::uint64_t size : {0UL, 29UL, 31UL, (1UL << 32) + 30}) {
+        EXPECT_EQ(allocator.Alloc(size), nullptr) << size;
+    }
+    EXPECT_TRUE(folder.names().empty());
+    EXPECT_NE(allocator.Alloc(30), nullptr);
+
+    constexpr unsigned long BEYOND = 1UL << 32;
+    for (const auto& [segment, block] :
+         {std::pair(100UL, 0UL), std::pair(0UL, 0UL), std::pair(100UL, 101UL), std::pair(BEYOND + 100, 30UL),
+          std::pair(BEYOND + 100, BEYOND + 30)}) {
+        vlVmAllocator none(segment, block);
+        EXPECT_EQ(none.Alloc(block), nullptr) << segment << ' ' << block;
+        EXPECT_EQ(none.Alloc(block % BEYOND), nullptr) << segment << ' ' << block;
+        none.Free(&none);
+    }
+}
+
+TEST(VmAllocator, keeps_files_that_fall_empty_and_no_descriptor) {
+    const ScratchFolder folder;
+    const long descriptors = basalt::test::open_descriptors();
+    const long mapped = basalt::test::mapped_balance();
+    const long blocks = basalt::test::live_heap_blocks();
+    {
+        vlVmAllocator allocator(2 * 4096, 4096);
+        std::vector<void*> taken;
+        for (int i = 0; i < 5; ++i) {
+            taken.push_back(allocator.Alloc(4096));
+        }
+        const std::set<std::string> names = folder.names();
+        EXPECT_EQ(names.size(), 3U);
+        for (const std::string& name : names) {
+            EXPECT_EQ(name.substr(0, 3), "vma");
+            EXPECT_EQ(std::filesystem::file_size(folder / name), 2 * 4096U);
+        }
+        EXPECT_EQ(basalt::test::open_descriptors(), descriptors);
+        for (int round = 0; round < 3; ++round) {
+            for (void* const block : taken) {
+                allocator.Free(block);
+            }
+            std::set<void*> again;
+            for (int i = 0; i < 5; ++i) {
+                again.insert(allocator.Alloc(4096));
+            }
+            EXPECT_EQ(again.size(), 5U);
+            EXPECT_EQ(again.count(nullptr), 0U);
+            EXPECT_EQ(folder.names(), names);
+            taken.assign(again.begin(), again.end());
+        }
+    }
+    EXPECT_TRUE(folder.names().empty());
+    EXPECT_EQ(basalt::test::open_descriptors(), descriptors);
+    EXPECT_EQ(basalt::test::mapped_balance(), mapped);
+    EXPECT_EQ(basalt::test::live_heap_blocks(), blocks);
+}
+
+// A segment size close to 2^32, where offsets in 32 bits would wrap: the second block would start beyond the
+// first one's end.
+TEST(VmAllocator, hands_out_nothing_beyond_a_view_of_nearly_4_gigabytes) {
+    const ScratchFolder folder;
+    constexpr unsigned long BLOCK = 0xFFFFF000;
+    vlVmAllocator allocator(0xFFFFFFFF, BLOCK);
+    auto* const first = static_cast<char*>(allocator.Alloc(BLOCK));
+    if (first == nullptr) {
+        GTEST_SKIP() << "no room for 4 GiB in the temporary folder";
+    }
+    first[BLOCK - 1] = 1;
+    EXPECT_EQ(folder.names().size(), 1U);
+    allocator.Free(first);
+    EXPECT_EQ(allocator.Alloc(BLOCK), first);
+}
+
+// Deletes the files that were made but could not be opened, which stay behind, empty; answers their number.
+std::size_t delete_unopened(const ScratchFolder& folder) {
+    std::size_t count = 0;
+    for (const std::string& name : folder.names()) {
+        if (std::filesystem::file_size(folder / name) == 0) {
+            count += std::filesystem::remove(folder / name) ? 1 : 0;
+        }
+    }
+    return count;
+}
+
+// Takes a block whose every step can fail: a new file, a larger index and a first chunk of state.
+template <class Failure>
+void fail_each_call_in_turn(const Failure& failure_at) {
+    const ScratchFolder folder;
+    constexpr std::size_t FILES_BEFORE = 16;  // with as many the index is full
+    for (int nth = 1; nth < 100; ++nth) {
+        SCOPED_TRACE(nth);
+        const long mapped = basalt::test::mapped_balance();
+        const long descriptors = basalt::test::open_descriptors();
+        {
+            vlVmAllocator allocator(4096, 4096);
+            std::vector<void*> blocks;
+            for (std::size_t i = 0; i < FILES_BEFORE; ++i) {
+                blocks.push_back(allocator.Alloc(4096));
+            }
+            const auto [block, has_struck] = failure_at(nth, allocator);
+            EXPECT_LE(delete_unopened(folder), block == nullptr ? 1U : 0U);
+            if (block == nullptr) {
+                EXPECT_EQ(folder.names().size(), FILES_BEFORE);
+                EXPECT_NE(allocator.Alloc(4096), nullptr) << "usable afterwards";
+            } else if (!has_struck) {
+                EXPECT_GT(nth, 4) << "several calls were made to fail";
+                return;
+            }
+            EXPECT_EQ(folder.names().size(), FILES_BEFORE + 1);
+            allocator.Free(blocks[7]);
+            EXPECT_EQ(allocator.Alloc(4096), blocks[7]);
+        }
+        EXPECT_TRUE(folder.names().empty());
+        EXPECT_EQ(basalt::test::mapped_balance(), mapped);
+        EXPECT_EQ(basalt::test::open_descriptors(), descriptors);
+    }
+    FAIL() << "some call failed for ever";
+}
+
+TEST(VmAllocator, gives_back_everything_when_memory_fails) {
+    fail_each_call_in_turn([](int nth, vlVmAllocator& allocator) {
+        const HeapFailure failure(nth);
+        void* const block = allocator.Alloc(4096);
+        return std::pair(block, HeapFailure::struck());
+    });
+}
+
+TEST(VmAllocator, gives_back_everything_when_the_system_fails) {
+    fail_each_call_in_turn([](int nth, vlVmAllocator& allocator) {
+        const SystemFailure failure(nth);
+        void* const block = allocator.Alloc(4096);
+        return std::pair(block, SystemFailure::struck());
+    });
+}
+
+TEST(VmAllocator, without_memory_for_more_state_takes_back_and_reuses) {
+    const ScratchFolder folder;
+    vlVmAllocator allocator(70'000, 4);
+    std::vector<void*> blocks;
+    for (int i = 0; i < 1 << 14; ++i) {
+        blocks.push_back(allocator.Alloc(4));
+    }
+    const auto alloc_without_memory = [&] {
+        const HeapFailure failure(1);
+        return allocator.Alloc(4);
+    };
+    EXPECT_EQ(alloc_without_memory(), nullptr);
+    allocator.Free(blocks[5]);
+    EXPECT_EQ(alloc_without_memory(), blocks[5]) << "a freed block needs none";
+    EXPECT_EQ(allocator.Alloc(4), static_cast<char*>(blocks.back()) + 4);
+}
+
+TEST(VmAllocator, without_a_temporary_folder_or_bookkeeping_gives_null) {
+    const ScratchFolder folder;
+    for (const std::string& name : {folder / "missing", "/" + std::string(300, 'x')}) {
+        ScratchFolder::set_temporary(name);
+        vlVmAllocator allocator(4096, 4096);
+        EXPECT_EQ(allocator.Alloc(4096), nullptr);
+        ScratchFolder::set_temporary(folder.path());
+        EXPECT_NE(allocator.Alloc(4096), nullptr) << "the folder is asked for anew";
+    }
+    // Bookkeeping that could not be made is missing for good.
+    const auto made_without_memory = [] {
+        const HeapFailure failure(1);
+        return vlVmAllocator(4096, 4096);
+    };
+    vlVmAllocator none = made_without_memory();
+    EXPECT_EQ(none.Alloc(4096), nullptr);
+    none.Free(&none);
+}
+
+// Virtual slots and size as hosts compiled against them expect: two slots for the destructor, then the
+// operations.
+TEST(VmAllocator, keeps_its_virtual_slots) {
+    const ScratchFolder folder;
+    vlVmAllocator allocator(4096, 64);
+    void** const slots = *reinterpret_cast<void***>(&allocator);
+    const auto alloc = reinterpret_cast<void* (*)(void*, std::uint64_t)>(slots[2]);
+    const auto free = reinterpret_cast<void (*)(void*, void*)>(slots[3]);
+    void* const block = alloc(&allocator, 64);
+    ASSERT_NE(block, nullptr);
+    free(&allocator, block);
+    EXPECT_EQ(allocator.Alloc(64), block);
+    static_assert(std::is_base_of_v<vex_lib::vlAllocator, vlVmAllocator>);
+    static_assert(!std::is_copy_constructible_v<vlVmAllocator> && !std::is_copy_assignable_v<vlVmAllocator>);
+    static_assert(sizeof(vlVmAllocator) == 5 * sizeof(void*) + 2 * sizeof(std::uint32_t));
+}
+
+}  // namespace

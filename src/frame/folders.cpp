@@ -80,5 +80,5 @@ CString _tempFilePath() {
     // A length beyond the buffer is the room the folder would have needed: then, as on failure, nothing was
     // written.
     GetTempPathW(MAX_PATH, folder);
-    return CString(folder);
+    return folder;
 }

@@ -82,6 +82,7 @@ void vlVmBuffer::Test() {
     for (int pass = 0; pass < 5; ++pass) {
         std::vector<Record> grown;
         for (int i = 0; i < 10'000; ++i) {
+            // NOLINTNEXTLINE(performance-inefficient-vector-operation): growing is what it is about
             grown.push_back({1.0, 2.0, 3.0, 1.1, 2.1, 3.1});
         }
         kept = grown;

@@ -52,7 +52,7 @@ private:
     struct SegmentIndex;
 
     MemoryMappedFile* CreateMemoryMappedFile();
-    void DestroyMemoryMappedFile(MemoryMappedFile* file);
+    void DestroyMemoryMappedFile(MemoryMappedFile* mapped);
 
     Segment* create_segment();
     void destroy_segment(Segment* segment);

@@ -50,7 +50,7 @@ private:
     void* m_data = nullptr;
     std::uint32_t m_size = 0;
     std::uint32_t m_step;
-    std::uint32_t m_reserve;
+    [[maybe_unused]] std::uint32_t m_reserve;
     bool m_step_fits;
 };
 

@@ -1,13 +1,13 @@
-// A progress line for work that takes its time.
-#ifndef WORKAREA_PROGRESS_H
-#define WORKAREA_PROGRESS_H
+// A progress bar for work that takes its time.
+#ifndef EXAMPLES_PROGRESS_H
+#define EXAMPLES_PROGRESS_H
 
 #include <chrono>
 #include <cstdint>
 #include <string>
 
-/// Shows how far a step has come, on standard error, when that is a terminal and the step lasts longer than
-/// half a second; the line is wiped when the step ends. Otherwise nothing is written.
+/// Shows how far a step has come as a bar and per cent, on standard error, when that is a terminal and the
+/// step lasts longer than half a second; the line is wiped when the step ends. Otherwise nothing is written.
 class Progress {
 public:
     Progress(std::string step, std::int64_t total);

@@ -1,5 +1,6 @@
 #include "process.h"
 
+#include <sys/resource.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -46,4 +47,16 @@ std::optional<std::int64_t> resident_memory() {
 
 std::optional<std::int64_t> peak_resident_memory() {
     return memory_line("/proc/self/status", "VmHWM:");
+}
+
+std::optional<std::int64_t> private_memory() {
+    return memory_line("/proc/self/status", "RssAnon:");
+}
+
+std::optional<std::int64_t> private_memory_limit() {
+    rlimit limit = {};
+    if (getrlimit(RLIMIT_DATA, &limit) != 0 || limit.rlim_cur == RLIM_INFINITY) {
+        return std::nullopt;
+    }
+    return static_cast<std::int64_t>(limit.rlim_cur);
 }

@@ -28,7 +28,10 @@ void Progress::update(std::int64_t done) {
     }
     m_next = now + std::chrono::milliseconds(100);
     m_shown = true;
-    const int percent = static_cast<int>(100.0 * static_cast<double>(done) / static_cast<double>(m_total));
-    std::fprintf(stderr, "\r\033[K%s %d %%", m_step.c_str(), percent);
+    constexpr int WIDTH = 30;
+    const double share = std::clamp(static_cast<double>(done) / static_cast<double>(m_total), 0.0, 1.0);
+    const auto filled = static_cast<std::size_t>(share * WIDTH);
+    const std::string bar = std::string(filled, '#') + std::string(WIDTH - filled, '.');
+    std::fprintf(stderr, "\r\033[K%s [%s] %d %%", m_step.c_str(), bar.c_str(), static_cast<int>(100 * share));
     std::fflush(stderr);
 }

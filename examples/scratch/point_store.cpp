@@ -1,0 +1,17 @@
+#include "point_store.h"
+
+#include <new>
+
+#include "interrupt.h"
+
+void PointStore::add(const Point& point) {
+    if (m_points == files() * POINTS_IN_MAP) {
+        stop_if_interrupted();
+        auto map = std::make_unique<vex_util::CMemoryMap>();
+        if (!map->Create(MAP_BYTES)) {
+            throw std::bad_alloc();
+        }
+        m_maps.push_back(std::move(map));
+    }
+    points_of(*m_maps.back())[m_points++ % POINTS_IN_MAP] = point;
+}

@@ -1,0 +1,162 @@
+#!/usr/bin/env bash
+# The program from the outside: cells against what awk makes of the same scan, a job beyond its memory limit,
+# and that nothing stays in the temporary folder however it ends.
+# Usage: scratch_test.sh PROGRAM
+set -u
+program=$(realpath "$1")
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+cd "$work" || exit 1
+mkdir temporary
+export TMPDIR=$work/temporary
+failures=0
+
+fail() {
+    echo "FAILED: $*"
+    failures=$((failures + 1))
+}
+
+# run ARGUMENT...: report in `out`, messages in `err`, exit code in `code`
+run() {
+    "$program" "$@" >out 2>err
+    code=$?
+}
+
+succeeds() {
+    run "$@"
+    [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
+    leaves_nothing "$*"
+}
+
+leaves_nothing() {
+    [ -z "$(ls -A temporary)" ] || fail "left by $1: $(ls -A temporary)"
+}
+
+# refused MESSAGE ARGUMENT...: one line that ends so, nothing on standard output, exit code 2
+refused() {
+    local message=$1
+    shift
+    run "$@"
+    [ $code -eq 2 ] || fail "exit $code, not 2, from $*"
+    [ ! -s out ] || fail "output from $*"
+    [ "$(cat err)" = "scratch: $message" ] || fail "$*: $(cat err); expected: $message"
+}
+
+# figure LABEL: what the report says behind a label, separators removed
+figure() {
+    sed -n "s/^  $1  *//p" out | tr -d ,
+}
+
+# is LABEL EXPECTED
+is() {
+    [ "$(figure "$1")" = "$2" ] || fail "$1: $(figure "$1"), expected $2"
+}
+
+# The same scan, drawn with the minimal standard generator in floating point, its cells sorted as text.
+model() {
+    LC_ALL=C awk -v points="$1" '
+        function draw(below) { state = state * 16807 % 2147483647; return state % below }
+        BEGIN {
+            side = int(sqrt(points / 4)); if (side < 1) side = 1
+            for (state = 1; points > 0; points--) {
+                north = draw(side * 1000); east = draw(side * 1000); growth = draw(2000)
+                print int(north / 1000), int(east / 1000), int(north / 50) + growth
+            }
+        }' | LC_ALL=C sort -n -k1,1 -k2,2 -k3,3 | LC_ALL=C awk '
+        function finish() {
+            if (n) printf "%s,%d,%.3f,%.3f,%.3f\n", cell, n, z[1] / 1000, z[int((n + 1) / 2)] / 1000, z[n] / 1000
+        }
+        BEGIN { print "row,column,points,lowest,median,highest" }
+        { key = $1 "," $2; if (key != cell) { finish(); cell = key; n = 0 } z[++n] = $3 }
+        END { finish() }'
+}
+
+# 65,536 points fill a block: one run, a run and its first point, several.
+for points in 1 2 3 65536 65537 200000; do
+    succeeds --points $points --cells cells.csv
+    model $points >expected.csv
+    cmp -s cells.csv expected.csv || fail "other cells for $points points: $(diff cells.csv expected.csv | head -3)"
+    is "Points" $points
+    is "Most points in a cell" "$(LC_ALL=C awk -F, 'NR > 1 && $3 > most { most = $3 } END { print most }' expected.csv)"
+done
+
+# 183 MiB of points where 48 MiB of memory are allowed; then the proof that the limit holds: without files,
+# blocks come from memory, of which there is not enough.
+(
+    ulimit -d 49152
+    run --points 12000000
+    [ $code -eq 0 ] || fail "exit $code under a memory limit: $(cat err)"
+    is "Memory limit" "48.0 MiB"
+    is "Bytes sorted" "183.1 MiB"
+    is "Files of runs" "3 192.0 MiB"
+    TMPDIR=$work/nowhere run --points 12000000
+    [ $code -eq 1 ] && [ "$(cat err)" = "scratch: out of memory" ] || fail "exit $code without files: $(cat err)"
+    exit $failures
+)
+failures=$?
+leaves_nothing "a job under a memory limit"
+
+# A full disk, as a limit on the size of files has it.
+(
+    ulimit -f 1024
+    run --points 100000
+    [ $code -eq 1 ] && [ "$(cat err)" = "scratch: out of memory" ] || fail "exit $code with no room: $(cat err)"
+    exit $failures
+)
+failures=$?
+leaves_nothing "a job without room"
+
+# interrupt SIGNAL: sends it once the job's first file is there
+interrupt() {
+    # A shell starts what runs behind it deaf to SIGINT.
+    env --default-signal=INT "$program" --points 100000000 >out 2>err &
+    local job=$!
+    for _ in $(seq 500); do
+        [ -n "$(ls -A temporary)" ] && break
+        sleep 0.01
+    done
+    [ -n "$(ls -A temporary)" ] || fail "no file to be seen before SIG$1"
+    sleep "$2"
+    kill -s "$1" $job
+    wait $job
+    code=$?
+    [ $code -eq $((128 + $(kill -l "$1"))) ] || fail "exit $code after SIG$1"
+}
+for delay in 0 0.3; do
+    interrupt INT $delay
+    [ "$(cat err)" = "scratch: interrupted, nothing is left behind" ] || fail "after SIGINT: $(cat err)"
+    leaves_nothing "SIGINT"
+done
+interrupt TERM 0.1
+leaves_nothing "SIGTERM"
+
+# What a killed job has left of mapped blocks goes with the next run, and nothing else does.
+touch "temporary/~0000123.mem" temporary/other
+run --points 10
+[ "$(ls -A temporary)" = other ] || fail "after clean-up: $(ls -A temporary)"
+rm -f temporary/*
+
+# On a terminal there is a bar, and it is wiped in the end.
+if command -v script >/dev/null; then
+    script -qec "$program --points 12000000 >report" typescript >/dev/null </dev/null
+    grep -q '\[#*\.*\] [0-9]* %' typescript || fail "no progress bar on a terminal"
+fi
+
+refused "unknown argument '--colour' (--help lists the options)" --colour
+refused "unknown argument 'file' (--help lists the options)" file
+refused "option --points needs a value" --points
+refused "option --points is given twice" --points 1 --points 2
+refused "option --cells is given twice" --cells=a --cells=b
+refused "--points takes a whole number from 1 to 400000000, not '0'" --points 0
+refused "--points takes a whole number from 1 to 400000000, not '400000001'" --points 400000001
+refused "--points takes a whole number from 1 to 400000000, not '1e6'" --points 1e6
+succeeds --help
+grep -q '^Usage: scratch' out || fail "--help shows no usage"
+succeeds --version
+grep -Eq '^scratch [0-9]+\.[0-9]+\.[0-9]+$' out || fail "--version shows no version"
+run --points 10 --cells nowhere/cells.csv
+[ $code -eq 1 ] && [ "$(cat err)" = "scratch: cannot write to nowhere/cells.csv: No such file or directory" ] ||
+    fail "exit $code: $(cat err)"
+
+[ $failures -eq 0 ] && echo "all passed"
+exit $((failures != 0))

@@ -1,9 +1,10 @@
 #!/usr/bin/env bash
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
-# locale, results to the bit, the package, exported symbols, sanitizers, documentation, a minute of each fuzzer.
+# locale, a system short of everything, results to the bit, the package, exported symbols, sanitizers,
+# documentation, a minute of each fuzzer.
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
-#        format includes clang headers tidy elsewhere package symbols exact asan tsan docs fuzz
+#        format includes clang headers tidy elsewhere limits package symbols exact asan tsan docs fuzz
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
@@ -26,6 +27,7 @@ step_elsewhere() {
     TZ='<+1245>-12:45<+1345>,M9.5.0/2:45,M4.1.0/3:45' LOCPATH=$PWD/build LC_ALL=de_DE.UTF-8 \
         ctest --preset clang -j "$(nproc)"
 }
+step_limits() { scripts/check_limits.sh build/clang; }
 step_package() { scripts/check_package.sh; }
 installed=build/package/library-ON/src  # what the package step built
 step_symbols() {
@@ -70,7 +72,7 @@ if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit 
 fi
 steps=("$@")
 if [ ${#steps[@]} -eq 0 ]; then
-    steps=(format includes clang headers tidy elsewhere package symbols exact asan tsan docs fuzz)
+    steps=(format includes clang headers tidy elsewhere limits package symbols exact asan tsan docs fuzz)
 fi
 need_packages "${BUILD_PACKAGES[@]}" "${TEST_PACKAGES[@]}" "${CHECK_PACKAGES[@]}"
 mkdir -p build

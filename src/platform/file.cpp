@@ -81,16 +81,3 @@ BOOL DeleteFileW(const wchar_t* name) {
         return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
     });
 }
-
-BOOL CloseHandle(HANDLE handle) {
-    using basalt::platform::HandleObject;
-    const std::shared_ptr<HandleObject> object = basalt::platform::find_object(handle);
-    if (object == nullptr || object->kind() == HandleObject::Kind::SEARCH) {
-        return fail_with(ERROR_INVALID_HANDLE, 0);
-    }
-    basalt::platform::drop_handle(handle);
-    if (object->kind() == OpenFile::KIND) {
-        static_cast<OpenFile&>(*object).close();
-    }
-    return 1;
-}

@@ -32,11 +32,12 @@ inline constexpr DWORD FILE_FLAG_SEQUENTIAL_SCAN = 0x08000000;  // nothing here
 // OPEN_EXISTING, `flags` any of the above but the folder's: anything else is ERROR_INVALID_PARAMETER.
 // Delete-on-close deletes the name it was opened by, if that still is this file, when the handle is closed,
 // and else when the process ends by returning or exit(), or the library is unloaded. A killed process leaves
-// the file, unlocked. INVALID_HANDLE_VALUE on failure, nothing stays on the disk: ERROR_FILE_EXISTS for
-// CREATE_NEW, ERROR_SHARING_VIOLATION for a file that is open, ERROR_FILE_NOT_FOUND, ERROR_PATH_NOT_FOUND
-// when the folder is missing or the name empty, ERROR_INVALID_NAME for a name with values that are no
-// characters, ERROR_ACCESS_DENIED for what is no file too, ERROR_TOO_MANY_OPEN_FILES, ERROR_NOT_ENOUGH_MEMORY
-// and what else the system says.
+// the file, unlocked.
+// INVALID_HANDLE_VALUE on failure, and nothing stays on the disk: ERROR_FILE_EXISTS for CREATE_NEW,
+// ERROR_SHARING_VIOLATION for a file that is open, ERROR_FILE_NOT_FOUND, ERROR_PATH_NOT_FOUND when the folder
+// is missing or the name empty, ERROR_INVALID_NAME for a name with values that are no characters,
+// ERROR_ACCESS_DENIED for what is no file too, ERROR_TOO_MANY_OPEN_FILES, ERROR_NOT_ENOUGH_MEMORY and what
+// else the system says.
 HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_ATTRIBUTES* security,
                    DWORD disposition, DWORD flags, HANDLE pattern);
 

@@ -3,8 +3,8 @@
 // Space on the disk is reserved when the mapping is made, so that a full disk, a quota or a limit on the size
 // of files is a failed call, never a signal later.
 // A mapping has one view in its life: made with MapViewOfFile, which takes the file's descriptor back from
-// the system. Files that are mapped cost no descriptor. Threads: thread-safe, each handle and view used by
-// one thread at a time.
+// the system. Files that are mapped cost no descriptor.
+// Threads: thread-safe, each handle and view used by one thread at a time.
 #ifndef BASALT_SRC_PLATFORM_FILE_MAPPING_H
 #define BASALT_SRC_PLATFORM_FILE_MAPPING_H
 
@@ -33,6 +33,6 @@ void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offse
 
 // Unmaps a view by its address, even when its mapping and file are closed. 1, or 0: ERROR_INVALID_ADDRESS
 // when there is no such view, ERROR_NOT_ENOUGH_MEMORY when the system refuses (the view stays).
-BOOL UnmapViewOfFile(const void* view);
+BOOL UnmapViewOfFile(const void* address);
 
 #endif

@@ -38,7 +38,7 @@ bool file_name_from_wide(std::wstring_view name, std::string& result) {
 std::wstring wide_from_file_name(std::string_view name) {
     std::wstring wide = wide_from_utf8(name);
     // The replacement character is a character too: only a name that does not come back was no UTF-8.
-    if (wide.find(REPLACEMENT_CHARACTER) == wide.npos || utf8_from_wide(wide) == name) {
+    if (wide.find(REPLACEMENT_CHARACTER) == std::wstring::npos || utf8_from_wide(wide) == name) {
         return wide;
     }
     wide.clear();
@@ -54,7 +54,7 @@ DWORD error_of_path(const std::string& path, int number) {
         return error_from_errno(number);
     }
     const std::size_t separator = path.find_last_of('/');
-    const std::string folder = separator == path.npos ? "." : path.substr(0, separator + 1);
+    const std::string folder = separator == std::string::npos ? "." : path.substr(0, separator + 1);
     return path.empty() || access(folder.c_str(), F_OK) != 0 ? ERROR_PATH_NOT_FOUND : ERROR_FILE_NOT_FOUND;
 }
 

@@ -121,7 +121,7 @@ DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& e
         return ERROR_FILE_NOT_FOUND;
     }
     std::string name;
-    if (last.find_first_of(L"*?") == last.npos) {
+    if (last.find_first_of(L"*?") == std::wstring_view::npos) {
         if (!basalt::platform::file_name_from_wide(path, name)) {
             return ERROR_INVALID_NAME;
         }

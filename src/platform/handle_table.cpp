@@ -5,6 +5,7 @@
 
 #include "src/platform/immortal.h"
 #include "src/platform/lock.h"
+#include "src/platform/out_of_memory.h"
 
 namespace basalt::platform {
 namespace {
@@ -70,3 +71,14 @@ void for_each_object(void (*visit)(HandleObject&)) noexcept {
 }
 
 }  // namespace basalt::platform
+
+BOOL CloseHandle(HANDLE handle) {
+    using basalt::platform::HandleObject;
+    const std::shared_ptr<HandleObject> object = basalt::platform::find_object(handle);
+    if (object == nullptr || object->kind() == HandleObject::Kind::SEARCH) {
+        return basalt::platform::fail_with(ERROR_INVALID_HANDLE, 0);
+    }
+    basalt::platform::drop_handle(handle);
+    object->close();
+    return 1;
+}

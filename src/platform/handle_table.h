@@ -25,6 +25,9 @@ public:
 
     Kind kind() const noexcept { return m_kind; }
 
+    // What the end of the handle means to the object, which others may still use.
+    virtual void close() noexcept {}
+
 private:
     const Kind m_kind;
 };

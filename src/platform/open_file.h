@@ -21,7 +21,7 @@ public:
     enum class Mode : std::uint8_t { CREATE, EXISTING };
 
     OpenFile() noexcept : HandleObject(KIND) {}
-    ~OpenFile() override { close(); }
+    ~OpenFile() override { OpenFile::close(); }
     OpenFile(const OpenFile&) = delete;
     OpenFile& operator=(const OpenFile&) = delete;
 
@@ -39,7 +39,7 @@ public:
     bool unmap(std::byte* view, std::size_t size) noexcept;
 
     // The end of the handle: deletes the file if that was asked for. The lock stays with a view.
-    void close() noexcept;
+    void close() noexcept override;
 
     // Deletes the file at the process's end if that was asked for.
     void delete_at_exit() noexcept;

@@ -16,7 +16,7 @@ constexpr bool matches_wildcards(std::wstring_view name, std::wstring_view patte
     // shortest that leads there.
     std::size_t n = 0;
     std::size_t p = 0;
-    std::size_t star = pattern.npos;
+    std::size_t star = std::wstring_view::npos;
     std::size_t after_star = 0;
     while (n < name.size()) {
         if (p < pattern.size() && pattern[p] == L'*') {
@@ -25,14 +25,14 @@ constexpr bool matches_wildcards(std::wstring_view name, std::wstring_view patte
         } else if (p < pattern.size() && (pattern[p] == L'?' || pattern[p] == name[n])) {
             ++p;
             ++n;
-        } else if (star != pattern.npos) {
+        } else if (star != std::wstring_view::npos) {
             p = star + 1;
             n = ++after_star;
         } else {
             return false;
         }
     }
-    return pattern.find_first_not_of(L'*', p) == pattern.npos;
+    return pattern.find_first_not_of(L'*', p) == std::wstring_view::npos;
 }
 
 }  // namespace basalt::platform

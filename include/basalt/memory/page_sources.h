@@ -14,9 +14,9 @@ namespace vex_lib {
 /// Pages of virtual memory. A reservation costs addresses alone; committed pages read as zero at first, and
 /// again after they were decommitted and committed anew.
 ///
-/// Failures are reported to the debugger output (see basalt/memory.h), but for codes that are not served.
-/// More than 2^32 - 1 bytes are refused in this way too. Threads: thread-safe; who works on one range from
-/// several threads keeps them apart.
+/// Failures are reported to the debugger output (see basalt/memory/allocators.h), but for codes that are not
+/// served. More than 2^32 - 1 bytes are refused in this way too.
+/// Threads: thread-safe; who works on one range from several threads keeps them apart.
 class BASALT_API vlSharedMemoryAllocator {
 public:
     /// Reserves a range, or commits pages of one.

@@ -3,8 +3,8 @@
 // Space on the disk is reserved when the mapping is made, so that a full disk, a quota or a limit on the size
 // of files is a failed call, never a signal later.
 // A mapping has one view in its life: made with MapViewOfFile, which takes the file's descriptor back from
-// the system. Files that are mapped cost no descriptor. Threads: thread-safe, each handle and view used by
-// one thread at a time.
+// the system. Files that are mapped cost no descriptor.
+// Threads: thread-safe, each handle and view used by one thread at a time.
 #ifndef BASALT_SRC_PLATFORM_FILE_MAPPING_H
 #define BASALT_SRC_PLATFORM_FILE_MAPPING_H
 

@@ -111,7 +111,7 @@ TEST(VirtualMemory, what_is_not_reserved_is_refused) {
     char* const base = reserve(GRANULE, nullptr);
     char* const next = reserve(GRANULE, base + GRANULE);  // perhaps, and then it is another reservation
     const long mapped = mapped_balance();
-    for (char* const address : {base - 1, base + GRANULE - 1, static_cast<char*>(nullptr) + PAGE}) {
+    for (char* const address : {base - 1, base + GRANULE - 1, reinterpret_cast<char*>(PAGE)}) {
         SetLastError(0);
         EXPECT_EQ(commit(address, 2), nullptr);
         EXPECT_EQ(GetLastError(), ERROR_INVALID_ADDRESS);

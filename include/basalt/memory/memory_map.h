@@ -16,8 +16,8 @@ namespace vex_util {
 ///
 /// The file's space is reserved at creation, so that a full disk is never a signal later. It is held alone
 /// and goes with the block, with the process when that returns or calls exit(), and by CleanUp() after a
-/// process that was killed. Nothing here throws or is reported. Threads: reentrant; one object is used by one
-/// thread at a time.
+/// process that was killed. Nothing here throws or is reported.
+/// Threads: reentrant; one object is used by one thread at a time.
 class BASALT_API CMemoryMap {
 public:
     /// Without a block.

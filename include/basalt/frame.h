@@ -1,16 +1,17 @@
 /// @file
 /// Environment queries: operating-system and handheld codes, language, display and two small utilities; the
-/// identifier replacement table; conversions of text in fixed buffers.
+/// folders that the host configures; the identifier replacement table; conversions of text in fixed buffers.
 ///
-/// None of the queries fails, takes a lock or throws. What is determined once is stored for the life of the
-/// library in the process; two threads that make the first query at once both get, and store, the same
-/// answer.
+/// None of them takes a lock, and none fails but _tempFilePath() and _REPLACE_LOAD(), for want of memory. What
+/// is determined once is stored for the life of the library in the process; two threads that make the first
+/// query at once both get, and store, the same answer.
 #ifndef BASALT_FRAME_H
 #define BASALT_FRAME_H
 
 #include <cstdint>
 
 #include "basalt/export.h"
+#include "basalt/platform/cstring.h"
 
 /// Operating-system release code:
 ///
@@ -107,6 +108,48 @@ BASALT_API std::uint16_t _random_uint16();
 /// @param count number of bytes; 0 and 1 change nothing
 /// Threads: reentrant; nobody else may use the bytes meanwhile.
 BASALT_API void _reversebytes(void* data, std::uint32_t count);
+
+/// @name Configured folders
+/// Values that the host sets at its start and anybody reads. They are kept as given, up to 259 characters
+/// (the rest is cut off): no folder is looked at, no separator added or taken away.
+///
+/// A setter takes a terminated text, which may be one a getter gave; null is not allowed. A getter gives the
+/// stored text itself, valid until the library is unloaded: it is empty before any setting, changes with a
+/// later one, and is not to be written to.
+///
+/// Threads: the getters are thread-safe; while a setter runs, nobody else may use its values.
+/// @{
+
+/// Sets the root folder of the product family, and determines the operating-system code.
+BASALT_API void _setKestraRootPath(wchar_t* value);
+/// The root folder.
+BASALT_API wchar_t* _kestraRootPath();
+
+/// Sets the folder of the machine-control product, with it the inbox folder, and determines the
+/// operating-system code.
+BASALT_API void _setKestraGRDXPath(wchar_t* value);
+/// The product folder.
+BASALT_API wchar_t* _kestraGRDXPath();
+/// The inbox of the data-exchange service: the product folder followed by "\Inbox", also after a separator,
+/// and never cut; empty until the product folder is set for the first time.
+BASALT_API wchar_t* _kestraPortulaInboxPath();
+
+/// Sets the folder of the executable.
+BASALT_API void _setKestraExePath(wchar_t* value);
+/// The folder of the executable.
+BASALT_API wchar_t* _kestraExePath();
+
+/// Sets the application's version text.
+BASALT_API void _setKestraApplicationVersion(wchar_t* value);
+/// The application's version text.
+BASALT_API wchar_t* _kestraApplicationVersion();
+/// @}
+
+/// The system's folder for temporary files, asked for at each call.
+/// @return the folder with its closing separator: here TMPDIR, or /tmp/ when that is unset or empty, whether
+/// it exists or not. Empty when it needs more than 259 characters, or the system does not answer.
+/// Threads: thread-safe, as long as nobody changes the environment.
+BASALT_API CString _tempFilePath();
 
 /// @name Identifier replacement
 /// A process-wide table of pairs that the host loads, at most 1000, and a switch that starts off. The

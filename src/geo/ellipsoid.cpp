@@ -1,1 +1,176 @@
 #include "basalt/geo/ellipsoid.h"
+
+#include <cmath>
+
+#include "basalt/geo/plane.h"
+#include "src/geo/constants.h"
+
+using namespace basalt::geo;
+
+namespace {
+
+constexpr double SEMI_MAJOR_AXIS = 6378137.0;
+constexpr double ECCENTRICITY2 = 0.00669437999014;
+/// 1 - e^2 by the name of the place that uses it: they differ in the last digits, and each is part of
+/// results.
+constexpr double FIRST_ESTIMATE_FACTOR = 0.99330562000986;
+constexpr double Z_FACTOR = 0.9933056200098587;
+/// a (1 - e^2), metres.
+constexpr double MERIDIAN_NUMERATOR = 6335439.327292829;
+/// Latitude above which the height is taken along the axis; 80 degrees in radians.
+constexpr double POLAR_LATITUDE = 1.3962634015954636;
+
+/// From this tolerance on (radians) the first estimate of the latitude is kept.
+constexpr double NO_ITERATION = 10.0;
+constexpr int MOST_PASSES = 10;
+constexpr double LOCAL_FRAME_TOLERANCE = 5e-10;
+
+/// Square root of 1 - e^2 sin^2 of the latitude.
+double curvature_factor(double sine) {
+    return std::sqrt(1.0 - sine * ECCENTRICITY2 * sine);
+}
+
+double prime_vertical_radius(double sine) {
+    return SEMI_MAJOR_AXIS / curvature_factor(sine);
+}
+
+geo_vector cartesian(const geo_llh& llh) {
+    const double sine = std::sin(llh.latitude);
+    const double cosine = std::cos(llh.latitude);
+    const double n = prime_vertical_radius(sine);
+    const double from_axis = (n + llh.height) * cosine;
+    return {std::cos(llh.longitude) * from_axis, std::sin(llh.longitude) * from_axis,
+            sine * (n * Z_FACTOR + llh.height)};
+}
+
+double height_above_ellipsoid(double latitude, double sine, double cosine, double p, double z) {
+    const double n = prime_vertical_radius(sine);
+    return std::abs(latitude) <= POLAR_LATITUDE ? p / cosine - n : z / sine - n + n * ECCENTRICITY2;
+}
+
+/// Latitude and height by the iteration as it is written in the books; p is the distance from the axis.
+bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
+    double latitude = std::atan2(z, p * FIRST_ESTIMATE_FACTOR);
+    double sine = std::sin(latitude);
+    if (tolerance < NO_ITERATION) {
+        double previous = -100.0;
+        double change = 0.0;
+        int passes = 0;
+        do {
+            latitude = std::atan2(prime_vertical_radius(sine) * ECCENTRICITY2 * sine + z, p);
+            sine = std::sin(latitude);
+            change = std::abs(latitude - previous);
+            previous = latitude;
+            if (++passes > MOST_PASSES) {
+                return false;
+            }
+        } while (!(change <= tolerance));
+    }
+    llh.latitude = latitude;
+    llh.height = height_above_ellipsoid(latitude, sine, std::cos(latitude), p, z);
+    return true;
+}
+
+/// The same passes without an angle: the latitude is the direction of (p, q), and a pass takes q to
+/// z + N e^2 sin = z + a e^2 q / sqrt(p^2 + (1 - e^2) q^2), a root and a division for a sine and an
+/// arctangent. Two latitudes differ by the angle whose tangent is p (q - q') / (p^2 + q q').
+/// False when anything might be decided otherwise than by convert_plainly(): a tolerance or a point outside
+/// the range where rounding stays below the margin, a change too close to the tolerance, a latitude too close
+/// to where the height's formula changes.
+bool convert_quickly(double p, double z, double tolerance, geo_llh& llh) {
+    const double p2 = p * p;
+    const double distance2 = p2 + z * z;
+    if (!(tolerance >= 1e-12 && tolerance <= 0.01 && distance2 > 1e12 && distance2 < 1e300)) {
+        return false;
+    }
+    constexpr double AXIS_PULL = SEMI_MAJOR_AXIS * ECCENTRICITY2;
+    constexpr double FLAT = 1.0 - ECCENTRICITY2;
+    const double margin = tolerance * 1e-4 + 1e-14;
+    const double base = p * FIRST_ESTIMATE_FACTOR;
+    // The first pass never settles: nothing stands before it.
+    double q = z + AXIS_PULL * z / std::sqrt(base * base + FLAT * (z * z));
+    int passes = 1;
+    for (;;) {
+        const double previous = q;
+        const double q2 = q * q;
+        q = z + AXIS_PULL * q / std::sqrt(p2 + FLAT * q2);
+        if (++passes > MOST_PASSES) {
+            return false;
+        }
+        const double change = std::abs(q - previous) * p;
+        const double unit = p2 + q * previous;
+        if (change <= (tolerance - margin) * unit) {
+            break;
+        }
+        if (!(change > (tolerance + margin) * unit)) {
+            return false;
+        }
+    }
+    const double latitude = std::atan2(q, p);
+    if (std::abs(std::abs(latitude) - POLAR_LATITUDE) < 1e-14) {
+        return false;
+    }
+    const double length = std::sqrt(p2 + q * q);
+    llh.latitude = latitude;
+    llh.height = height_above_ellipsoid(latitude, q / length, p / length, p, z);
+    return true;
+}
+
+/// Sum of products in the order x, y, z, from 0.
+double along(const geo_vector& axis, const geo_vector& d) {
+    return 0.0 + axis.x * d.x + axis.y * d.y + axis.z * d.z;
+}
+
+}  // namespace
+
+void _wgs84curvature(double latitude, double& meridianRadius, double& primeVerticalRadius) {
+    const double w = curvature_factor(std::sin(latitude));
+    meridianRadius = MERIDIAN_NUMERATOR / (w * w * w);
+    primeVerticalRadius = SEMI_MAJOR_AXIS / w;
+}
+
+int _xyz2llh(const geo_vector* xyz, geo_llh* llh, double tolerance) {
+    if (xyz->x == 0.0 && xyz->y == 0.0 && xyz->z == 0.0) {
+        return 0;
+    }
+    const double p = std::sqrt(xyz->x * xyz->x + xyz->y * xyz->y);
+    geo_llh result = {};
+    if (!convert_quickly(p, xyz->z, tolerance, result) && !convert_plainly(p, xyz->z, tolerance, result)) {
+        return 0;
+    }
+    result.longitude = std::atan2(xyz->y, xyz->x);
+    *llh = result;
+    return 1;
+}
+
+int _llh2xyz(const geo_llh* llh, geo_vector* xyz) {
+    if (llh->latitude == 0.0 && llh->longitude == 0.0 && llh->height == 0.0) {
+        return 0;
+    }
+    *xyz = cartesian(*llh);
+    return 1;
+}
+
+int _xyz2nez(const geo_vector* origin, const geo_vector* point, geo_nee* out) {
+    geo_llh at = {};
+    if (_xyz2llh(origin, &at, LOCAL_FRAME_TOLERANCE) == 0) {
+        return 1;
+    }
+    const double sin_lat = std::sin(at.latitude);
+    const double cos_lat = std::cos(at.latitude);
+    const double sin_lon = std::sin(at.longitude);
+    const double cos_lon = std::cos(at.longitude);
+    const geo_vector d = {point->x - origin->x, point->y - origin->y, point->z - origin->z};
+    out->north = along({-sin_lat * cos_lon, -sin_lat * sin_lon, cos_lat}, d);
+    out->east = along({-sin_lon, cos_lon, 0.0}, d);
+    out->elevation = along({cos_lat * cos_lon, cos_lat * sin_lon, sin_lat}, d);
+    return 1;
+}
+
+int llh_equal(const geo_llh& a, const geo_llh& b) {
+    // The conversion itself, not _llh2xyz(): that one refuses the all-zero point, which is a place like any
+    // other.
+    geo_vector va = cartesian(a);
+    geo_vector vb = cartesian(b);
+    return geo_vector_length(va, vb) < EQUALITY_TOLERANCE ? 1 : 0;
+}

@@ -1,1 +1,132 @@
 #include "basalt/geo/time_scales.h"
+
+#include <array>
+#include <atomic>
+#include <cstdint>
+
+namespace {
+
+constexpr std::uint32_t MJD_OF_GPS_EPOCH = 44244;
+constexpr std::uint32_t DAYS_PER_WEEK = 7;
+constexpr double SECONDS_PER_DAY = 86400.0;
+constexpr double SECONDS_PER_WEEK = 604800.0;
+constexpr std::uint64_t TICKS_PER_MILLISECOND = 10000;
+constexpr std::int32_t DATE_TO_MJD = 2432076;
+constexpr std::uint32_t MJD_TO_DATE = 2468570;
+
+/// Answer for a calendar record that is no time.
+constexpr std::uint64_t NO_TIME = ~std::uint64_t{0};
+
+/// Ticks of 1970-01-01 00:00; 0 until first asked for. Threads that fill it at once store the same number.
+std::atomic<std::uint64_t> epoch_cache = 0;
+
+std::uint64_t tick_count(const FILETIME& time) {
+    return std::uint64_t{time.dwHighDateTime} << 32 | time.dwLowDateTime;
+}
+
+std::uint64_t ticks_of_1970() {
+    std::uint64_t ticks = epoch_cache.load(std::memory_order_relaxed);
+    if (ticks == 0) {
+        const SYSTEMTIME epoch = {1970, 1, 0, 1, 0, 0, 0, 0};
+        FILETIME time = {};
+        SystemTimeToFileTime(&epoch, &time);
+        ticks = tick_count(time);
+        epoch_cache.store(ticks, std::memory_order_relaxed);
+    }
+    return ticks;
+}
+
+constexpr std::uint32_t days_since_1858(std::uint16_t year, std::uint16_t month, std::uint16_t day) {
+    const std::int32_t a = (month - 14) / 12;  // -1 for January and February, which end the year before
+    const std::int32_t y = year + a;
+    return static_cast<std::uint32_t>(day - DATE_TO_MJD + 367 * (month - 2 - 12 * a) / 12 -
+                                      3 * ((y + 4900) / 100) / 4 + 1461 * (y + 4800) / 4);
+}
+
+/// The last day whose year 16 bits hold.
+constexpr std::uint32_t LAST_WHOLE_YEAR_DAY = days_since_1858(65535, 12, 31);
+/// The last day the arithmetic reaches in 32 bits with a sign.
+constexpr std::uint32_t LAST_DAY = (std::uint32_t{1} << 29) - 1 - MJD_TO_DATE;
+constexpr std::uint32_t WEDNESDAY = 3;  // MJD 0
+
+struct Date {
+    std::uint16_t year, month, day;
+};
+
+/// Nothing is negative here, so all is unsigned, which divides faster.
+Date date_of(std::uint32_t mjd) {
+    std::uint32_t l = mjd + MJD_TO_DATE;
+    const std::uint32_t n = 4 * l / 146097;
+    l -= (146097 * n + 3) / 4;
+    const std::uint32_t i = 4000 * (l + 1) / 1461001;
+    l = l - 1461 * i / 4 + 31;
+    const std::uint32_t j = 80 * l / 2447;
+    const std::uint32_t k = j / 11;
+    return {static_cast<std::uint16_t>(100 * (n - 49) + i + k), static_cast<std::uint16_t>(j + 2 - 12 * k),
+            static_cast<std::uint16_t>(l - 2447 * j / 80)};
+}
+
+/// By the year as 16 bits hold it, which may not be the day's own.
+std::uint16_t day_of_week(const Date& date) {
+    if (date.month == 0) {
+        return 0;
+    }
+    constexpr std::array<int, 12> DAYS_BEFORE_MONTH = {0, 31, 59, 90, 120, 151, 181, 212, 243, 273, 304, 334};
+    const int year = date.year;
+    const bool leap = (year % 4 == 0 && year % 100 != 0) || year % 400 == 0;
+    const int day_of_year = DAYS_BEFORE_MONTH[date.month - 1U] + date.day + (leap && date.month > 2 ? 1 : 0);
+    const int century = (year - 1) / 100;
+    const int y = (year - 1) % 100;
+    const int first_of_january = (5 * (century % 4) + y + y / 4) % 7 + 1;
+    return static_cast<std::uint16_t>((first_of_january + day_of_year - 1) % 7);
+}
+
+}  // namespace
+
+std::uint32_t _greg2mjd(std::uint16_t year, std::uint16_t month, std::uint16_t day) {
+    return days_since_1858(year, month, day);
+}
+
+void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std::uint16_t& day,
+               std::uint16_t& dayOfWeek) {
+    const Date date = mjd <= LAST_DAY ? date_of(mjd) : Date{0, 0, 0};
+    year = date.year;
+    month = date.month;
+    day = date.day;
+    dayOfWeek = mjd <= LAST_WHOLE_YEAR_DAY ? static_cast<std::uint16_t>((mjd + WEDNESDAY) % DAYS_PER_WEEK)
+                                           : day_of_week(date);
+}
+
+void _mjd2gps(std::uint32_t mjd, double secondsOfDay, std::uint16_t& week, double& secondsOfWeek) {
+    const std::uint32_t days = mjd - MJD_OF_GPS_EPOCH;
+    week = static_cast<std::uint16_t>(days % 65536 / DAYS_PER_WEEK);
+    secondsOfWeek = days % DAYS_PER_WEEK * SECONDS_PER_DAY + secondsOfDay;
+}
+
+double _gps2mjd(std::uint16_t week, double secondsOfWeek) {
+    return (week * SECONDS_PER_WEEK + secondsOfWeek) / SECONDS_PER_DAY + MJD_OF_GPS_EPOCH;
+}
+
+std::uint64_t _systime2javatime(SYSTEMTIME* time) {
+    const std::uint64_t epoch = ticks_of_1970();
+    FILETIME ticks = {};
+    if (SystemTimeToFileTime(time, &ticks) == 0) {
+        return NO_TIME;
+    }
+    return (tick_count(ticks) - epoch) / TICKS_PER_MILLISECOND;
+}
+
+SYSTEMTIME* _javatime2systemtime(std::uint64_t milliseconds, SYSTEMTIME* time) {
+    const std::uint64_t ticks = milliseconds * TICKS_PER_MILLISECOND + ticks_of_1970();
+    const FILETIME file_time = {static_cast<DWORD>(ticks), static_cast<DWORD>(ticks >> 32)};
+    if (FileTimeToSystemTime(&file_time, time) == 0) {
+        *time = {};
+    }
+    return time;
+}
+
+std::uint64_t _currentjavatime() {
+    SYSTEMTIME now = {};
+    GetSystemTime(&now);
+    return _systime2javatime(&now);
+}

@@ -1,1 +1,128 @@
 #include "basalt/geo/units.h"
+
+#include <cmath>
+#include <cstdint>
+#include <limits>
+
+#include "src/geo/constants.h"
+
+using namespace basalt::geo;
+
+namespace {
+
+constexpr double RADIANS_PER_DEGREE = 0.017453292519943295;
+constexpr double METRES_PER_FOOT = 0.3048006096012192;
+constexpr double INCHES_PER_FOOT = 12.0;
+constexpr double SECONDS_ROUNDING = 5e-6;
+/// A bearing this large is 160,000 turns away, the most that are taken off one by one.
+constexpr double MOST_STEPPED = 1e6;
+constexpr std::uint32_t LARGEST_FINITE_FACTORIAL = 170;
+
+/// Whole part of a value, the nearest number Integer holds where it holds no such, and 0 for NaN.
+template <typename Integer>
+Integer whole_part(double value) {
+    // As a double the largest 64-bit number rounds up to the first that does not fit.
+    constexpr auto LARGEST = std::numeric_limits<Integer>::max();
+    constexpr auto SMALLEST = std::numeric_limits<Integer>::min();
+    if (value >= static_cast<double>(LARGEST)) {
+        return LARGEST;
+    }
+    if (value <= static_cast<double>(SMALLEST)) {
+        return SMALLEST;
+    }
+    return std::isnan(value) ? 0 : static_cast<Integer>(value);
+}
+
+/// Numerator of the fraction of an inch, rounded to the nearest 1 / denominator.
+int fraction_numerator(double inches, int denominator) {
+    if (denominator == -1) {
+        return 0;  // the smallest number there is has no remainder by -1: the division traps
+    }
+    return static_cast<int>(whole_part<std::int64_t>(denominator * inches + 0.5) % denominator);
+}
+
+bool is_even(int value) {
+    return value % 2 == 0;
+}
+
+}  // namespace
+
+double _degtorad(double degrees) {
+    return degrees * RADIANS_PER_DEGREE;
+}
+
+void _radtodms(double radians, int* degrees, int* minutes, double* seconds) {
+    const double angle = radians / RADIANS_PER_DEGREE;
+    double rest = std::abs(angle) * 3600.0 + SECONDS_ROUNDING;
+    const int whole_degrees = whole_part<int>(rest / 3600.0);
+    rest -= whole_degrees * 3600.0;
+    const int whole_minutes = whole_part<int>(rest / 60.0);
+    rest -= whole_minutes * 60.0;
+    *degrees = angle >= 0.0 ? whole_degrees : -whole_degrees;
+    *minutes = whole_minutes;
+    *seconds = rest - SECONDS_ROUNDING;
+}
+
+void _dmstorad(int degrees, int minutes, double seconds, double* radians) {
+    const double size = std::abs(static_cast<double>(degrees)) * RADIANS_PER_DEGREE +
+                        minutes / 60.0 * RADIANS_PER_DEGREE + seconds / 3600.0 * RADIANS_PER_DEGREE;
+    *radians = degrees < 0 ? -size : size;
+}
+
+void _mtoftin(double metres, int fractionDenominator, bool* positive, int* feet, double* inches,
+              int* numerator, int* denominator) {
+    const double total = std::abs(metres / METRES_PER_FOOT * INCHES_PER_FOOT);
+    int parts = 0;
+    int of = 0;
+    if (fractionDenominator != 0) {
+        of = fractionDenominator;
+        parts = fraction_numerator(total, of);
+        if (parts == 0) {
+            of = 0;
+        } else {
+            while (is_even(parts) && is_even(of)) {
+                of /= 2;
+                parts = fraction_numerator(total, of);
+            }
+        }
+    }
+    *positive = metres >= 0.0;
+    *feet = whole_part<int>(static_cast<double>(whole_part<std::int64_t>(total) / 12));
+    *inches = std::fmod(total, INCHES_PER_FOOT);
+    *numerator = parts;
+    *denominator = of;
+}
+
+void _ftintom(int feet, double inches, int numerator, int denominator, double* metres) {
+    const double all = denominator == 0 ? inches : inches + static_cast<double>(numerator) / denominator;
+    const double part = all / INCHES_PER_FOOT;
+    *metres = (feet >= 0 ? feet + part : feet - part) * METRES_PER_FOOT;
+}
+
+double _normalisedbearing(double angle) {
+    if (angle == GEO_NULL || !std::isfinite(angle)) {
+        return angle;
+    }
+    if (std::abs(angle) > MOST_STEPPED) {
+        angle = std::fmod(angle, TWO_PI);
+    }
+    while (angle >= TWO_PI) {
+        angle -= TWO_PI;
+    }
+    while (angle < 0.0) {
+        angle += TWO_PI;
+    }
+    // A tiny negative angle has just been rounded up to 2 pi.
+    return angle == TWO_PI ? 0.0 : angle;
+}
+
+double factorial(std::uint32_t n) {
+    if (n > LARGEST_FINITE_FACTORIAL) {
+        return std::numeric_limits<double>::infinity();
+    }
+    double product = n == 0 ? 1.0 : n;
+    for (std::uint32_t i = n; i > 2; --i) {
+        product *= i - 1;
+    }
+    return product;
+}

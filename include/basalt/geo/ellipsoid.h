@@ -1,9 +1,64 @@
 /// @file
-/// Conversions on the WGS84 ellipsoid.
+/// Conversions on the WGS84 ellipsoid. What holds for all of survey geometry is said in basalt/geo.h.
+///
+/// Cartesian coordinates are earth-centred and earth-fixed: x towards latitude 0, longitude 0; y towards
+/// longitude pi/2; z towards the north pole. Longitudes given may lie in any range.
 #ifndef BASALT_GEO_ELLIPSOID_H
 #define BASALT_GEO_ELLIPSOID_H
 
 #include "basalt/export.h"
 #include "basalt/geo/records.h"
+
+/// @name Ellipsoid
+/// @{
+
+/// Geodetic point of a Cartesian one, by iteration on the latitude.
+/// @param xyz Cartesian point, metres
+/// @param[out] llh geodetic point: latitude in [-pi/2, pi/2], longitude in [-pi, pi], 0 on the axis
+/// @param tolerance radians: the latitude has settled when two passes agree within it. 5e-10 is the
+/// library's own; with 0 they must agree exactly; from 10 on, or NaN, the first estimate is kept (right at
+/// height 0; 21 m off at 10 km).
+/// @return 1; 0 with llh untouched at the earth's centre, for NaN coordinates, and for a latitude that has
+/// not settled in ten passes (closer than about 250 km to the centre with 5e-10)
+///
+/// Accuracy: see docs/accuracy.md. Coordinates beyond 1e154 m count as infinite, below 1e-162 m as 0.
+///
+/// Source: W. Heiskanen, H. Moritz, Physical Geodesy, 1967, section 5-3.
+BASALT_API int _xyz2llh(const geo_vector* xyz, geo_llh* llh, double tolerance);
+
+/// Cartesian point of a geodetic one.
+/// @param llh geodetic point, radians and metres
+/// @param[out] xyz Cartesian point, metres
+/// @return 1; 0 with xyz untouched when latitude, longitude and height are all exactly 0: the point on the
+/// equator at longitude 0 and height 0 is refused as a record never set
+///
+/// Bad input: NaN, or an infinite latitude or longitude, gives NaN, with 1.
+///
+/// Source: W. Heiskanen, H. Moritz, Physical Geodesy, 1967, eq. 5-3.
+BASALT_API int _llh2xyz(const geo_llh* llh, geo_vector* xyz);
+
+/// A point in the local frame of an origin: north and east in the plane that touches the ellipsoid below it,
+/// elevation along its outward normal. All three are 0 at the origin; the elevation is no height: it falls
+/// away with the earth's curvature, 0.08 m at 1 km.
+/// @param origin Cartesian point, metres
+/// @param point Cartesian point, metres
+/// @param[out] out local point, metres
+/// @return always 1; out is untouched when the origin cannot be converted, see _xyz2llh()
+BASALT_API int _xyz2nez(const geo_vector* origin, const geo_vector* point, geo_nee* out);
+
+/// Principal radii of curvature.
+/// @param latitude radians
+/// @param[out] meridianRadius radius along the meridian, metres
+/// @param[out] primeVerticalRadius radius across it, metres
+///
+/// Source: W. Torge, Geodesy, 2001, section 4.1.
+BASALT_API void _wgs84curvature(double latitude, double& meridianRadius, double& primeVerticalRadius);
+
+/// Whether two geodetic points are less than 0.5 mm apart in space. Longitudes a turn apart are equal, as are
+/// all longitudes at a pole; the all-zero point counts as the point on the equator that it is.
+/// @return 1 or 0
+BASALT_API int llh_equal(const geo_llh& a, const geo_llh& b);
+
+/// @}
 
 #endif

@@ -1,9 +1,76 @@
 /// @file
-/// Calendar dates, Modified Julian Date, GPS time, milliseconds since 1970.
+/// Time scales: calendar dates, Modified Julian Date (MJD), GPS time, milliseconds since 1970.
+///
+/// MJD counts whole days from 1858-11-17. GPS time counts weeks from 1980-01-06, MJD 44244, without starting
+/// over, and seconds within them; no leap second is added or taken away. Dates are Gregorian throughout.
+///
+/// Threads: every function is thread-safe. None throws or allocates.
 #ifndef BASALT_GEO_TIME_SCALES_H
 #define BASALT_GEO_TIME_SCALES_H
 
+#include <cstdint>
+
 #include "basalt/export.h"
-#include "basalt/geo/records.h"
+#include "basalt/platform/calendar.h"
+
+/// MJD of a date.
+/// @param year 1858 or later for a date the result can hold; earlier days count backwards from 2^32
+/// @param month 1 to 12
+/// @param day 1 to 31
+/// @return whole days since 1858-11-17
+///
+/// Bad input: a day past the month's end is that many days after its beginning; months outside 1 to 12 give
+/// a number that means nothing.
+///
+/// Source: H. Fliegel, T. Van Flandern, Communications of the ACM 11 (10), 1968.
+BASALT_API std::uint32_t _greg2mjd(std::uint16_t year, std::uint16_t month, std::uint16_t day);
+
+/// Date and day of the week of an MJD.
+/// @param mjd whole days since 1858-11-17
+/// @param[out] year the year
+/// @param[out] month 1 to 12
+/// @param[out] day 1 to 31
+/// @param[out] dayOfWeek 0 (Sunday) to 6
+///
+/// Bad input: from 23257591 on, the year 65536, only the low 16 bits of the year are left and the day of the
+/// week is that of the year so cut; from 534402342 on all four are 0.
+///
+/// Source: as _greg2mjd().
+BASALT_API void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std::uint16_t& day,
+                          std::uint16_t& dayOfWeek);
+
+/// GPS time of an MJD and a time of day.
+/// @param mjd whole days, 44244 or more
+/// @param secondsOfDay added as it is: any number
+/// @param[out] week GPS week. Formed from the low 16 bits of the days since 1980-01-06, so that it starts
+/// over on 2159-06-12, after week 9362.
+/// @param[out] secondsOfWeek seconds since the week's beginning
+///
+/// Bad input: days before 1980-01-06 count backwards from 2^32.
+BASALT_API void _mjd2gps(std::uint32_t mjd, double secondsOfDay, std::uint16_t& week, double& secondsOfWeek);
+
+/// MJD with a day fraction of a GPS time; good to a microsecond.
+/// @param week GPS week
+/// @param secondsOfWeek any number of seconds since its beginning
+BASALT_API double _gps2mjd(std::uint16_t week, double secondsOfWeek);
+
+/// Milliseconds since 1970-01-01 00:00 of a calendar time.
+/// @param time UTC, not null; its day of the week is not read
+/// @return milliseconds. Times before 1970 give what is left of 2^64 ticks, in milliseconds: about 1.8e15.
+///
+/// Bad input: a record that is no time between 1601 and 30827 gives 2^64 - 1.
+BASALT_API std::uint64_t _systime2javatime(SYSTEMTIME* time);
+
+/// Calendar time of milliseconds since 1970-01-01 00:00.
+/// @param milliseconds the count; one of _systime2javatime() for a time before 1970 comes back within a
+/// millisecond below
+/// @param[out] time UTC with its day of the week, not null
+/// @return time
+///
+/// Bad input: a count whose time would lie after the platform's last (30828-09-14) gives a record of zeros.
+BASALT_API SYSTEMTIME* _javatime2systemtime(std::uint64_t milliseconds, SYSTEMTIME* time);
+
+/// Milliseconds since 1970-01-01 00:00 UTC, now, by the machine's clock.
+BASALT_API std::uint64_t _currentjavatime();
 
 #endif

@@ -1,0 +1,99 @@
+#include "src/geo/geodesic_line.h"
+
+#include <cmath>
+
+#include "src/geo/constants.h"
+
+namespace basalt::geo {
+
+namespace {
+
+constexpr double FLATTENING = 0.0033528106647474805;
+constexpr double ONE_LESS_FLATTENING = 0.9966471893352525;
+constexpr double SEMI_MINOR_AXIS = 6356752.3142;
+/// a^2 - b^2 and b^2, square metres.
+constexpr double AXES_DIFFERENCE2 = 272331606681.9453;
+constexpr double SEMI_MINOR_AXIS2 = 40408299984087.055;
+constexpr double FLATTENING_16TH = 0.00020955066654671753;
+
+constexpr double SETTLED = 1e-12;
+constexpr int MOST_PASSES = 100;
+
+}  // namespace
+
+GeodesicLine::GeodesicLine(double latitude, double azimuth)
+    : m_sin_azimuth(std::sin(azimuth)), m_cos_azimuth(std::cos(azimuth)) {
+    // One sine and cosine cost less than a tangent.
+    m_tan_u = ONE_LESS_FLATTENING * (std::sin(latitude) / std::cos(latitude));
+    m_cos_u = 1.0 / std::sqrt(m_tan_u * m_tan_u + 1.0);
+    m_sin_u = m_tan_u * m_cos_u;
+    m_sin_alpha = m_cos_u * m_sin_azimuth;
+    m_cos2_alpha = 1.0 - m_sin_alpha * m_sin_alpha;
+    const double u2 = m_cos2_alpha * AXES_DIFFERENCE2 / SEMI_MINOR_AXIS2;
+    const double a = 1.0 + u2 * 6.103515625e-05 * (4096.0 + u2 * (-768.0 + u2 * (320.0 - 175.0 * u2)));
+    m_b = u2 * 0.0009765625 * (256.0 + u2 * (-128.0 + u2 * (74.0 - 47.0 * u2)));
+    m_metres_per_radian = SEMI_MINOR_AXIS * a;
+    // sigma1 is the direction of (cos azimuth, tan u); the double angle needs no arctangent. The squares sum
+    // to more than 0: no double has a cosine of 0.
+    const double length2 = m_tan_u * m_tan_u + m_cos_azimuth * m_cos_azimuth;
+    m_sin_2sigma1 = 2.0 * m_tan_u * m_cos_azimuth / length2;
+    m_cos_2sigma1 = (m_cos_azimuth - m_tan_u) * (m_cos_azimuth + m_tan_u) / length2;
+}
+
+/// Vincenty's iteration for the arc, from its first value. The sine and cosines left are those the last pass
+/// began with. False when a change comes within `closeness` of what decides.
+template <typename CosineOfMiddle>
+bool GeodesicLine::settle(double first, double closeness, const CosineOfMiddle& cos_2m, Arc& arc) const {
+    const auto set = [&](double sigma) {
+        const double sine = std::sin(sigma);
+        const double cosine = std::cos(sigma);
+        arc = {sigma, sine, cosine, cos_2m(sigma, sine, cosine)};
+    };
+    set(first);
+    double change = std::abs(first - TWO_PI);
+    for (int pass = 0; change > SETTLED && pass < MOST_PASSES; ++pass) {
+        if (pass > 0) {
+            set(arc.sigma);
+        }
+        const double c = arc.cos_2m;
+        const double delta =
+            m_b * arc.sine *
+            (c + m_b / 4.0 *
+                     (arc.cosine * (2.0 * c * c - 1.0) -
+                      m_b / 6.0 * c * (4.0 * arc.sine * arc.sine - 3.0) * (4.0 * c * c - 3.0)));
+        const double previous = arc.sigma;
+        arc.sigma = first + delta;
+        change = std::abs(arc.sigma - previous);
+        if (std::abs(change - SETTLED) <= closeness) {
+            return false;
+        }
+    }
+    return true;
+}
+
+LineEnd GeodesicLine::at(double distance) const {
+    const double first = distance / m_metres_per_radian;
+    Arc arc = {};
+    // By the addition theorem the middle needs no cosine of its own. It moves sigma by a few units in the
+    // last place; where that could change the count of passes, the arc is settled again as the books have it.
+    const double rounding = 1e-15 * (1.0 + std::abs(first));
+    const auto by_addition = [this](double, double sine, double cosine) {
+        return m_cos_2sigma1 * cosine - m_sin_2sigma1 * sine;
+    };
+    if (!settle(first, rounding, by_addition, arc)) {
+        const double sigma1 = std::atan2(m_tan_u, m_cos_azimuth);
+        settle(
+            first, -1.0, [&](double sigma, double, double) { return std::cos(2.0 * sigma1 + sigma); }, arc);
+    }
+    const double t = m_sin_u * arc.sine - m_cos_u * arc.cosine * m_cos_azimuth;
+    const double lambda =
+        std::atan2(arc.sine * m_sin_azimuth, m_cos_u * arc.cosine - m_sin_u * arc.sine * m_cos_azimuth);
+    const double k = FLATTENING_16TH * m_cos2_alpha * (4.0 + FLATTENING * (4.0 - 3.0 * m_cos2_alpha));
+    const double c = arc.cos_2m;
+    return {m_sin_alpha, -t, m_sin_u * arc.cosine + m_cos_u * arc.sine * m_cos_azimuth,
+            ONE_LESS_FLATTENING * std::sqrt(m_sin_alpha * m_sin_alpha + t * t),
+            lambda - (1.0 - k) * FLATTENING * m_sin_alpha *
+                         (arc.sigma + k * arc.sine * (c + k * arc.cosine * (2.0 * c * c - 1.0)))};
+}
+
+}  // namespace basalt::geo

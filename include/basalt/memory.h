@@ -11,6 +11,8 @@
 #include <cstdint>
 
 #include "basalt/export.h"
+#include "basalt/memory/memory_map.h"
+#include "basalt/memory/page_sources.h"
 
 namespace vex_lib {
 

@@ -3,8 +3,8 @@
 #include "src/platform/pages.h"
 #include "src/platform/private_heap.h"
 
-using basalt::platform::page_size;
 using basalt::platform::PrivateHeap;
+using basalt::platform::whole_pages;
 
 namespace {
 
@@ -29,10 +29,8 @@ HANDLE HeapCreate(DWORD options, std::size_t initialSize, std::size_t maximumSiz
         SetLastError(ERROR_INVALID_PARAMETER);
         return nullptr;
     }
-    const std::size_t page = page_size();
     // Within a page of 2^64 this comes to 0: no limit, as good as that one.
-    const std::size_t rounded = (maximumSize / page + (maximumSize % page != 0)) * page;
-    PrivateHeap* heap = PrivateHeap::create(rounded);
+    PrivateHeap* heap = PrivateHeap::create(whole_pages(maximumSize));
     if (heap == nullptr) {
         SetLastError(ERROR_NOT_ENOUGH_MEMORY);
     }

@@ -8,8 +8,8 @@
 namespace basalt::platform {
 namespace {
 
-std::byte* map_anywhere(std::size_t size) noexcept {
-    void* pages = mmap(nullptr, size, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+std::byte* map_anywhere(std::size_t size, int protection) noexcept {
+    void* pages = mmap(nullptr, size, protection, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
     return pages == MAP_FAILED ? nullptr : static_cast<std::byte*>(pages);
 }
 
@@ -17,14 +17,8 @@ std::size_t distance_to_multiple(const std::byte* pages, std::size_t alignment) 
     return (0 - reinterpret_cast<std::uintptr_t>(pages)) & (alignment - 1);
 }
 
-}  // namespace
-
-std::size_t page_size() noexcept {
-    return static_cast<std::size_t>(sysconf(_SC_PAGESIZE));
-}
-
-std::byte* map_pages(std::size_t size, std::size_t alignment) noexcept {
-    std::byte* pages = map_anywhere(size);
+std::byte* map_aligned(std::size_t size, std::size_t alignment, int protection) noexcept {
+    std::byte* pages = map_anywhere(size, protection);
     if (pages == nullptr || distance_to_multiple(pages, alignment) == 0) {
         return pages;
     }
@@ -33,7 +27,7 @@ std::byte* map_pages(std::size_t size, std::size_t alignment) noexcept {
         return nullptr;
     }
     const std::size_t padded = size + alignment;
-    pages = map_anywhere(padded);
+    pages = map_anywhere(padded, protection);
     if (pages == nullptr) {
         return nullptr;
     }
@@ -48,6 +42,25 @@ std::byte* map_pages(std::size_t size, std::size_t alignment) noexcept {
         return nullptr;
     }
     return aligned;
+}
+
+}  // namespace
+
+std::size_t page_size() noexcept {
+    return static_cast<std::size_t>(sysconf(_SC_PAGESIZE));
+}
+
+std::size_t whole_pages(std::size_t size) noexcept {
+    const std::size_t page = page_size();
+    return (size + page - 1) & ~(page - 1);
+}
+
+std::byte* map_pages(std::size_t size, std::size_t alignment) noexcept {
+    return map_aligned(size, alignment, PROT_READ | PROT_WRITE);
+}
+
+std::byte* reserve_pages(std::size_t size, std::size_t alignment) noexcept {
+    return map_aligned(size, alignment, PROT_NONE);
 }
 
 bool unmap_pages(std::byte* pages, std::size_t size) noexcept {

@@ -14,9 +14,15 @@ inline constexpr std::size_t SMALLEST_PAGE = 4096;  // of any system; asking for
 
 std::size_t page_size() noexcept;
 
+// The size brought up to whole pages; within a page of 2^64 it comes to 0.
+std::size_t whole_pages(std::size_t size) noexcept;
+
 // Maps zeroed memory whose address is a multiple of alignment (a power of two, at least a page).
 // Null when the system has none; nothing stays mapped then.
 std::byte* map_pages(std::size_t size, std::size_t alignment) noexcept;
+
+// The same of address space alone, which may not be touched.
+std::byte* reserve_pages(std::size_t size, std::size_t alignment) noexcept;
 
 // Gives memory back. False when the system refuses (it may for want of bookkeeping): still mapped then.
 bool unmap_pages(std::byte* pages, std::size_t size) noexcept;

@@ -16,11 +16,6 @@ constexpr std::size_t LARGEST_REGION = std::size_t{32} << 20;
 // the system hands out fresh costs more than all the rest of an allocation.
 constexpr std::size_t MOST_IDLE = LARGEST_REGION;
 
-std::size_t whole_pages(std::size_t size) {
-    const std::size_t page = page_size();
-    return (size + page - 1) & ~(page - 1);
-}
-
 // Regions that fill large pages lie on their boundaries, or the system could not use any.
 std::byte* map_region(std::size_t size) {
     return map_pages(size, size >= LARGE_PAGE ? LARGE_PAGE : page_size());

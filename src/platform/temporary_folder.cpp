@@ -6,13 +6,13 @@
 #include <string>
 
 #include "basalt/platform/error.h"
-#include "src/platform/utf8.h"
+#include "src/platform/file_name.h"
 
 DWORD GetTempPathW(DWORD length, wchar_t* buffer) {
     try {
         const char* const configured = std::getenv("TMPDIR");
         const bool is_set = configured != nullptr && *configured != '\0';
-        std::wstring folder = basalt::platform::wide_from_utf8(is_set ? configured : "/tmp");
+        std::wstring folder = basalt::platform::wide_from_file_name(is_set ? configured : "/tmp");
         if (folder.back() != L'/') {
             folder += L'/';
         }

@@ -1,0 +1,66 @@
+/// @file
+/// CMemoryMap, one large block of memory on a temporary file.
+#ifndef BASALT_MEMORY_MEMORY_MAP_H
+#define BASALT_MEMORY_MEMORY_MAP_H
+
+#include <cstdint>
+
+#include "basalt/export.h"
+#include "basalt/platform/types.h"
+
+namespace vex_util {
+
+/// One block of memory that the system pages to a hidden file of its own in the temporary folder
+/// (_tempFilePath() of basalt/frame.h), "~" with a random number in seven digits and ".mem". Where there is
+/// no room for a file, or none can be made, the block comes from the heap instead.
+///
+/// The file's space is reserved at creation, so that a full disk is never a signal later. It is held alone
+/// and goes with the block, with the process when that returns or calls exit(), and by CleanUp() after a
+/// process that was killed. Nothing here throws or is reported. Threads: reentrant; one object is used by one
+/// thread at a time.
+class BASALT_API CMemoryMap {
+public:
+    /// Without a block.
+    CMemoryMap();
+
+    /// With a block, as by Create(); `operator void*` tells whether there is one.
+    explicit CMemoryMap(unsigned long size);
+
+    /// As Destroy().
+    ~CMemoryMap();
+
+    /// The block has one owner: copies are refused.
+    CMemoryMap(const CMemoryMap&) = delete;
+    CMemoryMap& operator=(const CMemoryMap&) = delete;
+
+    /// Releases what the object holds and makes a block.
+    /// @param size bytes, up to 2^32 - 1; 0 gives a block from the heap, of no bytes
+    /// @return true with a block that reads as zero; false, without one, when neither a file nor the heap has
+    ///         room, and for a size above the range
+    bool Create(unsigned long size);
+
+    /// Releases the block and deletes its file; without a block it does nothing.
+    /// @return true
+    bool Destroy();
+
+    /// The block; null when there is none.
+    operator void*() const;
+
+    /// Deletes every file "~*.mem" in the temporary folder that no living block holds, in this process or in
+    /// another; those and what cannot be deleted stay. Without a temporary folder it does nothing.
+    /// Threads: thread-safe.
+    static void CleanUp();
+
+private:
+    bool create_on_file();
+
+    void* m_data;
+    std::uint32_t m_size;
+    HANDLE m_file;
+    HANDLE m_mapping;
+    std::uint16_t m_number;
+};
+
+}  // namespace vex_util
+
+#endif

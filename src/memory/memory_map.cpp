@@ -1,0 +1,144 @@
+#include "basalt/memory/memory_map.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <exception>
+
+#include "basalt/frame.h"
+#include "basalt/platform/cstring.h"
+#include "basalt/platform/error.h"
+#include "src/platform/file.h"
+#include "src/platform/file_mapping.h"
+#include "src/platform/file_search.h"
+
+namespace vex_util {
+namespace {
+
+constexpr int LONGEST_NAME = 259;  // characters
+constexpr int MAX_DRAWS = 1000;    // of the 65,535 numbers; with all of them taken there is no end else
+
+// A new file, held alone and deleted when closed, and the number in its name; INVALID_HANDLE_VALUE on
+// failure.
+HANDLE create_file(std::uint16_t& number) {
+    const CString folder = _tempFilePath();
+    if (folder.IsEmpty()) {
+        return INVALID_HANDLE_VALUE;
+    }
+    HANDLE file = INVALID_HANDLE_VALUE;
+    DWORD error = ERROR_FILE_EXISTS;
+    for (int draw = 0; draw < MAX_DRAWS && error == ERROR_FILE_EXISTS; ++draw) {
+        number = _random_uint16();
+        CString name;
+        name.Format(L"%s\\~%07i.mem", folder, number);
+        if (name.GetLength() > LONGEST_NAME) {
+            return INVALID_HANDLE_VALUE;
+        }
+        file = CreateFileW(name, GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_NEW,
+                           FILE_ATTRIBUTE_HIDDEN | FILE_FLAG_DELETE_ON_CLOSE, nullptr);
+        error = file != INVALID_HANDLE_VALUE ? ERROR_SUCCESS : GetLastError();
+    }
+    return file;
+}
+
+// Ends a search however its owner is left.
+struct SearchEnd {
+    HANDLE search;
+    explicit SearchEnd(HANDLE begun) : search(begun) {}
+    ~SearchEnd() { FindClose(search); }
+    SearchEnd(const SearchEnd&) = delete;
+    SearchEnd& operator=(const SearchEnd&) = delete;
+};
+
+}  // namespace
+
+CMemoryMap::CMemoryMap()
+    : m_data(nullptr), m_size(0), m_file(INVALID_HANDLE_VALUE), m_mapping(nullptr), m_number(0) {}
+
+CMemoryMap::CMemoryMap(unsigned long size) : CMemoryMap() {
+    Create(size);
+}
+
+CMemoryMap::~CMemoryMap() {
+    Destroy();
+}
+
+bool CMemoryMap::Create(unsigned long size) {
+    Destroy();
+    if (size > UINT32_MAX) {
+        return false;
+    }
+    m_size = static_cast<std::uint32_t>(size);
+    if (create_on_file()) {
+        return true;
+    }
+    Destroy();
+    // Zero like a fresh file, and like it untouched until it is used.
+    m_data = std::calloc(std::max(m_size, std::uint32_t{1}), 1);
+    return m_data != nullptr;
+}
+
+// Leaves what it has made so far to Destroy().
+bool CMemoryMap::create_on_file() {
+    try {
+        m_file = create_file(m_number);
+    } catch (const std::exception&) {
+        return false;  // no memory for the name
+    }
+    if (m_file == INVALID_HANDLE_VALUE) {
+        return false;
+    }
+    m_mapping = CreateFileMappingW(m_file, nullptr, PAGE_READWRITE, 0, m_size, nullptr);
+    if (m_mapping == nullptr) {
+        return false;
+    }
+    m_data = MapViewOfFile(m_mapping, FILE_MAP_ALL_ACCESS, 0, 0, m_size);
+    return m_data != nullptr;
+}
+
+bool CMemoryMap::Destroy() {
+    if (m_data != nullptr) {
+        if (m_mapping != nullptr) {
+            UnmapViewOfFile(m_data);
+        } else {
+            std::free(m_data);
+        }
+        m_data = nullptr;
+    }
+    if (m_mapping != nullptr) {
+        CloseHandle(m_mapping);
+        m_mapping = nullptr;
+    }
+    if (m_file != INVALID_HANDLE_VALUE) {
+        // Closing deletes it, by the path it was made under. Deleting the name once more, composed anew,
+        // could only ever hit another file.
+        CloseHandle(m_file);
+        m_file = INVALID_HANDLE_VALUE;
+    }
+    return true;
+}
+
+CMemoryMap::operator void*() const {
+    return m_data;
+}
+
+void CMemoryMap::CleanUp() {
+    try {
+        const CString folder = _tempFilePath();
+        if (folder.IsEmpty()) {
+            return;
+        }
+        WIN32_FIND_DATAW entry;
+        const HANDLE search = FindFirstFileW(folder + L"\\~*.mem", &entry);
+        if (search == INVALID_HANDLE_VALUE) {
+            return;
+        }
+        const SearchEnd end(search);
+        do {
+            DeleteFileW(folder + L"\\" + entry.cFileName);
+        } while (FindNextFileW(search, &entry) != 0);
+    } catch (const std::exception&) {
+        // No memory for the names: the files stay for another time.
+    }
+}
+
+}  // namespace vex_util

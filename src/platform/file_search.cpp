@@ -1,0 +1,171 @@
+#include "src/platform/file_search.h"
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <sys/stat.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <iterator>
+#include <memory>
+#include <string>
+#include <string_view>
+
+#include "basalt/platform/error.h"
+#include "src/platform/error_from_errno.h"
+#include "src/platform/file.h"
+#include "src/platform/file_name.h"
+#include "src/platform/handle_table.h"
+#include "src/platform/out_of_memory.h"
+#include "src/platform/wildcard.h"
+
+using basalt::platform::error_from_errno;
+using basalt::platform::fail_with;
+using basalt::platform::HandleObject;
+using basalt::platform::matches_wildcards;
+using basalt::platform::NewHandle;
+using basalt::platform::or_out_of_memory;
+
+namespace {
+
+// An open search. Its end is reached at once where it was for a path's own entry.
+class FileSearch final : public HandleObject {
+public:
+    static constexpr Kind KIND = Kind::SEARCH;
+
+    FileSearch() noexcept : HandleObject(KIND) {}
+    ~FileSearch() override {
+        if (m_folder != nullptr) {
+            closedir(m_folder);
+        }
+    }
+    FileSearch(const FileSearch&) = delete;
+    FileSearch& operator=(const FileSearch&) = delete;
+
+    // Begins a search of a folder. ERROR_SUCCESS or what went wrong.
+    DWORD open(const std::string& folder, std::wstring_view pattern) {
+        m_pattern = pattern;
+        m_folder = opendir(folder.c_str());
+        if (m_folder != nullptr) {
+            return ERROR_SUCCESS;
+        }
+        return errno == ENOENT ? ERROR_PATH_NOT_FOUND : error_from_errno(errno);
+    }
+
+    // Describes the next match. ERROR_SUCCESS, ERROR_NO_MORE_FILES or what went wrong.
+    DWORD next(WIN32_FIND_DATAW& entry);
+
+private:
+    DIR* m_folder = nullptr;
+    std::wstring m_pattern;
+};
+
+FILETIME file_time(const statx_timestamp& time) {
+    constexpr std::int64_t SECONDS_FROM_1601_TO_1970 = 11'644'473'600;
+    const std::int64_t ticks = (time.tv_sec + SECONDS_FROM_1601_TO_1970) * 10'000'000 + time.tv_nsec / 100;
+    return {static_cast<DWORD>(ticks & 0xFFFFFFFF), static_cast<DWORD>(ticks >> 32)};
+}
+
+void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DATAW& entry) {
+    entry = {};
+    entry.dwFileAttributes = S_ISDIR(status.stx_mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
+    const bool knows_creation = (status.stx_mask & STATX_BTIME) != 0;
+    entry.ftCreationTime = file_time(knows_creation ? status.stx_btime : status.stx_ctime);
+    entry.ftLastAccessTime = file_time(status.stx_atime);
+    entry.ftLastWriteTime = file_time(status.stx_mtime);
+    entry.nFileSizeHigh = static_cast<DWORD>(status.stx_size >> 32);
+    entry.nFileSizeLow = static_cast<DWORD>(status.stx_size & 0xFFFFFFFF);
+    name.copy(entry.cFileName, std::size(entry.cFileName) - 1);
+}
+
+// What a link leads to, or the link itself where that is nothing.
+bool query(int folder, const char* name, struct statx& status) {
+    constexpr unsigned WANTED = STATX_BASIC_STATS | STATX_BTIME;
+    return statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &status) == 0 ||
+           statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) == 0;
+}
+
+DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
+    if (m_folder == nullptr) {
+        return ERROR_NO_MORE_FILES;
+    }
+    for (;;) {
+        errno = 0;
+        const dirent* const found = readdir(m_folder);
+        if (found == nullptr) {
+            return errno == 0 ? ERROR_NO_MORE_FILES : error_from_errno(errno);
+        }
+        const std::wstring name = basalt::platform::wide_from_file_name(found->d_name);
+        if (!matches_wildcards(name, m_pattern)) {
+            continue;
+        }
+        struct statx status = {};
+        if (!query(dirfd(m_folder), found->d_name, status)) {
+            if (errno == ENOENT) {
+                continue;  // deleted meanwhile
+            }
+            // A folder that may be read but not entered tells names and kinds alone.
+            status = {};
+            status.stx_mode = found->d_type == DT_DIR ? S_IFDIR : S_IFREG;
+        }
+        describe(status, name, entry);
+        return ERROR_SUCCESS;
+    }
+}
+
+// Begins a search and describes its first entry.
+DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& entry) {
+    const std::size_t start = path.find_last_of(L"\\/") + 1;  // 0 when there is none
+    const std::wstring_view last = path.substr(start);
+    if (last.empty()) {
+        return ERROR_FILE_NOT_FOUND;
+    }
+    std::string name;
+    if (last.find_first_of(L"*?") == last.npos) {
+        if (!basalt::platform::file_name_from_wide(path, name)) {
+            return ERROR_INVALID_NAME;
+        }
+        struct statx status = {};
+        if (!query(AT_FDCWD, name.c_str(), status)) {
+            return basalt::platform::error_of_path(name, errno);
+        }
+        describe(status, last, entry);
+        return ERROR_SUCCESS;
+    }
+    if (!basalt::platform::file_name_from_wide(start == 0 ? L"." : path.substr(0, start), name)) {
+        return ERROR_INVALID_NAME;
+    }
+    const DWORD error = search.open(name, last);
+    if (error != ERROR_SUCCESS) {
+        return error;
+    }
+    const DWORD first = search.next(entry);
+    return first == ERROR_NO_MORE_FILES ? ERROR_FILE_NOT_FOUND : first;
+}
+
+}  // namespace
+
+HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry) {
+    return or_out_of_memory(INVALID_HANDLE_VALUE, [&] {
+        const auto search = std::make_shared<FileSearch>();
+        NewHandle handle(search);
+        const DWORD error = find_first(path != nullptr ? path : L"", *search, *entry);
+        return error == ERROR_SUCCESS ? handle.give() : fail_with(error, INVALID_HANDLE_VALUE);
+    });
+}
+
+BOOL FindNextFileW(HANDLE search, WIN32_FIND_DATAW* entry) {
+    return or_out_of_memory(0, [&] {
+        const auto open = basalt::platform::find_object_of<FileSearch>(search);
+        const DWORD error = open != nullptr ? open->next(*entry) : ERROR_INVALID_HANDLE;
+        return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
+    });
+}
+
+BOOL FindClose(HANDLE search) {
+    if (basalt::platform::find_object_of<FileSearch>(search) == nullptr) {
+        return fail_with(ERROR_INVALID_HANDLE, 0);
+    }
+    basalt::platform::drop_handle(search);
+    return 1;
+}

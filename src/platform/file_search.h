@@ -1,0 +1,41 @@
+// Searching folders.
+#ifndef BASALT_SRC_PLATFORM_FILE_SEARCH_H
+#define BASALT_SRC_PLATFORM_FILE_SEARCH_H
+
+#include "basalt/platform/calendar.h"
+#include "basalt/platform/types.h"
+#include "src/platform/handle.h"
+
+// What a search tells of an entry; links answer for what they lead to, and for themselves where they lead
+// nowhere.
+struct WIN32_FIND_DATAW {
+    DWORD dwFileAttributes;   // FILE_ATTRIBUTE_DIRECTORY, or FILE_ATTRIBUTE_NORMAL for everything else
+    FILETIME ftCreationTime;  // of the last change of the entry where the file system keeps no creation time
+    FILETIME ftLastAccessTime;
+    FILETIME ftLastWriteTime;
+    DWORD nFileSizeHigh;
+    DWORD nFileSizeLow;
+    DWORD dwReserved0;  // 0
+    DWORD dwReserved1;  // 0
+    wchar_t cFileName[260];
+    wchar_t cAlternateFileName[14];  // empty
+};
+
+// Begins a search and describes its first entry. Without a wildcard in the last element of the path that is
+// the path's own entry, under its last element as the name; with `*` (any characters) or `?` (one character),
+// case counting, every matching entry of the folder, "." and ".." among them, in the system's order. "*.*"
+// matches all. Folders and files are told apart, never opened.
+// A handle for FindClose, or INVALID_HANDLE_VALUE, the record as it was: ERROR_FILE_NOT_FOUND when nothing
+// matches and for a path that ends in a separator or is empty, ERROR_PATH_NOT_FOUND when there is no such
+// folder, and as for CreateFileW.
+// Threads: thread-safe; one search is used by one thread at a time.
+HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry);
+
+// Describes the next entry. 1, or 0 with the record as it was: ERROR_NO_MORE_FILES after the last,
+// ERROR_INVALID_HANDLE, ERROR_NOT_ENOUGH_MEMORY, or an error of the system.
+BOOL FindNextFileW(HANDLE search, WIN32_FIND_DATAW* entry);
+
+// Ends a search. 1, or 0 for what is no search (ERROR_INVALID_HANDLE).
+BOOL FindClose(HANDLE search);
+
+#endif

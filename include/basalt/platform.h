@@ -3,6 +3,7 @@
 #ifndef BASALT_PLATFORM_H
 #define BASALT_PLATFORM_H
 
+#include "basalt/platform/automation_date.h"
 #include "basalt/platform/calendar.h"
 #include "basalt/platform/cstring.h"
 #include "basalt/platform/error.h"

@@ -215,7 +215,7 @@ TEST_F(VersionResourceFile, files_that_do_not_hold_one) {
         EXPECT_EQ(size_of(program), 0U);
     }
     EXPECT_EQ(size_of(ProgramFile(block, ".version_resources")), 0U);
-    for (std::uintmax_t size : {0, 3, 63, 64, 100}) {
+    for (const unsigned size : {0U, 3U, 63U, 64U, 100U}) {
         ProgramFile(block).write(path);
         std::filesystem::resize_file(path, size);
         EXPECT_EQ(GetFileVersionInfoSizeW(path.wstring().c_str(), nullptr), 0U);

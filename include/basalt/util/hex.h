@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "basalt/export.h"
+#include "basalt/platform/automation_date.h"
 
 namespace basalt {
 
@@ -40,6 +41,13 @@ BASALT_API std::string HexStringToString(const std::string& hex);
 /// @param hex digits up to the first zero byte
 /// Bad input: as for HexStringToString(), but nothing is refused.
 BASALT_API std::vector<unsigned char> HexStringToVector(const std::string& hex);
+
+/// Reads a date from the digits of eight decimal characters: day and month of two, year of four (from 100
+/// on). Fewer characters, with blanks before a field, are read as far as they go: "1 2 2021" is a date.
+/// @param hex digits as for HexStringToString(), which may throw; "3031303232303231" is 1 February 2021
+/// @param[out] date the date at 0:00, valid; or invalid with a value without meaning
+/// @return true, whatever the date
+BASALT_API bool ParseDateFromHexString(const std::string& hex, COleDateTime& date);
 
 }  // namespace basalt
 

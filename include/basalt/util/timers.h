@@ -38,7 +38,7 @@ private:
     CString m_name;
     std::int64_t m_start = 0;
     std::int64_t m_last_reading = 0;
-    bool m_flag;
+    [[maybe_unused]] bool m_flag;
 };
 
 /// Tells a polling loop when each period of a given length has passed. The time by which a period was

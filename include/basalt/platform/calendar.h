@@ -7,7 +7,6 @@
 #include "basalt/export.h"
 #include "basalt/platform/types.h"
 
-<<<<<<< HEAD
 /// A date and a time of day.
 struct SYSTEMTIME {
     WORD wYear;          ///< 1601 to 30827
@@ -49,18 +48,4 @@ BASALT_API BOOL FileTimeToSystemTime(const FILETIME* ticks, SYSTEMTIME* time);
 /// Threads: thread-safe.
 BASALT_API void GetSystemTime(SYSTEMTIME* time);
 
-=======
-/// Calendar time.
-struct SYSTEMTIME {
-    WORD wYear;          ///< year
-    WORD wMonth;         ///< month, 1 to 12
-    WORD wDayOfWeek;     ///< day of the week, 0 (Sunday) to 6
-    WORD wDay;           ///< day of the month, 1 to 31
-    WORD wHour;          ///< hour, 0 to 23
-    WORD wMinute;        ///< minute, 0 to 59
-    WORD wSecond;        ///< second, 0 to 59
-    WORD wMilliseconds;  ///< millisecond, 0 to 999
-};
-
->>>>>>> util
 #endif

@@ -7,18 +7,12 @@
 
 namespace {
 
+using basalt::platform::first_match_attributes;
 using SearchScoper = HANDLEScoperBase<FindFileHandleCloser>;
 
 HANDLE find_first(const CString& path, WIN32_FIND_DATAW& entry) {
     const HANDLE search = FindFirstFileW(path, &entry);
     return search != INVALID_HANDLE_VALUE ? search : nullptr;
-}
-
-// The first entry's attributes; 0 when there is none.
-DWORD attributes_of(const CString& path) {
-    WIN32_FIND_DATAW entry;
-    const SearchScoper search(find_first(path, entry));
-    return search.is_open() ? entry.dwFileAttributes : 0;
 }
 
 // A time of the second entry, or of the first where that is the only one. False when there is none.
@@ -141,12 +135,12 @@ FILETIME CFilePath::GetLastAccessTime() const {
 }
 
 bool CFilePath::FileExists(const CString& path) {
-    const DWORD attributes = attributes_of(path);
+    const DWORD attributes = first_match_attributes(path);
     return attributes != 0 && (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0;
 }
 
 bool CFilePath::IsDirectory(const CString& path) {
-    return (attributes_of(path) & FILE_ATTRIBUTE_DIRECTORY) != 0;
+    return (first_match_attributes(path) & FILE_ATTRIBUTE_DIRECTORY) != 0;
 }
 
 bool CFilePath::GetFileCreationTime(const CString& path, FILETIME& time) {

@@ -78,11 +78,18 @@ void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DAT
     name.copy(entry.cFileName, std::size(entry.cFileName) - 1);
 }
 
-// What a link leads to, or the link itself where that is nothing.
+// What a link leads to, or the link itself where that is nothing. A link is rare, so it is not followed at
+// first: one call then answers for everything else, also for what is missing.
 bool query(int folder, const char* name, struct statx& status) {
     constexpr unsigned WANTED = STATX_BASIC_STATS | STATX_BTIME;
-    return statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &status) == 0 ||
-           statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) == 0;
+    if (statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) != 0) {
+        return false;
+    }
+    struct statx target = {};
+    if (S_ISLNK(status.stx_mode) && statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &target) == 0) {
+        status = target;
+    }
+    return true;
 }
 
 DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
@@ -144,6 +151,15 @@ DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& e
 }
 
 }  // namespace
+
+DWORD basalt::platform::first_match_attributes(const wchar_t* path) noexcept {
+    return or_out_of_memory(DWORD{0}, [&] {
+        FileSearch search;
+        WIN32_FIND_DATAW entry;
+        const DWORD error = find_first(path != nullptr ? path : L"", search, entry);
+        return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
+    });
+}
 
 HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry) {
     return or_out_of_memory(INVALID_HANDLE_VALUE, [&] {

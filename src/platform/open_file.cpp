@@ -123,7 +123,8 @@ DWORD OpenFile::map(std::size_t size, std::byte*& view) noexcept {
     if (m_descriptor < 0) {
         return ERROR_FILE_INVALID;
     }
-    void* pages = mmap(nullptr, size, PROT_READ | PROT_WRITE, MAP_SHARED, m_descriptor, 0);
+    void* pages =
+        mmap(nullptr, whole_pages(size), PROT_READ | PROT_WRITE, MAP_SHARED, m_descriptor, 0);
     if (pages == MAP_FAILED) {
         return error_from_errno(errno);
     }

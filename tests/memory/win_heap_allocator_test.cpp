@@ -11,51 +11,22 @@
 #include "basalt/platform/error.h"
 #include "src/memory/heap_allocator.h"
 #include "src/memory/report_last_error.h"
-#include "src/platform/error_message.h"
 #include "src/platform/heap.h"
 #include "src/platform/heap_inspection.h"
+#include "tests/support/debug_output.h"
 #include "tests/support/system_failures.h"
 
 namespace {
 
+using basalt::test::DebugOutput;
+using basalt::test::Pieces;
+using basalt::test::report_of;
 using basalt::test::SystemFailure;
 using vex_lib::vlAllocator;
 using vex_lib::vlSharedMemoryHeap;
 using vex_lib::vlWinHeapAllocator;
 
 constexpr std::size_t BEYOND = std::size_t{1} << 60;
-
-// Collects the pieces of debugger output while alive.
-class DebugOutput {
-public:
-    DebugOutput() {
-        s_pieces.clear();
-        m_before = basalt::platform::SetDebugOutputHandler([](const wchar_t* text) {
-            s_pieces.emplace_back(text);
-            SetLastError(4711);  // a host's handler may call anything
-        });
-    }
-    ~DebugOutput() { basalt::platform::SetDebugOutputHandler(m_before); }
-    DebugOutput(const DebugOutput&) = delete;
-    DebugOutput& operator=(const DebugOutput&) = delete;
-
-    // The pieces since the last call.
-    static std::vector<std::wstring> take() { return std::exchange(s_pieces, {}); }
-
-private:
-    basalt::platform::DebugOutputHandler m_before;
-    static inline std::vector<std::wstring> s_pieces;
-};
-
-std::vector<std::wstring> report_of(DWORD code) {
-    wchar_t* message = nullptr;
-    FormatMessageW(0x1300, nullptr, code, 0, &message, 0, nullptr);
-    std::vector<std::wstring> pieces{L"ERROR:", message != nullptr ? message : L"", L"\n"};
-    LocalFree(message);
-    return pieces;
-}
-
-using Pieces = std::vector<std::wstring>;
 
 TEST(ReportLastError, WritesThreePiecesAndKeepsTheCode) {
     const DebugOutput output;

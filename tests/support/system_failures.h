@@ -1,15 +1,16 @@
-// Makes system calls fail on purpose (linked with --wrap for mmap, mremap, munmap and madvise).
+// Makes system calls fail on purpose (linked with --wrap): mmap, mremap, munmap, madvise, mprotect, open,
+// fcntl, fstat, posix_fallocate, statx, opendir, readdir.
 #ifndef BASALT_TESTS_SUPPORT_SYSTEM_FAILURES_H
 #define BASALT_TESTS_SUPPORT_SYSTEM_FAILURES_H
 
 namespace basalt::test {
 
 // While alive, the n-th call from now on (n = 1, 2, ...) of this thread fails, and those after it too when
-// so asked.
+// so asked: with the errno value given, or one that is usual for the call.
 class SystemFailure {
 public:
     enum class Then { RECOVERS, STAYS };
-    explicit SystemFailure(int nth, Then then = Then::RECOVERS);
+    explicit SystemFailure(int nth, Then then = Then::RECOVERS, int number = 0);
     ~SystemFailure();
     SystemFailure(const SystemFailure&) = delete;
     SystemFailure& operator=(const SystemFailure&) = delete;
@@ -18,6 +19,9 @@ public:
 
 // Bytes mapped minus bytes unmapped by this program through the calls above.
 long mapped_balance();
+
+// Descriptors open in this process: readings that agree say that none has leaked in between.
+long open_descriptors();
 
 }  // namespace basalt::test
 

@@ -1,0 +1,208 @@
+#include "src/platform/file_search.h"
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <filesystem>
+#include <set>
+#include <string>
+
+#include "basalt/platform/error.h"
+#include "src/platform/file.h"
+#include "src/platform/wildcard.h"
+#include "tests/support/scratch_folder.h"
+#include "tests/support/system_failures.h"
+
+namespace {
+
+using basalt::test::open_descriptors;
+using basalt::test::ScratchFolder;
+using basalt::test::SystemFailure;
+using WideNames = std::set<std::wstring>;
+
+// All entries a search names; the last error is what ended it.
+WideNames search(const std::wstring& path) {
+    WideNames names;
+    WIN32_FIND_DATAW entry = {};
+    const HANDLE found = FindFirstFileW(path.c_str(), &entry);
+    if (found == INVALID_HANDLE_VALUE) {
+        return names;
+    }
+    do {
+        EXPECT_TRUE(names.insert(entry.cFileName).second);
+        EXPECT_EQ(entry.dwReserved0 + entry.dwReserved1 + static_cast<DWORD>(entry.cAlternateFileName[0]),
+                  0U);
+    } while (FindNextFileW(found, &entry) != 0);
+    const DWORD error = GetLastError();
+    EXPECT_EQ(FindClose(found), 1);
+    EXPECT_EQ(FindClose(found), 0);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
+    SetLastError(error);
+    return names;
+}
+
+DWORD search_error(const std::wstring& path) {
+    EXPECT_EQ(search(path), WideNames{});
+    return GetLastError();
+}
+
+WIN32_FIND_DATAW entry_of(const std::wstring& path) {
+    WIN32_FIND_DATAW entry = {};
+    EXPECT_EQ(FindClose(FindFirstFileW(path.c_str(), &entry)), 1);
+    return entry;
+}
+
+std::uint64_t ticks(const FILETIME& time) {
+    return std::uint64_t{time.dwHighDateTime} << 32 | time.dwLowDateTime;
+}
+
+TEST(Wildcards, match_as_a_plain_recursion_does) {
+    struct Plain {
+        static bool matches(const wchar_t* name, const wchar_t* pattern) {
+            if (*pattern == L'\0') {
+                return *name == L'\0';
+            }
+            if (*pattern == L'*') {
+                return matches(name, pattern + 1) || (*name != L'\0' && matches(name + 1, pattern));
+            }
+            return *name != L'\0' && (*pattern == L'?' || *pattern == *name) &&
+                   matches(name + 1, pattern + 1);
+        }
+    };
+    // Every name of up to five and every pattern of up to four characters.
+    const auto texts = [](const std::wstring& characters, std::size_t longest) {
+        std::vector<std::wstring> all = {L""};
+        for (std::size_t i = 0; i < all.size() && all[i].size() < longest; ++i) {
+            for (const wchar_t ch : characters) {
+                all.push_back(all[i] + ch);
+            }
+        }
+        return all;
+    };
+    for (const std::wstring& name : texts(L"ab.", 5)) {
+        for (const std::wstring& pattern : texts(L"ab.*?", 4)) {
+            const bool expected = pattern == L"*.*" || Plain::matches(name.c_str(), pattern.c_str());
+            ASSERT_EQ(basalt::platform::matches_wildcards(name, pattern), expected)
+                << std::string(name.begin(), name.end()) << " "
+                << std::string(pattern.begin(), pattern.end());
+        }
+    }
+    EXPECT_TRUE(basalt::platform::matches_wildcards(L"[\\]", L"[\\*"));
+}
+
+TEST(FileSearch, names_what_matches) {
+    const ScratchFolder folder;
+    for (const char* name : {"a.txt", "b.txt", "A.TXT", ".hidden", "plain", "~0004711.mem", "\xC3\xA9.txt"}) {
+        folder.write(name);
+    }
+    std::filesystem::create_directory(folder / "folder.txt");
+    const long descriptors = open_descriptors();
+    const WideNames texts = {L"a.txt", L"b.txt", L"folder.txt", L"\x00E9.txt"};
+    EXPECT_EQ(search(folder.wide(L"*.txt")), texts);
+    EXPECT_EQ(GetLastError(), ERROR_NO_MORE_FILES);
+    EXPECT_EQ(search(folder.wide(L"\\?.txt")), (WideNames{L"a.txt", L"b.txt", L"\x00E9.txt"}));
+    EXPECT_EQ(search(folder.wide(L"\\~*.mem")), WideNames{L"~0004711.mem"});
+    WideNames all = texts;
+    all.merge(WideNames{L".", L"..", L"A.TXT", L".hidden", L"plain", L"~0004711.mem"});
+    EXPECT_EQ(search(folder.wide(L"*")), all);
+    EXPECT_EQ(search(folder.wide(L"*.*")), all);
+
+    EXPECT_EQ(search(folder.wide(L"a.txt")), WideNames{L"a.txt"});
+    EXPECT_EQ(GetLastError(), ERROR_NO_MORE_FILES);
+    EXPECT_EQ(search(folder.wide(L"folder.txt\\..")), WideNames{L".."});
+    const auto before = std::filesystem::current_path();
+    std::filesystem::current_path(folder.path());
+    EXPECT_EQ(search(L"pl*"), WideNames{L"plain"});
+    EXPECT_EQ(search(L"plain"), WideNames{L"plain"});
+    std::filesystem::current_path(before);
+
+    EXPECT_EQ(search_error(folder.wide(L"*.none")), ERROR_FILE_NOT_FOUND);
+    EXPECT_EQ(search_error(folder.wide(L"none")), ERROR_FILE_NOT_FOUND);
+    for (const wchar_t* path : {L"", L"/", L"\\", L"C:", L"C:\\"}) {
+        EXPECT_EQ(search_error(path), ERROR_FILE_NOT_FOUND) << path;
+    }
+    EXPECT_EQ(search_error(folder.wide(L"folder.txt/")), ERROR_FILE_NOT_FOUND);
+    EXPECT_EQ(search_error(folder.wide(L"none/x")), ERROR_PATH_NOT_FOUND);
+    EXPECT_EQ(search_error(folder.wide(L"none/*")), ERROR_PATH_NOT_FOUND);
+    EXPECT_EQ(search_error(folder.wide(L"a.txt/*")), ERROR_PATH_NOT_FOUND);
+    EXPECT_EQ(search_error(folder.wide(L"a.txt/x")), ERROR_PATH_NOT_FOUND);
+    EXPECT_EQ(search_error(folder.wide(L"\xD800")), ERROR_INVALID_NAME);
+    EXPECT_EQ(open_descriptors(), descriptors);
+}
+
+TEST(FileSearch, tells_kinds_sizes_and_times) {
+    const ScratchFolder folder;
+    folder.write("file", "12345");
+    std::filesystem::create_directory(folder / "folder");
+    std::filesystem::create_symlink("folder", folder / "to_folder");
+    std::filesystem::create_symlink("nowhere", folder / "to_nowhere");
+    ASSERT_EQ(mkfifo((folder / "pipe").c_str(), 0600), 0);
+    for (const wchar_t* name : {L"file", L"to_nowhere", L"pipe"}) {
+        EXPECT_EQ(entry_of(folder.wide(name)).dwFileAttributes, FILE_ATTRIBUTE_NORMAL);
+    }
+    for (const wchar_t* name : {L"folder", L"to_folder", L"."}) {
+        EXPECT_EQ(entry_of(folder.wide(name)).dwFileAttributes, FILE_ATTRIBUTE_DIRECTORY);
+    }
+    // A second before 1970 and 700 ns, as `date -d @-1` and 116444736000000000 ticks from 1601 to 1970 say;
+    // and 2001-09-09 01:46:40, 10^9 seconds after 1970.
+    const timespec times[] = {{-1, 700}, {1'000'000'000, 0}};
+    ASSERT_EQ(utimensat(AT_FDCWD, (folder / "file").c_str(), times, 0), 0);
+    std::filesystem::resize_file(folder / "folder/../file", 5);
+    ASSERT_EQ(utimensat(AT_FDCWD, (folder / "file").c_str(), times, 0), 0);
+    const WIN32_FIND_DATAW file = entry_of(folder.wide(L"file"));
+    EXPECT_EQ(ticks(file.ftLastAccessTime), 116'444'735'990'000'007U);
+    EXPECT_EQ(ticks(file.ftLastWriteTime), 126'444'736'000'000'000U);
+    const std::uint64_t now =
+        116'444'736'000'000'000U +
+        static_cast<std::uint64_t>(std::chrono::duration_cast<std::chrono::nanoseconds>(
+                                       std::chrono::system_clock::now().time_since_epoch())
+                                       .count()) /
+            100;
+    EXPECT_LE(ticks(file.ftCreationTime), now) << "created here and now, whatever the other times say";
+    EXPECT_GT(ticks(file.ftCreationTime), now - 600'000'000U);
+    EXPECT_EQ(file.nFileSizeLow, 5U);
+    ASSERT_EQ(truncate((folder / "file").c_str(), (off_t{3} << 32) + 7), 0);
+    EXPECT_EQ(entry_of(folder.wide(L"file")).nFileSizeHigh, 3U);
+    EXPECT_EQ(entry_of(folder.wide(L"file")).nFileSizeLow, 7U);
+}
+
+TEST(FileSearch, every_failing_call_is_told_and_leaves_nothing_open) {
+    const ScratchFolder folder;
+    folder.write("a");
+    folder.write("b");
+    const long descriptors = open_descriptors();
+    for (const std::wstring& path : {folder.wide(L"*"), folder.wide(L"a")}) {
+        const std::size_t expected = path.back() == L'*' ? 4 : 1;
+        bool fails = true;
+        for (int n = 1; fails; ++n) {
+            WIN32_FIND_DATAW entry = {};
+            std::size_t count = 0;
+            DWORD error = 0;
+            {
+                const SystemFailure failure(n, SystemFailure::Then::STAYS);
+                const HANDLE found = FindFirstFileW(path.c_str(), &entry);
+                bool goes_on = found != INVALID_HANDLE_VALUE;
+                while (goes_on) {
+                    ++count;
+                    goes_on = FindNextFileW(found, &entry) != 0;
+                }
+                error = GetLastError();
+                FindClose(found);
+                fails = SystemFailure::struck();
+            }
+            EXPECT_EQ(error == ERROR_NO_MORE_FILES && count == expected, !fails) << n;
+            EXPECT_EQ(open_descriptors(), descriptors);
+        }
+    }
+    WIN32_FIND_DATAW entry = {};
+    EXPECT_EQ(FindNextFileW(nullptr, &entry), 0);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
+    const HANDLE found = FindFirstFileW(folder.wide(L"*").c_str(), &entry);
+    EXPECT_EQ(CloseHandle(found), 0) << "a search is no file";
+    EXPECT_EQ(FindClose(found), 1);
+}
+
+}  // namespace

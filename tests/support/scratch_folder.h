@@ -1,0 +1,58 @@
+// A folder of a test's own, which TMPDIR names while it lives; gone at the end with all that is in it.
+#ifndef BASALT_TESTS_SUPPORT_SCRATCH_FOLDER_H
+#define BASALT_TESTS_SUPPORT_SCRATCH_FOLDER_H
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <set>
+#include <string>
+
+namespace basalt::test {
+
+class ScratchFolder {
+public:
+    ScratchFolder() {
+        const char* const before = std::getenv("TMPDIR");
+        m_was_set = before != nullptr;
+        m_before = m_was_set ? before : "";
+        std::string pattern = (std::filesystem::temp_directory_path() / "basalt-XXXXXX").string();
+        m_path = mkdtemp(pattern.data()) != nullptr ? pattern : "";
+        set_temporary(m_path);
+    }
+    ~ScratchFolder() {
+        m_was_set ? set_temporary(m_before) : static_cast<void>(unsetenv("TMPDIR"));
+        std::filesystem::remove_all(m_path);
+    }
+    ScratchFolder(const ScratchFolder&) = delete;
+    ScratchFolder& operator=(const ScratchFolder&) = delete;
+
+    static void set_temporary(const std::string& path) { setenv("TMPDIR", path.c_str(), 1); }
+
+    const std::string& path() const { return m_path; }
+    std::string operator/(const std::string& name) const { return m_path + "/" + name; }
+    std::wstring wide(const std::wstring& name) const {
+        return std::wstring(m_path.begin(), m_path.end()) + L"/" + name;
+    }
+
+    std::set<std::string> names() const {
+        std::set<std::string> found;
+        for (const auto& entry : std::filesystem::directory_iterator(m_path)) {
+            found.insert(entry.path().filename().string());
+        }
+        return found;
+    }
+
+    void write(const std::string& name, const std::string& text = "") const {
+        std::ofstream(*this / name) << text;
+    }
+
+private:
+    std::string m_path;
+    std::string m_before;
+    bool m_was_set;
+};
+
+}  // namespace basalt::test
+
+#endif

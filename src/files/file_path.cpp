@@ -1,4 +1,4 @@
-#include <utility>
+#include <cwchar>
 
 #include "basalt/files.h"
 #include "src/files/handle_scoper.h"
@@ -35,11 +35,19 @@ bool is_separator(wchar_t ch) {
     return ch == L'\\' || ch == L'/';
 }
 
-CString without_outer_separators(const CString& directory) {
-    const int length = directory.GetLength();
-    const int start = is_separator(directory[0]) ? 1 : 0;
-    const int end = is_separator(directory[length - 1]) ? 1 : 0;
-    return directory.Mid(start, length - start - end);
+// Without its first and last separator, cut in place.
+const wchar_t* trimmed(wchar_t* directory) {
+    const std::size_t length = std::wcslen(directory);
+    if (length > 0 && is_separator(directory[length - 1])) {
+        directory[length - 1] = L'\0';
+    }
+    return is_separator(directory[0]) ? directory + 1 : directory;
+}
+
+// In the storage that the text has: half the time of setting a path goes into new storage otherwise.
+void assign(CString& text, const wchar_t* characters) {
+    text.Empty();
+    text += characters;
 }
 
 }  // namespace
@@ -64,10 +72,10 @@ void CFilePath::split() {
     }
     basalt::files::PathParts parts;
     const bool is_split = parts.split(m_full_path);
-    m_drive = parts.drive;
-    m_directory_only = without_outer_separators(parts.directory);
-    m_file_name_only = parts.name;
-    m_extension = parts.extension[0] == L'.' ? parts.extension + 1 : parts.extension;
+    assign(m_drive, parts.drive);
+    assign(m_directory_only, trimmed(parts.directory));
+    assign(m_file_name_only, parts.name);
+    assign(m_extension, parts.extension[0] == L'.' ? parts.extension + 1 : parts.extension);
     if (is_split && IsDirectory(m_full_path)) {
         m_directory_only = joined(m_directory_only, m_file_name_only);
         m_file_name_only.Empty();

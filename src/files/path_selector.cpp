@@ -6,10 +6,10 @@ namespace vex_util {
 Path::Path(const CString& path) {
     basalt::files::PathParts parts;
     if (!path.IsEmpty() && parts.split(path)) {
-        m_drive = parts.drive;
-        m_directory = parts.directory;
-        m_name = parts.name;
-        m_extension = parts.extension;
+        m_drive += parts.drive;
+        m_directory += parts.directory;
+        m_name += parts.name;
+        m_extension += parts.extension;
         m_valid = true;
     }
 }

@@ -66,9 +66,13 @@ FILETIME file_time(const statx_timestamp& time) {
     return {static_cast<DWORD>(ticks & 0xFFFFFFFF), static_cast<DWORD>(ticks >> 32)};
 }
 
+DWORD attributes_of(const struct statx& status) {
+    return S_ISDIR(status.stx_mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
+}
+
 void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DATAW& entry) {
     entry = {};
-    entry.dwFileAttributes = S_ISDIR(status.stx_mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
+    entry.dwFileAttributes = attributes_of(status);
     const bool knows_creation = (status.stx_mask & STATX_BTIME) != 0;
     entry.ftCreationTime = file_time(knows_creation ? status.stx_btime : status.stx_ctime);
     entry.ftLastAccessTime = file_time(status.stx_atime);
@@ -120,26 +124,42 @@ DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
     }
 }
 
+bool has_wildcards(std::wstring_view name) {
+    return name.find_first_of(L"*?") != name.npos;
+}
+
+// A path's last element: empty behind a separator.
+std::wstring_view last_element(std::wstring_view path) {
+    return path.substr(path.find_last_of(L"\\/") + 1);  // all of it when there is none
+}
+
+// The status of a path's own entry. ERROR_SUCCESS or what went wrong.
+DWORD query_path(std::wstring_view path, struct statx& status) {
+    std::string name;
+    if (!basalt::platform::file_name_from_wide(path, name)) {
+        return ERROR_INVALID_NAME;
+    }
+    return query(AT_FDCWD, name.c_str(), status) ? ERROR_SUCCESS
+                                                 : basalt::platform::error_of_path(name, errno);
+}
+
 // Begins a search and describes its first entry.
 DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& entry) {
-    const std::size_t start = path.find_last_of(L"\\/") + 1;  // 0 when there is none
-    const std::wstring_view last = path.substr(start);
+    const std::wstring_view last = last_element(path);
     if (last.empty()) {
         return ERROR_FILE_NOT_FOUND;
     }
-    std::string name;
-    if (last.find_first_of(L"*?") == last.npos) {
-        if (!basalt::platform::file_name_from_wide(path, name)) {
-            return ERROR_INVALID_NAME;
-        }
+    if (!has_wildcards(last)) {
         struct statx status = {};
-        if (!query(AT_FDCWD, name.c_str(), status)) {
-            return basalt::platform::error_of_path(name, errno);
+        const DWORD error = query_path(path, status);
+        if (error == ERROR_SUCCESS) {
+            describe(status, last, entry);
         }
-        describe(status, last, entry);
-        return ERROR_SUCCESS;
+        return error;
     }
-    if (!basalt::platform::file_name_from_wide(start == 0 ? L"." : path.substr(0, start), name)) {
+    const std::wstring_view folder = path.substr(0, path.size() - last.size());
+    std::string name;
+    if (!basalt::platform::file_name_from_wide(folder.empty() ? L"." : folder, name)) {
         return ERROR_INVALID_NAME;
     }
     const DWORD error = search.open(name, last);
@@ -154,10 +174,17 @@ DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& e
 
 DWORD basalt::platform::first_match_attributes(const wchar_t* path) noexcept {
     return or_out_of_memory(DWORD{0}, [&] {
-        FileSearch search;
-        WIN32_FIND_DATAW entry;
-        const DWORD error = find_first(path != nullptr ? path : L"", search, entry);
-        return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
+        const std::wstring_view whole = path != nullptr ? path : L"";
+        const std::wstring_view last = last_element(whole);
+        if (last.empty() || has_wildcards(last)) {
+            FileSearch search;
+            WIN32_FIND_DATAW entry;
+            const DWORD error = find_first(whole, search, entry);
+            return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
+        }
+        struct statx status = {};
+        const DWORD error = query_path(whole, status);
+        return error == ERROR_SUCCESS ? attributes_of(status) : fail_with(error, DWORD{0});
     });
 }
 

@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "basalt/util.h"
+#include "tests/support/failing_new.h"
 #include "tests/util/plain_hex.h"
 
 #ifdef BENCH_HAS_ABSL
@@ -155,6 +156,19 @@ void run(benchmark::State& state, const Open& open) {
 
 void log_line_basalt(benchmark::State& state) {
     const CString line = CString(LINE) + L"\n";
+    bool took_memory = false;
+    {
+        vex_util::FileLogger log(log_path().c_str());
+        const FailAllocation guard(1);
+        for (int i = 0; i < 1000; ++i) {
+            log.Write(line);
+        }
+        took_memory = guard.fired();
+    }
+    if (took_memory) {
+        state.SkipWithError("writing a line takes memory");
+        return;
+    }
     run(state, [&line] {
         return
             [log = std::make_unique<vex_util::FileLogger>(log_path().c_str()), &line] { log->Write(line); };

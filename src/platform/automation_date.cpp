@@ -17,6 +17,10 @@ constexpr sys_days FIRST = std::chrono::year{100} / 1 / 1;
 constexpr sys_days LAST = std::chrono::year{9999} / 12 / 31;
 constexpr std::int64_t SECONDS_PER_DAY = 86'400;
 
+int second_of_day(const SYSTEMTIME& time) {
+    return time.wHour * 3600 + time.wMinute * 60 + time.wSecond;
+}
+
 // A time by what can be counted: chronological order is the order of the seconds.
 std::optional<std::int64_t> seconds_of(const COleDateTime& date) {
     SYSTEMTIME time{};
@@ -24,7 +28,7 @@ std::optional<std::int64_t> seconds_of(const COleDateTime& date) {
         return std::nullopt;
     }
     const sys_days day = std::chrono::year{time.wYear} / time.wMonth / time.wDay;
-    return (day - ZERO).count() * SECONDS_PER_DAY + time.wHour * 3600 + time.wMinute * 60 + time.wSecond;
+    return (day - ZERO).count() * SECONDS_PER_DAY + second_of_day(time);
 }
 
 int part_of(const COleDateTime& date, WORD SYSTEMTIME::*part) {
@@ -42,8 +46,7 @@ int SystemTimeToVariantTime(SYSTEMTIME* time, DATE* date) {
         return 0;
     }
     const auto days = static_cast<double>((sys_days(calendar) - ZERO).count());
-    const double time_of_day =
-        (time->wHour * 3600 + time->wMinute * 60 + time->wSecond) / static_cast<double>(SECONDS_PER_DAY);
+    const double time_of_day = second_of_day(*time) / static_cast<double>(SECONDS_PER_DAY);
     *date = days < 0.0 ? days - time_of_day : days + time_of_day;
     return 1;
 }

@@ -123,16 +123,16 @@ bool is_fixed_information(const Block& block, const Node& root) {
 
 }  // namespace
 
-BOOL VerQueryValueW(const void* bytes, const wchar_t* path, void** value, UINT* length) {
-    const Block block(bytes);
+BOOL VerQueryValueW(const void* block, const wchar_t* path, void** value, UINT* length) {
+    const Block nodes(block);
     const std::wstring_view keys = path;
     const bool wants_root = keys.empty() || keys == L"\\";
-    const std::optional<Node> node = find(block, keys);
-    if (!node || (wants_root && !is_fixed_information(block, *node))) {
+    const std::optional<Node> node = find(nodes, keys);
+    if (!node || (wants_root && !is_fixed_information(nodes, *node))) {
         SetLastError(ERROR_RESOURCE_TYPE_NOT_FOUND);
         return 0;
     }
-    *value = const_cast<unsigned char*>(block.at(node->value));
+    *value = const_cast<unsigned char*>(nodes.at(node->value));
     *length = static_cast<UINT>(node->is_text ? node->value_size / 2 : node->value_size);
     return 1;
 }

@@ -21,9 +21,9 @@ std::string encode(const unsigned char* bytes, std::size_t count) {
 }
 
 // The pair rule for any two characters; for digits it gives what they stand for.
-unsigned char decode_pair(wchar_t first, wchar_t second) {
-    const unsigned high = static_cast<unsigned char>(first);
-    const unsigned low = static_cast<unsigned char>(second);
+unsigned char decode_pair(char32_t first, char32_t second) {
+    const unsigned high = first & 0xFF;
+    const unsigned low = second & 0xFF;
     const unsigned high_part = (high > '9' ? high - 7 : high) << 4;
     const unsigned low_part = low > '9' ? low - 0x57 : low - 0x30;
     return static_cast<unsigned char>(high_part | low_part);
@@ -34,11 +34,12 @@ unsigned char decode_pair(wchar_t first, wchar_t second) {
 template <class Bytes>
 Bytes decode_any(std::string_view text) {
     const platform::CodePage& code_page = platform::active_code_page();
-    std::wstring wide = code_page.widen(text);
+    const std::wstring wide = code_page.widen(text);
+    const auto lower = [&](wchar_t ch) { return static_cast<char32_t>(code_page.to_lower(ch)); };
     Bytes bytes;
     bytes.reserve(wide.size() / 2);
     for (std::size_t i = 0; i + 1 < wide.size(); i += 2) {
-        const unsigned char byte = decode_pair(code_page.to_lower(wide[i]), code_page.to_lower(wide[i + 1]));
+        const unsigned char byte = decode_pair(lower(wide[i]), lower(wide[i + 1]));
         bytes.push_back(static_cast<typename Bytes::value_type>(byte));
     }
     return bytes;
@@ -78,7 +79,7 @@ bool IsHexString(const std::string& s) {
 }
 
 std::string HexStringToString(const std::string& hex) {
-    std::string text = decode<std::string>(hex);
+    auto text = decode<std::string>(hex);
     if (text.find('\0') != std::string::npos) {
         throw std::runtime_error("Null terminator in hex string");
     }

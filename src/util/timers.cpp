@@ -14,6 +14,10 @@ std::int64_t read_counter() {
     return count.QuadPart;
 }
 
+double seconds(std::int64_t ticks) {
+    return static_cast<double>(ticks) * HiResTimer::s_llFrequency;
+}
+
 // Stored within the one initialisation that every constructor waits for, so that no timer reads the shared
 // value while another thread writes it.
 void determine_tick_length() {
@@ -31,6 +35,7 @@ constinit double HiResTimer::s_llFrequency = 0.0;
 
 HiResTimer::HiResTimer() : HiResTimer(CString(), false) {}
 
+// NOLINTNEXTLINE(modernize-pass-by-value): the published signature
 HiResTimer::HiResTimer(const CString& name, bool flag) : m_name(name), m_flag(flag) {
     determine_tick_length();
     Reset();
@@ -40,13 +45,9 @@ void HiResTimer::Reset() {
     m_start = read_counter();
 }
 
-double HiResTimer::read_ticks() {
-    m_last_reading = read_counter();
-    return static_cast<double>(m_last_reading - m_start);
-}
-
 float HiResTimer::GetElapsedS() {
-    return static_cast<float>(read_ticks() * s_llFrequency);
+    m_last_reading = read_counter();
+    return static_cast<float>(seconds(m_last_reading - m_start));
 }
 
 float HiResTimer::GetElapsed() {
@@ -54,7 +55,8 @@ float HiResTimer::GetElapsed() {
 }
 
 unsigned long HiResTimer::GetElapsedMs() {
-    const auto milliseconds = static_cast<std::int64_t>(read_ticks() * s_llFrequency * 1000.0);
+    m_last_reading = read_counter();
+    const auto milliseconds = static_cast<std::int64_t>(seconds(m_last_reading - m_start) * 1000.0);
     return static_cast<std::uint32_t>(milliseconds);
 }
 

@@ -1,7 +1,9 @@
 #include "basalt/util/version_info.h"
 
 #include <cstring>
+#include <iterator>
 #include <new>
+#include <optional>
 #include <utility>
 
 #include "src/platform/module_file_name.h"
@@ -16,6 +18,53 @@ constexpr int low_word(DWORD value) {
     return static_cast<int>(value & 0xFFFF);
 }
 
+// Empty when there is no resource.
+std::vector<BYTE> read_resource() {
+    wchar_t file[256];
+    const DWORD length = GetModuleFileNameW(nullptr, file, std::size(file));
+    // A name that was cut could be that of another file.
+    if (length == 0 || length == std::size(file)) {
+        return {};
+    }
+    DWORD handle = 0;
+    std::vector<BYTE> resource(GetFileVersionInfoSizeW(file, &handle));
+    const auto size = static_cast<DWORD>(resource.size());
+    if (size == 0 || GetFileVersionInfoW(file, handle, size, resource.data()) == 0) {
+        return {};
+    }
+    return resource;
+}
+
+// A value of at least the record's size, copied from wherever it stands.
+template <class Record>
+std::optional<Record> record_at(const std::vector<BYTE>& resource, const wchar_t* path) {
+    void* value = nullptr;
+    UINT length = 0;
+    Record record;
+    if (VerQueryValueW(resource.data(), path, &value, &length) == 0 || length < sizeof record) {
+        return std::nullopt;
+    }
+    std::memcpy(&record, value, sizeof record);
+    return record;
+}
+
+// Empty when there is none.
+CString text_at(const std::vector<BYTE>& resource, const CString& translation, const wchar_t* key) {
+    CString path;
+    path.Format(L"\\StringFileInfo\\%s\\%s", translation, key);
+    void* value = nullptr;
+    UINT length = 0;
+    if (VerQueryValueW(resource.data(), path, &value, &length) == 0) {
+        return {};
+    }
+    return basalt::platform::wide_from_utf16(value, length).c_str();
+}
+
+struct Translation {
+    WORD language;
+    WORD code_page;
+};
+
 }  // namespace
 
 VersionInfo::VersionInfo() = default;
@@ -24,12 +73,27 @@ bool VersionInfo::InitVersionInfo(HINSTANCE) {
     try {
         // On a copy, so that a failure half-way leaves everything as it was.
         VersionInfo found = *this;
-        if (!found.read_resource()) {
+        found.m_version_data = read_resource();
+        if (found.m_version_data.empty()) {
             return false;
         }
-        found.take_numbers();
-        if (found.take_translation()) {
-            found.take_texts();
+        if (const auto fixed = record_at<VS_FIXEDFILEINFO>(found.m_version_data, L"\\")) {
+            found.m_major = high_word(fixed->dwProductVersionMS);
+            found.m_minor = low_word(fixed->dwProductVersionMS);
+            found.m_schema = high_word(fixed->dwProductVersionLS);
+            found.m_build = low_word(fixed->dwProductVersionLS);
+        }
+        if (const auto first = record_at<Translation>(found.m_version_data, L"\\VarFileInfo\\Translation")) {
+            found.m_translation.Format(L"%04x%04x", first->language, first->code_page);
+            const auto text = [&found](const wchar_t* key) {
+                return text_at(found.m_version_data, found.m_translation, key);
+            };
+            found.m_product_name = text(L"ProductName");
+            found.m_internal_name = text(L"InternalName");
+            found.m_copyright = text(L"LegalCopyright");
+            found.m_product_version = text(L"ProductVersion");
+            found.m_file_description = text(L"FileDescription");
+            found.m_comment = text(L"Comment");
         }
         *this = std::move(found);
         return true;
@@ -38,67 +102,8 @@ bool VersionInfo::InitVersionInfo(HINSTANCE) {
     }
 }
 
-bool VersionInfo::read_resource() {
-    wchar_t file[256];
-    const DWORD length = GetModuleFileNameW(nullptr, file, std::size(file));
-    // A name that was cut could be that of another file.
-    if (length == 0 || length == std::size(file)) {
-        return false;
-    }
-    DWORD handle = 0;
-    const DWORD size = GetFileVersionInfoSizeW(file, &handle);
-    if (size == 0) {
-        return false;
-    }
-    m_version_data.assign(size, 0);
-    return GetFileVersionInfoW(file, handle, size, m_version_data.data()) != 0;
-}
-
-void VersionInfo::take_numbers() {
-    void* value = nullptr;
-    UINT length = 0;
-    VS_FIXEDFILEINFO fixed{};
-    if (VerQueryValueW(m_version_data.data(), L"\\", &value, &length) == 0 || length < sizeof fixed) {
-        return;
-    }
-    std::memcpy(&fixed, value, sizeof fixed);
-    m_major = high_word(fixed.dwProductVersionMS);
-    m_minor = low_word(fixed.dwProductVersionMS);
-    m_schema = high_word(fixed.dwProductVersionLS);
-    m_build = low_word(fixed.dwProductVersionLS);
-}
-
-bool VersionInfo::take_translation() {
-    void* value = nullptr;
-    UINT length = 0;
-    WORD first[2] = {};
-    if (VerQueryValueW(m_version_data.data(), L"\\VarFileInfo\\Translation", &value, &length) == 0 ||
-        length < sizeof first) {
-        return false;
-    }
-    std::memcpy(first, value, sizeof first);
-    m_translation.Format(L"%04x%04x", first[0], first[1]);
-    return true;
-}
-
-void VersionInfo::take_texts() {
-    const std::pair<const wchar_t*, CString VersionInfo::*> texts[] = {
-        {L"ProductName", &VersionInfo::m_product_name},
-        {L"InternalName", &VersionInfo::m_internal_name},
-        {L"LegalCopyright", &VersionInfo::m_copyright},
-        {L"ProductVersion", &VersionInfo::m_product_version},
-        {L"FileDescription", &VersionInfo::m_file_description},
-        {L"Comment", &VersionInfo::m_comment},
-    };
-    for (const auto& [key, text] : texts) {
-        CString path;
-        path.Format(L"\\StringFileInfo\\%s\\%s", m_translation, key);
-        void* value = nullptr;
-        UINT length = 0;
-        const bool is_there = VerQueryValueW(m_version_data.data(), path, &value, &length) != 0;
-        this->*text = is_there ? basalt::platform::wide_from_utf16(value, length).c_str() : L"";
-    }
-}
+// The published signatures are not const.
+// NOLINTBEGIN(readability-make-member-function-const)
 
 int VersionInfo::GetMajorVersion() {
     return m_major;
@@ -145,3 +150,5 @@ CString VersionInfo::GetVersionString() {
     text.Format(L"%s %02d.%02d.%02d.%02d", m_product_name, m_major, m_minor, m_schema, m_build);
     return text;
 }
+
+// NOLINTEND(readability-make-member-function-const)

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cerrno>
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
@@ -22,6 +23,24 @@ namespace {
 using vex_util::FileLogger;
 namespace fs = std::filesystem;
 using namespace std::string_literals;
+
+bool fdopen_fails = false;
+
+}  // namespace
+
+// The name the linker's --wrap makes of fdopen.
+extern "C" {
+std::FILE* __real_fdopen(int file, const char* mode);
+std::FILE* __wrap_fdopen(int file, const char* mode) {
+    if (!fdopen_fails) {
+        return __real_fdopen(file, mode);
+    }
+    errno = ENOMEM;
+    return nullptr;
+}
+}
+
+namespace {
 
 std::string contents(const fs::path& file) {
     std::ifstream stream(file, std::ios::binary);
@@ -231,6 +250,18 @@ TEST_F(FileLog, full_disk_is_silent) {
     log.Write(L"still usable");
     log.Close();
     EXPECT_EQ(contents(file), "still usable");
+}
+
+TEST_F(FileLog, stream_that_cannot_be_made_leaves_no_file_open) {
+    const auto open_files = [] {
+        return std::distance(fs::directory_iterator("/proc/self/fd"), fs::directory_iterator());
+    };
+    const auto before = open_files();
+    fdopen_fails = true;
+    FileLogger log(file.c_str());
+    fdopen_fails = false;
+    log.Write(L"lost");
+    EXPECT_EQ(open_files(), before);
 }
 
 // In encodings other than UTF-8, of locales made here; each in a process of its own, since the environment is

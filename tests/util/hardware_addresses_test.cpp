@@ -1,9 +1,11 @@
 #include "basalt/util/hardware_addresses.h"
 
 #include <gtest/gtest.h>
+#include <ifaddrs.h>
 #include <net/if.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <filesystem>
 #include <fstream>
 #include <map>
@@ -21,11 +23,20 @@ std::optional<DWORD> vanished_index;
 std::size_t grows_by = 0;  // rows that appear, one after each call for the table
 DWORD table_error = 0;
 std::span<const MIB_IFROW> rows;
+bool list_is_refused = false;
 
 }  // namespace
 
 // The names the linker's --wrap makes of the platform's calls.
 extern "C" {
+int __real_getifaddrs(ifaddrs** list);
+int __wrap_getifaddrs(ifaddrs** list) {
+    if (!list_is_refused) {
+        return __real_getifaddrs(list);
+    }
+    errno = EMFILE;
+    return -1;
+}
 DWORD __real__Z10GetIfEntryP9MIB_IFROW(MIB_IFROW* row);
 DWORD __wrap__Z10GetIfEntryP9MIB_IFROW(MIB_IFROW* row) {
     return row->dwIndex == vanished_index ? 2 : __real__Z10GetIfEntryP9MIB_IFROW(row);
@@ -133,6 +144,17 @@ std::string first_line(const std::filesystem::path& file) {
     std::string line;
     std::getline(stream, line);
     return line;
+}
+
+TEST_F(HardwareAddresses, list_that_the_system_refuses) {
+    basalt::platform::set_interface_table(nullptr);
+    list_is_refused = true;
+    DWORD size = 0;
+    MIB_IFROW row{};
+    EXPECT_EQ(GetIfTable(nullptr, &size, 0), 4U);
+    EXPECT_EQ(GetIfEntry(&row), 4U);
+    EXPECT_FALSE(m_list.Create());
+    list_is_refused = false;
 }
 
 // The machine's own interfaces, as its files tell them.

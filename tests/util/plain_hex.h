@@ -9,7 +9,7 @@
 
 namespace plain {
 
-inline std::string encode_hex(const std::vector<unsigned char>& bytes) {
+[[gnu::noinline]] inline std::string encode_hex(const std::vector<unsigned char>& bytes) {
     static constexpr char DIGITS[] = "0123456789abcdef";
     std::string text(2 * bytes.size(), '\0');
     char* out = text.data();
@@ -21,7 +21,7 @@ inline std::string encode_hex(const std::vector<unsigned char>& bytes) {
 }
 
 // The characters are digits.
-inline std::vector<unsigned char> decode_hex(const std::string& text) {
+[[gnu::noinline]] inline std::vector<unsigned char> decode_hex(const std::string& text) {
     static constexpr std::array<unsigned char, 256> VALUES = [] {
         std::array<unsigned char, 256> values{};
         for (unsigned char n = 0; n < 10; ++n) {

@@ -1,8 +1,10 @@
 #include "basalt/util/version_info.h"
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <filesystem>
 #include <random>
 
@@ -15,10 +17,22 @@ using namespace basalt::test;
 
 const std::wstring* program_name = nullptr;  // null: the real one
 
+// The n-th reading fails, or all give one byte at most; 0 and false: none does.
+int readings_until_failure = 0;
+bool readings_are_short = false;
+
 }  // namespace
 
-// The name the linker's --wrap makes of GetModuleFileNameW.
+// The names the linker's --wrap makes of GetModuleFileNameW and pread.
 extern "C" {
+ssize_t __real_pread(int file, void* data, size_t size, off_t offset);
+ssize_t __wrap_pread(int file, void* data, size_t size, off_t offset) {
+    if (readings_until_failure > 0 && --readings_until_failure == 0) {
+        errno = EIO;
+        return -1;
+    }
+    return __real_pread(file, data, readings_are_short ? 1 : size, offset);
+}
 DWORD __real__Z18GetModuleFileNameWPvPwj(HINSTANCE module, wchar_t* name, DWORD size);
 DWORD __wrap__Z18GetModuleFileNameWPvPwj(HINSTANCE module, wchar_t* name, DWORD size) {
     if (program_name == nullptr) {
@@ -139,6 +153,25 @@ TEST_F(Version, program_without_a_name_that_fits_has_no_resource) {
         EXPECT_FALSE(m_info.InitVersionInfo(nullptr));
         expect_survey(m_info);
     }
+}
+
+TEST_F(Version, file_that_cannot_be_read_leaves_everything_as_it_was) {
+    run_as(survey_resource());
+    bool failed = true;
+    for (int nth = 1; failed; ++nth) {
+        ASSERT_LT(nth, 100);
+        readings_until_failure = nth;
+        const bool result = m_info.InitVersionInfo(nullptr);
+        failed = readings_until_failure == 0;
+        readings_until_failure = 0;
+        ASSERT_EQ(result, !failed) << nth;
+        ASSERT_STREQ(m_info.GetVersionString(), failed ? L" 01.00.00.01" : L"Survey 04.01.02.305");
+    }
+    readings_are_short = true;
+    VersionInfo bit_by_bit;
+    EXPECT_TRUE(bit_by_bit.InitVersionInfo(nullptr));
+    readings_are_short = false;
+    expect_survey(bit_by_bit);
 }
 
 TEST_F(Version, lack_of_memory_leaves_everything_as_it_was) {

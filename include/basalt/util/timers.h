@@ -33,8 +33,6 @@ public:
     static double s_llFrequency;
 
 private:
-    double read_ticks();
-
     CString m_name;
     std::int64_t m_start = 0;
     std::int64_t m_last_reading = 0;

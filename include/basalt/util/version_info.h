@@ -55,11 +55,6 @@ public:
     CString GetVersionString();
 
 private:
-    bool read_resource();
-    void take_numbers();
-    bool take_translation();
-    void take_texts();
-
     int m_major = 1;
     int m_minor = 0;
     int m_schema = 0;

@@ -2,9 +2,9 @@
 /// Environment queries: operating-system and handheld codes, language, display and two small utilities; the
 /// folders that the host configures; the identifier replacement table; conversions of text in fixed buffers.
 ///
-/// None of them takes a lock, and none fails but _tempFilePath() and _REPLACE_LOAD(), for want of memory. What
-/// is determined once is stored for the life of the library in the process; two threads that make the first
-/// query at once both get, and store, the same answer.
+/// None of them takes a lock, and none fails but _tempFilePath() and _REPLACE_LOAD(), for want of memory.
+/// What is determined once is stored for the life of the library in the process; two threads that make the
+/// first query at once both get, and store, the same answer.
 #ifndef BASALT_FRAME_H
 #define BASALT_FRAME_H
 

@@ -40,8 +40,8 @@ BOOL FindClose(HANDLE search);
 
 namespace basalt::platform {
 
-// The attributes of the entry that FindFirstFileW would describe, or 0 with its error; no search is left open.
-// Half the time of a search and its end, for those who ask nothing else.
+// The attributes of the entry that FindFirstFileW would describe, or 0 with its error; no search is left
+// open. Half the time of a search and its end, for those who ask nothing else.
 DWORD first_match_attributes(const wchar_t* path) noexcept;
 
 }  // namespace basalt::platform

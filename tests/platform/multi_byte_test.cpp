@@ -34,26 +34,26 @@ TEST(MultiByte, room_is_told_kept_or_found_too_small) {
     EXPECT_EQ(to_narrow[3], '|');
 }
 
+void expect_refused(int result) {
+    EXPECT_EQ(result, 0);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+    SetLastError(0);
+}
+
 TEST(MultiByte, refuses_what_it_does_not_know) {
     constexpr UINT OTHER = 1252;
     wchar_t wide[4] = L"";
     char narrow[4] = "";
-    for (const int result : {
-             MultiByteToWideChar(OTHER, 0, "a", 1, wide, 4),
-             MultiByteToWideChar(CP_ACP, 8, "a", 1, wide, 4),
-             MultiByteToWideChar(CP_ACP, 0, nullptr, 1, wide, 4),
-             MultiByteToWideChar(CP_ACP, 0, "a", 0, wide, 4),
-             MultiByteToWideChar(CP_ACP, 0, "a", 1, nullptr, 4),
-             WideCharToMultiByte(OTHER, 0, L"a", 1, narrow, 4, nullptr, nullptr),
-             WideCharToMultiByte(CP_ACP, 1, L"a", 1, narrow, 4, nullptr, nullptr),
-             WideCharToMultiByte(CP_ACP, 0, L"a", -2, narrow, 4, nullptr, nullptr),
-             WideCharToMultiByte(CP_ACP, 0, L"a", 1, narrow, -1, nullptr, nullptr),
-             WideCharToMultiByte(CP_ACP, 0, L"a", 1, narrow, 4, "!", nullptr),
-         }) {
-        EXPECT_EQ(result, 0);
-        EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
-        SetLastError(0);
-    }
+    expect_refused(MultiByteToWideChar(OTHER, 0, "a", 1, wide, 4));
+    expect_refused(MultiByteToWideChar(CP_ACP, 8, "a", 1, wide, 4));
+    expect_refused(MultiByteToWideChar(CP_ACP, 0, nullptr, 1, wide, 4));
+    expect_refused(MultiByteToWideChar(CP_ACP, 0, "a", 0, wide, 4));
+    expect_refused(MultiByteToWideChar(CP_ACP, 0, "a", 1, nullptr, 4));
+    expect_refused(WideCharToMultiByte(OTHER, 0, L"a", 1, narrow, 4, nullptr, nullptr));
+    expect_refused(WideCharToMultiByte(CP_ACP, 1, L"a", 1, narrow, 4, nullptr, nullptr));
+    expect_refused(WideCharToMultiByte(CP_ACP, 0, L"a", -2, narrow, 4, nullptr, nullptr));
+    expect_refused(WideCharToMultiByte(CP_ACP, 0, L"a", 1, narrow, -1, nullptr, nullptr));
+    expect_refused(WideCharToMultiByte(CP_ACP, 0, L"a", 1, narrow, 4, "!", nullptr));
 }
 
 }  // namespace

@@ -56,6 +56,7 @@ namespace vex_util {
 
 CFilePath::CFilePath() = default;
 
+// NOLINTNEXTLINE(modernize-pass-by-value): the published signature
 CFilePath::CFilePath(const CString& path) : m_full_path(path) {
     split();
 }
@@ -159,6 +160,7 @@ bool CFilePath::GetLastAccessTime(const CString& path, FILETIME& time) {
     return find_time(path, &WIN32_FIND_DATAW::ftLastAccessTime, time);
 }
 
+// NOLINTNEXTLINE(readability-make-member-function-const): the published signature
 std::vector<CString> CFilePath::GetFilesInDirectory(const CString& pattern) {
     std::vector<CString> files;
     const CString directory = Directory();

@@ -59,7 +59,8 @@ public:
     /// The extension without its dot; all of `.profile` is extension.
     const CString& Extension() const;
     /// Stores the extension as given (a dot at its front stays and doubles) and combines Directory() and
-    /// FileName(). An empty extension, and one for a path without a name, loses the name: `C:\a\`.
+    /// FileName(). An empty extension loses the name, and a path without a name gets none: its directory and
+    /// a separator are left.
     void SetExtension(const CString& extension);
     /// @}
 
@@ -85,9 +86,11 @@ public:
     static bool GetFileCreationTime(const CString& path, FILETIME& time);
     /// GetLastAccessTime() of any path. False, with the time untouched, when there is no entry.
     static bool GetLastAccessTime(const CString& path, FILETIME& time);
-    /// The entries of Directory() that match a pattern, each behind Directory() and `\`, in the system's
-    /// order: subdirectories, `.` and `..` too. For a relative path that is a folder of the root.
-    /// @param pattern `*` for any characters, `?` for one, case counts; `*.*` is everything
+    /// The entries of Directory() that match a pattern, each behind Directory() and a backslash, in the
+    /// system's order: subdirectories, the folder itself and the one above it too. For a relative path
+    /// that is a folder of the root.
+    /// @param pattern an asterisk for any characters, a question mark for one; case counts, and two asterisks
+    /// with a dot between match everything
     std::vector<CString> GetFilesInDirectory(const CString& pattern);
     /// @}
 

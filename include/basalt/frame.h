@@ -208,6 +208,7 @@ BASALT_API void _tchar2char(const wchar_t* source, char* destination, int n);
 /// @param value any; negative ones have a minus sign in radix 10 and stand for their 32-bit pattern in others
 /// @param destination the text; empty when text and terminator together need more than n characters (a text
 /// of exactly n too) and for a radix out of range
+/// @param n as above
 /// @param radix 2 to 36
 BASALT_API void _int2tchar(int value, wchar_t* destination, int n, int radix);
 /// @}

@@ -3,6 +3,7 @@
 #ifndef BASALT_BASALT_H
 #define BASALT_BASALT_H
 
+#include "basalt/files.h"
 #include "basalt/frame.h"
 #include "basalt/geo.h"
 #include "basalt/memory.h"

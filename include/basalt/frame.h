@@ -1,10 +1,10 @@
 /// @file
-/// Environment queries: operating-system and handheld codes, language, display and two small utilities; and
-/// the folders that the host configures.
+/// Environment queries: operating-system and handheld codes, language, display and two small utilities; the
+/// folders that the host configures; the identifier replacement table; conversions of text in fixed buffers.
 ///
-/// None of them fails or takes a lock, and none throws but _tempFilePath(). What is determined once is stored
-/// for the life of the library in the process; two threads that make the first query at once both get, and
-/// store, the same answer.
+/// None of them takes a lock, and none fails but _tempFilePath() and _REPLACE_LOAD(), for want of memory.
+/// What is determined once is stored for the life of the library in the process; two threads that make the
+/// first query at once both get, and store, the same answer.
 #ifndef BASALT_FRAME_H
 #define BASALT_FRAME_H
 
@@ -150,5 +150,67 @@ BASALT_API wchar_t* _kestraApplicationVersion();
 /// it exists or not. Empty when it needs more than 259 characters, or the system does not answer.
 /// Threads: thread-safe, as long as nobody changes the environment.
 BASALT_API CString _tempFilePath();
+
+/// @name Identifier replacement
+/// A process-wide table of pairs that the host loads, at most 1000, and a switch that starts off. The
+/// identifiers mean nothing to the library, which never looks one up itself.
+///
+/// Threads: one at a time, lookups too while another thread loads, switches or cleans up; lookups alone from
+/// any number of threads.
+/// @{
+
+/// Appends a pair to the table, whether replacement is on or off. A pair beyond the 1000th is dropped.
+/// Fails by std::bad_alloc, with nothing stored, when there is no memory for a table.
+/// @param from identifier to be replaced, any value; of several pairs with the same one the earliest counts
+/// @param to its replacement, any value; it is not looked up in turn
+BASALT_API void _REPLACE_LOAD(unsigned int from, unsigned int to);
+
+/// The replacement of an identifier, found by going through the pairs in the order they were loaded.
+/// @return the replacement; the identifier itself when replacement is off or no pair has it.
+BASALT_API unsigned int _REPLACE(unsigned int id);
+
+/// Switches replacement on or off; the table stays as it is.
+BASALT_API void _REPLACE_FLAG(bool enabled);
+
+/// Releases the table; the switch stays as it is, and the next load begins a new table. Only this call
+/// releases it: unloading the library does not.
+BASALT_API void _REPLACE_CLEANUP();
+/// @}
+
+/// @name Text in fixed buffers
+/// From one kind of terminated text to another, in buffers of the caller's. The count n (0 or more) is the
+/// largest number of characters before the terminator, so a destination holds n + 1 of them; nothing behind
+/// index n is written. Narrow text is in the active code page: the encoding of the environment's locale,
+/// UTF-8 where that names none. The process's own locale is neither used nor changed.
+///
+/// Bad input: no pointer may be null, n may not be negative, source and destination may not overlap. Nothing
+/// fails or throws. The two conversions are for results shorter than 65,536 characters; a longer one is
+/// terminated at its length modulo 65,536.
+/// Threads: thread-safe; each buffer is the caller's.
+/// @{
+
+/// Copies wide text; a source longer than n is cut to n characters.
+BASALT_API void _tchar2wchar(const wchar_t* source, wchar_t* destination, int n);
+/// The same as _tchar2wchar().
+BASALT_API void _wchar2tchar(const wchar_t* source, wchar_t* destination, int n);
+/// The same as _tchar2wchar().
+BASALT_API void _tchar2tchar(const wchar_t* source, wchar_t* destination, int n);
+
+/// Converts narrow text to wide; a source longer than n is cut to n bytes first, which may split its last
+/// character. Each byte that belongs to no character, a split one's too, becomes U+FFFD.
+BASALT_API void _char2tchar(const char* source, wchar_t* destination, int n);
+
+/// Converts wide text to narrow; what does not fit is never cut: a result of more than n bytes is the empty
+/// text. A character that the encoding lacks becomes `?`.
+BASALT_API void _tchar2char(const wchar_t* source, char* destination, int n);
+
+/// Writes a number as text, in lower-case digits. Index n holds a terminator in every case.
+/// @param value any; negative ones have a minus sign in radix 10 and stand for their 32-bit pattern in others
+/// @param destination the text; empty when text and terminator together need more than n characters (a text
+/// of exactly n too) and for a radix out of range
+/// @param n as above
+/// @param radix 2 to 36
+BASALT_API void _int2tchar(int value, wchar_t* destination, int n, int radix);
+/// @}
 
 #endif

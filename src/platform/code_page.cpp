@@ -75,6 +75,11 @@ std::wstring CodePage::widen(std::string_view text) const {
     return m_is_utf8 ? wide_from_utf8(text) : widen_by_locale(text, m_locale);
 }
 
+std::size_t CodePage::widen_to(std::string_view text, wchar_t* characters, std::size_t room) const {
+    return m_is_utf8 ? write_wide(text, characters, room)
+                     : widen_by_locale_to(text, m_locale, characters, room);
+}
+
 std::string CodePage::narrow(std::wstring_view text) const {
     return m_is_utf8 ? utf8_from_wide(text) : narrow_by_locale(text, m_locale);
 }
@@ -109,26 +114,34 @@ const CodePage& active_code_page() {
     return environment;
 }
 
-std::wstring widen_by_locale(std::string_view text, locale_t locale) {
+std::size_t widen_by_locale_to(std::string_view text, locale_t locale, wchar_t* characters,
+                               std::size_t room) {
     const ScopedLocale scope(locale);
-    std::wstring result;
-    result.reserve(text.size());
+    std::size_t count = 0;
     std::mbstate_t state{};
     while (!text.empty()) {
         wchar_t ch = L'\0';
-        const std::size_t length = std::mbrtowc(&ch, text.data(), text.size(), &state);
+        std::size_t length = std::mbrtowc(&ch, text.data(), text.size(), &state);
         // The two failures, invalid and cut short, are the two largest counts. A lead byte in front of
         // ordinary text may answer either, so neither swallows more than the one byte.
         if (length > text.size() || !is_unicode_scalar(ch)) {
-            result.push_back(REPLACEMENT_CHARACTER);
-            text.remove_prefix(1);
+            ch = REPLACEMENT_CHARACTER;
+            length = 1;
             state = {};
-        } else {
-            result.push_back(ch);
-            // A zero character answers 0 and has one byte.
-            text.remove_prefix(std::max<std::size_t>(length, 1));
         }
+        if (count < room) {
+            characters[count] = ch;
+        }
+        ++count;
+        // A zero character answers 0 and has one byte.
+        text.remove_prefix(std::max<std::size_t>(length, 1));
     }
+    return count;
+}
+
+std::wstring widen_by_locale(std::string_view text, locale_t locale) {
+    std::wstring result(text.size(), L'\0');
+    result.resize(widen_by_locale_to(text, locale, result.data(), result.size()));
     return result;
 }
 

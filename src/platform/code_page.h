@@ -27,6 +27,9 @@ public:
 
     // REPLACEMENT_CHARACTER for each byte that belongs to no character, a character cut short at the end too.
     std::wstring widen(std::string_view text) const;
+    // The same into room for some characters: writes those that fit and answers the count of all, which is at
+    // most one a byte.
+    std::size_t widen_to(std::string_view text, wchar_t* characters, std::size_t room) const;
     // '?' for each character that the encoding lacks.
     std::string narrow(std::wstring_view text) const;
     // The same into room for MB_LEN_MAX bytes a character; answers the end of what was written.
@@ -55,6 +58,7 @@ inline std::string narrow(std::wstring_view text) {
 // The two conversions by way of a locale's own routines, one character at a time: what CodePage does for
 // every encoding but UTF-8.
 std::wstring widen_by_locale(std::string_view text, locale_t locale);
+std::size_t widen_by_locale_to(std::string_view text, locale_t locale, wchar_t* characters, std::size_t room);
 std::string narrow_by_locale(std::wstring_view text, locale_t locale);
 char* narrow_by_locale_to(std::wstring_view text, locale_t locale, char* bytes);
 

@@ -17,6 +17,7 @@
 #include "src/platform/file_name.h"
 #include "src/platform/handle_table.h"
 #include "src/platform/out_of_memory.h"
+#include "src/platform/ticks.h"
 #include "src/platform/wildcard.h"
 
 using basalt::platform::error_from_errno;
@@ -61,14 +62,16 @@ private:
 };
 
 FILETIME file_time(const statx_timestamp& time) {
-    constexpr std::int64_t SECONDS_FROM_1601_TO_1970 = 11'644'473'600;
-    const std::int64_t ticks = (time.tv_sec + SECONDS_FROM_1601_TO_1970) * 10'000'000 + time.tv_nsec / 100;
-    return {static_cast<DWORD>(ticks & 0xFFFFFFFF), static_cast<DWORD>(ticks >> 32)};
+    return basalt::platform::file_time(basalt::platform::ticks_of(time.tv_sec, time.tv_nsec));
+}
+
+DWORD attributes_of(const struct statx& status) {
+    return S_ISDIR(status.stx_mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
 }
 
 void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DATAW& entry) {
     entry = {};
-    entry.dwFileAttributes = S_ISDIR(status.stx_mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
+    entry.dwFileAttributes = attributes_of(status);
     const bool knows_creation = (status.stx_mask & STATX_BTIME) != 0;
     entry.ftCreationTime = file_time(knows_creation ? status.stx_btime : status.stx_ctime);
     entry.ftLastAccessTime = file_time(status.stx_atime);
@@ -78,11 +81,18 @@ void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DAT
     name.copy(entry.cFileName, std::size(entry.cFileName) - 1);
 }
 
-// What a link leads to, or the link itself where that is nothing.
+// What a link leads to, or the link itself where that is nothing. A link is rare, so it is not followed at
+// first: one call then answers for everything else, also for what is missing.
 bool query(int folder, const char* name, struct statx& status) {
     constexpr unsigned WANTED = STATX_BASIC_STATS | STATX_BTIME;
-    return statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &status) == 0 ||
-           statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) == 0;
+    if (statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) != 0) {
+        return false;
+    }
+    struct statx target = {};
+    if (S_ISLNK(status.stx_mode) && statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &target) == 0) {
+        status = target;
+    }
+    return true;
 }
 
 DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
@@ -113,26 +123,42 @@ DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
     }
 }
 
+bool has_wildcards(std::wstring_view name) {
+    return name.find_first_of(L"*?") != std::wstring_view::npos;
+}
+
+// A path's last element: empty behind a separator.
+std::wstring_view last_element(std::wstring_view path) {
+    return path.substr(path.find_last_of(L"\\/") + 1);  // all of it when there is none
+}
+
+// The status of a path's own entry. ERROR_SUCCESS or what went wrong.
+DWORD query_path(std::wstring_view path, struct statx& status) {
+    std::string name;
+    if (!basalt::platform::file_name_from_wide(path, name)) {
+        return ERROR_INVALID_NAME;
+    }
+    return query(AT_FDCWD, name.c_str(), status) ? ERROR_SUCCESS
+                                                 : basalt::platform::error_of_path(name, errno);
+}
+
 // Begins a search and describes its first entry.
 DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& entry) {
-    const std::size_t start = path.find_last_of(L"\\/") + 1;  // 0 when there is none
-    const std::wstring_view last = path.substr(start);
+    const std::wstring_view last = last_element(path);
     if (last.empty()) {
         return ERROR_FILE_NOT_FOUND;
     }
-    std::string name;
-    if (last.find_first_of(L"*?") == std::wstring_view::npos) {
-        if (!basalt::platform::file_name_from_wide(path, name)) {
-            return ERROR_INVALID_NAME;
-        }
+    if (!has_wildcards(last)) {
         struct statx status = {};
-        if (!query(AT_FDCWD, name.c_str(), status)) {
-            return basalt::platform::error_of_path(name, errno);
+        const DWORD error = query_path(path, status);
+        if (error == ERROR_SUCCESS) {
+            describe(status, last, entry);
         }
-        describe(status, last, entry);
-        return ERROR_SUCCESS;
+        return error;
     }
-    if (!basalt::platform::file_name_from_wide(start == 0 ? L"." : path.substr(0, start), name)) {
+    const std::wstring_view folder = path.substr(0, path.size() - last.size());
+    std::string name;
+    if (!basalt::platform::file_name_from_wide(folder.empty() ? L"." : folder, name)) {
         return ERROR_INVALID_NAME;
     }
     const DWORD error = search.open(name, last);
@@ -144,6 +170,22 @@ DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& e
 }
 
 }  // namespace
+
+DWORD basalt::platform::first_match_attributes(const wchar_t* path) noexcept {
+    return or_out_of_memory(DWORD{0}, [&] {
+        const std::wstring_view whole = path != nullptr ? path : L"";
+        const std::wstring_view last = last_element(whole);
+        if (last.empty() || has_wildcards(last)) {
+            FileSearch search;
+            WIN32_FIND_DATAW entry;
+            const DWORD error = find_first(whole, search, entry);
+            return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
+        }
+        struct statx status = {};
+        const DWORD error = query_path(whole, status);
+        return error == ERROR_SUCCESS ? attributes_of(status) : fail_with(error, DWORD{0});
+    });
+}
 
 HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry) {
     return or_out_of_memory(INVALID_HANDLE_VALUE, [&] {

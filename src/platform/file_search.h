@@ -38,4 +38,12 @@ BOOL FindNextFileW(HANDLE search, WIN32_FIND_DATAW* entry);
 // Ends a search. 1, or 0 for what is no search (ERROR_INVALID_HANDLE).
 BOOL FindClose(HANDLE search);
 
+namespace basalt::platform {
+
+// The attributes of the entry that FindFirstFileW would describe, or 0 with its error; no search is left
+// open. Half the time of a search and its end, for those who ask nothing else.
+DWORD first_match_attributes(const wchar_t* path) noexcept;
+
+}  // namespace basalt::platform
+
 #endif

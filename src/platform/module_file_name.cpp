@@ -8,7 +8,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
-#include "src/platform/utf8.h"
+#include "src/platform/file_name.h"
 
 DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
     if (module != nullptr) {
@@ -25,7 +25,7 @@ DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
         basalt::platform::set_last_error_from_errno();
         return 0;
     }
-    const std::wstring wide = basalt::platform::wide_from_utf8({link, static_cast<std::size_t>(length)});
+    const std::wstring wide = basalt::platform::wide_from_file_name({link, static_cast<std::size_t>(length)});
     const std::size_t copied = std::min<std::size_t>(wide.size(), size - 1);
     std::copy_n(wide.data(), copied, name);
     name[copied] = L'\0';

@@ -10,7 +10,7 @@
 #include <string>
 
 #include "src/platform/code_page.h"
-#include "src/platform/system_file_name.h"
+#include "src/platform/file_name.h"
 
 namespace {
 
@@ -18,7 +18,8 @@ namespace {
 std::string file_name(const char* path) {
     const std::wstring wide = basalt::platform::widen(path);
     const bool is_text = wide.find(basalt::platform::REPLACEMENT_CHARACTER) == std::wstring::npos;
-    return is_text ? basalt::platform::system_file_name(wide) : path;
+    std::string name;
+    return is_text && basalt::platform::file_name_from_wide(wide, name) ? name : path;
 }
 
 }  // namespace

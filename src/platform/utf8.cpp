@@ -4,6 +4,7 @@
 #include <emmintrin.h>
 #endif
 
+#include <algorithm>
 #include <cstdint>
 #include <cstring>
 
@@ -137,19 +138,30 @@ char* write_utf8(std::wstring_view text, char* bytes) {
     return bytes;
 }
 
-std::wstring wide_from_utf8(std::string_view text) {
-    std::wstring result;
-    result.reserve(text.size());
+std::size_t write_wide(std::string_view text, wchar_t* characters, std::size_t room) {
+    std::size_t count = 0;
     while (!text.empty()) {
         const std::size_t ascii = ascii_prefix(text);
-        result.append(text.begin(), text.begin() + ascii);
+        if (count < room) {
+            std::copy_n(text.begin(), std::min(ascii, room - count), characters + count);
+        }
+        count += ascii;
         text.remove_prefix(ascii);
         while (!text.empty() && static_cast<unsigned char>(text[0]) >= 0x80) {
             const Decoded front = decode_front(text);
-            result.push_back(front.ch);
+            if (count < room) {
+                characters[count] = front.ch;
+            }
+            ++count;
             text.remove_prefix(front.length);
         }
     }
+    return count;
+}
+
+std::wstring wide_from_utf8(std::string_view text) {
+    std::wstring result(text.size(), L'\0');
+    result.resize(write_wide(text, result.data(), result.size()));
     return result;
 }
 

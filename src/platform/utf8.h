@@ -31,6 +31,9 @@ char* write_utf8(std::wstring_view text, char* bytes);
 // Every byte sequence in its character, zeros included; REPLACEMENT_CHARACTER for each byte that belongs to
 // none (overlong forms, surrogates, values beyond 0x10FFFF and a character cut short at the end as well).
 std::wstring wide_from_utf8(std::string_view text);
+// The same into room for some characters: writes those that fit and answers the count of all, which is at
+// most one a byte.
+std::size_t write_wide(std::string_view text, wchar_t* characters, std::size_t room);
 
 }  // namespace basalt::platform
 

@@ -14,7 +14,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
-#include "src/platform/system_file_name.h"
+#include "src/platform/file_name.h"
 
 namespace {
 
@@ -139,19 +139,25 @@ std::optional<Range> open_block(const BoundedFile& file) {
     return block;
 }
 
+// Empty, which opens nothing, for a name that no file has.
+std::string system_name(const wchar_t* file_name) {
+    std::string name;
+    return basalt::platform::file_name_from_wide(file_name, name) ? name : std::string();
+}
+
 }  // namespace
 
 DWORD GetFileVersionInfoSizeW(const wchar_t* file_name, DWORD* handle) {
     if (handle != nullptr) {
         *handle = 0;
     }
-    const BoundedFile file(basalt::platform::system_file_name(file_name));
+    const BoundedFile file(system_name(file_name));
     const std::optional<Range> block = open_block(file);
     return block ? static_cast<DWORD>(block->size) : 0;
 }
 
 BOOL GetFileVersionInfoW(const wchar_t* file_name, DWORD, DWORD length, void* data) {
-    const BoundedFile file(basalt::platform::system_file_name(file_name));
+    const BoundedFile file(system_name(file_name));
     const std::optional<Range> block = open_block(file);
     if (!block) {
         return 0;

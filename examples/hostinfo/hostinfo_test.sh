@@ -1,0 +1,142 @@
+#!/usr/bin/env bash
+# The program from the outside: its facts against what the system's own tools say, and every refusal.
+# Usage: hostinfo_test.sh PROGRAM
+set -u
+program=$(realpath "$1")
+work=$(realpath "$(mktemp -d)")
+trap 'rm -rf "$work"' EXIT
+cd "$work" || exit 1
+export LC_ALL=C.UTF-8
+failures=0
+
+fail() {
+    echo "FAILED: $*"
+    failures=$((failures + 1))
+}
+
+# run ARGUMENT...: output in `out`, messages in `err`, exit code in `code`
+run() {
+    "$program" "$@" >out 2>err
+    code=$?
+}
+
+succeeds() {
+    run "$@"
+    [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
+}
+
+# is NAME EXPECTED: the fact of that name
+is() {
+    local line
+    line=$(grep -- "^  $1  " out || grep -x -- "  $1" out) || fail "no fact '$1'"
+    line=${line#"  $1"}
+    [ "${line#"${line%%[! ]*}"}" = "$2" ] || fail "$1: '$line', expected '$2'"
+}
+
+# refused MESSAGE ARGUMENT...: this one line, nothing on standard output, exit code 2
+refused() {
+    local message=$1
+    shift
+    run "$@"
+    [ $code -eq 2 ] || fail "exit $code, not 2, from $*"
+    [ ! -s out ] || fail "output from $*"
+    [ "$(cat err)" = "hostinfo: $message" ] || fail "$*: $(cat err); expected: $message"
+}
+
+TMPDIR=$work succeeds
+is version "Host information 04.01.02.305"
+is description "What a host program shows in its about box"
+is "operating system" 11
+is handheld 1
+is language 15
+is root ""
+is inbox ""
+is temporary "$work/"
+is path "$program"
+is name "$(basename "$program")"
+is "is file" yes
+
+# Ethernet by the system's own account: no wireless device, in the order of the indexes
+addresses=$(for device in /sys/class/net/*; do
+    [ "$(cat "$device/type")" = 1 ] && [ ! -e "$device/wireless" ] && [ ! -e "$device/phy80211" ] &&
+        echo "$(cat "$device/ifindex") $(tr -d : <"$device/address")"
+done 2>/dev/null | sort -n | cut -d' ' -f2 | paste -sd, | sed 's/,/, /g')
+is "hardware addresses" "$addresses"
+
+TMPDIR='' succeeds --root 'D:\Root' --product='D:\Product\' 'C:\data\survey\job.tar.gz'
+is root 'D:\Root'
+is product 'D:\Product\'
+is inbox 'D:\Product\\Inbox'
+is temporary /tmp/
+is drive C:
+is directory '\data\survey\'
+is name job.tar
+is extension .gz
+is "composed directory" 'C:\data\survey'
+is "composed name" job.tar.gz
+is "is file" no
+is "is directory" no
+is created ""
+
+printf x >"été 日本.txt"
+TZ=UTC touch -a -d '2001-02-03 04:05:06' "été 日本.txt"
+succeeds "$work/été 日本.txt"
+is name "été 日本"
+is "is file" yes
+is "last read" "2001-02-03 04:05:06"
+made=$(TZ=UTC stat -c %w "été 日本.txt")
+[ "$made" = - ] || is created "${made%%.*}"
+mkdir data.d
+succeeds "$work/data.d"
+is "is directory" yes
+is "composed directory" "\\${work#/}\\data"
+LC_ALL=C.UTF-8 succeeds "$(printf 'line\nbreak')"
+is path 'line?break'
+
+# JSON, read back by whoever can
+succeeds --json --root "$(printf 'a"b\\c\td')" 'été 🌍.txt'
+grep -qP '[^\x00-\x7F]' out && fail "JSON is not ASCII"
+if command -v python3 >/dev/null; then
+    python3 - <<'PYTHON' || fail "JSON reads otherwise"
+import json
+facts = json.load(open("out"))
+assert facts["folders"]["root"] == 'a"b\\c\td', facts["folders"]["root"]
+assert facts["path"]["path"] == "\u00e9t\u00e9 \U0001F30D.txt", facts["path"]["path"]
+assert facts["path"]["name"] == "\u00e9t\u00e9 \U0001F30D"
+assert facts["path"]["is file"] is False
+assert facts["system"]["handheld"] == 1
+assert isinstance(facts["network"]["hardware addresses"], list)
+assert [*facts] == ["program", "system", "folders", "network", "path"]
+PYTHON
+fi
+
+# The log: the text, with carriage returns
+succeeds --log host.log "$work/data.d"
+sed 's/$/\r/' out | cmp -s - host.log || fail "the log is not the text"
+succeeds --json --log host.log "$work/data.d"
+grep -q '^  handheld  *1' host.log || fail "the log is not text beside JSON"
+run --log nowhere/host.log
+[ $code -eq 1 ] && [ "$(cat err)" = "hostinfo: cannot write the log nowhere/host.log" ] || fail "no such folder: $(cat err)"
+if [ -w /dev/full ]; then
+    run --log /dev/full
+    [ $code -eq 1 ] || fail "exit $code, not 1, with a log on a full disk"
+    "$program" >/dev/full 2>err
+    [ $? -eq 1 ] || fail "standard output on a full disk is no failure"
+fi
+
+refused "unknown option '--colour' (--help lists them)" --colour
+refused "option --log needs a value" --log
+refused "option --log takes a path, not ''" --log=
+refused "option --root is given twice" --root a --root b
+refused "one path only, but 'b' is a second one" a b
+succeeds -- --json
+is path --json
+succeeds ""
+is "composed directory" '\'
+succeeds --help
+grep -q '^Usage: hostinfo' out || fail "--help shows no usage"
+succeeds --version
+grep -Eq '^hostinfo [0-9]+\.[0-9]+\.[0-9]+$' out || fail "--version shows no version"
+
+[ $failures -eq 0 ] && echo "all passed"
+exit $((failures != 0))

@@ -1,0 +1,83 @@
+// The two character conversions into buffers of exactly their size, in the environment's encoding; and the
+// coders of UTF-8, plain ASCII and, made by localedef in the folder that LOCPATH names, ISO-8859-1 and EUC-KR
+// against the system's own routines. The C library keeps memory for each locale opened from such a folder, so
+// that needs ASAN_OPTIONS=detect_leaks=0.
+#include <locale.h>
+
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <string>
+#include <vector>
+
+#include "basalt/frame.h"
+#include "src/platform/code_page.h"
+
+namespace {
+
+using namespace basalt::platform;
+
+void require(bool holds) {
+    if (!holds) {
+        std::abort();
+    }
+}
+
+// Both directions, cut and emptied as they are, against the whole conversion.
+void check_buffers(const std::string& bytes, const std::wstring& wide, int n) {
+    const auto room = static_cast<std::size_t>(n);
+    std::vector<wchar_t> to_wide(room + 1, L'?');
+    _char2tchar(bytes.c_str(), to_wide.data(), n);
+    const std::string cut(bytes.c_str(), strnlen(bytes.c_str(), room));
+    require(widen(cut) == to_wide.data());
+
+    std::vector<char> to_narrow(room + 1, '?');
+    _tchar2char(wide.c_str(), to_narrow.data(), n);
+    const std::string all = narrow(wide.c_str());
+    require((all.size() <= room ? all : "") == to_narrow.data());
+}
+
+// What comes of any bytes are characters, and those come back.
+void check_code_page(const CodePage& code_page, const std::string& bytes) {
+    const std::wstring wide = code_page.widen(bytes);
+    require(wide.size() <= bytes.size());
+    for (const wchar_t ch : wide) {
+        require(is_unicode_scalar(ch));
+    }
+    std::vector<wchar_t> some(wide.size() / 2);
+    require(code_page.widen_to(bytes, some.data(), some.size()) == wide.size());
+    require(wide.compare(0, some.size(), some.data(), some.size()) == 0);
+    if (wide.find(REPLACEMENT_CHARACTER) == wide.npos) {
+        require(code_page.widen(code_page.narrow(wide)) == wide);
+    }
+}
+
+std::wstring wide_units(const std::uint8_t* data, std::size_t size) {
+    std::wstring wide;
+    for (; size >= 3; data += 3, size -= 3) {
+        wide += static_cast<wchar_t>(data[0] | data[1] << 8 | (data[2] & 0x1F) << 16);
+    }
+    return wide;
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    static const CodePage code_pages[] = {CodePage(nullptr), CodePage("C"), CodePage("ISO-8859-1"),
+                                          CodePage("EUC-KR")};
+    static const locale_t utf8 = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
+    if (size == 0) {
+        return 0;
+    }
+    const std::string bytes(reinterpret_cast<const char*>(data + 1), size - 1);
+    const std::wstring wide = wide_units(data + 1, size - 1);
+    check_buffers(bytes, wide, data[0]);
+    for (const CodePage& code_page : code_pages) {
+        check_code_page(code_page, bytes);
+    }
+    if (utf8 != nullptr) {
+        require(wide_from_utf8(bytes) == widen_by_locale(bytes, utf8));
+        require(utf8_from_wide(wide) == narrow_by_locale(wide, utf8));
+    }
+    return 0;
+}

@@ -1,0 +1,177 @@
+#include <cwchar>
+
+#include "basalt/files.h"
+#include "src/files/handle_scoper.h"
+#include "src/files/path_parts.h"
+#include "src/platform/file.h"
+
+namespace {
+
+using basalt::platform::first_match_attributes;
+using SearchScoper = HANDLEScoperBase<FindFileHandleCloser>;
+
+HANDLE find_first(const CString& path, WIN32_FIND_DATAW& entry) {
+    const HANDLE search = FindFirstFileW(path, &entry);
+    return search != INVALID_HANDLE_VALUE ? search : nullptr;
+}
+
+// A time of the second entry, or of the first where that is the only one. False when there is none.
+bool find_time(const CString& path, FILETIME WIN32_FIND_DATAW::*which, FILETIME& time) {
+    WIN32_FIND_DATAW entry;
+    const SearchScoper search(find_first(path, entry));
+    if (!search.is_open()) {
+        return false;
+    }
+    FindNextFileW(search.get(), &entry);
+    time = entry.*which;
+    return true;
+}
+
+CString joined(const CString& first, const CString& second) {
+    return first + L'\\' + second;
+}
+
+bool is_separator(wchar_t ch) {
+    return ch == L'\\' || ch == L'/';
+}
+
+// Without its first and last separator, cut in place.
+const wchar_t* trimmed(wchar_t* directory) {
+    const std::size_t length = std::wcslen(directory);
+    if (length > 0 && is_separator(directory[length - 1])) {
+        directory[length - 1] = L'\0';
+    }
+    return is_separator(directory[0]) ? directory + 1 : directory;
+}
+
+// In the storage that the text has: half the time of setting a path goes into new storage otherwise.
+void assign(CString& text, const wchar_t* characters) {
+    text.Empty();
+    text += characters;
+}
+
+}  // namespace
+
+namespace vex_util {
+
+CFilePath::CFilePath() = default;
+
+// NOLINTNEXTLINE(modernize-pass-by-value): the published signature
+CFilePath::CFilePath(const CString& path) : m_full_path(path) {
+    split();
+}
+
+CFilePath& CFilePath::operator=(CString& path) {
+    m_full_path = path;
+    split();
+    return *this;
+}
+
+void CFilePath::split() {
+    if (m_full_path.IsEmpty()) {
+        return;
+    }
+    basalt::files::PathParts parts;
+    const bool is_split = parts.split(m_full_path);
+    assign(m_drive, parts.drive);
+    assign(m_directory_only, trimmed(parts.directory));
+    assign(m_file_name_only, parts.name);
+    assign(m_extension, parts.extension[0] == L'.' ? parts.extension + 1 : parts.extension);
+    if (is_split && IsDirectory(m_full_path)) {
+        m_directory_only = joined(m_directory_only, m_file_name_only);
+        m_file_name_only.Empty();
+    }
+}
+
+void CFilePath::Combine(const CString& first, const CString& second) {
+    // Built apart from the members, which the arguments may be.
+    m_full_path = joined(first, second);
+    split();
+}
+
+const CString& CFilePath::Drive() const {
+    return m_drive;
+}
+
+CString CFilePath::Directory() const {
+    return joined(m_drive, m_directory_only);
+}
+
+const CString& CFilePath::DirectoryOnly() const {
+    return m_directory_only;
+}
+
+CString CFilePath::FileName() const {
+    const bool has_both = !m_file_name_only.IsEmpty() && !m_extension.IsEmpty();
+    return has_both ? m_file_name_only + L'.' + m_extension : CString();
+}
+
+const CString& CFilePath::FileNameOnly() const {
+    return m_file_name_only;
+}
+
+const CString& CFilePath::Extension() const {
+    return m_extension;
+}
+
+void CFilePath::SetExtension(const CString& extension) {
+    m_extension = extension;
+    Combine(Directory(), FileName());
+}
+
+bool CFilePath::FileExists() const {
+    return FileExists(m_full_path);
+}
+
+bool CFilePath::IsFile() const {
+    return FileExists();
+}
+
+bool CFilePath::IsDirectory() const {
+    return IsDirectory(m_full_path);
+}
+
+FILETIME CFilePath::GetCreationTime() const {
+    FILETIME time{};
+    GetFileCreationTime(m_full_path, time);
+    return time;
+}
+
+FILETIME CFilePath::GetLastAccessTime() const {
+    FILETIME time{};
+    GetLastAccessTime(m_full_path, time);
+    return time;
+}
+
+bool CFilePath::FileExists(const CString& path) {
+    const DWORD attributes = first_match_attributes(path);
+    return attributes != 0 && (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0;
+}
+
+bool CFilePath::IsDirectory(const CString& path) {
+    return (first_match_attributes(path) & FILE_ATTRIBUTE_DIRECTORY) != 0;
+}
+
+bool CFilePath::GetFileCreationTime(const CString& path, FILETIME& time) {
+    return find_time(path, &WIN32_FIND_DATAW::ftCreationTime, time);
+}
+
+bool CFilePath::GetLastAccessTime(const CString& path, FILETIME& time) {
+    return find_time(path, &WIN32_FIND_DATAW::ftLastAccessTime, time);
+}
+
+// NOLINTNEXTLINE(readability-make-member-function-const): the published signature
+std::vector<CString> CFilePath::GetFilesInDirectory(const CString& pattern) {
+    std::vector<CString> files;
+    const CString directory = Directory();
+    WIN32_FIND_DATAW entry;
+    const SearchScoper search(find_first(joined(directory, pattern), entry));
+    if (search.is_open()) {
+        do {
+            files.push_back(joined(directory, entry.cFileName));
+        } while (FindNextFileW(search.get(), &entry) != 0);
+    }
+    return files;
+}
+
+}  // namespace vex_util

@@ -1,0 +1,233 @@
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cstdint>
+#include <ctime>
+#include <filesystem>
+#include <new>
+#include <set>
+#include <string>
+
+#include "basalt/files.h"
+#include "src/platform/utf8.h"
+#include "tests/files/file_tree.h"
+#include "tests/support/failing_new.h"
+
+namespace {
+
+using basalt::platform::wide_from_utf8;
+using vex_util::CFilePath;
+namespace fs = std::filesystem;
+using FileQueries = FileTree;
+
+TEST_F(FileQueries, files_directories_and_neither) {
+    fs::create_directory(root / "dir");
+    make_file("file.txt");
+    fs::create_symlink("file.txt", root / "to_file");
+    fs::create_symlink("dir", root / "to_dir");
+    fs::create_symlink("nowhere", root / "dangling");
+    fs::create_symlink("circle", root / "circle");
+    ASSERT_EQ(mkfifo((root / "pipe").c_str(), 0600), 0);
+    struct Row {
+        const wchar_t* name;
+        bool file, directory;
+    };
+    for (const Row& row : {
+             Row{L"dir", false, true},         Row{L"file.txt", true, false},
+             Row{L"to_file", true, false},     Row{L"to_dir", false, true},
+             Row{L"dangling", true, false},    Row{L"circle", true, false},
+             Row{L"pipe", true, false},  // opening it would wait for ever
+             Row{L".", false, true},           Row{L"dir\\..\\file.txt", true, false},
+             Row{L"missing", false, false},    Row{L"dir/", false, false},
+             Row{L"dir\\", false, false},      Row{L"file.txt/", false, false},
+             Row{L"file.txt/x", false, false}, Row{L"FILE.TXT", false, false},
+             Row{L"f*", true, false},          Row{L"di?", false, true},
+             Row{L"di??", false, false},       Row{L"*\\file.txt", false, false},
+         }) {
+        EXPECT_EQ(CFilePath::FileExists(at(row.name)), row.file) << row.name;
+        EXPECT_EQ(CFilePath::IsDirectory(at(row.name)), row.directory) << row.name;
+        const CFilePath path(at(row.name));
+        EXPECT_EQ(path.FileExists(), row.file) << row.name;
+        EXPECT_EQ(path.IsFile(), row.file) << row.name;
+        EXPECT_EQ(path.IsDirectory(), row.directory) << row.name;
+    }
+    for (const wchar_t* const nothing : {L"", L"/", L"\\", L"C:", L"C:\\", L"C:\\x"}) {
+        EXPECT_FALSE(CFilePath::FileExists(nothing)) << nothing;
+        EXPECT_FALSE(CFilePath::IsDirectory(nothing)) << nothing;
+    }
+}
+
+std::int64_t ticks(const FILETIME& time) {
+    return static_cast<std::int64_t>(std::uint64_t{time.dwHighDateTime} << 32 | time.dwLowDateTime);
+}
+
+constexpr std::int64_t UNIX_EPOCH = 116'444'736'000'000'000;  // 1970-01-01, as published
+
+// Below the coarse clock that file systems stamp with.
+std::int64_t ticks_now(clockid_t clock) {
+    timespec now{};
+    clock_gettime(clock, &now);
+    return UNIX_EPOCH + now.tv_sec * 10'000'000 + now.tv_nsec / 100;
+}
+
+TEST_F(FileQueries, creation_and_last_access) {
+    const std::int64_t before = ticks_now(CLOCK_REALTIME_COARSE);
+    make_file("job.txt");
+    const std::int64_t after = ticks_now(CLOCK_REALTIME);
+    struct Row {
+        timespec access;
+        std::int64_t expected;
+    };
+    for (const Row& row :
+         {Row{{0, 0}, UNIX_EPOCH}, Row{{1'000'000'000, 123'456'789}, 126'444'736'001'234'567},
+          Row{{-2, 500'000'000}, UNIX_EPOCH - 15'000'000}}) {
+        const timespec times[] = {row.access, {86'400, 0}};  // what is old may have been made today
+        ASSERT_EQ(utimensat(AT_FDCWD, (root / "job.txt").c_str(), times, 0), 0);
+        const CFilePath path(at(L"job.txt"));
+        EXPECT_EQ(ticks(path.GetLastAccessTime()), row.expected);
+        FILETIME time{};
+        EXPECT_TRUE(CFilePath::GetLastAccessTime(at(L"job.txt"), time));
+        EXPECT_EQ(ticks(time), row.expected);
+        EXPECT_TRUE(CFilePath::GetFileCreationTime(at(L"job.txt"), time));
+        EXPECT_EQ(ticks(time), ticks(path.GetCreationTime()));
+        EXPECT_GE(ticks(time), before);
+    }
+    struct statx status {};
+    ASSERT_EQ(statx(AT_FDCWD, (root / "job.txt").c_str(), 0, STATX_BTIME, &status), 0);
+    if ((status.stx_mask & STATX_BTIME) != 0) {  // otherwise the time of the last change
+        EXPECT_LE(ticks(CFilePath(at(L"job.txt")).GetCreationTime()), after);
+    }
+}
+
+TEST_F(FileQueries, no_time_without_an_entry) {
+    for (const wchar_t* const name : {L"missing", L"", L"job*"}) {
+        FILETIME time{1, 2};
+        EXPECT_FALSE(CFilePath::GetFileCreationTime(at(name), time));
+        EXPECT_FALSE(CFilePath::GetLastAccessTime(at(name), time));
+        EXPECT_EQ(ticks(time), 0x200000001);
+        EXPECT_EQ(ticks(CFilePath(at(name)).GetCreationTime()), 0);
+        EXPECT_EQ(ticks(CFilePath(at(name)).GetLastAccessTime()), 0);
+    }
+}
+
+TEST_F(FileQueries, wildcards_test_the_first_match_and_time_the_second) {
+    for (int i = 0; i < 5; ++i) {
+        const std::string name = "job" + std::to_string(i);
+        make_file(name);
+        const timespec times[] = {{1000 + i, 0}, {0, 0}};
+        ASSERT_EQ(utimensat(AT_FDCWD, (root / name).c_str(), times, 0), 0);
+    }
+    CFilePath folder(text(wide_root));
+    const std::vector<CString> matches = folder.GetFilesInDirectory(L"job*");
+    ASSERT_EQ(matches.size(), 5U);
+    const CFilePath pattern(at(L"job*"));
+    EXPECT_EQ(ticks(pattern.GetLastAccessTime()), ticks(CFilePath(matches[1]).GetLastAccessTime()));
+    EXPECT_NE(ticks(pattern.GetLastAccessTime()), ticks(CFilePath(matches[0]).GetLastAccessTime()));
+    EXPECT_EQ(ticks(CFilePath(at(L"job3*")).GetLastAccessTime()), UNIX_EPOCH + 1003 * 10'000'000LL);
+}
+
+const std::string LONG_NAME(255, 'n');
+
+TEST_F(FileQueries, lists_odd_names_and_finds_each_again) {
+    const std::set<std::string> names = {
+        " leading",
+        "trailing ",
+        "trailing.",
+        "...",
+        "..x",
+        ".hidden",
+        "two words.txt",
+        "%s%n.txt",
+        "[a]",
+        "a\nb",
+        "\xC3\xA9t\xC3\xA9.txt",
+        "\xE6\x97\xA5\xE6\x9C\xAC",
+        "\xF0\x9F\x8C\x8D.gz",
+        "latin\xE9.txt",
+        LONG_NAME,
+    };
+    for (const std::string& name : names) {
+        make_file(name);
+    }
+    fs::create_directory(root / "dir.d");
+    CFilePath folder(text(wide_root));
+    ASSERT_TRUE(folder.IsDirectory());
+    std::multiset<std::wstring> found;
+    for (const CString& path : folder.GetFilesInDirectory(L"*")) {
+        EXPECT_EQ(path.Left(folder.Directory().GetLength()), folder.Directory());
+        const std::wstring name = path.Mid(folder.Directory().GetLength() + 1).GetString();
+        found.insert(name);
+        const bool is_directory = name == L"." || name == L".." || name == L"dir.d";
+        EXPECT_EQ(CFilePath::IsDirectory(path), is_directory) << name;
+        EXPECT_EQ(CFilePath(path).FileExists(), !is_directory) << name;
+    }
+    std::multiset<std::wstring> expected = {L".", L"..", L"dir.d", L"latin\xDCE9.txt"};
+    for (const std::string& name : names) {
+        if (name != "latin\xE9.txt") {
+            expected.insert(wide_from_utf8(name));
+        }
+    }
+    EXPECT_EQ(found, expected);
+
+    CFilePath file(at(L"no such job.txt"));  // the listing is of the folder, whether the file is there or not
+    EXPECT_EQ(file.GetFilesInDirectory(L"*").size(), expected.size());
+    EXPECT_EQ(file.GetFilesInDirectory(L"*.*").size(), expected.size());
+    EXPECT_EQ(file.GetFilesInDirectory(L"*.txt").size(), 4U);
+    EXPECT_EQ(file.GetFilesInDirectory(L"[a]"), std::vector{file.Directory() + L"\\[a]"});
+    EXPECT_EQ(file.GetFilesInDirectory(L"?t?.t*t"), std::vector{file.Directory() + L"\\été.txt"});
+    EXPECT_TRUE(file.GetFilesInDirectory(L"*.none").empty());
+    EXPECT_TRUE(file.GetFilesInDirectory(L"").empty());
+    EXPECT_TRUE(CFilePath(at(L"missing/job.txt")).GetFilesInDirectory(L"*").empty());
+}
+
+TEST_F(FileQueries, folders_without_permission) {
+    fs::create_directory(root / "closed");
+    make_file("closed/file");
+    const auto check = [&] {
+        chmod((root / "closed").c_str(), 0);
+        if (geteuid() == 0 && (chmod(root.c_str(), 0755) != 0 || seteuid(65'534) != 0)) {
+            std::_Exit(2);
+        }
+        EXPECT_TRUE(CFilePath::IsDirectory(at(L"closed")));
+        EXPECT_FALSE(CFilePath::FileExists(at(L"closed/file")));
+        EXPECT_TRUE(CFilePath(at(L"closed")).GetFilesInDirectory(L"*").empty());
+        std::_Exit(testing::Test::HasFailure() ? 1 : 0);
+    };
+    GTEST_FLAG_SET(death_test_style, "fast");
+    EXPECT_EXIT(check(), testing::ExitedWithCode(0), "");
+    fs::permissions(root / "closed", fs::perms::owner_all);
+}
+
+std::ptrdiff_t open_descriptors() {
+    return std::distance(fs::directory_iterator("/proc/self/fd"), fs::directory_iterator());
+}
+
+TEST_F(FileQueries, nothing_leaks_when_memory_runs_out) {
+    for (int i = 0; i < 10; ++i) {
+        make_file("a rather long name for a job " + std::to_string(i));
+    }
+    CFilePath folder(text(wide_root));
+    const CString pattern = L"*job*";
+    const std::ptrdiff_t descriptors = open_descriptors();
+    const long allocations = live_allocations();
+    bool fired = true;
+    std::size_t listed = 0;
+    for (long nth = 1; fired; ++nth) {
+        {
+            const FailAllocation failure(nth);
+            try {
+                listed = folder.GetFilesInDirectory(pattern).size();
+            } catch (const std::bad_alloc&) {
+                listed = 0;
+            }
+            fired = failure.fired();
+        }
+        ASSERT_EQ(live_allocations(), allocations) << nth;
+        ASSERT_EQ(open_descriptors(), descriptors) << nth;
+    }
+    EXPECT_EQ(listed, 10U);
+}
+
+}  // namespace

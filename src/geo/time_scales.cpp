@@ -100,7 +100,7 @@ Date near_date_of(std::uint32_t mjd) {
     const std::uint32_t day_of_year = static_cast<std::uint32_t>(in_century) / YEAR / 4;
     const std::uint32_t of_months = MONTH * day_of_year + 197913;
     const std::uint32_t turn = day_of_year >= DAYS_FROM_MARCH_TO_JANUARY ? 1 : 0;
-    return {static_cast<std::uint16_t>(100 * century + (in_century >> 32) + turn),
+    return {static_cast<std::uint16_t>(100 * century + static_cast<std::uint32_t>(in_century >> 32) + turn),
             static_cast<std::uint16_t>((of_months >> 16) - 12 * turn),
             static_cast<std::uint16_t>((of_months & 0xFFFF) / MONTH + 1)};
 }

@@ -5,6 +5,7 @@
 
 #include "basalt/frame.h"
 #include "basalt/geo.h"
+#include "basalt/graphics.h"
 #include "basalt/memory.h"
 #include "basalt/platform.h"
 #include "basalt/sparse.h"

@@ -2,14 +2,9 @@
 
 #include <basalt/version.h>
 
-#include <cerrno>
 #include <chrono>
-#include <cstdio>
-#include <exception>
 #include <memory>
-#include <new>
 #include <string>
-#include <system_error>
 #include <vector>
 
 #include "boundary_reader.h"
@@ -17,6 +12,7 @@
 #include "input_error.h"
 #include "options.h"
 #include "process.h"
+#include "program.h"
 #include "report.h"
 #include "survey.h"
 #include "synthetic_terrain.h"
@@ -25,8 +21,6 @@
 #include "work_area.h"
 
 namespace {
-
-enum ExitCode { SUCCESS = 0, FAILURE = 1, BAD_INPUT = 2 };
 
 std::unique_ptr<TerrainSource> open_terrain(const Options& options) {
     if (options.synthetic) {
@@ -98,30 +92,8 @@ std::string run(const std::vector<std::string>& arguments) {
     return measure(options);
 }
 
-int complain(const std::string& message, ExitCode code) {
-    std::fprintf(stderr, "workarea: %s\n", message.c_str());
-    return code;
-}
-
-/// A full disk shows only when the buffer is flushed.
-int print(const std::string& text) {
-    if (std::fwrite(text.data(), 1, text.size(), stdout) != text.size() || std::fflush(stdout) != 0) {
-        return complain("cannot write to standard output: " + std::generic_category().message(errno),
-                        FAILURE);
-    }
-    return SUCCESS;
-}
-
 }  // namespace
 
 int main(int count, char** arguments) {
-    try {
-        return print(run(std::vector<std::string>(arguments + (count > 0 ? 1 : 0), arguments + count)));
-    } catch (const InputError& error) {
-        return complain(error.what(), BAD_INPUT);
-    } catch (const std::bad_alloc&) {
-        return complain("out of memory", FAILURE);
-    } catch (const std::exception& error) {
-        return complain(error.what(), FAILURE);
-    }
+    return run_program("workarea", run, count, arguments);
 }

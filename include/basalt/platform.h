@@ -4,6 +4,7 @@
 #define BASALT_PLATFORM_H
 
 #include "basalt/platform/bitmap.h"
+#include "basalt/platform/automation_date.h"
 #include "basalt/platform/calendar.h"
 #include "basalt/platform/cstring.h"
 #include "basalt/platform/device_context.h"

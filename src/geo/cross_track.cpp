@@ -1,5 +1,6 @@
 #include "src/geo/cross_track.h"
 
+#include <algorithm>
 #include <cmath>
 #include <limits>
 
@@ -16,7 +17,10 @@ constexpr int MOST_PASSES = 100;
 /// Closer than this the point is on the line; metres.
 constexpr double ON_THE_LINE = 1e-6;
 /// What the coordinates of a foot resolve, metres.
-constexpr double FINEST_STEP = 1e-9;
+constexpr double FINEST_STEP = 5e-9;
+/// How far from where the search by steps would end the foot may be, metres: the distance changes by 0.4 % of
+/// it, what ellipsoid and sphere differ by.
+constexpr double FOOT_TOLERANCE = 5e-5;
 
 /// The point as it is seen from a place on the line, on the sphere: all without an angle.
 struct Sight {
@@ -25,8 +29,8 @@ struct Sight {
     double cosine;    ///< of the distance
     double distance;  ///< its sine, which is the length of (ahead, right)
 
-    /// How far from square: the sine of the angle that is left.
-    double skew() const { return std::abs(ahead) / distance; }
+    /// Cosine of the angle between line and sight: 0 at the foot, positive before it.
+    double skew() const { return ahead / distance; }
 };
 
 class Target {
@@ -57,6 +61,20 @@ private:
     double m_longitude;
 };
 
+/// The skews a search may end with: within `width` of `aim`. A search by small steps ends as soon as the skew
+/// is below the tolerance, on the side it came from. A long sight turns that into a foot some way short of
+/// square, so this is where to end; a short one leaves the whole tolerance, and below 1 cm what rounding
+/// resolves.
+struct Goal {
+    double aim;
+    double width;
+
+    Goal(double distance, double side)
+        : width(std::max(std::min(RAY_TOLERANCE, FOOT_TOLERANCE / distance), FINEST_STEP / distance)) {
+        aim = std::copysign(std::max(RAY_TOLERANCE - width, 0.0), side);
+    }
+};
+
 }  // namespace
 
 double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& passes) {
@@ -65,43 +83,49 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
         std::cos(geo_grid_divergence(bearing, geo_vincenty_bearing(a, p))) * geo_vincenty_distance(a, p);
     const GeodesicLine line(a.latitude, bearing);
     const Target target(p);
-    LineEnd best_foot = {};
-    Sight best = {};
-    double best_skew = std::numeric_limits<double>::infinity();
-    // The foot lies between the last place that has the point ahead and the first that has it behind.
+    LineEnd best_foot = line.at(along);
+    Sight best = target.seen_from(best_foot, a.longitude);
+    double best_miss = std::numeric_limits<double>::infinity();
+    const double side = best.ahead;
+    // Places between which the foot lies: the point is ahead of the first, behind the second.
     double low = -std::numeric_limits<double>::infinity();
     double high = std::numeric_limits<double>::infinity();
-    for (passes = 1; passes <= MOST_PASSES; ++passes) {
-        const LineEnd foot = line.at(along);
-        const Sight sight = target.seen_from(foot, a.longitude);
+    LineEnd foot = best_foot;
+    Sight sight = best;
+    for (passes = 1;; ++passes) {
         if (sight.distance * SPHERE_RADIUS < ON_THE_LINE && sight.cosine > 0.0) {
             return 0.0;
         }
-        const double skew = sight.skew();
-        // Not "skew < best_skew": NaN is taken too, and ends the search.
-        if (!(skew >= best_skew)) {
+        const Goal goal(sight.distance * SPHERE_RADIUS, side);
+        const double miss = std::abs(sight.skew() - goal.aim);
+        if (miss < best_miss) {
             best_foot = foot;
             best = sight;
-            best_skew = skew;
+            best_miss = miss;
         }
-        if (!(skew >= RAY_TOLERANCE)) {
+        // Not "miss < width": NaN ends the search too.
+        const bool square_at_once = passes == 1 && std::abs(sight.skew()) < RAY_TOLERANCE;
+        if (square_at_once || !(miss >= goal.width) || passes == MOST_PASSES) {
             break;
         }
-        (sight.ahead > 0.0 ? low : high) = along;
-        // Napier's rule gives the foot of a great circle, whose miss is what ellipsoid and sphere differ by:
-        // a hundredth or less is left after each pass.
-        along += SPHERE_RADIUS * std::atan2(sight.ahead, sight.cosine);
+        (sight.skew() > goal.aim ? low : high) = along;
+        // Napier's rule for the legs of a right-angled triangle gives the foot on a great circle; a geodesic
+        // of the ellipsoid leaves a hundredth of the way or less to the next pass.
+        along += SPHERE_RADIUS * (std::atan2(sight.ahead, sight.cosine) -
+                                  std::atan2(goal.aim * sight.distance, std::abs(sight.cosine)));
         if (!(along > low && along < high)) {
             along = low + (high - low) / 2.0;
         }
-        // Nothing is left to halve, or the step was lost in rounding before the foot was enclosed.
+        // Not finite: the step was lost in rounding before the foot was enclosed.
         if (!(high - low > FINEST_STEP) || !std::isfinite(along)) {
             break;
         }
+        foot = line.at(along);
+        sight = target.seen_from(foot, a.longitude);
     }
-    const geo_llh foot = {std::atan2(best_foot.latitude_sine, best_foot.latitude_cosine),
-                          a.longitude + best_foot.longitude_change, 0.0};
-    const double distance = geo_vincenty_distance(foot, p);
+    const geo_llh end = {std::atan2(best_foot.latitude_sine, best_foot.latitude_cosine),
+                         a.longitude + best_foot.longitude_change, 0.0};
+    const double distance = geo_vincenty_distance(end, p);
     return best.right >= 0.0 ? -distance : distance;
 }
 

@@ -40,29 +40,26 @@ GeodesicLine::GeodesicLine(double latitude, double azimuth)
     m_cos_2sigma1 = (m_cos_azimuth - m_tan_u) * (m_cos_azimuth + m_tan_u) / length2;
 }
 
-/// Vincenty's iteration for the arc, from its first value. The sine and cosines left are those the last pass
-/// began with. False when a change comes within `closeness` of what decides.
-template <typename CosineOfMiddle>
-bool GeodesicLine::settle(double first, double closeness, const CosineOfMiddle& cos_2m, Arc& arc) const {
-    const auto set = [&](double sigma) {
-        const double sine = std::sin(sigma);
-        const double cosine = std::cos(sigma);
-        arc = {sigma, sine, cosine, cos_2m(sigma, sine, cosine)};
-    };
-    set(first);
+/// Vincenty's iteration for the arc, from its first value. `directions` sets sine and cosines for an arc some
+/// way beyond the first; those left are what the last pass began with. False when a change comes within
+/// `closeness` of what decides.
+template <typename Directions>
+bool GeodesicLine::settle(double first, double closeness, const Directions& directions, Arc& arc) const {
+    double beyond = 0.0;
+    arc.sigma = first;
+    directions(beyond, arc);
     double change = std::abs(first - TWO_PI);
     for (int pass = 0; change > SETTLED && pass < MOST_PASSES; ++pass) {
         if (pass > 0) {
-            set(arc.sigma);
+            directions(beyond, arc);
         }
         const double c = arc.cos_2m;
-        const double delta =
-            m_b * arc.sine *
-            (c + m_b / 4.0 *
-                     (arc.cosine * (2.0 * c * c - 1.0) -
-                      m_b / 6.0 * c * (4.0 * arc.sine * arc.sine - 3.0) * (4.0 * c * c - 3.0)));
+        beyond = m_b * arc.sine *
+                 (c + m_b / 4.0 *
+                          (arc.cosine * (2.0 * c * c - 1.0) -
+                           m_b / 6.0 * c * (4.0 * arc.sine * arc.sine - 3.0) * (4.0 * c * c - 3.0)));
         const double previous = arc.sigma;
-        arc.sigma = first + delta;
+        arc.sigma = first + beyond;
         change = std::abs(arc.sigma - previous);
         if (std::abs(change - SETTLED) <= closeness) {
             return false;
@@ -74,16 +71,28 @@ bool GeodesicLine::settle(double first, double closeness, const CosineOfMiddle& 
 LineEnd GeodesicLine::at(double distance) const {
     const double first = distance / m_metres_per_radian;
     Arc arc = {};
-    // By the addition theorem the middle needs no cosine of its own. It moves sigma by a few units in the
-    // last place; where that could change the count of passes, the arc is settled again as the books have it.
-    const double rounding = 1e-15 * (1.0 + std::abs(first));
-    const auto by_addition = [this](double, double sine, double cosine) {
-        return m_cos_2sigma1 * cosine - m_sin_2sigma1 * sine;
+    // The passes turn by less than 0.002: a few terms of the series turn the first sine and cosine to the
+    // last place, and the addition theorem gives the middle. This may move sigma by some units in the last
+    // place; where that could change the count of passes, the arc is settled again as the books have it.
+    const double rounding = 2e-15 * (1.0 + std::abs(first));
+    const double first_sine = std::sin(first);
+    const double first_cosine = std::cos(first);
+    const auto by_addition = [&](double d, Arc& at) {
+        const double d2 = d * d;
+        const double sine = d - d * d2 * (1.0 / 6.0 - d2 / 120.0);
+        const double versine = d2 * (0.5 - d2 * (1.0 / 24.0 - d2 / 720.0));
+        at.sine = first_sine + (first_cosine * sine - first_sine * versine);
+        at.cosine = first_cosine - (first_sine * sine + first_cosine * versine);
+        at.cos_2m = m_cos_2sigma1 * at.cosine - m_sin_2sigma1 * at.sine;
     };
     if (!settle(first, rounding, by_addition, arc)) {
         const double sigma1 = std::atan2(m_tan_u, m_cos_azimuth);
-        settle(
-            first, -1.0, [&](double sigma, double, double) { return std::cos(2.0 * sigma1 + sigma); }, arc);
+        const auto plainly = [&](double, Arc& at) {
+            at.sine = std::sin(at.sigma);
+            at.cosine = std::cos(at.sigma);
+            at.cos_2m = std::cos(2.0 * sigma1 + at.sigma);
+        };
+        settle(first, -1.0, plainly, arc);
     }
     const double t = m_sin_u * arc.sine - m_cos_u * arc.cosine * m_cos_azimuth;
     const double lambda =

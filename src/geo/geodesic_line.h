@@ -25,8 +25,8 @@ private:
     struct Arc {
         double sigma, sine, cosine, cos_2m;
     };
-    template <typename CosineOfMiddle>
-    bool settle(double first, double closeness, const CosineOfMiddle& cos_2m, Arc& arc) const;
+    template <typename Directions>
+    bool settle(double first, double closeness, const Directions& directions, Arc& arc) const;
 
     double m_sin_azimuth, m_cos_azimuth;
     double m_tan_u, m_sin_u, m_cos_u;

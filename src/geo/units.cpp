@@ -33,12 +33,11 @@ Integer whole_part(double value) {
     return std::isnan(value) ? 0 : static_cast<Integer>(value);
 }
 
-/// Numerator of the fraction of an inch, rounded to the nearest 1 / denominator.
+/// Numerator of the fraction of an inch, rounded to the nearest 1 / denominator. The remainder of doubles is
+/// exact, so no integer has to hold all the parts of a length.
 int fraction_numerator(double inches, int denominator) {
-    if (denominator == -1) {
-        return 0;  // the smallest number there is has no remainder by -1: the division traps
-    }
-    return static_cast<int>(whole_part<std::int64_t>(denominator * inches + 0.5) % denominator);
+    const double rest = std::fmod(std::trunc(denominator * inches + 0.5), denominator);
+    return std::isnan(rest) ? 0 : static_cast<int>(rest);
 }
 
 bool is_even(int value) {

@@ -103,4 +103,38 @@ TEST(ExactResults, AreTheSameOnEveryCompiler) {
     EXPECT_EQ(library.value(), 8501370816125177454U);
 }
 
+TEST(ExactResults, OfCurvesAreTheSameOnEveryCompiler) {
+    plain::Random random(2);
+    Fold library;
+    Fold formulas;
+    for (int round = 0; round < 4000; ++round) {
+        // Some arcs stand off their chord by more than the radius, some spirals are too long for K.
+        const double radius = random.real(5.0, 300.0);
+        const double separation = random.real(0.0, 50.0);
+        const double length = random.real(-20.0, 200.0);
+        const double k = radius * 40.0;
+        double x = 0.0;
+        double y = 0.0;
+
+        library.add(geo_arc_angle_to_length(length / 30.0, radius));
+        library.add(geo_arc_length_to_angle(length, radius));
+        library.add(geo_arc_to_chord(radius, separation));
+        library.add(geo_spiral_deflection(length, k));
+        geo_spiral_deltas(length, k, 1e-9, x, y);
+        library.add(x);
+        library.add(y);
+
+        formulas.add(length / 30.0 * radius);
+        formulas.add(length / radius);
+        formulas.add(separation >= radius ? 2.0 * radius
+                                          : std::sqrt(2.0 * radius * separation - separation * separation));
+        formulas.add(length < 0.0 ? 0.0 : length * length / k);
+        plain::spiral_deltas(length, k, 1e-9, x, y);
+        formulas.add(x);
+        formulas.add(y);
+        ASSERT_EQ(library.value(), formulas.value()) << round;
+    }
+    EXPECT_EQ(library.value(), 14889729433225187223U);
+}
+
 }  // namespace

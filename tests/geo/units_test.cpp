@@ -122,7 +122,10 @@ TEST(FeetAndInches, ComeBackWithinHalfAFraction) {
 }
 
 TEST(FeetAndInches, StopAtTheLargestInteger) {
-    EXPECT_EQ(feet_of(1e300, 16).feet, 2147483647);
+    for (const double metres : {1e18, 1e300, INF}) {
+        EXPECT_EQ(feet_of(metres, 16).feet, 2147483647);
+        expect_fraction(feet_of(metres, 16), 0, 0);  // whole inches as doubles
+    }
     EXPECT_EQ(feet_of(6e8, 16).feet, 1968500000);  // more inches than an integer holds
     EXPECT_EQ(feet_of(NOT_A_NUMBER, 16).feet, 0);
     EXPECT_FALSE(feet_of(NOT_A_NUMBER, 16).positive);

@@ -62,8 +62,9 @@ BASALT_API double _gps2mjd(std::uint16_t week, double secondsOfWeek);
 BASALT_API std::uint64_t _systime2javatime(SYSTEMTIME* time);
 
 /// Calendar time of milliseconds since 1970-01-01 00:00.
-/// @param milliseconds the count; one of _systime2javatime() for a time before 1970 comes back within a
-/// millisecond below
+/// @param milliseconds the count, taken modulo 2^64 as a count of ticks: one of _systime2javatime() for a time
+/// before 1970 comes back within a millisecond below, and 2^64 - 1, its answer to no time, as the last
+/// millisecond of 1969
 /// @param[out] time UTC with its day of the week, not null
 /// @return time
 ///

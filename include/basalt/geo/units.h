@@ -41,8 +41,8 @@ BASALT_API void _dmstorad(int degrees, int minutes, double seconds, double* radi
 /// @param[out] numerator numerator of the fraction, halved with the denominator while both are even
 /// @param[out] denominator denominator of the fraction; 0 when the numerator is 0
 ///
-/// Bad input: lengths beyond 2147483647 feet give that many; NaN and infinities give NaN inches, and feet of
-/// 0 and 2147483647. A negative denominator gives a fraction that means nothing.
+/// Bad input: lengths beyond 2147483647 feet give that many; NaN and infinities give no fraction, NaN inches,
+/// and feet of 0 and 2147483647. A negative denominator gives a fraction that means nothing.
 BASALT_API void _mtoftin(double metres, int fractionDenominator, bool* positive, int* feet, double* inches,
                          int* numerator, int* denominator);
 

@@ -1,6 +1,6 @@
 // Numbers from text the same way in every locale.
-#ifndef WORKAREA_NUMBER_PARSING_H
-#define WORKAREA_NUMBER_PARSING_H
+#ifndef EXAMPLES_NUMBER_PARSING_H
+#define EXAMPLES_NUMBER_PARSING_H
 
 #include <charconv>
 #include <cmath>

@@ -1,6 +1,6 @@
-// Numbers as the report prints them.
-#ifndef WORKAREA_NUMBER_TEXT_H
-#define WORKAREA_NUMBER_TEXT_H
+// Numbers as reports print them.
+#ifndef EXAMPLES_NUMBER_TEXT_H
+#define EXAMPLES_NUMBER_TEXT_H
 
 #include <cstdint>
 #include <string>
@@ -9,5 +9,8 @@
 /// `-0`.
 std::string number_text(double value, int decimals);
 std::string number_text(std::int64_t value);
+
+/// As number_text, without the commas: for columns that are read by machines too.
+std::string fixed_text(double value, int decimals);
 
 #endif

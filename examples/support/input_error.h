@@ -1,6 +1,6 @@
 // Bad input, said in one line that names where it stands.
-#ifndef WORKAREA_INPUT_ERROR_H
-#define WORKAREA_INPUT_ERROR_H
+#ifndef EXAMPLES_INPUT_ERROR_H
+#define EXAMPLES_INPUT_ERROR_H
 
 #include <cstddef>
 #include <stdexcept>

@@ -15,19 +15,30 @@ std::string grouped(std::string digits) {
     return digits;
 }
 
-}  // namespace
-
-std::string number_text(double value, int decimals) {
+std::string unsigned_text(double value, int decimals) {
     char text[400];  // the largest double has 309 digits
     const auto result =
         std::to_chars(text, text + sizeof text, std::abs(value), std::chars_format::fixed, decimals);
-    const std::string digits(text, result.ptr);
+    return {text, result.ptr};
+}
+
+std::string sign_of(double value, const std::string& digits) {
     const bool zero = digits.find_first_not_of("0.") == std::string::npos;
-    std::string signed_digits(value < 0.0 && !zero ? "-" : "");
-    signed_digits += grouped(digits);
-    return signed_digits;
+    return value < 0.0 && !zero ? "-" : "";
+}
+
+}  // namespace
+
+std::string number_text(double value, int decimals) {
+    const std::string digits = unsigned_text(value, decimals);
+    return sign_of(value, digits) + grouped(digits);
 }
 
 std::string number_text(std::int64_t value) {
     return number_text(static_cast<double>(value), 0);
+}
+
+std::string fixed_text(double value, int decimals) {
+    const std::string digits = unsigned_text(value, decimals);
+    return sign_of(value, digits) + digits;
 }

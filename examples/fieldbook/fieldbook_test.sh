@@ -1,0 +1,283 @@
+#!/usr/bin/env bash
+# The program from the outside: known errors found again, points against what awk makes of them, every refusal.
+# Usage: fieldbook_test.sh PROGRAM DATA_DIRECTORY
+awk() { LC_ALL=C command awk "$@"; }
+set -u
+program=$(realpath "$1")
+data=$(realpath "$2")
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+cd "$work" || exit 1
+cp "$data"/fieldbook.csv book.csv
+cp "$data"/axis.csv axis.csv
+failures=0
+
+fail() {
+    echo "FAILED: $*"
+    failures=$((failures + 1))
+}
+
+# run ARGUMENT...: report in `out`, messages in `err`, exit code in `code`
+run() {
+    "$program" "$@" >out 2>err
+    code=$?
+}
+
+succeeds() {
+    run "$@"
+    [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
+}
+
+# shows LINE: the report has this line, runs of blanks counting as one
+shows() {
+    sed 's/  */ /g; s/^ //' out | grep -qxF -- "$1" || fail "no line '$1'"
+}
+
+# near WHAT ACTUAL EXPECTED TOLERANCE
+near() {
+    awk -v a="$2" -v b="$3" -v t="$4" 'BEGIN { exit !(a != "" && a - b <= t && b - a <= t) }' || fail "$1: $2, expected $3"
+}
+
+# refused MESSAGE ARGUMENT...: one line that says so, nothing on standard output, exit code 2
+refused() {
+    local message=$1
+    shift
+    run "$@"
+    [ $code -eq 2 ] || fail "exit $code, not 2, from $*"
+    [ ! -s out ] || fail "output from $*"
+    [ "$(cat err)" = "fieldbook: $message" ] || fail "$*: $(cat err); expected: $message"
+}
+
+# The errors that were put into the sample.
+succeeds book.csv --alignment axis.csv --wgs84 K1,47.5,8.5,450 --csv points.csv
+shows 'Mean collimation 4.0 "'
+shows 'Mean index -6.0 "'
+shows 'Angular misclosure 10.0 " taken out as -2.0 " an angle'
+shows 'Linear misclosure 0.0300 m north 0.0180, east 0.0240; taken out by the compass rule'
+shows 'Height misclosure 0.0060 m'
+shows 'T2 T3 109-21-32.4 156.8694 3.3560 0.1 12.0'
+near "bearing of the axis' end" "$(awk '/End misclosure/ { print $(NF - 1) }' out)" 0 0.05
+near "axis misclosure north" "$(awk '/End misclosure/ { print $6 + 0 }' out)" 0.009 0.0001001
+near "axis misclosure east" "$(awk '/End misclosure/ { print $8 + 0 }' out)" 0.012 0.0001001
+
+# Every station is off its true place by the errors before it, less its share of the misclosure; a side sight also
+# by the turn of its back sight.
+awk -F, 'function off(a, b) { return a > b ? a - b : b - a }
+    FNR == 1 { next }
+    NR == FNR { n[$1] = $2; e[$1] = $3; h[$1] = $4; next }
+    $1 == "axis" { next }
+    {
+        k = split("K1 T1 T2 T3 K3", route, " "); split("0 0 1 1 1", distance, " "); split("0 0 0 1 1", rise, " ")
+        sum = 0; for (i = 2; i <= k; i++)
+            reached[route[i]] = sum += sqrt((n[route[i]] - n[route[i-1]])^2 + (e[route[i]] - e[route[i-1]])^2)
+        for (i = 1; i <= k; i++) if (route[i] == $2) {
+            part = reached[$2] / sum; found++
+            if (off($3 - n[$2], .018 * (distance[i] - part)) > .0003 || off($4 - e[$2], .024 * (distance[i] - part)) > .0003 ||
+                off($5 - h[$2], .006 * (rise[i] - part)) > .0003) print "station " $0
+        }
+        if ($1 == "side") { found++; if (off($3, n[$2]) > .02 || off($4, e[$2]) > .02 || off($5, h[$2]) > .004) print "side " $0 }
+    }
+    END { if (found != 9) print found " stations and side sights, not 9" }' "$data"/fieldbook_truth.csv points.csv >wrong
+[ ! -s wrong ] || fail "$(cat wrong)"
+
+# The axis: multiples of the interval, the circle, chords within the sagitta, observations that lead to the points.
+awk -F, 'function off(a, b) { return a > b ? a - b : b - a }
+    BEGIN { pi = atan2(0, -1); degree = pi / 180 }
+    $1 != "axis" { n[$2] = $3; e[$2] = $4; h[$2] = $5; next }
+    {
+        if ($2 % 20 == 0) multiples++
+        if ($2 == 1160) { cn = $3 - 180 * sin($6 * degree); ce = $4 + 180 * cos($6 * degree) }
+        if ($2 >= 1160 && $2 <= 1280 && off(sqrt(($3 - cn)^2 + ($4 - ce)^2), 180) > .0003) print "off the circle: " $0
+        if ($2 > 1100 && $2 <= 1340) { # no flatter than at the bent end of each chord
+            radius = $2 <= 1160 ? 10800 / ($2 - 1100) : $2 <= 1280 ? 180 : 10800 / (1340 - last)
+            sagitta = radius - sqrt(radius^2 - (($3 - north)^2 + ($4 - east)^2) / 4)
+            if (sagitta > .0101 || off(sagitta, $7) > .0002) print "stand-off: " $0
+        }
+        last = $2; north = $3; east = $4
+        bearing = atan2(e[$9] - e[$8], n[$9] - n[$8]) + $10 * degree; run = $12 * sin($11 * degree)
+        height = $8 == "T1" ? 1.487 : $8 == "T2" ? 1.605 : $8 == "T3" ? 1.534 : $8 == "K1" ? 1.562 : 1.578
+        if (off(n[$8] + run * cos(bearing), $3) > .0003 || off(e[$8] + run * sin(bearing), $4) > .0003 ||
+            off(h[$8] + height + $12 * cos($11 * degree) - 1.5, $5) > .0003) print "set out elsewhere: " $0
+        for (s in n) if (s ~ /^(T.|K1|K3)$/ && (n[s] - $3)^2 + (e[s] - $4)^2 < (n[$8] - $3)^2 + (e[$8] - $4)^2) print "nearer " s ": " $0
+    }
+    END { if (multiples != 22) print multiples " multiples of 20 m, not 22" }' points.csv >wrong
+[ ! -s wrong ] || fail "$(head -n 3 wrong)"
+
+# On the earth: Cartesian from geodetic coordinates, back to the plane of the anchor; variances of the first leg.
+awk -F, 'function off(a, b) { return a > b ? a - b : b - a }
+    NR == 1 { next }
+    {
+        degree = atan2(0, -1) / 180; e2 = 0.00669437999014; p = $16 * degree; l = $17 * degree
+        w = 6378137 / sqrt(1 - e2 * sin(p)^2)
+        if (off((w + $18) * cos(p) * cos(l), $13) > .0003 || off((w + $18) * cos(p) * sin(l), $14) > .0003 ||
+            off((w * (1 - e2) + $18) * sin(p), $15) > .0003) print "geodetic: " $0
+        if (NR == 2) { x = $13; y = $14; z = $15 }
+        sp = sin(47.5 * degree); cp = cos(47.5 * degree); sl = sin(8.5 * degree); cl = cos(8.5 * degree)
+        dx = $13 - x; dy = $14 - y; dz = $15 - z
+        if (off(-sp * cl * dx - sp * sl * dy + cp * dz, $3 - 5000) > .0003 || off(-sl * dx + cl * dy, $4 - 2000) > .0003 ||
+            off(cp * cl * dx + cp * sl * dy + sp * dz, $5 - 100) > .0003) print "plane: " $0
+        m = w^3 * (1 - e2) / 6378137^2
+        if (off($22 * degree * (m + $18), $19) > .00006 || off($23 * degree * (w + $18) * cos(p), $20) > .00006) print "sigma: " $0
+        if ($2 == "T1") {
+            along = .002 + 2e-6 * 144.258; across = 3 / 3600 * degree * 144.222; c = 48 / 144.222; s = 136 / 144.222
+            if (off(sqrt((along * c)^2 + (across * s)^2), $19) > .0001 || off(sqrt((along * s)^2 + (across * c)^2), $20) > .0001 ||
+                off(3 / 3600 * degree * 144.258, $21) > .0001) print "sigma of the first leg: " $0
+        }
+    }' points.csv >wrong
+[ ! -s wrong ] || fail "$(head -n 3 wrong)"
+
+# A wide interval leaves the chords to the sagitta: 12 m each, 1 + 5 + 10 + 5 + 1 of them.
+succeeds book.csv --alignment axis.csv --interval 1000 --sagitta 0.1 --csv wide.csv
+awk -F, '$1 == "axis" && $7 > .1' wide.csv | grep . && fail "a chord stands off by more than the sagitta"
+[ "$(grep -c ^axis wide.csv)" -eq 23 ] || fail "$(grep -c ^axis wide.csv) points, not 23"
+
+# A left bend is a right one in the mirror.
+sed 's/48-30-00/0/; s/^end.*//' axis.csv >right.csv
+sed 's/,right/,left/' right.csv >left.csv
+succeeds book.csv --alignment right.csv --csv right.out
+succeeds book.csv --alignment left.csv --csv left.out
+awk -F, '$1 == "axis" && NR == FNR { n[$2] = $3; e[$2] = $4; next }
+    $1 == "axis" && (n[$2] != $3 || (e[$2] + $4 - 4060)^2 > .0001001^2)' right.out left.out | grep . &&
+    fail "left and right differ"
+
+# Forms of the same book: CRLF, byte order mark, comments, blanks, decimal degrees; another order of the faces.
+succeeds book.csv
+cp out expected
+{ printf '\xef\xbb\xbf# again\r\n\r\n'; sed 's/,/ ,\t/g; s/$/ # so\r/; s/^# .*//' book.csv; } >same.csv
+succeeds same.csv
+cmp -s out expected || fail "the same book in another form reads otherwise"
+awk -F, -v OFS=, '/^(back|fore|side)/ { for (i = 4; i <= 5; i++) { split($i, d, "-"); $i = sprintf("%.9f", d[1] + (d[2] + d[3] / 60) / 60) } } 1' \
+    book.csv >same.csv
+succeeds same.csv
+cmp -s out expected || fail "decimal degrees read otherwise"
+for locale in $(locale -a 2>/dev/null | grep -iE '^(de|fr)_.*utf' | head -n 1); do
+    LC_ALL=$locale run book.csv
+    cmp -s out expected || fail "another locale, another report"
+done
+
+# Open ends.
+sed '/^station,K3/,$d' book.csv >open.csv
+succeeds open.csv
+shows 'Angular misclosure none: the last fore sight is not between control points'
+shows 'Linear misclosure none: the last station is no control point'
+sed '/^station,T1/,$d' book.csv >one.csv
+succeeds one.csv
+shows 'P1 5061.2000 2018.4000 101.3300'
+shows 'T1 5047.9987 2136.0005 103.2500' # 1.4 mm to the side, by the first angle's 2 seconds
+sed '/^fore,K4/d' book.csv >blind.csv
+succeeds blind.csv
+shows 'Angular misclosure none: the last fore sight is not between control points'
+grep -q 'Ratio  *1 : ' out || fail "no ratio without a closing bearing"
+
+# Bad books. edit SCRIPT: book.csv changed by sed into bad.csv
+edit() { sed "$1" book.csv >bad.csv; }
+edit '10s/1.600/1,6/'; refused "bad.csv:10:26: expected a slope distance from 0.01 to 100000 metres, not '88-04-55.11'" bad.csv
+edit '3s/5000/five/'; refused "bad.csv:3:10: expected a north coordinate in metres, not 'five.000'" bad.csv
+edit '3s/,100.000//'; refused "bad.csv:3:27: expected an elevation in metres, but the line ends here" bad.csv
+edit '3s/2000.000/inf/'; refused "bad.csv:3:19: expected an east coordinate in metres, not 'inf'" bad.csv
+edit '3s/$/,7/'; refused "bad.csv:3:36: expected the line to end, not '7'" bad.csv
+edit '4s/K2/K1/'; refused "bad.csv:4:7: expected a control point not given before, not 'K1'" bad.csv
+edit '4s/K2//'; refused "bad.csv:4:7: expected the name of a control point, not ''" bad.csv
+edit '4s/K2/a-name-that-is-far-too-long/'
+refused "bad.csv:4:7: expected a name of at most 16 plain characters, not 'a-name-that-is-far-too-long'" bad.csv
+edit '9s/K1/T7/'; refused "bad.csv:9:9: expected a control point as first station, not 'T7'" bad.csv
+edit '9d'; refused "bad.csv:9:1: expected a station ahead of the first sight, not 'back'" bad.csv
+edit '9s/$/\npoint,K9,1,2,3/'; refused "bad.csv:10:1: expected control points ahead of the first station, not 'point'" bad.csv
+edit '9s/station/stop/'; refused "bad.csv:9:1: expected point, station, back, fore or side, not 'stop'" bad.csv
+edit '10s/K2/T1/'; refused "bad.csv:10:6: expected a control point as first back sight, not 'T1'" bad.csv
+edit '10s/K2/K1/'; refused "bad.csv:10:6: expected a target other than the station itself, not 'K1'" bad.csv
+edit '17s/K1/K2/'; refused "bad.csv:17:6: expected a back sight to 'K1', not 'K2'" bad.csv
+edit '11s/K2/K3/'; refused "bad.csv:11:6: expected no second back sight beside 'K2', not 'K3'" bad.csv
+edit '13s/T1/T2/'; refused "bad.csv:13:6: expected no second fore sight beside 'T1', not 'T2'" bad.csv
+edit '13s/fore/side/'; refused "bad.csv:13:1: expected the same kind of sight as before to 'T1', not 'side'" bad.csv
+edit '16s/T1/T2/'; refused "bad.csv:16:9: expected station 'T1', the fore sight before, not 'T2'" bad.csv
+edit '12,13d'; refused "bad.csv:14:1: expected a fore sight at 'K1' first, not 'station'" bad.csv
+edit '10,11d'; refused "bad.csv:9:1: expected a back sight at station 'K1'" bad.csv
+edit '11s/1.600/1.610/'; refused "bad.csv:11:9: expected the same target height as on the other face, not '1.610'" bad.csv
+edit '11s/.*/back,K2,1.600,327-56-17.10,88-04-55.11,368.9533,1/'
+refused "bad.csv:11:49: expected one reading a face to 'K2', not '1'" bad.csv
+edit '11s/,2$/,3/'; refused "bad.csv:11:50: expected face 1 or 2, not '3'" bad.csv
+edit '11s/,2$/,1/'; refused "bad.csv:11:28: expected a zenith angle from 1 to 179 degrees on face 1, not '271-54-52.89'" bad.csv
+edit '10s/,1$/,2/'; refused "bad.csv:10:28: expected a zenith angle from 181 to 359 degrees on face 2, not '88-04-55.11'" bad.csv
+for angle in 360 -1 12-60-00 12-30 12-30-60 12-3.5-00 1e2 12-30-00-1 ''; do
+    edit "10s/327-56-17.10/$angle/"
+    refused "bad.csv:10:15: expected an angle from 0 to below 360 degrees, as 12.5 or 12-30-00, not '$angle'" bad.csv
+done
+edit '10s/368.9533/-1/'; refused "bad.csv:10:40: expected a slope distance from 0.01 to 100000 metres, not '-1'" bad.csv
+edit '9s/1.562/101/'; refused "bad.csv:9:12: expected an instrument height in metres, not '101'" bad.csv
+sed 's/K3/T1/g; s/^point,T1.*/point,T1,5048,2136,103/' book.csv >bad.csv
+refused "bad.csv:21:1: expected the traverse to end at control point 'T1', not 'station'" bad.csv
+: >bad.csv; refused "bad.csv:1:1: expected a station, but the file ends here" bad.csv
+head -c 5000 /dev/zero >bad.csv
+refused "bad.csv:1:1: expected a line of text, not '????????????????????????????????????????...'" bad.csv
+refused "nowhere.csv: cannot be opened: No such file or directory" nowhere.csv
+refused ".: cannot be read: Is a directory" .
+
+# Bad alignments
+bend() { sed "$1" axis.csv >bad.csv; }
+bent() { refused "bad.csv:$1" book.csv --alignment bad.csv; }
+bend '3s/start/begin/'; bent "3:1: expected start on the first line, not 'begin'"
+bend '3s/48-30-00/400/'; bent "3:28: expected a bearing from 0 to below 360 degrees, as 12.5 or 12-30-00, not '400'"
+bend '3s/-0.004/-4/'; bent "3:37: expected a grade as rise over run, -1 to 1, not '-4'"
+bend '4s/straight/line/'; bent "4:1: expected straight, spiral_in, arc, spiral_out or end, not 'line'"
+bend '4s/95/0/'; bent "4:10: expected a length from 0.01 to 10000 metres, not '0'"
+bend '5s/right/r/'; bent "5:18: expected left or right, not 'r'"
+bend '5s/,60/,600/'; bent "5:11: expected a spiral that turns by 90 degrees at most, not '600'"
+bend '6s/,120/,1200/'; bent "6:5: expected an arc that turns by 360 degrees at most, not '1200'"
+bend '6s/180/170/'; bent "6:1: expected an arc of the radius and hand of the spiral before"
+bend '7s/right/left/'; bent "7:1: expected an arc of this radius and hand ahead of the spiral, not 'spiral_out'"
+bend '6s/180/0/'; bent "6:9: expected a radius from 1 to 1000000 metres, not '0'"
+bend '10s/$/\nstraight,5/'; bent "11:1: expected nothing after the end, not 'straight'"
+bend '4,$d'; bent "4:1: expected an element, but the file ends here"
+bend '6,$d'; bent "6:1: expected an arc of the radius and hand of the spiral before"
+bend 's/.*//'; bent "11:1: expected start, but the file ends here"
+
+# The command line
+refused "no field book given (--help shows how)"
+refused "unknown option '--colour' (--help lists them)" book.csv --colour
+refused "unknown option '-v' (--help lists them)" -v
+refused "option --csv needs a value" book.csv --csv
+refused "--csv takes a file name, not ''" book.csv --csv=
+refused "option --interval is given twice" book.csv --interval 1 --interval 1
+refused "one field book only, but 'b.csv' is a second one" a.csv b.csv
+refused "--interval takes metres from 0.1 to 10000, not '0'" book.csv --interval 0
+refused "--sagitta takes metres from 0.0001 to 10, not 'nan'" book.csv --sagitta nan
+refused "--scale takes a factor from 0.9 to 1.1, not '2'" book.csv --scale 2
+refused "--target-height takes metres from -100 to 100, not '1,5'" book.csv --target-height 1,5
+refused "--precision takes SECONDS,MM,PPM, not '3,2'" book.csv --precision 3,2
+refused "--wgs84 takes NAME,LATITUDE,LONGITUDE,HEIGHT in degrees and metres, not 'K1,91,0,0'" book.csv --wgs84 K1,91,0,0
+refused "--wgs84: 'T1' is no control point of the field book" book.csv --wgs84 T1,47,8,0
+refused "--wgs84: latitude, longitude and height may not be 0 all three" book.csv --wgs84 K1,0,0,0
+refused "--csv would overwrite book.csv" book.csv --csv ./book.csv
+refused "--csv would overwrite axis.csv" book.csv --alignment axis.csv --csv axis.csv
+cmp -s book.csv "$data"/fieldbook.csv || fail "the book was overwritten"
+cp book.csv -- -odd.csv
+succeeds -- -odd.csv
+succeeds --help
+grep -q '^Usage: fieldbook' out || fail "--help shows no usage"
+succeeds --version
+grep -Eq '^fieldbook [0-9]+\.[0-9]+\.[0-9]+$' out || fail "--version shows no version"
+
+# The scale shortens what was measured on the ground, and setting out undoes it.
+succeeds open.csv --scale 0.9996 --alignment axis.csv --csv scaled.csv
+near "scaled leg" "$(awk '$1 == "K1" && $2 == "T1" && $3 ~ /-..-/ { print $4 }' out)" 144.16441 0.0001
+awk -F, '$1 == "control" || $1 == "station" { n[$2] = $3; e[$2] = $4 }
+    $1 == "axis" { run = sqrt(($3 - n[$8])^2 + ($4 - e[$8])^2); d = $12 * sin($11 * atan2(0, -1) / 180) * .9996 - run
+        if (d * d > .0003 ^ 2) print }' scaled.csv >wrong
+[ ! -s wrong ] || fail "setting out on a scaled grid: $(head -n 1 wrong)"
+
+if [ -w /dev/full ]; then
+    "$program" book.csv >/dev/full 2>err
+    code=$?
+    [ $code -eq 1 ] || fail "exit $code, not 1, on a full disk"
+    [ "$(cat err)" = "fieldbook: cannot write to standard output: No space left on device" ] || fail "on a full disk: $(cat err)"
+    run book.csv --csv /dev/full
+    [ $code -eq 1 ] && [ ! -s out ] || fail "exit $code, not 1, for points on a full disk"
+    [ "$(cat err)" = "fieldbook: cannot write to /dev/full: No space left on device" ] || fail "points on a full disk: $(cat err)"
+fi
+run book.csv --csv nowhere/points.csv
+[ $code -eq 1 ] || fail "exit $code, not 1, without the folder"
+[ "$(cat err)" = "fieldbook: cannot write to nowhere/points.csv: No such file or directory" ] || fail "$(cat err)"
+
+[ $failures -eq 0 ] && echo "all passed"
+exit $((failures != 0))

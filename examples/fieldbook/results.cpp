@@ -1,0 +1,78 @@
+#include "results.h"
+
+#include <cmath>
+
+#include "input_error.h"
+#include "number_parsing.h"
+#include "number_text.h"
+
+namespace {
+
+ResultPoint plain_point(PointKind kind, const NamedPoint& point, const Covariance& covariance) {
+    return {kind, point.name, point.at, covariance, std::nullopt, std::nullopt, std::nullopt};
+}
+
+void add_surveyed_points(Results& results, const Precision& precision) {
+    const double scale = results.options.scale;
+    for (const NamedPoint& point : results.book.control) {
+        results.points.push_back(plain_point(PointKind::CONTROL, point, {}));
+    }
+    for (std::size_t i = 0; i < results.traverse.stations.size(); ++i) {
+        const NamedPoint& station = results.traverse.stations[i];
+        if (results.book.find_control(station.name) == nullptr) {
+            results.points.push_back(plain_point(PointKind::STATION, station, precision.station(i)));
+        }
+    }
+    for (const SidePoint& side : reduce_side_sights(results.book, results.traverse, scale)) {
+        results.points.push_back(plain_point(
+            PointKind::SIDE, side.point, precision.seen_from(side.setup, side.observation, side.point.at)));
+    }
+}
+
+void add_axis_points(Results& results, const Alignment& alignment, const Precision& precision) {
+    const Options& options = results.options;
+    const std::vector<ChainagePoint> axis = set_out_axis(alignment, options.interval, options.sagitta);
+    for (const ChainagePoint& point : axis) {
+        const geo_nee& at = point.axis.at;
+        const SettingOut out =
+            set_out(results.book, results.traverse, at, options.target_height, options.scale);
+        results.points.push_back({PointKind::AXIS, fixed_text(point.chainage, 3), at,
+                                  precision.seen_from(out.setup, out.observation, at), point, out,
+                                  std::nullopt});
+    }
+    if (alignment.end) {
+        const AxisPoint& end = axis.back().axis;
+        results.axis_misclosure = {
+            {end.at.north - alignment.end->north, end.at.east - alignment.end->east, 0.0},
+            std::remainder(end.bearing - alignment.end->bearing, 2.0 * PI)};
+    }
+}
+
+void place_on_earth(Results& results, const EarthAnchor& anchor) {
+    const NamedPoint* control = results.book.find_control(anchor.name);
+    if (control == nullptr) {
+        throw InputError("--wgs84: " + quoted(anchor.name) + " is no control point of the field book");
+    }
+    const Earth earth(control->at, anchor.position, results.options.scale);
+    for (ResultPoint& point : results.points) {
+        point.earth = earth.locate(point.at, point.covariance);
+    }
+}
+
+}  // namespace
+
+Results compute(const Options& options) {
+    Results results = {options, read_book(options.book), {}, {}, std::nullopt};
+    const std::optional<Alignment> alignment =
+        options.alignment ? std::optional(read_alignment(*options.alignment)) : std::nullopt;
+    results.traverse = compute_traverse(results.book, options.scale);
+    const Precision precision(results.traverse, options.precision);
+    add_surveyed_points(results, precision);
+    if (alignment) {
+        add_axis_points(results, *alignment, precision);
+    }
+    if (options.wgs84) {
+        place_on_earth(results, *options.wgs84);
+    }
+    return results;
+}

@@ -1,0 +1,66 @@
+// Comma-separated files, line by line, with the place of every field.
+#ifndef EXAMPLES_CSV_READER_H
+#define EXAMPLES_CSV_READER_H
+
+#include <cstddef>
+#include <cstdio>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+/// Where something stands in a file; both count from 1, columns in bytes.
+struct Place {
+    std::size_t line;
+    std::size_t column;
+};
+
+/// Reads records of fields between commas. Blanks around a field are no part of it, `#` begins a comment,
+/// lines without fields are passed over, LF and CRLF files read alike, and a UTF-8 byte order mark is
+/// skipped. There is no quoting: a field holds no comma and no `#`.
+///
+/// Whatever does not fit is an InputError that names file, line, column and what was expected there.
+class CsvReader {
+public:
+    /// Opens the file. InputError when that fails.
+    explicit CsvReader(std::string path);
+
+    /// Goes to the next record; false at the end of the file.
+    bool next();
+
+    std::size_t size() const { return m_fields.size(); }
+    /// Place of a field; behind the last one, of the line's end.
+    Place place(std::size_t index) const;
+    /// A field that must be there; `expected` says what it is.
+    std::string_view text(std::size_t index, const char* expected) const;
+    /// A finite number from `low` to `high`.
+    double number(std::size_t index, const char* expected, double low, double high) const;
+    /// Refuses fields beyond the first `count`.
+    void expect_end(std::size_t count) const;
+
+    /// Throws `expected ..., not 'field'`, or `... but the line ends here`.
+    [[noreturn]] void fail(std::size_t index, const std::string& expected) const;
+    /// Throws a message about an earlier place.
+    [[noreturn]] void fail_at(const Place& place, const std::string& message) const;
+
+private:
+    struct CloseFile {
+        void operator()(std::FILE* file) const { std::fclose(file); }
+    };
+    struct Field {
+        std::string_view text;
+        std::size_t column;
+    };
+
+    bool read_line();
+    void split();
+
+    std::string m_path;
+    std::unique_ptr<std::FILE, CloseFile> m_file;
+    std::string m_text;
+    std::size_t m_line = 0;
+    std::size_t m_end_column = 1;
+    std::vector<Field> m_fields;
+};
+
+#endif

@@ -17,6 +17,7 @@ configure_package_config_file(cmake/basalt-config.cmake.in ${PROJECT_BINARY_DIR}
 write_basic_package_version_file(${PROJECT_BINARY_DIR}/basalt-config-version.cmake
   COMPATIBILITY SameMinorVersion)
 install(FILES ${PROJECT_BINARY_DIR}/basalt-config.cmake ${PROJECT_BINARY_DIR}/basalt-config-version.cmake
+  cmake/BasaltVersionResource.cmake cmake/version_resource.cpp.in
   DESTINATION ${config_dir})
 
 # The installed tree may be moved as a whole: basalt.pc finds the rest from where it stands, as the CMake package does.

@@ -9,6 +9,7 @@
 #include "basalt/memory.h"
 #include "basalt/platform.h"
 #include "basalt/sparse.h"
+#include "basalt/util.h"
 #include "basalt/version.h"
 
 #endif

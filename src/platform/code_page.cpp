@@ -42,6 +42,18 @@ locale_t open_locale(const char* name) {
     return newlocale(LC_CTYPE_MASK, name, nullptr);
 }
 
+// Writes one character's bytes in the locale in force ('?' when it has none) and answers their count.
+std::size_t encode_in_scope(wchar_t ch, char* bytes, std::mbstate_t& state) {
+    constexpr auto FAILED = static_cast<std::size_t>(-1);
+    const std::size_t length = is_unicode_scalar(ch) ? std::wcrtomb(bytes, ch, &state) : FAILED;
+    if (length != FAILED) {
+        return length;
+    }
+    bytes[0] = '?';
+    state = {};
+    return 1;
+}
+
 }  // namespace
 
 CodePage::CodePage(const char* locale_name)
@@ -65,6 +77,10 @@ std::wstring CodePage::widen(std::string_view text) const {
 
 std::string CodePage::narrow(std::wstring_view text) const {
     return m_is_utf8 ? utf8_from_wide(text) : narrow_by_locale(text, m_locale);
+}
+
+char* CodePage::narrow_to(std::wstring_view text, char* bytes) const {
+    return m_is_utf8 ? write_utf8(text, bytes) : narrow_by_locale_to(text, m_locale, bytes);
 }
 
 wchar_t CodePage::to_lower(wchar_t ch) const {
@@ -123,16 +139,18 @@ std::string narrow_by_locale(std::wstring_view text, locale_t locale) {
     std::mbstate_t state{};
     for (const wchar_t ch : text) {
         char bytes[MB_LEN_MAX];
-        constexpr auto FAILED = static_cast<std::size_t>(-1);
-        const std::size_t length = is_unicode_scalar(ch) ? std::wcrtomb(bytes, ch, &state) : FAILED;
-        if (length == FAILED) {
-            result.push_back('?');
-            state = {};
-        } else {
-            result.append(bytes, length);
-        }
+        result.append(bytes, encode_in_scope(ch, bytes, state));
     }
     return result;
+}
+
+char* narrow_by_locale_to(std::wstring_view text, locale_t locale, char* bytes) {
+    const ScopedLocale scope(locale);
+    std::mbstate_t state{};
+    for (const wchar_t ch : text) {
+        bytes += encode_in_scope(ch, bytes, state);
+    }
+    return bytes;
 }
 
 }  // namespace basalt::platform

@@ -29,6 +29,8 @@ public:
     std::wstring widen(std::string_view text) const;
     // '?' for each character that the encoding lacks.
     std::string narrow(std::wstring_view text) const;
+    // The same into room for MB_LEN_MAX bytes a character; answers the end of what was written.
+    char* narrow_to(std::wstring_view text, char* bytes) const;
 
     wchar_t to_lower(wchar_t ch) const;
     wchar_t to_upper(wchar_t ch) const;
@@ -54,6 +56,7 @@ inline std::string narrow(std::wstring_view text) {
 // every encoding but UTF-8.
 std::wstring widen_by_locale(std::string_view text, locale_t locale);
 std::string narrow_by_locale(std::wstring_view text, locale_t locale);
+char* narrow_by_locale_to(std::wstring_view text, locale_t locale, char* bytes);
 
 }  // namespace basalt::platform
 

@@ -57,6 +57,8 @@ constexpr Message MESSAGES[] = {
     {ERROR_NO_SYSTEM_RESOURCES, L"The system is short of resources."},
     {ERROR_COMMITMENT_LIMIT, L"The system cannot provide more memory."},
     {ERROR_TIMEOUT, L"The operation took too long."},
+    {ERROR_RESOURCE_DATA_NOT_FOUND, L"The file does not hold the resource."},
+    {ERROR_RESOURCE_TYPE_NOT_FOUND, L"The resource does not hold the value."},
     {ERROR_CANT_RESOLVE_FILENAME, L"The name cannot be followed to a file."},
 };
 static_assert(std::is_sorted(std::begin(MESSAGES), std::end(MESSAGES),

@@ -1,5 +1,9 @@
 #include "src/platform/utf8.h"
 
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
 #include <cstdint>
 #include <cstring>
 
@@ -20,6 +24,32 @@ std::size_t ascii_prefix(std::string_view text) {
     }
     while (count < text.size() && static_cast<unsigned char>(text[count]) < 0x80) {
         ++count;
+    }
+    return count;
+}
+
+// Copies the ASCII characters at the front and answers their count. Sixteen at a time where the processor
+// always can: half the time of writing a log line otherwise.
+std::size_t copy_ascii_prefix(std::wstring_view text, char* bytes) {
+    std::size_t count = 0;
+#if defined(__SSE2__)
+    const auto four = [&](std::size_t offset) {
+        return _mm_loadu_si128(reinterpret_cast<const __m128i*>(text.data() + count + offset));
+    };
+    const __m128i beyond_ascii = _mm_set1_epi32(~0x7F);
+    for (; text.size() - count >= 16; count += 16) {
+        const __m128i a = four(0), b = four(4), c = four(8), d = four(12);
+        const __m128i all = _mm_or_si128(_mm_or_si128(a, b), _mm_or_si128(c, d));
+        const __m128i is_ascii = _mm_cmpeq_epi32(_mm_and_si128(all, beyond_ascii), _mm_setzero_si128());
+        if (_mm_movemask_epi8(is_ascii) != 0xFFFF) {
+            break;
+        }
+        const __m128i packed = _mm_packus_epi16(_mm_packs_epi32(a, b), _mm_packs_epi32(c, d));
+        _mm_storeu_si128(reinterpret_cast<__m128i*>(bytes + count), packed);
+    }
+#endif
+    for (; count < text.size() && static_cast<char32_t>(text[count]) < 0x80; ++count) {
+        bytes[count] = static_cast<char>(text[count]);
     }
     return count;
 }
@@ -92,6 +122,19 @@ std::string utf8_from_wide(std::wstring_view text) {
         }
     }
     return result;
+}
+
+char* write_utf8(std::wstring_view text, char* bytes) {
+    while (!text.empty()) {
+        const std::size_t ascii = copy_ascii_prefix(text, bytes);
+        bytes += ascii;
+        text.remove_prefix(ascii);
+        if (!text.empty()) {
+            bytes += encode_utf8(text.front(), bytes);
+            text.remove_prefix(1);
+        }
+    }
+    return bytes;
 }
 
 std::wstring wide_from_utf8(std::string_view text) {

@@ -25,6 +25,9 @@ std::size_t encode_utf8(wchar_t ch, char* bytes);
 // Every character in its bytes, zeros included; '?' for a value that is no character.
 std::string utf8_from_wide(std::wstring_view text);
 
+// The same into room for MAX_UTF8_BYTES a character; answers the end of what was written.
+char* write_utf8(std::wstring_view text, char* bytes);
+
 // Every byte sequence in its character, zeros included; REPLACEMENT_CHARACTER for each byte that belongs to
 // none (overlong forms, surrogates, values beyond 0x10FFFF and a character cut short at the end as well).
 std::wstring wide_from_utf8(std::string_view text);

@@ -3,6 +3,16 @@
 
 #include <cstdio>
 
+// The name and version that the build put into this program.
+static bool has_its_version() {
+#ifdef VERSION_STRING
+    VersionInfo info;
+    return info.InitVersionInfo(nullptr) && info.GetVersionString() == VERSION_STRING;
+#else
+    return true;
+#endif
+}
+
 int main() {
     vex_util::Sparse2DArray heights(sizeof(double), 16, 64);
     for (int y = 0; y < 40; ++y) {
@@ -26,7 +36,7 @@ int main() {
     std::printf("basalt %s: %d cells, %g m, language %u\n", BASALT_VERSION, count, geo_horz_dist(a, b),
                 static_cast<unsigned>(_languageVersion()));
     return count == 1024 && geo_horz_dist(a, b) == 5.0 &&
-                   vex_lib::vlSharedMemoryHeap::GetHeapHandle() != nullptr
+                   vex_lib::vlSharedMemoryHeap::GetHeapHandle() != nullptr && has_its_version()
                ? 0
                : 1;
 }

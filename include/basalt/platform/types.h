@@ -21,6 +21,8 @@ using LONG = std::int32_t;
 using HRESULT = std::int32_t;
 /// Reference to an object of the platform layer; null or all ones where a call says so.
 using HANDLE = void*;
+/// Reference to a program or library in memory.
+using HINSTANCE = void*;
 
 static_assert(sizeof(BOOL) == 4, "platform records hold their truth values in 32 bits");
 

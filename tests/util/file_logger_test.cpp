@@ -1,0 +1,312 @@
+#include "basalt/util/file_logger.h"
+
+#include <gtest/gtest.h>
+
+#include <cerrno>
+#include <csignal>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <optional>
+#include <random>
+#include <sstream>
+#include <string>
+#include <thread>
+#include <type_traits>
+#include <vector>
+
+#include "src/platform/text_file.h"
+#include "tests/support/failing_new.h"
+
+namespace {
+
+using vex_util::FileLogger;
+namespace fs = std::filesystem;
+using namespace std::string_literals;
+
+bool fdopen_fails = false;
+
+}  // namespace
+
+// The name the linker's --wrap makes of fdopen.
+extern "C" {
+std::FILE* __real_fdopen(int file, const char* mode);
+std::FILE* __wrap_fdopen(int file, const char* mode) {
+    if (!fdopen_fails) {
+        return __real_fdopen(file, mode);
+    }
+    errno = ENOMEM;
+    return nullptr;
+}
+}
+
+namespace {
+
+std::string contents(const fs::path& file) {
+    std::ifstream stream(file, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(stream), {});
+}
+
+class FileLog : public testing::Test {
+protected:
+    FileLog() { fs::create_directory(folder); }
+    ~FileLog() override { fs::remove_all(folder); }
+
+    // The lines of the file, each of which has to be "<writer> <number> <filler>".
+    static std::vector<int> counted_lines(const std::string& text, char writer) {
+        std::vector<int> numbers;
+        std::istringstream stream(text);
+        for (std::string line; std::getline(stream, line, '\n');) {
+            char who = '\0';
+            int number = -1;
+            char filler[100] = "";
+            char end = '\0';
+            EXPECT_EQ(std::sscanf(line.c_str(), "%c %d %99[x]%c", &who, &number, filler, &end), 4) << line;
+            EXPECT_EQ(end, '\r');
+            EXPECT_EQ(std::string(filler).size(), static_cast<std::size_t>(number % 80 + 1)) << line;
+            if (who == writer) {
+                numbers.push_back(number);
+            }
+        }
+        return numbers;
+    }
+    static void write_line(FileLogger& log, char writer, int number) {
+        CString line;
+        line.Format(L"%c %d %s\n", writer, number,
+                    std::string(static_cast<std::size_t>(number % 80 + 1), 'x').c_str());
+        log.Write(line);
+    }
+    static std::vector<int> up_to(std::size_t count) {
+        std::vector<int> numbers(count);
+        for (std::size_t i = 0; i < count; ++i) {
+            numbers[i] = static_cast<int>(i);
+        }
+        return numbers;
+    }
+
+    const fs::path folder =
+        fs::temp_directory_path() / ("basalt_log_" + std::to_string(std::random_device{}()));
+    const fs::path file = folder / "a log.txt";
+};
+
+TEST_F(FileLog, closed_log_ignores_writes) {
+    for (const char* const path :
+         {static_cast<const char*>(nullptr), "", "/no such folder/log", folder.c_str()}) {
+        FileLogger log(path);
+        log.Write(L"lost\n");
+        log.Close();
+    }
+    FileLogger().Write(L"lost\n");
+    EXPECT_TRUE(fs::is_empty(folder));
+}
+
+TEST_F(FileLog, texts_follow_each_other_with_nothing_between) {
+    std::ofstream(file) << "what was there before";
+    FileLogger log(file.c_str());
+    EXPECT_EQ(contents(file), "") << "opening empties the file";
+    log.Write(L"a");
+    log.Write(CString());
+    log.Write(L"b");
+    EXPECT_EQ(contents(file), "") << "nothing is flushed";
+    log.Close();
+    EXPECT_EQ(contents(file), "ab");
+    log.Write(L"lost");
+    EXPECT_EQ(contents(file), "ab");
+}
+
+TEST_F(FileLog, each_line_feed_becomes_two_characters) {
+    {
+        FileLogger log(file.c_str());
+        log.Write(L"line\n");
+        log.Write(L"\n\nhas one already\r\nend");
+    }
+    EXPECT_EQ(contents(file), "line\r\n\r\n\r\nhas one already\r\r\nend");
+}
+
+TEST_F(FileLog, text_is_in_the_code_page_and_ends_at_its_first_zero) {
+    {
+        FileLogger log(file.c_str());
+        log.Write(CString(L"5\x20AC \x1F30D \xD800|\0 lost", 15));
+    }
+    EXPECT_EQ(contents(file), "5\xE2\x82\xAC \xF0\x9F\x8C\x8D ?|");
+}
+
+TEST_F(FileLog, opening_closes_first_whatever_the_new_path) {
+    const std::string missing = (folder / "none" / "log").string();
+    int text = 0;
+    for (const char* const path : {static_cast<const char*>(nullptr), "", missing.c_str()}) {
+        FileLogger log(file.c_str());
+        const std::string expected = std::to_string(++text);
+        log.Write(CString(expected.c_str()));
+        log.Open(path);
+        log.Write(L"lost");
+        EXPECT_EQ(contents(file), expected);
+    }
+    FileLogger log(file.c_str());
+    log.Write(L"first");
+    log.Open((folder.string() + "\\second").c_str());  // either separator
+    log.Write(L"second");
+    log.Close();
+    EXPECT_EQ(contents(file), "first");
+    EXPECT_EQ(contents(folder / "second"), "second");
+}
+
+TEST_F(FileLog, has_one_owner) {
+    EXPECT_FALSE(std::is_copy_constructible_v<FileLogger>);
+    EXPECT_FALSE(std::is_copy_assignable_v<FileLogger>);
+}
+
+TEST_F(FileLog, texts_of_every_length_arrive_whole) {
+    const unsigned seed = std::random_device{}();
+    SCOPED_TRACE(seed);
+    std::mt19937 random(seed);
+    std::string expected;
+    FileLogger log(file.c_str());
+    for (int round = 0; round < 300; ++round) {
+        const int lengths[] = {1, 80, 255, 256, 257, 511, 513, 4095, 4096, 9000};
+        std::wstring text;
+        for (int left = lengths[random() % std::size(lengths)]; left > 0; --left) {
+            const int kind = static_cast<int>(random() % 40);
+            text += kind == 0 ? L'\n' : kind == 1 ? L'\xE9' : static_cast<wchar_t>(L'a' + kind % 26);
+            expected += kind == 0   ? "\r\n"s
+                        : kind == 1 ? "\xC3\xA9"s
+                                    : std::string(1, static_cast<char>('a' + kind % 26));
+        }
+        log.Write(CString(text.c_str()));
+    }
+    log.Close();
+    EXPECT_EQ(contents(file), expected);
+}
+
+TEST_F(FileLog, writing_takes_no_memory) {
+    FileLogger log(file.c_str());
+    const CString line(L"2021-02-01 12:00:00 RTK fixed, age 0.8 s\n");
+    const CString long_text(L'x', 10'000);
+    bool took_memory;
+    {
+        const FailAllocation guard(1, true);
+        for (int i = 0; i < 1000; ++i) {
+            log.Write(line);
+        }
+        log.Write(long_text);
+        took_memory = guard.fired();
+    }
+    EXPECT_FALSE(took_memory);
+}
+
+TEST_F(FileLog, killed_process_leaves_whole_texts) {
+    GTEST_FLAG_SET(death_test_style, "fast");
+    const auto write_and_die = [this] {
+        FileLogger log(file.c_str());
+        for (int i = 0; i < 1000; ++i) {
+            write_line(log, 'a', i);
+        }
+        std::raise(SIGKILL);
+    };
+    EXPECT_EXIT(write_and_die(), testing::KilledBySignal(SIGKILL), "");
+    const std::vector<int> lines = counted_lines(contents(file), 'a');
+    EXPECT_GT(lines.size(), 800U) << "at most a buffer of text is lost";
+    EXPECT_EQ(lines, up_to(lines.size()));
+}
+
+TEST_F(FileLog, two_logs_on_one_file_do_not_cut_each_others_texts) {
+    FileLogger a(file.c_str());
+    FileLogger b(file.c_str());
+    for (int i = 0; i < 1000; ++i) {
+        write_line(a, 'a', i);
+        write_line(b, 'b', i);
+    }
+    a.Close();
+    b.Close();
+    EXPECT_EQ(counted_lines(contents(file), 'a'), up_to(1000));
+    EXPECT_EQ(counted_lines(contents(file), 'b'), up_to(1000));
+}
+
+TEST_F(FileLog, threads_write_whole_texts) {
+    FileLogger log(file.c_str());
+    std::vector<std::thread> threads;
+    for (const char writer : {'a', 'b', 'c'}) {
+        threads.emplace_back([&log, writer] {
+            for (int i = 0; i < 500; ++i) {
+                write_line(log, writer, i);
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    log.Close();
+    for (const char writer : {'a', 'b', 'c'}) {
+        EXPECT_EQ(counted_lines(contents(file), writer), up_to(500));
+    }
+}
+
+TEST_F(FileLog, full_disk_is_silent) {
+    FileLogger log("/dev/full");
+    for (int i = 0; i < 1000; ++i) {
+        write_line(log, 'a', i);
+    }
+    log.Open(file.c_str());
+    log.Write(L"still usable");
+    log.Close();
+    EXPECT_EQ(contents(file), "still usable");
+}
+
+TEST_F(FileLog, stream_that_cannot_be_made_leaves_no_file_open) {
+    const auto open_files = [] {
+        return std::distance(fs::directory_iterator("/proc/self/fd"), fs::directory_iterator());
+    };
+    const auto before = open_files();
+    fdopen_fails = true;
+    FileLogger log(file.c_str());
+    fdopen_fails = false;
+    log.Write(L"lost");
+    EXPECT_EQ(open_files(), before);
+}
+
+// In encodings other than UTF-8, of locales made here; each in a process of its own, since the environment is
+// read once.
+TEST_F(FileLog, follows_the_environments_encoding) {
+    struct Row {
+        const char* charmap;
+        std::string name, expected;
+    };
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    for (const Row& row : {Row{"ISO-8859-15", "caf\xE9", "\xA4 \xE9 ? ?\r\n"},
+                           Row{"EUC-JP", "caf\x8F\xAB\xB1", "? \x8F\xAB\xB1 \xC6\xFC ?\r\n"}}) {
+        const fs::path locales = folder.parent_path() / ("basalt_log_locale_"s + row.charmap);
+        const std::string command =
+            "localedef -c -i POSIX -f "s + row.charmap + " '" + locales.string() + "/test' >/dev/null 2>&1";
+        fs::create_directory(locales);
+        const bool made = std::system(command.c_str()) != -1 && fs::exists(locales / "test" / "LC_CTYPE");
+        const auto log_in_that_locale = [&] {
+            setenv("LOCPATH", locales.c_str(), 1);
+            setenv("LC_ALL", "test", 1);
+            FileLogger log((folder.string() + "/" + row.name).c_str());
+            log.Write(L"\x20AC \xE9 \x65E5 \xD800\n");
+            log.Close();
+            const bool right = contents(folder / "caf\xC3\xA9") == row.expected;
+            fs::remove_all(folder);  // of the test that runs again in this process
+            std::_Exit(right ? 0 : 1);
+        };
+        if (made) {
+            EXPECT_EXIT(log_in_that_locale(), testing::ExitedWithCode(0), "") << row.charmap;
+        }
+        fs::remove_all(locales);
+        if (!made) {
+            GTEST_SKIP() << "localedef cannot make the locales";
+        }
+    }
+}
+
+TEST_F(FileLog, the_one_mode_and_its_errors) {
+    std::FILE* stream = stdout;
+    EXPECT_EQ(fopen_s(&stream, file.c_str(), "r"), EINVAL);
+    EXPECT_EQ(stream, nullptr);
+    EXPECT_EQ(fopen_s(&stream, nullptr, "w"), EINVAL);
+    EXPECT_EQ(fopen_s(nullptr, file.c_str(), "w"), EINVAL);
+    EXPECT_EQ(fopen_s(&stream, "/no such folder/log", "w"), ENOENT);
+    EXPECT_FALSE(fs::exists(file));
+}
+
+}  // namespace

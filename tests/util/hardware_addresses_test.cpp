@@ -1,0 +1,206 @@
+#include "basalt/util/hardware_addresses.h"
+
+#include <gtest/gtest.h>
+#include <ifaddrs.h>
+#include <net/if.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <optional>
+
+#include "src/platform/interface_table.h"
+
+namespace {
+
+using basalt::MACAddressFromMIBTable;
+using Texts = std::vector<std::string>;
+
+// What happens between the calls that the list is made by.
+std::optional<DWORD> vanished_index;
+std::size_t grows_by = 0;  // rows that appear, one after each call for the table
+DWORD table_error = 0;
+std::span<const MIB_IFROW> rows;
+bool list_is_refused = false;
+
+}  // namespace
+
+// The names the linker's --wrap makes of the platform's calls.
+extern "C" {
+int __real_getifaddrs(ifaddrs** list);
+int __wrap_getifaddrs(ifaddrs** list) {
+    if (!list_is_refused) {
+        return __real_getifaddrs(list);
+    }
+    errno = EMFILE;
+    return -1;
+}
+DWORD __real__Z10GetIfEntryP9MIB_IFROW(MIB_IFROW* row);
+DWORD __wrap__Z10GetIfEntryP9MIB_IFROW(MIB_IFROW* row) {
+    return row->dwIndex == vanished_index ? 2 : __real__Z10GetIfEntryP9MIB_IFROW(row);
+}
+DWORD __real__Z10GetIfTableP11MIB_IFTABLEPji(MIB_IFTABLE* table, DWORD* size, BOOL sorted);
+DWORD __wrap__Z10GetIfTableP11MIB_IFTABLEPji(MIB_IFTABLE* table, DWORD* size, BOOL sorted) {
+    if (table_error != 0) {
+        return table_error;
+    }
+    const DWORD result = __real__Z10GetIfTableP11MIB_IFTABLEPji(table, size, sorted);
+    if (grows_by > 0) {
+        --grows_by;
+        rows = {rows.data(), rows.size() + 1};
+    }
+    return result;
+}
+}
+
+namespace {
+
+MIB_IFROW row(DWORD index, DWORD type, const std::vector<unsigned char>& address) {
+    MIB_IFROW row{};
+    row.dwIndex = index;
+    row.dwType = type;
+    row.dwPhysAddrLen = static_cast<DWORD>(address.size());
+    std::copy_n(address.begin(), std::min<std::size_t>(address.size(), 8), row.bPhysAddr);
+    return row;
+}
+
+class HardwareAddresses : public testing::Test {
+protected:
+    HardwareAddresses() {
+        basalt::platform::set_interface_table(&rows);
+        rows = {};
+    }
+    ~HardwareAddresses() override {
+        basalt::platform::set_interface_table(nullptr);
+        vanished_index.reset();
+        table_error = 0;
+        grows_by = 0;
+    }
+
+    MACAddressFromMIBTable m_list;
+};
+
+TEST_F(HardwareAddresses, ethernet_interfaces_by_ascending_index) {
+    const MIB_IFROW all[] = {row(7, 6, {0x00, 0x1A, 0x2B, 0x3C, 0x4D, 0x5E}),
+                             row(1, 24, {0, 0, 0, 0, 0, 0}),
+                             row(12, 6, {}),
+                             row(5, 71, {1, 2, 3, 4, 5, 6}),
+                             row(9, 1, {1}),
+                             row(3, 6, {0xFF, 0xFE, 0xFD, 0, 1, 2, 3, 4})};
+    rows = all;
+    EXPECT_TRUE(m_list.GetMACAddressesAsHexString().empty());
+    EXPECT_TRUE(m_list.Create());
+    const Texts once = {"fffefd0001020304", "001a2b3c4d5e", ""};
+    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), once);
+    EXPECT_TRUE(m_list.Create());
+    Texts twice = once;
+    twice.insert(twice.end(), once.begin(), once.end());
+    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), twice);
+    const MACAddressFromMIBTable copy = m_list;
+    rows = {};
+    EXPECT_TRUE(m_list.Create()) << "what was gathered stays";
+    EXPECT_EQ(MACAddressFromMIBTable(copy).GetMACAddressesAsHexString(), twice);
+}
+
+TEST_F(HardwareAddresses, none) {
+    EXPECT_FALSE(m_list.Create());
+    const MIB_IFROW wireless[] = {row(2, 71, {1, 2, 3, 4, 5, 6})};
+    rows = wireless;
+    EXPECT_FALSE(m_list.Create());
+    const MIB_IFROW wired[] = {row(2, 6, {1, 2, 3, 4, 5, 6})};
+    rows = wired;
+    table_error = 50;
+    EXPECT_FALSE(m_list.Create());
+    EXPECT_TRUE(m_list.GetMACAddressesAsHexString().empty());
+}
+
+TEST_F(HardwareAddresses, interfaces_that_come_and_go_meanwhile) {
+    std::vector<MIB_IFROW> all;
+    for (DWORD index = 1; index <= 20; ++index) {
+        all.push_back(row(index, 6, {static_cast<unsigned char>(index)}));
+    }
+    rows = {all.data(), 1};
+    grows_by = 4;
+    vanished_index = 2;
+    EXPECT_TRUE(m_list.Create());
+    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), (Texts{"01", "03", "04", "05"}));
+    MACAddressFromMIBTable never_ready;
+    grows_by = 15;
+    EXPECT_FALSE(never_ready.Create()) << "ends although the table grows at every reading";
+}
+
+TEST_F(HardwareAddresses, length_beyond_the_record_is_not_believed) {
+    MIB_IFROW odd = row(1, 6, {1, 2, 3, 4, 5, 6, 7, 8});
+    odd.dwPhysAddrLen = 0xFFFFFFFF;
+    rows = {&odd, 1};
+    EXPECT_TRUE(m_list.Create());
+    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), Texts{"0102030405060708"});
+}
+
+std::string first_line(const std::filesystem::path& file) {
+    std::ifstream stream(file);
+    std::string line;
+    std::getline(stream, line);
+    return line;
+}
+
+TEST_F(HardwareAddresses, list_that_the_system_refuses) {
+    basalt::platform::set_interface_table(nullptr);
+    list_is_refused = true;
+    DWORD size = 0;
+    MIB_IFROW row{};
+    EXPECT_EQ(GetIfTable(nullptr, &size, 0), 4U);
+    EXPECT_EQ(GetIfEntry(&row), 4U);
+    EXPECT_FALSE(m_list.Create());
+    list_is_refused = false;
+}
+
+// The machine's own interfaces, as its files tell them.
+TEST_F(HardwareAddresses, real_interfaces) {
+    namespace fs = std::filesystem;
+    basalt::platform::set_interface_table(nullptr);
+    std::map<int, std::string> expected;
+    std::size_t seen = 0;
+    std::error_code error;
+    for (const fs::directory_entry& entry : fs::directory_iterator("/sys/class/net", error)) {
+        const fs::path folder = entry.path();
+        if (!fs::exists(folder / "ifindex")) {
+            continue;
+        }
+        const int index = std::stoi(first_line(folder / "ifindex"));
+        if (if_nametoindex(folder.filename().c_str()) != static_cast<unsigned>(index)) {
+            GTEST_SKIP() << "/sys shows another network's interfaces";
+        }
+        ++seen;
+        if (first_line(folder / "type") == "1" && !fs::exists(folder / "phy80211") &&
+            !fs::exists(folder / "wireless")) {
+            std::string address = first_line(folder / "address");
+            std::erase(address, ':');
+            expected[index] = address;
+        }
+    }
+    if (seen == 0) {
+        GTEST_SKIP() << "/sys is not mounted";
+    }
+    Texts in_order;
+    for (const auto& [index, address] : expected) {
+        in_order.push_back(address);
+    }
+    EXPECT_EQ(m_list.Create(), !in_order.empty());
+    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), in_order);
+
+    std::vector<unsigned char> bytes(4 + 860 * seen);
+    auto size = static_cast<DWORD>(bytes.size() - 1);
+    auto* const table = reinterpret_cast<MIB_IFTABLE*>(bytes.data());
+    EXPECT_EQ(GetIfTable(table, &size, 1), 122U);
+    EXPECT_EQ(size, bytes.size());
+    EXPECT_EQ(GetIfTable(table, &size, 1), 0U);
+    EXPECT_EQ(table->dwNumEntries, seen);
+    MIB_IFROW none{};
+    none.dwIndex = 0x7FFFFFFF;
+    EXPECT_EQ(GetIfEntry(&none), 2U);
+}
+
+}  // namespace

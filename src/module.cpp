@@ -14,16 +14,14 @@ namespace {
 // from their constructors, and until their destructors have run.
 constexpr int MODULE_PRIORITY = 101;
 
-std::uintptr_t start_codec() {
-    constexpr GdiplusStartupInput INPUT = {.GdiplusVersion = 1,
-                                           .DebugEventCallback = nullptr,
-                                           .SuppressBackgroundThread = 0,
-                                           .SuppressExternalCodecs = 0};
-    std::uintptr_t token = 0;
-    return GdiplusStartup(&token, &INPUT, nullptr) == Gdiplus::Ok ? token : 0;
-}
-
-constexpr basalt::frame::CodecCalls CODEC = {.start = start_codec, .shut_down = GdiplusShutdown};
+constexpr basalt::frame::CodecCalls CODEC = {
+    .start = []() -> std::uintptr_t {
+        const GdiplusStartupInput input = {1, nullptr, 0, 0};
+        std::uintptr_t token = 0;
+        return GdiplusStartup(&token, &input, nullptr) == Gdiplus::Ok ? token : 0;
+    },
+    .shut_down = GdiplusShutdown,
+};
 
 }  // namespace
 

@@ -3,8 +3,8 @@
 #ifndef BASALT_PLATFORM_H
 #define BASALT_PLATFORM_H
 
-#include "basalt/platform/bitmap.h"
 #include "basalt/platform/automation_date.h"
+#include "basalt/platform/bitmap.h"
 #include "basalt/platform/calendar.h"
 #include "basalt/platform/cstring.h"
 #include "basalt/platform/device_context.h"

@@ -21,6 +21,7 @@ constexpr int BELOW_MAP = 40;
 constexpr int LINE = 22;
 constexpr int ROUNDING = 14;  // diameter
 constexpr int SMALLEST_HEIGHT = 640;
+constexpr COLORREF OUTLINE = RGB(150, 150, 150);
 
 int legend_left(const Map& map) {
     return MAP_LEFT + map.width + GAP;
@@ -50,12 +51,18 @@ void visit_ticks(double low, double high, double times, Visit visit) {
     }
 }
 
-/// Paints what lies outside the rounding of a rectangle over with the paper's colour.
+/// A rounded rectangle one pixel larger than a bar: what is left of it around the bar is its outline.
+void draw_bar_outline(Drawing& page, const RECT& bar) {
+    _gradientfill(page.dc(), bar.left - 1, bar.top - 1, bar.right + 1, bar.bottom + 1, ROUNDING + 2, PAPER,
+                  OUTLINE, 1.0F, GRADIENT_FILL_RECT_H);
+}
+
+/// Paints what lies outside the rounding of a rectangle over with the outline's colour.
 void round_corners(Drawing& page, const RECT& bar) {
     constexpr COLORREF INSIDE = RGB(128, 128, 128);
     const int width = bar.right - bar.left;
     const int height = bar.bottom - bar.top;
-    Drawing mask(Canvas(width, height, PAPER));
+    Drawing mask(Canvas(width, height, OUTLINE));
     HBRUSH const brush = CreateSolidBrush(INSIDE);
     HGDIOBJ const brush_before = SelectObject(mask.dc(), brush);
     SelectObject(mask.dc(), GetStockObject(NULL_PEN));
@@ -102,6 +109,7 @@ int draw_elevations(const Map& map, Drawing& page, int left, int top) {
     constexpr int HEIGHT = 190;
     constexpr int WIDTH = 34;
     const RECT bar = {left, top + LINE, left + WIDTH, top + LINE + HEIGHT};
+    draw_bar_outline(page, bar);
     const std::vector<COLORREF> stops = elevation_stops();
     const auto parts = static_cast<int>(stops.size() - 1);
     for (int i = 0; i < parts; ++i) {  // from the highest down

@@ -7,6 +7,7 @@
 #include "src/frame/environment_state.h"
 #include "src/graphics/memory_surface.h"
 #include "src/graphics/os_codes.h"
+#include "src/graphics/solid_brush.h"
 
 namespace basalt::graphics {
 
@@ -43,28 +44,11 @@ void fill_gradient(HDC dc, const RECT& rectangle, COLORREF colour, float darkeni
     GradientFill(dc, vertices, 2, &JOINED, 1, mode);
 }
 
-/// A brush of one colour.
-class Brush {
-public:
-    explicit Brush(COLORREF colour) : m_brush(CreateSolidBrush(colour)) {}
-    ~Brush() {
-        if (m_brush != nullptr) {
-            DeleteObject(m_brush);
-        }
-    }
-    Brush(const Brush&) = delete;
-    Brush& operator=(const Brush&) = delete;
-    HBRUSH get() const { return m_brush; }
-
-private:
-    HBRUSH m_brush;
-};
-
 /// Paints what of a block lies outside its rounding with a colour, the rest with INSIDE.
 bool paint_corners(HDC dc, int width, int height, int diameter, COLORREF colour) {
-    const Brush outside(colour);
-    const Brush inside(INSIDE);
-    if (outside.get() == nullptr || inside.get() == nullptr) {
+    const SolidBrush outside(colour);
+    const SolidBrush inside(INSIDE);
+    if (!outside.is_ready() || !inside.is_ready()) {
         return false;
     }
     const RECT all = {0, 0, width, height};

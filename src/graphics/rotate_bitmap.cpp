@@ -4,6 +4,7 @@
 #include "basalt/graphics/bitmap.h"
 #include "basalt/platform/drawing.h"
 #include "src/graphics/memory_surface.h"
+#include "src/graphics/solid_brush.h"
 
 namespace basalt::graphics {
 
@@ -12,11 +13,10 @@ namespace {
 /// What nothing turns into: red 128, green 128, blue 0.
 constexpr COLORREF UNCOVERED = 0x008080;
 
-void fill(HDC dc, int width, int height, COLORREF colour) {
-    HBRUSH const brush = CreateSolidBrush(colour);
+bool fill(HDC dc, int width, int height, COLORREF colour) {
+    const SolidBrush brush(colour);
     const RECT all = {0, 0, width, height};
-    FillRect(dc, &all, brush);
-    DeleteObject(brush);
+    return brush.is_ready() && FillRect(dc, &all, brush.get()) != 0;
 }
 
 /// Copies a picture turned clockwise about the middle, on a surface that takes a transform.
@@ -58,10 +58,9 @@ bool RotateBitmap(CDC* dc, CBitmap* bitmap, float angle) {
         return false;
     }
     const MemorySurface work(source.dc(), CreateCompatibleBitmap(source.dc(), width, height));
-    if (!work.is_ready()) {
+    if (!work.is_ready() || !fill(work.dc(), width, height, UNCOVERED)) {
         return false;
     }
-    fill(work.dc(), width, height, UNCOVERED);
     const int mode = SetGraphicsMode(work.dc(), GM_ADVANCED);
     if (mode == 0) {
         return false;

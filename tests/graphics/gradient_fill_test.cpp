@@ -157,9 +157,9 @@ TEST(RoundedCorners, StandInTheRectanglesOwnPlace) {
 
 TEST(RoundedCorners, CutTheSameShapeAtEveryDepth) {
     const StoredOsCode os(NT);
-    const Fill corners = {7, 5, 50, 38, 20, 0xFFFFFF, 0, 1.0F, 0};
+    const Fill corners = {7, 5, 50, 38, 20, 0, 0xFFFFFF, 1.0F, 0};
     Picture expected(60, 45, 0);
-    paint(expected, corners, {0, 0, 0});
+    paint(expected, corners, {0xFF00, 0xFF00, 0xFF00});
     for (const int depth : {1, 4, 8, 16, 24, 32}) {
         SCOPED_TRACE(depth);
         TestSurface surface(60, 45, depth);

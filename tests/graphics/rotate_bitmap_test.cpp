@@ -55,7 +55,7 @@ TEST(RotateBitmap, TurnsByQuartersPixelForPixel) {
                             {24, 40}, {41, 24}, {24, 41}, {33, 57}, {2, 200}, {200, 1}};
     for (const auto& size : sizes) {
         const Picture picture = random_picture(random, size[0], size[1], COLOURS);
-        for (const int angle : {90, 180, 270, 360, 450, -90, -180, -270, -360, 3600, 36000090}) {
+        for (const int angle : {90, 180, 270, 360, 450, -90, -180, -270, -360, 3600, 3690}) {
             SCOPED_TRACE(testing::Message() << size[0] << " x " << size[1] << " by " << angle);
             expect_same(rotated(picture, static_cast<float>(angle)),
                         turned_by_quarters(picture, (angle / 90 % 4 + 4) % 4));

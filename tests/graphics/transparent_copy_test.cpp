@@ -27,11 +27,13 @@ std::vector<Copy> copies(std::mt19937& random, bool stretched) {
     for (int i = 0; i < 40; ++i) {
         Copy copy = {draw(-20, 45), draw(-20, 35), draw(1, 50), draw(1, 40),
                      draw(0, 15),   draw(0, 12),   draw(1, 16), draw(1, 12)};
+        all.push_back(copy);
+    }
+    for (Copy& copy : all) {
         if (!stretched) {
             copy.width = copy.source_width;
             copy.height = copy.source_height;
         }
-        all.push_back(copy);
     }
     return all;
 }

@@ -15,7 +15,7 @@
 namespace {
 
 constexpr int GAP = 28;  // between map and legend
-constexpr int LEGEND_WIDTH = 256;
+constexpr int LEGEND_WIDTH = 272;
 constexpr int MARGIN = 16;
 constexpr int BELOW_MAP = 40;
 constexpr int LINE = 22;
@@ -24,31 +24,62 @@ constexpr int SMALLEST_HEIGHT = 640;
 constexpr COLORREF OUTLINE = RGB(150, 150, 150);
 
 int legend_left(const Map& map) {
-    return MAP_LEFT + map.width + GAP;
+    return map_left(map) + map.width + GAP;
 }
 
-/// The largest of 1, 2 and 5 times a power of ten that goes at least so often into a range.
-double round_step(double range, double times) {
-    const double power = std::pow(10.0, std::floor(std::log10(range / times)));
-    for (const double factor : {5.0, 2.0}) {
-        if (power * factor * times <= range) {
+/// The smallest of 1, 2 and 5 times a power of ten that is not below a value.
+double rounded_up(double value) {
+    const double power = std::pow(10.0, std::floor(std::log10(value)));
+    for (const double factor : {1.0, 2.0, 5.0}) {
+        if (power * factor >= value) {
             return power * factor;
         }
     }
-    return power;
+    return 10.0 * power;
 }
 
 int decimals_for(double step) {
     return std::max(0, static_cast<int>(std::ceil(-std::log10(step) - 1e-9)));
 }
 
-/// Multiples of a step within a range, with their texts.
-template <typename Visit>
-void visit_ticks(double low, double high, double times, Visit visit) {
-    const double step = round_step(high - low, times);
-    for (double i = std::ceil(low / step); i * step <= high; ++i) {
-        visit(i * step, number_text(i * step, decimals_for(step)));
+/// Round values along a line of pixels that runs from one value to another.
+class Ticks {
+public:
+    /// Texts lie along the line, and need room for themselves, or across it.
+    Ticks(double from, double to, int pixels, bool along) : m_from(from), m_to(to), m_pixels(pixels) {
+        constexpr int CLOSEST = 50;
+        constexpr int BETWEEN = 20;
+        const double per_pixel = std::abs(to - from) / pixels;
+        m_step = rounded_up(CLOSEST * per_pixel);
+        if (along) {
+            m_step = rounded_up((Drawing::text_width(text(from)) + BETWEEN) * per_pixel);
+        }
     }
+    std::string text(double value) const { return number_text(value, decimals_for(m_step)); }
+
+    /// Calls visit(text, distance from the start in pixels).
+    template <typename Visit>
+    void visit(Visit visit) const {
+        for (double i = std::ceil(std::min(m_from, m_to) / m_step); i * m_step <= std::max(m_from, m_to);
+             ++i) {
+            visit(text(i * m_step),
+                  static_cast<int>(std::lround((i * m_step - m_from) / (m_to - m_from) * m_pixels)));
+        }
+    }
+
+private:
+    double m_from;
+    double m_to;
+    int m_pixels;
+    double m_step;
+};
+
+constexpr int TICK = 6;
+constexpr int TICK_TO_TEXT = 4;
+
+Ticks latitudes(const Map& map) {
+    const GridFrame& frame = map.outcome.area.frame();
+    return {frame.north(), frame.south, map.height, false};
 }
 
 /// A rounded rectangle one pixel larger than a bar: what is left of it around the bar is its outline.
@@ -83,30 +114,25 @@ TRIVERTEX vertex(int x, int y, COLORREF colour) {
 /// Degrees along the map's frame.
 void draw_frame(const Map& map, Drawing& page) {
     const GridFrame& frame = map.outcome.area.frame();
-    const RECT outline = {MAP_LEFT - 1, MAP_TOP - 1, MAP_LEFT + map.width + 1, MAP_TOP + map.height + 1};
+    const int left = map_left(map);
+    const RECT outline = {left - 1, MAP_TOP - 1, left + map.width + 1, MAP_TOP + map.height + 1};
     page.outline(outline, INK);
-    constexpr int TICK = 6;
-    constexpr double PIXELS_BETWEEN = 150.0;
-    visit_ticks(
-        frame.west, frame.east(), map.width / PIXELS_BETWEEN, [&](double degrees, const std::string& text) {
-            const int x =
-                MAP_LEFT + static_cast<int>((degrees - frame.west) / (frame.east() - frame.west) * map.width);
-            page.fill({x, outline.bottom, x + 1, outline.bottom + TICK}, INK);
-            page.text(x, outline.bottom + TICK + 4, text, INK, 2, Align::CENTRE);
-        });
-    visit_ticks(frame.south, frame.north(), map.height / PIXELS_BETWEEN,
-                [&](double degrees, const std::string& text) {
-                    const int y = MAP_TOP + static_cast<int>((frame.north() - degrees) /
-                                                             (frame.north() - frame.south) * map.height);
-                    page.fill({outline.left - TICK, y, outline.left, y + 1}, INK);
-                    page.text(outline.left - TICK - 4, y - Drawing::text_height() / 2, text, INK, 2,
-                              Align::RIGHT);
-                });
+    Ticks(frame.west, frame.east(), map.width, true).visit([&](const std::string& degrees, int at) {
+        const int x = left + at;
+        page.fill({x, outline.bottom, x + 1, outline.bottom + TICK}, INK);
+        page.text(x, outline.bottom + TICK + TICK_TO_TEXT, degrees, INK, 2, Align::CENTRE);
+    });
+    latitudes(map).visit([&](const std::string& degrees, int at) {
+        const int y = MAP_TOP + at;
+        page.fill({outline.left - TICK, y, outline.left, y + 1}, INK);
+        page.text(outline.left - TICK - TICK_TO_TEXT, y - Drawing::text_height() / 2, degrees, INK, 2,
+                  Align::RIGHT);
+    });
 }
 
 int draw_elevations(const Map& map, Drawing& page, int left, int top) {
     page.text(left, top, "ELEVATION, M", INK);
-    constexpr int HEIGHT = 190;
+    constexpr int HEIGHT = 210;
     constexpr int WIDTH = 34;
     const RECT bar = {left, top + LINE, left + WIDTH, top + LINE + HEIGHT};
     draw_bar_outline(page, bar);
@@ -120,15 +146,13 @@ int draw_elevations(const Map& map, Drawing& page, int left, int top) {
         GradientFill(page.dc(), ends, 2, &JOINED, 1, GRADIENT_FILL_RECT_V);
     }
     round_corners(page, bar);
-    const double range = map.relief.highest() - map.relief.lowest();
-    if (range > 0.0) {
-        visit_ticks(
-            map.relief.lowest(), map.relief.highest(), 4.0, [&](double metres, const std::string& text) {
-                const int y = bar.bottom -
-                              static_cast<int>(std::lround((metres - map.relief.lowest()) / range * HEIGHT));
-                page.fill({bar.right + 2, y, bar.right + 8, y + 1}, INK);
-                page.text(bar.right + 14, std::clamp<int>(y - 7, bar.top, bar.bottom - 14), text, INK);
-            });
+    if (map.relief.highest() > map.relief.lowest()) {
+        const Ticks ticks(map.relief.highest(), map.relief.lowest(), HEIGHT, false);
+        ticks.visit([&](const std::string& metres, int at) {
+            const int y = bar.top + at;
+            page.fill({bar.right + 2, y, bar.right + 8, y + 1}, INK);
+            page.text(bar.right + 14, std::clamp<int>(y - 7, bar.top, bar.bottom - 14), metres, INK);
+        });
     }
     return bar.bottom + LINE;
 }
@@ -143,8 +167,10 @@ int draw_depths(Drawing& page, int left, int top, const std::string& name, COLOR
     page.text(left + LEGEND_WIDTH, top, "0 - " + number_text(largest, largest < 10.0 ? 2 : 0) + " M", INK, 2,
               Align::RIGHT);
     top += LINE;
-    _gradientfill(page.dc(), left, top, left + width, top + HEIGHT, ROUNDING, PAPER, hue, darkening_at(part),
-                  GRADIENT_FILL_RECT_H);
+    const RECT bar = {left, top, left + width, top + HEIGHT};
+    draw_bar_outline(page, bar);
+    _gradientfill(page.dc(), bar.left, bar.top, bar.right, bar.bottom, ROUNDING, OUTLINE, hue,
+                  darkening_at(part), GRADIENT_FILL_RECT_H);
     return top + HEIGHT + 12;
 }
 
@@ -160,15 +186,18 @@ int draw_earthwork(const Map& map, Drawing& page, int left, int top) {
     if (map.largest_fill > 0.0) {
         top = draw_depths(page, left, top, "FILL", FILL, map.largest_fill, scale_end);
     }
-    const auto figure = [&](const std::string& name, double value) {
-        page.text(left, top, name, INK);
-        page.text(left + LEGEND_WIDTH, top, number_text(value, 0), INK, 2, Align::RIGHT);
+    const auto figure = [&](const std::string& name, double value, double metres, const char* power) {
+        constexpr double MOST = 1e11;  // what there is room for
+        const bool in_km = value >= MOST;
+        page.text(left, top, name + (in_km ? " KM" : " M") + power, INK);
+        page.text(left + LEGEND_WIDTH, top, number_text(in_km ? value / metres : value, in_km ? 3 : 0), INK,
+                  2, Align::RIGHT);
         top += LINE;
     };
     top += 4;
-    figure("CUT M3", survey.cut);
-    figure("FILL M3", survey.fill);
-    figure("AREA M2", survey.area);
+    figure("CUT", survey.cut, 1e9, "3");
+    figure("FILL", survey.fill, 1e9, "3");
+    figure("AREA", survey.area, 1e6, "2");
     return top + 12;
 }
 
@@ -195,8 +224,8 @@ int draw_lines(const Map& map, Drawing& page, int left, int top) {
 /// Four lengths, black and white by turns, and an arrow to the north.
 void draw_scale(const Map& map, Drawing& page, int left, int top) {
     constexpr int ARROW = 40;
-    constexpr double LONGEST = LEGEND_WIDTH - ARROW - 40;
-    const double metres = round_step(LONGEST * map.metres_per_pixel, 1.0);
+    constexpr double SHORTEST = 80.0;  // and at most two and a half times as long
+    const double metres = rounded_up(SHORTEST * map.metres_per_pixel);
     const int length = static_cast<int>(std::lround(metres / map.metres_per_pixel));
     constexpr int HEIGHT = 8;
     for (int i = 0; i < 4; ++i) {
@@ -219,6 +248,15 @@ void draw_scale(const Map& map, Drawing& page, int left, int top) {
 
 }  // namespace
 
+int map_left(const Map& map) {
+    const GridFrame& frame = map.outcome.area.frame();
+    const Ticks ticks = latitudes(map);
+    // One end of the range has the longest text.
+    const int longest = std::max(Drawing::text_width(ticks.text(frame.south)),
+                                 Drawing::text_width(ticks.text(frame.north())));
+    return MARGIN + longest + TICK_TO_TEXT + TICK;
+}
+
 Canvas page_for(const Map& map) {
     return {legend_left(map) + LEGEND_WIDTH + MARGIN,
             std::max(MAP_TOP + map.height + BELOW_MAP, SMALLEST_HEIGHT), PAPER};
@@ -228,7 +266,10 @@ void draw_legend(const Map& map, Drawing& page) {
     _operatingsystem();  // gradients are drawn once the system is known
     draw_frame(map, page);
     const int left = legend_left(map);
-    int top = draw_elevations(map, page, left, MAP_TOP);
+    int top = MAP_TOP;
+    if (map.outcome.survey.inside < map.outcome.area.cells()) {  // else no cell shows its elevation
+        top = draw_elevations(map, page, left, top);
+    }
     top = draw_earthwork(map, page, left, top);
     draw_lines(map, page, left, top);
     const int bottom = std::max(MAP_TOP + map.height, SMALLEST_HEIGHT - BELOW_MAP);

@@ -7,8 +7,8 @@
 #include "map.h"
 
 /// Where the map lies on a page with a legend, pixels.
-inline constexpr int MAP_LEFT = 84;
 inline constexpr int MAP_TOP = 16;
+int map_left(const Map& map);
 
 /// An empty page with room for the map and its legend.
 Canvas page_for(const Map& map);

@@ -18,7 +18,7 @@ PictureSize write_picture(const Outcome& outcome, WorkArea& area) {
     }
     const Canvas paper = page_for(map);
     Drawing page(paper);
-    BitBlt(page.dc(), MAP_LEFT, MAP_TOP, map.width, map.height, picture.dc(), 0, 0, SRCCOPY);
+    BitBlt(page.dc(), map_left(map), MAP_TOP, map.width, map.height, picture.dc(), 0, 0, SRCCOPY);
     draw_legend(map, page);
     page.save(file);
     return {paper.width(), paper.height(), map.metres_per_pixel};

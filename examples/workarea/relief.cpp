@@ -60,8 +60,9 @@ double Relief::elevation(double x, double y) const {
     const double north = y / m_cells_per_sample - 0.5 - row;
     const int i = static_cast<int>(column);
     const int j = static_cast<int>(row);
-    return (sample(i, j) * (1 - east) + sample(i + 1, j) * east) * (1 - north) +
-           (sample(i, j + 1) * (1 - east) + sample(i + 1, j + 1) * east) * north;
+    const double between = (sample(i, j) * (1 - east) + sample(i + 1, j) * east) * (1 - north) +
+                           (sample(i, j + 1) * (1 - east) + sample(i + 1, j + 1) * east) * north;
+    return has_elevation(between) ? between : sample(i + (east < 0.5 ? 0 : 1), j + (north < 0.5 ? 0 : 1));
 }
 
 double Relief::light(double x, double y) const {

@@ -20,7 +20,8 @@ public:
     double lowest() const { return m_lowest; }
     double highest() const { return m_highest; }
 
-    /// Elevation at a place, between the four samples around it, metres; NO_ELEVATION beside a missing one.
+    /// Elevation at a place, metres: between the four samples around it, or where one of them is missing that
+    /// of the nearest, which may be NO_ELEVATION.
     double elevation(double x, double y) const;
 
     /// Light that a place gets from the north-west, as a part of what level ground gets: 0 for none, up to

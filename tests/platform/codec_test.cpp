@@ -89,7 +89,9 @@ TEST_F(CodecTest, WritesFilesThatHoldThePicture) {
     std::mt19937 random(51);
     SCOPED_TRACE("seed 51");
     const std::wstring name = file(L"p\u00EEcture.png");
-    const std::filesystem::path path = m_folder / L"p\u00EEcture.png";
+    const std::filesystem::path path = m_folder /
+                                       "p\xC3\xAE"
+                                       "cture.png";
     for (const int depth : drawing::DEPTHS) {
         for (const int width : {700, 33, 2, 1}) {
             SCOPED_TRACE(testing::Message() << depth << " bits, width " << width);

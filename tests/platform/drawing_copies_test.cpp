@@ -297,7 +297,7 @@ TEST(TransformedCopy, TakesTheSourcePixelUnderEachMiddle) {
     for (const double angle : {30.0, 45.0, 123.4, -77.0, 359.0}) {
         transforms.push_back(turned(angle, 20, 15));
     }
-    transforms.push_back({2.5F, 0, 0, 0.75F, -10, 3});
+    transforms.push_back({2.37F, 0, 0, 0.71F, -10, 3});
     transforms.push_back({-1, 0, 0, 1, 40, 0});
     transforms.push_back({1, 0.3F, -0.7F, 1.2F, 5.25F, -3.5F});
     transforms.push_back({1e-3F, 0, 0, 1e-3F, 20, 15});
@@ -426,15 +426,16 @@ TEST(Transform, ReachesAllCallsOrIsRefused) {
     EXPECT_EQ(canvas.picture().at(5, 0), 0xFF0000U);
     EXPECT_EQ(canvas.picture().at(2, 1), 0U);
     EXPECT_NE(BitBlt(source, 0, 0, 8, 8, canvas, 0, 0, SRCCOPY), 0) << "from a shifted source";
-    EXPECT_EQ(source.picture().at(0, 3), 0xFF0000U & 0U);
+    EXPECT_EQ(source.picture().at(0, 3), 0xFF0000U);
+    EXPECT_EQ(source.picture().at(0, 2), 5U);
     // Steps and places far beyond any surface.
     const XFORM tiny = {1e-30F, 0, 0, 1e-30F, 0, 0};
     const XFORM far = {1, 0.5F, 0, 1, 3e38F, -3e38F};
     EXPECT_NE(SetWorldTransform(canvas, &tiny), 0);
     EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, source, 0, 0, SRCCOPY), 0);
-    EXPECT_EQ(DPtoLP(canvas, points, 1), 1);
-    points[0] = {INT_MAX, 1};
-    EXPECT_EQ(DPtoLP(canvas, points, 1), 0);
+    EXPECT_EQ(DPtoLP(canvas, points, 2), 0);
+    EXPECT_EQ(points[0].x, 1);
+    EXPECT_NE(DPtoLP(canvas, points + 1, 1), 0);
     EXPECT_NE(SetWorldTransform(canvas, &far), 0);
     expected = canvas.picture();
     EXPECT_NE(BitBlt(canvas, INT_MIN, INT_MIN, INT_MAX, INT_MAX, source, 0, 0, SRCCOPY), 0);

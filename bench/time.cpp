@@ -18,40 +18,43 @@ constexpr std::size_t COUNT = 1024;
 constexpr std::chrono::sys_days MJD_0 = std::chrono::year(1858) / std::chrono::November / 17;
 constexpr std::int64_t SECONDS_AT_MJD_0 = -3506716800;  // since 1970
 
+/// Wide fields: results written as four short ones and read as a whole would wait for the store buffer.
 struct Date {
-    std::uint16_t year, month, day, day_of_week;
+    unsigned year, month, day, day_of_week;
     bool operator==(const Date&) const = default;
 };
 
 Date library_date(std::uint32_t mjd) {
-    Date d = {};
-    _mjd2greg(mjd, d.year, d.month, d.day, d.day_of_week);
-    return d;
+    std::uint16_t year = 0;
+    std::uint16_t month = 0;
+    std::uint16_t day = 0;
+    std::uint16_t day_of_week = 0;
+    _mjd2greg(mjd, year, month, day, day_of_week);
+    return {year, month, day, day_of_week};
 }
 
 Date chrono_date(std::uint32_t mjd) {
     const std::chrono::sys_days day = MJD_0 + std::chrono::days(mjd);
     const std::chrono::year_month_day date = day;
-    return {static_cast<std::uint16_t>(static_cast<int>(date.year())),
-            static_cast<std::uint16_t>(static_cast<unsigned>(date.month())),
-            static_cast<std::uint16_t>(static_cast<unsigned>(date.day())),
-            static_cast<std::uint16_t>(std::chrono::weekday(day).c_encoding())};
+    return {static_cast<unsigned>(static_cast<int>(date.year())), static_cast<unsigned>(date.month()),
+            static_cast<unsigned>(date.day()), std::chrono::weekday(day).c_encoding()};
 }
 
 Date gmtime_date(std::uint32_t mjd) {
     const time_t seconds = SECONDS_AT_MJD_0 + std::int64_t{86400} * mjd;
     tm fields = {};
     gmtime_r(&seconds, &fields);
-    return {static_cast<std::uint16_t>(fields.tm_year + 1900), static_cast<std::uint16_t>(fields.tm_mon + 1),
-            static_cast<std::uint16_t>(fields.tm_mday), static_cast<std::uint16_t>(fields.tm_wday)};
+    return {static_cast<unsigned>(fields.tm_year + 1900), static_cast<unsigned>(fields.tm_mon + 1),
+            static_cast<unsigned>(fields.tm_mday), static_cast<unsigned>(fields.tm_wday)};
 }
 
 std::uint32_t library_mjd(const Date& date) {
-    return _greg2mjd(date.year, date.month, date.day);
+    return _greg2mjd(static_cast<std::uint16_t>(date.year), static_cast<std::uint16_t>(date.month),
+                     static_cast<std::uint16_t>(date.day));
 }
 
 std::uint32_t chrono_mjd(const Date& date) {
-    const std::chrono::sys_days day = std::chrono::year(date.year) / date.month / date.day;
+    const std::chrono::sys_days day = std::chrono::year(static_cast<int>(date.year)) / date.month / date.day;
     return static_cast<std::uint32_t>((day - MJD_0).count());
 }
 

@@ -55,9 +55,10 @@ std::string dms_text(double radians, int decimals) {
     const std::int64_t per_minute = 60 * per_second;
     const std::int64_t per_degree = 60 * per_minute;
     const double seconds = static_cast<double>(units % per_minute) / static_cast<double>(per_second);
-    return (signed_units < 0 ? "-" : "") + std::to_string(units / per_degree) + "-" +
-           two_digits(std::to_string(units % per_degree / per_minute)) + "-" +
-           two_digits(fixed_text(seconds, decimals));
+    std::string text(signed_units < 0 ? "-" : "");
+    text += std::to_string(units / per_degree) + "-";
+    text += two_digits(std::to_string(units % per_degree / per_minute)) + "-";
+    return text + two_digits(fixed_text(seconds, decimals));
 }
 
 std::string seconds_text(double radians) {

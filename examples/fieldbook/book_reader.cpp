@@ -189,7 +189,7 @@ private:
 
     CsvReader m_csv;
     Book m_book;
-    Place m_setup_place = {};
+    FilePlace m_setup_place = {};
 };
 
 }  // namespace

@@ -121,7 +121,10 @@ std::vector<SidePoint> reduce_side_sights(const Book& book, const Traverse& trav
             if (sight.kind != SightKind::SIDE && !open_end) {
                 continue;
             }
-            SidePoint side = {{sight.name, {}}, i, mean_of_faces(sight)};
+            SidePoint side = {};
+            side.point.name = sight.name;
+            side.setup = i;
+            side.observation = mean_of_faces(sight);
             side.observation.horizontal =
                 geo_normalised_bearing(traverse.back_bearing[i] + angle_right(setup, sight));
             geo_reduce_obs(side.observation, traverse.stations[i].at, setup.height - sight.height,

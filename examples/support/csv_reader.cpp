@@ -72,7 +72,7 @@ bool CsvReader::next() {
     return false;
 }
 
-Place CsvReader::place(std::size_t index) const {
+FilePlace CsvReader::place(std::size_t index) const {
     return {m_line, index < m_fields.size() ? m_fields[index].column : m_end_column};
 }
 
@@ -103,6 +103,6 @@ void CsvReader::fail(std::size_t index, const std::string& expected) const {
                                                        : ", but the line ends here"));
 }
 
-void CsvReader::fail_at(const Place& place, const std::string& message) const {
+void CsvReader::fail_at(const FilePlace& place, const std::string& message) const {
     throw InputError(m_path, place.line, place.column, message);
 }

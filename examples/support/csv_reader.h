@@ -10,7 +10,7 @@
 #include <vector>
 
 /// Where something stands in a file; both count from 1, columns in bytes.
-struct Place {
+struct FilePlace {
     std::size_t line;
     std::size_t column;
 };
@@ -28,9 +28,8 @@ public:
     /// Goes to the next record; false at the end of the file.
     bool next();
 
-    std::size_t size() const { return m_fields.size(); }
     /// Place of a field; behind the last one, of the line's end.
-    Place place(std::size_t index) const;
+    FilePlace place(std::size_t index) const;
     /// A field that must be there; `expected` says what it is.
     std::string_view text(std::size_t index, const char* expected) const;
     /// A finite number from `low` to `high`.
@@ -41,7 +40,7 @@ public:
     /// Throws `expected ..., not 'field'`, or `... but the line ends here`.
     [[noreturn]] void fail(std::size_t index, const std::string& expected) const;
     /// Throws a message about an earlier place.
-    [[noreturn]] void fail_at(const Place& place, const std::string& message) const;
+    [[noreturn]] void fail_at(const FilePlace& place, const std::string& message) const;
 
 private:
     struct CloseFile {

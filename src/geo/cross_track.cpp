@@ -22,6 +22,10 @@ constexpr double FINEST_STEP = 5e-9;
 /// it, what ellipsoid and sphere differ by.
 constexpr double FOOT_TOLERANCE = 5e-5;
 
+double length_of(double x, double y) {
+    return std::sqrt(x * x + y * y);
+}
+
 /// The point as it is seen from a place on the line, on the sphere: all without an angle.
 struct Sight {
     double ahead;     ///< sine of the distance, times the cosine of the angle between line and sight
@@ -42,17 +46,17 @@ public:
         const double east = m_longitude - (start_longitude + foot.longitude_change);
         const double sin_east = std::sin(east);
         const double cos_east = std::cos(east);
-        const double length = std::hypot(foot.latitude_sine, foot.latitude_cosine);
+        const double length = length_of(foot.latitude_sine, foot.latitude_cosine);
         const double sine = foot.latitude_sine / length;
         const double cosine = foot.latitude_cosine / length;
         // Components of the sight towards north and east at the foot.
         const double v = cosine * m_sine - sine * m_cosine * cos_east;
         const double u = sin_east * m_cosine;
-        const double azimuth_length = std::hypot(foot.azimuth_sine, foot.azimuth_cosine);
+        const double azimuth_length = length_of(foot.azimuth_sine, foot.azimuth_cosine);
         const double along_north = foot.azimuth_cosine / azimuth_length;
         const double along_east = foot.azimuth_sine / azimuth_length;
         return {u * along_east + v * along_north, u * along_north - v * along_east,
-                sine * m_sine + cosine * m_cosine * cos_east, std::sqrt(u * u + v * v)};
+                sine * m_sine + cosine * m_cosine * cos_east, length_of(u, v)};
     }
 
 private:
@@ -90,6 +94,7 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
     // Places between which the foot lies: the point is ahead of the first, behind the second.
     double low = -std::numeric_limits<double>::infinity();
     double high = std::numeric_limits<double>::infinity();
+    double step = std::numeric_limits<double>::infinity();
     LineEnd foot = best_foot;
     Sight sight = best;
     for (passes = 1;; ++passes) {
@@ -110,9 +115,13 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
         }
         (sight.skew() > goal.aim ? low : high) = along;
         // Napier's rule for the legs of a right-angled triangle gives the foot on a great circle; a geodesic
-        // of the ellipsoid leaves a hundredth of the way or less to the next pass.
-        along += SPHERE_RADIUS * (std::atan2(sight.ahead, sight.cosine) -
-                                  std::atan2(goal.aim * sight.distance, std::abs(sight.cosine)));
+        // of the ellipsoid leaves the next pass a fraction of the way. From the second step on that fraction
+        // is known, and what all further steps would add up to is made in one: this saves the last pass.
+        const double leg = SPHERE_RADIUS * (std::atan2(sight.ahead, sight.cosine) -
+                                            std::atan2(goal.aim * sight.distance, std::abs(sight.cosine)));
+        const double fraction = leg / step;
+        step = std::abs(fraction) < 0.1 ? leg / (1.0 - fraction) : leg;
+        along += step;
         if (!(along > low && along < high)) {
             along = low + (high - low) / 2.0;
         }

@@ -43,11 +43,6 @@ geo_vector cartesian(const geo_llh& llh) {
             sine * (n * Z_FACTOR + llh.height)};
 }
 
-double height_above_ellipsoid(double latitude, double sine, double cosine, double p, double z) {
-    const double n = prime_vertical_radius(sine);
-    return std::abs(latitude) <= POLAR_LATITUDE ? p / cosine - n : z / sine - n + n * ECCENTRICITY2;
-}
-
 /// Latitude and height by the iteration as it is written in the books; p is the distance from the axis.
 bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
     double latitude = std::atan2(z, p * FIRST_ESTIMATE_FACTOR);
@@ -66,53 +61,85 @@ bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
             }
         } while (!(change <= tolerance));
     }
+    const double n = prime_vertical_radius(sine);
     llh.latitude = latitude;
-    llh.height = height_above_ellipsoid(latitude, sine, std::cos(latitude), p, z);
+    llh.height =
+        std::abs(latitude) <= POLAR_LATITUDE ? p / std::cos(latitude) - n : z / sine - n + n * ECCENTRICITY2;
     return true;
 }
+
+constexpr double FLAT = 1.0 - ECCENTRICITY2;
 
 /// The same passes without an angle: the latitude is the direction of (p, q), and a pass takes q to
 /// z + N e^2 sin = z + a e^2 q / sqrt(p^2 + (1 - e^2) q^2), a root and a division for a sine and an
 /// arctangent. Two latitudes differ by the angle whose tangent is p (q - q') / (p^2 + q q').
 /// False when anything might be decided otherwise than by convert_plainly(): a tolerance or a point outside
-/// the range where rounding stays below the margin, a change too close to the tolerance, a latitude too close
-/// to where the height's formula changes.
-bool convert_quickly(double p, double z, double tolerance, geo_llh& llh) {
+/// the range where rounding stays below the margin, a change too close to the tolerance.
+bool settle_quickly(double p, double z, double tolerance, double& q) {
     const double p2 = p * p;
     const double distance2 = p2 + z * z;
     if (!(tolerance >= 1e-12 && tolerance <= 0.01 && distance2 > 1e12 && distance2 < 1e300)) {
         return false;
     }
     constexpr double AXIS_PULL = SEMI_MAJOR_AXIS * ECCENTRICITY2;
-    constexpr double FLAT = 1.0 - ECCENTRICITY2;
     const double margin = tolerance * 1e-4 + 1e-14;
     const double base = p * FIRST_ESTIMATE_FACTOR;
     // The first pass never settles: nothing stands before it.
-    double q = z + AXIS_PULL * z / std::sqrt(base * base + FLAT * (z * z));
+    q = z + AXIS_PULL * z / std::sqrt(base * base + FLAT * (z * z));
     int passes = 1;
     for (;;) {
         const double previous = q;
-        const double q2 = q * q;
-        q = z + AXIS_PULL * q / std::sqrt(p2 + FLAT * q2);
+        q = z + AXIS_PULL * q / std::sqrt(p2 + FLAT * (q * q));
         if (++passes > MOST_PASSES) {
             return false;
         }
         const double change = std::abs(q - previous) * p;
         const double unit = p2 + q * previous;
         if (change <= (tolerance - margin) * unit) {
-            break;
+            return true;
         }
         if (!(change > (tolerance + margin) * unit)) {
             return false;
         }
     }
-    const double latitude = std::atan2(q, p);
-    if (std::abs(std::abs(latitude) - POLAR_LATITUDE) < 1e-14) {
+}
+
+/// Latitude and height from where settle_quickly() ended; false when the latitude is too close to where the
+/// height's formula changes.
+bool convert_quickly(double p, double z, double tolerance, geo_llh& llh) {
+    double q = 0.0;
+    if (!settle_quickly(p, z, tolerance, q)) {
         return false;
     }
-    const double length = std::sqrt(p2 + q * q);
-    llh.latitude = latitude;
-    llh.height = height_above_ellipsoid(latitude, q / length, p / length, p, z);
+    llh.latitude = std::atan2(q, p);
+    const double length = std::sqrt(p * p + q * q);  // p over the cosine
+    // The divisor is 1 to the bit on the equator, so that heights there are exact.
+    const double n = SEMI_MAJOR_AXIS / (std::sqrt(p * p + FLAT * (q * q)) / length);
+    const double beyond = std::abs(llh.latitude) - POLAR_LATITUDE;
+    llh.height = beyond <= 0.0 ? length - n : z / (q / length) - n + n * ECCENTRICITY2;
+    return std::abs(beyond) > 1e-14;
+}
+
+/// Sines and cosines of a place's latitude and longitude.
+struct Rotation {
+    double sin_lat, cos_lat, sin_lon, cos_lon;
+};
+
+/// False when the place cannot be converted.
+bool rotation_at(const geo_vector& xyz, Rotation& r) {
+    const double p = std::sqrt(xyz.x * xyz.x + xyz.y * xyz.y);
+    double q = 0.0;
+    // Off the axis no angle is needed.
+    if (p > 1.0 && settle_quickly(p, xyz.z, LOCAL_FRAME_TOLERANCE, q)) {
+        const double length = std::sqrt(p * p + q * q);
+        r = {q / length, p / length, xyz.y / p, xyz.x / p};
+        return true;
+    }
+    geo_llh at = {};
+    if (_xyz2llh(&xyz, &at, LOCAL_FRAME_TOLERANCE) == 0) {
+        return false;
+    }
+    r = {std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude), std::cos(at.longitude)};
     return true;
 }
 
@@ -152,18 +179,14 @@ int _llh2xyz(const geo_llh* llh, geo_vector* xyz) {
 }
 
 int _xyz2nez(const geo_vector* origin, const geo_vector* point, geo_nee* out) {
-    geo_llh at = {};
-    if (_xyz2llh(origin, &at, LOCAL_FRAME_TOLERANCE) == 0) {
+    Rotation r = {};
+    if (!rotation_at(*origin, r)) {
         return 1;
     }
-    const double sin_lat = std::sin(at.latitude);
-    const double cos_lat = std::cos(at.latitude);
-    const double sin_lon = std::sin(at.longitude);
-    const double cos_lon = std::cos(at.longitude);
     const geo_vector d = {point->x - origin->x, point->y - origin->y, point->z - origin->z};
-    out->north = along({-sin_lat * cos_lon, -sin_lat * sin_lon, cos_lat}, d);
-    out->east = along({-sin_lon, cos_lon, 0.0}, d);
-    out->elevation = along({cos_lat * cos_lon, cos_lat * sin_lon, sin_lat}, d);
+    out->north = along({-r.sin_lat * r.cos_lon, -r.sin_lat * r.sin_lon, r.cos_lat}, d);
+    out->east = along({-r.sin_lon, r.cos_lon, 0.0}, d);
+    out->elevation = along({r.cos_lat * r.cos_lon, r.cos_lat * r.sin_lon, r.sin_lat}, d);
     return 1;
 }
 

@@ -18,19 +18,13 @@ constexpr double SECONDS_ROUNDING = 5e-6;
 constexpr double MOST_STEPPED = 1e6;
 constexpr std::uint32_t LARGEST_FINITE_FACTORIAL = 170;
 
-/// Whole part of a value, the nearest number Integer holds where it holds no such, and 0 for NaN.
-template <typename Integer>
-Integer whole_part(double value) {
-    // As a double the largest 64-bit number rounds up to the first that does not fit.
-    constexpr auto LARGEST = std::numeric_limits<Integer>::max();
-    constexpr auto SMALLEST = std::numeric_limits<Integer>::min();
-    if (value >= static_cast<double>(LARGEST)) {
-        return LARGEST;
+/// Whole part of a value above -1: the largest integer for one that is larger still, 0 for NaN.
+int whole_part(double value) {
+    constexpr double FIRST_TOO_LARGE = 2147483648.0;
+    if (value < FIRST_TOO_LARGE) {
+        return static_cast<int>(value);
     }
-    if (value <= static_cast<double>(SMALLEST)) {
-        return SMALLEST;
-    }
-    return std::isnan(value) ? 0 : static_cast<Integer>(value);
+    return std::isnan(value) ? 0 : std::numeric_limits<int>::max();
 }
 
 /// Numerator of the fraction of an inch, rounded to the nearest 1 / denominator. The remainder of doubles is
@@ -53,9 +47,9 @@ double _degtorad(double degrees) {
 void _radtodms(double radians, int* degrees, int* minutes, double* seconds) {
     const double angle = radians / RADIANS_PER_DEGREE;
     double rest = std::abs(angle) * 3600.0 + SECONDS_ROUNDING;
-    const int whole_degrees = whole_part<int>(rest / 3600.0);
+    const int whole_degrees = whole_part(rest / 3600.0);
     rest -= whole_degrees * 3600.0;
-    const int whole_minutes = whole_part<int>(rest / 60.0);
+    const int whole_minutes = whole_part(rest / 60.0);
     rest -= whole_minutes * 60.0;
     *degrees = angle >= 0.0 ? whole_degrees : -whole_degrees;
     *minutes = whole_minutes;
@@ -86,7 +80,7 @@ void _mtoftin(double metres, int fractionDenominator, bool* positive, int* feet,
         }
     }
     *positive = metres >= 0.0;
-    *feet = whole_part<int>(static_cast<double>(whole_part<std::int64_t>(total) / 12));
+    *feet = whole_part(std::trunc(total) / INCHES_PER_FOOT);
     *inches = std::fmod(total, INCHES_PER_FOOT);
     *numerator = parts;
     *denominator = of;

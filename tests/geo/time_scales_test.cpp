@@ -72,6 +72,9 @@ TEST(ModifiedJulianDate, KeepsToTheArithmeticForFarYears) {
         const auto mjd = static_cast<std::uint32_t>(random.real(0.0, 534402341.0));
         ASSERT_EQ(date_of(mjd), plain_date_of(mjd)) << mjd;
     }
+    for (std::uint32_t mjd = 0; mjd <= 23257590; mjd += 97) {
+        ASSERT_EQ(date_of(mjd), plain_date_of(mjd)) << mjd;
+    }
     for (const std::uint32_t mjd : {23257589U, 23257590U, 23257591U, 23257592U, 534402341U}) {
         EXPECT_EQ(date_of(mjd), plain_date_of(mjd)) << mjd;
     }

@@ -81,10 +81,14 @@ HRGN keep_region(std::unique_ptr<Region> region) {
 
 HRGN basalt::platform::create_region(std::span<const RECT> rectangles) {
     std::unique_ptr<Region> region(new (std::nothrow) Region);
-    if (region != nullptr && !rectangles.empty()) {
-        pixman_region32_t* const bands = &region->area.bands;
+    // The library writes to standard error about a single rectangle that is reversed.
+    const bool holds_none =
+        rectangles.empty() || (rectangles.size() == 1 && (rectangles[0].left >= rectangles[0].right ||
+                                                          rectangles[0].top >= rectangles[0].bottom));
+    if (region != nullptr && !holds_none) {
         if (rectangles.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()) ||
-            !pixman_region32_init_rects(bands, reinterpret_cast<const pixman_box32_t*>(rectangles.data()),
+            !pixman_region32_init_rects(&region->area.bands,
+                                        reinterpret_cast<const pixman_box32_t*>(rectangles.data()),
                                         static_cast<int>(rectangles.size()))) {
             region = nullptr;
         }
@@ -95,7 +99,7 @@ HRGN basalt::platform::create_region(std::span<const RECT> rectangles) {
 HRGN CreateRectRgn(int left, int top, int right, int bottom) {
     const RECT rectangle = {std::min(left, right), std::min(top, bottom), std::max(left, right),
                             std::max(top, bottom)};
-    return basalt::platform::create_region(std::span(&rectangle, left != right && top != bottom ? 1U : 0U));
+    return basalt::platform::create_region(std::span(&rectangle, 1));
 }
 
 int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {

@@ -20,7 +20,7 @@ struct Samples {
     std::int64_t source;  // first column of the source's
     std::int64_t source_size;
 
-    // The middle of the destination's column, scaled: 2^32 columns at most, so 64 bits hold the product.
+    // The middle of the destination's column, scaled; 64 bits hold the product of two sizes doubled.
     std::int64_t of(std::int64_t column) const {
         return source + (2 * (column - target) + 1) * source_size / (2 * size);
     }

@@ -141,8 +141,8 @@ public:
     /// Selects a bitmap as ::SelectObject does.
     /// @return a lent wrapper of the bitmap used before, to be selected back; null on failure
     CBitmap* SelectObject(const CBitmap* bitmap) {
-        return CBitmap::FromHandle(static_cast<HBITMAP>(
-            ::SelectObject(m_hDC, bitmap != nullptr ? bitmap->GetSafeHandle() : nullptr)));
+        HGDIOBJ const before = ::SelectObject(m_hDC, bitmap != nullptr ? bitmap->GetSafeHandle() : nullptr);
+        return before != nullptr ? CBitmap::FromHandle(static_cast<HBITMAP>(before)) : nullptr;
     }
 };
 

@@ -7,7 +7,6 @@
 #include <random>
 
 #include "tests/graphics/test_surface.h"
-#include "tests/support/failing_new.h"
 
 namespace {
 
@@ -177,22 +176,12 @@ TEST(RoundedCorners, LeaveNothingBehind) {
     paint(square, without, {0x4C80, 0x3300, 0x1980});
     Picture rounded(44, 44, GROUND);
     paint(rounded, corners, {0x4C80, 0x3300, 0x1980});
-    for (long nth = 1;; ++nth) {
-        TestSurface surface(Picture(44, 44, GROUND));
-        const long live = live_allocations();
-        bool fired = false;
-        {
-            const FailAllocation failure(nth);
-            fill(surface.dc(), corners);
-            fired = failure.fired();
-        }
-        EXPECT_EQ(live_allocations(), live) << nth;
-        expect_same(surface.picture(), fired ? square : rounded);
-        if (!fired) {
-            break;
-        }
-    }
-    TestSurface surface(44, 44);
+    TestSurface surface(Picture(44, 44, GROUND));
+    with_failing_allocations([&] { fill(surface.dc(), corners); },
+                             [&](bool fired) {
+                                 expect_same(surface.picture(), fired ? square : rounded);
+                                 surface.put(Picture(44, 44, GROUND));
+                             });
     HBRUSH const brush = CreateSolidBrush(0x010203);
     SelectObject(surface.dc(), brush);
     for (int i = 0; i < 17000; ++i) {  // four objects each, should any be left behind

@@ -3,7 +3,6 @@
 #include <random>
 
 #include "tests/graphics/test_surface.h"
-#include "tests/support/failing_new.h"
 
 namespace {
 
@@ -158,23 +157,13 @@ TEST(TransparentCopy, DrawsAllOrNothingWithoutMemory) {
     const auto copy = [&](HDC dest, int side) {
         _transparentblt(dest, 0, 0, side, side, source.dc(), 0, 0, side, side, KEY);
     };
-    for (long nth = 1;; ++nth) {
-        TestSurface dest(before);
-        const long live = live_allocations();
-        bool fired = false;
-        {
-            const FailAllocation failure(nth);
-            copy(dest.dc(), 64);
-            fired = failure.fired();
-        }
-        EXPECT_EQ(live_allocations(), live) << nth;
-        expect_same(dest.picture(), fired ? before : after);
-        if (!fired) {
-            break;
-        }
-    }
-    // More objects than there may be at once, should any be left behind.
     TestSurface dest(before);
+    with_failing_allocations([&] { copy(dest.dc(), 64); },
+                             [&](bool fired) {
+                                 expect_same(dest.picture(), fired ? before : after);
+                                 dest.put(before);
+                             });
+    // More objects than there may be at once, should any be left behind.
     for (int i = 0; i < 7000; ++i) {
         copy(dest.dc(), 1);
     }

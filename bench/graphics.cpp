@@ -247,7 +247,6 @@ void transparent_plain_loop(benchmark::State& state, int mean) {
             if ((from[i] & 0xFFFFFF) != KEY) {
                 drawn[i] = from[i];
             }
-            benchmark::DoNotOptimize(drawn.data());  // one pixel after the other, as written
         }
     });
 }

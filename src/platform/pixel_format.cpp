@@ -30,8 +30,8 @@ constexpr std::array<std::uint32_t, 256> make_mix() {
     for (std::uint32_t i = 1; i <= 28; ++i) {
         mix[at++] = i * 255 / 29 * 0x010101;
     }
-    for (const std::uint32_t word : {0xFFFBF0, 0xA0A0A4, 0x808080, 0xFF0000, 0x00FF00, 0xFFFF00, 0x0000FF,
-                                     0xFF00FF, 0x00FFFF, 0xFFFFFF}) {
+    for (const std::uint32_t word : {0xFFFBF0U, 0xA0A0A4U, 0x808080U, 0xFF0000U, 0x00FF00U, 0xFFFF00U,
+                                     0x0000FFU, 0xFF00FFU, 0x00FFFFU, 0xFFFFFFU}) {
         mix[at++] = word;
     }
     return mix;

@@ -16,6 +16,7 @@ class BASALT_API ColorPalette {
 public:
     /// A palette of the default colours.
     ColorPalette();
+    /// A palette of the same colours.
     ColorPalette(const ColorPalette& other) = default;
     ~ColorPalette() = default;
 

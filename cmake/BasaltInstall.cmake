@@ -9,6 +9,20 @@ install(TARGETS basalt EXPORT basalt-targets
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/include/basalt DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
 install(FILES ${PROJECT_BINARY_DIR}/include/basalt/version.h DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/basalt)
 
+# A static archive leaves its own dependencies to whoever links it.
+if(BUILD_SHARED_LIBS)
+  set(basalt_static_dependencies "")
+  set(pc_requires "")
+  set(pc_static_libs "")
+else()
+  set(basalt_static_dependencies "include(CMakeFindDependencyMacro)
+find_dependency(PkgConfig)
+pkg_check_modules(PIXMAN REQUIRED IMPORTED_TARGET GLOBAL pixman-1)
+")
+  set(pc_requires "Requires: pixman-1")
+  set(pc_static_libs "-lstdc++ -lm")
+endif()
+
 set(config_dir ${CMAKE_INSTALL_LIBDIR}/cmake/basalt)
 install(EXPORT basalt-targets NAMESPACE basalt:: DESTINATION ${config_dir})
 configure_package_config_file(cmake/basalt-config.cmake.in ${PROJECT_BINARY_DIR}/basalt-config.cmake
@@ -30,11 +44,6 @@ if(NOT IS_ABSOLUTE "${CMAKE_INSTALL_LIBDIR}" AND NOT IS_ABSOLUTE "${CMAKE_INSTAL
   set(pc_prefix "\${pcfiledir}/${up}")
   set(pc_libdir "\${prefix}/${CMAKE_INSTALL_LIBDIR}")
   set(pc_includedir "\${prefix}/${CMAKE_INSTALL_INCLUDEDIR}")
-endif()
-if(BUILD_SHARED_LIBS)
-  set(pc_static_libs "")
-else()
-  set(pc_static_libs "-lstdc++ -lm")
 endif()
 configure_file(cmake/basalt.pc.in ${PROJECT_BINARY_DIR}/basalt.pc @ONLY)
 install(FILES ${PROJECT_BINARY_DIR}/basalt.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)

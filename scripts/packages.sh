@@ -22,8 +22,8 @@ need_packages() {  # package names; nothing is asked of the network when all are
     DEBIAN_FRONTEND=noninteractive "${run[@]}" apt-get install -q -y --no-install-recommends "${missing[@]}" >/dev/null
 }
 
-BUILD_PACKAGES=(g++ cmake ninja-build)
+BUILD_PACKAGES=(g++ cmake ninja-build pkg-config libpixman-1-dev)
 TEST_PACKAGES=(libgtest-dev)
 PEER_PACKAGES=(libbenchmark-dev libabsl-dev libopenvdb-dev libtbb-dev libboost1.81-dev libgeos-dev
-    libgeographiclib-dev libproj-dev libspdlog-dev libcairo2-dev libpixman-1-dev)
-CHECK_PACKAGES=(binutils clang clang-format clang-tidy doxygen git libclang-rt-14-dev llvm locales pkg-config python3)
+    libgeographiclib-dev libproj-dev libspdlog-dev libcairo2-dev)
+CHECK_PACKAGES=(binutils clang clang-format clang-tidy doxygen git libclang-rt-14-dev llvm locales python3)

@@ -6,6 +6,7 @@
 
 #include "basalt/memory.h"
 #include "src/frame/codec_guard.h"
+#include "src/platform/codec.h"
 
 namespace {
 
@@ -13,10 +14,13 @@ namespace {
 // from their constructors, and until their destructors have run.
 constexpr int MODULE_PRIORITY = 101;
 
-// No codec is part of the library so far, so none starts.
-constexpr basalt::frame::CodecCalls NO_CODEC = {
-    .start = []() -> std::uintptr_t { return 0; },
-    .shut_down = [](std::uintptr_t) {},
+constexpr basalt::frame::CodecCalls CODEC = {
+    .start = []() -> std::uintptr_t {
+        const GdiplusStartupInput input = {1, nullptr, 0, 0};
+        std::uintptr_t token = 0;
+        return GdiplusStartup(&token, &input, nullptr) == Gdiplus::Ok ? token : 0;
+    },
+    .shut_down = GdiplusShutdown,
 };
 
 }  // namespace
@@ -24,7 +28,7 @@ constexpr basalt::frame::CodecCalls NO_CODEC = {
 // 1. Module state of the host's application framework: there is no framework here, so nothing is kept.
 
 // 2. The image codec's start-up guard.
-[[gnu::init_priority(MODULE_PRIORITY)]] basalt::frame::CodecGuard basalt::frame::codec_guard(NO_CODEC);
+[[gnu::init_priority(MODULE_PRIORITY)]] basalt::frame::CodecGuard basalt::frame::codec_guard(CODEC);
 
 // 3. The standard library's error categories: they come up with that library.
 

@@ -3,14 +3,17 @@
 #include <basalt/version.h>
 
 #include <chrono>
+#include <filesystem>
 #include <memory>
 #include <string>
+#include <system_error>
 #include <vector>
 
 #include "boundary_reader.h"
 #include "esri_grid_reader.h"
 #include "input_error.h"
 #include "options.h"
+#include "picture.h"
 #include "process.h"
 #include "program.h"
 #include "report.h"
@@ -53,8 +56,21 @@ std::string nothing_found(const Options& options, const Survey& survey) {
     return options.terrain + ": no cell " + (options.view ? "of the view " : "") + "has an elevation";
 }
 
+/// A slip of the fingers should not cost a terrain.
+void spare_inputs(const Options& options) {
+    for (const std::string& input : {options.terrain, options.boundary.value_or("")}) {
+        std::error_code no_such_file;
+        if (std::filesystem::equivalent(*options.picture, input, no_such_file)) {
+            throw InputError("--picture would overwrite " + input);
+        }
+    }
+}
+
 std::string measure(const Options& options) {
     // Small inputs first: a mistake in them is told before a large terrain is read.
+    if (options.picture) {
+        spare_inputs(options);
+    }
     const std::vector<Place> places =
         options.boundary ? read_boundary(*options.boundary) : std::vector<Place>();
     const std::unique_ptr<TerrainSource> terrain = open_terrain(options);
@@ -63,7 +79,7 @@ std::string measure(const Options& options) {
 
     WorkArea area(terrain->frame());
     const std::vector<geo_nee> boundary = in_plane(places, area.plane());
-    Outcome outcome{options, area, boundary, view, {}, {}, 0.0, 0.0, std::nullopt, std::nullopt};
+    Outcome outcome{options, area, boundary, view, {}, {}, 0.0, 0.0, {}, {}, {}};
     const std::optional<std::int64_t> memory_before = resident_memory();
     outcome.load = load_terrain(*terrain, area);
     const std::optional<std::int64_t> memory_after = resident_memory();
@@ -78,6 +94,9 @@ std::string measure(const Options& options) {
         throw InputError(nothing_found(options, outcome.survey));
     }
     outcome.memory_peak = peak_resident_memory();
+    if (options.picture) {
+        outcome.picture = write_picture(outcome, area);
+    }
     return write_report(outcome);
 }
 

@@ -22,11 +22,13 @@ const char* const USAGE =
     "degrees\n"
     "                       (default: the whole grid)\n"
     "  --grade ELEVATION    cut and fill against this elevation in metres (default: the mean elevation)\n"
+    "  --picture FILE       draw the terrain with boundary, view, cut and fill, as a BMP file\n"
+    "  --legend             with --picture: what its colours and lines mean, degrees, scale and north\n"
     "  --synthetic N        a generated terrain of N cells, at most 100000000, instead of a file\n"
     "  --help               print this and exit\n"
     "  --version            print the version and exit\n"
     "\n"
-    "Exit status: 0 success, 1 the report could not be written or memory ran out, 2 bad arguments or "
+    "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad arguments or "
     "input.\n";
 
 namespace {
@@ -86,13 +88,16 @@ void set_option(Options& options, std::string_view name, const std::string& valu
         set_once(options.view, parse_view(value), name);
     } else if (name == "--grade") {
         set_once(options.grade, parse_grade(value), name);
+    } else if (name == "--picture") {
+        set_once(options.picture, value, name);
     } else {
         set_once(options.synthetic, parse_cells(value), name);
     }
 }
 
 bool takes_value(std::string_view name) {
-    return name == "--boundary" || name == "--view" || name == "--grade" || name == "--synthetic";
+    return name == "--boundary" || name == "--view" || name == "--grade" || name == "--picture" ||
+           name == "--synthetic";
 }
 
 }  // namespace
@@ -115,6 +120,8 @@ Options parse_options(const std::vector<std::string>& arguments) {
         } else if (argument == "--help") {
             options.help = true;
             return options;
+        } else if (argument == "--legend") {
+            options.legend = true;
         } else if (argument == "--version") {
             options.version = true;
             return options;
@@ -136,6 +143,9 @@ Options parse_options(const std::vector<std::string>& arguments) {
     }
     if (!options.terrain.empty() && options.synthetic) {
         throw InputError("--synthetic replaces the terrain file; both are given");
+    }
+    if (options.legend && !options.picture) {
+        throw InputError("--legend goes with --picture");
     }
     return options;
 }

@@ -23,6 +23,8 @@ struct Options {
     std::optional<std::string> boundary;
     std::optional<DegreeBox> view;
     std::optional<double> grade;  ///< metres
+    std::optional<std::string> picture;
+    bool legend = false;
 };
 
 /// Reads the arguments that follow the program's name. InputError for anything it does not know.

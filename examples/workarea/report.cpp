@@ -137,6 +137,14 @@ void write_earthwork(Sheet& sheet, const Survey& s) {
     sheet.line("Cut less fill", number_text(s.cut - s.fill, 0), "m3");
 }
 
+void write_picture(Sheet& sheet, const std::string& file, const PictureSize& picture) {
+    sheet.section("Picture");
+    sheet.text("File", file);
+    sheet.line("Width", number_text(std::int64_t{picture.width}), "pixels");
+    sheet.line("Height", number_text(std::int64_t{picture.height}), "pixels");
+    sheet.line("Scale", number_text(picture.metres_per_pixel, 3), "m a pixel");
+}
+
 void write_store(Sheet& sheet, const Outcome& o) {
     const auto cells = static_cast<double>(o.area.cells());
     const double arithmetic =
@@ -186,6 +194,9 @@ std::string write_report(const Outcome& outcome) {
     write_terrain(sheet, outcome);
     write_view(sheet, outcome);
     write_earthwork(sheet, outcome.survey);
+    if (outcome.picture) {
+        write_picture(sheet, *outcome.options.picture, *outcome.picture);
+    }
     write_store(sheet, outcome);
     write_times(sheet, outcome);
     return sheet.take();

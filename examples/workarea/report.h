@@ -12,6 +12,13 @@
 #include "survey.h"
 #include "terrain_loader.h"
 
+/// A picture that was drawn.
+struct PictureSize {
+    int width;  ///< pixels
+    int height;
+    double metres_per_pixel;  ///< of its map
+};
+
 /// Everything the report speaks of.
 struct Outcome {
     const Options& options;
@@ -24,6 +31,7 @@ struct Outcome {
     double visit_seconds;
     std::optional<std::int64_t> memory_grown;  ///< resident bytes, by loading
     std::optional<std::int64_t> memory_peak;   ///< resident bytes
+    std::optional<PictureSize> picture;
 };
 
 std::string write_report(const Outcome& outcome);

@@ -262,6 +262,67 @@ border '50,0\n51,0\n51,1\n'
 refused "border.csv: no cell of the view lies inside the boundary" plain.asc --boundary border.csv
 refused "none.csv: cannot be opened: No such file or directory" plain.asc --boundary none.csv
 
+# Pictures, as another program reads them
+succeeds plain.asc --picture picture.bmp
+is "Width" 680
+is "Height" 507 # three degrees north at the equator, of 110.574 km, to four east, of 111.320 km, less a fifth of a pixel
+rm picture.bmp
+# a boundary around the two western columns of the two southern rows
+border '10,-1.5\n12,-1.5\n12,0.5\n10,0.5\n'
+succeeds plain.asc --boundary border.csv --picture=picture.bmp --legend
+[ "$(figure "Width")" -gt 680 ] || fail "there is no room for a legend: $(figure "Width")"
+cp plain.asc input.asc
+refused "--legend goes with --picture" plain.asc --legend
+refused "option --picture is given twice" plain.asc --picture a --picture b
+refused "--picture would overwrite input.asc" input.asc --picture input.asc
+refused "--picture would overwrite border.csv" plain.asc --boundary border.csv --picture ./border.csv
+run plain.asc --picture no/picture.bmp
+[ $code -eq 1 ] && [ "$(cat err)" = "workarea: cannot write to no/picture.bmp: No such file or directory" ] ||
+    fail "exit $code in a folder that is not there: $(cat err)"
+if convert -version >/dev/null 2>&1; then
+    # pixel X Y: colour as RRGGBB; strongest X Y: its largest channel
+    pixel() { convert picture.bmp -format "%[hex:u.p{$1,$2}]" info: | cut -c1-6; }
+    strongest() {
+        local p=$(pixel $1 $2)
+        local red=$((16#${p:0:2})) green=$((16#${p:2:2})) blue=$((16#${p:4:2}))
+        if [ $red -gt $green ] && [ $red -gt $blue ]; then echo red; elif [ $green -gt $blue ]; then echo green; else echo blue; fi
+    }
+    shows() { [ "$($1 $2 $3)" = $4 ] || fail "pixel $2, $3 is $(pixel $2 $3), not $4"; }
+
+    succeeds plain.asc --grade 60 --picture picture.bmp
+    [[ "$(identify picture.bmp)" == *" BMP"*" 680x507 "* ]] || fail "identify says: $(identify picture.bmp)"
+    shows strongest 85 84 blue   # 10 m
+    shows strongest 425 422 red  # 110 m
+    shows pixel 595 422 DEDEDE   # no elevation
+
+    succeeds plain.asc --grade 60 --boundary border.csv --view 10.5,-1.5,14,1.5 --picture picture.bmp
+    shows strongest 425 84 green # 30 m, outside the boundary: ground in its own colour
+    shows strongest 255 422 red  # 100 m, inside
+    shows strongest 255 253 red  # 60 m, inside; 50 m to the west
+    shows pixel 340 330 262626   # the boundary's eastern side
+    shows pixel 200 168 262626   # and its northern side, at 0.5 degrees
+    shows pixel 88 0 262626      # the view's first dash
+
+    succeeds flat.asc --grade 5 --picture picture.bmp
+    shows pixel 340 250 78B2FF   # nothing to fill, under the light of level ground
+    succeeds flat.asc --grade 4 --picture picture.bmp
+    shows pixel 340 250 623523   # the deepest cut: 255, 138 and 92 by 2.6
+
+    # Ground that faces the light from the north-west is brighter than level ground, 78B2FF, other ground darker.
+    slope() { printf 'ncols 3\nnrows 3\nxllcorner 10\nyllcorner 0\ncellsize 0.001\n%s\n%s\n%s\n' "$@" >slope.asc; }
+    light() {
+        succeeds slope.asc --grade 50 --picture picture.bmp
+        local p=$(pixel 340 340)
+        echo $((16#${p:0:2} - 16#78 > 0))
+    }
+    slope "0 50 100" "0 50 100" "0 50 100"; [ "$(light)" = 1 ] || fail "a slope that faces west is dark"
+    slope "100 50 0" "100 50 0" "100 50 0"; [ "$(light)" = 0 ] || fail "a slope that faces east is bright"
+    slope "0 0 0" "50 50 50" "100 100 100"; [ "$(light)" = 1 ] || fail "a slope that faces north is dark"
+    slope "100 100 100" "50 50 50" "0 0 0"; [ "$(light)" = 0 ] || fail "a slope that faces south is bright"
+else
+    echo "SKIPPED: the pictures' colours, for want of ImageMagick"
+fi
+
 # The command line
 refused "no terrain file given (--help shows how)"
 refused "unknown option '--colour' (--help lists them)" plain.asc --colour

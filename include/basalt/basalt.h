@@ -6,6 +6,7 @@
 #include "basalt/files.h"
 #include "basalt/frame.h"
 #include "basalt/geo.h"
+#include "basalt/graphics.h"
 #include "basalt/memory.h"
 #include "basalt/platform.h"
 #include "basalt/sparse.h"

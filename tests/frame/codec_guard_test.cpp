@@ -5,6 +5,8 @@
 #include <thread>
 #include <vector>
 
+#include "src/platform/codec.h"
+
 namespace {
 
 using basalt::frame::CodecCalls;
@@ -109,10 +111,14 @@ TEST_F(CodecGuardTest, threads_share_one_run) {
     }
 }
 
-TEST_F(CodecGuardTest, the_modules_own_has_no_codec_yet) {
+TEST_F(CodecGuardTest, the_modules_own_runs_the_image_codec) {
+    UINT count = 0;
+    UINT size = 0;
     basalt::frame::codec_guard.AddImage();
-    EXPECT_FALSE(basalt::frame::codec_guard.Start());
+    EXPECT_TRUE(basalt::frame::codec_guard.Start());
+    EXPECT_EQ(GdipGetImageEncodersSize(&count, &size), Gdiplus::Ok);
     basalt::frame::codec_guard.ReleaseImage();
+    EXPECT_EQ(GdipGetImageEncodersSize(&count, &size), Gdiplus::GdiplusNotInitialized);
 }
 
 }  // namespace

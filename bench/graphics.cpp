@@ -1,0 +1,447 @@
+// Drawing beside cairo, pixman and plain loops. Before a row is timed, its picture is compared with the
+// library's, where the two draw the same picture.
+#include <benchmark/benchmark.h>
+
+#include <cmath>
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <numbers>
+#include <random>
+#include <vector>
+
+#include "basalt/graphics.h"
+#include "basalt/platform.h"
+
+#ifdef BENCH_HAS_CAIRO
+#include <cairo.h>
+#endif
+#ifdef BENCH_HAS_PIXMAN
+#include <pixman.h>
+#endif
+
+namespace {
+
+constexpr int WIDTH = 1920;
+constexpr int HEIGHT = 1080;
+constexpr std::uint32_t KEY = 0x00808080;
+
+using Pixels = std::vector<std::uint32_t>;
+
+/// A 32-bit surface with a context.
+class Screen {
+public:
+    Screen(int width, int height, const std::uint32_t* pixels = nullptr) : m_width(width), m_height(height) {
+        m_dc.CreateCompatibleDC(nullptr);
+        m_bitmap.CreateBitmap(width, height, 1, 32, pixels);
+        m_replaced = m_dc.SelectObject(&m_bitmap);
+    }
+    ~Screen() { m_dc.SelectObject(m_replaced); }
+    Screen(const Screen&) = delete;
+    Screen& operator=(const Screen&) = delete;
+
+    operator HDC() const { return m_dc; }
+    CBitmap& bitmap() { return m_bitmap; }
+    Pixels pixels() const {
+        Pixels result(static_cast<std::size_t>(m_width) * static_cast<std::size_t>(m_height));
+        BITMAPINFO info = {{40, m_width, -m_height, 1, 32, BI_RGB, 0, 0, 0, 0, 0}, {}};
+        GetDIBits(m_dc, m_bitmap, 0, static_cast<UINT>(m_height), result.data(), &info, DIB_RGB_COLORS);
+        return result;
+    }
+
+private:
+    int m_width;
+    int m_height;
+    CDC m_dc;
+    CBitmap m_bitmap;
+    CBitmap* m_replaced = nullptr;
+};
+
+/// Times `draw`, after one call whose picture has to be within `slack` levels of the one expected.
+template <typename Draw>
+void run(benchmark::State& state, const Pixels& drawn, const Pixels& expected, int slack, const Draw& draw) {
+    draw();
+    for (std::size_t i = 0; i < drawn.size(); ++i) {
+        for (const int shift : {0, 8, 16}) {
+            const auto level = [shift](std::uint32_t word) { return static_cast<int>(word >> shift & 0xFF); };
+            if (std::abs(level(drawn[i]) - level(expected[i])) > slack) {
+                state.SkipWithError("pictures differ");
+                return;
+            }
+        }
+    }
+    for ([[maybe_unused]] auto _ : state) {
+        draw();
+        benchmark::ClobberMemory();
+    }
+}
+
+template <typename Draw>
+void run_own(benchmark::State& state, const Draw& draw) {
+    draw();
+    for ([[maybe_unused]] auto _ : state) {
+        draw();
+        benchmark::ClobberMemory();
+    }
+}
+
+// Nearest colour
+// ----------------------------------------------------------------------------------------------
+
+std::vector<std::uint32_t> random_colours() {
+    std::mt19937 random(1);
+    std::vector<std::uint32_t> colours(1024);
+    for (std::uint32_t& colour : colours) {
+        colour = static_cast<std::uint32_t>(random()) & 0xFFFFFF;
+    }
+    return colours;
+}
+
+unsigned char scan(const std::uint32_t* colours, std::uint32_t wanted) {
+    int best = 300;
+    unsigned char candidate = 0;
+    for (int i = 0; i < 256; ++i) {
+        if (colours[i] == wanted) {
+            return static_cast<unsigned char>(i);
+        }
+        int distance = 0;
+        for (const int shift : {16, 8, 0}) {
+            const int a = static_cast<int>(colours[i] >> shift & 0xFF);
+            const int b = static_cast<int>(wanted >> shift & 0xFF);
+            distance += std::abs((a - b) * 100 / 255);
+        }
+        if (distance < best) {
+            best = distance;
+            candidate = static_cast<unsigned char>(i);
+        }
+    }
+    return candidate;
+}
+
+template <typename Find>
+void nearest_colour(benchmark::State& state, const Find& find) {
+    const ColorPalette palette;
+    const std::vector<std::uint32_t> colours = random_colours();
+    for (const std::uint32_t colour : colours) {
+        if (find(colour) != palette.FindClosestColor(colour)) {
+            state.SkipWithError("answers differ");
+            return;
+        }
+    }
+    std::size_t at = 0;
+    for ([[maybe_unused]] auto _ : state) {
+        benchmark::DoNotOptimize(find(colours[at]));
+        at = (at + 1) % colours.size();
+    }
+}
+
+void nearest_colour_basalt(benchmark::State& state) {
+    const ColorPalette palette;
+    nearest_colour(state, [&palette](std::uint32_t colour) { return palette.FindClosestColor(colour); });
+}
+
+void nearest_colour_scan(benchmark::State& state) {
+    std::uint32_t colours[256];
+    ColorPalette().ToMemory(colours);
+    nearest_colour(state, [&colours](std::uint32_t colour) { return scan(colours, colour); });
+}
+
+BENCHMARK(nearest_colour_basalt)->Name("nearest_colour/basalt");
+BENCHMARK(nearest_colour_scan)->Name("nearest_colour/plain_scan");
+
+// Gradients
+// ---------------------------------------------------------------------------------------------------
+
+void draw_gradient(HDC dc, DWORD mode) {
+    const TRIVERTEX corners[2] = {{0, 0, 0xFF00, 0x4000, 0, 0}, {WIDTH, HEIGHT, 0x7F00, 0x2000, 0xFF00, 0}};
+    const GRADIENT_RECT mesh = {0, 1};
+    GradientFill(dc, corners, 2, &mesh, 1, mode);
+}
+
+void gradient_basalt(benchmark::State& state, DWORD mode) {
+    const Screen screen(WIDTH, HEIGHT);
+    run_own(state, [&] { draw_gradient(screen, mode); });
+}
+
+void gradient_copied_row(benchmark::State& state) {
+    const Screen screen(WIDTH, HEIGHT);
+    draw_gradient(screen, GRADIENT_FILL_RECT_H);
+    const Pixels expected = screen.pixels();
+    Pixels drawn = expected;
+    run(state, drawn, expected, 0, [&] {
+        for (int y = 1; y < HEIGHT; ++y) {
+            std::memcpy(&drawn[static_cast<std::size_t>(y) * WIDTH], drawn.data(), WIDTH * 4);
+        }
+    });
+}
+
+#ifdef BENCH_HAS_CAIRO
+
+void gradient_cairo(benchmark::State& state, DWORD mode) {
+    const Screen screen(WIDTH, HEIGHT);
+    draw_gradient(screen, mode);
+    Pixels drawn(static_cast<std::size_t>(WIDTH) * HEIGHT);
+    cairo_surface_t* const surface = cairo_image_surface_create_for_data(
+        reinterpret_cast<unsigned char*>(drawn.data()), CAIRO_FORMAT_RGB24, WIDTH, HEIGHT, WIDTH * 4);
+    cairo_t* const context = cairo_create(surface);
+    const bool across = mode == GRADIENT_FILL_RECT_H;
+    cairo_pattern_t* const pattern =
+        cairo_pattern_create_linear(0, 0, across ? WIDTH : 0, across ? 0 : HEIGHT);
+    cairo_pattern_add_color_stop_rgb(pattern, 0, 1, 64 / 255.0, 0);
+    cairo_pattern_add_color_stop_rgb(pattern, 1, 127 / 255.0, 32 / 255.0, 1);
+    cairo_set_source(context, pattern);
+    // It samples at the pixel's middle and rounds, which makes a level of difference.
+    run(state, drawn, screen.pixels(), 1, [&] {
+        cairo_paint(context);
+        cairo_surface_flush(surface);
+    });
+    cairo_pattern_destroy(pattern);
+    cairo_destroy(context);
+    cairo_surface_destroy(surface);
+}
+
+#endif
+
+BENCHMARK_CAPTURE(gradient_basalt, across, GRADIENT_FILL_RECT_H)->Name("gradient_horizontal/basalt");
+#ifdef BENCH_HAS_CAIRO
+BENCHMARK_CAPTURE(gradient_cairo, across, GRADIENT_FILL_RECT_H)->Name("gradient_horizontal/cairo");
+#endif
+BENCHMARK(gradient_copied_row)->Name("gradient_horizontal/copying_a_row_down");
+BENCHMARK_CAPTURE(gradient_basalt, down, GRADIENT_FILL_RECT_V)->Name("gradient_vertical/basalt");
+#ifdef BENCH_HAS_CAIRO
+BENCHMARK_CAPTURE(gradient_cairo, down, GRADIENT_FILL_RECT_V)->Name("gradient_vertical/cairo");
+#endif
+
+// Copies that leave a colour out
+// ------------------------------------------------------------------------------
+
+/// Runs of the key and of other colours, of 1 to twice `mean` pixels.
+Pixels runs_of(int mean) {
+    std::mt19937 random(2);
+    Pixels pixels(static_cast<std::size_t>(WIDTH) * HEIGHT);
+    bool is_key = false;
+    for (std::size_t i = 0; i < pixels.size();) {
+        const std::size_t length = 1 + random() % static_cast<unsigned>(2 * mean);
+        for (std::size_t end = std::min(i + length, pixels.size()); i < end; ++i) {
+            pixels[i] = is_key ? KEY : static_cast<std::uint32_t>(random()) & 0x00FFFFFF;
+        }
+        is_key = !is_key;
+    }
+    return pixels;
+}
+
+void transparent_basalt(benchmark::State& state, int mean) {
+    const Screen source(WIDTH, HEIGHT, runs_of(mean).data());
+    const Screen screen(WIDTH, HEIGHT);
+    run_own(state, [&] { TransparentBlt(screen, 0, 0, WIDTH, HEIGHT, source, 0, 0, WIDTH, HEIGHT, KEY); });
+}
+
+void transparent_plain_loop(benchmark::State& state, int mean) {
+    const Pixels from = runs_of(mean);
+    const Screen source(WIDTH, HEIGHT, from.data());
+    const Screen screen(WIDTH, HEIGHT);
+    TransparentBlt(screen, 0, 0, WIDTH, HEIGHT, source, 0, 0, WIDTH, HEIGHT, KEY);
+    Pixels drawn(from.size());
+    run(state, drawn, screen.pixels(), 0, [&] {
+        for (std::size_t i = 0; i < from.size(); ++i) {
+            if ((from[i] & 0xFFFFFF) != KEY) {
+                drawn[i] = from[i];
+            }
+        }
+    });
+}
+
+void transparent_memcpy(benchmark::State& state, int mean) {
+    const Pixels from = runs_of(mean);
+    Pixels drawn(from.size());
+    run(state, drawn, from, 0, [&] { std::memcpy(drawn.data(), from.data(), from.size() * 4); });
+}
+
+BENCHMARK_CAPTURE(transparent_basalt, short_runs, 4)->Name("transparent_copy_of_short_runs/basalt");
+BENCHMARK_CAPTURE(transparent_plain_loop, short_runs, 4)->Name("transparent_copy_of_short_runs/plain_loop");
+BENCHMARK_CAPTURE(transparent_memcpy, short_runs, 4)->Name("transparent_copy_of_short_runs/memcpy");
+BENCHMARK_CAPTURE(transparent_basalt, long_runs, 200)->Name("transparent_copy_of_long_runs/basalt");
+BENCHMARK_CAPTURE(transparent_plain_loop, long_runs, 200)->Name("transparent_copy_of_long_runs/plain_loop");
+BENCHMARK_CAPTURE(transparent_memcpy, long_runs, 200)->Name("transparent_copy_of_long_runs/memcpy");
+
+// Rotation
+// ----------------------------------------------------------------------------------------------------
+
+Pixels noise() {
+    std::mt19937 random(3);
+    Pixels pixels(static_cast<std::size_t>(WIDTH) * HEIGHT);
+    for (std::uint32_t& pixel : pixels) {
+        pixel = static_cast<std::uint32_t>(random()) & 0x00FFFFFF;
+    }
+    return pixels;
+}
+
+XFORM turn(double degrees) {
+    const double a = degrees * std::numbers::pi / 180;
+    const double x = WIDTH / 2;
+    const double y = HEIGHT / 2;
+    const double c = std::cos(a);
+    const double s = std::sin(a);
+    return {static_cast<float>(c),
+            static_cast<float>(s),
+            static_cast<float>(-s),
+            static_cast<float>(c),
+            static_cast<float>(x - x * c + y * s),
+            static_cast<float>(y - x * s - y * c)};
+}
+
+void rotation_basalt(benchmark::State& state) {
+    const Screen source(WIDTH, HEIGHT, noise().data());
+    const Screen screen(WIDTH, HEIGHT);
+    const XFORM transform = turn(static_cast<double>(state.range(0)));
+    SetGraphicsMode(screen, GM_ADVANCED);
+    SetWorldTransform(screen, &transform);
+    run_own(state, [&] { BitBlt(screen, 0, 0, WIDTH, HEIGHT, source, 0, 0, SRCCOPY); });
+}
+
+#ifdef BENCH_HAS_PIXMAN
+
+void rotation_pixman(benchmark::State& state) {
+    Pixels from = noise();
+    Pixels to(from.size());
+    pixman_image_t* const source =
+        pixman_image_create_bits(PIXMAN_x8r8g8b8, WIDTH, HEIGHT, from.data(), WIDTH * 4);
+    pixman_image_t* const screen =
+        pixman_image_create_bits(PIXMAN_x8r8g8b8, WIDTH, HEIGHT, to.data(), WIDTH * 4);
+    const XFORM t = turn(static_cast<double>(state.range(0)));
+    pixman_f_transform f = {{{double{t.eM11}, double{t.eM21}, double{t.eDx}},
+                             {double{t.eM12}, double{t.eM22}, double{t.eDy}},
+                             {0, 0, 1}}};
+    pixman_f_transform inverse;
+    pixman_f_transform_invert(&inverse, &f);
+    pixman_transform_t fixed;
+    pixman_transform_from_pixman_f_transform(&fixed, &inverse);
+    pixman_image_set_transform(source, &fixed);
+    pixman_image_set_filter(source, PIXMAN_FILTER_NEAREST, nullptr, 0);
+    const auto draw = [&] {
+        pixman_image_composite32(PIXMAN_OP_OVER, source, nullptr, screen, 0, 0, 0, 0, 0, 0, WIDTH, HEIGHT);
+    };
+    // Its places have 16 bits behind the point: by the far edge, some pixels are their neighbours.
+    const Screen own_source(WIDTH, HEIGHT, noise().data());
+    const Screen own(WIDTH, HEIGHT);
+    SetGraphicsMode(own, GM_ADVANCED);
+    SetWorldTransform(own, &t);
+    BitBlt(own, 0, 0, WIDTH, HEIGHT, own_source, 0, 0, SRCCOPY);
+    draw();
+    const Pixels expected = own.pixels();
+    std::size_t different = 0;
+    for (std::size_t i = 0; i < to.size(); ++i) {
+        different += ((to[i] ^ expected[i]) & 0xFFFFFF) != 0;
+    }
+    if (different > to.size() / 50) {
+        state.SkipWithError("pictures differ");
+    } else {
+        for ([[maybe_unused]] auto _ : state) {
+            draw();
+            benchmark::ClobberMemory();
+        }
+    }
+    pixman_image_unref(source);
+    pixman_image_unref(screen);
+}
+
+#endif
+
+BENCHMARK(rotation_basalt)->Name("rotation/basalt")->ArgName("degrees")->Arg(5)->Arg(30)->Arg(90);
+#ifdef BENCH_HAS_PIXMAN
+BENCHMARK(rotation_pixman)->Name("rotation/pixman")->ArgName("degrees")->Arg(5)->Arg(30)->Arg(90);
+#endif
+
+// Regions
+// -----------------------------------------------------------------------------------------------------
+
+constexpr int SIDE = 2000;
+
+Pixels blobs() {
+    Pixels pixels(static_cast<std::size_t>(SIDE) * SIDE);
+    for (int y = 0; y < SIDE; ++y) {
+        for (int x = 0; x < SIDE; ++x) {
+            const int dx = x % 200 - 100;
+            const int dy = y % 200 - 100;
+            pixels[static_cast<std::size_t>(y * SIDE + x)] = dx * dx + dy * dy < 6400 ? 0x00FFFFFF : KEY;
+        }
+    }
+    return pixels;
+}
+
+Pixels checkerboard() {
+    Pixels pixels(static_cast<std::size_t>(SIDE) * SIDE);
+    for (int i = 0; i < SIDE * SIDE; ++i) {
+        pixels[static_cast<std::size_t>(i)] = (i / SIDE + i) % 2 == 0 ? 0x00FFFFFF : KEY;
+    }
+    return pixels;
+}
+
+void region_basalt(benchmark::State& state, Pixels (*picture)()) {
+    CBitmap bitmap;
+    bitmap.CreateBitmap(SIDE, SIDE, 1, 32, picture().data());
+    run_own(state, [&] {
+        CRgn region;
+        vex_util::mfc::RegionFromBitmap(region, bitmap, KEY);
+    });
+}
+
+#ifdef BENCH_HAS_PIXMAN
+
+/// The rows' runs, sorted as they come, and the region made of them at once.
+void region_pixman(benchmark::State& state, Pixels (*picture)()) {
+    const Pixels pixels = picture();
+    CBitmap bitmap;
+    bitmap.CreateBitmap(SIDE, SIDE, 1, 32, pixels.data());
+    CRgn expected;
+    vex_util::mfc::RegionFromBitmap(expected, bitmap, KEY);
+    pixman_region32_t region;
+    const auto make = [&] {
+        std::vector<pixman_box32_t> boxes;
+        for (int y = 0; y < SIDE; ++y) {
+            const std::uint32_t* const row = &pixels[static_cast<std::size_t>(y) * SIDE];
+            for (int x = 0; x < SIDE;) {
+                if (row[x] == KEY) {
+                    ++x;
+                    continue;
+                }
+                const int start = x;
+                while (x < SIDE && row[x] != KEY) {
+                    ++x;
+                }
+                boxes.push_back({start, y, x, y + 1});
+            }
+        }
+        pixman_region32_init_rects(&region, boxes.data(), static_cast<int>(boxes.size()));
+    };
+    make();
+    for (int i = 0; i < SIDE * SIDE; i += 37) {
+        const int x = i % SIDE;
+        const int y = i / SIDE;
+        if (expected.PtInRegion(x, y) != pixman_region32_contains_point(&region, x, y, nullptr)) {
+            state.SkipWithError("regions differ");
+            return;
+        }
+    }
+    pixman_region32_fini(&region);
+    for ([[maybe_unused]] auto _ : state) {
+        make();
+        pixman_region32_fini(&region);
+    }
+}
+
+#endif
+
+BENCHMARK_CAPTURE(region_basalt, blobs, blobs)->Name("region_of_blobs/basalt");
+#ifdef BENCH_HAS_PIXMAN
+BENCHMARK_CAPTURE(region_pixman, blobs, blobs)->Name("region_of_blobs/pixman_from_sorted_rectangles");
+#endif
+BENCHMARK_CAPTURE(region_basalt, checkerboard, checkerboard)->Name("region_of_a_checkerboard/basalt");
+#ifdef BENCH_HAS_PIXMAN
+BENCHMARK_CAPTURE(region_pixman, checkerboard, checkerboard)
+    ->Name("region_of_a_checkerboard/pixman_from_sorted_rectangles");
+#endif
+
+}  // namespace
+
+BENCHMARK_MAIN();

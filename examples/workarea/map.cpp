@@ -1,0 +1,162 @@
+#include "map.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstddef>
+#include <utility>
+
+#include "map_colours.h"
+
+namespace {
+
+/// Place of a point of the local plane on the map.
+CanvasPoint on_map(const Map& map, const geo_nee& point) {
+    const GridFrame& frame = map.outcome.area.frame();
+    const geo_nee corner = map.outcome.area.plane().to_grid(frame.west, frame.north(), 0.0);
+    return {(point.east - corner.east) / map.metres_per_pixel,
+            (corner.north - point.north) / map.metres_per_pixel};
+}
+
+/// Which pixels count, row by row: inside the view, and inside the boundary by the even-odd rule.
+class CountedPixels {
+public:
+    explicit CountedPixels(const Map& map) : m_map(map) {
+        for (const geo_nee& point : map.outcome.boundary) {
+            m_boundary.push_back(on_map(map, point));
+        }
+    }
+    /// Must come before `counts` for the pixels of a row.
+    void go_to_row(int y) {
+        m_crossings.clear();
+        const double middle = y + 0.5;
+        for (std::size_t i = 0; i < m_boundary.size(); ++i) {
+            const CanvasPoint& a = m_boundary[i];
+            const CanvasPoint& b = m_boundary[(i + 1) % m_boundary.size()];
+            if ((a.y <= middle) != (b.y <= middle)) {
+                m_crossings.push_back(a.x + (b.x - a.x) * (middle - a.y) / (b.y - a.y));
+            }
+        }
+        std::sort(m_crossings.begin(), m_crossings.end());
+    }
+    bool counts(int x, int cell_x, int cell_y) const {
+        if (!m_map.outcome.view.contains(cell_x, cell_y)) {
+            return false;
+        }
+        const double middle = x + 0.5;
+        const auto before = std::lower_bound(m_crossings.begin(), m_crossings.end(), middle);
+        return m_boundary.empty() || (before - m_crossings.begin()) % 2 != 0;
+    }
+
+private:
+    const Map& m_map;
+    std::vector<CanvasPoint> m_boundary;
+    std::vector<double> m_crossings;
+};
+
+/// Calls visit(x, y, place in cells east, north, counts) for every pixel of the map.
+template <typename Visit>
+void visit_pixels(const Map& map, Visit visit) {
+    const GridFrame& frame = map.outcome.area.frame();
+    CountedPixels counted(map);
+    for (int y = 0; y < map.height; ++y) {
+        counted.go_to_row(y);
+        const double cell_y = (map.height - y - 0.5) / map.height * frame.rows;
+        for (int x = 0; x < map.width; ++x) {
+            const double cell_x = (x + 0.5) / map.width * frame.columns;
+            visit(x, y, cell_x, cell_y,
+                  counted.counts(x, static_cast<int>(cell_x), static_cast<int>(cell_y)));
+        }
+    }
+}
+
+void draw_polygon(Canvas& canvas, const std::vector<CanvasPoint>& points, double thickness, COLORREF colour,
+                  double opacity) {
+    for (std::size_t i = 0; i < points.size(); ++i) {
+        canvas.line(points[i], points[(i + 1) % points.size()], thickness, colour, opacity);
+    }
+}
+
+void draw_boundary(const Map& map, Canvas& canvas) {
+    std::vector<CanvasPoint> points;
+    for (const geo_nee& point : map.outcome.boundary) {
+        points.push_back(on_map(map, point));
+    }
+    draw_polygon(canvas, points, 4.5, PAPER, 0.8);
+    draw_polygon(canvas, points, 2.0, INK, 1.0);
+}
+
+void draw_view(const Map& map, Canvas& canvas) {
+    const DegreeBox& view = *map.outcome.options.view;
+    const LocalPlane& plane = map.outcome.area.plane();
+    const CanvasPoint upper_left = on_map(map, plane.to_grid(view.west, view.north, 0.0));
+    const CanvasPoint lower_right = on_map(map, plane.to_grid(view.east, view.south, 0.0));
+    const auto dashed = [&](CanvasPoint from, CanvasPoint to) {
+        constexpr double DASH = 9.0;
+        const double length = std::hypot(to.x - from.x, to.y - from.y);
+        const auto at = [&](double along) {
+            const double part = std::min(1.0, along / length);
+            return CanvasPoint{from.x + part * (to.x - from.x), from.y + part * (to.y - from.y)};
+        };
+        for (double along = 0.0; along < length; along += 2.0 * DASH) {
+            canvas.line(at(along), at(along + DASH), 2.0, INK);
+        }
+    };
+    const CanvasPoint upper_right = {lower_right.x, upper_left.y};
+    const CanvasPoint lower_left = {upper_left.x, lower_right.y};
+    draw_polygon(canvas, {upper_left, upper_right, lower_right, lower_left}, 4.0, PAPER, 0.7);
+    dashed(upper_left, upper_right);
+    dashed(upper_right, lower_right);
+    dashed(lower_right, lower_left);
+    dashed(lower_left, upper_left);
+}
+
+}  // namespace
+
+Map lay_out_map(const Outcome& outcome, const Relief& relief, int longer_side) {
+    const GridFrame& frame = outcome.area.frame();
+    const geo_nee south_west = outcome.area.plane().to_grid(frame.west, frame.south, 0.0);
+    const geo_nee north_east = outcome.area.plane().to_grid(frame.east(), frame.north(), 0.0);
+    const double east = north_east.east - south_west.east;
+    const double north = north_east.north - south_west.north;
+    const double scale = std::max(east, north) / longer_side;
+    Map map = {outcome,
+               relief,
+               std::max(1, static_cast<int>(std::lround(east / scale))),
+               std::max(1, static_cast<int>(std::lround(north / scale))),
+               scale,
+               0.0,
+               0.0};
+    visit_pixels(map, [&](int, int, double cell_x, double cell_y, bool counts) {
+        const double above = relief.elevation(cell_x, cell_y) - outcome.survey.grade;
+        if (counts && !std::isnan(above)) {
+            map.largest_cut = std::max(map.largest_cut, above);
+            map.largest_fill = std::max(map.largest_fill, -above);
+        }
+    });
+    return map;
+}
+
+Canvas draw_map(const Map& map) {
+    Canvas canvas(map.width, map.height, PAPER);
+    const std::vector<COLORREF> stops = elevation_stops();
+    const double range = std::max(map.relief.highest() - map.relief.lowest(), 1e-3);
+    const double depth = std::max({map.largest_cut, map.largest_fill, 1e-3});
+    visit_pixels(map, [&](int x, int y, double cell_x, double cell_y, bool counts) {
+        const double elevation = map.relief.elevation(cell_x, cell_y);
+        COLORREF colour = NO_DATA;
+        if (!std::isnan(elevation)) {
+            const double above = elevation - map.outcome.survey.grade;
+            colour = counts ? darkened(above > 0.0 ? CUT : FILL, std::abs(above) / depth)
+                            : between_stops(stops, (elevation - map.relief.lowest()) / range);
+            colour = lit(colour, map.relief.light(cell_x, cell_y));
+        }
+        canvas.set(x, y, colour);
+    });
+    if (!map.outcome.boundary.empty()) {
+        draw_boundary(map, canvas);
+    }
+    if (map.outcome.options.view) {
+        draw_view(map, canvas);
+    }
+    return canvas;
+}

@@ -1,0 +1,12 @@
+/// @file
+/// Colours, drawing and bitmaps.
+///
+/// A colour is 0x00BBGGRR: red in the low byte, then green, then blue.
+#ifndef BASALT_GRAPHICS_H
+#define BASALT_GRAPHICS_H
+
+#include "basalt/graphics/bitmap.h"
+#include "basalt/graphics/drawing.h"
+#include "basalt/graphics/palette.h"
+
+#endif

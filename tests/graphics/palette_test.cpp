@@ -1,0 +1,161 @@
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cstdint>
+#include <cstdlib>
+#include <random>
+
+#include "basalt/graphics.h"
+#include "src/graphics/closest_colour.h"
+
+namespace {
+
+using Colours = std::array<std::uint32_t, 256>;
+
+int channel(std::uint32_t colour, int shift) {
+    return static_cast<int>(colour >> shift & 0xFF);
+}
+
+/// The search as a scan from the first colour to the last.
+int plain_closest(const Colours& colours, std::uint32_t wanted) {
+    int best = 300;
+    int candidate = 0;
+    for (int i = 0; i < 256; ++i) {
+        const std::uint32_t entry = colours[static_cast<std::size_t>(i)];
+        if (entry == wanted) {
+            return i;
+        }
+        int distance = 0;
+        for (const int shift : {16, 8, 0}) {
+            distance += std::abs((channel(entry, shift) - channel(wanted, shift)) * 100 / 255);
+        }
+        if (distance < best) {
+            best = distance;
+            candidate = i;
+        }
+    }
+    return candidate;
+}
+
+Colours colours_of(const ColorPalette& palette) {
+    Colours colours = {};
+    palette.ToMemory(colours.data());
+    return colours;
+}
+
+TEST(DefaultPalette, IsMadeOfBasicColoursHuesAndGreys) {
+    const ColorPalette palette;
+    const std::uint32_t basic[] = {0x0000FF, 0x00FFFF, 0x00FF00, 0xFFFF00, 0xFF0000,
+                                   0xFF00FF, 0xFFFFFF, 0x808080, 0xC0C0C0};
+    for (unsigned char i = 0; i < 9; ++i) {
+        EXPECT_EQ(palette[i], basic[i]);
+    }
+    // A hue's full colour at five levels, each followed by one whose channels are halfway to the leading one.
+    const int levels[5][2] = {{255, 255}, {204, 204}, {152, 153}, {127, 127}, {76, 76}};
+    for (int group = 0; group < 24; ++group) {
+        for (int level = 0; level < 5; ++level) {
+            const auto at = static_cast<unsigned char>(9 + 10 * group + 2 * level);
+            const std::uint32_t full = palette[at];
+            const std::uint32_t pale = palette[static_cast<unsigned char>(at + 1)];
+            int leading = 0;
+            for (const int shift : {0, 8, 16}) {
+                leading = std::max(leading, channel(full, shift));
+            }
+            EXPECT_GE(leading, levels[level][0]) << group;
+            EXPECT_LE(leading, levels[level][1]) << group;
+            for (const int shift : {0, 8, 16}) {
+                // Channels were cut from exact shares of the level, which loses up to one each.
+                EXPECT_NEAR(channel(pale, shift), (channel(full, shift) + leading) / 2.0, 1.0) << group;
+            }
+        }
+        // Red leads, then green, then blue, and the hue goes round in steps of a quarter of a channel's rise.
+        const std::uint32_t hue = palette[static_cast<unsigned char>(9 + 10 * group)];
+        const int rise[] = {0, 63, 127, 191, 255};
+        const int within = group % 4;
+        const bool rising = group / 4 % 2 == 0;
+        const int moving = rising ? rise[within] : rise[4 - within];
+        const int leads = (group + 4) / 8 % 3 * 8;
+        EXPECT_EQ(channel(hue, leads), 255) << group;
+        EXPECT_EQ(static_cast<int>(hue & 0xFF) + channel(hue, 8) + channel(hue, 16), 255 + moving) << group;
+    }
+    const int greys[] = {0, 51, 91, 132, 173, 214};
+    for (unsigned i = 0; i < 6; ++i) {
+        EXPECT_EQ(palette[static_cast<unsigned char>(249 + i)],
+                  static_cast<std::uint32_t>(greys[i]) * 0x010101U);
+    }
+    EXPECT_EQ(palette[255], 0xFFFFFFU);
+}
+
+TEST(Palette, SaysItsRanges) {
+    EXPECT_EQ(ColorPalette::GetSize(), 256U);
+    EXPECT_EQ(ColorPalette()[ColorPalette::GetWhiteColorIndex()], 0xFFFFFFU);
+    EXPECT_EQ(ColorPalette::GetSecondPaletteStartIndex(), 0);
+    EXPECT_EQ(ColorPalette::GetSecondPaletteEndIndex() + 1, ColorPalette::GetLargePaletteStartIndex());
+    EXPECT_EQ(ColorPalette::GetLargePaletteStartIndex() + 24 * 10, ColorPalette::GetThirdPaletteStartIndex());
+    EXPECT_EQ(ColorPalette::GetLargePaletteEndIndex() + 1, ColorPalette::GetThirdPaletteStartIndex());
+    EXPECT_EQ(ColorPalette::GetThirdPaletteEndIndex(), 254);
+    static_assert(sizeof(ColorPalette) == 1024);
+}
+
+TEST(Palette, GoesThroughMemory) {
+    Colours colours = {};
+    for (std::uint32_t i = 0; i < 256; ++i) {
+        colours[i] = i * 0x01010101U;
+    }
+    ColorPalette palette;
+    palette.FromMemory(colours.data());
+    ColorPalette other;
+    other = palette;
+    EXPECT_EQ(colours_of(other), colours);
+    EXPECT_NE(colours_of(ColorPalette()), colours);
+}
+
+TEST(ClosestColour, IsTheFirstOfTheNearest) {
+    const ColorPalette palette;
+    EXPECT_EQ(palette.FindClosestColor(0x000000), 249);
+    EXPECT_EQ(palette.FindClosestColor(0xFFFFFF), 6);
+    EXPECT_EQ(palette.FindClosestColor(0x0000FE), 0);
+    Colours colours;
+    colours.fill(0x01FFFFFF);
+    ColorPalette white;
+    white.FromMemory(colours.data());
+    EXPECT_EQ(white.FindClosestColor(0), 0);  // nothing nearer than the greatest distance
+    colours[7] = 0x02FFFFFF;
+    white.FromMemory(colours.data());
+    EXPECT_EQ(white.FindClosestColor(0x02FFFFFF), 7);  // entry 0 is at distance 0, 7 is equal
+}
+
+TEST(ClosestColour, AgreesWithTheScan) {
+    std::mt19937 random(17);
+    SCOPED_TRACE("seed 17");
+    for (int round = 0; round < 400; ++round) {
+        ColorPalette palette;
+        if (round % 2 == 1) {
+            // Few levels make equal distances and equal colours common; the high byte counts for equality
+            // alone.
+            const std::uint32_t mask = round % 4 == 1 ? 0x01030303U : 0x80FFFFFFU;
+            Colours colours = {};
+            for (std::uint32_t& colour : colours) {
+                colour = static_cast<std::uint32_t>(random()) & mask;
+            }
+            palette.FromMemory(colours.data());
+        }
+        const Colours colours = colours_of(palette);
+        for (int i = 0; i < 200; ++i) {
+            const auto drawn = static_cast<std::uint32_t>(random());
+            const std::uint32_t wanted =
+                i % 2 == 0 ? colours[drawn & 0xFF] ^ (drawn >> 31) : drawn & 0x01FFFFFF;
+            const int expected = plain_closest(colours, wanted);
+            ASSERT_EQ(palette.FindClosestColor(wanted), expected) << std::hex << wanted;
+            ASSERT_EQ(basalt::graphics::closest_colour_portable(colours.data(), wanted), expected);
+        }
+    }
+}
+
+TEST(ComplementaryColour, IsDarkOverLight) {
+    EXPECT_EQ(_complementarycolor(0x808080), 0xFFFFFFU);
+    EXPECT_EQ(_complementarycolor(0x818080), 0x505050U);
+    EXPECT_EQ(_complementarycolor(0xFF000000), 0xFFFFFFU);
+}
+
+}  // namespace

@@ -1,0 +1,176 @@
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <new>
+#include <random>
+#include <vector>
+
+#include "tests/graphics/test_surface.h"
+
+namespace {
+
+using namespace basalt::test;
+using vex_util::mfc::RegionFromBitmap;
+
+constexpr COLORREF KEY = 0xC08040;
+
+// The region as described: a rectangle for every run of every row, one after the other.
+void unite_runs(CRgn& region, const Picture& picture, COLORREF key) {
+    region.CreateRectRgn(0, 0, 0, 0);
+    for (int y = 0; y < picture.height; ++y) {
+        int x = 0;
+        while (x < picture.width) {
+            const int start = x;
+            while (x < picture.width && picture.at(x, y) != key) {
+                ++x;
+            }
+            if (x > start) {
+                CRgn run;
+                run.CreateRectRgn(start, y, x, y + 1);
+                region.CombineRgn(&region, &run, RGN_OR);
+            }
+            ++x;
+        }
+    }
+}
+
+void expect_region(CBitmap& bitmap, const Picture& picture, COLORREF key) {
+    CRgn region;
+    ASSERT_TRUE(RegionFromBitmap(region, bitmap, key));
+    for (int y = -1; y <= picture.height; ++y) {
+        for (int x = -1; x <= picture.width; ++x) {
+            ASSERT_EQ(region.PtInRegion(x, y) != 0, picture.has(x, y) && picture.at(x, y) != key)
+                << x << ", " << y;
+        }
+    }
+    CRgn united;
+    unite_runs(united, picture, key);
+    EXPECT_NE(region.EqualRgn(&united), 0);
+}
+
+TEST(RegionFromBitmap, HoldsThePixelsNotOfTheColour) {
+    std::mt19937 random(101);
+    SCOPED_TRACE("seed 101");
+    const std::vector<std::vector<COLORREF>> mixes = {
+        {KEY, 0xFFFFFF}, {KEY, KEY, KEY, KEY, KEY, KEY, 0x102030}, {0xFFFFFF, 0xC08041, 0x408040, KEY}};
+    for (int width = 1; width <= 200; width += width < 70 ? 1 : 29) {
+        SCOPED_TRACE(width);
+        Picture picture = random_picture(random, width, 7, mixes[random() % mixes.size()]);
+        for (int x = 0; x < width; ++x) {  // rows that are alike, and rows of one colour
+            picture.at(x, 3) = picture.at(x, 2);
+            picture.at(x, 5) = width % 2 == 0 ? KEY : 0xFFFFFF;
+        }
+        TestSurface surface(picture);
+        expect_region(surface.bitmap(), picture, KEY);
+    }
+}
+
+TEST(RegionFromBitmap, ReadsLargeBitmapsInPieces) {
+    std::mt19937 random(102);
+    SCOPED_TRACE("seed 102");
+    for (const auto& [width, height] : {std::pair(3, 9000), std::pair(20000, 3)}) {
+        Picture picture(width, height, KEY);
+        for (int i = 0; i < 300; ++i) {
+            picture.pixels[random() % picture.pixels.size()] = 0;
+        }
+        TestSurface surface(picture);
+        expect_region(surface.bitmap(), picture, KEY);
+    }
+}
+
+TEST(RegionFromBitmap, IsEmptyOrWholeForOneColour) {
+    for (const COLORREF colour : {KEY, COLORREF{0}}) {
+        TestSurface surface(Picture(65, 40, colour));
+        CRgn region;
+        ASSERT_TRUE(RegionFromBitmap(region, surface.bitmap(), KEY));
+        RECT box;
+        EXPECT_EQ(region.GetRgnBox(&box), colour == KEY ? NULLREGION : SIMPLEREGION);
+        EXPECT_EQ(box.right, colour == KEY ? 0 : 65);
+        EXPECT_EQ(box.bottom, colour == KEY ? 0 : 40);
+    }
+}
+
+TEST(RegionFromBitmap, ComparesAtEveryDepth) {
+    std::mt19937 random(103);
+    SCOPED_TRACE("seed 103");
+    // Each in the tables of 4 and 8 bits, and 5-5-5 in all channels.
+    const std::vector<COLORREF> colours = {0, 0xFFFFFF, 0x0000FF, 0xFF0000};
+    for (const int depth : {1, 4, 8, 16, 24, 32}) {
+        SCOPED_TRACE(depth);
+        for (const COLORREF key : colours) {
+            TestSurface surface(random_picture(random, 37, 9, colours), depth);
+            const Picture stored = surface.picture();
+            expect_region(surface.bitmap(), stored, key);
+        }
+    }
+}
+
+TEST(RegionFromBitmap, ComparesTheWholeWordOfAPixel) {
+    const std::uint32_t words[] = {0x00804020, 0x01804020, 0xFF804020, 0x00804021};
+    CBitmap bitmap;
+    bitmap.CreateBitmap(4, 1, 1, 32, words);
+    CRgn region;
+    ASSERT_TRUE(RegionFromBitmap(region, bitmap, 0xAA204080));  // the colour's own high byte plays no part
+    for (int x = 0; x < 4; ++x) {
+        EXPECT_EQ(region.PtInRegion(x, 0), x != 0);
+    }
+
+    const std::uint16_t five_five_five[] = {0x10 << 10 | 0x08 << 5 | 0x04,
+                                            0x8000 | 0x10 << 10 | 0x08 << 5 | 0x04,
+                                            0x10 << 10 | 0x08 << 5 | 0x05, 0};
+    CBitmap narrow;
+    narrow.CreateBitmap(4, 1, 1, 16, five_five_five);
+    CRgn narrow_region;
+    ASSERT_TRUE(RegionFromBitmap(narrow_region, narrow, RGB(0x87, 0x40, 0x27)));  // cut to five bits
+    for (int x = 0; x < 4; ++x) {
+        EXPECT_EQ(narrow_region.PtInRegion(x, 0), x != 0);
+    }
+}
+
+TEST(RegionFromBitmap, LeavesTheRegionAloneOnFailure) {
+    TestSurface surface(Picture(5, 1, 0));
+    CRgn region;
+    EXPECT_FALSE(RegionFromBitmap(region, surface.bitmap(), 0x100000000));
+    CBitmap none;
+    EXPECT_FALSE(RegionFromBitmap(region, none, 0));
+    EXPECT_EQ(region.GetSafeHandle(), nullptr);
+    region.CreateRectRgn(1, 2, 3, 4);
+    HGDIOBJ const held = region.GetSafeHandle();
+    EXPECT_FALSE(RegionFromBitmap(region, surface.bitmap(), 0));
+    EXPECT_EQ(region.GetSafeHandle(), held);
+    EXPECT_NE(region.PtInRegion(2, 3), 0);
+}
+
+TEST(RegionFromBitmap, ThrowsOrFailsWithoutMemory) {
+    Picture picture(100, 4, KEY);
+    for (int x = 0; x < 100; x += 2) {
+        picture.at(x, x % 4) = 0;
+    }
+    TestSurface surface(picture);
+    CBitmap& bitmap = surface.bitmap();
+    bool made = false;
+    bool holds_one = false;
+    int thrown = 0;
+    with_failing_allocations(
+        [&] {
+            CRgn region;
+            made = false;
+            try {
+                made = RegionFromBitmap(region, bitmap, KEY);
+            } catch (const std::bad_alloc&) {
+                ++thrown;
+            }
+            holds_one = region.GetSafeHandle() != nullptr;
+        },
+        [&](bool fired) {
+            EXPECT_NE(made, fired);
+            EXPECT_EQ(holds_one, made);
+        });
+    EXPECT_GT(thrown, 0);
+    for (int i = 0; i < 66000; ++i) {  // more objects than there may be, should any be left behind
+        CRgn region;
+        ASSERT_TRUE(RegionFromBitmap(region, bitmap, KEY));
+    }
+}
+
+}  // namespace

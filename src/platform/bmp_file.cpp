@@ -1,4 +1,5 @@
 #include "src/platform/bmp_file.h"
+#include "src/platform/file_name.h"
 
 #include <fcntl.h>
 #include <stdio.h>
@@ -13,7 +14,6 @@
 #include "src/platform/error_from_errno.h"
 #include "src/platform/pixel_format.h"
 #include "src/platform/pixel_rows.h"
-#include "src/platform/system_file_name.h"
 
 namespace basalt::platform {
 
@@ -109,7 +109,11 @@ bool is_regular_file(FILE* file) {
 }  // namespace
 
 bool write_bmp_file(const Surface& surface, const wchar_t* name) {
-    const std::string file_name = system_file_name(name);
+    std::string file_name;
+    if (!file_name_from_wide(name, file_name)) {
+        SetLastError(ERROR_INVALID_NAME);
+        return false;
+    }
     FILE* const file = open_file(file_name.c_str());
     if (file == nullptr) {
         set_last_error_from_errno();

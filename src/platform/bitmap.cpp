@@ -61,11 +61,13 @@ HBITMAP CreateBitmap(int width, int height, UINT planes, UINT bits_per_pixel, co
 
 CBitmap* CBitmap::FromHandle(HBITMAP bitmap) {
     if (bitmap == basalt::platform::stock_bitmap()) {
-        // Lent for ever: its end would be one more thing for the module's to wait for.
+        // Never destroyed, so that nothing waits for the library's unload.
         alignas(CBitmap) static unsigned char storage[sizeof(CBitmap)];
-        static CBitmap* const lent = new (storage) CBitmap;
-        static const BOOL attached = lent->Attach(bitmap);
-        static_cast<void>(attached);
+        static CBitmap* const lent = [bitmap] {
+            auto* const wrapper = new (storage) CBitmap;
+            wrapper->Attach(bitmap);
+            return wrapper;
+        }();
         return lent;
     }
     auto* const object = object_of<Bitmap>(bitmap);

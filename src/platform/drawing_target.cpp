@@ -1,5 +1,6 @@
 #include "src/platform/drawing_target.h"
 
+#include <algorithm>
 #include <cmath>
 
 #include "basalt/platform/error.h"
@@ -8,13 +9,13 @@ namespace basalt::platform {
 
 std::optional<PixelShift> whole_pixel_shift(const Context& context) {
     const Affine& world = context.world;
-    const Affine shift = Affine::shift(std::trunc(world.dx), std::trunc(world.dy));
-    // Beyond this nothing can be on a surface, and sums with coordinates stay far from overflow.
-    constexpr double FARTHEST = 0x1p40;
-    if (world != shift || std::fabs(world.dx) > FARTHEST || std::fabs(world.dy) > FARTHEST) {
+    if (world != Affine::shift(std::trunc(world.dx), std::trunc(world.dy))) {
         return std::nullopt;
     }
-    return PixelShift{static_cast<std::int64_t>(world.dx), static_cast<std::int64_t>(world.dy)};
+    // Beyond this nothing can be on a surface, and sums with coordinates stay far from overflow.
+    constexpr double FARTHEST = 0x1p40;
+    return PixelShift{static_cast<std::int64_t>(std::clamp(world.dx, -FARTHEST, FARTHEST)),
+                      static_cast<std::int64_t>(std::clamp(world.dy, -FARTHEST, FARTHEST))};
 }
 
 std::optional<PixelShift> required_shift(const Context& context) {

@@ -1,7 +1,8 @@
 // Handles of drawing objects and contexts: numbers that are checked before they are believed.
 //
 // A handle is a slot's number below its generation, which changes with every object the slot holds: the
-// handle of a deleted object is told apart from that of its successor. Looking one up takes no lock.
+// handle of a deleted object is told apart from that of its successor. Looking one up takes no lock. Numbers
+// below 0x10000 are left to stock objects.
 #ifndef BASALT_SRC_PLATFORM_GRAPHICS_HANDLES_H
 #define BASALT_SRC_PLATFORM_GRAPHICS_HANDLES_H
 
@@ -20,9 +21,6 @@ struct GraphicsObject {
 
     const GraphicsKind kind;
 };
-
-// Handles below this are none of the table's: stock objects have theirs there.
-inline constexpr std::uintptr_t FIRST_TABLE_HANDLE = 0x10000;
 
 // Keeps an object under a new handle; null, with the last error set, when the object is null (there was no
 // memory for it) or 65,536 are there already. Threads: thread-safe.

@@ -27,6 +27,8 @@ struct Surface {
     // An equal surface.
     bool copy(const Surface& other);
 
+    // A surface that may not change gives rows that may not either.
+    // NOLINTNEXTLINE(readability-make-member-function-const)
     std::byte* row(int y) { return bits.get() + static_cast<std::size_t>(y) * row_bytes; }
     const std::byte* row(int y) const { return bits.get() + static_cast<std::size_t>(y) * row_bytes; }
     bool contains(std::int64_t x, std::int64_t y) const {

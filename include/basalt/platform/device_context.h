@@ -140,7 +140,7 @@ public:
 
     /// Selects a bitmap as ::SelectObject does.
     /// @return a lent wrapper of the bitmap used before, to be selected back; null on failure
-    CBitmap* SelectObject(const CBitmap* bitmap) {
+    CBitmap* SelectObject(const CBitmap* bitmap) const {
         HGDIOBJ const before = ::SelectObject(m_hDC, bitmap != nullptr ? bitmap->GetSafeHandle() : nullptr);
         return before != nullptr ? CBitmap::FromHandle(static_cast<HBITMAP>(before)) : nullptr;
     }

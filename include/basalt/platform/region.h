@@ -74,6 +74,7 @@ public:
         return m_hObject == nullptr ? Attach(::CreateRectRgn(left, top, right, bottom)) : 0;
     }
     /// Makes this region, which must exist, the combination of two, as ::CombineRgn does.
+    // NOLINTNEXTLINE(readability-make-member-function-const): the region changes, if not its handle
     int CombineRgn(const CRgn* a, const CRgn* b, int mode) {
         return ::CombineRgn(*this, a != nullptr ? HRGN(*a) : nullptr, b != nullptr ? HRGN(*b) : nullptr,
                             mode);

@@ -83,7 +83,7 @@ std::string run(const std::vector<std::string>& arguments) {
     const ColorPalette palette;
     std::string report = options.colours.empty() ? list_ranges() : list_nearest(palette, options.colours);
     if (options.picture) {
-        report += "\n" + draw_chart(palette, *options.picture);
+        report.append("\n").append(draw_chart(palette, *options.picture));
     }
     return report;
 }

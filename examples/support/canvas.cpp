@@ -48,14 +48,15 @@ void Canvas::line(CanvasPoint from, CanvasPoint to, double thickness, COLORREF c
     const double dx = to.x - from.x;
     const double dy = to.y - from.y;
     const double length2 = dx * dx + dy * dy;
-    const auto first = [reach](double a, double b) {
-        return std::max(0, static_cast<int>(std::max(-1.0, std::floor(std::min(a, b) - reach))));
+    const auto first = [reach](double a, double b, int size) {
+        return static_cast<int>(
+            std::clamp(std::floor(std::min(a, b) - reach), 0.0, static_cast<double>(size)));
     };
     const auto last = [reach](double a, double b, int size) {
-        return static_cast<int>(std::min(size - 1.0, std::floor(std::max(a, b) + reach)));
+        return static_cast<int>(std::clamp(std::floor(std::max(a, b) + reach), -1.0, size - 1.0));
     };
-    for (int y = first(from.y, to.y); y <= last(from.y, to.y, m_height); ++y) {
-        for (int x = first(from.x, to.x); x <= last(from.x, to.x, m_width); ++x) {
+    for (int y = first(from.y, to.y, m_height); y <= last(from.y, to.y, m_height); ++y) {
+        for (int x = first(from.x, to.x, m_width); x <= last(from.x, to.x, m_width); ++x) {
             const double px = x + 0.5 - from.x;
             const double py = y + 0.5 - from.y;
             const double along = length2 > 0 ? std::clamp((px * dx + py * dy) / length2, 0.0, 1.0) : 0.0;

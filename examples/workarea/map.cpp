@@ -88,8 +88,14 @@ void draw_boundary(const Map& map, Canvas& canvas) {
 void draw_view(const Map& map, Canvas& canvas) {
     const DegreeBox& view = *map.outcome.options.view;
     const LocalPlane& plane = map.outcome.area.plane();
-    const CanvasPoint upper_left = on_map(map, plane.to_grid(view.west, view.north, 0.0));
-    const CanvasPoint lower_right = on_map(map, plane.to_grid(view.east, view.south, 0.0));
+    // A view may be the whole earth: what lies far outside the map needs no dashes.
+    const auto near_map = [&map](CanvasPoint point) {
+        constexpr double BEYOND = 20.0;
+        return CanvasPoint{std::clamp(point.x, -BEYOND, map.width + BEYOND),
+                           std::clamp(point.y, -BEYOND, map.height + BEYOND)};
+    };
+    const CanvasPoint upper_left = near_map(on_map(map, plane.to_grid(view.west, view.north, 0.0)));
+    const CanvasPoint lower_right = near_map(on_map(map, plane.to_grid(view.east, view.south, 0.0)));
     const auto dashed = [&](CanvasPoint from, CanvasPoint to) {
         constexpr double DASH = 9.0;
         const double length = std::hypot(to.x - from.x, to.y - from.y);

@@ -21,8 +21,10 @@ bool fill(HDC dc, int width, int height, COLORREF colour) {
 
 /// Copies a picture turned clockwise about the middle, on a surface that takes a transform.
 bool copy_turned(HDC to, HDC from, int width, int height, float degrees) {
-    const auto x = static_cast<float>(width / 2);
-    const auto y = static_cast<float>(height / 2);
+    const int middle_column = width / 2;
+    const int middle_row = height / 2;
+    const auto x = static_cast<float>(middle_column);
+    const auto y = static_cast<float>(middle_row);
     const double radians = _degtorad(static_cast<double>(degrees));
     const auto cosine = static_cast<float>(std::cos(radians));
     const auto sine = static_cast<float>(std::sin(radians));

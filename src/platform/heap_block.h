@@ -2,6 +2,7 @@
 //
 //     head | payload ...                          a live block
 //     head | next | prev | unused ... | size      a free block
+//     head | next | unused ...                    a freed block in a quick list
 //
 // A head lies 8 bytes before a multiple of 16, so payloads are 16-byte aligned. Blocks follow each other
 // without gaps from the first to the last of a region, and no two neighbours are both free. The size at
@@ -28,12 +29,14 @@ inline constexpr std::size_t REGION_OVERHEAD = 16;
 // Far beyond any address space, far below overflow.
 inline constexpr std::size_t MAX_REQUEST = std::size_t{1} << 46;
 
-// The parts of a head: flags in the low four bits, size of the whole block (a multiple of 16), and the
-// heap's tag in the top 16 bits while the block is live, zero while it is free.
+// The parts of a head: flags in the low four bits, size of the whole block (a multiple of 16), and in the
+// top 16 bits the heap's tag while the block is live, zero while it is free, QUICK_TAG in a quick list.
 inline constexpr std::uint64_t PREVIOUS_FREE = 1;
 inline constexpr std::uint64_t LAST_OF_REGION = 2;
 inline constexpr std::uint64_t SIZE_BITS = 0x0000'FFFF'FFFF'FFF0;
 inline constexpr std::uint64_t TAG_BITS = 0xFFFF'0000'0000'0000;
+inline constexpr std::uint64_t LIVE_BIT = 0x0001'0000'0000'0000;  // set in the tag of every heap
+inline constexpr std::uint64_t QUICK_TAG = 0x0002'0000'0000'0000;
 
 inline std::size_t size_of(std::uint64_t head) {
     return head & SIZE_BITS;

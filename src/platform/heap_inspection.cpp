@@ -18,8 +18,9 @@ const char* check_free_block(std::uint64_t head, bool after_free, Block* after) 
     return nullptr;
 }
 
-// Blocks from the first head to the end of the region, each with its neighbours.
-const char* check_region(const Region& region, std::uint64_t tag, HeapReport& report) {
+// Blocks from the first head to the end of the region, each with its neighbours. Adds up the bytes of the
+// live ones.
+const char* check_region(const Region& region, std::uint64_t tag, HeapReport& report, std::size_t& live) {
     std::byte* const end = region.begin + region.size - HEAD_BYTES;
     bool after_free = false;
     std::size_t blocks = 0;
@@ -42,15 +43,17 @@ const char* check_region(const Region& region, std::uint64_t tag, HeapReport& re
             }
             ++report.free_blocks;
             report.largest_free = std::max(report.largest_free, size - HEAD_BYTES - GUARD_BYTES);
+        } else if ((head & TAG_BITS) == QUICK_TAG) {
+            ++report.quick_blocks;
         } else if ((head & TAG_BITS) != tag) {
             return "a block carries another heap's mark";
         } else {
             ++report.live_blocks;
+            live += size;
         }
         after_free = is_free(head);
     }
-    return region.single && (blocks != 1 || after_free) ? "a large block is not alone in its region"
-                                                        : nullptr;
+    return region.single && (blocks != 1 || live == 0) ? "a large block is not alone in its region" : nullptr;
 }
 
 const char* check_lists(const FreeLists& lists, const RegionTable& regions, std::size_t expected) {
@@ -79,6 +82,27 @@ const char* check_lists(const FreeLists& lists, const RegionTable& regions, std:
     return listed == expected ? nullptr : "a free block is in no list";
 }
 
+const char* check_quick_lists(const QuickLists& lists, const RegionTable& regions, std::size_t expected) {
+    std::size_t listed = 0;
+    std::size_t bytes = 0;
+    for (std::size_t list = 0; list < QuickLists::LISTS; ++list) {
+        for (Block* block = lists.first(list); block != nullptr; block = next_of(block)) {
+            if (++listed > expected || regions.find(block) == nullptr) {
+                return "a quick list runs astray";
+            }
+            const std::uint64_t head = head_of(block);
+            if ((head & TAG_BITS) != QUICK_TAG || size_of(head) != list * BLOCK_ALIGNMENT) {
+                return "a quick list holds a block that does not belong there";
+            }
+            bytes += size_of(head);
+        }
+    }
+    if (bytes != lists.bytes()) {
+        return "the count of bytes in the quick lists is wrong";
+    }
+    return listed == expected ? nullptr : "a block marked for the quick lists is in none";
+}
+
 }  // namespace
 
 HeapReport inspect_heap(void* handle) {
@@ -86,6 +110,7 @@ HeapReport inspect_heap(void* handle) {
     const std::lock_guard guard(heap.m_lock);
     HeapReport report;
     std::size_t shared = 0;
+    std::size_t live_shared = 0;
     std::size_t idle = 0;
     const std::byte* end_before = nullptr;
     for (const Region& region : heap.m_regions.all()) {
@@ -94,21 +119,28 @@ HeapReport inspect_heap(void* handle) {
             return report;
         }
         end_before = region.begin + region.size;
-        report.fault = check_region(region, heap.m_tag, report);
+        std::size_t live = 0;
+        report.fault = check_region(region, heap.m_tag, report, live);
         if (report.fault != nullptr) {
             return report;
         }
         ++report.regions;
         report.mapped += region.size;
         shared += region.single ? 0 : region.size;
+        live_shared += region.single ? 0 : live;
         idle += heap.is_idle_region(block_at(region.begin + HEAD_BYTES)) ? region.size : 0;
     }
     report.fault = check_lists(heap.m_free, heap.m_regions, report.free_blocks);
+    if (report.fault == nullptr) {
+        report.fault = check_quick_lists(heap.m_quick, heap.m_regions, report.quick_blocks);
+    }
     if (report.fault != nullptr) {
         return report;
     }
     if (report.mapped != heap.m_mapped || shared != heap.m_mapped_shared || heap.m_mapped > heap.m_maximum) {
         report.fault = "the count of mapped bytes is wrong";
+    } else if (live_shared != heap.m_live_shared) {
+        report.fault = "the count of live bytes is wrong";
     } else if (idle != heap.m_idle) {
         report.fault = "the count of bytes in wholly free regions is wrong";
     }

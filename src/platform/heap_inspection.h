@@ -12,6 +12,7 @@ struct HeapReport {
     std::size_t mapped = 0;  // bytes
     std::size_t live_blocks = 0;
     std::size_t free_blocks = 0;
+    std::size_t quick_blocks = 0;  // freed and not yet joined with their neighbours
     std::size_t largest_free = 0;  // bytes that a request can have of it
 };
 

@@ -17,6 +17,9 @@ constexpr std::size_t SINGLE_FROM = std::size_t{1} << 20;
 // Heaps with a maximum up to this have one region, of that very size: nothing is lost between regions.
 constexpr std::size_t ONE_REGION_UP_TO = std::size_t{64} << 20;
 
+// The quick lists hold up to this: a bound on the time that one call spends on settling them.
+constexpr std::size_t MOST_QUICK = std::size_t{256} << 10;
+
 constexpr std::size_t ATTEMPTS_BEFORE_GROWTH = 8;
 constexpr std::size_t ALL = ~std::size_t{0};
 
@@ -29,10 +32,10 @@ std::size_t record_bytes() {
     return (sizeof(PrivateHeap) + page - 1) & ~(page - 1);
 }
 
-// Never 0, the mark of free blocks, and different for most heaps.
+// Unlike the marks of blocks that are not live, and different for most heaps.
 std::uint64_t tag_for(const void* heap) {
     const auto address = reinterpret_cast<std::uintptr_t>(heap);
-    return (((address >> 12) * 0x9E37'79B9'7F4A'7C15) & TAG_BITS) | (std::uint64_t{1} << 48);
+    return (((address >> 12) * 0x9E37'79B9'7F4A'7C15) & TAG_BITS) | LIVE_BIT;
 }
 
 }  // namespace
@@ -91,7 +94,7 @@ DWORD PrivateHeap::release(void* payload) {
     }
     Block* block = block_of(payload);
     if (!region->single) {
-        put_back(block, *region);
+        set_aside(block);
         return ERROR_SUCCESS;
     }
     if (!unmap_region(*region)) {
@@ -118,8 +121,7 @@ void* PrivateHeap::resize(void* payload, std::size_t size, DWORD& error) {
         Block* block = block_of(payload);
         old_size = size_of(head_of(block)) - HEAD_BYTES;
         const bool single = region->single;
-        const bool done =
-            single ? resize_single(block, need, *region) : resize_in_place(block, need, *region);
+        const bool done = single ? resize_single(block, need, *region) : resize_in_place(block, need);
         if (done) {
             forbid_access(payload_of(block), size_of(head_of(block)) - HEAD_BYTES);
             permit_access(payload_of(block), size);
@@ -142,6 +144,7 @@ void* PrivateHeap::resize(void* payload, std::size_t size, DWORD& error) {
 
 std::size_t PrivateHeap::compact() {
     const std::lock_guard guard(m_lock);
+    settle(0);
     // Blocks that hold no whole page between their links and their end have nothing to give.
     for (unsigned level = FreeLists::place_of(page_size()).level; level < FreeLists::LEVELS; ++level) {
         for (unsigned list = 0; list < FreeLists::LISTS; ++list) {
@@ -177,10 +180,22 @@ const Region* PrivateHeap::region_of_live(void* payload) const {
     return live && (!region->single || offset == HEAD_BYTES) ? region : nullptr;
 }
 
-Block* PrivateHeap::take_shared(std::size_t need) {
+Block* PrivateHeap::find_free(std::size_t need) {
     Block* block = m_free.find(need);
-    if (block == nullptr) {
-        block = m_free.find_among_equals(need, ATTEMPTS_BEFORE_GROWTH);
+    return block != nullptr ? block : m_free.find_among_equals(need, ATTEMPTS_BEFORE_GROWTH);
+}
+
+Block* PrivateHeap::take_shared(std::size_t need) {
+    if (need < QuickLists::SIZE_LIMIT) {
+        if (Block* block = m_quick.take(need, m_tag)) {
+            m_live_shared += need;
+            return block;
+        }
+    }
+    Block* block = find_free(need);
+    if (block == nullptr && m_quick.bytes() != 0) {
+        settle(0);
+        block = find_free(need);
     }
     if (block == nullptr) {
         block = map_shared_region(need);
@@ -195,87 +210,26 @@ Block* PrivateHeap::take_shared(std::size_t need) {
     return block;
 }
 
-// Turns a listed free block into a live one, giving back what is too much at its end.
-void PrivateHeap::carve(Block* block, std::size_t need) {
-    const std::uint64_t head = head_of(block);
-    std::size_t size = size_of(head);
-    std::uint64_t last = head & LAST_OF_REGION;
-    m_free.remove(block, size);
-    if (is_idle_region(block)) {
-        m_idle -= size + REGION_OVERHEAD;
+// Frees a live block of a shared region.
+void PrivateHeap::set_aside(Block* block) {
+    const std::size_t size = size_of(head_of(block));
+    m_live_shared -= size;
+    if (size >= QuickLists::SIZE_LIMIT) {
+        put_back(block);
+        return;
     }
-    Block* after = successor(block, size);
-    if (size - need >= MIN_BLOCK) {
-        Block* rest = successor(block, need);
-        set_head(rest, (size - need) | last);
-        if (last == 0) {
-            set_size_before(after, size - need);
-        }
-        m_free.insert(rest, size - need);
-        size = need;
-        last = 0;
-    } else if (last == 0) {
-        set_head(after, head_of(after) & ~PREVIOUS_FREE);
-    }
-    set_head(block, m_tag | size | last);
+    forbid_access(block, size);
+    m_quick.insert(block, size);
+    // Wherever the blocks lie, they keep no more idle regions from being seen as such than may be kept.
+    const std::size_t spare = m_mapped_shared - m_live_shared;
+    settle(spare <= MOST_IDLE ? MOST_QUICK : 0);
 }
 
-// Frees a live block of a shared region, joining it with its free neighbours.
-void PrivateHeap::put_back(Block* block, const Region& region) {
-    const std::uint64_t head = head_of(block);
-    std::size_t size = size_of(head);
-    std::uint64_t last = head & LAST_OF_REGION;
-    forbid_access(block, size);  // the head too: the end cut off a block had none
-    set_head(block, size);       // whatever becomes of it, it is no live block any more
-    if (last == 0) {
-        Block* after = successor(block, size);
-        const std::uint64_t head_after = head_of(after);
-        if (is_free(head_after)) {
-            m_free.remove(after, size_of(head_after));
-            size += size_of(head_after);
-            last = head_after & LAST_OF_REGION;
-        }
+// Empties the quick lists down to so many bytes.
+void PrivateHeap::settle(std::size_t most) {
+    while (m_quick.bytes() > most) {
+        put_back(m_quick.take_any());
     }
-    if ((head & PREVIOUS_FREE) != 0) {
-        const std::size_t before = size_before(block);
-        block = block_at(bytes_of(block) - before);
-        m_free.remove(block, before);
-        size += before;
-    }
-    set_head(block, size | last);
-    if (last == 0) {
-        Block* after = successor(block, size);
-        set_size_before(after, size);
-        set_head(after, head_of(after) | PREVIOUS_FREE);
-    }
-    m_free.insert(block, size);
-    if (size == region.size - REGION_OVERHEAD) {
-        keep_idle_region(block, region.size);
-    }
-}
-
-bool PrivateHeap::resize_in_place(Block* block, std::size_t need, const Region& region) {
-    std::uint64_t head = head_of(block);
-    if (size_of(head) < need) {
-        Block* after = successor(block, size_of(head));
-        if (is_last(head) || !is_free(head_of(after)) || size_of(head) + size_of(head_of(after)) < need) {
-            return false;
-        }
-        // The neighbour is taken whole; the end goes back below.
-        carve(after, size_of(head_of(after)));
-        const std::uint64_t joined = head_of(after);
-        set_head(after, 0);
-        head = (head + size_of(joined)) | (joined & LAST_OF_REGION);
-        set_head(block, head);
-    }
-    const std::size_t rest = size_of(head) - need;
-    if (rest >= MIN_BLOCK) {
-        set_head(block, (head & ~(SIZE_BITS | LAST_OF_REGION)) | need);
-        Block* tail = successor(block, need);
-        set_head(tail, m_tag | rest | (head & LAST_OF_REGION));
-        put_back(tail, region);
-    }
-    return true;
 }
 
 }  // namespace basalt::platform

@@ -7,6 +7,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/heap_free_lists.h"
+#include "src/platform/heap_quick_lists.h"
 #include "src/platform/heap_regions.h"
 #include "src/platform/lock.h"
 
@@ -53,9 +54,12 @@ private:
     bool has_one_region() const { return m_single_from == ~std::size_t{0}; }
     Block* add_region(std::byte* begin, std::size_t size, bool single);
 
+    Block* find_free(std::size_t need);
     void carve(Block* block, std::size_t need);
-    void put_back(Block* block, const Region& region);
-    bool resize_in_place(Block* block, std::size_t need, const Region& region);
+    void set_aside(Block* block);
+    void settle(std::size_t most);
+    void put_back(Block* block);
+    bool resize_in_place(Block* block, std::size_t need);
     bool resize_single(Block*& block, std::size_t need, const Region& region);
 
     bool is_idle_region(const Block* block) const;
@@ -64,16 +68,22 @@ private:
     bool drop_free_region(Block* block);
     bool unmap_region(const Region& region);
 
+    // Wholly free regions are kept up to this: a heap that is emptied and filled again finds its pages warm.
+    // What the system hands out fresh costs more than all the rest of an allocation.
+    static constexpr std::size_t MOST_IDLE = std::size_t{32} << 20;
+
     // Leading members are what every allocation touches.
     std::uint64_t m_magic;
     std::uint64_t m_tag;  // marks the heads of this heap's live blocks
     Lock m_lock;
+    std::size_t m_live_shared = 0;    // bytes of the live blocks in shared regions
+    std::size_t m_mapped_shared = 0;  // bytes of the regions that many blocks share
+    QuickLists m_quick;
     FreeLists m_free;
     std::size_t m_idle = 0;     // bytes of the wholly free regions kept for the next allocations
     std::size_t m_single_from;  // blocks of this size and above get a region of their own
     std::size_t m_maximum;
-    std::size_t m_mapped = 0;         // bytes of all regions
-    std::size_t m_mapped_shared = 0;  // bytes of the regions that many blocks share
+    std::size_t m_mapped = 0;  // bytes of all regions
     RegionTable m_regions;
 };
 

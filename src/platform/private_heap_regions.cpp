@@ -12,10 +12,6 @@ namespace {
 constexpr std::size_t SMALLEST_REGION = std::size_t{64} << 10;
 constexpr std::size_t LARGEST_REGION = std::size_t{32} << 20;
 
-// Wholly free regions are kept up to this: a heap that is emptied and filled again finds its pages warm. What
-// the system hands out fresh costs more than all the rest of an allocation.
-constexpr std::size_t MOST_IDLE = LARGEST_REGION;
-
 // Regions that fill large pages lie on their boundaries, or the system could not use any.
 std::byte* map_region(std::size_t size) {
     return map_pages(size, size >= LARGE_PAGE ? LARGE_PAGE : page_size());
@@ -130,6 +126,7 @@ void PrivateHeap::keep_idle_region(Block* block, std::size_t bytes) {
 
 // False when there is none, or the system refuses them all.
 bool PrivateHeap::drop_idle_regions() {
+    settle(0);
     const std::size_t idle_before = m_idle;
     for (std::size_t i = m_regions.all().size(); i > 0 && m_idle > 0; --i) {
         const Region& region = m_regions.all()[i - 1];

@@ -383,6 +383,89 @@ TEST(Heap, CompactAnswersTheLargestFreeBlock) {
     EXPECT_GT(HeapCompact(heap.handle, 0), 60 * KIB) << "a used heap keeps a region";
 }
 
+std::vector<void*> take_many(const Heap& heap, std::size_t size, std::size_t count) {
+    std::vector<void*> blocks(count);
+    std::generate(blocks.begin(), blocks.end(), [&] { return heap.take(size); });
+    EXPECT_EQ(std::count(blocks.begin(), blocks.end(), nullptr), 0);
+    return blocks;
+}
+
+TEST(Heap, SmallBlocksAreSetAsideUntilTheirRoomIsNeeded) {
+    const Heap heap(MIB);
+    std::vector<void*> blocks;
+    while (void* block = heap.take(100)) {
+        blocks.push_back(block);
+    }
+    // Each second one is taken again as it is, last freed first.
+    for (std::size_t i = 0; i < 200; i += 2) {
+        EXPECT_EQ(heap.free(blocks[i]), 1);
+        EXPECT_EQ(heap.free(blocks[i]), 0) << "freed twice";
+        EXPECT_EQ(heap.resize(blocks[i], 10), nullptr);
+    }
+    EXPECT_EQ(sound(heap.handle).quick_blocks, 100U);
+    for (std::size_t i = 200; i > 0; i -= 2) {
+        EXPECT_EQ(heap.take(100), blocks[i - 2]);
+    }
+    // All of it in one piece, though nothing but small blocks was freed, and for a small block of another
+    // size.
+    std::shuffle(blocks.begin(), blocks.end(), std::mt19937(1));
+    for (void* block : blocks) {
+        EXPECT_EQ(heap.free(block), 1);
+    }
+    EXPECT_GT(sound(heap.handle).quick_blocks, 0U);
+    void* whole = heap.take(MIB - 64);
+    EXPECT_NE(whole, nullptr);
+    EXPECT_EQ(heap.free(whole), 1);
+    blocks.clear();
+    while (void* block = heap.take(40)) {
+        blocks.push_back(block);
+    }
+    for (std::size_t i = 0; i < 1000; ++i) {
+        EXPECT_EQ(heap.free(blocks[i]), 1);
+    }
+    EXPECT_NE(heap.take(400), nullptr);
+    EXPECT_EQ(sound(heap.handle).quick_blocks, 0U);
+}
+
+TEST(Heap, SmallBlocksSetAsideStayWithinBounds) {
+    const Heap heap(0);
+    const std::vector<void*> held = take_many(heap, 500, 1000);
+    std::vector<void*> blocks = take_many(heap, 40, 100'000);
+    for (std::size_t i = 0; i < blocks.size() / 2; ++i) {
+        EXPECT_EQ(heap.free(blocks[i]), 1);
+    }
+    EXPECT_GT(sound(heap.handle).quick_blocks, 0U);
+    EXPECT_LE(sound(heap.handle).quick_blocks * 48, 256 * KIB);
+    // Among those, the ones of other sizes find their place.
+    for (void* block : held) {
+        EXPECT_EQ(heap.free(block), 1);
+    }
+    sound(heap.handle);
+    HeapCompact(heap.handle, 0);
+    EXPECT_EQ(sound(heap.handle).quick_blocks, 0U);
+}
+
+// Blocks set aside lie in every region here, and must not keep any from going back.
+TEST(Heap, RegionsGoBackThoughOnlySmallBlocksWereFreed) {
+    const Heap heap(0);
+    std::vector<void*> blocks = take_many(heap, 480, 200'000);
+    EXPECT_GT(sound(heap.handle).mapped, 90 * MIB);
+    std::shuffle(blocks.begin(), blocks.end(), std::mt19937(2));
+    for (void* block : blocks) {
+        EXPECT_EQ(heap.free(block), 1);
+    }
+    EXPECT_LE(sound(heap.handle).mapped, 32 * MIB);
+    // A large block of a limited heap drives out regions whose blocks are all set aside.
+    const Heap limited(66 * MIB);
+    blocks = take_many(limited, 480, 60'000);
+    for (void* block : blocks) {
+        EXPECT_EQ(limited.free(block), 1);
+    }
+    EXPECT_GT(sound(limited.handle).quick_blocks, 0U);
+    EXPECT_NE(limited.take(66 * MIB - 8 * KIB), nullptr);
+    sound(limited.handle);
+}
+
 TEST(Heap, GrowsInPlaceIntoAFreeNeighbour) {
     const Heap heap(0);
     void* block = heap.take(1000);

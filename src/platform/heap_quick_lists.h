@@ -1,0 +1,63 @@
+// Small blocks that were freed and not yet joined with their neighbours, in a list for each size: most are
+// asked for again soon, and are then handed out as they are.
+#ifndef BASALT_SRC_PLATFORM_HEAP_QUICK_LISTS_H
+#define BASALT_SRC_PLATFORM_HEAP_QUICK_LISTS_H
+
+#include <array>
+#include <cstddef>
+
+#include "src/platform/heap_block.h"
+
+namespace basalt::platform {
+
+// Their heads carry QUICK_TAG, so that they are neither live nor free to their neighbours.
+class QuickLists {
+public:
+    static constexpr std::size_t LISTS = 34;
+    static constexpr std::size_t SIZE_LIMIT = LISTS * BLOCK_ALIGNMENT;  // not included
+
+    void insert(Block* block, std::size_t size) {
+        Block*& first = m_first[size / BLOCK_ALIGNMENT];
+        set_head(block, (head_of(block) & ~TAG_BITS) | QUICK_TAG);
+        set_next(block, first);
+        first = block;
+        m_bytes += size;
+    }
+
+    // The block of this very size that came last, live with the tag; null without any.
+    Block* take(std::size_t size, std::uint64_t tag) {
+        Block* block = m_first[size / BLOCK_ALIGNMENT];
+        if (block != nullptr) {
+            m_first[size / BLOCK_ALIGNMENT] = next_of(block);
+            set_head(block, (head_of(block) & ~TAG_BITS) | tag);
+            m_bytes -= size;
+        }
+        return block;
+    }
+
+    // Some block, the sizes taking turns; there must be one. Its head is left as it is.
+    Block* take_any() {
+        while (m_first[m_turn] == nullptr) {
+            m_turn = (m_turn + 1) % LISTS;
+        }
+        Block* block = m_first[m_turn];
+        m_first[m_turn] = next_of(block);
+        m_bytes -= m_turn * BLOCK_ALIGNMENT;
+        m_turn = (m_turn + 1) % LISTS;
+        return block;
+    }
+
+    std::size_t bytes() const { return m_bytes; }
+
+    // First block of a size; the others by next_of().
+    Block* first(std::size_t list) const { return m_first[list]; }
+
+private:
+    std::size_t m_bytes = 0;
+    std::size_t m_turn = 0;
+    std::array<Block*, LISTS> m_first{};
+};
+
+}  // namespace basalt::platform
+
+#endif

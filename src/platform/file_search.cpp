@@ -71,13 +71,13 @@ FILETIME file_time(const statx_timestamp& time) {
     return basalt::platform::file_time(basalt::platform::ticks_of(time.tv_sec, time.tv_nsec));
 }
 
-DWORD attributes_of(const struct statx& status) {
-    return S_ISDIR(status.stx_mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
+DWORD attributes_of(mode_t mode) {
+    return S_ISDIR(mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
 }
 
 void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DATAW& entry) {
     entry = {};
-    entry.dwFileAttributes = attributes_of(status);
+    entry.dwFileAttributes = attributes_of(status.stx_mode);
     const bool knows_creation = (status.stx_mask & STATX_BTIME) != 0;
     entry.ftCreationTime = file_time(knows_creation ? status.stx_btime : status.stx_ctime);
     entry.ftLastAccessTime = file_time(status.stx_atime);
@@ -89,20 +89,32 @@ void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DAT
 
 // What a link leads to, or the link itself where that is nothing. A link is rare, so it is not followed at
 // first: one call then answers for everything else, also for what is missing.
-bool query(int folder, const char* name, unsigned wanted, struct statx& status) {
-    if (statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, wanted, &status) != 0) {
+bool query(int folder, const char* name, struct statx& status) {
+    constexpr unsigned WANTED = STATX_BASIC_STATS | STATX_BTIME;
+    if (statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) != 0) {
         return false;
     }
     if (S_ISLNK(status.stx_mode)) {
         struct statx target = {};
-        if (statx(folder, name, AT_NO_AUTOMOUNT, wanted, &target) == 0) {
+        if (statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &target) == 0) {
             status = target;
         }
     }
     return true;
 }
 
-constexpr unsigned WHOLE_STATUS = STATX_BASIC_STATS | STATX_BTIME;
+// The same for the mode alone, of which the system has the least to tell by this call.
+bool query_mode(const char* name, mode_t& mode) {
+    struct stat status;
+    if (fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW) != 0) {
+        return false;
+    }
+    mode = status.st_mode;
+    if (S_ISLNK(mode) && fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT) == 0) {
+        mode = status.st_mode;
+    }
+    return true;
+}
 
 DWORD FileSearch::advance() {
     if (m_folder == nullptr) {
@@ -126,7 +138,7 @@ DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
             return error;
         }
         struct statx status = {};
-        if (!query(dirfd(m_folder), m_found->d_name, WHOLE_STATUS, status)) {
+        if (!query(dirfd(m_folder), m_found->d_name, status)) {
             if (errno == ENOENT) {
                 continue;  // deleted meanwhile
             }
@@ -154,15 +166,18 @@ struct Sought {
     }
 };
 
-// The status of a path's own entry. ERROR_SUCCESS or what went wrong.
-DWORD query_path(std::wstring_view path, unsigned wanted, struct statx& status) {
+// Asks about a path's own entry. ERROR_SUCCESS or what went wrong.
+template <class Question>
+DWORD query_path(std::wstring_view path, Question question) {
     basalt::platform::FileName name;
     if (!name.set(path)) {
         return ERROR_INVALID_NAME;
     }
-    return query(AT_FDCWD, name.c_str(), wanted, status)
-               ? ERROR_SUCCESS
-               : basalt::platform::error_of_path(name.c_str(), errno);
+    return question(name.c_str()) ? ERROR_SUCCESS : basalt::platform::error_of_path(name.c_str(), errno);
+}
+
+DWORD query_mode_of_path(std::wstring_view path, mode_t& mode) {
+    return query_path(path, [&](const char* name) { return query_mode(name, mode); });
 }
 
 // Opens the folder of a search with wildcards. ERROR_SUCCESS or what went wrong.
@@ -180,7 +195,7 @@ DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& e
     }
     if (!sought.has_wildcards) {
         struct statx status = {};
-        const DWORD error = query_path(path, WHOLE_STATUS, status);
+        const DWORD error = query_path(path, [&](const char* name) { return query(AT_FDCWD, name, status); });
         if (error == ERROR_SUCCESS) {
             describe(status, sought.last, entry);
         }
@@ -206,17 +221,17 @@ DWORD basalt::platform::first_match_attributes(const wchar_t* path) noexcept {
             const DWORD error = find_first(whole, search, entry);
             return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
         }
-        struct statx status = {};
-        const DWORD error = query_path(whole, STATX_TYPE, status);
-        return error == ERROR_SUCCESS ? attributes_of(status) : fail_with(error, DWORD{0});
+        mode_t mode = 0;
+        const DWORD error = query_mode_of_path(whole, mode);
+        return error == ERROR_SUCCESS ? attributes_of(mode) : fail_with(error, DWORD{0});
     });
 }
 
 void basalt::platform::for_each_match(const wchar_t* path, const std::function<void(const wchar_t*)>& visit) {
     const Sought sought(path);
     if (!sought.has_wildcards) {
-        struct statx status = {};
-        if (!sought.last.empty() && query_path(path, STATX_TYPE, status) == ERROR_SUCCESS) {
+        mode_t mode = 0;
+        if (!sought.last.empty() && query_mode_of_path(path, mode) == ERROR_SUCCESS) {
             visit(sought.last.data());
         }
         return;

@@ -25,18 +25,17 @@ public:
     TextFile(const TextFile&) = delete;
     TextFile& operator=(const TextFile&) = delete;
 
-    // Adds a text in the active code page, '?' for what that lacks, CR LF for each LF. A text for which the
-    // buffer has no room left sends the buffer out first: what reaches the file ends between two texts,
-    // unless one is longer than the buffer. Takes no memory. What the system does not take is lost. Threads:
-    // thread-safe; each text is whole.
+    // Adds a text up to its first zero, in the active code page, '?' for what that lacks, CR LF for each LF.
+    // A text for which the buffer has no room left sends the buffer out first: what reaches the file ends
+    // between two texts, unless one is longer than the buffer. Takes no memory. What the system does not take
+    // is lost. Threads: thread-safe; each text is whole.
     void write(std::wstring_view text) noexcept;
 
 private:
-    static constexpr std::size_t BUFFER = 4096;  // bytes, as the C library's
+    static constexpr std::size_t BUFFER = 8192;  // bytes: two pages, for the system does each that is cut twice
     static constexpr std::size_t PIECE = 256;    // characters that are converted at once
 
     TextFile() = default;
-    void add(std::wstring_view piece) noexcept;
     void send(std::size_t count) noexcept;
 
     int m_file = -1;

@@ -25,7 +25,7 @@ void FileLogger::Close() {
 
 void FileLogger::Write(const CString& text) {
     if (m_file != nullptr) {
-        m_file->write(text.GetString());
+        m_file->write({text.GetString(), static_cast<std::size_t>(text.GetLength())});
     }
 }
 

@@ -17,7 +17,7 @@ namespace vex_util {
 /// A log file. It holds the texts written to it and nothing else: no time stamps, levels or line ends; the
 /// host formats every line.
 ///
-/// Texts are buffered and reach the file when the buffer of 4 KiB is full, at Close() and at destruction; a
+/// Texts are buffered and reach the file when the buffer of 8 KiB is full, at Close() and at destruction; a
 /// log that the process leaves open when it exits loses its last ones. The buffer goes out between two texts,
 /// so whatever else happens to the process, and whoever else appends to the file, each text shorter than the
 /// buffer is in it whole or not at all.

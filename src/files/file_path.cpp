@@ -1,9 +1,8 @@
-#include <cwchar>
-
 #include "basalt/files.h"
 #include "src/files/handle_scoper.h"
-#include "src/files/path_parts.h"
 #include "src/platform/file.h"
+#include "src/platform/file_search.h"
+#include "src/platform/path_split.h"
 
 namespace {
 
@@ -35,19 +34,22 @@ bool is_separator(wchar_t ch) {
     return ch == L'\\' || ch == L'/';
 }
 
-// Without its first and last separator, cut in place.
-const wchar_t* trimmed(wchar_t* directory) {
-    const std::size_t length = std::wcslen(directory);
-    if (length > 0 && is_separator(directory[length - 1])) {
-        directory[length - 1] = L'\0';
+// Without its first and last separator.
+std::wstring_view trimmed(std::wstring_view directory) {
+    if (!directory.empty() && is_separator(directory.back())) {
+        directory.remove_suffix(1);
     }
-    return is_separator(directory[0]) ? directory + 1 : directory;
+    if (!directory.empty() && is_separator(directory.front())) {
+        directory.remove_prefix(1);
+    }
+    return directory;
 }
 
-// In the storage that the text has: half the time of setting a path goes into new storage otherwise.
-void assign(CString& text, const wchar_t* characters) {
-    text.Empty();
-    text += characters;
+// In the storage that the text has, so that a path that is set again and again takes no memory.
+void assign(CString& text, std::wstring_view characters) {
+    const auto length = static_cast<int>(characters.size());
+    characters.copy(text.GetBuffer(length), characters.size());
+    text.ReleaseBuffer(length);
 }
 
 }  // namespace
@@ -71,12 +73,12 @@ void CFilePath::split() {
     if (m_full_path.IsEmpty()) {
         return;
     }
-    basalt::files::PathParts parts;
-    const bool is_split = parts.split(m_full_path);
+    basalt::platform::PathParts parts;
+    const bool is_split = split_path(m_full_path.GetString(), parts);
     assign(m_drive, parts.drive);
     assign(m_directory_only, trimmed(parts.directory));
     assign(m_file_name_only, parts.name);
-    assign(m_extension, parts.extension[0] == L'.' ? parts.extension + 1 : parts.extension);
+    assign(m_extension, parts.extension.substr(parts.extension.empty() ? 0 : 1));
     if (is_split && IsDirectory(m_full_path)) {
         m_directory_only = joined(m_directory_only, m_file_name_only);
         m_file_name_only.Empty();
@@ -163,14 +165,11 @@ bool CFilePath::GetLastAccessTime(const CString& path, FILETIME& time) {
 // NOLINTNEXTLINE(readability-make-member-function-const): the published signature
 std::vector<CString> CFilePath::GetFilesInDirectory(const CString& pattern) {
     std::vector<CString> files;
-    const CString directory = Directory();
-    WIN32_FIND_DATAW entry;
-    const SearchScoper search(find_first(joined(directory, pattern), entry));
-    if (search.is_open()) {
-        do {
-            files.push_back(joined(directory, entry.cFileName));
-        } while (FindNextFileW(search.get(), &entry) != 0);
-    }
+    const CString prefix = Directory() + L'\\';
+    basalt::platform::for_each_match(prefix + pattern, [&](const wchar_t* name) {
+        CString& file = files.emplace_back(prefix);
+        file += name;
+    });
     return files;
 }
 

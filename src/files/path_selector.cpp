@@ -1,15 +1,23 @@
 #include "basalt/files.h"
-#include "src/files/path_parts.h"
+#include "src/platform/path_split.h"
+
+namespace {
+
+CString text_of(std::wstring_view part) {
+    return CString(part.data(), static_cast<int>(part.size()));
+}
+
+}  // namespace
 
 namespace vex_util {
 
 Path::Path(const CString& path) {
-    basalt::files::PathParts parts;
-    if (!path.IsEmpty() && parts.split(path)) {
-        m_drive += parts.drive;
-        m_directory += parts.directory;
-        m_name += parts.name;
-        m_extension += parts.extension;
+    basalt::platform::PathParts parts;
+    if (!path.IsEmpty() && split_path(path.GetString(), parts)) {
+        m_drive = text_of(parts.drive);
+        m_directory = text_of(parts.directory);
+        m_name = text_of(parts.name);
+        m_extension = text_of(parts.extension);
         m_valid = true;
     }
 }

@@ -88,6 +88,22 @@ char* CodePage::narrow_to(std::wstring_view text, char* bytes) const {
     return m_is_utf8 ? write_utf8(text, bytes) : narrow_by_locale_to(text, m_locale, bytes);
 }
 
+std::size_t CodePage::narrow_lines_to(std::wstring_view text, char*& bytes) const {
+    if (m_is_utf8) {
+        return write_utf8_lines(text, bytes);
+    }
+    text = text.substr(0, text.find(L'\0'));
+    const std::size_t count = text.size();
+    for (std::size_t line_end; (line_end = text.find(L'\n')) != std::wstring_view::npos;
+         text.remove_prefix(line_end + 1)) {
+        bytes = narrow_by_locale_to(text.substr(0, line_end), m_locale, bytes);
+        *bytes++ = '\r';
+        *bytes++ = '\n';
+    }
+    bytes = narrow_by_locale_to(text, m_locale, bytes);
+    return count;
+}
+
 wchar_t CodePage::to_lower(wchar_t ch) const {
     if (m_locale != nullptr) {
         return static_cast<wchar_t>(towlower_l(static_cast<wint_t>(ch), m_locale));

@@ -34,6 +34,9 @@ public:
     std::string narrow(std::wstring_view text) const;
     // The same into room for MB_LEN_MAX bytes a character; answers the end of what was written.
     char* narrow_to(std::wstring_view text, char* bytes) const;
+    // The same as text mode does it: up to the first zero, with CR LF for each LF. Moves `bytes` to the end
+    // of what was written; answers the count of characters before the zero.
+    std::size_t narrow_lines_to(std::wstring_view text, char*& bytes) const;
 
     wchar_t to_lower(wchar_t ch) const;
     wchar_t to_upper(wchar_t ch) const;

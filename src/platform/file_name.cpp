@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <iterator>
 
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
@@ -18,14 +19,9 @@ constexpr wchar_t LAST_BYTE = 0xDCFF;
 }  // namespace
 
 bool file_name_from_wide(std::wstring_view name, std::string& result) {
-    // Names are nearly all ASCII, which goes straight into its place: a third of the time of appending it.
-    result.resize(name.size());
-    std::size_t ascii = 0;
-    for (; ascii < name.size() && static_cast<char32_t>(name[ascii]) < 0x80; ++ascii) {
-        result[ascii] = name[ascii] == L'\\' ? '/' : static_cast<char>(name[ascii]);
-    }
-    result.resize(ascii);
-    for (const wchar_t ch : name.substr(ascii)) {
+    result.clear();
+    result.reserve(name.size());
+    for (const wchar_t ch : name) {
         if (ch == L'\\') {
             result.push_back('/');
         } else if (ch >= FIRST_BYTE && ch <= LAST_BYTE) {
@@ -40,26 +36,52 @@ bool file_name_from_wide(std::wstring_view name, std::string& result) {
     return true;
 }
 
-std::wstring wide_from_file_name(std::string_view name) {
-    std::wstring wide = wide_from_utf8(name);
-    // The replacement character is a character too: only a name that does not come back was no UTF-8.
-    if (wide.find(REPLACEMENT_CHARACTER) == std::wstring::npos || utf8_from_wide(wide) == name) {
-        return wide;
+bool FileName::set(std::wstring_view name) {
+    if (name.size() < std::size(m_short)) {
+        // Without a way out of the loop, so that the compiler makes lanes of it.
+        char32_t all = 0;
+        for (std::size_t i = 0; i < name.size(); ++i) {
+            const auto ch = static_cast<char32_t>(name[i]);
+            all |= ch;
+            m_short[i] = static_cast<char>(ch == U'\\' ? U'/' : ch);
+        }
+        m_short[name.size()] = '\0';
+        m_name = m_short;
+        if (all < 0x80) {
+            return true;
+        }
     }
-    wide.clear();
+    const bool is_name = file_name_from_wide(name, m_long);
+    m_name = m_long.c_str();
+    return is_name;
+}
+
+void wide_from_file_name(std::string_view name, std::wstring& result) {
+    result.resize(name.size());
+    result.resize(write_wide(name, result.data(), result.size()));
+    // The replacement character is a character too: only a name that does not come back was no UTF-8.
+    if (result.find(REPLACEMENT_CHARACTER) == std::wstring::npos || utf8_from_wide(result) == name) {
+        return;
+    }
+    result.clear();
     for (const char byte : name) {
         const auto value = static_cast<unsigned char>(byte);
-        wide.push_back(static_cast<wchar_t>(value < 0x80 ? value : 0xDC00 + value));
+        result.push_back(static_cast<wchar_t>(value < 0x80 ? value : 0xDC00 + value));
     }
+}
+
+std::wstring wide_from_file_name(std::string_view name) {
+    std::wstring wide;
+    wide_from_file_name(name, wide);
     return wide;
 }
 
-DWORD error_of_path(const std::string& path, int number) {
+DWORD error_of_path(std::string_view path, int number) {
     if (number != ENOENT) {
         return error_from_errno(number);
     }
     const std::size_t separator = path.find_last_of('/');
-    const std::string folder = separator == std::string::npos ? "." : path.substr(0, separator + 1);
+    const std::string folder(separator == std::string_view::npos ? "." : path.substr(0, separator + 1));
     return path.empty() || access(folder.c_str(), F_OK) != 0 ? ERROR_PATH_NOT_FOUND : ERROR_FILE_NOT_FOUND;
 }
 

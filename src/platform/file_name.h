@@ -13,13 +13,31 @@ namespace basalt::platform {
 // from 0xDC80 to 0xDCFF stand for single bytes.
 bool file_name_from_wide(std::wstring_view name, std::string& result);
 
+// The same for the time of a call. A name in ASCII that is not very long, as nearly all are, takes no memory.
+class FileName {
+public:
+    FileName() = default;
+    FileName(const FileName&) = delete;
+    FileName& operator=(const FileName&) = delete;
+
+    bool set(std::wstring_view name);
+    const char* c_str() const { return m_name; }
+
+private:
+    const char* m_name = "";
+    std::string m_long;
+    char m_short[512];
+};
+
 // The wide text that file_name_from_wide leads back to the same bytes. Should a name not be UTF-8, each of
 // its bytes from 0x80 on becomes a value from 0xDC80 on.
 std::wstring wide_from_file_name(std::string_view name);
+// The same in the storage that the result has.
+void wide_from_file_name(std::string_view name, std::wstring& result);
 
 // The published code of an errno value that a call gave for a path: a missing file is told from a missing
 // folder.
-DWORD error_of_path(const std::string& path, int number);
+DWORD error_of_path(std::string_view path, int number);
 
 }  // namespace basalt::platform
 

@@ -44,20 +44,26 @@ public:
     FileSearch& operator=(const FileSearch&) = delete;
 
     // Begins a search of a folder. ERROR_SUCCESS or what went wrong.
-    DWORD open(const std::string& folder, std::wstring_view pattern) {
+    DWORD open(const char* folder, std::wstring_view pattern) {
         m_pattern = pattern;
-        m_folder = opendir(folder.c_str());
+        m_folder = opendir(folder);
         if (m_folder != nullptr) {
             return ERROR_SUCCESS;
         }
         return errno == ENOENT ? ERROR_PATH_NOT_FOUND : error_from_errno(errno);
     }
 
-    // Describes the next match. ERROR_SUCCESS, ERROR_NO_MORE_FILES or what went wrong.
+    // Goes on to the next match. ERROR_SUCCESS, ERROR_NO_MORE_FILES or what went wrong.
+    DWORD advance();
+    // The name of the match.
+    const wchar_t* name() const { return m_name.c_str(); }
+    // Advances and describes the match.
     DWORD next(WIN32_FIND_DATAW& entry);
 
 private:
     DIR* m_folder = nullptr;
+    const dirent* m_found = nullptr;
+    std::wstring m_name;
     std::wstring m_pattern;
 };
 
@@ -65,13 +71,13 @@ FILETIME file_time(const statx_timestamp& time) {
     return basalt::platform::file_time(basalt::platform::ticks_of(time.tv_sec, time.tv_nsec));
 }
 
-DWORD attributes_of(const struct statx& status) {
-    return S_ISDIR(status.stx_mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
+DWORD attributes_of(mode_t mode) {
+    return S_ISDIR(mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
 }
 
 void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DATAW& entry) {
     entry = {};
-    entry.dwFileAttributes = attributes_of(status);
+    entry.dwFileAttributes = attributes_of(status.stx_mode);
     const bool knows_creation = (status.stx_mask & STATX_BTIME) != 0;
     entry.ftCreationTime = file_time(knows_creation ? status.stx_btime : status.stx_ctime);
     entry.ftLastAccessTime = file_time(status.stx_atime);
@@ -88,80 +94,114 @@ bool query(int folder, const char* name, struct statx& status) {
     if (statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) != 0) {
         return false;
     }
-    struct statx target = {};
-    if (S_ISLNK(status.stx_mode) && statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &target) == 0) {
-        status = target;
+    if (S_ISLNK(status.stx_mode)) {
+        struct statx target = {};
+        if (statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &target) == 0) {
+            status = target;
+        }
     }
     return true;
 }
 
-DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
+// The same for the mode alone, of which the system has the least to tell by this call.
+bool query_mode(const char* name, mode_t& mode) {
+    struct stat status;
+    if (fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW) != 0) {
+        return false;
+    }
+    mode = status.st_mode;
+    if (S_ISLNK(mode) && fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT) == 0) {
+        mode = status.st_mode;
+    }
+    return true;
+}
+
+DWORD FileSearch::advance() {
     if (m_folder == nullptr) {
         return ERROR_NO_MORE_FILES;
     }
-    for (;;) {
+    do {
         errno = 0;
-        const dirent* const found = readdir(m_folder);
-        if (found == nullptr) {
+        m_found = readdir(m_folder);
+        if (m_found == nullptr) {
             return errno == 0 ? ERROR_NO_MORE_FILES : error_from_errno(errno);
         }
-        const std::wstring name = basalt::platform::wide_from_file_name(found->d_name);
-        if (!matches_wildcards(name, m_pattern)) {
-            continue;
+        basalt::platform::wide_from_file_name(m_found->d_name, m_name);
+    } while (!matches_wildcards(m_name, m_pattern));
+    return ERROR_SUCCESS;
+}
+
+DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
+    for (;;) {
+        const DWORD error = advance();
+        if (error != ERROR_SUCCESS) {
+            return error;
         }
         struct statx status = {};
-        if (!query(dirfd(m_folder), found->d_name, status)) {
+        if (!query(dirfd(m_folder), m_found->d_name, status)) {
             if (errno == ENOENT) {
                 continue;  // deleted meanwhile
             }
             // A folder that may be read but not entered tells names and kinds alone.
             status = {};
-            status.stx_mode = found->d_type == DT_DIR ? S_IFDIR : S_IFREG;
+            status.stx_mode = m_found->d_type == DT_DIR ? S_IFDIR : S_IFREG;
         }
-        describe(status, name, entry);
+        describe(status, m_name, entry);
         return ERROR_SUCCESS;
     }
 }
 
-bool has_wildcards(std::wstring_view name) {
-    return name.find_first_of(L"*?") != std::wstring_view::npos;
-}
+// What a search is for.
+struct Sought {
+    std::wstring_view folder, last;  // the last element is empty behind a separator
+    bool has_wildcards = false;      // in the last element
 
-// A path's last element: empty behind a separator.
-std::wstring_view last_element(std::wstring_view path) {
-    return path.substr(path.find_last_of(L"\\/") + 1);  // all of it when there is none
-}
+    explicit Sought(std::wstring_view path) {
+        std::size_t start = path.size();
+        for (; start > 0 && path[start - 1] != L'\\' && path[start - 1] != L'/'; --start) {
+            has_wildcards |= path[start - 1] == L'*' || path[start - 1] == L'?';
+        }
+        folder = path.substr(0, start);
+        last = path.substr(start);
+    }
+};
 
-// The status of a path's own entry. ERROR_SUCCESS or what went wrong.
-DWORD query_path(std::wstring_view path, struct statx& status) {
-    std::string name;
-    if (!basalt::platform::file_name_from_wide(path, name)) {
+// Asks about a path's own entry. ERROR_SUCCESS or what went wrong.
+template <class Question>
+DWORD query_path(std::wstring_view path, Question question) {
+    basalt::platform::FileName name;
+    if (!name.set(path)) {
         return ERROR_INVALID_NAME;
     }
-    return query(AT_FDCWD, name.c_str(), status) ? ERROR_SUCCESS
-                                                 : basalt::platform::error_of_path(name, errno);
+    return question(name.c_str()) ? ERROR_SUCCESS : basalt::platform::error_of_path(name.c_str(), errno);
+}
+
+DWORD query_mode_of_path(std::wstring_view path, mode_t& mode) {
+    return query_path(path, [&](const char* name) { return query_mode(name, mode); });
+}
+
+// Opens the folder of a search with wildcards. ERROR_SUCCESS or what went wrong.
+DWORD open_folder(const Sought& sought, FileSearch& search) {
+    basalt::platform::FileName name;
+    return name.set(sought.folder.empty() ? L"." : sought.folder) ? search.open(name.c_str(), sought.last)
+                                                                  : ERROR_INVALID_NAME;
 }
 
 // Begins a search and describes its first entry.
 DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& entry) {
-    const std::wstring_view last = last_element(path);
-    if (last.empty()) {
+    const Sought sought(path);
+    if (sought.last.empty()) {
         return ERROR_FILE_NOT_FOUND;
     }
-    if (!has_wildcards(last)) {
+    if (!sought.has_wildcards) {
         struct statx status = {};
-        const DWORD error = query_path(path, status);
+        const DWORD error = query_path(path, [&](const char* name) { return query(AT_FDCWD, name, status); });
         if (error == ERROR_SUCCESS) {
-            describe(status, last, entry);
+            describe(status, sought.last, entry);
         }
         return error;
     }
-    const std::wstring_view folder = path.substr(0, path.size() - last.size());
-    std::string name;
-    if (!basalt::platform::file_name_from_wide(folder.empty() ? L"." : folder, name)) {
-        return ERROR_INVALID_NAME;
-    }
-    const DWORD error = search.open(name, last);
+    const DWORD error = open_folder(sought, search);
     if (error != ERROR_SUCCESS) {
         return error;
     }
@@ -174,17 +214,34 @@ DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& e
 DWORD basalt::platform::first_match_attributes(const wchar_t* path) noexcept {
     return or_out_of_memory(DWORD{0}, [&] {
         const std::wstring_view whole = path != nullptr ? path : L"";
-        const std::wstring_view last = last_element(whole);
-        if (last.empty() || has_wildcards(last)) {
+        const Sought sought(whole);
+        if (sought.last.empty() || sought.has_wildcards) {
             FileSearch search;
             WIN32_FIND_DATAW entry;
             const DWORD error = find_first(whole, search, entry);
             return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
         }
-        struct statx status = {};
-        const DWORD error = query_path(whole, status);
-        return error == ERROR_SUCCESS ? attributes_of(status) : fail_with(error, DWORD{0});
+        mode_t mode = 0;
+        const DWORD error = query_mode_of_path(whole, mode);
+        return error == ERROR_SUCCESS ? attributes_of(mode) : fail_with(error, DWORD{0});
     });
+}
+
+void basalt::platform::for_each_match(const wchar_t* path, const std::function<void(const wchar_t*)>& visit) {
+    const Sought sought(path);
+    if (!sought.has_wildcards) {
+        mode_t mode = 0;
+        if (!sought.last.empty() && query_mode_of_path(path, mode) == ERROR_SUCCESS) {
+            visit(sought.last.data());
+        }
+        return;
+    }
+    FileSearch search;
+    if (open_folder(sought, search) == ERROR_SUCCESS) {
+        while (search.advance() == ERROR_SUCCESS) {
+            visit(search.name());
+        }
+    }
 }
 
 HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry) {

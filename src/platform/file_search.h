@@ -2,6 +2,9 @@
 #ifndef BASALT_SRC_PLATFORM_FILE_SEARCH_H
 #define BASALT_SRC_PLATFORM_FILE_SEARCH_H
 
+#include <functional>
+#include <string_view>
+
 #include "basalt/platform/calendar.h"
 #include "basalt/platform/types.h"
 #include "src/platform/handle.h"
@@ -41,8 +44,12 @@ BOOL FindClose(HANDLE search);
 namespace basalt::platform {
 
 // The attributes of the entry that FindFirstFileW would describe, or 0 with its error; no search is left
-// open. Half the time of a search and its end, for those who ask nothing else.
+// open.
 DWORD first_match_attributes(const wchar_t* path) noexcept;
+
+// Visits the names that a search would tell, in its order, and asks the disk for no more than them. None
+// where a search cannot begin. May run out of memory; the visit may throw.
+void for_each_match(const wchar_t* path, const std::function<void(const wchar_t*)>& visit);
 
 }  // namespace basalt::platform
 

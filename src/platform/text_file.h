@@ -1,26 +1,48 @@
-// Text files written through the C library's buffered streams.
+// Text files that are written as text mode does.
 #ifndef BASALT_SRC_PLATFORM_TEXT_FILE_H
 #define BASALT_SRC_PLATFORM_TEXT_FILE_H
 
-#include <cstdio>
+#include <climits>
+#include <cstddef>
+#include <memory>
 #include <string_view>
 
-// Opens a file for writing: created, or emptied when it exists. What is written goes to the file's end as it
-// then is, so two streams on one file do not overwrite each other. A child process does not inherit it.
-// The path is narrow text in the active code page, either separator; a path with bytes that are no
-// character of it goes to the system as it is. The mode is "w", the only one there is.
-// Failure: an errno value (EINVAL for a null argument or another mode) and a null stream; 0 is success.
-// Threads: reentrant.
-int fopen_s(std::FILE** stream, const char* path, const char* mode);
+#include "src/platform/lock.h"
 
 namespace basalt::platform {
 
-// Writes text to a byte stream as text mode does: in the active code page, '?' for what that lacks, CR LF for
-// each LF. Nothing is added and the stream is not flushed, except that a text for which the buffer has no
-// room left sends the buffer out first: what reaches the file ends between two texts, unless one is longer
-// than the buffer. Takes no memory. Errors are the stream's.
-// Threads: thread-safe; each text is whole.
-void write_text(std::wstring_view text, std::FILE* stream);
+// A file open for writing, with a buffer of its own: the C library's streams cost a text a copy more and, to
+// keep it whole, two passes over it.
+class TextFile {
+public:
+    // Created, or emptied when it exists. What is written goes to the file's end as it then is, so two
+    // objects on one file do not overwrite each other. A child process does not inherit it. The path is
+    // narrow text in the active code page, either separator; one with bytes that are no character of it goes
+    // to the system as it is. Null for a file that cannot be opened, and for want of memory.
+    static std::unique_ptr<TextFile> open(const char* path) noexcept;
+    // Sends the buffer out and closes the file.
+    ~TextFile();
+    TextFile(const TextFile&) = delete;
+    TextFile& operator=(const TextFile&) = delete;
+
+    // Adds a text up to its first zero, in the active code page, '?' for what that lacks, CR LF for each LF.
+    // A text for which the buffer has no room left sends the buffer out first: what reaches the file ends
+    // between two texts, unless one is longer than the buffer. Takes no memory. What the system does not take
+    // is lost. Threads: thread-safe; each text is whole.
+    void write(std::wstring_view text) noexcept;
+
+private:
+    static constexpr std::size_t BUFFER = 8192;  // bytes: two pages, for the system does each that is cut twice
+    static constexpr std::size_t PIECE = 256;    // characters that are converted at once
+
+    TextFile() = default;
+    void send(std::size_t count) noexcept;
+
+    int m_file = -1;
+    Lock m_lock;
+    std::size_t m_size = 0;
+    char m_bytes[BUFFER + PIECE * MB_LEN_MAX];  // with room behind the buffer for any piece
+};
 
 }  // namespace basalt::platform
 

@@ -5,6 +5,7 @@
 #endif
 
 #include <algorithm>
+#include <bit>
 #include <cstdint>
 #include <cstring>
 
@@ -29,27 +30,40 @@ std::size_t ascii_prefix(std::string_view text) {
     return count;
 }
 
-// Copies the ASCII characters at the front and answers their count. Sixteen at a time where the processor
-// always can: half the time of writing a log line otherwise.
-std::size_t copy_ascii_prefix(std::wstring_view text, char* bytes) {
+#if defined(__SSE2__)
+// Narrows sixteen characters and answers how many at their front are from ' ' to 0x7F. Narrowing saturates: a
+// character beyond 0xFF becomes 0xFF, one below 0 becomes 0, and as signed bytes all others are below ' '.
+std::size_t copy_sixteen(const wchar_t* text, char* bytes) {
+    const auto four = [text](std::size_t offset) {
+        return _mm_loadu_si128(reinterpret_cast<const __m128i*>(text + offset));
+    };
+    const __m128i packed =
+        _mm_packus_epi16(_mm_packs_epi32(four(0), four(4)), _mm_packs_epi32(four(8), four(12)));
+    _mm_storeu_si128(reinterpret_cast<__m128i*>(bytes), packed);
+    const __m128i is_printing = _mm_cmpgt_epi8(packed, _mm_set1_epi8(' ' - 1));
+    return static_cast<std::size_t>(std::countr_one(static_cast<unsigned>(_mm_movemask_epi8(is_printing))));
+}
+#endif
+
+// Copies the characters from ' ' to 0x7F at the front and answers their count; what it writes behind them, as
+// far as the text is long, has no meaning.
+std::size_t copy_printing_prefix(std::wstring_view text, char* bytes) {
     std::size_t count = 0;
 #if defined(__SSE2__)
-    const auto four = [&](std::size_t offset) {
-        return _mm_loadu_si128(reinterpret_cast<const __m128i*>(text.data() + count + offset));
-    };
-    const __m128i beyond_ascii = _mm_set1_epi32(~0x7F);
-    for (; text.size() - count >= 16; count += 16) {
-        const __m128i a = four(0), b = four(4), c = four(8), d = four(12);
-        const __m128i all = _mm_or_si128(_mm_or_si128(a, b), _mm_or_si128(c, d));
-        const __m128i is_ascii = _mm_cmpeq_epi32(_mm_and_si128(all, beyond_ascii), _mm_setzero_si128());
-        if (_mm_movemask_epi8(is_ascii) != 0xFFFF) {
-            break;
+    // Sixteen at a time where the processor always can: a third of the time of a log line otherwise. The last
+    // sixteen overlap the ones before, which are printing.
+    if (text.size() >= 16) {
+        const std::size_t last = text.size() - 16;
+        for (; count < last; count += 16) {
+            const std::size_t printing = copy_sixteen(text.data() + count, bytes + count);
+            if (printing < 16) {
+                return count + printing;
+            }
         }
-        const __m128i packed = _mm_packus_epi16(_mm_packs_epi32(a, b), _mm_packs_epi32(c, d));
-        _mm_storeu_si128(reinterpret_cast<__m128i*>(bytes + count), packed);
+        return last + copy_sixteen(text.data() + last, bytes + last);
     }
 #endif
-    for (; count < text.size() && static_cast<char32_t>(text[count]) < 0x80; ++count) {
+    for (; count < text.size() && text[count] >= L' ' && text[count] < 0x80; ++count) {
         bytes[count] = static_cast<char>(text[count]);
     }
     return count;
@@ -127,15 +141,31 @@ std::string utf8_from_wide(std::wstring_view text) {
 
 char* write_utf8(std::wstring_view text, char* bytes) {
     while (!text.empty()) {
-        const std::size_t ascii = copy_ascii_prefix(text, bytes);
-        bytes += ascii;
-        text.remove_prefix(ascii);
+        const std::size_t printing = copy_printing_prefix(text, bytes);
+        bytes += printing;
+        text.remove_prefix(printing);
         if (!text.empty()) {
             bytes += encode_utf8(text.front(), bytes);
             text.remove_prefix(1);
         }
     }
     return bytes;
+}
+
+std::size_t write_utf8_lines(std::wstring_view text, char*& bytes) {
+    std::size_t done = 0;
+    for (;;) {
+        const std::size_t printing = copy_printing_prefix(text.substr(done), bytes);
+        bytes += printing;
+        done += printing;
+        if (done == text.size() || text[done] == L'\0') {
+            return done;
+        }
+        if (text[done] == L'\n') {
+            *bytes++ = '\r';
+        }
+        bytes += encode_utf8(text[done++], bytes);
+    }
 }
 
 std::size_t write_wide(std::string_view text, wchar_t* characters, std::size_t room) {

@@ -27,6 +27,9 @@ std::string utf8_from_wide(std::wstring_view text);
 
 // The same into room for MAX_UTF8_BYTES a character; answers the end of what was written.
 char* write_utf8(std::wstring_view text, char* bytes);
+// The same as text mode does it: up to the first zero, with CR LF for each LF. Moves `bytes` to the end of
+// what was written; answers the count of characters before the zero.
+std::size_t write_utf8_lines(std::wstring_view text, char*& bytes);
 
 // Every byte sequence in its character, zeros included; REPLACEMENT_CHARACTER for each byte that belongs to
 // none (overlong forms, surrogates, values beyond 0x10FFFF and a character cut short at the end as well).

@@ -10,27 +10,22 @@ FileLogger::FileLogger(const char* path) {
     Open(path);
 }
 
-FileLogger::~FileLogger() {
-    Close();
-}
+FileLogger::~FileLogger() = default;
 
 void FileLogger::Open(const char* path) {
     Close();
     if (path != nullptr && *path != '\0') {
-        fopen_s(&m_stream, path, "w");
+        m_file = basalt::platform::TextFile::open(path);
     }
 }
 
 void FileLogger::Close() {
-    if (m_stream != nullptr) {
-        std::fclose(m_stream);
-        m_stream = nullptr;
-    }
+    m_file.reset();
 }
 
 void FileLogger::Write(const CString& text) {
-    if (m_stream != nullptr) {
-        basalt::platform::write_text(text.GetString(), m_stream);
+    if (m_file != nullptr) {
+        m_file->write({text.GetString(), static_cast<std::size_t>(text.GetLength())});
     }
 }
 

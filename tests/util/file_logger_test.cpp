@@ -2,7 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cerrno>
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
@@ -15,7 +14,6 @@
 #include <type_traits>
 #include <vector>
 
-#include "src/platform/text_file.h"
 #include "tests/support/failing_new.h"
 
 namespace {
@@ -23,24 +21,6 @@ namespace {
 using vex_util::FileLogger;
 namespace fs = std::filesystem;
 using namespace std::string_literals;
-
-bool fdopen_fails = false;
-
-}  // namespace
-
-// The name the linker's --wrap makes of fdopen.
-extern "C" {
-std::FILE* __real_fdopen(int file, const char* mode);
-std::FILE* __wrap_fdopen(int file, const char* mode) {
-    if (!fdopen_fails) {
-        return __real_fdopen(file, mode);
-    }
-    errno = ENOMEM;
-    return nullptr;
-}
-}
-
-namespace {
 
 std::string contents(const fs::path& file) {
     std::ifstream stream(file, std::ios::binary);
@@ -252,16 +232,24 @@ TEST_F(FileLog, full_disk_is_silent) {
     EXPECT_EQ(contents(file), "still usable");
 }
 
-TEST_F(FileLog, stream_that_cannot_be_made_leaves_no_file_open) {
+TEST_F(FileLog, opening_without_memory_is_silent_and_leaves_no_file_open) {
     const auto open_files = [] {
         return std::distance(fs::directory_iterator("/proc/self/fd"), fs::directory_iterator());
     };
     const auto before = open_files();
-    fdopen_fails = true;
-    FileLogger log(file.c_str());
-    fdopen_fails = false;
-    log.Write(L"lost");
-    EXPECT_EQ(open_files(), before);
+    bool fired = true;
+    for (long nth = 1; fired; ++nth) {
+        FileLogger log;
+        {
+            const FailAllocation guard(nth);
+            log.Open(file.c_str());
+            fired = guard.fired();
+        }
+        EXPECT_EQ(open_files(), before + (fired ? 0 : 1)) << nth;
+        log.Write(L"text");
+        log.Close();
+        EXPECT_EQ(fs::exists(file) ? contents(file) : "", fired ? "" : "text") << nth;
+    }
 }
 
 // In encodings other than UTF-8, of locales made here; each in a process of its own, since the environment is
@@ -297,16 +285,6 @@ TEST_F(FileLog, follows_the_environments_encoding) {
             GTEST_SKIP() << "localedef cannot make the locales";
         }
     }
-}
-
-TEST_F(FileLog, the_one_mode_and_its_errors) {
-    std::FILE* stream = stdout;
-    EXPECT_EQ(fopen_s(&stream, file.c_str(), "r"), EINVAL);
-    EXPECT_EQ(stream, nullptr);
-    EXPECT_EQ(fopen_s(&stream, nullptr, "w"), EINVAL);
-    EXPECT_EQ(fopen_s(nullptr, file.c_str(), "w"), EINVAL);
-    EXPECT_EQ(fopen_s(&stream, "/no such folder/log", "w"), ENOENT);
-    EXPECT_FALSE(fs::exists(file));
 }
 
 }  // namespace

@@ -3,19 +3,24 @@
 #ifndef BASALT_UTIL_FILE_LOGGER_H
 #define BASALT_UTIL_FILE_LOGGER_H
 
-#include <cstdio>
+#include <memory>
 
 #include "basalt/export.h"
 #include "basalt/platform/cstring.h"
+
+namespace basalt::platform {
+class TextFile;
+}
 
 namespace vex_util {
 
 /// A log file. It holds the texts written to it and nothing else: no time stamps, levels or line ends; the
 /// host formats every line.
 ///
-/// Texts are buffered by the C library and reach the file when its buffer (usually 4 KiB) is full, at Close()
-/// and at destruction. The buffer goes out between two texts, so whatever else happens to the process, and
-/// whoever else appends to the file, each text shorter than the buffer is in it whole or not at all.
+/// Texts are buffered and reach the file when the buffer of 8 KiB is full, at Close() and at destruction; a
+/// log that the process leaves open when it exits loses its last ones. The buffer goes out between two texts,
+/// so whatever else happens to the process, and whoever else appends to the file, each text shorter than the
+/// buffer is in it whole or not at all.
 ///
 /// Failures are silent: what cannot be opened stays closed, and what cannot be written, on a full disk, is
 /// lost.
@@ -45,7 +50,7 @@ public:
     void Write(const CString& text);
 
 private:
-    std::FILE* m_stream = nullptr;
+    std::unique_ptr<basalt::platform::TextFile> m_file;  // null when the log is closed
 };
 
 }  // namespace vex_util

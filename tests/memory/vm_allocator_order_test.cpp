@@ -6,6 +6,7 @@
 #include <cstring>
 #include <map>
 #include <random>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -45,7 +46,7 @@ public:
         } else {
             segment.next_offset += m_block_size;
         }
-        segment.used.push_back(entry);
+        segment.used.insert(entry);
         if (segment.free.empty() && segment.next_offset + m_block_size > m_segment_size) {
             m_partial.pop_back();
             m_full.push_back(number);
@@ -60,7 +61,7 @@ public:
             return false;
         }
         Segment& segment = m_segments[place.segment];
-        if (std::erase(segment.used, place.offset) == 0) {
+        if (segment.used.erase(place.offset) == 0) {
             return false;
         }
         segment.free.push_back(place.offset);
@@ -76,7 +77,8 @@ public:
 
 private:
     struct Segment {
-        std::vector<std::uint64_t> used, free;
+        std::set<std::uint64_t> used;
+        std::vector<std::uint64_t> free;
         std::uint64_t next_offset = 0;
     };
 
@@ -122,36 +124,26 @@ public:
         for (std::size_t i = 0; i < m_block_size; ++i) {
             ASSERT_EQ(static_cast<unsigned char>(block[i]), stamp_of(block));
         }
-        const std::size_t before = m_live.size();
-        free_at(block);
-        ASSERT_EQ(m_live.size(), before - 1);
+        ASSERT_TRUE(free_at(block));
+        m_live.erase(m_live.begin() + static_cast<std::ptrdiff_t>(index));
         m_freed = block;
     }
 
-    // What is no block in use, as a rule: freed already, inside one, just outside of a view (where another
-    // may begin), in none.
+    // What is no block in use, as a rule: in no view, just outside of one (where another may begin), inside a
+    // block, freed already.
     void free_nonsense(std::size_t choice) {
         char* const base = m_bases[choice / 8 % m_bases.size()];
-        switch (choice % 8) {
-            case 0:
-                m_allocator.Free(nullptr);
-                break;
-            case 1:
-                m_allocator.Free(&choice);
-                break;
-            case 2:
-                free_at(base + m_segment_size);
-                break;
-            case 3:
-                free_at(base - 1);
-                break;
-            case 4:
-                free_at(base + choice / 64 % m_segment_size);
-                break;
-            default:
-                if (m_freed != nullptr) {
-                    free_at(m_freed);
-                }
+        char* const addresses[] = {nullptr,
+                                   reinterpret_cast<char*>(&choice),
+                                   base - 1,
+                                   base + m_segment_size,
+                                   base + choice / 64 % m_segment_size,
+                                   m_freed,
+                                   m_freed,
+                                   m_freed};
+        char* const address = addresses[choice % 8];
+        if (free_at(address)) {
+            std::erase(m_live, address);
         }
     }
 
@@ -163,15 +155,15 @@ private:
         return static_cast<unsigned char>(number_of(block) * 31 >> 3);
     }
 
-    void free_at(char* address) {
-        const auto after = m_segments.upper_bound(number_of(address));
-        if (after != m_segments.begin()) {
-            const auto& [base, segment] = *std::prev(after);
-            if (m_plain.free({segment, number_of(address) - base})) {
-                std::erase(m_live, address);
-            }
-        }
+    // Whether it was a block in use, going by the rules.
+    bool free_at(char* address) {
         m_allocator.Free(address);
+        const auto after = m_segments.upper_bound(number_of(address));
+        if (after == m_segments.begin()) {
+            return false;
+        }
+        const auto& [base, segment] = *std::prev(after);
+        return m_plain.free({segment, number_of(address) - base});
     }
 
     unsigned long m_segment_size, m_block_size;

@@ -17,20 +17,26 @@ namespace {
 constexpr int LONGEST_NAME = 259;  // characters
 constexpr int MAX_DRAWS = 1000;    // of the 65,535 numbers; with all of them taken there is no end else
 
+// The full name of a number's file in the temporary folder as it is now; empty when there is no folder or the
+// name would not fit.
+CString file_name(std::uint16_t number) {
+    const CString folder = _tempFilePath();
+    CString name;
+    if (!folder.IsEmpty()) {
+        name.Format(L"%s\\~%07i.mem", folder, number);
+    }
+    return name.GetLength() <= LONGEST_NAME ? name : CString();
+}
+
 // A new file, held alone and deleted when closed, and the number in its name; INVALID_HANDLE_VALUE on
 // failure.
 HANDLE create_file(std::uint16_t& number) {
-    const CString folder = _tempFilePath();
-    if (folder.IsEmpty()) {
-        return INVALID_HANDLE_VALUE;
-    }
     HANDLE file = INVALID_HANDLE_VALUE;
     DWORD error = ERROR_FILE_EXISTS;
     for (int draw = 0; draw < MAX_DRAWS && error == ERROR_FILE_EXISTS; ++draw) {
         number = _random_uint16();
-        CString name;
-        name.Format(L"%s\\~%07i.mem", folder, number);
-        if (name.GetLength() > LONGEST_NAME) {
+        const CString name = file_name(number);
+        if (name.IsEmpty()) {
             return INVALID_HANDLE_VALUE;
         }
         file = CreateFileW(name, GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_NEW,
@@ -38,6 +44,18 @@ HANDLE create_file(std::uint16_t& number) {
         error = file != INVALID_HANDLE_VALUE ? ERROR_SUCCESS : GetLastError();
     }
     return file;
+}
+
+// Deletes a number's file in the temporary folder as it is now, unless somebody holds it.
+void delete_by_number(std::uint16_t number) {
+    try {
+        const CString name = file_name(number);
+        if (!name.IsEmpty()) {
+            DeleteFileW(name);
+        }
+    } catch (const std::exception&) {
+        // No memory for the name: clean-up finds the file, if there is one.
+    }
 }
 
 // Ends a search however its owner is left.
@@ -109,10 +127,11 @@ bool CMemoryMap::Destroy() {
         m_mapping = nullptr;
     }
     if (m_file != INVALID_HANDLE_VALUE) {
-        // Closing deletes it, by the path it was made under. Deleting the name once more, composed anew,
-        // could only ever hit another file.
+        // Closing deletes it, by the path it was made under. What has its name in today's folder and is held
+        // by nobody is stale.
         CloseHandle(m_file);
         m_file = INVALID_HANDLE_VALUE;
+        delete_by_number(m_number);
     }
     return true;
 }

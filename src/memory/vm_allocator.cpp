@@ -83,7 +83,7 @@ vlVmAllocator::Segment* vlVmAllocator::find_segment(const void* block) const {
         address - reinterpret_cast<std::uintptr_t>(m_partial->base) < m_segment_size) {
         return m_partial;
     }
-    if (m_segments == nullptr) {
+    if (m_segments == nullptr || m_segments->count == 0) {
         return nullptr;
     }
     // The last one that starts at or before the address, by halves and without a branch to mispredict.

@@ -1,20 +1,16 @@
 #include "basalt/memory/memory_map.h"
 
 #include <gtest/gtest.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
-#include <csignal>
 #include <cstdlib>
 #include <filesystem>
-#include <memory>
 #include <set>
 #include <string>
 #include <type_traits>
-#include <vector>
 
+#include "src/platform/file.h"
 #include "tests/support/failing_new.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
@@ -53,48 +49,6 @@ bool is_usable(const CMemoryMap& map, std::size_t size) {
     std::fill_n(data, size, 'x');
     return true;
 }
-
-// A child process that runs a function with one end of a pipe, and is over when this is.
-class Child {
-public:
-    template <class Body>
-    explicit Child(Body body) {
-        int ready[2];
-        EXPECT_EQ(pipe(ready), 0);
-        m_process = fork();
-        if (m_process == 0) {
-            close(ready[0]);
-            body(ready[1]);
-            std::exit(0);
-        }
-        close(ready[1]);
-        char byte;
-        EXPECT_EQ(read(ready[0], &byte, 1), 1);  // its maps stand
-        close(ready[0]);
-    }
-    ~Child() { end(SIGKILL); }
-    Child(const Child&) = delete;
-    Child& operator=(const Child&) = delete;
-
-    void end(int signal) {
-        if (m_process > 0) {
-            kill(m_process, signal);
-            waitpid(m_process, nullptr, 0);
-            m_process = 0;
-        }
-    }
-
-    static void tell(int ready) { EXPECT_EQ(write(ready, "!", 1), 1); }
-    [[noreturn]] static void tell_and_wait(int ready) {
-        tell(ready);
-        for (;;) {
-            pause();
-        }
-    }
-
-private:
-    pid_t m_process;
-};
 
 TEST(MemoryMap, is_a_hidden_file_while_it_lives) {
     const ScratchFolder folder;
@@ -167,16 +121,24 @@ TEST(MemoryMap, the_longest_name_that_fits) {
     }
 }
 
-TEST(MemoryMap, deletes_the_file_it_made_wherever_the_folder_is_by_then) {
+TEST(MemoryMap, deletes_the_file_it_made_and_a_stale_one_of_its_name_in_the_folder_of_then) {
     const ScratchFolder folder;
     std::filesystem::create_directory(folder / "other");
-    CMemoryMap map(SIZE);
-    const std::string name = *folder.names().begin();
-    folder.write("other/" + name, "not ours");
-    ScratchFolder::set_temporary(folder / "other");
-    map.Destroy();
-    EXPECT_EQ(folder.names(), Names{"other"});
-    EXPECT_TRUE(std::filesystem::exists(folder / ("other/" + name)));
+    for (const bool is_held : {false, true}) {
+        ScratchFolder::set_temporary(folder.path());
+        CMemoryMap map(SIZE);
+        const std::string name = *folder.names().rbegin();
+        folder.write("other/" + name);
+        const std::wstring other = folder.wide(L"other/" + std::wstring(name.begin(), name.end()));
+        const HANDLE holder = is_held ? CreateFileW(other.c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr,
+                                                    OPEN_EXISTING, FILE_FLAG_DELETE_ON_CLOSE, nullptr)
+                                      : INVALID_HANDLE_VALUE;
+        ScratchFolder::set_temporary(folder / "other");
+        map.Destroy();
+        EXPECT_EQ(folder.names(), Names{"other"});
+        EXPECT_EQ(std::filesystem::is_empty(folder / "other"), !is_held);
+        CloseHandle(holder);
+    }
 }
 
 TEST(MemoryMap, a_thousand_names_taken_lead_to_the_heap) {
@@ -193,45 +155,6 @@ TEST(MemoryMap, a_thousand_names_taken_lead_to_the_heap) {
         EXPECT_TRUE(map.Create(SIZE)) << "the next number is free";
     }
     EXPECT_EQ(folder.names().size(), 1U);
-}
-
-TEST(MemoryMap, many_processes_share_the_folder) {
-    const ScratchFolder folder;
-    {
-        std::vector<std::unique_ptr<Child>> children;
-        for (int i = 0; i < 6; ++i) {
-            children.push_back(std::make_unique<Child>([](int ready) {
-                static std::vector<CMemoryMap> maps(40);
-                for (CMemoryMap& map : maps) {
-                    map.Create(SIZE);
-                    std::fill_n(bytes(map), SIZE, 'x');
-                }
-                Child::tell_and_wait(ready);
-            }));
-        }
-        EXPECT_EQ(folder.names().size(), 240U);
-        CMemoryMap::CleanUp();
-        EXPECT_EQ(folder.names().size(), 240U);
-        children.front()->end(SIGKILL);
-        EXPECT_EQ(folder.names().size(), 240U) << "nobody had the time to delete them";
-        CMemoryMap::CleanUp();
-        EXPECT_EQ(folder.names().size(), 200U);
-    }
-    CMemoryMap::CleanUp();
-    EXPECT_EQ(folder.names(), Names{});
-}
-
-TEST(MemoryMap, an_owner_that_exits_takes_its_files_along) {
-    const ScratchFolder folder;
-    CMemoryMap ours(SIZE);
-    Child child([](int ready) {
-        static CMemoryMap* const map = new CMemoryMap(SIZE);
-        EXPECT_NE(bytes(*map), nullptr);
-        Child::tell(ready);
-    });
-    child.end(0);  // waits for it
-    EXPECT_EQ(folder.names().size(), 1U) << "those of its parent stay";
-    EXPECT_TRUE(is_usable(ours, SIZE));
 }
 
 TEST(MemoryMap, clean_up_deletes_what_nobody_holds) {
@@ -297,6 +220,10 @@ TEST(MemoryMap, every_failing_call_is_made_up_for_by_the_heap) {
         {
             const FailAllocation failure(n);
             CMemoryMap::CleanUp();
+        }
+        {
+            const FailAllocation failure(n);
+            map.Destroy();
         }
         std::filesystem::remove(folder / "~stale.mem");
         EXPECT_EQ(open_descriptors(), descriptors);

@@ -1,15 +1,15 @@
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <cstring>
-#include <map>
-#include <random>
+#include <filesystem>
+#include <set>
 #include <string>
 #include <type_traits>
 #include <utility>
 #include <vector>
 
 #include "basalt/memory.h"
-#include "tests/memory/plain_block_allocator.h"
 #include "tests/support/heap_calls.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
@@ -17,151 +17,9 @@
 namespace {
 
 using basalt::test::HeapFailure;
-using basalt::test::PlainBlockAllocator;
 using basalt::test::ScratchFolder;
 using basalt::test::SystemFailure;
 using vex_lib::vlVmAllocator;
-
-constexpr std::uintptr_t PAGE = 4096;
-
-std::uintptr_t number_of(const void* address) {
-    return reinterpret_cast<std::uintptr_t>(address);
-}
-
-// Drives an allocator and the plain rules alike, and compares every address.
-class Pair {
-public:
-    Pair(unsigned long segment_size, unsigned long block_size)
-        : m_segment_size(segment_size),
-          m_block_size(block_size),
-          m_allocator(segment_size, block_size),
-          m_plain(segment_size, block_size) {}
-
-    void alloc() {
-        auto* const block = static_cast<char*>(m_allocator.Alloc(m_block_size));
-        ASSERT_NE(block, nullptr);
-        const PlainBlockAllocator::Place place = m_plain.alloc();
-        if (place.segment == m_bases.size()) {
-            ASSERT_EQ(place.offset, 0U);
-            ASSERT_EQ(number_of(block) % PAGE, 0U);
-            m_bases.push_back(block);
-            const bool is_new = m_segments.emplace(number_of(block), place.segment).second;
-            ASSERT_TRUE(is_new);
-        }
-        ASSERT_EQ(block, m_bases[place.segment] + place.offset);
-        // Over the whole block, so that any overlap, with bookkeeping too, shows when it is freed.
-        std::memset(block, stamp_of(block), m_block_size);
-        m_live.push_back(block);
-    }
-
-    void free_live(std::size_t index) {
-        char* const block = m_live[index];
-        for (std::size_t i = 0; i < m_block_size; ++i) {
-            ASSERT_EQ(static_cast<unsigned char>(block[i]), stamp_of(block));
-        }
-        const std::size_t before = m_live.size();
-        free_at(block);
-        ASSERT_EQ(m_live.size(), before - 1);
-        m_freed = block;
-    }
-
-    // What is no block in use, as a rule: freed already, inside one, just outside of a view (where another
-    // may begin), in none.
-    void free_nonsense(std::size_t choice) {
-        char* const base = m_bases[choice / 8 % m_bases.size()];
-        switch (choice % 8) {
-            case 0:
-                m_allocator.Free(nullptr);
-                break;
-            case 1:
-                m_allocator.Free(&choice);
-                break;
-            case 2:
-                free_at(base + m_segment_size);
-                break;
-            case 3:
-                free_at(base - 1);
-                break;
-            case 4:
-                free_at(base + choice / 64 % m_segment_size);
-                break;
-            default:
-                if (m_freed != nullptr) {
-                    free_at(m_freed);
-                }
-        }
-    }
-
-    std::size_t live() const { return m_live.size(); }
-    std::size_t segments() const { return m_bases.size(); }
-
-private:
-    static unsigned char stamp_of(const char* block) {
-        return static_cast<unsigned char>(number_of(block) * 31 >> 3);
-    }
-
-    void free_at(char* address) {
-        const auto after = m_segments.upper_bound(number_of(address));
-        if (after != m_segments.begin()) {
-            const auto& [base, segment] = *std::prev(after);
-            if (m_plain.free({segment, number_of(address) - base})) {
-                std::erase(m_live, address);
-            }
-        }
-        m_allocator.Free(address);
-    }
-
-    unsigned long m_segment_size, m_block_size;
-    vlVmAllocator m_allocator;
-    PlainBlockAllocator m_plain;
-    std::vector<char*> m_bases;
-    std::map<std::uintptr_t, std::size_t> m_segments;  // by base
-    std::vector<char*> m_live;
-    char* m_freed = nullptr;
-};
-
-struct Sizes {
-    unsigned long segment, block;
-    std::size_t most_live;
-    int steps;
-};
-
-class VmAllocatorOrder : public testing::TestWithParam<Sizes> {};
-
-TEST_P(VmAllocatorOrder, is_that_of_the_lists) {
-    const Sizes& sizes = GetParam();
-    const ScratchFolder folder;
-    const unsigned seed = std::random_device()();
-    SCOPED_TRACE(testing::Message() << "seed " << seed);
-    std::mt19937 random(seed);
-    Pair pair(sizes.segment, sizes.block);
-    bool grows = true;
-    for (int step = 0; step < sizes.steps && !testing::Test::HasFatalFailure(); ++step) {
-        if (pair.live() == 0 || pair.live() >= sizes.most_live) {
-            grows = pair.live() == 0;
-        }
-        const std::size_t draw = random();
-        if (draw % 50 == 0 && pair.segments() != 0) {
-            pair.free_nonsense(random());
-        } else if ((draw % 4 != 0) == grows) {
-            pair.alloc();
-        } else if (pair.live() != 0) {
-            const std::size_t newest = pair.live() - 1;
-            const std::size_t choices[] = {0, newest, newest, random() % pair.live()};
-            pair.free_live(choices[random() % 4]);
-        }
-    }
-}
-
-INSTANTIATE_TEST_SUITE_P(Sizes, VmAllocatorOrder,
-                         testing::Values(Sizes{100, 30, 200, 20'000},          // does not divide
-                                         Sizes{4096, 4096, 60, 5'000},         // one block a file
-                                         Sizes{8191, 4096, 40, 5'000},         // the same, with a rest
-                                         Sizes{1, 1, 40, 5'000},               // the smallest
-                                         Sizes{3 * 4096, 4096, 100, 20'000},   // several
-                                         Sizes{33 * 100, 100, 400, 40'000},    // a second word of bits
-                                         Sizes{1 << 20, 65537, 100, 2'000},    // blocks beyond a page
-                                         Sizes{70'000, 4, 40'000, 120'000}));  // a second chunk of state
 
 TEST(VmAllocator, refuses_what_it_does_not_serve) {
     const ScratchFolder folder;
@@ -323,6 +181,9 @@ TEST(VmAllocator, without_a_temporary_folder_or_bookkeeping_gives_null) {
         ScratchFolder::set_temporary(name);
         vlVmAllocator allocator(4096, 4096);
         EXPECT_EQ(allocator.Alloc(4096), nullptr);
+        void* as_in_fresh_memory = nullptr;
+        std::memset(&as_in_fresh_memory, basalt::test::FRESH_BYTE, sizeof as_in_fresh_memory);
+        allocator.Free(as_in_fresh_memory);  // compared with no entry of the index, which is empty
         ScratchFolder::set_temporary(folder.path());
         EXPECT_NE(allocator.Alloc(4096), nullptr) << "the folder is asked for anew";
     }

@@ -4,6 +4,7 @@
 #include <type_traits>
 
 #include "basalt/memory.h"
+#include "tests/support/failing_new.h"
 #include "tests/support/heap_calls.h"
 
 namespace {
@@ -91,6 +92,10 @@ TEST(VmBuffer, keeps_its_block_when_it_cannot_grow) {
 TEST(VmBuffer, exercise_leaves_nothing_behind) {
     const long before = basalt::test::live_heap_blocks();
     vlVmBuffer::Test();
+    EXPECT_NO_THROW({
+        const FailAllocation failure(1, true);
+        vlVmBuffer::Test();
+    });
     EXPECT_EQ(basalt::test::live_heap_blocks(), before);
     static_assert(!std::is_copy_constructible_v<vlVmBuffer> && !std::is_copy_assignable_v<vlVmBuffer>);
     static_assert(sizeof(vlVmBuffer) == sizeof(void*) + 4 * sizeof(std::uint32_t));

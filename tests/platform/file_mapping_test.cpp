@@ -13,7 +13,6 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/file.h"
-#include "tests/support/failing_new.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
 
@@ -102,20 +101,6 @@ TEST(FileMapping, a_view_outlives_its_handles_and_keeps_the_lock) {
     EXPECT_EQ(DeleteFileW(name.c_str()), 1);
 }
 
-TEST(FileMapping, anonymous_pages) {
-    const long mapped = mapped_balance();
-    const HANDLE mapping = make_mapping(INVALID_HANDLE_VALUE);
-    char* const view = map(mapping);
-    ASSERT_NE(view, nullptr);
-    EXPECT_TRUE(is_zero(view, SIZE));
-    view[SIZE - 1] = 'x';
-    EXPECT_EQ(UnmapViewOfFile(view), 1);
-    EXPECT_EQ(CloseHandle(mapping), 1);
-    EXPECT_EQ(mapped_balance(), mapped);
-    EXPECT_EQ(map(mapping), nullptr);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
-}
-
 TEST(FileMapping, other_uses_are_refused) {
     const ScratchFolder folder;
     const HANDLE file = make_file(folder.wide(L"file"));
@@ -168,21 +153,6 @@ TEST(FileMapping, every_failing_call_leaves_nothing_behind) {
             EXPECT_EQ(open_descriptors(), descriptors);
             EXPECT_TRUE(folder.names().empty());
         }
-    }
-    bool has_failed = true;
-    for (long n = 1; has_failed; ++n) {
-        char* view = nullptr;
-        HANDLE mapping = nullptr;
-        {
-            const FailAllocation failure(n);
-            mapping = make_mapping(INVALID_HANDLE_VALUE);
-            view = mapping != nullptr ? map(mapping) : nullptr;
-            has_failed = failure.fired();
-        }
-        EXPECT_EQ(view == nullptr, has_failed);
-        UnmapViewOfFile(view);
-        CloseHandle(mapping);
-        EXPECT_EQ(mapped_balance(), mapped);
     }
 }
 

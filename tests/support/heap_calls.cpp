@@ -1,5 +1,8 @@
 #include "tests/support/heap_calls.h"
 
+#include <algorithm>
+#include <cstring>
+
 namespace {
 
 thread_local int calls_left = 0;  // until one fails; 0: none will
@@ -24,7 +27,10 @@ void __real_free(void*);
 
 void* __wrap_malloc(std::size_t size) {
     void* const block = fails_now(size) ? nullptr : __real_malloc(size);
-    live_blocks += block != nullptr ? 1 : 0;
+    if (block != nullptr) {
+        ++live_blocks;
+        std::memset(block, basalt::test::FRESH_BYTE, std::min(size, std::size_t{4096}));
+    }
     return block;
 }
 

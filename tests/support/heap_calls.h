@@ -1,10 +1,13 @@
-// Watches the general-purpose heap and makes it fail (linked with --wrap for malloc, realloc and free).
+// Watches the general-purpose heap and makes it fail (linked with --wrap for malloc, realloc and free). What
+// malloc gives is filled, so that reading it before it is written shows.
 #ifndef BASALT_TESTS_SUPPORT_HEAP_CALLS_H
 #define BASALT_TESTS_SUPPORT_HEAP_CALLS_H
 
 #include <cstddef>
 
 namespace basalt::test {
+
+inline constexpr unsigned char FRESH_BYTE = 0xA5;
 
 // While alive, the n-th malloc or realloc from now on (n = 1, 2, ...) of this thread fails, once. Assertions
 // of the test framework allocate, so end it before asserting.

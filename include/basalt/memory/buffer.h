@@ -39,7 +39,7 @@ public:
 
     /// A fixed exercise of growing arrays, for profiling: five times 10,000 records of six doubles are
     /// appended one by one to a fresh array, which is then assigned to one that is kept. Leaves nothing
-    /// behind. Runs out of memory by std::bad_alloc. Threads: reentrant.
+    /// behind, and ends early without memory. Threads: reentrant.
     static void Test();
 
 private:

@@ -39,7 +39,8 @@ public:
     ///         room, and for a size above the range
     bool Create(unsigned long size);
 
-    /// Releases the block and deletes its file; without a block it does nothing.
+    /// Releases the block and deletes its file, wherever the temporary folder is by then; there, a file of
+    /// the same name that no living block holds goes too, as by CleanUp(). Without a block it does nothing.
     /// @return true
     bool Destroy();
 

@@ -22,21 +22,18 @@ public:
     /// Reserves a range, or commits pages of one.
     /// @param address reserve: where the range is to begin, brought down to a multiple of 64 KiB, or null for
     ///        anywhere; commit: the first byte to use
-    /// @param size bytes, up to 2^32 - 1; the pages that hold them are reserved or committed whole.
-    /// Committing
-    ///        0 bytes does nothing and gives null, unreported
+    /// @param size bytes, up to 2^32 - 1, whose pages are reserved or committed whole; committing 0 does
+    ///        nothing and gives null, unreported
     /// @param type 0x1000 commits, 0x2000 reserves
     /// @param handle not used, may be null
     /// @return reserve: the base of the range; commit: the base of the first page; null on failure and for
-    /// any
-    ///         other code. A commit that fails keeps the pieces, of up to 32 MiB each, that succeeded.
+    ///         any other code. A commit that fails keeps the pieces, of up to 32 MiB each, that succeeded.
     static void* Alloc(void* address, unsigned long size, unsigned long type, unsigned long* handle);
 
     /// Decommits pages, or releases a range.
     /// @param address decommit: the first byte to give up; release: the base of the range
-    /// @param size decommit: bytes, up to 2^32 - 1, the pages that hold them are given up whole; 0 does
-    /// nothing
-    ///        and gives 0, unreported. Release: not used
+    /// @param size decommit: bytes, up to 2^32 - 1, whose pages are given up whole; 0 does nothing and gives
+    ///        0, unreported. Release: not used
     /// @param type 0x4000 decommits, 0x8000 releases
     /// @param handle not used
     /// @return not 0 on success, 0 on failure and for any other code
@@ -53,8 +50,7 @@ public:
     /// @param type 0x1000 commits, 0x2000 reserves
     /// @param handle reserve: receives what Free needs to release the view, 0 on failure; commit: not used
     /// @return reserve: the view, null on failure (unreported) and for a null `handle`; commit: `address`;
-    /// null
-    ///         for any other code
+    ///         null for any other code
     static void* Alloc(void* address, unsigned long size, unsigned long type, unsigned long* handle);
 
     /// Releases a view; its pages cannot be given up one by one, so decommitting does nothing.

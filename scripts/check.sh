@@ -57,14 +57,20 @@ step_docs() {
     cmake --build build/docs --target docs
 }
 step_fuzz() {
+    local program name corpus
     [ -f fuzz/CMakeLists.txt ] || { echo "no fuzzer yet"; return; }
     cmake --preset fuzz >/dev/null
     cmake --build --preset fuzz
     for program in build/fuzz/fuzz/fuzz_*; do
         [ -x "$program" ] || continue
-        "$program" -max_total_time="${FUZZ_SECONDS:-60}" -timeout=10 -print_final_stats=1 2>"$program.log" ||
-            { tail -n 40 "$program.log"; return 1; }
-        echo "$(basename "$program"): $(grep -c . "$program.log") lines, $(grep executed_units "$program.log")"
+        name=$(basename "$program")
+        # begins with the kept inputs; what is found goes into the first folder
+        corpus=("build/fuzz/corpus/$name" "fuzz/corpus/${name#fuzz_}")
+        mkdir -p "${corpus[0]}"
+        [ -d "${corpus[1]}" ] || unset "corpus[1]"
+        "$program" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-60}" -timeout=10 -print_final_stats=1 \
+            2>"$program.log" || { tail -n 40 "$program.log"; return 1; }
+        echo "$name: $(grep -c . "$program.log") lines, $(grep executed_units "$program.log")"
     done
 }
 

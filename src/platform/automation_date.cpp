@@ -17,6 +17,13 @@ constexpr sys_days FIRST = std::chrono::year{100} / 1 / 1;
 constexpr sys_days LAST = std::chrono::year{9999} / 12 / 31;
 constexpr std::int64_t SECONDS_PER_DAY = 86'400;
 
+// The calendar's own types keep months and days in a byte, so larger ones are refused before.
+bool is_valid(const SYSTEMTIME& time) {
+    return time.wYear >= 100 && time.wYear <= 9999 && time.wMonth <= 12 && time.wDay <= 31 &&
+           (std::chrono::year{time.wYear} / time.wMonth / time.wDay).ok() && time.wHour < 24 &&
+           time.wMinute < 60 && time.wSecond < 60;
+}
+
 int second_of_day(const SYSTEMTIME& time) {
     return time.wHour * 3600 + time.wMinute * 60 + time.wSecond;
 }
@@ -39,13 +46,12 @@ int part_of(const COleDateTime& date, WORD SYSTEMTIME::*part) {
 }  // namespace
 
 int SystemTimeToVariantTime(SYSTEMTIME* time, DATE* date) {
-    const year_month_day calendar = std::chrono::year{time->wYear} / time->wMonth / time->wDay;
-    const bool is_time = time->wHour < 24 && time->wMinute < 60 && time->wSecond < 60;
-    if (time->wYear < 100 || time->wYear > 9999 || !calendar.ok() || !is_time) {
+    if (!is_valid(*time)) {
         SetLastError(ERROR_INVALID_PARAMETER);
         return 0;
     }
-    const auto days = static_cast<double>((sys_days(calendar) - ZERO).count());
+    const sys_days day = std::chrono::year{time->wYear} / time->wMonth / time->wDay;
+    const auto days = static_cast<double>((day - ZERO).count());
     const double time_of_day = second_of_day(*time) / static_cast<double>(SECONDS_PER_DAY);
     *date = days < 0.0 ? days - time_of_day : days + time_of_day;
     return 1;

@@ -42,16 +42,29 @@ locale_t open_locale(const char* name) {
     return newlocale(LC_CTYPE_MASK, name, nullptr);
 }
 
+constexpr auto FAILED = static_cast<std::size_t>(-1);
+
+// Some encodings keep a character back until the next one has told whether both make one (BIG5-HKSCS and
+// TCVN, for instance). Writes the bytes of what was kept and answers their count.
+std::size_t encode_kept(char* bytes, std::mbstate_t& state) {
+    if (std::mbsinit(&state) != 0) {
+        return 0;
+    }
+    const std::size_t length = std::wcrtomb(bytes, L'\0', &state);
+    return length != FAILED ? length - 1 : 0;  // without the zero's own byte
+}
+
 // Writes one character's bytes in the locale in force ('?' when it has none) and answers their count.
 std::size_t encode_in_scope(wchar_t ch, char* bytes, std::mbstate_t& state) {
-    constexpr auto FAILED = static_cast<std::size_t>(-1);
+    std::mbstate_t before = state;
     const std::size_t length = is_unicode_scalar(ch) ? std::wcrtomb(bytes, ch, &state) : FAILED;
     if (length != FAILED) {
         return length;
     }
-    bytes[0] = '?';
+    const std::size_t kept = encode_kept(bytes, before);
+    bytes[kept] = '?';
     state = {};
-    return 1;
+    return kept + 1;
 }
 
 }  // namespace
@@ -132,26 +145,47 @@ const CodePage& active_code_page() {
 
 std::size_t widen_by_locale_to(std::string_view text, locale_t locale, wchar_t* characters,
                                std::size_t room) {
+    constexpr auto NOTHING = static_cast<wchar_t>(-1);
     const ScopedLocale scope(locale);
     std::size_t count = 0;
-    std::mbstate_t state{};
-    while (!text.empty()) {
-        wchar_t ch = L'\0';
-        std::size_t length = std::mbrtowc(&ch, text.data(), text.size(), &state);
-        // The two failures, invalid and cut short, are the two largest counts. A lead byte in front of
-        // ordinary text may answer either, so neither swallows more than the one byte.
-        if (length > text.size() || !is_unicode_scalar(ch)) {
-            ch = REPLACEMENT_CHARACTER;
-            length = 1;
-            state = {};
-        }
+    const auto put = [&](wchar_t ch) {
         if (count < room) {
             characters[count] = ch;
         }
         ++count;
-        // A zero character answers 0 and has one byte.
-        text.remove_prefix(std::max<std::size_t>(length, 1));
+    };
+    const auto put_kept = [&](std::mbstate_t& state) {
+        wchar_t ch = NOTHING;
+        if (std::mbsinit(&state) == 0 && std::mbrtowc(&ch, "", 1, &state) <= 1 && ch != L'\0' &&
+            ch != NOTHING) {
+            put(ch);
+        }
+    };
+    std::mbstate_t state{};
+    while (!text.empty()) {
+        std::mbstate_t before = state;
+        wchar_t ch = NOTHING;
+        std::size_t length = std::mbrtowc(&ch, text.data(), text.size(), &state);
+        // The two failures, invalid and cut short, are the two largest counts. A lead byte in front of
+        // ordinary text may answer either, so neither swallows more than the one byte.
+        const bool is_taken = ch == NOTHING ? length > 0 : is_unicode_scalar(ch);
+        if (length > text.size() || !is_taken) {
+            put_kept(before);
+            ch = REPLACEMENT_CHARACTER;
+            length = 1;
+            state = {};
+        }
+        if (ch != NOTHING) {
+            put(ch);
+        }
+        if (ch == L'\0') {
+            length = 1;  // answered as 0
+        } else if (length == 0) {
+            state = {};  // what was kept is out, but the C library gives it for ever in Shift_JISX0213
+        }
+        text.remove_prefix(length);
     }
+    put_kept(state);
     return count;
 }
 
@@ -166,11 +200,11 @@ std::string narrow_by_locale(std::wstring_view text, locale_t locale) {
     std::string result;
     result.reserve(text.size());
     std::mbstate_t state{};
+    char bytes[MB_LEN_MAX];
     for (const wchar_t ch : text) {
-        char bytes[MB_LEN_MAX];
         result.append(bytes, encode_in_scope(ch, bytes, state));
     }
-    return result;
+    return result.append(bytes, encode_kept(bytes, state));
 }
 
 char* narrow_by_locale_to(std::wstring_view text, locale_t locale, char* bytes) {
@@ -179,7 +213,8 @@ char* narrow_by_locale_to(std::wstring_view text, locale_t locale, char* bytes) 
     for (const wchar_t ch : text) {
         bytes += encode_in_scope(ch, bytes, state);
     }
-    return bytes;
+    char kept[MB_LEN_MAX];
+    return std::copy_n(kept, encode_kept(kept, state), bytes);
 }
 
 }  // namespace basalt::platform

@@ -1,6 +1,8 @@
 #include "basalt/util/timers.h"
 
+#include <atomic>
 #include <cmath>
+#include <mutex>
 
 #include "src/platform/performance_counter.h"
 
@@ -18,15 +20,20 @@ double seconds(std::int64_t ticks) {
     return static_cast<double>(ticks) * HiResTimer::s_llFrequency;
 }
 
-// Stored within the one initialisation that every constructor waits for, so that no timer reads the shared
-// value while another thread writes it.
+// Atomically, so that no timer reads the shared value while another thread's first one writes it; under a
+// lock, so that only one of them asks.
 void determine_tick_length() {
-    [[maybe_unused]] static const bool is_determined = [] {
+    static constinit std::mutex lock;
+    const std::atomic_ref<double> tick_length(HiResTimer::s_llFrequency);
+    if (tick_length.load(std::memory_order_acquire) != 0.0) {
+        return;
+    }
+    const std::lock_guard guard(lock);
+    if (tick_length.load(std::memory_order_relaxed) == 0.0) {
         LARGE_INTEGER frequency{};
         QueryPerformanceFrequency(&frequency);
-        HiResTimer::s_llFrequency = 1.0 / static_cast<double>(frequency.QuadPart);
-        return true;
-    }();
+        tick_length.store(1.0 / static_cast<double>(frequency.QuadPart), std::memory_order_release);
+    }
 }
 
 }  // namespace

@@ -63,10 +63,10 @@ TEST(AutomationDate, published_values) {
 }
 
 TEST(AutomationDate, what_is_no_date_is_refused) {
-    for (SYSTEMTIME time :
-         {at(2021, 2, 29), at(2021, 4, 31), at(2021, 0, 1), at(2021, 13, 1), at(2021, 1, 0), at(1900, 2, 29),
-          at(0, 1, 1), at(99, 12, 31), at(10000, 1, 1), at(65535, 1, 1), at(2021, 65535, 1),
-          at(2021, 1, 65535), at(2021, 1, 1, 24), at(2021, 1, 1, 0, 60), at(2021, 1, 1, 0, 0, 60)}) {
+    for (SYSTEMTIME time : {at(2021, 2, 29), at(2021, 4, 31), at(2021, 0, 1), at(2021, 13, 1), at(2021, 1, 0),
+                            at(1900, 2, 29), at(0, 1, 1), at(99, 12, 31), at(10000, 1, 1), at(65535, 1, 1),
+                            at(2021, 65535, 1), at(2021, 1, 65535), at(2021, 257, 1), at(2021, 1, 257),
+                            at(2021, 1, 1, 24), at(2021, 1, 1, 0, 60), at(2021, 1, 1, 0, 0, 60)}) {
         double date = 0.5;
         SetLastError(0);
         EXPECT_EQ(SystemTimeToVariantTime(&time, &date), 0)

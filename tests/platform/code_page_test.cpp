@@ -104,7 +104,8 @@ TEST(CodePage, single_and_double_byte_encodings) {
                                     (folder / charmap).string() + "' >/dev/null 2>&1";
         return std::system(command.c_str()) != -1 && std::filesystem::exists(folder / charmap / "LC_CTYPE");
     };
-    const bool made = make("ISO-8859-15") && make("EUC-JP");
+    const bool made = make("ISO-8859-15") && make("EUC-JP") && make("BIG5-HKSCS") && make("SHIFT_JISX0213") &&
+                      make("TCVN5712-1");
     // In a process of its own, since the C library keeps some memory for each locale opened by LOCPATH.
     const auto convert = [&] {
         setenv("LOCPATH", folder.c_str(), 1);
@@ -114,6 +115,16 @@ TEST(CodePage, single_and_double_byte_encodings) {
         const CodePage japanese("EUC-JP");
         EXPECT_EQ(japanese.widen("a\xC6\xFC\xB1"), L"a\x65E5\xFFFD") << "the last character is split";
         EXPECT_EQ(japanese.narrow(L"a\x65E5\xD800z"), "a\xC6\xFC?z");
+        // Encodings in which one character becomes two, or waits for a mark that belongs to it.
+        const CodePage hong_kong("BIG5-HKSCS");
+        EXPECT_EQ(hong_kong.widen("\x88\x62z\x88\x62"), L"\xCA\x304z\xCA\x304");
+        EXPECT_EQ(hong_kong.narrow(L"\xCA\x304z\xCA\x416\xCA\xD800\xCA"),
+                  "\x88\x62z\x88\x66\xC7\xFA\x88\x66?\x88\x66");
+        EXPECT_EQ(CodePage("SHIFT_JISX0213").widen("\x82\xF5z"), L"\x304B\x309Az");
+        const CodePage vietnamese("TCVN5712-1");
+        EXPECT_EQ(vietnamese.widen("ba"), L"ba");
+        EXPECT_EQ(vietnamese.widen("\0a\0"s), L"\0a\0"s);
+        EXPECT_EQ(vietnamese.narrow(L"ba\x65E5"), "ba?");
         std::_Exit(testing::Test::HasFailure() ? 1 : 0);
     };
     if (made) {

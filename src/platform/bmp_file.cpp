@@ -1,5 +1,4 @@
 #include "src/platform/bmp_file.h"
-#include "src/platform/file_name.h"
 
 #include <fcntl.h>
 #include <stdio.h>
@@ -12,6 +11,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
+#include "src/platform/file_name.h"
 #include "src/platform/pixel_format.h"
 #include "src/platform/pixel_rows.h"
 

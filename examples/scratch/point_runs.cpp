@@ -1,7 +1,7 @@
 #include "point_runs.h"
 
 #include <algorithm>
-#include <new>
+#include <stdexcept>
 
 #include "interrupt.h"
 
@@ -10,7 +10,7 @@ void PointRuns::add(const Point& point) {
         close_run();
         auto* const block = static_cast<Point*>(m_allocator.Alloc(BLOCK_BYTES));
         if (block == nullptr) {
-            throw std::bad_alloc();
+            throw std::runtime_error("no file of 64 MiB can be made and mapped in the temporary folder");
         }
         m_runs.push_back({block, block, block});
         m_most_runs = std::max(m_most_runs, m_runs.size());

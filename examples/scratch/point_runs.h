@@ -18,7 +18,7 @@ public:
     static constexpr std::uint32_t FILE_BYTES = 64 << 20;
     static constexpr std::int64_t POINTS_IN_BLOCK = BLOCK_BYTES / sizeof(Point);
 
-    /// std::bad_alloc when there is no room on the disk for another file.
+    /// std::runtime_error when no further file can be made.
     void add(const Point& point);
 
     /// Calls `visit` for every point in order; the runs are empty then.

@@ -1,6 +1,6 @@
 #include "point_store.h"
 
-#include <new>
+#include <stdexcept>
 
 #include "interrupt.h"
 
@@ -9,7 +9,7 @@ void PointStore::add(const Point& point) {
         stop_if_interrupted();
         auto map = std::make_unique<vex_util::CMemoryMap>();
         if (!map->Create(MAP_BYTES)) {
-            throw std::bad_alloc();
+            throw std::runtime_error("no room for 64 MiB of points, in the temporary folder or in memory");
         }
         m_maps.push_back(std::move(map));
     }

@@ -80,8 +80,8 @@ for points in 1 2 3 65536 65537 200000; do
     is "Most points in a cell" "$(LC_ALL=C awk -F, 'NR > 1 && $3 > most { most = $3 } END { print most }' expected.csv)"
 done
 
-# 183 MiB of points where 48 MiB of memory are allowed; then the proof that the limit holds: without files,
-# blocks come from memory, of which there is not enough.
+# 183 MiB of points where 48 MiB of memory are allowed; then the proof that the limit holds: the cells' text is
+# made in memory, of which there is not enough.
 (
     ulimit -d 49152
     run --points 12000000
@@ -89,18 +89,21 @@ done
     is "Memory limit" "48.0 MiB"
     is "Bytes sorted" "183.1 MiB"
     is "Files of runs" "3 192.0 MiB"
-    TMPDIR=$work/nowhere run --points 12000000
-    [ $code -eq 1 ] && [ "$(cat err)" = "scratch: out of memory" ] || fail "exit $code without files: $(cat err)"
+    run --points 12000000 --cells cells.csv
+    [ $code -eq 1 ] && [ "$(cat err)" = "scratch: out of memory" ] || fail "exit $code beyond the limit: $(cat err)"
     exit $failures
 )
 failures=$?
 leaves_nothing "a job under a memory limit"
 
-# A full disk, as a limit on the size of files has it.
+# A full disk, as a limit on the size of files has it, and no folder at all.
 (
+    no_room="scratch: no file of 64 MiB can be made and mapped in the temporary folder"
+    TMPDIR=$work/nowhere run --points 10
+    [ $code -eq 1 ] && [ "$(cat err)" = "$no_room" ] || fail "exit $code without a folder: $(cat err)"
     ulimit -f 1024
     run --points 100000
-    [ $code -eq 1 ] && [ "$(cat err)" = "scratch: out of memory" ] || fail "exit $code with no room: $(cat err)"
+    [ $code -eq 1 ] && [ "$(cat err)" = "$no_room" ] || fail "exit $code with no room: $(cat err)"
     exit $failures
 )
 failures=$?

@@ -67,9 +67,10 @@ int MultiByteToWideChar(UINT code_page, DWORD flags, const char* source, int len
     return answer(needed, room);
 }
 
-// NOLINTNEXTLINE(readability-non-const-parameter): the published signature
+// NOLINTBEGIN(readability-non-const-parameter): the published signature
 int WideCharToMultiByte(UINT code_page, DWORD flags, const wchar_t* source, int length, char* destination,
                         int room, const char* default_character, BOOL* used_default) {
+    // NOLINTEND(readability-non-const-parameter)
     if (code_page != CP_ACP || flags != 0 || default_character != nullptr || used_default != nullptr ||
         !are_valid(source, length, destination, room)) {
         return fail(ERROR_INVALID_PARAMETER);

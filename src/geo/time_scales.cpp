@@ -102,6 +102,17 @@ std::uint16_t day_of_week(const Date& date) {
     return static_cast<std::uint16_t>((first_of_january + day_of_year - 1) % 7);
 }
 
+/// _mjd2greg() beyond LAST_WHOLE_YEAR_DAY; apart, since saving registers for it cost days within a third.
+[[gnu::noinline]] void far_date(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month,
+                                std::uint16_t& day, std::uint16_t& weekday) {
+    const bool reached = mjd <= LAST_DAY;
+    const Date date = reached ? date_of(mjd) : Date{0, 0, 0};
+    year = date.year;
+    month = date.month;
+    day = date.day;
+    weekday = reached ? day_of_week(date) : std::uint16_t{0};
+}
+
 }  // namespace
 
 std::uint32_t _greg2mjd(std::uint16_t year, std::uint16_t month, std::uint16_t day) {
@@ -110,16 +121,15 @@ std::uint32_t _greg2mjd(std::uint16_t year, std::uint16_t month, std::uint16_t d
 
 void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std::uint16_t& day,
                std::uint16_t& dayOfWeek) {
-    const bool reached = mjd <= LAST_DAY;
-    const Date date = reached ? date_of(mjd) : Date{0, 0, 0};
+    if (mjd > LAST_WHOLE_YEAR_DAY) {
+        far_date(mjd, year, month, day, dayOfWeek);
+        return;
+    }
+    const Date date = date_of(mjd);
     year = date.year;
     month = date.month;
     day = date.day;
-    if (mjd <= LAST_WHOLE_YEAR_DAY) {
-        dayOfWeek = static_cast<std::uint16_t>((mjd + WEDNESDAY) % DAYS_PER_WEEK);
-    } else {
-        dayOfWeek = reached ? day_of_week(date) : std::uint16_t{0};
-    }
+    dayOfWeek = static_cast<std::uint16_t>((mjd + WEDNESDAY) % DAYS_PER_WEEK);
 }
 
 void _mjd2gps(std::uint32_t mjd, double secondsOfDay, std::uint16_t& week, double& secondsOfWeek) {

@@ -26,8 +26,7 @@ geo_vector over(const geo_vector& row, double divisor) {
 }
 
 LocalFrame frame_at(const geo_llh& at) {
-    return LocalFrame(std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude),
-                      std::cos(at.longitude));
+    return {std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude), std::cos(at.longitude)};
 }
 
 Matrix north_east_up(const geo_llh& at) {

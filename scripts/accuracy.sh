@@ -7,11 +7,12 @@ set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
 
-need_packages "${BUILD_PACKAGES[@]}" "${TEST_PACKAGES[@]}" geographiclib-tools proj-bin python3
+need_packages "${BUILD_PACKAGES[@]}" libbenchmark-dev geographiclib-tools proj-bin python3
 build=${BUILD:-build/accuracy}
-cmake -S . -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
+cmake -S . -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo -DBASALT_BUILD_BENCHMARKS=ON \
+    -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF >/dev/null
 cmake --build "$build" --target accuracy >"$build/build.log" || { cat "$build/build.log"; exit 1; }
-accuracy=$build/tests/accuracy/accuracy
+accuracy=$build/bench/accuracy/accuracy
 
 geographiclib=$(GeodSolve --version | sed 's/.*GeographicLib version/GeographicLib/')
 proj=$(cct --version 2>&1 | sed -n 's/.*Rel\. \([0-9.]*\).*/PROJ \1/p')

@@ -1,14 +1,15 @@
 #include "angles.h"
 
+#include <basalt/geo.h>
+
 #include <cmath>
-#include <cstdint>
 
 #include "number_parsing.h"
 #include "number_text.h"
 
 namespace {
 
-constexpr std::int64_t SECONDS_PER_TURN = 1296000;
+constexpr double SECONDS_PER_TURN = 1296000.0;
 
 /// A number spelled with digits and a point only.
 std::optional<double> digits(std::string_view text) {
@@ -30,34 +31,38 @@ std::string two_digits(const std::string& text) {
 
 std::optional<double> parse_angle(std::string_view text) {
     constexpr double TURN = 360.0;
-    std::optional<double> degrees;
     const std::size_t first = text.find('-');
+    const std::size_t second = text.find('-', first == std::string_view::npos ? first : first + 1);
     if (first == std::string_view::npos) {
-        degrees = digits(text);
-    } else if (const std::size_t second = text.find('-', first + 1); second != std::string_view::npos) {
-        const std::optional<double> d = whole(text.substr(0, first));
-        const std::optional<double> m = whole(text.substr(first + 1, second - first - 1));
-        const std::optional<double> s = digits(text.substr(second + 1));
-        if (d && m && s && *m < 60.0 && *s < 60.0) {
-            degrees = *d + (*m + *s / 60.0) / 60.0;
-        }
+        const std::optional<double> degrees = digits(text);
+        return degrees && *degrees < TURN ? std::optional(_degtorad(*degrees)) : std::nullopt;
     }
-    return degrees && *degrees < TURN ? std::optional(*degrees * RADIANS_PER_DEGREE) : std::nullopt;
+    if (second == std::string_view::npos) {
+        return std::nullopt;
+    }
+    const std::optional<double> d = whole(text.substr(0, first));
+    const std::optional<double> m = whole(text.substr(first + 1, second - first - 1));
+    const std::optional<double> s = digits(text.substr(second + 1));
+    if (!d || !m || !s || *d >= TURN || *m >= 60.0 || *s >= 60.0) {
+        return std::nullopt;
+    }
+    double radians = 0.0;
+    _dmstorad(static_cast<int>(*d), static_cast<int>(*m), *s, &radians);
+    return radians;
 }
 
 std::string dms_text(double radians, int decimals) {
     // Rounded once, as a whole count of the last decimal, so that no part can show 60.
-    const auto per_second = static_cast<std::int64_t>(std::llround(std::pow(10.0, decimals)));
-    const std::int64_t turn = SECONDS_PER_TURN * per_second;
-    const std::int64_t signed_units =
-        std::llround(radians / RADIANS_PER_SECOND * static_cast<double>(per_second));
-    const std::int64_t units = (signed_units < 0 ? -signed_units : signed_units) % turn;
-    const std::int64_t per_minute = 60 * per_second;
-    const std::int64_t per_degree = 60 * per_minute;
-    const double seconds = static_cast<double>(units % per_minute) / static_cast<double>(per_second);
-    std::string text(signed_units < 0 ? "-" : "");
-    text += std::to_string(units / per_degree) + "-";
-    text += two_digits(std::to_string(units % per_degree / per_minute)) + "-";
+    const double per_second = std::pow(10.0, decimals);
+    const double units = std::fmod(std::round(std::abs(radians) / RADIANS_PER_SECOND * per_second),
+                                   SECONDS_PER_TURN * per_second);
+    int degrees = 0;
+    int minutes = 0;
+    double seconds = 0.0;
+    _radtodms(units / per_second * RADIANS_PER_SECOND, &degrees, &minutes, &seconds);
+    const bool negative = radians < 0.0 && units > 0.0;
+    std::string text(negative ? "-" : "");
+    text += std::to_string(degrees) + "-" + two_digits(std::to_string(minutes)) + "-";
     return text + two_digits(fixed_text(seconds, decimals));
 }
 

@@ -147,7 +147,7 @@ private:
         }
         const bool second = face == "2";
         const double low = second ? 181.0 : 1.0;
-        if (zenith < low * RADIANS_PER_DEGREE || zenith > (low + 178.0) * RADIANS_PER_DEGREE) {
+        if (zenith < _degtorad(low) || zenith > _degtorad(low + 178.0)) {
             m_csv.fail(4, second ? "a zenith angle from 181 to 359 degrees on face 2"
                                  : "a zenith angle from 1 to 179 degrees on face 1");
         }

@@ -1,8 +1,8 @@
 #include "options.h"
 
-#include <algorithm>
 #include <string_view>
 
+#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 
@@ -77,8 +77,7 @@ EarthAnchor parse_wgs84(std::string_view text) {
         throw InputError("--wgs84 takes NAME,LATITUDE,LONGITUDE,HEIGHT in degrees and metres, not " +
                          quoted(text));
     }
-    return {std::string(parts[0]),
-            {(*values)[0] * RADIANS_PER_DEGREE, (*values)[1] * RADIANS_PER_DEGREE, (*values)[2]}};
+    return {std::string(parts[0]), {_degtorad((*values)[0]), _degtorad((*values)[1]), (*values)[2]}};
 }
 
 InstrumentPrecision parse_precision(std::string_view text) {
@@ -117,50 +116,22 @@ void set_option(Options& options, std::string_view name, const std::string& valu
     }
 }
 
-constexpr std::string_view WITH_VALUE[] = {"--alignment",     "--csv",   "--interval", "--sagitta",
-                                           "--target-height", "--scale", "--wgs84",    "--precision"};
-
 }  // namespace
 
 Options parse_options(const std::vector<std::string>& arguments) {
+    const CommandLine line =
+        parse_command_line(arguments, {"--alignment", "--csv", "--interval", "--sagitta", "--target-height",
+                                       "--scale", "--wgs84", "--precision"});
     Options options;
-    std::vector<std::string> given;
-    bool only_files = false;
-    for (std::size_t i = 0; i < arguments.size(); ++i) {
-        const std::string& argument = arguments[i];
-        if (!only_files && argument == "--") {
-            only_files = true;
-        } else if (only_files || argument.size() < 2 || argument[0] != '-') {
-            if (argument.empty()) {
-                throw InputError("the field book's file name is empty");
-            }
-            if (!options.book.empty()) {
-                throw InputError("one field book only, but " + quoted(argument) + " is a second one");
-            }
-            options.book = argument;
-        } else if (argument == "--help") {
-            options.help = true;
-            return options;
-        } else if (argument == "--version") {
-            options.version = true;
-            return options;
-        } else {
-            const std::size_t equals = argument.find('=');
-            const std::string name = argument.substr(0, equals);
-            if (std::find(std::begin(WITH_VALUE), std::end(WITH_VALUE), name) == std::end(WITH_VALUE)) {
-                throw InputError("unknown option " + quoted(argument) + " (--help lists them)");
-            }
-            if (std::find(given.begin(), given.end(), name) != given.end()) {
-                throw InputError("option " + name + " is given twice");
-            }
-            if (equals == std::string::npos && i + 1 == arguments.size()) {
-                throw InputError("option " + name + " needs a value");
-            }
-            given.push_back(name);
-            set_option(options, name,
-                       equals != std::string::npos ? argument.substr(equals + 1) : arguments[++i]);
-        }
+    options.help = line.help;
+    options.version = line.version;
+    if (line.help || line.version) {
+        return options;
     }
+    for (const auto& [name, value] : line.options) {
+        set_option(options, name, value);
+    }
+    options.book = file_operand(line, "field book");
     if (options.book.empty()) {
         throw InputError("no field book given (--help shows how)");
     }

@@ -1,5 +1,8 @@
 #include "options.h"
 
+#include <string_view>
+
+#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 
@@ -20,58 +23,38 @@ const char* const USAGE =
 
 namespace {
 
-void set_once(std::optional<std::string>& option, const std::string& name, const std::string& value) {
-    if (option) {
-        throw InputError("option " + name + " is given twice");
-    }
+void set_option(Options& options, std::string_view name, const std::string& value) {
     if (value.empty()) {
-        throw InputError("option " + name + " takes a path, not ''");
+        throw InputError("option " + std::string(name) + " takes a path, not ''");
     }
-    option = value;
-}
-
-std::optional<std::string>* option_of(Options& options, const std::string& name) {
-    return name == "--log"       ? &options.log
-           : name == "--root"    ? &options.root
-           : name == "--product" ? &options.product
-                                 : nullptr;
+    if (name == "--log") {
+        options.log = value;
+    } else if (name == "--root") {
+        options.root = value;
+    } else {
+        options.product = value;
+    }
 }
 
 }  // namespace
 
 Options parse_options(const std::vector<std::string>& arguments) {
+    const CommandLine line = parse_command_line(arguments, {"--log", "--root", "--product"}, {"--json"});
     Options options;
-    bool only_paths = false;
-    for (std::size_t i = 0; i < arguments.size(); ++i) {
-        const std::string& argument = arguments[i];
-        if (!only_paths && argument == "--") {
-            only_paths = true;
-        } else if (only_paths || argument.size() < 2 || argument[0] != '-') {
-            if (options.path) {
-                throw InputError("one path only, but " + quoted(argument) + " is a second one");
-            }
-            options.path = argument;
-        } else if (argument == "--help") {
-            options.help = true;
-            return options;
-        } else if (argument == "--version") {
-            options.version = true;
-            return options;
-        } else if (argument == "--json") {
-            options.json = true;
-        } else {
-            const std::size_t equals = argument.find('=');
-            const std::string name = argument.substr(0, equals);
-            std::optional<std::string>* const option = option_of(options, name);
-            if (option == nullptr) {
-                throw InputError("unknown option " + quoted(argument) + " (--help lists them)");
-            }
-            if (equals == std::string::npos && i + 1 == arguments.size()) {
-                throw InputError("option " + name + " needs a value");
-            }
-            set_once(*option, name,
-                     equals != std::string::npos ? argument.substr(equals + 1) : arguments[++i]);
-        }
+    options.help = line.help;
+    options.version = line.version;
+    if (line.help || line.version) {
+        return options;
+    }
+    for (const auto& [name, value] : line.options) {
+        set_option(options, name, value);
+    }
+    options.json = !line.flags.empty();
+    if (line.operands.size() > 1) {
+        throw InputError("one path only, but " + quoted(line.operands[1]) + " is a second one");
+    }
+    if (!line.operands.empty()) {
+        options.path = line.operands[0];
     }
     return options;
 }

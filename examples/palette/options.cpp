@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <string_view>
 
+#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 
@@ -39,32 +40,18 @@ COLORREF parse_colour(std::string_view given) {
 }  // namespace
 
 Options parse_options(const std::vector<std::string>& arguments) {
-    constexpr std::string_view PICTURE = "--picture";
+    const CommandLine line = parse_command_line(arguments, {"--picture"});
     Options options;
-    for (std::size_t i = 0; i < arguments.size(); ++i) {
-        const std::string& argument = arguments[i];
-        const std::size_t equals = argument.find('=');
-        if (argument == "--help") {
-            options.help = true;
-            return options;
-        }
-        if (argument == "--version") {
-            options.version = true;
-            return options;
-        }
-        if (argument.substr(0, equals) == PICTURE) {
-            if (options.picture) {
-                throw InputError("option --picture is given twice");
-            }
-            if (equals == std::string::npos && i + 1 == arguments.size()) {
-                throw InputError("option --picture needs a value");
-            }
-            options.picture = equals != std::string::npos ? argument.substr(equals + 1) : arguments[++i];
-        } else if (!argument.empty() && argument[0] == '-') {
-            throw InputError("unknown option " + quoted(argument) + " (--help lists them)");
-        } else {
-            options.colours.push_back(parse_colour(argument));
-        }
+    options.help = line.help;
+    options.version = line.version;
+    if (line.help || line.version) {
+        return options;
+    }
+    for (const std::string& colour : line.operands) {
+        options.colours.push_back(parse_colour(colour));
+    }
+    if (!line.options.empty()) {
+        options.picture = line.options[0].second;
     }
     return options;
 }

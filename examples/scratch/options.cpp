@@ -1,5 +1,6 @@
 #include "options.h"
 
+#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 #include "scan.h"
@@ -29,41 +30,23 @@ std::int64_t parse_points(const std::string& text) {
     return *points;
 }
 
-void set_option(Options& options, const std::string& name, const std::string& value) {
-    const bool is_points = name == "--points";
-    if (is_points ? options.points.has_value() : options.cells.has_value()) {
-        throw InputError("option " + name + " is given twice");
-    }
-    if (is_points) {
-        options.points = parse_points(value);
-    } else {
-        options.cells = value;
-    }
-}
-
 }  // namespace
 
 Options parse_options(const std::vector<std::string>& arguments) {
+    const CommandLine line = parse_command_line(arguments, {"--points", "--cells"});
     Options options;
-    for (std::size_t i = 0; i < arguments.size(); ++i) {
-        const std::string& argument = arguments[i];
-        const std::size_t equals = argument.find('=');
-        const std::string name = argument.substr(0, equals);
-        if (argument == "--help") {
-            options.help = true;
-            return options;
+    options.help = line.help;
+    options.version = line.version;
+    if (line.help || line.version) {
+        return options;
+    }
+    refuse_operands(line);
+    for (const auto& [name, value] : line.options) {
+        if (name == "--points") {
+            options.points = parse_points(value);
+        } else {
+            options.cells = value;
         }
-        if (argument == "--version") {
-            options.version = true;
-            return options;
-        }
-        if (name != "--points" && name != "--cells") {
-            throw InputError("unknown argument " + quoted(argument) + " (--help lists the options)");
-        }
-        if (equals == std::string::npos && i + 1 == arguments.size()) {
-            throw InputError("option " + name + " needs a value");
-        }
-        set_option(options, name, equals != std::string::npos ? argument.substr(equals + 1) : arguments[++i]);
     }
     return options;
 }

@@ -3,10 +3,9 @@
 namespace {
 
 constexpr double SEMI_MAJOR_AXIS = 6378137.0;  // WGS84, metres
-constexpr double RADIANS_PER_DEGREE = 3.141592653589793 / 180.0;
 
 geo_vector on_ellipsoid(double longitude, double latitude) {
-    const geo_llh place = {latitude * RADIANS_PER_DEGREE, longitude * RADIANS_PER_DEGREE, 0.0};
+    const geo_llh place = {_degtorad(latitude), _degtorad(longitude), 0.0};
     // The one place whose three numbers are all 0 is refused as a record never set.
     geo_vector xyz = {SEMI_MAJOR_AXIS, 0.0, 0.0};
     _llh2xyz(&place, &xyz);

@@ -2,8 +2,8 @@
 
 #include <cmath>
 #include <string_view>
-#include <utility>
 
+#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 #include "synthetic_terrain.h"
@@ -72,72 +72,36 @@ std::int64_t parse_cells(std::string_view text) {
     return *cells;
 }
 
-/// Stores a value once.
-template <typename Value>
-void set_once(std::optional<Value>& option, Value value, std::string_view name) {
-    if (option) {
-        throw InputError("option " + std::string(name) + " is given twice");
-    }
-    option = std::move(value);
-}
-
 void set_option(Options& options, std::string_view name, const std::string& value) {
     if (name == "--boundary") {
-        set_once(options.boundary, value, name);
+        options.boundary = value;
     } else if (name == "--view") {
-        set_once(options.view, parse_view(value), name);
+        options.view = parse_view(value);
     } else if (name == "--grade") {
-        set_once(options.grade, parse_grade(value), name);
+        options.grade = parse_grade(value);
     } else if (name == "--picture") {
-        set_once(options.picture, value, name);
+        options.picture = value;
     } else {
-        set_once(options.synthetic, parse_cells(value), name);
+        options.synthetic = parse_cells(value);
     }
-}
-
-bool takes_value(std::string_view name) {
-    return name == "--boundary" || name == "--view" || name == "--grade" || name == "--picture" ||
-           name == "--synthetic";
 }
 
 }  // namespace
 
 Options parse_options(const std::vector<std::string>& arguments) {
+    const CommandLine line = parse_command_line(
+        arguments, {"--boundary", "--view", "--grade", "--picture", "--synthetic"}, {"--legend"});
     Options options;
-    bool only_files = false;
-    for (std::size_t i = 0; i < arguments.size(); ++i) {
-        const std::string& argument = arguments[i];
-        if (!only_files && argument == "--") {
-            only_files = true;
-        } else if (only_files || argument.size() < 2 || argument[0] != '-') {
-            if (argument.empty()) {
-                throw InputError("the terrain's file name is empty");
-            }
-            if (!options.terrain.empty()) {
-                throw InputError("one terrain file only, but " + quoted(argument) + " is a second one");
-            }
-            options.terrain = argument;
-        } else if (argument == "--help") {
-            options.help = true;
-            return options;
-        } else if (argument == "--legend") {
-            options.legend = true;
-        } else if (argument == "--version") {
-            options.version = true;
-            return options;
-        } else {
-            const std::size_t equals = argument.find('=');
-            const std::string name = argument.substr(0, equals);
-            if (!takes_value(name)) {
-                throw InputError("unknown option " + quoted(argument) + " (--help lists them)");
-            }
-            if (equals == std::string::npos && i + 1 == arguments.size()) {
-                throw InputError("option " + name + " needs a value");
-            }
-            set_option(options, name,
-                       equals != std::string::npos ? argument.substr(equals + 1) : arguments[++i]);
-        }
+    options.help = line.help;
+    options.version = line.version;
+    if (line.help || line.version) {
+        return options;
     }
+    for (const auto& [name, value] : line.options) {
+        set_option(options, name, value);
+    }
+    options.legend = !line.flags.empty();
+    options.terrain = file_operand(line, "terrain file");
     if (options.terrain.empty() && !options.synthetic) {
         throw InputError("no terrain file given (--help shows how)");
     }

@@ -1,9 +1,11 @@
 #include "basalt/geo/ellipsoid.h"
 
 #include <cmath>
+#include <optional>
 
 #include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
+#include "src/geo/local_frame.h"
 
 using namespace basalt::geo;
 
@@ -120,27 +122,21 @@ bool convert_quickly(double p, double z, double tolerance, geo_llh& llh) {
     return std::abs(beyond) > 1e-14;
 }
 
-/// Sines and cosines of a place's latitude and longitude.
-struct Rotation {
-    double sin_lat, cos_lat, sin_lon, cos_lon;
-};
-
-/// False when the place cannot be converted.
-bool rotation_at(const geo_vector& xyz, Rotation& r) {
+/// Nothing when the place cannot be converted.
+std::optional<LocalFrame> local_frame_at(const geo_vector& xyz) {
     const double p = std::sqrt(xyz.x * xyz.x + xyz.y * xyz.y);
     double q = 0.0;
     // Off the axis no angle is needed.
     if (p > 1.0 && settle_quickly(p, xyz.z, LOCAL_FRAME_TOLERANCE, q)) {
         const double length = std::sqrt(p * p + q * q);
-        r = {q / length, p / length, xyz.y / p, xyz.x / p};
-        return true;
+        return LocalFrame(q / length, p / length, xyz.y / p, xyz.x / p);
     }
     geo_llh at = {};
     if (_xyz2llh(&xyz, &at, LOCAL_FRAME_TOLERANCE) == 0) {
-        return false;
+        return std::nullopt;
     }
-    r = {std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude), std::cos(at.longitude)};
-    return true;
+    return LocalFrame(std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude),
+                      std::cos(at.longitude));
 }
 
 /// Sum of products in the order x, y, z, from 0.
@@ -181,14 +177,14 @@ int _llh2xyz(const geo_llh* llh, geo_vector* xyz) {
 }
 
 int _xyz2nez(const geo_vector* origin, const geo_vector* point, geo_nee* out) {
-    Rotation r = {};
-    if (!rotation_at(*origin, r)) {
+    const std::optional<LocalFrame> frame = local_frame_at(*origin);
+    if (!frame) {
         return 1;
     }
     const geo_vector d = {point->x - origin->x, point->y - origin->y, point->z - origin->z};
-    out->north = along({-r.sin_lat * r.cos_lon, -r.sin_lat * r.sin_lon, r.cos_lat}, d);
-    out->east = along({-r.sin_lon, r.cos_lon, 0.0}, d);
-    out->elevation = along({r.cos_lat * r.cos_lon, r.cos_lat * r.sin_lon, r.sin_lat}, d);
+    out->north = along(frame->north, d);
+    out->east = along(frame->east, d);
+    out->elevation = along(frame->up, d);
     return 1;
 }
 

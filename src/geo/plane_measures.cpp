@@ -2,6 +2,7 @@
 
 #include "basalt/geo.h"
 #include "src/geo/constants.h"
+#include "src/geo/one_turn.h"
 
 using namespace basalt::geo;
 
@@ -9,14 +10,7 @@ double geo_normalised_bearing(double angle) {
     if (angle == GEO_NULL || angle > REDUCTION_LIMIT || angle < -REDUCTION_LIMIT) {
         return angle;
     }
-    while (angle >= TWO_PI) {
-        angle -= TWO_PI;
-    }
-    while (angle < 0.0) {
-        angle += TWO_PI;
-    }
-    // A tiny negative angle has just been rounded up to 2 pi.
-    return angle == TWO_PI ? 0.0 : angle;
+    return to_one_turn(angle);
 }
 
 double geo_horz_dist(const geo_nee& a, const geo_nee& b) {

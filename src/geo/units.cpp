@@ -5,6 +5,7 @@
 #include <limits>
 
 #include "src/geo/constants.h"
+#include "src/geo/one_turn.h"
 
 using namespace basalt::geo;
 
@@ -96,17 +97,7 @@ double _normalisedbearing(double angle) {
     if (angle == GEO_NULL || !std::isfinite(angle)) {
         return angle;
     }
-    if (std::abs(angle) > MOST_STEPPED) {
-        angle = std::fmod(angle, TWO_PI);
-    }
-    while (angle >= TWO_PI) {
-        angle -= TWO_PI;
-    }
-    while (angle < 0.0) {
-        angle += TWO_PI;
-    }
-    // A tiny negative angle has just been rounded up to 2 pi.
-    return angle == TWO_PI ? 0.0 : angle;
+    return to_one_turn(std::abs(angle) > MOST_STEPPED ? std::fmod(angle, TWO_PI) : angle);
 }
 
 double factorial(std::uint32_t n) {

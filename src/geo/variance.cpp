@@ -6,84 +6,74 @@
 #include <cstddef>
 
 #include "basalt/geo/ellipsoid.h"
+#include "src/geo/local_frame.h"
+
+using basalt::geo::LocalFrame;
 
 namespace {
 
 constexpr double POSITION_TOLERANCE = 5e-9;  // radians
-constexpr int COMPONENTS = 6;
 
-using Matrix = std::array<std::array<double, 3>, 3>;
+using Matrix = std::array<geo_vector, 3>;  // by rows
 
-/// Sines and cosines of a latitude and a longitude.
-struct Direction {
-    double sin_lat, cos_lat, sin_lon, cos_lon;
-
-    explicit Direction(const geo_llh& at)
-        : sin_lat(std::sin(at.latitude)),
-          cos_lat(std::cos(at.latitude)),
-          sin_lon(std::sin(at.longitude)),
-          cos_lon(std::cos(at.longitude)) {}
-};
-
-/// left * right^T, each entry summed from 0 in the order of the columns.
-Matrix times_transposed(const Matrix& left, const Matrix& right) {
-    Matrix product = {};
-    for (std::size_t i = 0; i < 3; ++i) {
-        for (std::size_t j = 0; j < 3; ++j) {
-            for (std::size_t k = 0; k < 3; ++k) {
-                product[i][j] += left[i][k] * right[j][k];
-            }
-        }
-    }
-    return product;
+/// Sum of products from 0, in the order of the columns.
+double product(const geo_vector& a, const geo_vector& b) {
+    return 0.0 + a.x * b.x + a.y * b.y + a.z * b.z;
 }
 
-void propagate(const Matrix& jacobian, const double* covariance, double* out) {
+geo_vector over(const geo_vector& row, double divisor) {
+    return {row.x / divisor, row.y / divisor, row.z / divisor};
+}
+
+LocalFrame frame_at(const geo_llh& at) {
+    return {std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude), std::cos(at.longitude)};
+}
+
+Matrix north_east_up(const geo_llh& at) {
+    const LocalFrame frame = frame_at(at);
+    return {frame.north, frame.east, frame.up};
+}
+
+/// By a metre north, east and up latitude and longitude change by 1 over the radii of their circles.
+Matrix latitude_longitude_height(const geo_llh& at) {
+    double meridian = 0.0;
+    double prime_vertical = 0.0;
+    _wgs84curvature(at.latitude, meridian, prime_vertical);
+    const LocalFrame frame = frame_at(at);
+    return {over(frame.north, meridian + at.height),
+            over(frame.east, (prime_vertical + at.height) * std::cos(at.latitude)), frame.up};
+}
+
+/// J Q J^T at a position; six #GEO_NULL when it cannot be converted.
+void propagate(const geo_vector& position, Matrix (*jacobian)(const geo_llh&), const double* covariance,
+               double* out) {
+    geo_llh at = {};
+    if (_xyz2llh(&position, &at, POSITION_TOLERANCE) == 0) {
+        std::fill_n(out, 6, GEO_NULL);
+        return;
+    }
+    const Matrix j = jacobian(at);
     const double* c = covariance;
     const Matrix q = {{{c[0], c[3], c[4]}, {c[3], c[1], c[5]}, {c[4], c[5], c[2]}}};
-    // q is its own transpose.
-    const Matrix result = times_transposed(jacobian, times_transposed(jacobian, q));
-    const std::array<double, COMPONENTS> packed = {result[0][0], result[1][1], result[2][2],
-                                                   result[0][1], result[0][2], result[1][2]};
-    std::copy(packed.begin(), packed.end(), out);
-}
-
-/// Geodetic position; false, with out all #GEO_NULL, when there is none.
-bool locate(const geo_vector& position, geo_llh& at, double* out) {
-    if (_xyz2llh(&position, &at, POSITION_TOLERANCE) == 0) {
-        std::fill_n(out, COMPONENTS, GEO_NULL);
-        return false;
+    Matrix t = {};
+    for (std::size_t row = 0; row < 3; ++row) {
+        t[row] = {product(j[row], q[0]), product(j[row], q[1]), product(j[row], q[2])};
     }
-    return true;
+    constexpr std::array<std::array<std::size_t, 2>, 6> PLACES = {
+        {{0, 0}, {1, 1}, {2, 2}, {0, 1}, {0, 2}, {1, 2}}};
+    for (std::size_t i = 0; i < 6; ++i) {
+        out[i] = product(j[PLACES[i][0]], t[PLACES[i][1]]);
+    }
 }
 
 }  // namespace
 
 int Varxyz2varllh(const geo_vector* position, const double* covariance, double* out) {
-    geo_llh at = {};
-    if (locate(*position, at, out)) {
-        const Direction d(at);
-        double meridian = 0.0;
-        double prime_vertical = 0.0;
-        _wgs84curvature(at.latitude, meridian, prime_vertical);
-        const double m = meridian + at.height;
-        const double p = (prime_vertical + at.height) * d.cos_lat;
-        propagate({{{-d.sin_lat * d.cos_lon / m, -d.sin_lat * d.sin_lon / m, d.cos_lat / m},
-                    {-d.sin_lon / p, d.cos_lon / p, 0.0},
-                    {d.cos_lat * d.cos_lon, d.cos_lat * d.sin_lon, d.sin_lat}}},
-                  covariance, out);
-    }
+    propagate(*position, latitude_longitude_height, covariance, out);
     return 1;
 }
 
 int Varxyz2varneu(const geo_vector* position, const double* covariance, double* out) {
-    geo_llh at = {};
-    if (locate(*position, at, out)) {
-        const Direction d(at);
-        propagate({{{-d.sin_lat * d.cos_lon, -d.sin_lat * d.sin_lon, d.cos_lat},
-                    {-d.sin_lon, d.cos_lon, 0.0},
-                    {d.cos_lat * d.cos_lon, d.cos_lat * d.sin_lon, d.sin_lat}}},
-                  covariance, out);
-    }
+    propagate(*position, north_east_up, covariance, out);
     return 1;
 }

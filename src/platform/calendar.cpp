@@ -18,7 +18,6 @@ namespace {
 constexpr WORD FIRST_YEAR = 1601;
 constexpr WORD LAST_YEAR = 30827;
 constexpr sys_days FIRST_DAY = std::chrono::year(FIRST_YEAR) / std::chrono::January / 1;
-constexpr std::int64_t TICKS_PER_MILLISECOND = 10'000;
 constexpr std::int64_t TICKS_PER_DAY = 86'400 * TICKS_PER_SECOND;
 
 std::chrono::year_month_day date_of(const SYSTEMTIME& time) {

@@ -11,6 +11,7 @@
 namespace basalt::platform {
 
 inline constexpr std::int64_t TICKS_PER_SECOND = 10'000'000;
+inline constexpr std::int64_t TICKS_PER_MILLISECOND = 10'000;
 inline constexpr std::int64_t NANOSECONDS_PER_TICK = 100;
 // From the beginning of 1601 to that of 1970.
 inline constexpr std::int64_t SECONDS_BEFORE_1970 = 11'644'473'600;

@@ -93,16 +93,6 @@ TEST(SpiralDeltas, AreTheIntegralsOfTheTurningTangent) {
     }
 }
 
-TEST(SpiralDeltas, KeepTheErrorBelowTheTolerance) {
-    for (const double tolerance : {1e-3, 1e-6, 1e-9}) {
-        double x = 0.0;
-        double y = 0.0;
-        geo_spiral_deltas(100.0, 8000.0, tolerance, x, y);
-        EXPECT_NEAR(x, integral(100.0, 8000.0, [](double a) { return std::cos(a); }), tolerance);
-        EXPECT_NEAR(y, integral(100.0, 8000.0, [](double a) { return std::sin(a); }), tolerance);
-    }
-}
-
 TEST(SpiralDeltas, TakeNineTermsAtMost) {
     // The ninth terms are l turn^18 / (18! 37) and l turn^19 / (19! 39), and the test against them is strict.
     const double turn = 2.0;

@@ -114,24 +114,6 @@ TEST(CalcObs, LeavesTheResultAloneWhenAnythingIsMissing) {
     }
 }
 
-TEST(CalcObs, UndoesAReduction) {
-    plain::Random random(5);
-    for (int i = 0; i < 2000; ++i) {
-        const geo_hvd obs = {random.real(0.0, 2 * PI), random.real(0.01, PI - 0.01),
-                             random.real(1.0, 2000.0)};
-        const geo_nee station = {random.real(-1e6, 1e6), random.real(-1e6, 1e6), random.real(-100.0, 3000.0)};
-        const double scale = random.real(0.9, 1.1);
-        geo_nee point = {};
-        geo_reduce_obs(obs, station, 1.6 - 1.3, point, scale);
-        geo_hvd back = {};
-        geo_calc_obs(station, 1.6, point, 1.3, back, 1.0 / scale);
-        // Coordinates of 1e6 m carry 1.2e-10 m of rounding each, over a run of at least 1 cm.
-        ASSERT_NEAR(std::remainder(back.horizontal - obs.horizontal, 2 * PI), 0.0, 1e-7) << i;
-        ASSERT_NEAR(back.vertical, obs.vertical, 1e-9) << i;
-        ASSERT_NEAR(back.distance, obs.distance, 1e-9) << i;
-    }
-}
-
 TEST(GridFollow, GoesAlongTheBearingWithTheSlopeGiven) {
     const geo_nee start = {0.0, 0.0, 10.0};
     const double along = std::atan2(3.0, 4.0);

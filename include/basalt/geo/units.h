@@ -60,7 +60,7 @@ BASALT_API void _ftintom(int feet, double inches, int numerator, int denominator
 ///
 /// Bad input: #GEO_NULL, infinities and NaN come back unchanged.
 ///
-/// Accuracy: each step of 2 pi rounds, which adds up to 1e-7 at a million radians; larger angles are reduced
+/// Accuracy: each step of 2 pi rounds, which adds up to 2e-6 at a million radians; larger angles are reduced
 /// by fmod first. For angles within 100 radians geo_normalised_bearing() gives the same.
 BASALT_API double _normalisedbearing(double angle);
 

@@ -9,7 +9,7 @@
 
 /// A date and a time of day.
 struct SYSTEMTIME {
-    WORD wYear;          ///< 1601 to 30827, as an automation date 100 to 9999
+    WORD wYear;          ///< 1601 to 30827, as an automation date 100 to 9999; 30828 may come out of a count
     WORD wMonth;         ///< 1 to 12
     WORD wDayOfWeek;     ///< 0 (Sunday) to 6; never read
     WORD wDay;           ///< 1 to 31

@@ -3,7 +3,7 @@
 #include <cstdio>
 #include <random>
 
-#include "tests/accuracy/accuracy.h"
+#include "bench/accuracy/accuracy.h"
 
 namespace accuracy {
 

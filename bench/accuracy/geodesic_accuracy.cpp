@@ -4,8 +4,8 @@
 
 #include "basalt/geo/ellipsoid.h"
 #include "basalt/geo/geodesic.h"
-#include "tests/accuracy/accuracy.h"
-#include "tests/accuracy/error_table.h"
+#include "bench/accuracy/accuracy.h"
+#include "bench/accuracy/error_table.h"
 
 namespace accuracy {
 

@@ -1,4 +1,4 @@
-#include "tests/accuracy/error_table.h"
+#include "bench/accuracy/error_table.h"
 
 #include <algorithm>
 #include <array>

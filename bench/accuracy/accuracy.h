@@ -1,6 +1,6 @@
 /// The measurements behind docs/accuracy.md. Each prints its tables.
-#ifndef BASALT_TESTS_ACCURACY_ACCURACY_H
-#define BASALT_TESTS_ACCURACY_ACCURACY_H
+#ifndef BASALT_BENCH_ACCURACY_ACCURACY_H
+#define BASALT_BENCH_ACCURACY_ACCURACY_H
 
 #include <vector>
 

@@ -6,8 +6,8 @@
 #include <utility>
 
 #include "basalt/geo/variance.h"
-#include "tests/accuracy/accuracy.h"
-#include "tests/accuracy/error_table.h"
+#include "bench/accuracy/accuracy.h"
+#include "bench/accuracy/error_table.h"
 
 namespace accuracy {
 

@@ -4,7 +4,7 @@
 #include <exception>
 #include <string>
 
-#include "tests/accuracy/accuracy.h"
+#include "bench/accuracy/accuracy.h"
 
 namespace {
 

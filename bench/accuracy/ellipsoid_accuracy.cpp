@@ -3,8 +3,8 @@
 #include <cstdio>
 
 #include "basalt/geo/ellipsoid.h"
-#include "tests/accuracy/accuracy.h"
-#include "tests/accuracy/error_table.h"
+#include "bench/accuracy/accuracy.h"
+#include "bench/accuracy/error_table.h"
 
 namespace accuracy {
 

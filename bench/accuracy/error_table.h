@@ -1,6 +1,6 @@
 /// Sizes of errors, sorted into bands, as a Markdown table.
-#ifndef BASALT_TESTS_ACCURACY_ERROR_TABLE_H
-#define BASALT_TESTS_ACCURACY_ERROR_TABLE_H
+#ifndef BASALT_BENCH_ACCURACY_ERROR_TABLE_H
+#define BASALT_BENCH_ACCURACY_ERROR_TABLE_H
 
 #include <cstdio>
 #include <string>

@@ -1,0 +1,93 @@
+#include "command_line.h"
+
+#include <algorithm>
+
+#include "input_error.h"
+#include "number_parsing.h"
+
+namespace {
+
+class Parser {
+public:
+    Parser(const std::vector<std::string>& arguments, const std::vector<std::string_view>& names,
+           const std::vector<std::string_view>& flags)
+        : m_arguments(arguments), m_names(names), m_flags(flags) {}
+
+    CommandLine parse() {
+        bool only_operands = false;
+        for (; m_at < m_arguments.size() && !m_line.help && !m_line.version; ++m_at) {
+            const std::string& argument = m_arguments[m_at];
+            if (only_operands || argument.size() < 2 || argument[0] != '-') {
+                m_line.operands.push_back(argument);
+            } else if (argument == "--") {
+                only_operands = true;
+            } else if (argument == "--help") {
+                m_line.help = true;
+            } else if (argument == "--version") {
+                m_line.version = true;
+            } else if (is_one_of(m_flags, argument)) {
+                m_line.flags.push_back(argument);
+            } else {
+                take_option(argument);
+            }
+        }
+        return std::move(m_line);
+    }
+
+private:
+    static bool is_one_of(const std::vector<std::string_view>& names, std::string_view name) {
+        return std::find(names.begin(), names.end(), name) != names.end();
+    }
+
+    void take_option(const std::string& argument) {
+        const std::size_t equals = argument.find('=');
+        const std::string name = argument.substr(0, equals);
+        if (!is_one_of(m_names, name)) {
+            throw InputError(is_one_of(m_flags, name)
+                                 ? "option " + name + " takes no value"
+                                 : "unknown option " + quoted(argument) + " (--help lists them)");
+        }
+        if (std::any_of(m_line.options.begin(), m_line.options.end(),
+                        [&](const auto& given) { return given.first == name; })) {
+            throw InputError("option " + name + " is given twice");
+        }
+        if (equals == std::string::npos && m_at + 1 == m_arguments.size()) {
+            throw InputError("option " + name + " needs a value");
+        }
+        m_line.options.emplace_back(
+            name, equals != std::string::npos ? argument.substr(equals + 1) : m_arguments[++m_at]);
+    }
+
+    const std::vector<std::string>& m_arguments;
+    const std::vector<std::string_view>& m_names;
+    const std::vector<std::string_view>& m_flags;
+    std::size_t m_at = 0;
+    CommandLine m_line;
+};
+
+}  // namespace
+
+CommandLine parse_command_line(const std::vector<std::string>& arguments,
+                               const std::vector<std::string_view>& names,
+                               const std::vector<std::string_view>& flags) {
+    return Parser(arguments, names, flags).parse();
+}
+
+std::string file_operand(const CommandLine& line, const std::string& what) {
+    if (line.operands.empty()) {
+        return {};
+    }
+    if (line.operands[0].empty()) {
+        throw InputError("the " + what + "'s name is empty");
+    }
+    if (line.operands.size() > 1) {
+        throw InputError("one " + what + " only, but " + quoted(line.operands[1]) + " is a second one");
+    }
+    return line.operands[0];
+}
+
+void refuse_operands(const CommandLine& line) {
+    if (!line.operands.empty()) {
+        throw InputError("unexpected argument " + quoted(line.operands[0]) + " (--help shows what is taken)");
+    }
+}

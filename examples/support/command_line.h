@@ -1,0 +1,31 @@
+// The arguments of a program.
+#ifndef EXAMPLES_COMMAND_LINE_H
+#define EXAMPLES_COMMAND_LINE_H
+
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+struct CommandLine {
+    bool help = false;
+    bool version = false;
+    std::vector<std::string> operands;                         ///< what is no option, in order
+    std::vector<std::pair<std::string, std::string>> options;  ///< names and values as given, each once
+    std::vector<std::string> flags;                            ///< names as given
+};
+
+/// Reads `--name VALUE`, `--name=VALUE`, `--flag`, `--help`, `--version` and operands; behind `--` everything is
+/// an operand. Nothing behind --help or --version is looked at. InputError for all else.
+CommandLine parse_command_line(const std::vector<std::string>& arguments,
+                               const std::vector<std::string_view>& names,
+                               const std::vector<std::string_view>& flags = {});
+
+/// The one operand of a program that takes a file at most, empty when there is none. InputError for a second one
+/// and for an empty name; `what` names the file in it.
+std::string file_operand(const CommandLine& line, const std::string& what);
+
+/// For a program that takes none: InputError if there is an operand.
+void refuse_operands(const CommandLine& line);
+
+#endif

@@ -1,0 +1,66 @@
+# Sourced by the programs' tests: a scratch folder, and what every program has to do.
+# Sets program, data (absolute), work (the current folder) and failures.
+
+awk() { LC_ALL=C command awk "$@"; }  # numbers as the files write them, whatever the locale
+set -u
+program=$(realpath "$1")
+data=$(realpath "$2")
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+cd "$work" || exit 1
+failures=0
+
+fail() {
+    echo "FAILED: $*"
+    failures=$((failures + 1))
+}
+
+# run ARGUMENT...: report in `out`, messages in `err`, exit code in `code`
+run() {
+    "$program" "$@" >out 2>err
+    code=$?
+}
+
+succeeds() {
+    run "$@"
+    [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
+}
+
+# refused MESSAGE ARGUMENT...: one line that says so, nothing on standard output, exit code 2
+refused() {
+    local message=$1
+    shift
+    run "$@"
+    [ $code -eq 2 ] || fail "exit $code, not 2, from $*"
+    [ ! -s out ] || fail "output from $*"
+    [ "$(cat err)" = "$(basename "$program"): $message" ] || fail "$*: $(cat err); expected: $message"
+}
+
+# close_to WHAT ACTUAL EXPECTED TOLERANCE
+close_to() {
+    awk -v a="$2" -v b="$3" -v t="$4" 'BEGIN { exit !(a != "" && a - b <= t && b - a <= t) }' ||
+        fail "$1: $2, expected $3"
+}
+
+# answers_to_everyone ARGUMENT...: usage, version, and with these arguments a full disk
+answers_to_everyone() {
+    local name
+    name=$(basename "$program")
+    succeeds --help
+    grep -q "^Usage: $name" out || fail "--help shows no usage"
+    succeeds --version
+    grep -Eq "^$name [0-9]+\.[0-9]+\.[0-9]+$" out || fail "--version shows no version"
+    refused "unknown option '--colour' (--help lists them)" --colour
+    refused "unknown option '-v' (--help lists them)" -v
+    [ -w /dev/full ] || return
+    "$program" "$@" >/dev/full 2>err
+    code=$?
+    [ $code -eq 1 ] || fail "exit $code, not 1, on a full disk"
+    [ "$(cat err)" = "$name: cannot write to standard output: No space left on device" ] ||
+        fail "on a full disk: $(cat err)"
+}
+
+finish() {
+    [ $failures -eq 0 ] && echo "all passed"
+    exit $((failures != 0))
+}

@@ -45,7 +45,7 @@ TextFile::~TextFile() {
 
 void TextFile::write(std::wstring_view text) noexcept {
     const CodePage& code_page = active_code_page();
-    // As in the C library's streams: a quarter of the work for a line where nobody could be kept out.
+    // As the C library's streams do: locking takes as long as converting a line, here for nobody to wait.
     std::unique_lock guard(m_lock, std::defer_lock);
     if (__libc_single_threaded == 0) {
         guard.lock();

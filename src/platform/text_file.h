@@ -32,8 +32,9 @@ public:
     void write(std::wstring_view text) noexcept;
 
 private:
-    static constexpr std::size_t BUFFER = 8192;  // bytes: two pages, for the system does each that is cut twice
-    static constexpr std::size_t PIECE = 256;    // characters that are converted at once
+    // Bytes. Two pages, since the system has the more to do the more often one is written in parts.
+    static constexpr std::size_t BUFFER = 8192;
+    static constexpr std::size_t PIECE = 256;  // characters that are converted at once
 
     TextFile() = default;
     void send(std::size_t count) noexcept;

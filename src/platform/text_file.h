@@ -11,8 +11,8 @@
 
 namespace basalt::platform {
 
-// A file open for writing, with a buffer of its own: the C library's streams cost a text a copy more and, to
-// keep it whole, two passes over it.
+// A file open for writing, with a buffer of its own: a text is converted in its place, once, and moved if
+// that turns out to be too small; a stream of the C library lets nobody write there.
 class TextFile {
 public:
     // Created, or emptied when it exists. What is written goes to the file's end as it then is, so two

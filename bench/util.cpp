@@ -78,6 +78,9 @@ void hex_encode_table_loop(benchmark::State& state) {
 void hex_decode_basalt(benchmark::State& state) {
     run_decode(state, basalt::HexStringToVector);
 }
+void hex_decode_text_basalt(benchmark::State& state) {
+    run_decode(state, basalt::HexStringToString);
+}
 void hex_decode_table_loop(benchmark::State& state) {
     run_decode(state, plain::decode_hex);
 }
@@ -88,6 +91,12 @@ void hex_encode_abseil(benchmark::State& state) {
     });
 }
 void hex_decode_abseil(benchmark::State& state) {
+    run_decode(state, [](const std::string& text) {
+        const std::string bytes = absl::HexStringToBytes(text);
+        return Bytes(bytes.begin(), bytes.end());
+    });
+}
+void hex_decode_text_abseil(benchmark::State& state) {
     run_decode(state, [](const std::string& text) { return absl::HexStringToBytes(text); });
 }
 #endif
@@ -214,6 +223,11 @@ BENCHMARK(hex_encode_abseil)->Name("hex_encode/abseil")->Apply(sizes);
 #endif
 #ifdef HAS_BOOST_HEX
 BENCHMARK(hex_encode_boost)->Name("hex_encode/boost")->Apply(sizes);
+#endif
+// Text may not hold zeros, as 64 KiB of random bytes do.
+BENCHMARK(hex_decode_text_basalt)->Name("hex_decode_text/basalt")->ArgName("bytes")->Arg(6);
+#ifdef BENCH_HAS_ABSL
+BENCHMARK(hex_decode_text_abseil)->Name("hex_decode_text/abseil")->ArgName("bytes")->Arg(6);
 #endif
 BENCHMARK(hex_decode_basalt)->Name("hex_decode/basalt")->Apply(sizes);
 BENCHMARK(hex_decode_table_loop)->Name("hex_decode/table_loop")->Apply(sizes);

@@ -1,29 +1,8 @@
 #!/usr/bin/env bash
 # The program from the outside: its facts against what the system's own tools say, and every refusal.
 # Usage: hostinfo_test.sh PROGRAM
-set -u
-program=$(realpath "$1")
-work=$(realpath "$(mktemp -d)")
-trap 'rm -rf "$work"' EXIT
-cd "$work" || exit 1
+. "$(dirname "$0")/../support/program_test.sh"
 export LC_ALL=C.UTF-8
-failures=0
-
-fail() {
-    echo "FAILED: $*"
-    failures=$((failures + 1))
-}
-
-# run ARGUMENT...: output in `out`, messages in `err`, exit code in `code`
-run() {
-    "$program" "$@" >out 2>err
-    code=$?
-}
-
-succeeds() {
-    run "$@"
-    [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
-}
 
 # is NAME EXPECTED: the fact of that name
 is() {
@@ -31,16 +10,6 @@ is() {
     line=$(grep -- "^  $1  " out || grep -x -- "  $1" out) || fail "no fact '$1'"
     line=${line#"  $1"}
     [ "${line#"${line%%[! ]*}"}" = "$2" ] || fail "$1: '$line', expected '$2'"
-}
-
-# refused MESSAGE ARGUMENT...: this one line, nothing on standard output, exit code 2
-refused() {
-    local message=$1
-    shift
-    run "$@"
-    [ $code -eq 2 ] || fail "exit $code, not 2, from $*"
-    [ ! -s out ] || fail "output from $*"
-    [ "$(cat err)" = "hostinfo: $message" ] || fail "$*: $(cat err); expected: $message"
 }
 
 TMPDIR=$work succeeds
@@ -115,28 +84,17 @@ succeeds --log host.log "$work/data.d"
 sed 's/$/\r/' out | cmp -s - host.log || fail "the log is not the text"
 succeeds --json --log host.log "$work/data.d"
 grep -q '^  handheld  *1' host.log || fail "the log is not text beside JSON"
-run --log nowhere/host.log
-[ $code -eq 1 ] && [ "$(cat err)" = "hostinfo: cannot write the log nowhere/host.log" ] || fail "no such folder: $(cat err)"
-if [ -w /dev/full ]; then
-    run --log /dev/full
-    [ $code -eq 1 ] || fail "exit $code, not 1, with a log on a full disk"
-    "$program" >/dev/full 2>err
-    [ $? -eq 1 ] || fail "standard output on a full disk is no failure"
-fi
+fails "cannot write the log nowhere/host.log" --log nowhere/host.log
+[ ! -w /dev/full ] || fails "cannot write the log /dev/full" --log /dev/full
 
-refused "unknown option '--colour' (--help lists them)" --colour
 refused "option --log needs a value" --log
 refused "option --log takes a path, not ''" --log=
 refused "option --root is given twice" --root a --root b
+refused "option --json takes no value" --json=x
 refused "one path only, but 'b' is a second one" a b
 succeeds -- --json
 is path --json
 succeeds ""
 is "composed directory" '\'
-succeeds --help
-grep -q '^Usage: hostinfo' out || fail "--help shows no usage"
-succeeds --version
-grep -Eq '^hostinfo [0-9]+\.[0-9]+\.[0-9]+$' out || fail "--version shows no version"
-
-[ $failures -eq 0 ] && echo "all passed"
-exit $((failures != 0))
+answers_to_everyone
+finish

@@ -1,38 +1,7 @@
 #!/usr/bin/env bash
 # The program from the outside: its figures, its picture as another program reads it, and every refusal.
 # Usage: palette_test.sh PROGRAM
-set -u
-program=$(realpath "$1")
-work=$(mktemp -d)
-trap 'rm -rf "$work"' EXIT
-cd "$work" || exit 1
-failures=0
-
-fail() {
-    echo "FAILED: $*"
-    failures=$((failures + 1))
-}
-
-# run ARGUMENT...: report in `out`, messages in `err`, exit code in `code`
-run() {
-    "$program" "$@" >out 2>err
-    code=$?
-}
-
-succeeds() {
-    run "$@"
-    [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
-}
-
-# refused CODE MESSAGE ARGUMENT...: one line that says so, nothing on standard output
-refused() {
-    local expected=$1 message=$2
-    shift 2
-    run "$@"
-    [ $code -eq "$expected" ] || fail "exit $code, not $expected, from $*"
-    [ ! -s out ] || fail "output from $*"
-    [ "$(cat err)" = "palette: $message" ] || fail "$*: $(cat err); expected: $message"
-}
+. "$(dirname "$0")/../support/program_test.sh"
 
 # line TEXT: some line of the report has these words
 line() {
@@ -79,18 +48,12 @@ cp chart.bmp again.bmp
 succeeds --picture=chart.bmp
 cmp -s chart.bmp again.bmp || fail "a second run draws otherwise"
 
-refused 2 "a colour is six hexadecimal digits RRGGBB, not 'red'" red
-refused 2 "a colour is six hexadecimal digits RRGGBB, not '#FF00FF0'" '#FF00FF0'
-refused 2 "a colour is six hexadecimal digits RRGGBB, not ''" ''
-refused 2 "unknown option '--colour' (--help lists them)" --colour
-refused 2 "option --picture needs a value" --picture
-refused 2 "option --picture is given twice" --picture a --picture b
-refused 1 "cannot write to no/chart.bmp: No such file or directory" --picture no/chart.bmp
-[ ! -c /dev/full ] || refused 1 "cannot write all of /dev/full" --picture /dev/full
-succeeds --help
-grep -q '^Usage: palette' out || fail "--help shows no usage"
-succeeds --version
-grep -Eq '^palette [0-9]+\.[0-9]+\.[0-9]+$' out || fail "--version shows no version"
-
-[ $failures -eq 0 ] && echo "all passed"
-exit $((failures != 0))
+refused "a colour is six hexadecimal digits RRGGBB, not 'red'" red
+refused "a colour is six hexadecimal digits RRGGBB, not '#FF00FF0'" '#FF00FF0'
+refused "a colour is six hexadecimal digits RRGGBB, not ''" ''
+refused "option --picture needs a value" --picture
+refused "option --picture is given twice" --picture a --picture b
+fails "cannot write to no/chart.bmp: No such file or directory" --picture no/chart.bmp
+[ ! -c /dev/full ] || fails "cannot write all of /dev/full" --picture /dev/full
+answers_to_everyone FF0000
+finish

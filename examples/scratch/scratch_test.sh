@@ -2,44 +2,12 @@
 # The program from the outside: cells against what awk makes of the same scan, a job beyond its memory limit,
 # and that nothing stays in the temporary folder however it ends.
 # Usage: scratch_test.sh PROGRAM
-set -u
-program=$(realpath "$1")
-work=$(mktemp -d)
-trap 'rm -rf "$work"' EXIT
-cd "$work" || exit 1
+. "$(dirname "$0")/../support/program_test.sh"
 mkdir temporary
 export TMPDIR=$work/temporary
-failures=0
-
-fail() {
-    echo "FAILED: $*"
-    failures=$((failures + 1))
-}
-
-# run ARGUMENT...: report in `out`, messages in `err`, exit code in `code`
-run() {
-    "$program" "$@" >out 2>err
-    code=$?
-}
-
-succeeds() {
-    run "$@"
-    [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
-    leaves_nothing "$*"
-}
 
 leaves_nothing() {
     [ -z "$(ls -A temporary)" ] || fail "left by $1: $(ls -A temporary)"
-}
-
-# refused MESSAGE ARGUMENT...: one line that ends so, nothing on standard output, exit code 2
-refused() {
-    local message=$1
-    shift
-    run "$@"
-    [ $code -eq 2 ] || fail "exit $code, not 2, from $*"
-    [ ! -s out ] || fail "output from $*"
-    [ "$(cat err)" = "scratch: $message" ] || fail "$*: $(cat err); expected: $message"
 }
 
 # figure LABEL: what the report says behind a label, separators removed
@@ -74,6 +42,7 @@ model() {
 # 65,536 points fill a block: one run, a run and its first point, several.
 for points in 1 2 3 65536 65537 200000; do
     succeeds --points $points --cells cells.csv
+    leaves_nothing "$points points"
     model $points >expected.csv
     cmp -s cells.csv expected.csv || fail "other cells for $points points: $(diff cells.csv expected.csv | head -3)"
     is "Points" $points
@@ -145,21 +114,15 @@ if command -v script >/dev/null; then
     grep -q '\[#*\.*\] [0-9]* %' typescript || fail "no progress bar on a terminal"
 fi
 
-refused "unknown argument '--colour' (--help lists the options)" --colour
-refused "unknown argument 'file' (--help lists the options)" file
+refused "unexpected argument 'file' (--help shows what is taken)" file
 refused "option --points needs a value" --points
 refused "option --points is given twice" --points 1 --points 2
 refused "option --cells is given twice" --cells=a --cells=b
 refused "--points takes a whole number from 1 to 400000000, not '0'" --points 0
 refused "--points takes a whole number from 1 to 400000000, not '400000001'" --points 400000001
 refused "--points takes a whole number from 1 to 400000000, not '1e6'" --points 1e6
-succeeds --help
-grep -q '^Usage: scratch' out || fail "--help shows no usage"
-succeeds --version
-grep -Eq '^scratch [0-9]+\.[0-9]+\.[0-9]+$' out || fail "--version shows no version"
-run --points 10 --cells nowhere/cells.csv
-[ $code -eq 1 ] && [ "$(cat err)" = "scratch: cannot write to nowhere/cells.csv: No such file or directory" ] ||
-    fail "exit $code: $(cat err)"
+fails "cannot write to nowhere/cells.csv: No such file or directory" --points 10 --cells nowhere/cells.csv
 
-[ $failures -eq 0 ] && echo "all passed"
-exit $((failures != 0))
+answers_to_everyone --points 10
+leaves_nothing "the last of them"
+finish

@@ -1,11 +1,11 @@
 # Sourced by the programs' tests: a scratch folder, and what every program has to do.
-# Sets program, data (absolute), work (the current folder) and failures.
+# Sets program, data (absolute, empty for a test without), work (the current folder) and failures.
 
 awk() { LC_ALL=C command awk "$@"; }  # numbers as the files write them, whatever the locale
 set -u
 program=$(realpath "$1")
-data=$(realpath "$2")
-work=$(mktemp -d)
+data=${2:+$(realpath "$2")}
+work=$(realpath "$(mktemp -d)")
 trap 'rm -rf "$work"' EXIT
 cd "$work" || exit 1
 failures=0
@@ -26,15 +26,21 @@ succeeds() {
     [ $code -eq 0 ] && [ ! -s err ] || fail "exit $code from $*: $(cat err)"
 }
 
-# refused MESSAGE ARGUMENT...: one line that says so, nothing on standard output, exit code 2
-refused() {
-    local message=$1
-    shift
+# ends_with CODE MESSAGE ARGUMENT...: one line that says so, nothing on standard output
+ends_with() {
+    local expected=$1 message=$2
+    shift 2
     run "$@"
-    [ $code -eq 2 ] || fail "exit $code, not 2, from $*"
+    [ $code -eq "$expected" ] || fail "exit $code, not $expected, from $*"
     [ ! -s out ] || fail "output from $*"
     [ "$(cat err)" = "$(basename "$program"): $message" ] || fail "$*: $(cat err); expected: $message"
 }
+
+# refused MESSAGE ARGUMENT...: for what the user did
+refused() { ends_with 2 "$@"; }
+
+# fails MESSAGE ARGUMENT...: for what the system did
+fails() { ends_with 1 "$@"; }
 
 # close_to WHAT ACTUAL EXPECTED TOLERANCE
 close_to() {

@@ -4,7 +4,7 @@
 namespace {
 
 CString text_of(std::wstring_view part) {
-    return CString(part.data(), static_cast<int>(part.size()));
+    return {part.data(), static_cast<int>(part.size())};
 }
 
 }  // namespace

@@ -37,19 +37,14 @@ bool file_name_from_wide(std::wstring_view name, std::string& result) {
 }
 
 bool FileName::set(std::wstring_view name) {
-    if (name.size() < std::size(m_short)) {
-        // Without a way out of the loop, so that the compiler makes lanes of it.
-        char32_t all = 0;
+    if (name.size() < std::size(m_short) && write_printing(name, m_short) == name.size()) {
+        // Stores every byte, unlike std::replace, so that the compiler makes lanes of it.
         for (std::size_t i = 0; i < name.size(); ++i) {
-            const auto ch = static_cast<char32_t>(name[i]);
-            all |= ch;
-            m_short[i] = static_cast<char>(ch == U'\\' ? U'/' : ch);
+            m_short[i] = m_short[i] == '\\' ? '/' : m_short[i];
         }
         m_short[name.size()] = '\0';
         m_name = m_short;
-        if (all < 0x80) {
-            return true;
-        }
+        return true;
     }
     const bool is_name = file_name_from_wide(name, m_long);
     m_name = m_long.c_str();

@@ -29,7 +29,9 @@ std::string system_name(const char* path) {
 
 std::unique_ptr<TextFile> TextFile::open(const char* path) noexcept {
     return or_out_of_memory(std::unique_ptr<TextFile>(), [&] {
-        std::unique_ptr<TextFile> file(new TextFile);  // the constructor is private
+        // The constructor is private, and want of memory caught.
+        // NOLINTNEXTLINE(bugprone-unhandled-exception-at-new)
+        std::unique_ptr<TextFile> file(new TextFile);
         constexpr int FLAGS = O_WRONLY | O_CREAT | O_TRUNC | O_APPEND | O_CLOEXEC;
         file->m_file = ::open(system_name(path).c_str(), FLAGS, 0666);
         return file->m_file >= 0 ? std::move(file) : nullptr;
@@ -45,7 +47,7 @@ TextFile::~TextFile() {
 
 void TextFile::write(std::wstring_view text) noexcept {
     const CodePage& code_page = active_code_page();
-    // As in the C library's streams: a quarter of the work for a line where nobody could be kept out.
+    // As the C library's streams do: locking takes as long as converting a line, here for nobody to wait.
     std::unique_lock guard(m_lock, std::defer_lock);
     if (__libc_single_threaded == 0) {
         guard.lock();

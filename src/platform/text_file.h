@@ -11,8 +11,8 @@
 
 namespace basalt::platform {
 
-// A file open for writing, with a buffer of its own: the C library's streams cost a text a copy more and, to
-// keep it whole, two passes over it.
+// A file open for writing, with a buffer of its own: a text is converted in its place, once, and moved if
+// that turns out to be too small; a stream of the C library lets nobody write there.
 class TextFile {
 public:
     // Created, or emptied when it exists. What is written goes to the file's end as it then is, so two
@@ -32,8 +32,8 @@ public:
     void write(std::wstring_view text) noexcept;
 
 private:
-    static constexpr std::size_t BUFFER =
-        8192;                                  // bytes: two pages, for the system does each that is cut twice
+    // Bytes. Two pages, since the system has the more to do the more often one is written in parts.
+    static constexpr std::size_t BUFFER = 8192;
     static constexpr std::size_t PIECE = 256;  // characters that are converted at once
 
     TextFile() = default;

@@ -45,30 +45,6 @@ std::size_t copy_sixteen(const wchar_t* text, char* bytes) {
 }
 #endif
 
-// Copies the characters from ' ' to 0x7F at the front and answers their count; what it writes behind them, as
-// far as the text is long, has no meaning.
-std::size_t copy_printing_prefix(std::wstring_view text, char* bytes) {
-    std::size_t count = 0;
-#if defined(__SSE2__)
-    // Sixteen at a time where the processor always can: a third of the time of a log line otherwise. The last
-    // sixteen overlap the ones before, which are printing.
-    if (text.size() >= 16) {
-        const std::size_t last = text.size() - 16;
-        for (; count < last; count += 16) {
-            const std::size_t printing = copy_sixteen(text.data() + count, bytes + count);
-            if (printing < 16) {
-                return count + printing;
-            }
-        }
-        return last + copy_sixteen(text.data() + last, bytes + last);
-    }
-#endif
-    for (; count < text.size() && text[count] >= L' ' && text[count] < 0x80; ++count) {
-        bytes[count] = static_cast<char>(text[count]);
-    }
-    return count;
-}
-
 struct Decoded {
     wchar_t ch;
     std::size_t length;
@@ -104,6 +80,27 @@ Decoded decode_front(std::string_view text) {
 }
 
 }  // namespace
+
+std::size_t write_printing(std::wstring_view text, char* bytes) {
+    std::size_t count = 0;
+#if defined(__SSE2__)
+    // Where the processor always can. The last sixteen overlap the ones before, which are printing.
+    if (text.size() >= 16) {
+        const std::size_t last = text.size() - 16;
+        for (; count < last; count += 16) {
+            const std::size_t printing = copy_sixteen(text.data() + count, bytes + count);
+            if (printing < 16) {
+                return count + printing;
+            }
+        }
+        return last + copy_sixteen(text.data() + last, bytes + last);
+    }
+#endif
+    for (; count < text.size() && text[count] >= L' ' && text[count] < 0x80; ++count) {
+        bytes[count] = static_cast<char>(text[count]);
+    }
+    return count;
+}
 
 std::size_t encode_utf8(wchar_t ch, char* bytes) {
     const auto value = static_cast<char32_t>(ch);
@@ -141,7 +138,7 @@ std::string utf8_from_wide(std::wstring_view text) {
 
 char* write_utf8(std::wstring_view text, char* bytes) {
     while (!text.empty()) {
-        const std::size_t printing = copy_printing_prefix(text, bytes);
+        const std::size_t printing = write_printing(text, bytes);
         bytes += printing;
         text.remove_prefix(printing);
         if (!text.empty()) {
@@ -155,7 +152,7 @@ char* write_utf8(std::wstring_view text, char* bytes) {
 std::size_t write_utf8_lines(std::wstring_view text, char*& bytes) {
     std::size_t done = 0;
     for (;;) {
-        const std::size_t printing = copy_printing_prefix(text.substr(done), bytes);
+        const std::size_t printing = write_printing(text.substr(done), bytes);
         bytes += printing;
         done += printing;
         if (done == text.size() || text[done] == L'\0') {

@@ -19,6 +19,10 @@ constexpr bool is_unicode_scalar(wchar_t ch) {
     return value < 0xD800 || (value >= 0xE000 && value <= 0x10FFFF);
 }
 
+// Writes the characters from ' ' to 0x7F at the front, one byte each, into room for the whole text and
+// answers their count; what it writes behind them has no meaning.
+std::size_t write_printing(std::wstring_view text, char* bytes);
+
 // Writes one character's bytes ('?' when it is none) and answers their count, 1 to 4.
 std::size_t encode_utf8(wchar_t ch, char* bytes);
 

@@ -48,8 +48,7 @@ Bytes decode_any(std::string_view text) {
 // Where everything is a digit no zero byte ends the text early, so its end need not be looked for first.
 template <class Bytes>
 Bytes decode(const std::string& hex) {
-    Bytes bytes;
-    bytes.resize(hex.size() / 2);
+    Bytes bytes(hex.size() / 2, 0);
     if (!decode_hex(hex.data(), bytes.size(), reinterpret_cast<unsigned char*>(bytes.data()))) {
         bytes = decode_any<Bytes>(hex.c_str());
     }

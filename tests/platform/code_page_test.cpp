@@ -32,6 +32,34 @@ TEST(Utf8, characters_of_every_length) {
     }
 }
 
+// At every place of texts up to a few lanes long, what lanes might take for a printing character.
+TEST(Utf8, lanes_tell_printing_characters_from_all_others) {
+    const std::wstring others =
+        L"\n\t\r\x1F\x7F\x80\xA0\xFF\x100\x120\x7F41\xFF41\x10041\x1F30D\xD841\x7FFFFF41"s +
+        static_cast<wchar_t>(-1) + L'\0';
+    for (std::size_t size = 1; size < 50; ++size) {
+        for (std::size_t place = 0; place < size; ++place) {
+            for (const wchar_t other : others) {
+                std::wstring text(size, L'a');
+                text[place] = other;
+                const std::string expected = utf8_from_wide(text);
+                std::string bytes(size * MAX_UTF8_BYTES, '-');
+                bytes.resize(static_cast<std::size_t>(write_utf8(text, bytes.data()) - bytes.data()));
+                ASSERT_EQ(bytes, expected) << size << ' ' << place;
+
+                std::string lines(size * MAX_UTF8_BYTES, '-');
+                char* end = lines.data();
+                const std::size_t done = write_utf8_lines(text, end);
+                lines.resize(static_cast<std::size_t>(end - lines.data()));
+                ASSERT_EQ(done, other == L'\0' ? place : size);
+                ASSERT_EQ(lines, other == L'\0'   ? std::string(place, 'a')
+                                 : other == L'\n' ? expected.substr(0, place) + '\r' + expected.substr(place)
+                                                  : expected);
+            }
+        }
+    }
+}
+
 TEST(Utf8, each_byte_of_no_character_is_replaced) {
     for (const auto& [narrow, wide] : {
              Pair{"\x80", L"\xFFFD"},

@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
 # locale, a system short of everything, results to the bit, the package, exported symbols, sanitizers,
-# documentation, a minute of each fuzzer.
+# documentation, twenty seconds of each fuzzer (FUZZ_SECONDS=N: longer).
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
 #        format includes clang headers tidy elsewhere limits package symbols exact asan tsan docs fuzz
@@ -68,7 +68,7 @@ step_fuzz() {
         corpus=("build/fuzz/corpus/$name" "fuzz/corpus/${name#fuzz_}")
         mkdir -p "${corpus[0]}"
         [ -d "${corpus[1]}" ] || unset "corpus[1]"
-        "$program" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-60}" -timeout=10 -print_final_stats=1 \
+        "$program" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-20}" -timeout=10 -print_final_stats=1 \
             2>"$program.log" || { tail -n 40 "$program.log"; return 1; }
         echo "$name: $(grep -c . "$program.log") lines, $(grep executed_units "$program.log")"
     done

@@ -15,14 +15,14 @@ struct CommandLine {
     std::vector<std::string> flags;                            ///< names as given
 };
 
-/// Reads `--name VALUE`, `--name=VALUE`, `--flag`, `--help`, `--version` and operands; behind `--` everything is
-/// an operand. Nothing behind --help or --version is looked at. InputError for all else.
+/// Reads `--name VALUE`, `--name=VALUE`, `--flag`, `--help`, `--version` and operands; behind `--` everything
+/// is an operand. Nothing behind --help or --version is looked at. InputError for all else.
 CommandLine parse_command_line(const std::vector<std::string>& arguments,
                                const std::vector<std::string_view>& names,
                                const std::vector<std::string_view>& flags = {});
 
-/// The one operand of a program that takes a file at most, empty when there is none. InputError for a second one
-/// and for an empty name; `what` names the file in it.
+/// The one operand of a program that takes a file at most, empty when there is none. InputError for a second
+/// one and for an empty name; `what` names the file in it.
 std::string file_operand(const CommandLine& line, const std::string& what);
 
 /// For a program that takes none: InputError if there is an operand.

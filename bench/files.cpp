@@ -128,7 +128,7 @@ void set_one_stat(benchmark::State& state) {
         benchmark::DoNotOptimize(stat(file.c_str(), &status));
     }
 }
-BENCHMARK(set_one_stat)->Name("path_set/one_stat");
+BENCHMARK(set_one_stat)->Name("path_set/limit_one_stat");
 
 void set_std_filesystem(benchmark::State& state) {
     const Folder folder;

@@ -75,6 +75,16 @@ const Places& places() {
     return all;
 }
 
+/// Times what a formula cannot do without, over all places.
+template <typename Ask>
+void run_functions(benchmark::State& state, const Ask& ask) {
+    std::size_t at = 0;
+    for ([[maybe_unused]] auto _ : state) {
+        benchmark::DoNotOptimize(ask(places().geodetic[at], places().azimuth[at]));
+        at = (at + 1) % COUNT;
+    }
+}
+
 // Geodetic to Cartesian and back.
 
 constexpr Triple METRES = {1e-7, 1e-4, 1e-7};
@@ -103,6 +113,20 @@ void to_cartesian_plain(benchmark::State& state) {
         return Triple{v.x, v.y, v.z};
     };
     run(state, METRES, ask, to_cartesian);
+}
+
+void to_cartesian_functions(benchmark::State& state) {
+    run_functions(state, [](const geo_llh& g, double) {
+        return std::sin(g.latitude) + std::cos(g.latitude) + std::sin(g.longitude) + std::cos(g.longitude) +
+               std::sqrt(g.latitude * g.latitude);
+    });
+}
+
+void to_geodetic_functions(benchmark::State& state) {
+    run_functions(state, [](const geo_llh& g, double azimuth) {
+        return std::atan2(g.latitude, azimuth) + std::atan2(g.longitude, azimuth) +
+               std::sqrt(g.latitude * g.latitude + g.longitude * g.longitude);
+    });
 }
 
 void to_geodetic_basalt(benchmark::State& state) {
@@ -145,6 +169,16 @@ void run_direct(benchmark::State& state, const Ask& ask) {
 
 void direct_basalt(benchmark::State& state) {
     run_direct(state, direct);
+}
+
+/// Sines and cosines of latitude, azimuth and arc; the end's latitude, longitude and azimuth.
+void direct_functions(benchmark::State& state) {
+    run_functions(state, [](const geo_llh& g, double azimuth) {
+        const double arc = g.height * 1e-4;
+        return std::sin(g.latitude) + std::cos(g.latitude) + std::sin(azimuth) + std::cos(azimuth) +
+               std::sin(arc) + std::cos(arc) + std::atan2(g.latitude, azimuth) +
+               std::atan2(g.longitude, azimuth) + std::atan2(azimuth, g.longitude);
+    });
 }
 
 void direct_plain(benchmark::State& state) {
@@ -333,9 +367,12 @@ void distances(benchmark::internal::Benchmark* row) {
 
 BENCHMARK(to_cartesian_basalt)->Name("to_cartesian/basalt");
 BENCHMARK(to_cartesian_plain)->Name("to_cartesian/plain");
+BENCHMARK(to_cartesian_functions)->Name("to_cartesian/limit_two_sines_and_cosines");
+BENCHMARK(to_geodetic_functions)->Name("to_geodetic/limit_two_arctangents");
 BENCHMARK(to_geodetic_basalt)->Name("to_geodetic/basalt");
 BENCHMARK(to_geodetic_plain)->Name("to_geodetic/plain");
 BENCHMARK(direct_basalt)->Name("direct/basalt")->Apply(distances);
+BENCHMARK(direct_functions)->Name("direct/limit_three_sines_and_cosines_three_arctangents")->Apply(distances);
 BENCHMARK(direct_plain)->Name("direct/plain")->Apply(distances);
 BENCHMARK(crosstrack_basalt)->Name("crosstrack/basalt");
 BENCHMARK(crosstrack_steps)->Name("crosstrack/metre_steps");

@@ -24,6 +24,7 @@
 #include <vector>
 
 #include "basalt/memory.h"
+#include "bench/limits.h"
 #include "src/platform/heap.h"
 #include "src/platform/lock.h"
 
@@ -312,6 +313,10 @@ void lock_pair(benchmark::State& state) {
     }
 }
 
+void two_lock_pairs(benchmark::State& state) {
+    bench::lock_pairs(state, 2);
+}
+
 #define BASALT_COMPARE(work)                                               \
     BENCHMARK_TEMPLATE(work, PrivateHeap)->Name(#work "/basalt");          \
     BENCHMARK_TEMPLATE(work, Malloc)->Name(#work "/malloc");               \
@@ -320,7 +325,9 @@ void lock_pair(benchmark::State& state) {
 
 BASALT_COMPARE(chunks);
 BASALT_COMPARE(chunk_exchange);
+BENCHMARK(two_lock_pairs)->Name("chunk_exchange/limit_two_lock_pairs");
 BENCHMARK_TEMPLATE(small_mix, PrivateHeap)->Name("small_mix/basalt")->ThreadRange(1, 2)->UseRealTime();
+BENCHMARK(two_lock_pairs)->Name("small_mix/limit_two_lock_pairs")->ThreadRange(1, 1)->UseRealTime();
 BENCHMARK_TEMPLATE(small_mix, Malloc)->Name("small_mix/malloc")->ThreadRange(1, 2)->UseRealTime();
 BENCHMARK_TEMPLATE(small_mix, UnsynchronizedPool)->Name("small_mix/pmr_pool")->Threads(1)->UseRealTime();
 BENCHMARK_TEMPLATE(small_mix, SynchronizedPool)
@@ -329,10 +336,10 @@ BENCHMARK_TEMPLATE(small_mix, SynchronizedPool)
     ->UseRealTime();
 
 BENCHMARK_TEMPLATE(fresh, FreshHeap, false)->Name("fresh_64_bytes/basalt")->UseManualTime();
-BENCHMARK_TEMPLATE(fresh, Pages, false)->Name("fresh_64_bytes/pages")->UseManualTime();
+BENCHMARK_TEMPLATE(fresh, Pages, false)->Name("fresh_64_bytes/limit_pages")->UseManualTime();
 BENCHMARK_TEMPLATE(fresh, FreshMalloc, false)->Name("fresh_64_bytes/malloc")->UseManualTime();
 BENCHMARK_TEMPLATE(fresh, FreshHeap, true)->Name("drop_64_bytes/basalt")->UseManualTime();
-BENCHMARK_TEMPLATE(fresh, Pages, true)->Name("drop_64_bytes/pages")->UseManualTime();
+BENCHMARK_TEMPLATE(fresh, Pages, true)->Name("drop_64_bytes/limit_pages")->UseManualTime();
 BENCHMARK_TEMPLATE(fresh, FreshMalloc, true)->Name("drop_64_bytes/malloc")->UseManualTime();
 
 BENCHMARK_CAPTURE(grow, heap, grow_heap_block)->Name("grow_heap_block/basalt");

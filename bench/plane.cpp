@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "basalt/geo.h"
+#include "bench/limits.h"
 #include "tests/geo/plain_forms.h"
 
 #if __has_include(<boost/geometry.hpp>)
@@ -178,6 +179,10 @@ void in_polygon_geos_prepared(benchmark::State& state) {
 
 #endif
 
+void reading_the_points(benchmark::State& state) {
+    bench::reading(state, static_cast<std::size_t>(size_of(state)) * sizeof(geo_nee));
+}
+
 void polygon_sizes(benchmark::internal::Benchmark* row) {
     row->Arg(10)->Arg(100)->Arg(1000)->Arg(10000);
 }
@@ -187,6 +192,7 @@ void band_sizes(benchmark::internal::Benchmark* row) {
 
 BENCHMARK(in_polygon_basalt)->Name("in_polygon/basalt")->Apply(polygon_sizes);
 BENCHMARK(in_polygon_plain_loop)->Name("in_polygon/plain_loop")->Apply(polygon_sizes);
+BENCHMARK(reading_the_points)->Name("in_polygon/limit_reading_the_points")->Apply(polygon_sizes);
 #ifdef HAS_BOOST_GEOMETRY
 BENCHMARK(in_polygon_boost)->Name("in_polygon/boost")->Apply(polygon_sizes);
 #endif

@@ -28,6 +28,7 @@
 #endif
 
 #include "basalt/sparse.h"
+#include "bench/limits.h"
 #include "bench/resident_memory.h"
 #include "src/sparse/lock.h"
 
@@ -302,15 +303,6 @@ void add_store(const std::vector<Cell>& rows, const std::vector<Cell>& random,
     add_memory_row<Store>("bytes per element, one cell in ten (bytes, not ns)", tenth);
 }
 
-struct Floor {
-    void lock() {
-        while (word.exchange(1, std::memory_order_acquire) != 0) {
-        }
-    }
-    void unlock() { word.store(0, std::memory_order_release); }
-    std::atomic<int> word{0};
-};
-
 struct OurLock {
     void lock() { wrapper.Enter(); }
     void unlock() { wrapper.Leave(); }
@@ -332,6 +324,17 @@ void add_lock_row(const char* who) {
                                          lock.unlock();
                                      }
                                  });
+}
+
+void add_limits(std::size_t records) {
+    for (const char* work : {"insert", "find", "remove"}) {
+        for (const bool in_order : {true, false}) {
+            const std::string row = std::string(work) + (in_order ? " row by row" : " at random");
+            benchmark::RegisterBenchmark(
+                (row + "/limit_lock_pair_and_a_look").c_str(),
+                [=](benchmark::State& state) { bench::locked_looks(state, records, in_order); });
+        }
+    }
 }
 
 }  // namespace
@@ -357,8 +360,9 @@ int main(int argc, char** argv) {
     add_store<Volume>(rows, random, tenth);
 #endif
     add_lock_row<OurLock>("basalt");
-    add_lock_row<Floor>("exchange_and_store");
+    add_lock_row<bench::Floor>("limit_exchange_and_store");
     add_lock_row<std::recursive_mutex>("std_recursive_mutex");
+    add_limits(rows.size());
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();
     return 0;

@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "basalt/util.h"
+#include "bench/limits.h"
 #include "tests/support/failing_new.h"
 #include "tests/util/plain_hex.h"
 
@@ -119,6 +120,10 @@ void hex_decode_boost(benchmark::State& state) {
 }
 #endif
 
+void digits_copied(benchmark::State& state) {
+    bench::copying(state, 2 * static_cast<std::size_t>(state.range(0)));
+}
+
 constexpr char LINE[] = "2021-02-01 12:00:00.250 RTK fixed, 14 satellites, age 0.8 s, HDOP 0.7, 3.1 mm";
 
 struct CloseStream {
@@ -224,6 +229,8 @@ BENCHMARK(hex_encode_abseil)->Name("hex_encode/abseil")->Apply(sizes);
 #ifdef HAS_BOOST_HEX
 BENCHMARK(hex_encode_boost)->Name("hex_encode/boost")->Apply(sizes);
 #endif
+BENCHMARK(digits_copied)->Name("hex_encode/limit_memcpy_of_the_digits")->Apply(sizes);
+BENCHMARK(digits_copied)->Name("hex_decode/limit_memcpy_of_the_digits")->Apply(sizes);
 // Text may not hold zeros, as 64 KiB of random bytes do.
 BENCHMARK(hex_decode_text_basalt)->Name("hex_decode_text/basalt")->ArgName("bytes")->Arg(6);
 #ifdef BENCH_HAS_ABSL

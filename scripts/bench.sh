@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
-# Measures the library beside its peers in one run and prints a table of medians and ratios (peer / ours).
+# Measures the library beside its peers and prints a table of medians and ratios (peer / ours).
 # Usage: scripts/bench.sh [subject ...]          subjects are the files of bench/: plane rtree sparse memory ...
-# REPETITIONS (5) and MIN_TIME (0.1 seconds a repetition) may be set; a longer run is a quieter one.
+# Without a subject: all of them, and the tables of docs/performance.md are written anew.
+# ROUNDS (7) and MIN_TIME (0.05 seconds a measurement in a round) may be set; a longer run is a quieter one.
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
@@ -9,14 +10,33 @@ show_help "$@"
 need_packages "${BUILD_PACKAGES[@]}" "${PEER_PACKAGES[@]}" python3
 cmake --preset bench >/dev/null
 subjects=("$@")
+page=()
 if [ ${#subjects[@]} -eq 0 ]; then
+    page=(--page docs/performance.md)
     for file in bench/*.cpp; do subjects+=("$(basename "$file" .cpp)"); done
 fi
 for subject in "${subjects[@]}"; do
     [ -f "bench/$subject.cpp" ] || { echo "bench.sh: no such subject: $subject" >&2; exit 2; }
     cmake --build --preset bench --target "bench_$subject" >build/bench/build.log || { cat build/bench/build.log; exit 1; }
-    "build/bench/bench/bench_$subject" --benchmark_repetitions="${REPETITIONS:-5}" \
-        --benchmark_min_time="${MIN_TIME:-0.1}" --benchmark_enable_random_interleaving=true --benchmark_report_aggregates_only=true \
-        --benchmark_out="build/bench/$subject.json" --benchmark_out_format=json >build/bench/run.log
-    python3 scripts/bench_table.py "build/bench/$subject.json"
+done
+
+machine() {
+    echo "$(lscpu | sed -n 's/^Model name: *//p'), $(nproc) processors," \
+        "$(lscpu | sed -n 's/^L2 cache: *//p') L2, $(g++ -dumpfullversion) at -O3, $(date -u +%F)," \
+        "\`ROUNDS=${ROUNDS:-7} MIN_TIME=${MIN_TIME:-0.05} scripts/bench.sh\`"
+}
+
+[ ${#page[@]} -eq 0 ] || python3 scripts/bench_table.py "${page[@]}" machine --text "$(machine)"
+for subject in "${subjects[@]}"; do
+    rounds=${ROUNDS:-7}
+    [ "$subject" != scale ] || rounds=1  # minutes each; it has no peer
+    rm -f "build/bench/$subject".*.json
+    for round in $(seq "$rounds"); do
+        "build/bench/bench/bench_$subject" --benchmark_min_time="${MIN_TIME:-0.05}" \
+            --benchmark_enable_random_interleaving=true --benchmark_out="build/bench/$subject.$round.json" \
+            --benchmark_out_format=json >build/bench/run.log
+    done
+    printf '\n### %s\n\n' "$subject"
+    python3 scripts/bench_table.py "build/bench/$subject".*.json
+    [ ${#page[@]} -eq 0 ] || python3 scripts/bench_table.py "${page[@]}" "$subject" "build/bench/$subject".*.json
 done

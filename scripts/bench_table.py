@@ -1,18 +1,26 @@
 #!/usr/bin/env python3
-"""Turns benchmark results into a table: our median, each peer's median and the ratio peer / ours.
+"""Turns rounds of benchmark results into a table: our median, and for each peer its median and the ratio peer / ours.
 
-Benchmarks are named "<row>/<who>[/<argument>...]", with who = basalt for ours; arguments become part of the
-row. Fails when a name is no such name, a row has no figure of ours, or a benchmark reported an error, such as
+A round is one run of a subject's program, in which everything is measured in random turns; a ratio is taken
+inside each round, and its median and its range over the rounds are told.
+Benchmarks are named "<row>/<who>[/<argument>...]", with who = basalt for ours; arguments become part of the row.
+Who = limit_<what> is no peer but what the machine allows at best, and is told as times that limit.
+Fails when a name is no such name, a row has no figure of ours, or a benchmark reported an error, such as
 answers that differ from a peer's.
 
-Usage: bench_table.py RESULTS.json
+Usage: bench_table.py ROUND.json ...                    prints the table
+       bench_table.py --page PAGE SUBJECT ROUND.json ...    puts it between the page's marks of that subject
+       bench_table.py --page PAGE MARK --text TEXT          puts a text there
 """
 import json
-import os
+import pathlib
+import re
+import statistics
 import sys
 
 NANOSECONDS = {"ns": 1.0, "us": 1e3, "ms": 1e6, "s": 1e9}
 HOW_TIMED = {"real_time", "manual_time", "process_time"}
+LIMIT = "limit "
 
 
 def split_name(name):
@@ -25,17 +33,19 @@ def split_name(name):
     return ", ".join([row.replace("_", " "), *arguments]), who.replace("_", " ")
 
 
-def medians(benchmarks):
+def read_round(file):
+    """{row: {who: (nanoseconds, counters)}}, in the order in which the rows are written."""
     rows = {}
-    # measured in random turns; told in the order in which they are written
+    benchmarks = json.loads(pathlib.Path(file).read_text(encoding="utf-8"))["benchmarks"]
     for entry in sorted(benchmarks, key=lambda e: (e["family_index"], e["per_family_instance_index"])):
         if entry.get("error_occurred"):
             sys.exit(f"{entry['name']}: {entry['error_message']}")
-        if entry.get("aggregate_name", "median") != "median":
-            continue
         row, who = split_name(entry["run_name"])
         counters = {k: v for k, v in entry.items() if k.endswith("_ns") or k == "bytes_per_cell"}
         rows.setdefault(row, {})[who] = (entry["real_time"] * NANOSECONDS[entry["time_unit"]], counters)
+    for row, figures in rows.items():
+        if "basalt" not in figures:
+            sys.exit(f"{row}: no figure of basalt to set beside {', '.join(figures)}")
     return rows
 
 
@@ -43,26 +53,62 @@ def number(value):
     return f"{value:,.0f}" if value >= 1000 else f"{value:.3g}"
 
 
-def main():
-    if len(sys.argv) != 2 or sys.argv[1].startswith("-"):
-        sys.exit(__doc__)
-    with open(sys.argv[1], encoding="utf-8") as file:
-        results = json.load(file)
-    context = results["context"]
-    print(f"\n### {os.path.basename(sys.argv[1]).removesuffix('.json')}: {context['num_cpus']} processors of "
-          f"{context['mhz_per_cpu']} MHz, nanoseconds unless the row says otherwise\n")
-    print("| row | basalt | peer | peer's figure | ratio |")
-    print("|---|---:|---|---:|---:|")
-    for row, figures in medians(results["benchmarks"]).items():
-        if "basalt" not in figures:
-            sys.exit(f"{row}: no figure of basalt to set beside {', '.join(figures)}")
-        ours, counters = figures.pop("basalt")
+def median_of(rounds, row, who):
+    return statistics.median(r[row][who][0] for r in rounds)
+
+
+def ratios(rounds, row, who):
+    return [r[row][who][0] / r[row]["basalt"][0] for r in rounds if r[row]["basalt"][0] > 0]
+
+
+def table(rounds):
+    lines = ["| row | basalt | peer | its figure | ratio | lowest to highest | limit | times the limit |",
+             "|---|---:|---|---:|---:|---|---|---:|"]
+    for row, figures in rounds[0].items():
+        counters = figures["basalt"][1]
         label = row + "".join(f"; {name} {number(value)}" for name, value in counters.items())
-        if not figures:
-            print(f"| {label} | {number(ours)} | | | |")
-        for who, (theirs, _) in figures.items():
-            ratio = f"{theirs / ours:.2f}" if ours > 0 else ""
-            print(f"| {label} | {number(ours)} | {who} | {number(theirs)} | {ratio} |")
+        ours = number(median_of(rounds, row, "basalt"))
+        limits = [who for who in figures if who.startswith(LIMIT)]
+        limit = " | | "
+        if limits:
+            times = statistics.median(1 / r for r in ratios(rounds, row, limits[0]))
+            limit = f" | {limits[0].removeprefix(LIMIT)} {number(median_of(rounds, row, limits[0]))} | {times:.2f} "
+        peers = [who for who in figures if who != "basalt" and who not in limits]
+        for who in peers or [None]:
+            told = " | | | "
+            if who:
+                seen = ratios(rounds, row, who)
+                told = f" {who} | {number(median_of(rounds, row, who))} | "
+                told += f"{statistics.median(seen):.2f} | {min(seen):.2f} to {max(seen):.2f}" if seen else " | "
+            lines.append(f"| {label} | {ours} |{told}{limit}|")
+            limit = " | | "
+    return "\n".join(lines)
+
+
+def put_into(page, subject, text):
+    begin, end = f"<!-- {subject} -->", f"<!-- end {subject} -->"
+    pattern = re.compile(re.escape(begin) + ".*?" + re.escape(end), re.DOTALL)
+    old = page.read_text(encoding="utf-8")
+    if not pattern.search(old):
+        sys.exit(f"{page}: no marks {begin} and {end}")
+    page.write_text(pattern.sub(lambda _: f"{begin}\n{text}\n{end}", old), encoding="utf-8")
+
+
+def main():
+    arguments = sys.argv[1:]
+    page = None
+    if arguments[:1] == ["--page"]:
+        page, subject, *arguments = arguments[1:]
+    if page and arguments[:1] == ["--text"] and len(arguments) == 2:
+        text = arguments[1]
+    elif not arguments or arguments[0].startswith("-"):
+        sys.exit(__doc__)
+    else:
+        text = table([read_round(file) for file in arguments])
+    if page:
+        put_into(pathlib.Path(page), subject, text)
+    else:
+        print(text)
 
 
 if __name__ == "__main__":

@@ -1,0 +1,97 @@
+// What the machine allows at best: memory moved, a lock's two operations, a wait for memory.
+#ifndef BENCH_LIMITS_H
+#define BENCH_LIMITS_H
+
+#include <benchmark/benchmark.h>
+
+#include <algorithm>
+#include <atomic>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <numeric>
+#include <random>
+#include <vector>
+
+namespace bench {
+
+/// The least a lock can be: one locked operation and a store.
+class Floor {
+public:
+    void lock() {
+        while (m_word.exchange(1, std::memory_order_acquire) != 0) {
+        }
+    }
+    void unlock() { m_word.store(0, std::memory_order_release); }
+
+private:
+    std::atomic<int> m_word{0};
+};
+
+/// `count` pairs of it a turn.
+inline void lock_pairs(benchmark::State& state, int count) {
+    Floor floor;
+    long guarded = 0;
+    for ([[maybe_unused]] auto _ : state) {
+        for (int i = 0; i < count; ++i) {
+            floor.lock();
+            benchmark::DoNotOptimize(++guarded);
+            floor.unlock();
+        }
+    }
+}
+
+/// A pair of it and one look at a record of 32 bytes a turn, the records in order or not.
+inline void locked_looks(benchmark::State& state, std::size_t records, bool in_order) {
+    constexpr std::size_t DOUBLES = 4;
+    std::vector<double> memory(records * DOUBLES, 1.0);
+    std::vector<std::uint32_t> order(records);
+    std::iota(order.begin(), order.end(), 0U);
+    if (!in_order) {
+        std::shuffle(order.begin(), order.end(), std::mt19937(5));
+    }
+    Floor floor;
+    double sum = 0;
+    std::size_t at = 0;
+    for ([[maybe_unused]] auto _ : state) {
+        floor.lock();
+        sum += memory[order[at] * DOUBLES];
+        benchmark::DoNotOptimize(sum);
+        floor.unlock();
+        at = at + 1 == records ? 0 : at + 1;
+    }
+}
+
+inline void copying(benchmark::State& state, std::size_t bytes) {
+    std::vector<unsigned char> from(bytes, 1);
+    std::vector<unsigned char> to(bytes, 2);
+    for ([[maybe_unused]] auto _ : state) {
+        std::memcpy(to.data(), from.data(), bytes);
+        benchmark::ClobberMemory();
+    }
+}
+
+inline void setting(benchmark::State& state, std::size_t bytes) {
+    std::vector<unsigned char> to(bytes, 2);
+    for ([[maybe_unused]] auto _ : state) {
+        std::memset(to.data(), 3, bytes);
+        benchmark::ClobberMemory();
+    }
+}
+
+/// Reading whole words, as many at once as the compiler can.
+inline void reading(benchmark::State& state, std::size_t bytes) {
+    const std::vector<std::uint64_t> words(bytes / sizeof(std::uint64_t), 3);
+    for ([[maybe_unused]] auto _ : state) {
+        std::uint64_t all = 0;
+        for (const std::uint64_t word : words) {
+            all |= word;
+        }
+        benchmark::DoNotOptimize(all);
+        benchmark::ClobberMemory();
+    }
+}
+
+}  // namespace bench
+
+#endif

@@ -17,12 +17,11 @@ namespace basalt::platform {
 
 namespace {
 
-// Bytes that are no text cannot be told in another encoding, so such a name is left as it is.
+// Bytes that are no text cannot be told in another encoding, so they are left as they are.
 std::string system_name(const char* path) {
-    const std::wstring wide = widen(path);
-    const bool is_text = wide.find(REPLACEMENT_CHARACTER) == std::wstring::npos;
     std::string name;
-    return is_text && file_name_from_wide(wide, name) ? name : path;
+    file_name_from_wide(active_code_page().widen_name(path), name);
+    return name;
 }
 
 }  // namespace
@@ -53,16 +52,14 @@ void TextFile::write(std::wstring_view text) noexcept {
         guard.lock();
     }
     std::size_t before = m_size;
+    std::mbstate_t state{};
     while (!text.empty()) {
-        const std::wstring_view piece = text.substr(0, PIECE);
-        char* end = m_bytes + m_size;
-        const std::size_t done = code_page.narrow_lines_to(piece, end);
+        char* const end = code_page.narrow_line_piece(text, PIECE, m_bytes + m_size, state);
         m_size = static_cast<std::size_t>(end - m_bytes);
         while (m_size > BUFFER) {
             send(before > 0 ? before : m_size);
             before = 0;
         }
-        text.remove_prefix(done < piece.size() ? text.size() : done);
     }
 }
 

@@ -153,6 +153,17 @@ TEST(CodePage, single_and_double_byte_encodings) {
         EXPECT_EQ(vietnamese.widen("ba"), L"ba");
         EXPECT_EQ(vietnamese.widen("\0a\0"s), L"\0a\0"s);
         EXPECT_EQ(vietnamese.narrow(L"ba\x65E5"), "ba?");
+        // However a text is cut into pieces.
+        const std::wstring text = L"\xCA\x304z\xCA\x416\xCA\xD800\xCA\x30C\xCA";
+        for (std::size_t most = 1; most <= text.size(); ++most) {
+            char bytes[100];
+            char* end = bytes;
+            std::mbstate_t state{};
+            for (std::wstring_view left = text; !left.empty();) {
+                end = hong_kong.narrow_piece(left, most, end, state);
+            }
+            EXPECT_EQ(std::string(bytes, end), hong_kong.narrow(text)) << most;
+        }
         std::_Exit(testing::Test::HasFailure() ? 1 : 0);
     };
     if (made) {

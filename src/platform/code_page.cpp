@@ -135,7 +135,14 @@ std::size_t widen_by_locale_to(std::string_view text, locale_t locale, Substitut
 
 std::wstring widen_by_locale(std::string_view text, locale_t locale, Substitute substitute) {
     std::wstring result(text.size(), L'\0');
-    result.resize(widen_by_locale_to(text, locale, substitute, result.data(), result.size()));
+    const auto convert = [&] {
+        return widen_by_locale_to(text, locale, substitute, result.data(), result.size());
+    };
+    const std::size_t count = convert();
+    result.resize(count);
+    if (count > text.size()) {
+        convert();  // a byte of TSCII is up to three characters
+    }
     return result;
 }
 

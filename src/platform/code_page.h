@@ -28,8 +28,8 @@ public:
 
     // REPLACEMENT_CHARACTER for each byte that belongs to no character, a character cut short at the end too.
     std::wstring widen(std::string_view text) const;
-    // The same into room for some characters: writes those that fit and answers the count of all, which is at
-    // most one a byte.
+    // The same into room for some characters: writes those that fit and answers the count of all, which is
+    // hardly ever more than one a byte.
     std::size_t widen_to(std::string_view text, wchar_t* characters, std::size_t room) const;
     // A file's name: what belongs to no character becomes what file_name_from_wide leads back to the same
     // bytes.

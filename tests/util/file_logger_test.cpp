@@ -1,6 +1,7 @@
 #include "basalt/util/file_logger.h"
 
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 
 #include <csignal>
 #include <cstdlib>
@@ -239,6 +240,22 @@ TEST_F(FileLog, full_disk_is_silent) {
     log.Write(L"still usable");
     log.Close();
     EXPECT_EQ(contents(file), "still usable");
+}
+
+TEST_F(FileLog, limit_on_file_sizes_is_silent) {
+    constexpr rlim_t LIMIT = 20'000;
+    const auto log_beyond_it = [&] {
+        const rlimit limit = {LIMIT, LIMIT};
+        setrlimit(RLIMIT_FSIZE, &limit);
+        FileLogger log(file.c_str());
+        for (int i = 0; i < 1000; ++i) {
+            write_line(log, 'a', i);
+        }
+        log.Close();
+        std::_Exit(fs::file_size(file) == LIMIT ? 0 : 1);
+    };
+    GTEST_FLAG_SET(death_test_style, "fast");
+    EXPECT_EXIT(log_beyond_it(), testing::ExitedWithCode(0), "");
 }
 
 TEST_F(FileLog, opening_without_memory_is_silent_and_leaves_no_file_open) {

@@ -22,8 +22,8 @@ namespace vex_util {
 /// so whatever else happens to the process, and whoever else appends to the file, each text shorter than the
 /// buffer is in it whole or not at all.
 ///
-/// Failures are silent: what cannot be opened stays closed, and what cannot be written, on a full disk, is
-/// lost.
+/// Failures are silent: what cannot be opened stays closed, and what cannot be written, on a full disk or
+/// beyond the limit on file sizes, is lost; the text in which the room ends is cut there.
 /// Threads: Write() from any number of threads, each text whole; Open() and Close() from one alone.
 class BASALT_API FileLogger {
 public:

@@ -19,8 +19,8 @@ namespace vex_util::mfc {
 /// @param bitmap the bitmap, not selected into a context; it stays the caller's
 /// @param fileName path, UTF-8 on this system
 ///
-/// Bad input: nothing is reported. A handle that is no bitmap leaves no file; what becomes of a file that
-/// cannot be written is the system's affair.
+/// Bad input: nothing is reported. A handle that is no bitmap leaves the name as it is; a file that cannot be
+/// written to its end, for a full disk or a limit on file sizes, is deleted again.
 BASALT_API void DumpBitmap(HBITMAP bitmap, const CString& fileName);
 
 /// Reads a bitmap's pixels in its own depth, top row first.

@@ -170,9 +170,9 @@ TEST(Handle, OfAnotherKindOrADeletedObjectIsRefusedEverywhere) {
         }
         if (handle != region) {
             auto* const no_region = static_cast<HRGN>(handle);
-            EXPECT_EQ(CombineRgn(region, region, no_region, RGN_OR), ERROR);
-            EXPECT_EQ(CombineRgn(no_region, region, region, RGN_OR), ERROR);
-            EXPECT_EQ(GetRgnBox(no_region, &box), ERROR);
+            EXPECT_EQ(CombineRgn(region, region, no_region, RGN_OR), RGN_ERROR);
+            EXPECT_EQ(CombineRgn(no_region, region, region, RGN_OR), RGN_ERROR);
+            EXPECT_EQ(GetRgnBox(no_region, &box), RGN_ERROR);
             EXPECT_EQ(EqualRgn(region, no_region) + PtInRegion(no_region, 0, 0), 0);
         }
     }

@@ -121,6 +121,21 @@ TEST(Wrapper, OwnsOneHandle) {
     EXPECT_FALSE(dc.DeleteDC());
 }
 
+TEST(Wrapper, OfTheStockBitmapIsWholeAgainAfterItsEnd) {
+    CDC dc;
+    dc.CreateCompatibleDC(nullptr);
+    CBitmap bitmap;
+    bitmap.CreateBitmap(2, 2, 1, 8, nullptr);
+    EXPECT_TRUE(dc.SelectObject(&bitmap)->DeleteObject());  // stock objects stay
+    CDC other;
+    other.CreateCompatibleDC(nullptr);
+    CBitmap second;
+    second.CreateBitmap(2, 2, 1, 8, nullptr);
+    CBitmap* const before = other.SelectObject(&second);
+    ASSERT_NE(before, nullptr);
+    EXPECT_NE(other.SelectObject(before), nullptr);
+}
+
 TEST(Handle, OfAnotherKindOrADeletedObjectIsRefusedEverywhere) {
     HDC const dc = CreateCompatibleDC(nullptr);
     HBITMAP const bitmap = CreateBitmap(2, 2, 1, 32, nullptr);

@@ -107,6 +107,24 @@ TEST(TransparentCopy, ByMasksTakesWhatLiesOutsideTheSourceForBlack) {
     expect_same(dest.picture(), expected);
 }
 
+TEST(TransparentCopy, ByMasksDrawsNothingFromWhatCannotBeRead) {
+    const StoredOsCode os(2);
+    const Picture before(4, 4, 0x112233);
+    TestSurface dest(before);
+    TestSurface turned(Picture(4, 4, 0x445566));
+    SetGraphicsMode(turned.dc(), GM_ADVANCED);
+    constexpr XFORM QUARTER = {0, 1, -1, 0, 0, 0};
+    SetWorldTransform(turned.dc(), &QUARTER);
+    for (HDC const source : {HDC(nullptr), turned.dc()}) {
+        EXPECT_EQ(_transparentblt(dest.dc(), 0, 0, 4, 4, source, 0, 0, 4, 4, KEY), 0);
+        expect_same(dest.picture(), before);
+    }
+    const TestSurface source(Picture(4, 4, 0x778899));
+    EXPECT_EQ(_transparentblt(turned.dc(), 0, 0, 4, 4, source.dc(), 0, 0, 4, 4, KEY), 0);
+    ModifyWorldTransform(turned.dc(), nullptr, MWT_IDENTITY);
+    expect_same(turned.picture(), Picture(4, 4, 0x445566));
+}
+
 TEST(TransparentCopy, ByMasksOfOneBitKeepsWhatIsWhiteInBoth) {
     const StoredOsCode os(3);
     Picture white_black(4, 1);

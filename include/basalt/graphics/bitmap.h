@@ -53,8 +53,8 @@ BASALT_API bool RotateBitmap(CDC* dc, CBitmap* bitmap, float angle);
 /// @param bitmap the bitmap
 /// @param transparentColour 0x00BBGGRR, the high byte plays no part. At 32 bits a pixel whose unused byte is
 /// not 0 is of no colour; at 16 the colour is brought to the nearest of 5 bits a channel first, as drawing in
-/// it does, and a pixel whose unused bit is set is of no colour; at other depths the colours of the pixels are
-/// compared.
+/// it does, and a pixel whose unused bit is set is of no colour; at other depths the colours of the pixels
+/// are compared.
 /// @return false, and the region stays as it is, when it holds one already, the colour exceeds 32 bits, the
 /// bitmap cannot be read or no region can be made
 ///

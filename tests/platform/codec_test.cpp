@@ -102,7 +102,7 @@ TEST_F(CodecTest, WritesFilesThatHoldThePicture) {
             ASSERT_EQ(save(canvas.bitmap(), name), Gdiplus::Ok);
             const BmpFile bmp(path);
             const std::uint32_t colours = depth <= 8 ? 1U << depth : 0;
-            const std::uint32_t image = static_cast<std::uint32_t>((width * depth + 31) / 32 * 4 * 3);
+            const auto image = static_cast<std::uint32_t>((width * depth + 31) / 32 * 4 * 3);
             EXPECT_EQ(bmp.field(0, 2), 0x4D42U);
             EXPECT_EQ(bmp.size(), 54 + colours * 4 + image) << "an older, longer file is cut";
             EXPECT_EQ(bmp.field(2, 4), bmp.size());

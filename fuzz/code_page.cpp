@@ -4,6 +4,7 @@
 // that needs ASAN_OPTIONS=detect_leaks=0.
 #include <locale.h>
 
+#include <climits>
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
@@ -52,6 +53,27 @@ void check_code_page(const CodePage& code_page, const std::string& bytes) {
     }
 }
 
+// However a text is cut into pieces, it comes out as a whole; in lines, the same with more line ends.
+void check_pieces(const CodePage& code_page, const std::wstring& wide, std::size_t most) {
+    std::vector<char> bytes((wide.size() + 2) * MB_LEN_MAX);
+    char* end = bytes.data();
+    std::mbstate_t state{};
+    for (std::wstring_view left = wide; !left.empty();) {
+        end = code_page.narrow_piece(left, most, end, state);
+    }
+    require(std::string(bytes.data(), end) == code_page.narrow(wide));
+
+    end = bytes.data();
+    for (std::wstring_view left = wide; !left.empty();) {
+        end = code_page.narrow_line_piece(left, most, end, state);
+    }
+    std::string lines;
+    for (const char byte : code_page.narrow(wide.c_str())) {
+        lines.append(byte == '\n' ? "\r" : "").append(1, byte);
+    }
+    require(std::string(bytes.data(), end) == lines);
+}
+
 std::wstring wide_units(const std::uint8_t* data, std::size_t size) {
     std::wstring wide;
     for (; size >= 3; data += 3, size -= 3) {
@@ -74,6 +96,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     check_buffers(bytes, wide, data[0]);
     for (const CodePage& code_page : code_pages) {
         check_code_page(code_page, bytes);
+        check_pieces(code_page, wide, data[0] % 5 + 1);
     }
     if (utf8 != nullptr) {
         require(wide_from_utf8(bytes) == widen_by_locale(bytes, utf8));

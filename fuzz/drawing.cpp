@@ -194,10 +194,10 @@ struct World {
         const int y = input.coordinate();
         const bool in_either = PtInRegion(a, x, y) != 0 || PtInRegion(b, x, y) != 0;
         const int mode = input.byte() % 7;
-        if (CombineRgn(result, a, b, mode) != ERROR && mode == RGN_OR) {
+        if (CombineRgn(result, a, b, mode) != RGN_ERROR && mode == RGN_OR) {
             require(in_either == (PtInRegion(result, x, y) != 0));
             RECT box = {};
-            require(GetRgnBox(result, &box) != ERROR && EqualRgn(result, result) == 1);
+            require(GetRgnBox(result, &box) != RGN_ERROR && EqualRgn(result, result) == 1);
         }
     }
 

@@ -84,6 +84,9 @@ succeeds --log host.log "$work/data.d"
 sed 's/$/\r/' out | cmp -s - host.log || fail "the log is not the text"
 succeeds --json --log host.log "$work/data.d"
 grep -q '^  handheld  *1' host.log || fail "the log is not text beside JSON"
+mkdir logs
+succeeds --log "logs\\été $(printf '\351').log" "$work/data.d"
+sed 's/$/\r/' out | cmp -s - "logs/été $(printf '\351').log" || fail "the log is not in its folder"
 fails "cannot write the log nowhere/host.log" --log nowhere/host.log
 [ ! -w /dev/full ] || fails "cannot write the log /dev/full" --log /dev/full
 

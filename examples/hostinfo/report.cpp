@@ -1,6 +1,5 @@
 #include "report.h"
 
-#include <basalt/files.h>
 #include <basalt/frame.h>
 #include <basalt/util.h>
 
@@ -77,6 +76,21 @@ struct AsJson {
     }
 };
 
+/// The name under which the library has a file of a path: in UTF-8, `/` for either separator.
+std::filesystem::path system_path(std::string path) {
+    const CString text(path.c_str());
+    if (text.Find(L'\xFFFD') >= 0) {
+        // Bytes that are no text stay as they are.
+        std::replace(path.begin(), path.end(), '\\', '/');
+        return path;
+    }
+    std::u32string name;
+    for (int i = 0; i < text.GetLength(); ++i) {
+        name += text[i] == L'\\' ? U'/' : static_cast<char32_t>(text[i]);
+    }
+    return name;
+}
+
 }  // namespace
 
 CString text_report(const std::vector<Section>& sections) {
@@ -111,13 +125,19 @@ CString json_report(const std::vector<Section>& sections) {
 }
 
 std::string narrow(const CString& text) {
-    // By pieces, since the conversion is for short texts.
+    // By pieces, since the conversion is for short texts; they end with a line, for a mark of its own may
+    // belong to the letter before it.
     constexpr int PIECE = 1000;
     constexpr int LONGEST_CHARACTER = 16;
     std::string all;
-    for (int start = 0; start < text.GetLength(); start += PIECE) {
+    for (int start = 0; start < text.GetLength();) {
+        CString piece = text.Mid(start, PIECE);
+        if (const int line_end = piece.ReverseFind(L'\n'); line_end >= 0) {
+            piece = piece.Left(line_end + 1);
+        }
+        start += piece.GetLength();
         char bytes[PIECE * LONGEST_CHARACTER + 1];
-        _tchar2char(text.Mid(start, PIECE), bytes, PIECE * LONGEST_CHARACTER);
+        _tchar2char(piece, bytes, PIECE * LONGEST_CHARACTER);
         all += bytes;
     }
     return all;
@@ -131,8 +151,7 @@ void write_log(const std::string& path, const CString& text) {
     const std::string bytes = narrow(text);
     const auto carriage_returns = static_cast<std::uintmax_t>(std::count(bytes.begin(), bytes.end(), '\n'));
     std::error_code unknown;
-    if (!vex_util::CFilePath::FileExists(path.c_str()) ||
-        std::filesystem::file_size(path, unknown) != bytes.size() + carriage_returns) {
+    if (std::filesystem::file_size(system_path(path), unknown) != bytes.size() + carriage_returns) {
         throw std::runtime_error("cannot write the log " + path);
     }
 }

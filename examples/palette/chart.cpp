@@ -22,7 +22,7 @@ constexpr int LARGE_TOP = MARGIN + LINE + 40 + GAP;
 constexpr int SCENES_TOP = LARGE_TOP + LINE + PER_HUE * CELL_HEIGHT + GAP;
 constexpr int HEIGHT = SCENES_TOP + LINE + SCENE_HEIGHT + MARGIN;
 
-/// A colour's field with its number, which is legible over any colour.
+/// A colour's number in the middle of its field, in the colour the library has for text over it.
 void draw_number(Drawing& page, const ColorPalette& palette, int number, const RECT& field) {
     const COLORREF colour = palette[static_cast<unsigned char>(number)];
     page.text((field.left + field.right) / 2, (field.top + field.bottom - Drawing::text_height(1)) / 2,

@@ -38,8 +38,8 @@ public:
     CFilePath& operator=(CString& path);
     /// The path as it was set.
     operator const CString&() const { return m_full_path; }
-    /// Sets the path to `first`, `\` and `second`, whatever they end and begin with; they may be parts of the
-    /// object itself.
+    /// Sets the path to `first`, `\` and `second`, whatever they end and begin with, each up to its first
+    /// zero; they may be parts of the object itself.
     void Combine(const CString& first, const CString& second);
 
     /// @name Parts

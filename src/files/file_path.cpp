@@ -86,8 +86,9 @@ void CFilePath::split() {
 }
 
 void CFilePath::Combine(const CString& first, const CString& second) {
-    // Built apart from the members, which the arguments may be.
-    m_full_path = joined(first, second);
+    // Built apart from the members, which the arguments may be; each up to its first zero, as text is
+    // formatted.
+    m_full_path = CString(first.GetString()) + L'\\' + second.GetString();
     split();
 }
 

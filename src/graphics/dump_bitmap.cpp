@@ -63,11 +63,7 @@ void DumpBitmap(HBITMAP bitmap, const CString& fileName) {
         return;
     }
     const std::unique_ptr<GpBitmap, DisposeImage> owner(image);
-    try {
-        GdipSaveImageToFile(image, fileName, &*encoder, nullptr);
-    } catch (const std::bad_alloc&) {
-        // The name goes to the system as text, which may run out of memory; that is not reported either.
-    }
+    GdipSaveImageToFile(image, fileName, &*encoder, nullptr);
 }
 
 }  // namespace vex_util::mfc

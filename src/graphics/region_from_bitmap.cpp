@@ -9,6 +9,7 @@
 #include "src/graphics/dib_rows.h"
 #include "src/graphics/opaque_runs.h"
 #include "src/graphics/screen_context.h"
+#include "src/platform/pixel_format.h"
 #include "src/platform/region_rectangles.h"
 
 namespace basalt::graphics {
@@ -19,12 +20,12 @@ namespace {
 constexpr std::size_t STRIP_BYTES = 65536;
 
 std::uint32_t key_of(COLORREF colour, std::uint32_t) {
-    return std::uint32_t{GetRValue(colour)} << 16 | std::uint32_t{GetGValue(colour)} << 8 | GetBValue(colour);
+    return platform::word_of_colour(colour);
 }
 
+/// The code that drawing in the colour stores: a background filled with it is of it.
 std::uint16_t key_of(COLORREF colour, std::uint16_t) {
-    return static_cast<std::uint16_t>((GetRValue(colour) >> 3) << 10 | (GetGValue(colour) >> 3) << 5 |
-                                      GetBValue(colour) >> 3);
+    return static_cast<std::uint16_t>(platform::value_of_colour(16, colour));
 }
 
 /// Appends the runs of all rows; neighbouring rows that are alike give one rectangle a run.

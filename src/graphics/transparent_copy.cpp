@@ -19,7 +19,9 @@ struct Place {
 void copy_by_masks(Place dest, Place src, int width, int height, COLORREF transparent) {
     const HDC like = dest.dc;
     const MemorySurface s(like, CreateCompatibleBitmap(like, width, height));
-    BitBlt(s.dc(), 0, 0, width, height, src.dc, src.x, src.y, SRCCOPY);
+    if (BitBlt(s.dc(), 0, 0, width, height, src.dc, src.x, src.y, SRCCOPY) == 0) {
+        return;  // what the surfaces hold otherwise would spoil the destination; so below
+    }
     POINT size = {width, height};
     DPtoLP(src.dc, &size, 1);
 
@@ -29,7 +31,7 @@ void copy_by_masks(Place dest, Place src, int width, int height, COLORREF transp
     const MemorySurface i(like, CreateBitmap(size.x, size.y, 1, 1, nullptr));
     for (const MemorySurface* surface : {&s, &k, &r, &m, &i}) {
         if (!surface->is_ready()) {
-            return;  // without one of them the copy would spoil the destination
+            return;
         }
     }
     const auto combine = [size](const MemorySurface& to, const MemorySurface& from, DWORD rop) {
@@ -42,7 +44,9 @@ void copy_by_masks(Place dest, Place src, int width, int height, COLORREF transp
     combine(m, s, SRCCOPY);
     SetBkColor(s.dc(), background);
     combine(i, m, NOTSRCCOPY);
-    BitBlt(r.dc(), 0, 0, size.x, size.y, dest.dc, dest.x, dest.y, SRCCOPY);
+    if (BitBlt(r.dc(), 0, 0, size.x, size.y, dest.dc, dest.x, dest.y, SRCCOPY) == 0) {
+        return;
+    }
     combine(r, m, SRCAND);
     combine(s, i, SRCAND);
     combine(r, s, SRCPAINT);

@@ -68,6 +68,10 @@ CBitmap* CBitmap::FromHandle(HBITMAP bitmap) {
             wrapper->Attach(bitmap);
             return wrapper;
         }();
+        // DeleteObject of the wrapper lets go of the handle. Written only then: threads share the wrapper.
+        if (lent->m_hObject != bitmap) {
+            lent->m_hObject = bitmap;
+        }
         return lent;
     }
     auto* const object = object_of<Bitmap>(bitmap);

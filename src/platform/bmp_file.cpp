@@ -6,12 +6,11 @@
 #include <unistd.h>
 
 #include <cerrno>
-#include <memory>
-#include <string>
 
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
 #include "src/platform/file_name.h"
+#include "src/platform/file_size_signal.h"
 #include "src/platform/pixel_format.h"
 #include "src/platform/pixel_rows.h"
 
@@ -109,8 +108,8 @@ bool is_regular_file(FILE* file) {
 }  // namespace
 
 bool write_bmp_file(const Surface& surface, const wchar_t* name) {
-    std::string file_name;
-    if (!file_name_from_wide(name, file_name)) {
+    FileName file_name;
+    if (!file_name.set(name)) {
         SetLastError(ERROR_INVALID_NAME);
         return false;
     }
@@ -120,6 +119,7 @@ bool write_bmp_file(const Surface& surface, const wchar_t* name) {
         return false;
     }
     const bool may_be_deleted = is_regular_file(file);
+    const FileSizeSignalHeld held;
     Writer writer(file);
     write_headers(surface, writer);
     for (int y = surface.height - 1; y >= 0 && ::ferror_unlocked(file) == 0; --y) {

@@ -8,6 +8,8 @@
 #include <cwchar>
 #include <cwctype>
 
+#include "src/platform/file_name.h"
+
 namespace basalt::platform {
 
 namespace {
@@ -51,6 +53,7 @@ std::size_t encode_kept(char* bytes, std::mbstate_t& state) {
         return 0;
     }
     const std::size_t length = std::wcrtomb(bytes, L'\0', &state);
+    state = {};
     return length != FAILED ? length - 1 : 0;  // without the zero's own byte
 }
 
@@ -65,6 +68,82 @@ std::size_t encode_in_scope(wchar_t ch, char* bytes, std::mbstate_t& state) {
     bytes[kept] = '?';
     state = {};
     return kept + 1;
+}
+
+// Answers the end of what was written, with what is kept back if that is the end of the text.
+char* narrow_by_locale_to(std::wstring_view piece, bool is_last, locale_t locale, char* bytes,
+                          std::mbstate_t& state) {
+    const ScopedLocale scope(locale);
+    for (const wchar_t ch : piece) {
+        bytes += encode_in_scope(ch, bytes, state);
+    }
+    return is_last ? bytes + encode_kept(bytes, state) : bytes;
+}
+
+// What stands for a byte that belongs to no character.
+using Substitute = wchar_t (*)(char byte);
+
+wchar_t replacement(char) {
+    return REPLACEMENT_CHARACTER;
+}
+
+std::size_t widen_by_locale_to(std::string_view text, locale_t locale, Substitute substitute,
+                               wchar_t* characters, std::size_t room) {
+    constexpr auto NOTHING = static_cast<wchar_t>(-1);
+    const ScopedLocale scope(locale);
+    std::size_t count = 0;
+    const auto put = [&](wchar_t ch) {
+        if (count < room) {
+            characters[count] = ch;
+        }
+        ++count;
+    };
+    const auto put_kept = [&](std::mbstate_t& state) {
+        wchar_t ch = NOTHING;
+        if (std::mbsinit(&state) == 0 && std::mbrtowc(&ch, "", 1, &state) <= 1 && ch != L'\0' &&
+            ch != NOTHING) {
+            put(ch);
+        }
+    };
+    std::mbstate_t state{};
+    while (!text.empty()) {
+        std::mbstate_t before = state;
+        wchar_t ch = NOTHING;
+        std::size_t length = std::mbrtowc(&ch, text.data(), text.size(), &state);
+        // The two failures, invalid and cut short, are the two largest counts. A lead byte in front of
+        // ordinary text may answer either, so neither swallows more than the one byte.
+        const bool is_taken = ch == NOTHING ? length > 0 : is_unicode_scalar(ch);
+        if (length > text.size() || !is_taken) {
+            put_kept(before);
+            ch = substitute(text.front());
+            length = 1;
+            state = {};
+        }
+        if (ch != NOTHING) {
+            put(ch);
+        }
+        if (ch == L'\0') {
+            length = 1;  // answered as 0
+        } else if (length == 0) {
+            state = {};  // what was kept is out, but the C library gives it for ever in Shift_JISX0213
+        }
+        text.remove_prefix(length);
+    }
+    put_kept(state);
+    return count;
+}
+
+std::wstring widen_by_locale(std::string_view text, locale_t locale, Substitute substitute) {
+    std::wstring result(text.size(), L'\0');
+    const auto convert = [&] {
+        return widen_by_locale_to(text, locale, substitute, result.data(), result.size());
+    };
+    const std::size_t count = convert();
+    result.resize(count);
+    if (count > text.size()) {
+        convert();  // a byte of TSCII is up to three characters
+    }
+    return result;
 }
 
 }  // namespace
@@ -88,33 +167,45 @@ std::wstring CodePage::widen(std::string_view text) const {
     return m_is_utf8 ? wide_from_utf8(text) : widen_by_locale(text, m_locale);
 }
 
+std::wstring CodePage::widen_name(std::string_view name) const {
+    return m_is_utf8 ? wide_from_file_name(name) : widen_by_locale(name, m_locale, wide_from_byte);
+}
+
 std::size_t CodePage::widen_to(std::string_view text, wchar_t* characters, std::size_t room) const {
     return m_is_utf8 ? write_wide(text, characters, room)
-                     : widen_by_locale_to(text, m_locale, characters, room);
+                     : widen_by_locale_to(text, m_locale, replacement, characters, room);
 }
 
 std::string CodePage::narrow(std::wstring_view text) const {
     return m_is_utf8 ? utf8_from_wide(text) : narrow_by_locale(text, m_locale);
 }
 
-char* CodePage::narrow_to(std::wstring_view text, char* bytes) const {
-    return m_is_utf8 ? write_utf8(text, bytes) : narrow_by_locale_to(text, m_locale, bytes);
+char* CodePage::narrow_piece(std::wstring_view& text, std::size_t most, char* bytes,
+                             std::mbstate_t& state) const {
+    const std::wstring_view piece = text.substr(0, most);
+    text.remove_prefix(piece.size());
+    return m_is_utf8 ? write_utf8(piece, bytes)
+                     : narrow_by_locale_to(piece, text.empty(), m_locale, bytes, state);
 }
 
-std::size_t CodePage::narrow_lines_to(std::wstring_view text, char*& bytes) const {
+char* CodePage::narrow_line_piece(std::wstring_view& text, std::size_t most, char* bytes,
+                                  std::mbstate_t& state) const {
+    std::wstring_view piece = text.substr(0, most);
     if (m_is_utf8) {
-        return write_utf8_lines(text, bytes);
+        const std::size_t done = write_utf8_lines(piece, bytes);
+        text.remove_prefix(done < piece.size() ? text.size() : done);
+        return bytes;
     }
-    text = text.substr(0, text.find(L'\0'));
-    const std::size_t count = text.size();
-    for (std::size_t line_end; (line_end = text.find(L'\n')) != std::wstring_view::npos;
-         text.remove_prefix(line_end + 1)) {
-        bytes = narrow_by_locale_to(text.substr(0, line_end), m_locale, bytes);
+    const std::size_t zero = piece.find(L'\0');
+    piece = piece.substr(0, zero);
+    text.remove_prefix(zero != std::wstring_view::npos ? text.size() : piece.size());
+    for (std::size_t line_end; (line_end = piece.find(L'\n')) != std::wstring_view::npos;
+         piece.remove_prefix(line_end + 1)) {
+        bytes = narrow_by_locale_to(piece.substr(0, line_end), true, m_locale, bytes, state);
         *bytes++ = '\r';
         *bytes++ = '\n';
     }
-    bytes = narrow_by_locale_to(text, m_locale, bytes);
-    return count;
+    return narrow_by_locale_to(piece, text.empty(), m_locale, bytes, state);
 }
 
 wchar_t CodePage::to_lower(wchar_t ch) const {
@@ -143,56 +234,8 @@ const CodePage& active_code_page() {
     return environment;
 }
 
-std::size_t widen_by_locale_to(std::string_view text, locale_t locale, wchar_t* characters,
-                               std::size_t room) {
-    constexpr auto NOTHING = static_cast<wchar_t>(-1);
-    const ScopedLocale scope(locale);
-    std::size_t count = 0;
-    const auto put = [&](wchar_t ch) {
-        if (count < room) {
-            characters[count] = ch;
-        }
-        ++count;
-    };
-    const auto put_kept = [&](std::mbstate_t& state) {
-        wchar_t ch = NOTHING;
-        if (std::mbsinit(&state) == 0 && std::mbrtowc(&ch, "", 1, &state) <= 1 && ch != L'\0' &&
-            ch != NOTHING) {
-            put(ch);
-        }
-    };
-    std::mbstate_t state{};
-    while (!text.empty()) {
-        std::mbstate_t before = state;
-        wchar_t ch = NOTHING;
-        std::size_t length = std::mbrtowc(&ch, text.data(), text.size(), &state);
-        // The two failures, invalid and cut short, are the two largest counts. A lead byte in front of
-        // ordinary text may answer either, so neither swallows more than the one byte.
-        const bool is_taken = ch == NOTHING ? length > 0 : is_unicode_scalar(ch);
-        if (length > text.size() || !is_taken) {
-            put_kept(before);
-            ch = REPLACEMENT_CHARACTER;
-            length = 1;
-            state = {};
-        }
-        if (ch != NOTHING) {
-            put(ch);
-        }
-        if (ch == L'\0') {
-            length = 1;  // answered as 0
-        } else if (length == 0) {
-            state = {};  // what was kept is out, but the C library gives it for ever in Shift_JISX0213
-        }
-        text.remove_prefix(length);
-    }
-    put_kept(state);
-    return count;
-}
-
 std::wstring widen_by_locale(std::string_view text, locale_t locale) {
-    std::wstring result(text.size(), L'\0');
-    result.resize(widen_by_locale_to(text, locale, result.data(), result.size()));
-    return result;
+    return widen_by_locale(text, locale, replacement);
 }
 
 std::string narrow_by_locale(std::wstring_view text, locale_t locale) {
@@ -205,16 +248,6 @@ std::string narrow_by_locale(std::wstring_view text, locale_t locale) {
         result.append(bytes, encode_in_scope(ch, bytes, state));
     }
     return result.append(bytes, encode_kept(bytes, state));
-}
-
-char* narrow_by_locale_to(std::wstring_view text, locale_t locale, char* bytes) {
-    const ScopedLocale scope(locale);
-    std::mbstate_t state{};
-    for (const wchar_t ch : text) {
-        bytes += encode_in_scope(ch, bytes, state);
-    }
-    char kept[MB_LEN_MAX];
-    return std::copy_n(kept, encode_kept(kept, state), bytes);
 }
 
 }  // namespace basalt::platform

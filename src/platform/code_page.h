@@ -8,6 +8,7 @@
 
 #include <locale.h>
 
+#include <cwchar>
 #include <string>
 #include <string_view>
 
@@ -27,16 +28,22 @@ public:
 
     // REPLACEMENT_CHARACTER for each byte that belongs to no character, a character cut short at the end too.
     std::wstring widen(std::string_view text) const;
-    // The same into room for some characters: writes those that fit and answers the count of all, which is at
-    // most one a byte.
+    // The same into room for some characters: writes those that fit and answers the count of all, which is
+    // hardly ever more than one a byte.
     std::size_t widen_to(std::string_view text, wchar_t* characters, std::size_t room) const;
+    // A file's name: what belongs to no character becomes what file_name_from_wide leads back to the same
+    // bytes.
+    std::wstring widen_name(std::string_view name) const;
     // '?' for each character that the encoding lacks.
     std::string narrow(std::wstring_view text) const;
-    // The same into room for MB_LEN_MAX bytes a character; answers the end of what was written.
-    char* narrow_to(std::wstring_view text, char* bytes) const;
-    // The same as text mode does it: up to the first zero, with CR LF for each LF. Moves `bytes` to the end
-    // of what was written; answers the count of characters before the zero.
-    std::size_t narrow_lines_to(std::wstring_view text, char*& bytes) const;
+    // The same piece by piece: takes up to `most` characters off the front of a text and writes them into
+    // room for MB_LEN_MAX bytes each and once more; answers the end of what was written. What an encoding
+    // keeps back until it knows the next character stays in `state`, at first all zero, and goes with the
+    // last piece.
+    char* narrow_piece(std::wstring_view& text, std::size_t most, char* bytes, std::mbstate_t& state) const;
+    // The same as text mode does it: with CR LF for each LF, and the text is over at its first zero.
+    char* narrow_line_piece(std::wstring_view& text, std::size_t most, char* bytes,
+                            std::mbstate_t& state) const;
 
     wchar_t to_lower(wchar_t ch) const;
     wchar_t to_upper(wchar_t ch) const;
@@ -61,9 +68,7 @@ inline std::string narrow(std::wstring_view text) {
 // The two conversions by way of a locale's own routines, one character at a time: what CodePage does for
 // every encoding but UTF-8.
 std::wstring widen_by_locale(std::string_view text, locale_t locale);
-std::size_t widen_by_locale_to(std::string_view text, locale_t locale, wchar_t* characters, std::size_t room);
 std::string narrow_by_locale(std::wstring_view text, locale_t locale);
-char* narrow_by_locale_to(std::wstring_view text, locale_t locale, char* bytes);
 
 }  // namespace basalt::platform
 

@@ -103,7 +103,11 @@ Gdiplus::Status GdipSaveImageToFile(GpImage* image, const wchar_t* name, const C
     if (bitmap == nullptr) {
         return Gdiplus::InvalidParameter;
     }
-    return basalt::platform::write_bmp_file(bitmap->surface, name) ? Gdiplus::Ok : Gdiplus::Win32Error;
+    try {
+        return basalt::platform::write_bmp_file(bitmap->surface, name) ? Gdiplus::Ok : Gdiplus::Win32Error;
+    } catch (const std::bad_alloc&) {
+        return Gdiplus::OutOfMemory;
+    }
 }
 
 Gdiplus::Status GdipDisposeImage(GpImage* image) {

@@ -83,7 +83,8 @@ Gdiplus::Status GdipGetImageEncoders(UINT count, UINT size, ImageCodecInfo* enco
 // handle that is no bitmap. palette is null.
 Gdiplus::Status GdipCreateBitmapFromHBITMAP(HBITMAP bitmap, void* palette, GpBitmap** image);
 // Writes an image to a file, which is created or cut. Win32Error when that fails: then there is no file, but
-// for one that could not be opened in the first place. parameters is null.
+// for one that could not be opened in the first place. OutOfMemory without memory for the name. parameters is
+// null.
 Gdiplus::Status GdipSaveImageToFile(GpImage* image, const wchar_t* name, const CLSID* encoder,
                                     const EncoderParameters* parameters);
 // Ends an image; the bitmap stays.

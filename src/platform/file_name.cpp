@@ -60,8 +60,7 @@ void wide_from_file_name(std::string_view name, std::wstring& result) {
     }
     result.clear();
     for (const char byte : name) {
-        const auto value = static_cast<unsigned char>(byte);
-        result.push_back(static_cast<wchar_t>(value < 0x80 ? value : 0xDC00 + value));
+        result.push_back(wide_from_byte(byte));
     }
 }
 

@@ -29,6 +29,12 @@ private:
     char m_short[512];
 };
 
+// The value that stands for a byte that belongs to no character.
+constexpr wchar_t wide_from_byte(char byte) {
+    const auto value = static_cast<unsigned char>(byte);
+    return static_cast<wchar_t>(value < 0x80 ? value : 0xDC00 + value);
+}
+
 // The wide text that file_name_from_wide leads back to the same bytes. Should a name not be UTF-8, each of
 // its bytes from 0x80 on becomes a value from 0xDC80 on.
 std::wstring wide_from_file_name(std::string_view name);

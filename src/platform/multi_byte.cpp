@@ -40,16 +40,16 @@ int answer(std::size_t needed, int room) {
 // Writes a text's bytes as far as they fit, by whole pieces, and answers how many there are.
 std::size_t narrow_to(std::wstring_view text, char* destination, std::size_t room) {
     constexpr std::size_t PIECE = 64;
-    char bytes[PIECE * MB_LEN_MAX];
+    char bytes[(PIECE + 1) * MB_LEN_MAX];
     std::size_t count = 0;
+    std::mbstate_t state{};
     while (!text.empty()) {
-        const std::wstring_view piece = text.substr(0, PIECE);
-        const auto length = static_cast<std::size_t>(active_code_page().narrow_to(piece, bytes) - bytes);
+        const char* const end = active_code_page().narrow_piece(text, PIECE, bytes, state);
+        const auto length = static_cast<std::size_t>(end - bytes);
         if (count + length <= room) {
             std::memcpy(destination + count, bytes, length);
         }
         count += length;
-        text.remove_prefix(piece.size());
     }
     return count;
 }

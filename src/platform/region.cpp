@@ -107,16 +107,16 @@ int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {
     const auto* const first = result != nullptr ? object_of<Region>(a) : nullptr;
     const auto* const second = first == nullptr || mode == RGN_COPY ? first : object_of<Region>(b);
     if (second == nullptr) {
-        return ERROR;
+        return RGN_ERROR;
     }
     if (mode < RGN_AND || mode > RGN_COPY) {
         SetLastError(ERROR_INVALID_PARAMETER);
-        return ERROR;
+        return RGN_ERROR;
     }
     Area combined;
     if (!combine(&combined.bands, bands_of(*first), bands_of(*second), mode)) {
         SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-        return ERROR;
+        return RGN_ERROR;
     }
     std::swap(combined.bands, result->area.bands);
     return kind_of_area(&result->area.bands);
@@ -130,11 +130,11 @@ BOOL PtInRegion(HRGN region, int x, int y) {
 int GetRgnBox(HRGN region, RECT* box) {
     const auto* const found = object_of<Region>(region);
     if (found == nullptr) {
-        return ERROR;
+        return RGN_ERROR;
     }
     if (box == nullptr) {
         SetLastError(ERROR_INVALID_PARAMETER);
-        return ERROR;
+        return RGN_ERROR;
     }
     pixman_region32_t* const bands = bands_of(*found);
     const int kind = kind_of_area(bands);

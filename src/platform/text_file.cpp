@@ -1,28 +1,30 @@
 #include "src/platform/text_file.h"
 
 #include <fcntl.h>
+#include <sys/resource.h>
 #include <sys/single_threaded.h>
 #include <unistd.h>
 
 #include <cerrno>
 #include <cstring>
 #include <mutex>
+#include <optional>
 #include <string>
 
 #include "src/platform/code_page.h"
 #include "src/platform/file_name.h"
+#include "src/platform/file_size_signal.h"
 #include "src/platform/out_of_memory.h"
 
 namespace basalt::platform {
 
 namespace {
 
-// Bytes that are no text cannot be told in another encoding, so such a name is left as it is.
+// Bytes that are no text cannot be told in another encoding, so they are left as they are.
 std::string system_name(const char* path) {
-    const std::wstring wide = widen(path);
-    const bool is_text = wide.find(REPLACEMENT_CHARACTER) == std::wstring::npos;
     std::string name;
-    return is_text && file_name_from_wide(wide, name) ? name : path;
+    file_name_from_wide(active_code_page().widen_name(path), name);
+    return name;
 }
 
 }  // namespace
@@ -53,21 +55,25 @@ void TextFile::write(std::wstring_view text) noexcept {
         guard.lock();
     }
     std::size_t before = m_size;
+    std::mbstate_t state{};
     while (!text.empty()) {
-        const std::wstring_view piece = text.substr(0, PIECE);
-        char* end = m_bytes + m_size;
-        const std::size_t done = code_page.narrow_lines_to(piece, end);
+        char* const end = code_page.narrow_line_piece(text, PIECE, m_bytes + m_size, state);
         m_size = static_cast<std::size_t>(end - m_bytes);
         while (m_size > BUFFER) {
             send(before > 0 ? before : m_size);
             before = 0;
         }
-        text.remove_prefix(done < piece.size() ? text.size() : done);
     }
 }
 
 // Takes bytes off the front of the buffer and gives them to the system.
 void TextFile::send(std::size_t count) noexcept {
+    // Asking whether there is a limit takes a quarter of the calls that holding its signal back takes.
+    std::optional<FileSizeSignalHeld> held;
+    rlimit limit{};
+    if (::getrlimit(RLIMIT_FSIZE, &limit) != 0 || limit.rlim_cur != RLIM_INFINITY) {
+        held.emplace();
+    }
     for (std::size_t sent = 0; sent < count;) {
         const ssize_t taken = ::write(m_file, m_bytes + sent, count - sent);
         if (taken > 0) {

@@ -17,8 +17,8 @@ class TextFile {
 public:
     // Created, or emptied when it exists. What is written goes to the file's end as it then is, so two
     // objects on one file do not overwrite each other. A child process does not inherit it. The path is
-    // narrow text in the active code page, either separator; one with bytes that are no character of it goes
-    // to the system as it is. Null for a file that cannot be opened, and for want of memory.
+    // narrow text in the active code page, either separator; bytes that are no character of it go to the
+    // system as they are. Null for a file that cannot be opened, and for want of memory.
     static std::unique_ptr<TextFile> open(const char* path) noexcept;
     // Sends the buffer out and closes the file.
     ~TextFile();
@@ -42,7 +42,7 @@ private:
     int m_file = -1;
     Lock m_lock;
     std::size_t m_size = 0;
-    char m_bytes[BUFFER + PIECE * MB_LEN_MAX];  // with room behind the buffer for any piece
+    char m_bytes[BUFFER + (PIECE + 1) * MB_LEN_MAX];  // with room behind the buffer for any piece
 };
 
 }  // namespace basalt::platform

@@ -50,33 +50,27 @@ TEST(DefaultPalette, IsMadeOfBasicColoursHuesAndGreys) {
     for (unsigned char i = 0; i < 9; ++i) {
         EXPECT_EQ(palette[i], basic[i]);
     }
-    // A hue's full colour at five levels, each followed by one whose channels are halfway to the leading one.
-    const int levels[5][2] = {{255, 255}, {204, 204}, {152, 153}, {127, 127}, {76, 76}};
+    // From red to yellow, green, cyan, blue, magenta and back: one channel leads, and a second one goes up or
+    // down by quarters of it. Each of five levels comes in the full colour and, after it, with the other
+    // channels halfway to the leading one, all cut to whole numbers.
+    const struct {
+        int leading, moving;  // places of the channels' bits
+    } sixths[] = {{0, 8}, {8, 0}, {8, 16}, {16, 8}, {16, 0}, {0, 16}};
     for (int group = 0; group < 24; ++group) {
-        for (int level = 0; level < 5; ++level) {
-            const auto at = static_cast<unsigned char>(9 + 10 * group + 2 * level);
-            const std::uint32_t full = palette[at];
-            const std::uint32_t pale = palette[static_cast<unsigned char>(at + 1)];
-            int leading = 0;
+        const auto [leading, moving] = sixths[group / 4];
+        const int quarters = group / 4 % 2 == 0 ? group % 4 : 4 - group % 4;
+        const int levels[] = {255, 204, group < 4 ? 153 : 152, 127, 76};
+        for (int i = 0; i < 5; ++i) {
+            const auto at = static_cast<unsigned char>(9 + 10 * group + 2 * i);
             for (const int shift : {0, 8, 16}) {
-                leading = std::max(leading, channel(full, shift));
-            }
-            EXPECT_GE(leading, levels[level][0]) << group;
-            EXPECT_LE(leading, levels[level][1]) << group;
-            for (const int shift : {0, 8, 16}) {
-                // Channels were cut from exact shares of the level, which loses up to one each.
-                EXPECT_NEAR(channel(pale, shift), (channel(full, shift) + leading) / 2.0, 1.0) << group;
+                const int level = levels[i];
+                const int rise = shift == moving ? level * quarters / 4 : 0;
+                const int full = shift == leading ? level : rise;
+                EXPECT_EQ(channel(palette[at], shift), full) << "number " << int{at};
+                EXPECT_EQ(channel(palette[static_cast<unsigned char>(at + 1)], shift), (full + level) / 2)
+                    << "number " << at + 1;
             }
         }
-        // Red leads, then green, then blue, and the hue goes round in steps of a quarter of a channel's rise.
-        const std::uint32_t hue = palette[static_cast<unsigned char>(9 + 10 * group)];
-        const int rise[] = {0, 63, 127, 191, 255};
-        const int within = group % 4;
-        const bool rising = group / 4 % 2 == 0;
-        const int moving = rising ? rise[within] : rise[4 - within];
-        const int leads = (group + 4) / 8 % 3 * 8;
-        EXPECT_EQ(channel(hue, leads), 255) << group;
-        EXPECT_EQ(static_cast<int>(hue & 0xFF) + channel(hue, 8) + channel(hue, 16), 255 + moving) << group;
     }
     const int greys[] = {0, 51, 91, 132, 173, 214};
     for (unsigned i = 0; i < 6; ++i) {

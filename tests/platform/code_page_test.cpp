@@ -133,7 +133,7 @@ TEST(CodePage, single_and_double_byte_encodings) {
         return std::system(command.c_str()) != -1 && std::filesystem::exists(folder / charmap / "LC_CTYPE");
     };
     const bool made = make("ISO-8859-15") && make("EUC-JP") && make("BIG5-HKSCS") && make("SHIFT_JISX0213") &&
-                      make("TCVN5712-1");
+                      make("TCVN5712-1") && make("TSCII");
     // In a process of its own, since the C library keeps some memory for each locale opened by LOCPATH.
     const auto convert = [&] {
         setenv("LOCPATH", folder.c_str(), 1);
@@ -153,6 +153,18 @@ TEST(CodePage, single_and_double_byte_encodings) {
         EXPECT_EQ(vietnamese.widen("ba"), L"ba");
         EXPECT_EQ(vietnamese.widen("\0a\0"s), L"\0a\0"s);
         EXPECT_EQ(vietnamese.narrow(L"ba\x65E5"), "ba?");
+        EXPECT_EQ(CodePage("TSCII").widen("C\xD6\xEC"), L"C\xBB2\xBC1\xB95\xBCD") << "longer than its bytes";
+        // However a text is cut into pieces.
+        const std::wstring text = L"\xCA\x304z\xCA\x416\xCA\xD800\xCA\x30C\xCA";
+        for (std::size_t most = 1; most <= text.size(); ++most) {
+            char bytes[100];
+            char* end = bytes;
+            std::mbstate_t state{};
+            for (std::wstring_view left = text; !left.empty();) {
+                end = hong_kong.narrow_piece(left, most, end, state);
+            }
+            EXPECT_EQ(std::string(bytes, end), hong_kong.narrow(text)) << most;
+        }
         std::_Exit(testing::Test::HasFailure() ? 1 : 0);
     };
     if (made) {

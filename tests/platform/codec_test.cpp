@@ -1,6 +1,7 @@
 #include "src/platform/codec.h"
 
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <unistd.h>
 
 #include <cstdio>
@@ -10,6 +11,7 @@
 #include <string>
 
 #include "tests/platform/drawing_support.h"
+#include "tests/support/failing_new.h"
 
 namespace {
 
@@ -100,7 +102,7 @@ TEST_F(CodecTest, WritesFilesThatHoldThePicture) {
             ASSERT_EQ(save(canvas.bitmap(), name), Gdiplus::Ok);
             const BmpFile bmp(path);
             const std::uint32_t colours = depth <= 8 ? 1U << depth : 0;
-            const std::uint32_t image = static_cast<std::uint32_t>((width * depth + 31) / 32 * 4 * 3);
+            const auto image = static_cast<std::uint32_t>((width * depth + 31) / 32 * 4 * 3);
             EXPECT_EQ(bmp.field(0, 2), 0x4D42U);
             EXPECT_EQ(bmp.size(), 54 + colours * 4 + image) << "an older, longer file is cut";
             EXPECT_EQ(bmp.field(2, 4), bmp.size());
@@ -132,6 +134,36 @@ TEST_F(CodecTest, LeavesNoFileWhereNoneCanBeWritten) {
         EXPECT_EQ(GetLastError(), ERROR_DISK_FULL);
         EXPECT_TRUE(std::filesystem::exists("/dev/full")) << "a device is not deleted";
     }
+    EXPECT_TRUE(std::filesystem::is_empty(m_folder));
+}
+
+// The signal of the limit would end the process.
+TEST_F(CodecTest, LeavesNoFileBeyondTheLimitOnFileSizes) {
+    const Canvas canvas(600, 300, 24);
+    rlimit before = {};
+    getrlimit(RLIMIT_FSIZE, &before);
+    const rlimit limit = {100000, before.rlim_max};
+    setrlimit(RLIMIT_FSIZE, &limit);
+    const Gdiplus::Status status = save(canvas.bitmap(), file(L"picture.bmp"));
+    setrlimit(RLIMIT_FSIZE, &before);
+    EXPECT_EQ(status, Gdiplus::Win32Error);
+    EXPECT_EQ(GetLastError(), ERROR_FILE_TOO_LARGE);
+    EXPECT_TRUE(std::filesystem::is_empty(m_folder));
+    EXPECT_EQ(save(canvas.bitmap(), file(L"picture.bmp")), Gdiplus::Ok);
+}
+
+TEST_F(CodecTest, SaysThatMemoryForTheNameIsMissing) {
+    const Canvas canvas(2, 2, 24);
+    GpBitmap* image = nullptr;
+    ASSERT_EQ(GdipCreateBitmapFromHBITMAP(canvas.bitmap(), nullptr, &image), Gdiplus::Ok);
+    const std::wstring name = file(L"p\u00EEcture.bmp");
+    Gdiplus::Status status = Gdiplus::Ok;
+    {
+        const FailAllocation failure(1);
+        EXPECT_NO_THROW(status = GdipSaveImageToFile(image, name.c_str(), &m_encoder.Clsid, nullptr));
+    }
+    EXPECT_EQ(status, Gdiplus::OutOfMemory);
+    EXPECT_EQ(GdipDisposeImage(image), Gdiplus::Ok);
     EXPECT_TRUE(std::filesystem::is_empty(m_folder));
 }
 

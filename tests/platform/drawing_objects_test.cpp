@@ -121,6 +121,21 @@ TEST(Wrapper, OwnsOneHandle) {
     EXPECT_FALSE(dc.DeleteDC());
 }
 
+TEST(Wrapper, OfTheStockBitmapIsWholeAgainAfterItsEnd) {
+    CDC dc;
+    dc.CreateCompatibleDC(nullptr);
+    CBitmap bitmap;
+    bitmap.CreateBitmap(2, 2, 1, 8, nullptr);
+    EXPECT_TRUE(dc.SelectObject(&bitmap)->DeleteObject());  // stock objects stay
+    CDC other;
+    other.CreateCompatibleDC(nullptr);
+    CBitmap second;
+    second.CreateBitmap(2, 2, 1, 8, nullptr);
+    CBitmap* const before = other.SelectObject(&second);
+    ASSERT_NE(before, nullptr);
+    EXPECT_NE(other.SelectObject(before), nullptr);
+}
+
 TEST(Handle, OfAnotherKindOrADeletedObjectIsRefusedEverywhere) {
     HDC const dc = CreateCompatibleDC(nullptr);
     HBITMAP const bitmap = CreateBitmap(2, 2, 1, 32, nullptr);
@@ -170,9 +185,9 @@ TEST(Handle, OfAnotherKindOrADeletedObjectIsRefusedEverywhere) {
         }
         if (handle != region) {
             auto* const no_region = static_cast<HRGN>(handle);
-            EXPECT_EQ(CombineRgn(region, region, no_region, RGN_OR), ERROR);
-            EXPECT_EQ(CombineRgn(no_region, region, region, RGN_OR), ERROR);
-            EXPECT_EQ(GetRgnBox(no_region, &box), ERROR);
+            EXPECT_EQ(CombineRgn(region, region, no_region, RGN_OR), RGN_ERROR);
+            EXPECT_EQ(CombineRgn(no_region, region, region, RGN_OR), RGN_ERROR);
+            EXPECT_EQ(GetRgnBox(no_region, &box), RGN_ERROR);
             EXPECT_EQ(EqualRgn(region, no_region) + PtInRegion(no_region, 0, 0), 0);
         }
     }

@@ -1,6 +1,7 @@
 #include "basalt/util/file_logger.h"
 
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 
 #include <csignal>
 #include <cstdlib>
@@ -131,6 +132,15 @@ TEST_F(FileLog, opening_closes_first_whatever_the_new_path) {
     EXPECT_EQ(contents(folder / "second"), "second");
 }
 
+TEST_F(FileLog, separators_are_told_in_names_that_are_no_text) {
+    for (const char* const name : {"caf\xE9", "half \xE2\x82", "a real \xEF\xBF\xBD"}) {
+        FileLogger log((folder.string() + '\\' + name).c_str());
+        log.Write(L"text");
+        log.Close();
+        EXPECT_EQ(contents(folder / name), "text") << name;
+    }
+}
+
 TEST_F(FileLog, has_one_owner) {
     EXPECT_FALSE(std::is_copy_constructible_v<FileLogger>);
     EXPECT_FALSE(std::is_copy_assignable_v<FileLogger>);
@@ -232,6 +242,22 @@ TEST_F(FileLog, full_disk_is_silent) {
     EXPECT_EQ(contents(file), "still usable");
 }
 
+TEST_F(FileLog, limit_on_file_sizes_is_silent) {
+    constexpr rlim_t LIMIT = 20'000;
+    const auto log_beyond_it = [&] {
+        const rlimit limit = {LIMIT, LIMIT};
+        setrlimit(RLIMIT_FSIZE, &limit);
+        FileLogger log(file.c_str());
+        for (int i = 0; i < 1000; ++i) {
+            write_line(log, 'a', i);
+        }
+        log.Close();
+        std::_Exit(fs::file_size(file) == LIMIT ? 0 : 1);
+    };
+    GTEST_FLAG_SET(death_test_style, "fast");
+    EXPECT_EXIT(log_beyond_it(), testing::ExitedWithCode(0), "");
+}
+
 TEST_F(FileLog, opening_without_memory_is_silent_and_leaves_no_file_open) {
     const auto open_files = [] {
         return std::distance(fs::directory_iterator("/proc/self/fd"), fs::directory_iterator());
@@ -257,11 +283,20 @@ TEST_F(FileLog, opening_without_memory_is_silent_and_leaves_no_file_open) {
 TEST_F(FileLog, follows_the_environments_encoding) {
     struct Row {
         const char* charmap;
-        std::string name, expected;
+        std::string name, name_on_disk;
+        std::wstring text;
+        std::string expected;
     };
+    const std::wstring most_of_a_piece(255, L'x');
     GTEST_FLAG_SET(death_test_style, "threadsafe");
-    for (const Row& row : {Row{"ISO-8859-15", "caf\xE9", "\xA4 \xE9 ? ?\r\n"},
-                           Row{"EUC-JP", "caf\x8F\xAB\xB1", "? \x8F\xAB\xB1 \xC6\xFC ?\r\n"}}) {
+    for (const Row& row :
+         {Row{"ISO-8859-15", "caf\xE9", "caf\xC3\xA9", L"\x20AC \xE9 \x65E5 \xD800\n", "\xA4 \xE9 ? ?\r\n"},
+          Row{"EUC-JP", "caf\x8F\xAB\xB1\\\xC6", "caf\xC3\xA9/\xC6", L"\x20AC \xE9 \x65E5 \xD800\n",
+              "? \x8F\xAB\xB1 \xC6\xFC ?\r\n"},
+          // A letter at the end of what is converted at once waits for its mark, or for nothing.
+          Row{"BIG5-HKSCS", "log", "log",
+              most_of_a_piece + L"\xCA\x304\n" + most_of_a_piece.substr(2) + L"\xCA\nz\xCA",
+              std::string(255, 'x') + "\x88\x62\r\n" + std::string(253, 'x') + "\x88\x66\r\nz\x88\x66"}}) {
         const fs::path locales = folder.parent_path() / ("basalt_log_locale_"s + row.charmap);
         const std::string command =
             "localedef -c -i POSIX -f "s + row.charmap + " '" + locales.string() + "/test' >/dev/null 2>&1";
@@ -270,10 +305,11 @@ TEST_F(FileLog, follows_the_environments_encoding) {
         const auto log_in_that_locale = [&] {
             setenv("LOCPATH", locales.c_str(), 1);
             setenv("LC_ALL", "test", 1);
+            fs::create_directories((folder / row.name_on_disk).parent_path());
             FileLogger log((folder.string() + "/" + row.name).c_str());
-            log.Write(L"\x20AC \xE9 \x65E5 \xD800\n");
+            log.Write(row.text.c_str());
             log.Close();
-            const bool right = contents(folder / "caf\xC3\xA9") == row.expected;
+            const bool right = contents(folder / row.name_on_disk) == row.expected;
             fs::remove_all(folder);  // of the test that runs again in this process
             std::_Exit(right ? 0 : 1);
         };

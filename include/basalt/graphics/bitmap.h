@@ -19,8 +19,8 @@ namespace vex_util::mfc {
 /// @param bitmap the bitmap, not selected into a context; it stays the caller's
 /// @param fileName path, UTF-8 on this system
 ///
-/// Bad input: nothing is reported. A handle that is no bitmap leaves no file; what becomes of a file that
-/// cannot be written is the system's affair.
+/// Bad input: nothing is reported. A handle that is no bitmap leaves the name as it is; a file that cannot be
+/// written to its end, for a full disk or a limit on file sizes, is deleted again.
 BASALT_API void DumpBitmap(HBITMAP bitmap, const CString& fileName);
 
 /// Reads a bitmap's pixels in its own depth, top row first.
@@ -52,8 +52,9 @@ BASALT_API bool RotateBitmap(CDC* dc, CBitmap* bitmap, float angle);
 /// colour
 /// @param bitmap the bitmap
 /// @param transparentColour 0x00BBGGRR, the high byte plays no part. At 32 bits a pixel whose unused byte is
-/// not 0 is of no colour; at 16 the colour is brought to 5 bits a channel first, and a pixel whose unused bit
-/// is set is of no colour; at other depths the colours of the pixels are compared.
+/// not 0 is of no colour; at 16 the colour is brought to the nearest of 5 bits a channel first, as drawing in
+/// it does, and a pixel whose unused bit is set is of no colour; at other depths the colours of the pixels
+/// are compared.
 /// @return false, and the region stays as it is, when it holds one already, the colour exceeds 32 bits, the
 /// bitmap cannot be read or no region can be made
 ///

@@ -18,8 +18,8 @@
 /// @param transparentColour the colour left out, 0x00BBGGRR
 /// @return with code 5 or more the result of ::TransparentBlt, which does it all and stretches where the
 /// sizes differ. With 2 to 4 always 0: wSrc x hSrc pixels are combined by masks, wDest and hDest play no
-/// part, and without memory for the masks nothing is drawn. Below 2 the result of ::BitBlt with SRCAND from
-/// the source's origin: only the destination's rectangle plays a part.
+/// part, and without memory for the masks or a source that can be read nothing is drawn. Below 2 the result
+/// of ::BitBlt with SRCAND from the source's origin: only the destination's rectangle plays a part.
 BASALT_API int _transparentblt(HDC dest, int xDest, int yDest, int wDest, int hDest, HDC src, int xSrc,
                                int ySrc, int wSrc, int hSrc, unsigned int transparentColour);
 

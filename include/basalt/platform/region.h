@@ -10,7 +10,7 @@
 
 /// @name What a region is, as its calls answer
 /// @{
-inline constexpr int ERROR = 0;          ///< the call failed
+inline constexpr int RGN_ERROR = 0;      ///< the call failed; its other name, ERROR, is left to the host
 inline constexpr int NULLREGION = 1;     ///< empty
 inline constexpr int SIMPLEREGION = 2;   ///< one rectangle
 inline constexpr int COMPLEXREGION = 3;  ///< more than one rectangle
@@ -36,7 +36,7 @@ BASALT_API HRGN CreateRectRgn(int left, int top, int right, int bottom);
 /// @param destination takes the result; as before when the call fails
 /// @param a,b the two; b is not looked at for RGN_COPY
 /// @param mode one of the ways above
-/// @return what the result is; ERROR for a wrong handle or mode, or a lack of memory
+/// @return what the result is; RGN_ERROR for a wrong handle or mode, or a lack of memory
 BASALT_API int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode);
 
 /// Whether a pixel is in a region: 1 or 0; 0 for a wrong handle.
@@ -45,11 +45,10 @@ BASALT_API BOOL PtInRegion(HRGN region, int x, int y);
 /// The smallest rectangle around a region.
 /// @param region the region
 /// @param[out] box takes the rectangle; all zero for the empty region
-/// @return what the region is; ERROR for a wrong handle or a null pointer
+/// @return what the region is; RGN_ERROR for a wrong handle or a null pointer
 BASALT_API int GetRgnBox(HRGN region, RECT* box);
 
-/// Whether two regions hold the same pixels, however they came about: 1 or 0; ERROR, which is 0, for a
-/// wrong handle.
+/// Whether two regions hold the same pixels, however they came about: 1 or 0; 0 for a wrong handle.
 BASALT_API BOOL EqualRgn(HRGN a, HRGN b);
 /// @}
 

@@ -22,8 +22,8 @@ namespace vex_util {
 /// so whatever else happens to the process, and whoever else appends to the file, each text shorter than the
 /// buffer is in it whole or not at all.
 ///
-/// Failures are silent: what cannot be opened stays closed, and what cannot be written, on a full disk, is
-/// lost.
+/// Failures are silent: what cannot be opened stays closed, and what cannot be written, on a full disk or
+/// beyond the limit on file sizes, is lost; the text in which the room ends is cut there.
 /// Threads: Write() from any number of threads, each text whole; Open() and Close() from one alone.
 class BASALT_API FileLogger {
 public:
@@ -39,8 +39,8 @@ public:
     FileLogger& operator=(const FileLogger&) = delete;
 
     /// Closes the log, then opens a file, created or emptied.
-    /// @param path in the active code page, either separator; null, empty or a file that cannot be opened
-    /// leaves the log closed
+    /// @param path in the active code page, either separator; bytes that are no character of it are kept.
+    /// Null, empty or a file that cannot be opened leaves the log closed
     void Open(const char* path);
     /// Writes what is buffered and closes the file; nothing when the log is closed.
     void Close();

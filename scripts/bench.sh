@@ -40,3 +40,4 @@ for subject in "${subjects[@]}"; do
     python3 scripts/bench_table.py "build/bench/$subject".*.json
     [ ${#page[@]} -eq 0 ] || python3 scripts/bench_table.py "${page[@]}" "$subject" "build/bench/$subject".*.json
 done
+[ ${#page[@]} -eq 0 ] || scripts/sizes.sh "${page[@]}"

@@ -1,0 +1,47 @@
+#!/usr/bin/env bash
+# Prints how large the library is, and a static program that uses one family: bytes of code and constants, of data,
+# and of data that begins as zero, stripped; programs beyond what the empty one has.
+# Usage: scripts/sizes.sh [--page PAGE]          also writes the table between the page's marks
+set -euo pipefail
+. "$(dirname "$0")/packages.sh"
+show_help "$@"
+
+need_packages "${BUILD_PACKAGES[@]}" python3
+work=build/sizes
+mkdir -p $work
+for kind in ON OFF; do
+    cmake -S . -B $work/$kind -G Ninja -DCMAKE_BUILD_TYPE=Release -DBUILD_SHARED_LIBS=$kind -DBASALT_BUILD_TESTS=OFF \
+        -DBASALT_BUILD_EXAMPLES=OFF >$work/log
+    cmake --build $work/$kind --target basalt >>$work/log || { cat $work/log; exit 1; }
+done
+
+program() {  # name, headers, statement: a program whose library parts are linked in
+    printf '%s\nint main(int count, char**) { %s }\n' "$2" "$3" >"$work/$1.cpp"
+    # shellcheck disable=SC2046  # the flags are words
+    g++ -std=c++17 -O2 -Iinclude -I$work/OFF/include "$work/$1.cpp" -o "$work/$1" -Wl,--gc-sections -s \
+        $work/OFF/src/libbasalt.a $(pkg-config --libs pixman-1)
+}
+sections() { size "$1" | awk 'NR == 2 { print $1, $2, $3 }'; }
+
+program empty '' 'return count;'
+program geo '#include <basalt/geo.h>' 'return (int)geo_vincenty_distance({0.1 * count, 0, 0}, {0.2, 0, 0});'
+program memory '#include <basalt/memory.h>' 'vex_lib::vlWinHeapAllocator heap(0); return heap.Alloc(count) == nullptr;'
+program sparse '#include <basalt/sparse.h>' 'vex_util::Sparse2DArray array(8, 16, 64); return array.Find(count, 0) != nullptr;'
+program util '#include <basalt/util.h>' 'return basalt::IsHexString(std::string(count, 48)) ? 0 : 1;'
+program files '#include <basalt/files.h>' 'return vex_util::CFilePath(CString(L"a.b")).IsFile() ? count : 0;'
+program graphics '#include <basalt/graphics.h>' 'return ColorPalette().FindClosestColor(count);'
+
+{
+    echo "| what | code and constants | data | zeroed data |"
+    echo "|---|---:|---:|---:|"
+    strip -o $work/stripped.so $work/ON/src/libbasalt.so
+    read -r code data zeroed <<<"$(sections $work/stripped.so)"
+    printf "| the shared library | %'d | %'d | %'d |\n" "$code" "$data" "$zeroed"
+    read -r code0 data0 zeroed0 <<<"$(sections $work/empty)"
+    for name in geo memory sparse util files graphics; do
+        read -r code data zeroed <<<"$(sections $work/$name)"
+        printf "| a static program of \`%s\` | %'d | %'d | %'d |\n" $name $((code - code0)) $((data - data0)) $((zeroed - zeroed0))
+    done
+} >$work/table
+cat $work/table
+[ "${1:-}" != --page ] || python3 scripts/bench_table.py --page "$2" sizes --text "$(cat $work/table)"

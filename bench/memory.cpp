@@ -8,13 +8,13 @@
 #endif
 
 #include <algorithm>
-#include <atomic>
 #include <condition_variable>
 #include <cstddef>
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
 #include <ctime>
+#include <memory>
 #include <memory_resource>
 #include <mutex>
 #include <random>
@@ -93,9 +93,10 @@ void chunk_exchange(benchmark::State& state) {
 // 16 to 512 bytes, 10,000 alive for each thread, in random order; the threads share the allocator.
 template <class Allocator>
 void small_mix(benchmark::State& state) {
-    static Allocator* s_allocator;
+    // Lives until the next run: a thread that ends still gives its share of a synchronized pool back.
+    static std::unique_ptr<Allocator> s_allocator;
     if (state.thread_index() == 0) {
-        s_allocator = new Allocator;
+        s_allocator = std::make_unique<Allocator>();
     }
     struct Draw {
         std::uint32_t place, size;
@@ -120,12 +121,6 @@ void small_mix(benchmark::State& state) {
         if (block != nullptr) {
             s_allocator->free(block, size);
         }
-    }
-    // The threads leave the loop together, but not this function.
-    static std::atomic<int> s_done = 0;
-    if (++s_done == state.threads()) {
-        s_done = 0;
-        delete s_allocator;
     }
 }
 

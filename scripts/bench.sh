@@ -34,7 +34,7 @@ for subject in "${subjects[@]}"; do
     for round in $(seq "$rounds"); do
         "build/bench/bench/bench_$subject" --benchmark_min_time="${MIN_TIME:-0.05}" \
             --benchmark_enable_random_interleaving=true --benchmark_out="build/bench/$subject.$round.json" \
-            --benchmark_out_format=json >build/bench/run.log
+            --benchmark_out_format=json >build/bench/run.log 2>&1 || { cat build/bench/run.log; exit 1; }
     done
     printf '\n### %s\n\n' "$subject"
     python3 scripts/bench_table.py "build/bench/$subject".*.json

@@ -62,26 +62,30 @@ def ratios(rounds, row, who):
 
 
 def table(rounds):
-    lines = ["| row | basalt | peer | its figure | ratio | lowest to highest | limit | times the limit |",
-             "|---|---:|---|---:|---:|---|---|---:|"]
-    for row, figures in rounds[0].items():
-        counters = figures["basalt"][1]
-        label = row + "".join(f"; {name} {number(value)}" for name, value in counters.items())
-        ours = number(median_of(rounds, row, "basalt"))
+    first = rounds[0]
+    counters = list(dict.fromkeys(name for figures in first.values() for name in figures["basalt"][1]))
+    has_peers = any(len(figures) > 1 for figures in first.values())
+    heads = ["row", "basalt", *(name.replace("_", " ") for name in counters)]
+    if has_peers:
+        heads += ["peer", "its figure", "ratio", "lowest to highest", "limit", "times the limit"]
+    lines = ["| " + " | ".join(heads) + " |", "|---|" + "---:|" * (len(heads) - 1)]
+    for row, figures in first.items():
+        own = [row, number(median_of(rounds, row, "basalt"))]
+        own += [number(figures["basalt"][1][name]) if name in figures["basalt"][1] else "" for name in counters]
         limits = [who for who in figures if who.startswith(LIMIT)]
-        limit = " | | "
+        peers = [who for who in figures if who != "basalt" and who not in limits]
+        limit = ["", ""]
         if limits:
             times = statistics.median(1 / r for r in ratios(rounds, row, limits[0]))
-            limit = f" | {limits[0].removeprefix(LIMIT)} {number(median_of(rounds, row, limits[0]))} | {times:.2f} "
-        peers = [who for who in figures if who != "basalt" and who not in limits]
+            limit = [f"{limits[0].removeprefix(LIMIT)} {number(median_of(rounds, row, limits[0]))}", f"{times:.2f}"]
         for who in peers or [None]:
-            told = " | | | "
+            told = ["", "", "", ""]
             if who:
                 seen = ratios(rounds, row, who)
-                told = f" {who} | {number(median_of(rounds, row, who))} | "
-                told += f"{statistics.median(seen):.2f} | {min(seen):.2f} to {max(seen):.2f}" if seen else " | "
-            lines.append(f"| {label} | {ours} |{told}{limit}|")
-            limit = " | | "
+                told = [who, number(median_of(rounds, row, who)), f"{statistics.median(seen):.2f}",
+                        f"{min(seen):.2f} to {max(seen):.2f}"]
+            lines.append("| " + " | ".join(own + (told + limit if has_peers else [])) + " |")
+            limit = ["", ""]
     return "\n".join(lines)
 
 

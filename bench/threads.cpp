@@ -1,5 +1,5 @@
-// Two threads on two arrays and on one, beside a hash map under a lock. A row's time is that of one operation
-// of one thread; where threads do not hold each other up, two of them cost no more than one.
+// Two threads on two arrays and on one, beside a hash map under a lock. A row's time is the wall's, shared
+// out over the operations of all threads: where they do not hold each other up, two take half of one's.
 #include <benchmark/benchmark.h>
 
 #include <array>

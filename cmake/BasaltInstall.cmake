@@ -1,30 +1,32 @@
-# The package: headers, library, find_package(basalt) and basalt.pc.
+# The package: headers, library, find_package(basalt) and basalt.pc. Three components: the run-time library, what is
+# needed to build against it, and an archive alone, which joins a shared library's package.
 include(GNUInstallDirs)
 include(CMakePackageConfigHelpers)
 
 install(TARGETS basalt EXPORT basalt-targets
-  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
-  ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR}
+  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT runtime NAMELINK_COMPONENT development
+  ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT archive
   INCLUDES DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
-install(DIRECTORY ${PROJECT_SOURCE_DIR}/include/basalt DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
-install(FILES ${PROJECT_BINARY_DIR}/include/basalt/version.h DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/basalt)
+install(DIRECTORY ${PROJECT_SOURCE_DIR}/include/basalt DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} COMPONENT development)
+install(FILES ${PROJECT_BINARY_DIR}/include/basalt/version.h
+  DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/basalt COMPONENT development)
 
 # A static archive leaves its own dependencies to whoever links it.
 if(BUILD_SHARED_LIBS)
   set(basalt_static_dependencies "")
-  set(pc_requires "")
-  set(pc_static_libs "")
+  set(pc_requires "Requires.private: pixman-1")
+  set(pc_static_libs "\nLibs.private: -lstdc++ -lm")
 else()
   set(basalt_static_dependencies "include(CMakeFindDependencyMacro)
 find_dependency(PkgConfig)
 pkg_check_modules(PIXMAN REQUIRED IMPORTED_TARGET GLOBAL pixman-1)
 ")
   set(pc_requires "Requires: pixman-1")
-  set(pc_static_libs "-lstdc++ -lm")
+  set(pc_static_libs " -lstdc++ -lm")
 endif()
 
 set(config_dir ${CMAKE_INSTALL_LIBDIR}/cmake/basalt)
-install(EXPORT basalt-targets NAMESPACE basalt:: DESTINATION ${config_dir})
+install(EXPORT basalt-targets NAMESPACE basalt:: DESTINATION ${config_dir} COMPONENT development)
 configure_package_config_file(cmake/basalt-config.cmake.in ${PROJECT_BINARY_DIR}/basalt-config.cmake
   INSTALL_DESTINATION ${config_dir})
 # Before 1.0 a minor version may change the interface.
@@ -32,7 +34,7 @@ write_basic_package_version_file(${PROJECT_BINARY_DIR}/basalt-config-version.cma
   COMPATIBILITY SameMinorVersion)
 install(FILES ${PROJECT_BINARY_DIR}/basalt-config.cmake ${PROJECT_BINARY_DIR}/basalt-config-version.cmake
   cmake/BasaltVersionResource.cmake cmake/version_resource.cpp.in
-  DESTINATION ${config_dir})
+  DESTINATION ${config_dir} COMPONENT development)
 
 # The installed tree may be moved as a whole: basalt.pc finds the rest from where it stands, as the CMake package does.
 set(pc_libdir "${CMAKE_INSTALL_FULL_LIBDIR}")
@@ -46,4 +48,12 @@ if(NOT IS_ABSOLUTE "${CMAKE_INSTALL_LIBDIR}" AND NOT IS_ABSOLUTE "${CMAKE_INSTAL
   set(pc_includedir "\${prefix}/${CMAKE_INSTALL_INCLUDEDIR}")
 endif()
 configure_file(cmake/basalt.pc.in ${PROJECT_BINARY_DIR}/basalt.pc @ONLY)
-install(FILES ${PROJECT_BINARY_DIR}/basalt.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
+install(FILES ${PROJECT_BINARY_DIR}/basalt.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT development)
+
+if(BASALT_BUILD_DOCS)
+  install(DIRECTORY ${PROJECT_BINARY_DIR}/docs/html
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/basalt COMPONENT documentation OPTIONAL)
+endif()
+if(BASALT_IS_TOP_LEVEL)
+  include(cmake/BasaltPackages.cmake)
+endif()

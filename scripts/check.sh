@@ -1,10 +1,11 @@
 #!/usr/bin/env bash
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
-# locale, a system short of everything, results to the bit, the package, exported symbols, sanitizers,
+# locale, a system short of everything, results to the bit, the package, exported symbols, hardening and
+# the same bytes from another folder, sanitizers,
 # documentation, twenty seconds of each fuzzer (FUZZ_SECONDS=N: longer).
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
-#        format includes clang headers tidy elsewhere limits package symbols exact asan tsan docs fuzz
+#        format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan docs fuzz
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
@@ -33,6 +34,18 @@ installed=build/package/library-ON/src  # what the package step built
 step_symbols() {
     [ -d $installed ] || step_package
     scripts/check_symbols.sh $installed/libbasalt.so
+}
+step_hardening() {
+    [ -d $installed ] || step_package
+    # once more from another folder
+    local again=build/again
+    rm -rf $again
+    mkdir -p $again/basalt
+    git ls-files -z | xargs -0 cp --parents -t $again/basalt
+    cmake -S $again/basalt -B $again/build -G Ninja -DCMAKE_BUILD_TYPE=Release -DBUILD_SHARED_LIBS=ON \
+        -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF
+    cmake --build $again/build --target basalt
+    scripts/check_hardening.sh $installed/libbasalt.so $again/build/src/libbasalt.so
 }
 step_exact() {
     # one number folded from thousands of results: whoever compiles it, and as the optimised library gives it
@@ -80,7 +93,7 @@ if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit 
 fi
 steps=("$@")
 if [ ${#steps[@]} -eq 0 ]; then
-    steps=(format includes clang headers tidy elsewhere limits package symbols exact asan tsan docs fuzz)
+    steps=(format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan docs fuzz)
 fi
 need_packages "${BUILD_PACKAGES[@]}" "${TEST_PACKAGES[@]}" "${CHECK_PACKAGES[@]}"
 mkdir -p build

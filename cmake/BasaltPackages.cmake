@@ -1,0 +1,39 @@
+# Debian packages, made by cpack: the library, what is needed to build against it, and its documentation.
+# scripts/packages_debian.sh makes all of them, the static archive included, and the source archive.
+set(CPACK_PACKAGE_NAME basalt)
+set(CPACK_PACKAGE_CONTACT "The basalt authors <basalt@localhost>")
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "${PROJECT_DESCRIPTION}")
+set(CPACK_PACKAGE_VERSION "${PROJECT_VERSION}")
+set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
+set(CPACK_GENERATOR DEB)
+set(CPACK_STRIP_FILES ON)
+set(CPACK_DEB_COMPONENT_INSTALL ON)
+set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
+set(CPACK_DEBIAN_PACKAGE_RELEASE 1)
+set(CPACK_DEBIAN_PACKAGE_PRIORITY optional)
+
+# The run-time package is named after the soname, so that two interfaces can be installed beside each other.
+get_target_property(basalt_soversion basalt SOVERSION)
+set(CPACK_DEBIAN_RUNTIME_PACKAGE_NAME "libbasalt${basalt_soversion}")
+set(CPACK_DEBIAN_RUNTIME_PACKAGE_SECTION libs)
+set(CPACK_DEBIAN_RUNTIME_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_RUNTIME_PACKAGE_GENERATE_SHLIBS ON)
+set(CPACK_DEBIAN_RUNTIME_PACKAGE_GENERATE_SHLIBS_POLICY ">=")
+set(CPACK_COMPONENT_RUNTIME_DESCRIPTION "Runtime library for surveying and machine control
+ Survey geometry and geodesy, a sparse grid store, allocators on mapped memory,
+ logs, paths, colours and bitmaps.")
+
+set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_NAME libbasalt-dev)
+set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_SECTION libdevel)
+set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS
+  "${CPACK_DEBIAN_RUNTIME_PACKAGE_NAME} (= ${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE}), libpixman-1-dev")
+set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION "Headers and archives of basalt
+ What a program needs to be built against the basalt runtime library.")
+
+set(CPACK_DEBIAN_DOCUMENTATION_PACKAGE_NAME basalt-doc)
+set(CPACK_DEBIAN_DOCUMENTATION_PACKAGE_SECTION doc)
+set(CPACK_DEBIAN_DOCUMENTATION_PACKAGE_ARCHITECTURE all)
+set(CPACK_COMPONENT_DOCUMENTATION_DESCRIPTION "Reference and guides of basalt
+ The reference pages and guides of the basalt runtime library, for a browser.")
+
+include(CPack)

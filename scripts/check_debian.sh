@@ -1,0 +1,59 @@
+#!/usr/bin/env bash
+# Installs the Debian packages in a clean system of their own, builds outside programs against them there (found by
+# CMake; by pkg-config with a bare compiler line, shared and static; as a subproject of the source archive), removes
+# the packages, and sees that nothing stays behind. As root, or through sudo; the system is fetched once, from where
+# this one gets its packages, and kept in build/debian-root.
+# Usage: scripts/check_debian.sh
+set -euo pipefail
+. "$(dirname "$0")/packages.sh"
+show_help "$@"
+
+need_packages debootstrap
+as_root=()
+[ "$(id -u)" = 0 ] || as_root=(sudo)
+root=$PWD/build/debian-root
+if [ ! -f "$root/ready" ]; then
+    # shellcheck source=/dev/null
+    suite=$(. /etc/os-release && echo "$VERSION_CODENAME")
+    mirror=$(apt-get indextargets --format '$(SITE)' 'Created-By: Packages' | grep -v security | head -n 1)
+    "${as_root[@]}" debootstrap --variant=minbase \
+        --include=ca-certificates,cmake,g++,libpixman-1-dev,ninja-build,pkg-config "$suite" "$root" "$mirror" \
+        >build/debian-root.log 2>&1 || { tail -n 20 build/debian-root.log; exit 1; }
+    "${as_root[@]}" touch "$root/ready"
+fi
+scripts/debian_packages.sh
+"${as_root[@]}" rm -rf "$root/work"
+"${as_root[@]}" mkdir "$root/work"
+"${as_root[@]}" cp -r build/debian/*.deb build/debian/*.tar.gz tests/package "$root/work/"
+
+# Everything below runs inside, offline.
+"${as_root[@]}" chroot "$root" bash -euo pipefail -s <<'INSIDE'
+cd /work
+files() { find / -xdev \( -path /work -o -path /proc -o -path /var/lib/dpkg -o -path /var/log -o -path /var/cache \) \
+    -prune -o -print | sort; }
+files >before
+dpkg -i ./*.deb >install.log 2>&1 || { cat install.log; exit 1; }
+ldconfig -p | grep -q 'libbasalt\.so' || { echo "the loader does not know the library"; exit 1; }
+
+configure() { cmake -S "$1" -B "$2" -G Ninja -DCMAKE_BUILD_TYPE=Release "${@:3}" && cmake --build "$2"; }
+mkdir source
+tar -xf basalt-*.tar.gz -C source --strip-components=1
+{
+    configure package/find_package found
+    configure package/subdirectory sub -DBASALT_SOURCE_DIR=/work/source
+    # shellcheck disable=SC2046  # the flags are words
+    g++ -std=c++17 package/consumer.cpp -o bare $(pkg-config --cflags --libs basalt)
+    # shellcheck disable=SC2046
+    g++ -std=c++17 package/consumer.cpp -o bare-static $(pkg-config --cflags basalt) -l:libbasalt.a \
+        $(pkg-config --static --libs-only-l basalt | sed 's/-lbasalt//')
+} >build.log 2>&1 || { tail -n 40 build.log; exit 1; }
+for program in found/consumer sub/consumer ./bare ./bare-static; do
+    "$program" || { echo "$program failed"; exit 1; }
+done
+! ldd bare-static | grep -q basalt || { echo "the static program asks for the shared library"; exit 1; }
+
+dpkg --purge $(dpkg-query -W -f '${Package}\n' '*basalt*') >remove.log 2>&1 || { cat remove.log; exit 1; }
+files >after
+diff before after || { echo "files stay behind"; exit 1; }
+echo "installed, four programs built and run, removed: nothing stays behind"
+INSIDE

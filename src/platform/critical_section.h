@@ -10,10 +10,10 @@
 #include <cstdint>
 #include <new>
 
-#include "src/platform/lock.h"
+#include "src/platform/leaning_lock.h"
 
 struct CRITICAL_SECTION {
-    basalt::platform::Lock lock;
+    basalt::platform::LeaningLock lock;
     std::atomic<const void*> owner{nullptr};
     std::uint32_t depth = 0;  // entries of the owner; touched by the owner alone
 };

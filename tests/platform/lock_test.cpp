@@ -1,10 +1,12 @@
 #include "src/platform/lock.h"
+#include "src/platform/leaning_lock.h"
 
 #include <gtest/gtest.h>
 #include <sys/syscall.h>
 
 #include <atomic>
 #include <cerrno>
+#include <chrono>
 #include <cstdarg>
 #include <mutex>
 #include <thread>
@@ -12,6 +14,7 @@
 
 namespace {
 
+using basalt::platform::LeaningLock;
 using basalt::platform::Lock;
 
 constinit Lock before_any_constructor;
@@ -75,6 +78,104 @@ TEST_P(LockTest, LetsOneThreadInAtATimeAndWakesTheSleepers) {
     EXPECT_EQ(refused, THREADS * ROUNDS) << "not recursive";
     EXPECT_TRUE(before_any_constructor.try_lock());
     before_any_constructor.unlock();
+}
+
+// Entries in a row after which a thread is the favourite for sure, whatever came before.
+constexpr int LONG_RUN = 100'000;
+
+void enter_alone(LeaningLock& lock, int times) {
+    for (int i = 0; i < times; ++i) {
+        const std::lock_guard guard(lock);
+    }
+}
+
+TEST_P(LockTest, FavouriteAndOthersAreNeverInsideTogether) {
+    // Each lock ends its favour once at the start and a few times later; the race is in that moment.
+    for (int round = 0; round < 100; ++round) {
+        LeaningLock lock;
+        std::atomic<bool> others_wait{false};
+        std::atomic<int> left{2};
+        long counter = 0;
+        long entered[2] = {};
+        std::thread favourite([&] {
+            enter_alone(lock, LONG_RUN / 50);
+            others_wait = true;
+            while (left != 0) {
+                const std::lock_guard guard(lock);
+                counter = counter + 1;
+                ++entered[0];
+            }
+        });
+        while (!others_wait) {
+            std::this_thread::yield();
+        }
+        for (; left != 0; --left) {
+            const std::lock_guard guard(lock);
+            counter = counter + 1;
+            ++entered[1];
+        }
+        favourite.join();
+        ASSERT_EQ(counter, entered[0] + entered[1]) << "round " << round;
+    }
+}
+
+TEST_P(LockTest, EveryThreadCanBecomeTheFavouriteInTurn) {
+    LeaningLock lock;
+    long counter = 0;
+    constexpr int THREADS = 8;  // more than a lock has favourites in its life
+    for (int i = 0; i < THREADS; ++i) {
+        std::thread([&] {
+            enter_alone(lock, LONG_RUN);
+            const std::lock_guard guard(lock);
+            ++counter;
+        }).join();
+    }
+    EXPECT_EQ(counter, THREADS);
+}
+
+TEST_P(LockTest, WhoeverWaitsForAFavouriteAsleepInsideIsWoken) {
+    LeaningLock lock;
+    std::atomic<bool> inside{false};
+    std::atomic<bool> left{false};
+    std::thread favourite([&] {
+        enter_alone(lock, LONG_RUN);
+        const std::lock_guard guard(lock);
+        inside = true;
+        std::this_thread::sleep_for(std::chrono::milliseconds(30));  // the other is long past spinning
+        left = true;
+    });
+    while (!inside) {
+        std::this_thread::yield();
+    }
+    {
+        const std::lock_guard guard(lock);
+        EXPECT_TRUE(left);
+    }
+    favourite.join();
+}
+
+// A process may lose the call between the favour and its end, by a filter of system calls.
+TEST(LeaningLockTest, FavourEndsAlsoWhereTheBarrierHasGoneMeanwhile) {
+    LeaningLock lock;
+    std::atomic<bool> inside{false};
+    std::atomic<bool> left{false};
+    std::thread favourite([&] {
+        enter_alone(lock, LONG_RUN);
+        const std::lock_guard guard(lock);
+        without_barrier = true;
+        inside = true;
+        std::this_thread::sleep_for(std::chrono::milliseconds(30));
+        left = true;
+    });
+    while (!inside) {
+        std::this_thread::yield();
+    }
+    {
+        const std::lock_guard guard(lock);
+        EXPECT_TRUE(left);
+    }
+    favourite.join();
+    without_barrier = false;
 }
 
 INSTANTIATE_TEST_SUITE_P(WithAndWithoutBarrier, LockTest, testing::Bool());

@@ -1,0 +1,56 @@
+#include "src/platform/leaning_lock.h"
+
+#include "src/platform/waiting.h"
+
+namespace basalt::platform {
+
+void LeaningLock::enter_as_any(std::uintptr_t self) noexcept {
+    m_lock.lock();
+    if (m_favour.load(std::memory_order_relaxed) != 0) {
+        end_favour();
+    }
+    m_inside = nullptr;
+    if (self != m_last) {
+        m_last = self;
+        m_run = 0;
+    } else if (++m_run == m_wanted) {
+        favour(self);
+    }
+}
+
+void LeaningLock::favour(std::uintptr_t self) noexcept {
+    const ErrnoKept kept;
+    m_run = 0;
+    // Also a trial of the barrier: without one there can be no favourite.
+    if (m_turn == TURNS || !barrier_on_all_threads()) {
+        return;
+    }
+    m_favour.store(self | m_turn, std::memory_order_relaxed);
+    ++m_turn;
+    m_wanted *= 4;  // threads that take turns end favours less and less often
+}
+
+void LeaningLock::end_favour() noexcept {
+    const ErrnoKept kept;
+    Word& inside = m_words[m_favour.load(std::memory_order_relaxed) & TURN_BITS];
+    m_favour.store(0, std::memory_order_relaxed);
+    const timespec* period = nullptr;
+    if (!barrier_on_all_threads()) {
+        // It was there when the favour was given. No processor holds a store back for as long as this.
+        nanosleep(&ONE_MILLISECOND, nullptr);
+        period = &ONE_MILLISECOND;
+    }
+    for (int spin = 0; spin < SPINS && inside.load(std::memory_order_acquire) != 0; ++spin) {
+        relax();
+    }
+    while (inside.load(std::memory_order_acquire) != 0) {
+        sleep_on(inside, 1, period);
+    }
+}
+
+void LeaningLock::wake(Word& inside) noexcept {
+    const ErrnoKept kept;
+    wake_one_on(inside);
+}
+
+}  // namespace basalt::platform

@@ -4,14 +4,8 @@
 #include <cstring>
 #include <limits>
 
-#include "src/platform/pages.h"
-
 namespace vex_util {
 namespace {
-
-using basalt::platform::LARGE_PAGE;
-
-constexpr std::size_t CACHE_LINE = 64;
 
 // A new slab adds an eighth to what is there: few slabs, little idle room.
 constexpr std::size_t GROWTH_DIVISOR = 8;
@@ -32,30 +26,18 @@ void BlockPool::AddSlab() {
         throw std::bad_alloc();
     }
     const std::size_t blockBytes = BlockBytes();
-    std::size_t bytes = std::max(blockBytes, m_bytes / GROWTH_DIVISOR);
-    std::align_val_t alignment{CACHE_LINE};
-    const bool large = bytes >= LARGE_PAGE / 4;
-    if (large) {
-        // Page faults on ordinary pages would cost more than everything an insertion does.
-        bytes = (bytes + LARGE_PAGE - 1) & ~(LARGE_PAGE - 1);
-        alignment = std::align_val_t{LARGE_PAGE};
-    }
     if (m_slabs.size() == m_slabs.capacity()) {
         m_slabs.reserve(2 * m_slabs.size() + 8);
     }
-    void* const memory = ::operator new[](bytes, alignment);
-    if (large) {
-        basalt::platform::prefer_large_pages(static_cast<std::byte*>(memory), bytes);
-    }
-    m_slabs.push_back({memory, bytes, alignment});
-    m_next = static_cast<char*>(memory);
-    m_left = bytes / blockBytes;
-    m_bytes += bytes;
+    const Slab& slab = m_slabs.emplace_back(std::max(blockBytes, m_bytes / GROWTH_DIVISOR));
+    m_next = slab.Begin();
+    m_left = slab.Bytes() / blockBytes;
+    m_bytes += slab.Bytes();
 }
 
 Block BlockPool::TakeReserved() noexcept {
     const std::size_t bytes = BlockBytes();
-    char* const memory = m_next;
+    std::byte* const memory = m_next;
     std::memset(memory, 0, bytes);
     m_next += bytes;
     --m_left;
@@ -63,9 +45,6 @@ Block BlockPool::TakeReserved() noexcept {
 }
 
 void BlockPool::Clear() noexcept {
-    for (const Slab& slab : m_slabs) {
-        ::operator delete[](slab.memory, slab.alignment);
-    }
     m_slabs.clear();
     m_next = nullptr;
     m_left = 0;

@@ -4,9 +4,10 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <new>
 #include <utility>
 #include <vector>
+
+#include "src/sparse/slab.h"
 
 namespace vex_util {
 
@@ -26,7 +27,7 @@ struct Block {
 class BlockPool {
 public:
     explicit BlockPool(std::size_t cellsPerBlock) noexcept : m_cellsPerBlock(cellsPerBlock) {}
-    ~BlockPool() { Clear(); }
+    ~BlockPool() = default;
     BlockPool(const BlockPool&) = delete;
     BlockPool& operator=(const BlockPool&) = delete;
 
@@ -53,18 +54,12 @@ public:
     }
 
 private:
-    struct Slab {
-        void* memory;
-        std::size_t bytes;
-        std::align_val_t alignment;
-    };
-
     std::size_t BlockBytes() const noexcept;
     void AddSlab();
 
     std::size_t m_cellsPerBlock;
-    char* m_next = nullptr;  // the newest slab's first byte not handed out
-    std::size_t m_left = 0;  // blocks that still fit there
+    std::byte* m_next = nullptr;  // the newest slab's first byte not handed out
+    std::size_t m_left = 0;       // blocks that still fit there
     std::size_t m_bytes = 0;
     std::vector<Slab> m_slabs;
 };

@@ -1,5 +1,6 @@
 #include "src/sparse/element_pool.h"
 
+#include <algorithm>
 #include <limits>
 #include <new>
 
@@ -11,7 +12,14 @@ void ElementPool::AddChunk() {
     if (m_elementsPerChunk > std::numeric_limits<std::size_t>::max() / m_elementSize) {
         throw std::bad_alloc();
     }
-    m_chunks.push_back(nullptr);  // room in the list first: what follows must not have to be undone
+    // Room in the lists first: what follows must not have to be undone.
+    const std::size_t slots = (m_chunks.size() + 1) * m_elementsPerChunk;
+    if (slots > FreeRoom()) {
+        // Nothing to take over: no slot is free when a chunk is wanted.
+        m_freeMemory = Slab(std::max(slots, 2 * FreeRoom()) * sizeof(void*));
+        m_free = reinterpret_cast<void**>(m_freeMemory.Begin());
+    }
+    m_chunks.push_back(nullptr);
     void* const chunk = vex_lib::vlSharedMemoryHeap::Alloc(m_elementSize * m_elementsPerChunk);
     if (chunk == nullptr) {
         m_chunks.pop_back();
@@ -26,7 +34,9 @@ void ElementPool::Clear() noexcept {
         vex_lib::vlSharedMemoryHeap::Free(chunk);
     }
     m_chunks.clear();
+    m_freeMemory = {};
     m_free = nullptr;
+    m_freeCount = 0;
     m_unused = 0;
 }
 

@@ -44,12 +44,11 @@ void SparseContents::CheckInvariants() const {
 
 void ElementPool::CheckInvariants(std::size_t taken,
                                   const std::unordered_set<const void*>& takenSlots) const {
-    std::size_t free = 0;
-    for (void* slot = m_free; slot != nullptr; std::memcpy(&slot, slot, sizeof slot)) {
-        require(!takenSlots.contains(slot), "no slot is both free and in a cell");
-        require(++free <= m_chunks.size() * m_elementsPerChunk, "the free list ends");
+    for (std::size_t i = 0; i < m_freeCount; ++i) {
+        require(!takenSlots.contains(m_free[i]), "no slot is both free and in a cell");
     }
-    require(free + m_unused + taken == m_chunks.size() * m_elementsPerChunk,
+    require(m_chunks.size() * m_elementsPerChunk <= FreeRoom(), "there is room to free every slot");
+    require(m_freeCount + m_unused + taken == m_chunks.size() * m_elementsPerChunk,
             "every slot is free or in one cell");
 }
 

@@ -1,0 +1,61 @@
+// Memory of the sparse array in large pieces.
+#ifndef BASALT_SRC_SPARSE_SLAB_H
+#define BASALT_SRC_SPARSE_SLAB_H
+
+#include <cstddef>
+#include <limits>
+#include <new>
+#include <utility>
+
+#include "src/platform/pages.h"
+
+namespace vex_util {
+
+inline constexpr std::size_t CACHE_LINE = 64;
+
+// So many bytes or more on a cache line's boundary, on large pages where they fill one to a fair part: faults
+// on ordinary pages would cost more than everything an insertion does. Untouched, and without memory of its
+// own until it is used.
+class Slab {
+public:
+    Slab() noexcept = default;
+    // Throws std::bad_alloc.
+    explicit Slab(std::size_t bytes) : m_bytes(bytes) {
+        using namespace basalt::platform;
+        if (bytes > std::numeric_limits<std::ptrdiff_t>::max()) {
+            throw std::bad_alloc();
+        }
+        if (bytes >= LARGE_PAGE / 4) {
+            m_bytes = (bytes + LARGE_PAGE - 1) & ~(LARGE_PAGE - 1);
+            m_alignment = std::align_val_t{LARGE_PAGE};
+        }
+        m_begin = static_cast<std::byte*>(::operator new[](m_bytes, m_alignment));
+        if (bytes >= LARGE_PAGE / 4) {
+            prefer_large_pages(m_begin, m_bytes);
+        }
+    }
+    ~Slab() { ::operator delete[](m_begin, m_alignment); }
+    Slab(Slab&& other) noexcept { Swap(other); }
+    Slab& operator=(Slab&& other) noexcept {
+        Slab(std::move(other)).Swap(*this);
+        return *this;
+    }
+
+    std::byte* Begin() const noexcept { return m_begin; }
+    std::size_t Bytes() const noexcept { return m_bytes; }
+
+private:
+    void Swap(Slab& other) noexcept {
+        std::swap(m_begin, other.m_begin);
+        std::swap(m_bytes, other.m_bytes);
+        std::swap(m_alignment, other.m_alignment);
+    }
+
+    std::byte* m_begin = nullptr;
+    std::size_t m_bytes = 0;
+    std::align_val_t m_alignment{CACHE_LINE};
+};
+
+}  // namespace vex_util
+
+#endif

@@ -1,4 +1,6 @@
 // Selection by rectangle and the visits.
+#include <algorithm>
+
 #include "src/sparse/sparse_array_storage.h"
 
 namespace vex_util {
@@ -7,6 +9,12 @@ namespace {
 // Elements lie in as many runs as a block has rows, where the processor's own guess of what comes next fails:
 // they are asked of the memory this many cells ahead.
 constexpr std::size_t CELLS_AHEAD = 32;
+
+void ask_for(const void* element) {
+    if (element != nullptr) {
+        __builtin_prefetch(element);
+    }
+}
 
 // A callback may fill or empty cells ahead of it, so each word of bits is read again after each call; it may
 // clear or assign the array, which the generation tells, and then the block is gone.
@@ -20,6 +28,9 @@ bool visit_block(const Storage& storage, std::size_t identifier,
     const std::size_t words = contents.FilledWords();
     const BlockGrid grid = contents.Grid();
     const std::size_t cells = grid.CellsPerBlock();
+    for (std::size_t cell = 0; cell < std::min(cells, CELLS_AHEAD); ++cell) {
+        ask_for(listed.block.cells[cell]);
+    }
     for (std::size_t word = 0; word < words; ++word) {
         std::uint64_t bits = filled[word];
         while (bits != 0) {
@@ -27,8 +38,7 @@ bool visit_block(const Storage& storage, std::size_t identifier,
             const std::size_t cell = word * 64 + static_cast<std::size_t>(bit);
             const void* const element = listed.block.cells[cell];
             if (cell + CELLS_AHEAD < cells) {
-                const void* const ahead = listed.block.cells[cell + CELLS_AHEAD];
-                __builtin_prefetch(ahead != nullptr ? ahead : element);
+                ask_for(listed.block.cells[cell + CELLS_AHEAD]);
             }
             if (!visit(grid.X(listed.key, cell), grid.Y(listed.key, cell), element, context) ||
                 storage.generation != generation) {

@@ -5,6 +5,7 @@
 #include <benchmark/benchmark.h>
 
 #include <algorithm>
+#include <array>
 #include <atomic>
 #include <cstddef>
 #include <cstdint>
@@ -15,7 +16,7 @@
 
 namespace bench {
 
-/// The least a lock can be: one locked operation and a store.
+/// The least a lock can be that any thread may take next: one locked operation and a store.
 class Floor {
 public:
     void lock() {
@@ -41,25 +42,41 @@ inline void lock_pairs(benchmark::State& state, int count) {
     }
 }
 
-/// A pair of it and one look at a record of 32 bytes a turn, the records in order or not.
-inline void locked_looks(benchmark::State& state, std::size_t records, bool in_order) {
-    constexpr std::size_t DOUBLES = 4;
-    std::vector<double> memory(records * DOUBLES, 1.0);
-    std::vector<std::uint32_t> order(records);
+using Bytes32 = std::array<double, 4>;
+
+struct Read {
+    using Item = Bytes32;
+    double sum = 0;
+    void operator()(Item& item) { sum += item[2]; }
+};
+struct Write {
+    using Item = Bytes32;
+    double next = 0;
+    void operator()(Item& item) {
+        next += 1;
+        item = {next, next, next, next};
+    }
+};
+struct Clear {
+    using Item = void*;
+    void operator()(Item& item) { item = nullptr; }
+};
+
+/// One item's work a turn, the items in order or not.
+template <class Work>
+void each_of(benchmark::State& state, std::vector<typename Work::Item> items, bool in_order, Work work) {
+    std::vector<std::uint32_t> order(items.size());
     std::iota(order.begin(), order.end(), 0U);
     if (!in_order) {
         std::shuffle(order.begin(), order.end(), std::mt19937(5));
     }
-    Floor floor;
-    double sum = 0;
     std::size_t at = 0;
     for ([[maybe_unused]] auto _ : state) {
-        floor.lock();
-        sum += memory[order[at] * DOUBLES];
-        benchmark::DoNotOptimize(sum);
-        floor.unlock();
-        at = at + 1 == records ? 0 : at + 1;
+        work(items[order[at]]);
+        benchmark::DoNotOptimize(work);
+        at = at + 1 == items.size() ? 0 : at + 1;
     }
+    benchmark::DoNotOptimize(items.data());
 }
 
 inline void copying(benchmark::State& state, std::size_t bytes) {

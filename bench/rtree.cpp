@@ -1,5 +1,5 @@
-// The R-tree beside Boost.Geometry's: the same blocks, the same windows, the results compared before any
-// timing.
+// The R-tree beside those of Boost.Geometry and libspatialindex, with the same split and the same entries a
+// node: the same blocks, the same windows, the results compared before any timing.
 #include <benchmark/benchmark.h>
 
 #include <algorithm>
@@ -21,6 +21,11 @@
 #include <boost/geometry.hpp>
 #include <boost/geometry/index/rtree.hpp>
 #pragma GCC diagnostic pop
+#endif
+
+#if __has_include(<spatialindex/SpatialIndex.h>)
+#define HAVE_SPATIALINDEX 1
+#include <spatialindex/SpatialIndex.h>
 #endif
 
 namespace {
@@ -164,23 +169,149 @@ void boost_window(benchmark::State& state, bool packed) {
     }
 }
 
-void compare_results() {
-    const BoostTree peer = boost_tree(false);
+#endif
+
+#if HAVE_SPATIALINDEX
+namespace si = SpatialIndex;
+
+si::Region region(const Block& b) {
+    const double low[2] = {static_cast<double>(b.min[0]), static_cast<double>(b.min[1])};
+    const double high[2] = {static_cast<double>(b.max[0]), static_cast<double>(b.max[1])};
+    return {low, high, 2};
+}
+
+class SpatialTree {
+public:
+    explicit SpatialTree(const std::vector<Block>& blocks) {
+        si::id_type own = 0;
+        m_tree.reset(si::RTree::createNewRTree(*m_storage, 0.5, 8, 8, 2, si::RTree::RV_QUADRATIC, own));
+        si::id_type id = 0;
+        for (const Block& b : blocks) {
+            m_tree->insertData(0, nullptr, region(b), id++);
+        }
+    }
+    void search(const Block& q, std::vector<int>& found) const {
+        found.clear();
+        Collector collector(found);
+        m_tree->intersectsWithQuery(region(q), collector);
+    }
+
+private:
+    class Collector : public si::IVisitor {
+    public:
+        explicit Collector(std::vector<int>& ids) : m_ids(ids) {}
+        void visitNode(const si::INode&) override {}
+        void visitData(const si::IData& data) override {
+            m_ids.push_back(static_cast<int>(data.getIdentifier()));
+        }
+        void visitData(std::vector<const si::IData*>&) override {}
+
+    private:
+        std::vector<int>& m_ids;
+    };
+
+    std::unique_ptr<si::IStorageManager> m_storage{si::StorageManager::createNewMemoryStorageManager()};
+    std::unique_ptr<si::ISpatialIndex> m_tree;
+};
+
+void spatial_insert(benchmark::State& state) {
+    const auto blocks = shuffled_blocks(static_cast<int>(state.range(0)));
+    for (auto _ : state) {
+        SpatialTree tree(blocks);
+        benchmark::DoNotOptimize(tree);
+    }
+}
+
+const SpatialTree& spatial_stored() {
+    static const SpatialTree tree(shuffled_blocks(STORED));
+    return tree;
+}
+
+void spatial_window(benchmark::State& state) {
+    const auto queries = windows(STORED, static_cast<int>(state.range(0)), static_cast<int>(state.range(1)));
+    const SpatialTree& tree = spatial_stored();
+    std::vector<int> found;
+    std::size_t i = 0;
+    for (auto _ : state) {
+        tree.search(queries[i++ % queries.size()], found);
+        benchmark::DoNotOptimize(found.data());
+    }
+}
+#endif
+
+// What no tree beats: what a window finds stands side by side and is tested and written.
+void limit_window(benchmark::State& state) {
+    struct Found {
+        Block query;
+        std::vector<std::pair<Block, int>> hits;
+    };
+    const auto blocks = shuffled_blocks(STORED);
+    std::vector<Found> answers;
+    std::vector<int> found;
+    for (const Block& q :
+         windows(STORED, static_cast<int>(state.range(0)), static_cast<int>(state.range(1)))) {
+        stored().Search(q.min, q.max, found);
+        answers.push_back({q, {}});
+        for (const int id : found) {
+            answers.back().hits.emplace_back(blocks[static_cast<std::size_t>(id)], id);
+        }
+    }
+    std::size_t i = 0;
+    for (auto _ : state) {
+        const auto& [q, hits] = answers[i++ % answers.size()];
+        found.resize(hits.size());
+        std::size_t count = 0;
+        for (const auto& [b, id] : hits) {
+            found[count] = id;
+            count += static_cast<std::size_t>((b.min[0] <= q.max[0]) & (b.max[0] >= q.min[0]) &
+                                              (b.min[1] <= q.max[1]) & (b.max[1] >= q.min[1]));
+        }
+        benchmark::DoNotOptimize(found.data());
+        benchmark::ClobberMemory();
+    }
+}
+
+// What no insertion into a growing tree of such nodes beats: a look at one node on each level, each of which
+// tells the next, and the entry written. Nodes hold 5.6 entries, as in a tree that was split at random.
+void limit_insert(benchmark::State& state) {
+    using vex_util::rtree::Node;
+    constexpr double FILL = 5.6;
+    const auto count = static_cast<std::size_t>(state.range(0));
+    std::vector<Node> nodes(static_cast<std::size_t>(static_cast<double>(count) / FILL) + 1, Node{});
+    for (auto _ : state) {
+        for (std::size_t i = 1; i <= count; ++i) {
+            const double leaves = static_cast<double>(i) / FILL;
+            std::size_t at = 0;
+            std::size_t told = i * 0x9E3779B97F4A7C15U;
+            for (double level = 1; level < leaves;) {
+                level = std::min(level * FILL, leaves);
+                at = static_cast<std::size_t>(level * static_cast<double>(told >> 32) * 0x1p-32);
+                told += static_cast<std::size_t>(nodes[at].count);
+                told *= 0x9E3779B97F4A7C15U;
+            }
+            nodes[at].slot[i % 8] = static_cast<std::uint32_t>(i);
+        }
+        benchmark::DoNotOptimize(nodes.data());
+    }
+}
+
+template <class Search>
+void require_same(const char* peer, Search search) {
     for (const auto& [across, down] : {std::pair{5, 2}, {40, 25}}) {
         for (const Block& q : windows(STORED, across, down)) {
-            std::vector<int> ours, theirs;
+            std::vector<int> ours;
+            std::vector<int> theirs;
             stored().Search(q.min, q.max, ours);
-            boost_search(peer, q, theirs);
+            search(q, theirs);
             std::sort(ours.begin(), ours.end());
             std::sort(theirs.begin(), theirs.end());
             if (ours != theirs || ours.size() != static_cast<std::size_t>(across * down)) {
-                std::fprintf(stderr, "the trees disagree: %zu and %zu hits\n", ours.size(), theirs.size());
+                std::fprintf(stderr, "%s disagrees: %zu and %zu hits\n", peer, ours.size(), theirs.size());
                 std::exit(1);
             }
         }
     }
 }
-#endif
 
 void insert_sizes(benchmark::internal::Benchmark* b) {
     b->Arg(1000)->Arg(10000)->Arg(100000)->Arg(1000000)->Unit(benchmark::kMillisecond);
@@ -188,6 +319,11 @@ void insert_sizes(benchmark::internal::Benchmark* b) {
 
 void window_sizes(benchmark::internal::Benchmark* b) {
     b->ArgNames({"across", "down"})->Args({5, 2})->Args({40, 25});
+}
+
+// A million take libspatialindex ten seconds or so.
+[[maybe_unused]] void small_insert_sizes(benchmark::internal::Benchmark* b) {
+    b->Arg(1000)->Arg(10000)->Arg(100000)->Unit(benchmark::kMillisecond);
 }
 
 BENCHMARK(insert)->Name("insert/basalt")->Apply(insert_sizes);
@@ -199,12 +335,22 @@ BENCHMARK(window)->Name("window/basalt")->Apply(window_sizes);
 BENCHMARK_CAPTURE(boost_window, inserted, false)->Name("window/boost_inserted")->Apply(window_sizes);
 BENCHMARK_CAPTURE(boost_window, packed, true)->Name("window/boost_packed")->Apply(window_sizes);
 #endif
+#if HAVE_SPATIALINDEX
+BENCHMARK(spatial_insert)->Name("insert/spatialindex")->Apply(small_insert_sizes);
+BENCHMARK(spatial_window)->Name("window/spatialindex")->Apply(window_sizes);
+#endif
+BENCHMARK(limit_insert)->Name("insert/limit_one_node_a_level")->Apply(insert_sizes);
+BENCHMARK(limit_window)->Name("window/limit_testing_the_hits")->Apply(window_sizes);
 
 }  // namespace
 
 int main(int argc, char** argv) {
 #if HAVE_BOOST
-    compare_results();
+    const BoostTree peer = boost_tree(false);
+    require_same("boost", [&](const Block& q, auto& found) { boost_search(peer, q, found); });
+#endif
+#if HAVE_SPATIALINDEX
+    require_same("spatialindex", [](const Block& q, auto& found) { spatial_stored().search(q, found); });
 #endif
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();

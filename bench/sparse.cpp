@@ -18,137 +18,17 @@
 #include <utility>
 #include <vector>
 
-#if __has_include(<absl/container/flat_hash_map.h>)
-#define HAVE_ABSEIL 1
-#include <absl/container/flat_hash_map.h>
-#endif
-#if __has_include(<openvdb/openvdb.h>)
-#define HAVE_OPENVDB 1
-#include <openvdb/openvdb.h>
-#endif
-
-#include "basalt/sparse.h"
 #include "bench/limits.h"
 #include "bench/resident_memory.h"
+#include "bench/sparse_stores.h"
 #include "src/sparse/lock.h"
 
 namespace {
 
 using Clock = std::chrono::steady_clock;
 using Cell = std::pair<int, int>;
-using Record = std::array<double, 4>;
-
-Record record_of(int x, int y) {
-    return {static_cast<double>(x), static_cast<double>(y), x + 0.5 * y, 1.0};
-}
-
-struct Basalt {
-    static constexpr const char* NAME = "basalt";
-    void insert(int x, int y, const Record& r) { array.Insert(x, y, r.data()); }
-    double find(int x, int y) {
-        const void* const element = array.Find(x, y);
-        return element == nullptr ? 0 : static_cast<const double*>(element)[2];
-    }
-    bool remove(int x, int y) { return array.Remove(x, y); }
-    template <class Sum>
-    static bool add(int, int, const void* element, const void* context) {
-        *static_cast<Sum*>(const_cast<void*>(context)) += static_cast<const double*>(element)[2];
-        return true;
-    }
-    double visit_all() {
-        double sum = 0;
-        array.IterateAll(add<double>, &sum);
-        return sum;
-    }
-    double visit_window(int x0, int y0, int side) {
-        const int min[2] = {x0, y0};
-        const int max[2] = {x0 + side - 1, y0 + side - 1};
-        array.Select(min, max);
-        double sum = 0;
-        array.IterateSelected(add<double>, &sum);
-        return sum;
-    }
-    vex_util::Sparse2DArray array{sizeof(Record), 16, 64};
-};
-
-#ifdef HAVE_ABSEIL
-// A lock around each call, since ours has one.
-template <class Mutex>
-struct FlatMap {
-    static constexpr const char* NAME = std::is_same_v<Mutex, std::recursive_mutex> ? "absl_locked" : "absl";
-    static std::uint64_t key(int x, int y) {
-        return std::uint64_t{static_cast<std::uint32_t>(x)} << 32 | static_cast<std::uint32_t>(y);
-    }
-    void insert(int x, int y, const Record& r) {
-        const std::lock_guard<Mutex> lock(mutex);
-        map[key(x, y)] = r;
-    }
-    double find(int x, int y) {
-        const std::lock_guard<Mutex> lock(mutex);
-        const auto found = map.find(key(x, y));
-        return found == map.end() ? 0 : found->second[2];
-    }
-    bool remove(int x, int y) {
-        const std::lock_guard<Mutex> lock(mutex);
-        return map.erase(key(x, y)) != 0;
-    }
-    double visit_all() {
-        double sum = 0;
-        for (const auto& [k, r] : map) {
-            sum += r[2];
-        }
-        return sum;
-    }
-    Mutex mutex;
-    absl::flat_hash_map<std::uint64_t, Record> map;
-};
-struct NoMutex {
-    void lock() {}
-    void unlock() {}
-};
-#endif
-
-#ifdef HAVE_OPENVDB
-// The plane folded into the volume's 8 x 8 x 8 leaves, 32 x 16 cells a leaf, so that no leaf is wasted.
-struct Volume {
-    static constexpr const char* NAME = "openvdb";
-    using Tree = openvdb::tree::Tree4<openvdb::Vec4d, 5, 4, 3>::Type;
-    static openvdb::Coord fold(int x, int y) {
-        return {(x >> 5) * 8 + (x & 7), (y >> 4) * 8 + (y & 7), ((x >> 3) & 3) + 4 * ((y >> 3) & 1)};
-    }
-    void insert(int x, int y, const Record& r) { accessor.setValue(fold(x, y), openvdb::Vec4d(r.data())); }
-    double find(int x, int y) {
-        openvdb::Vec4d value;
-        return accessor.probeValue(fold(x, y), value) ? value[2] : 0;
-    }
-    bool remove(int x, int y) {
-        accessor.setValueOff(fold(x, y));
-        return true;
-    }
-    double visit_all() {
-        double sum = 0;
-        for (auto value = tree.cbeginValueOn(); value; ++value) {
-            sum += (*value)[2];
-        }
-        return sum;
-    }
-    double visit_window(int x0, int y0, int side) {
-        double sum = 0;
-        for (int by = y0 >> 4; by <= (y0 + side - 1) >> 4; ++by) {
-            for (int bx = x0 >> 5; bx <= (x0 + side - 1) >> 5; ++bx) {
-                if (const auto* leaf = accessor.probeConstLeaf(openvdb::Coord(bx * 8, by * 8, 0))) {
-                    for (auto value = leaf->cbeginValueOn(); value; ++value) {
-                        sum += (*value)[2];
-                    }
-                }
-            }
-        }
-        return sum;
-    }
-    Tree tree{openvdb::Vec4d(0, 0, 0, 0)};
-    openvdb::tree::ValueAccessor<Tree> accessor{tree};
-};
-#endif
+using bench::Basalt;
+using bench::record_of;
 
 std::vector<Cell> square(int side) {
     std::vector<Cell> cells;
@@ -187,6 +67,16 @@ void require_same(const std::vector<Cell>& cells) {
     }
     if (ours->visit_all() != theirs->visit_all()) {
         std::fprintf(stderr, "%s differs in a visit\n", Store::NAME);
+        std::exit(1);
+    }
+}
+
+void require_same_visits(int side) {
+    auto ours = filled<Basalt>(square(side));
+    const bench::PlainSquare plain(side);
+    if (ours->visit_all() != plain.visit_all() ||
+        ours->visit_window(-20, -3, 21) != plain.visit_window(-20, -3, 21)) {
+        std::fprintf(stderr, "the limit of visits reads other records\n");
         std::exit(1);
     }
 }
@@ -249,7 +139,12 @@ void add_visit_rows() {
     for (const int side : {100, 1000}) {
         const auto cells = square(side);
         const std::string size = " of " + std::to_string(cells.size());
-        const auto store = std::make_shared<std::unique_ptr<Store>>(filled<Store>(cells));
+        const auto store = std::make_shared<std::unique_ptr<Store>>();
+        if constexpr (std::is_constructible_v<Store, int>) {
+            *store = std::make_unique<Store>(side);
+        } else {
+            *store = filled<Store>(cells);
+        }
         add("visit all" + size, Store::NAME, cells.size(), [=] {
             return [=] {
                 double sum = (*store)->visit_all();
@@ -326,14 +221,19 @@ void add_lock_row(const char* who) {
                                  });
 }
 
+// What a call cannot beat: the record read or written and nothing else; of a removal, the cell's pointer
+// cleared.
 void add_limits(std::size_t records) {
-    for (const char* work : {"insert", "find", "remove"}) {
-        for (const bool in_order : {true, false}) {
-            const std::string row = std::string(work) + (in_order ? " row by row" : " at random");
-            benchmark::RegisterBenchmark(
-                (row + "/limit_lock_pair_and_a_look").c_str(),
-                [=](benchmark::State& state) { bench::locked_looks(state, records, in_order); });
-        }
+    for (const bool in_order : {true, false}) {
+        const std::string order = in_order ? " row by row/" : " at random/";
+        const auto limit = [&](const std::string& name, auto work) {
+            benchmark::RegisterBenchmark(name.c_str(), [=](benchmark::State& state) {
+                bench::each_of(state, std::vector<typename decltype(work)::Item>(records), in_order, work);
+            });
+        };
+        limit("insert" + order + "limit_writing_the_record", bench::Write{});
+        limit("find" + order + "limit_reading_the_record", bench::Read{});
+        limit("remove" + order + "limit_clearing_a_pointer", bench::Clear{});
     }
 }
 
@@ -350,19 +250,22 @@ int main(int argc, char** argv) {
     const std::vector<Cell> few(random.begin(), random.begin() + 10000);
     add_store<Basalt>(rows, random, tenth);
 #ifdef HAVE_ABSEIL
-    require_same<FlatMap<std::recursive_mutex>>(few);
-    add_store<FlatMap<std::recursive_mutex>>(rows, random, tenth);
-    add_store<FlatMap<NoMutex>>(rows, random, tenth);
+    require_same<bench::FlatMap<std::recursive_mutex>>(few);
+    add_store<bench::FlatMap<std::recursive_mutex>>(rows, random, tenth);
+    add_store<bench::FlatMap<bench::NoMutex>>(rows, random, tenth);
 #endif
 #ifdef HAVE_OPENVDB
     openvdb::initialize();
-    require_same<Volume>(few);
-    add_store<Volume>(rows, random, tenth);
+    require_same<bench::Volume<std::recursive_mutex>>(few);
+    add_store<bench::Volume<std::recursive_mutex>>(rows, random, tenth);
+    add_store<bench::Volume<bench::NoMutex>>(rows, random, tenth);
 #endif
     add_lock_row<OurLock>("basalt");
-    add_lock_row<bench::Floor>("limit_exchange_and_store");
+    add_lock_row<bench::Floor>("exchange_and_store");
     add_lock_row<std::recursive_mutex>("std_recursive_mutex");
     add_limits(rows.size());
+    require_same_visits(64);
+    add_visit_rows<bench::PlainSquare>();
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();
     return 0;

@@ -1,5 +1,7 @@
 // Observations both ways and spiral coordinates, beside the formulas written out plainly. Before a row is
-// timed, its results for all inputs are compared to the bit.
+// timed, its results for all inputs are compared to the bit. The plain forms stand behind functions with the
+// library's arguments, as a user's own would: compiled into the loop they would have lost a call and had
+// their constants folded.
 #include <benchmark/benchmark.h>
 
 #include <bit>
@@ -8,6 +10,7 @@
 #include <vector>
 
 #include "basalt/geo.h"
+#include "bench/out_of_sight.h"
 #include "tests/geo/plain_forms.h"
 
 namespace {
@@ -34,30 +37,35 @@ struct Scene {
 };
 
 /// The formulas with every step spelled out.
-geo_nee plain_reduce(const geo_hvd& obs, const geo_nee& station) {
-    geo_nee out = {GEO_NULL, GEO_NULL, GEO_NULL};
+void plain_reduce(const geo_hvd& obs, const geo_nee& station, double height, geo_nee& out, double scale) {
     if (obs.horizontal == GEO_NULL || obs.vertical == GEO_NULL || obs.distance == GEO_NULL) {
-        return out;
+        out = {GEO_NULL, GEO_NULL, GEO_NULL};
+        return;
     }
-    const double hd = std::sin(obs.vertical) * obs.distance * SCALE;
+    const double hd = std::sin(obs.vertical) * obs.distance * scale;
     const double dz = std::cos(obs.vertical) * obs.distance;
     out.north = std::cos(obs.horizontal) * hd + station.north;
     out.east = std::sin(obs.horizontal) * hd + station.east;
-    out.elevation = HEIGHT + station.elevation + dz;
-    return out;
+    out.elevation = height + station.elevation + dz;
 }
 
-geo_hvd plain_calculate(const geo_nee& from, const geo_nee& to) {
+void plain_calculate(const geo_nee& from, double from_height, const geo_nee& to, double to_height,
+                     geo_hvd& out, double scale) {
     if (from.north == GEO_NULL || from.east == GEO_NULL || from.elevation == GEO_NULL ||
         to.north == GEO_NULL || to.east == GEO_NULL || to.elevation == GEO_NULL) {
-        return {};
+        return;
     }
     const double north = to.north - from.north;
     const double east = to.east - from.east;
-    const double dz = to.elevation + 0.0 - from.elevation - HEIGHT;
-    const double hd = std::sqrt(east * east + north * north) * SCALE;
-    return {geo_normalised_bearing(std::atan2(east, north)),
-            geo_normalised_bearing(1.5707963267948966 - std::atan2(dz, hd)), std::sqrt(hd * hd + dz * dz)};
+    const double dz = to.elevation + to_height - from.elevation - from_height;
+    const double hd = std::sqrt(east * east + north * north) * scale;
+    out.horizontal = geo_normalised_bearing(std::atan2(east, north));
+    out.vertical = geo_normalised_bearing(1.5707963267948966 - std::atan2(dz, hd));
+    out.distance = std::sqrt(hd * hd + dz * dz);
+}
+
+void plain_deltas(double length, double constant, double tolerance, double& x, double& y) {
+    plain::spiral_deltas(length, constant, tolerance, x, y);
 }
 
 bool same_bits(double a, double b) {
@@ -91,67 +99,50 @@ void run(benchmark::State& state, const std::vector<Input>& inputs, const Work& 
     }
 }
 
-auto reduce(const Scene& scene) {
-    return [&scene](const geo_hvd& obs) {
+auto reduce(decltype(geo_reduce_obs)* function, const Scene& scene) {
+    return [function = bench::out_of_sight(function), &scene](const geo_hvd& obs) {
         geo_nee out;
-        geo_reduce_obs(obs, scene.station, HEIGHT, out, SCALE);
+        function(obs, scene.station, HEIGHT, out, SCALE);
         return out;
     };
 }
 
-auto calculate(const Scene& scene) {
-    return [&scene](const geo_nee& point) {
+auto calculate(decltype(geo_calc_obs)* function, const Scene& scene) {
+    return [function = bench::out_of_sight(function), &scene](const geo_nee& point) {
         geo_hvd out = {};
-        geo_calc_obs(scene.station, HEIGHT, point, 0.0, out, SCALE);
+        function(scene.station, HEIGHT, point, 0.0, out, SCALE);
         return out;
     };
 }
 
-geo_vector deltas(const geo_vector& spiral) {
-    geo_vector out = {};
-    geo_spiral_deltas(spiral.x, spiral.y, spiral.z, out.x, out.y);
-    return out;
+auto deltas(decltype(geo_spiral_deltas)* function) {
+    return [function = bench::out_of_sight(function)](const geo_vector& spiral) {
+        geo_vector out = {};
+        function(spiral.x, spiral.y, spiral.z, out.x, out.y);
+        return out;
+    };
 }
 
-geo_vector plain_deltas(const geo_vector& spiral) {
-    geo_vector out = {};
-    plain::spiral_deltas(spiral.x, spiral.y, spiral.z, out.x, out.y);
-    return out;
+void reduce_row(benchmark::State& state, decltype(geo_reduce_obs)* function) {
+    const Scene scene;
+    run(state, scene.observations, reduce(function, scene), reduce(geo_reduce_obs, scene));
 }
 
-void reduce_basalt(benchmark::State& state) {
+void calculate_row(benchmark::State& state, decltype(geo_calc_obs)* function) {
     const Scene scene;
-    run(state, scene.observations, reduce(scene), reduce(scene));
-}
-void reduce_plain(benchmark::State& state) {
-    const Scene scene;
-    run(
-        state, scene.observations, [&](const geo_hvd& obs) { return plain_reduce(obs, scene.station); },
-        reduce(scene));
-}
-void calculate_basalt(benchmark::State& state) {
-    const Scene scene;
-    run(state, scene.points, calculate(scene), calculate(scene));
-}
-void calculate_plain(benchmark::State& state) {
-    const Scene scene;
-    run(
-        state, scene.points, [&](const geo_nee& point) { return plain_calculate(scene.station, point); },
-        calculate(scene));
-}
-void spiral_basalt(benchmark::State& state) {
-    run(state, Scene().spirals, deltas, deltas);
-}
-void spiral_plain(benchmark::State& state) {
-    run(state, Scene().spirals, plain_deltas, deltas);
+    run(state, scene.points, calculate(function, scene), calculate(geo_calc_obs, scene));
 }
 
-BENCHMARK(reduce_basalt)->Name("reduce_observation/basalt");
-BENCHMARK(reduce_plain)->Name("reduce_observation/plain_form");
-BENCHMARK(calculate_basalt)->Name("calculate_observation/basalt");
-BENCHMARK(calculate_plain)->Name("calculate_observation/plain_form");
-BENCHMARK(spiral_basalt)->Name("spiral_deltas/basalt");
-BENCHMARK(spiral_plain)->Name("spiral_deltas/plain_form");
+void spiral_row(benchmark::State& state, decltype(geo_spiral_deltas)* function) {
+    run(state, Scene().spirals, deltas(function), deltas(geo_spiral_deltas));
+}
+
+BENCHMARK_CAPTURE(reduce_row, basalt, geo_reduce_obs)->Name("reduce_observation/basalt");
+BENCHMARK_CAPTURE(reduce_row, plain, plain_reduce)->Name("reduce_observation/plain_form");
+BENCHMARK_CAPTURE(calculate_row, basalt, geo_calc_obs)->Name("calculate_observation/basalt");
+BENCHMARK_CAPTURE(calculate_row, plain, plain_calculate)->Name("calculate_observation/plain_form");
+BENCHMARK_CAPTURE(spiral_row, basalt, geo_spiral_deltas)->Name("spiral_deltas/basalt");
+BENCHMARK_CAPTURE(spiral_row, plain, plain_deltas)->Name("spiral_deltas/plain_form");
 
 }  // namespace
 

@@ -1,5 +1,6 @@
 // Dates and day counts beside std::chrono and the C library; angles and variances beside the formulas written
-// out. Before a row is timed, its answers are compared with the library's.
+// out. Before a row is timed, its answers are compared with the library's. Peers stand behind functions with
+// the library's arguments, as a user's own would.
 #include <benchmark/benchmark.h>
 #include <time.h>
 
@@ -10,6 +11,7 @@
 #include <vector>
 
 #include "basalt/geo.h"
+#include "bench/out_of_sight.h"
 #include "tests/geo/plain_forms.h"
 
 namespace {
@@ -24,38 +26,48 @@ struct Date {
     bool operator==(const Date&) const = default;
 };
 
-Date library_date(std::uint32_t mjd) {
-    std::uint16_t year = 0;
-    std::uint16_t month = 0;
-    std::uint16_t day = 0;
-    std::uint16_t day_of_week = 0;
-    _mjd2greg(mjd, year, month, day, day_of_week);
-    return {year, month, day, day_of_week};
+using Whole = std::uint16_t;
+
+void chrono_date(std::uint32_t mjd, Whole& year, Whole& month, Whole& day, Whole& day_of_week) {
+    const std::chrono::sys_days days = MJD_0 + std::chrono::days(mjd);
+    const std::chrono::year_month_day date = days;
+    year = static_cast<Whole>(static_cast<int>(date.year()));
+    month = static_cast<Whole>(static_cast<unsigned>(date.month()));
+    day = static_cast<Whole>(static_cast<unsigned>(date.day()));
+    day_of_week = static_cast<Whole>(std::chrono::weekday(days).c_encoding());
 }
 
-Date chrono_date(std::uint32_t mjd) {
-    const std::chrono::sys_days day = MJD_0 + std::chrono::days(mjd);
-    const std::chrono::year_month_day date = day;
-    return {static_cast<unsigned>(static_cast<int>(date.year())), static_cast<unsigned>(date.month()),
-            static_cast<unsigned>(date.day()), std::chrono::weekday(day).c_encoding()};
-}
-
-Date gmtime_date(std::uint32_t mjd) {
+void gmtime_date(std::uint32_t mjd, Whole& year, Whole& month, Whole& day, Whole& day_of_week) {
     const time_t seconds = SECONDS_AT_MJD_0 + std::int64_t{86400} * mjd;
     tm fields = {};
     gmtime_r(&seconds, &fields);
-    return {static_cast<unsigned>(fields.tm_year + 1900), static_cast<unsigned>(fields.tm_mon + 1),
-            static_cast<unsigned>(fields.tm_mday), static_cast<unsigned>(fields.tm_wday)};
+    year = static_cast<Whole>(fields.tm_year + 1900);
+    month = static_cast<Whole>(fields.tm_mon + 1);
+    day = static_cast<Whole>(fields.tm_mday);
+    day_of_week = static_cast<Whole>(fields.tm_wday);
 }
 
-std::uint32_t library_mjd(const Date& date) {
-    return _greg2mjd(static_cast<std::uint16_t>(date.year), static_cast<std::uint16_t>(date.month),
-                     static_cast<std::uint16_t>(date.day));
+std::uint32_t chrono_mjd(Whole year, Whole month, Whole day) {
+    const std::chrono::sys_days days = std::chrono::year(year) / month / day;
+    return static_cast<std::uint32_t>((days - MJD_0).count());
 }
 
-std::uint32_t chrono_mjd(const Date& date) {
-    const std::chrono::sys_days day = std::chrono::year(static_cast<int>(date.year)) / date.month / date.day;
-    return static_cast<std::uint32_t>((day - MJD_0).count());
+auto date_by(decltype(_mjd2greg)* convert) {
+    return [convert = bench::out_of_sight(convert)](std::uint32_t mjd) -> Date {
+        Whole year = 0;
+        Whole month = 0;
+        Whole day = 0;
+        Whole day_of_week = 0;
+        convert(mjd, year, month, day, day_of_week);
+        return {year, month, day, day_of_week};
+    };
+}
+
+auto mjd_by(decltype(_greg2mjd)* convert) {
+    return [convert = bench::out_of_sight(convert)](const Date& date) {
+        return convert(static_cast<Whole>(date.year), static_cast<Whole>(date.month),
+                       static_cast<Whole>(date.day));
+    };
 }
 
 /// Times `ask` over the inputs, one a turn; `expected` is the library's own answer.
@@ -87,7 +99,7 @@ std::vector<std::uint32_t> days() {
 std::vector<Date> dates() {
     std::vector<Date> result;
     for (const std::uint32_t mjd : days()) {
-        result.push_back(library_date(mjd));
+        result.push_back(date_by(_mjd2greg)(mjd));
     }
     return result;
 }
@@ -105,25 +117,24 @@ struct Dms {
     bool operator==(const Dms&) const = default;
 };
 
-Dms library_dms(double radians) {
-    int degrees = 0;
-    int minutes = 0;
-    double seconds = 0.0;
-    _radtodms(radians, &degrees, &minutes, &seconds);
-    return {degrees, minutes, seconds};
-}
-
-/// Out of line, as the library is to its callers.
-[[gnu::noinline]] Dms plain_dms(double radians) {
+void plain_dms(double radians, int* degrees, int* minutes, double* seconds) {
     const double d = radians / 0.017453292519943295;
     double t = std::fabs(d) * 3600.0 + 5e-6;
-    Dms result = {};
-    result.degrees = static_cast<int>(t / 3600.0);
-    t -= static_cast<double>(result.degrees) * 3600.0;
-    result.minutes = static_cast<int>(t / 60.0);
-    result.seconds = t - static_cast<double>(result.minutes) * 60.0 - 5e-6;
-    result.degrees = d >= 0.0 ? result.degrees : -result.degrees;
-    return result;
+    *degrees = static_cast<int>(t / 3600.0);
+    t -= static_cast<double>(*degrees) * 3600.0;
+    *minutes = static_cast<int>(t / 60.0);
+    *seconds = t - static_cast<double>(*minutes) * 60.0 - 5e-6;
+    *degrees = d >= 0.0 ? *degrees : -*degrees;
+}
+
+auto dms_by(decltype(_radtodms)* convert) {
+    return [convert = bench::out_of_sight(convert)](double radians) -> Dms {
+        int degrees = 0;
+        int minutes = 0;
+        double seconds = 0.0;
+        convert(radians, &degrees, &minutes, &seconds);
+        return {degrees, minutes, seconds};
+    };
 }
 
 std::vector<double> angles() {
@@ -163,13 +174,13 @@ Six position_alone(const geo_vector& position) {
 }  // namespace
 
 int main(int argc, char** argv) {
-    row("date_to_mjd/basalt", dates(), library_mjd, library_mjd);
-    row("date_to_mjd/std_chrono", dates(), chrono_mjd, library_mjd);
-    row("mjd_to_date_and_weekday/basalt", days(), library_date, library_date);
-    row("mjd_to_date_and_weekday/std_chrono", days(), chrono_date, library_date);
-    row("mjd_to_date_and_weekday/gmtime_r", days(), gmtime_date, library_date);
-    row("degrees_minutes_seconds/basalt", angles(), library_dms, library_dms);
-    row("degrees_minutes_seconds/plain_form", angles(), plain_dms, library_dms);
+    row("date_to_mjd/basalt", dates(), mjd_by(_greg2mjd), mjd_by(_greg2mjd));
+    row("date_to_mjd/std_chrono", dates(), mjd_by(chrono_mjd), mjd_by(_greg2mjd));
+    row("mjd_to_date_and_weekday/basalt", days(), date_by(_mjd2greg), date_by(_mjd2greg));
+    row("mjd_to_date_and_weekday/std_chrono", days(), date_by(chrono_date), date_by(_mjd2greg));
+    row("mjd_to_date_and_weekday/gmtime_r", days(), date_by(gmtime_date), date_by(_mjd2greg));
+    row("degrees_minutes_seconds/basalt", angles(), dms_by(_radtodms), dms_by(_radtodms));
+    row("degrees_minutes_seconds/plain_form", angles(), dms_by(plain_dms), dms_by(_radtodms));
     row("variance_north_east_up/basalt", positions(), library_variance, library_variance);
     row("variance_north_east_up/limit_position_alone", positions(), position_alone, position_alone);
     benchmark::Initialize(&argc, argv);

@@ -65,7 +65,6 @@ constexpr std::uint32_t days_since_1858(std::uint16_t year, std::uint16_t month,
 constexpr std::uint32_t LAST_WHOLE_YEAR_DAY = days_since_1858(65535, 12, 31);
 /// The last day four times which, counted from MJD -2468570 as Fliegel and Van Flandern do, 31 bits hold.
 constexpr std::uint32_t LAST_DAY = (std::uint32_t{1} << 29) - 1 - 2468570;
-constexpr std::uint32_t WEDNESDAY = 3;  // MJD 0
 
 struct Date {
     std::uint16_t year, month, day;
@@ -78,16 +77,27 @@ Date date_of(std::uint32_t mjd) {
     constexpr std::uint32_t DAYS_FROM_MARCH_OF_YEAR_0 = 678881;
     constexpr std::uint32_t YEAR = 2939745;  // 2^32 / 1461, rounded up
     constexpr std::uint32_t MONTH = 2141;    // 2^16 / 30.6
+    constexpr std::uint32_t MONTHS = 12U << 16;
     constexpr std::uint32_t DAYS_FROM_MARCH_TO_JANUARY = 306;
     const std::uint32_t quarters = 4 * (mjd + DAYS_FROM_MARCH_OF_YEAR_0) + 3;
     const std::uint32_t century = quarters / 146097;
     const std::uint64_t in_century = std::uint64_t{YEAR} * (quarters % 146097 | 3);
     const std::uint32_t day_of_year = static_cast<std::uint32_t>(in_century) / YEAR / 4;
-    const std::uint32_t of_months = MONTH * day_of_year + 197913;
-    const std::uint32_t turn = day_of_year >= DAYS_FROM_MARCH_TO_JANUARY ? 1 : 0;
-    return {static_cast<std::uint16_t>(100 * century + static_cast<std::uint32_t>(in_century >> 32) + turn),
-            static_cast<std::uint16_t>((of_months >> 16) - 12 * turn),
+    // All bits before the turn of the year, so that what differs there takes no branch.
+    const std::uint32_t before_turn = day_of_year < DAYS_FROM_MARCH_TO_JANUARY ? ~std::uint32_t{0} : 0;
+    const std::uint32_t of_months = MONTH * day_of_year + 197913 - MONTHS + (before_turn & MONTHS);
+    return {static_cast<std::uint16_t>(100 * century + static_cast<std::uint32_t>(in_century >> 32) + 1 +
+                                       before_turn),
+            static_cast<std::uint16_t>(of_months >> 16),
             static_cast<std::uint16_t>((of_months & 0xFFFF) / MONTH + 1)};
+}
+
+/// Of a day up to 2^30: the remainder as the upper half of the quotient's fraction times seven.
+std::uint16_t day_of_week(std::uint32_t mjd) {
+    constexpr std::uint32_t WEDNESDAY = 3;     // MJD 0
+    constexpr std::uint32_t WEEK = 613566757;  // 2^32 / 7, rounded up
+    const std::uint32_t fraction = WEEK * (mjd + WEDNESDAY);
+    return static_cast<std::uint16_t>(std::uint64_t{fraction} * DAYS_PER_WEEK >> 32);
 }
 
 /// By the year as 16 bits hold it, which may not be the day's own.
@@ -129,7 +139,7 @@ void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std
     year = date.year;
     month = date.month;
     day = date.day;
-    dayOfWeek = static_cast<std::uint16_t>((mjd + WEDNESDAY) % DAYS_PER_WEEK);
+    dayOfWeek = day_of_week(mjd);
 }
 
 void _mjd2gps(std::uint32_t mjd, double secondsOfDay, std::uint16_t& week, double& secondsOfWeek) {

@@ -126,17 +126,11 @@ public:
     static CString GetPath(const CString& path, unsigned char selector);
 
 private:
-    static constexpr unsigned DRIVE = 1;
-    static constexpr unsigned DIRECTORY = 2;
-    static constexpr unsigned NAME = 4;
-    static constexpr unsigned EXTENSION = 8;
+    static constexpr int PARTS = 4;
 
     mutable CString m_result;
-    CString m_drive;
-    CString m_directory;
-    CString m_name;
-    CString m_extension;
-    bool m_valid = false;
+    CString m_path;
+    int m_bounds[PARTS + 1] = {};  // where in the path each part begins, and the last ends
 };
 
 }  // namespace vex_util

@@ -1,24 +1,18 @@
+#include <algorithm>
+
 #include "basalt/files.h"
 #include "src/platform/path_split.h"
-
-namespace {
-
-CString text_of(std::wstring_view part) {
-    return {part.data(), static_cast<int>(part.size())};
-}
-
-}  // namespace
 
 namespace vex_util {
 
 Path::Path(const CString& path) {
     basalt::platform::PathParts parts;
     if (!path.IsEmpty() && split_path(path.GetString(), parts)) {
-        m_drive = text_of(parts.drive);
-        m_directory = text_of(parts.directory);
-        m_name = text_of(parts.name);
-        m_extension = text_of(parts.extension);
-        m_valid = true;
+        m_path = path;
+        const std::wstring_view in_order[PARTS] = {parts.drive, parts.directory, parts.name, parts.extension};
+        for (int part = 0; part < PARTS; ++part) {
+            m_bounds[part + 1] = m_bounds[part] + static_cast<int>(in_order[part].size());
+        }
     }
 }
 
@@ -27,21 +21,23 @@ Path& Path::operator=(const Path& other) = default;
 Path::~Path() = default;
 
 const CString& Path::GetPath(unsigned char selector) const {
-    m_result.Empty();
-    if (m_valid) {
-        if ((selector & DRIVE) != 0) {
-            m_result += m_drive;
-        }
-        if ((selector & DIRECTORY) != 0) {
-            m_result += m_directory;
-        }
-        if ((selector & NAME) != 0) {
-            m_result += m_name;
-        }
-        if ((selector & EXTENSION) != 0) {
-            m_result += m_extension;
-        }
+    const auto is_selected = [selector](int part) { return (selector >> part & 1) != 0; };
+    int length = 0;
+    for (int part = 0; part < PARTS; ++part) {
+        length += is_selected(part) ? m_bounds[part + 1] - m_bounds[part] : 0;
     }
+    const wchar_t* const path = m_path.GetString();
+    wchar_t* end = m_result.GetBuffer(length);
+    for (int part = 0; part < PARTS;) {
+        // Neighbours are copied at once.
+        int next = part;
+        while (next < PARTS && is_selected(next)) {
+            ++next;
+        }
+        end = std::copy(path + m_bounds[part], path + m_bounds[next], end);
+        part = next + 1;
+    }
+    m_result.ReleaseBuffer(length);
     return m_result;
 }
 

@@ -1,6 +1,7 @@
 // Taking paths apart and asking the disk about them, beside std::filesystem and the bare system call. Before
 // a row is timed, its answers are compared with the library's.
 #include <benchmark/benchmark.h>
+#include <dirent.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -165,6 +166,20 @@ void list_basalt(benchmark::State& state) {
     }
 }
 BENCHMARK(list_basalt)->Name("list_200_files/basalt")->Unit(benchmark::kMicrosecond);
+
+// The names as the system tells them, not kept.
+void list_limit(benchmark::State& state) {
+    const Folder folder;
+    const std::string path = fs::path(folder.file()).parent_path();
+    for ([[maybe_unused]] auto _ : state) {
+        DIR* const names = opendir(path.c_str());
+        while (const dirent* const entry = readdir(names)) {
+            benchmark::DoNotOptimize(entry->d_name);
+        }
+        closedir(names);
+    }
+}
+BENCHMARK(list_limit)->Name("list_200_files/limit_reading_the_folder")->Unit(benchmark::kMicrosecond);
 
 void list_std_filesystem(benchmark::State& state) {
     const Folder folder;

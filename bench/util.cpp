@@ -1,8 +1,12 @@
-// One log line beside the C library's streams and spdlog. What each wrote is compared before anything is
-// timed.
+// Hexadecimal text beside table loops, Abseil and Boost, and one log line beside the C library's streams and
+// spdlog. What each wrote is compared before anything is timed.
 #include <benchmark/benchmark.h>
+#include <fcntl.h>
+#include <unistd.h>
 
+#include <algorithm>
 #include <cstdio>
+#include <cstring>
 #include <cwchar>
 #include <filesystem>
 #include <fstream>
@@ -10,10 +14,10 @@
 #include <memory>
 #include <random>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "basalt/util.h"
-#include "bench/limits.h"
 #include "tests/support/failing_new.h"
 #include "tests/util/plain_hex.h"
 
@@ -120,8 +124,29 @@ void hex_decode_boost(benchmark::State& state) {
 }
 #endif
 
-void digits_copied(benchmark::State& state) {
-    bench::copying(state, 2 * static_cast<std::size_t>(state.range(0)));
+// What the result cannot do without: its container, which is made of zeros, and copying what is read into it.
+template <class Result>
+void zeros_and_copies(benchmark::State& state, std::size_t result_bytes, std::size_t read_bytes) {
+    const Bytes from(read_bytes, 1);
+    for ([[maybe_unused]] auto _ : state) {
+        Result result(result_bytes, 0);
+        benchmark::DoNotOptimize(result.data());
+        for (std::size_t done = 0; done < read_bytes; done += std::min(result_bytes, read_bytes - done)) {
+            std::memcpy(result.data(), from.data() + done, std::min(result_bytes, read_bytes - done));
+            benchmark::ClobberMemory();
+        }
+    }
+}
+
+void encode_limit(benchmark::State& state) {
+    const auto bytes = static_cast<std::size_t>(state.range(0));
+    zeros_and_copies<std::string>(state, 2 * bytes, 2 * bytes);
+}
+
+template <class Result>
+void decode_limit(benchmark::State& state) {
+    const auto bytes = static_cast<std::size_t>(state.range(0));
+    zeros_and_copies<Result>(state, bytes, 2 * bytes);
 }
 
 constexpr char LINE[] = "2021-02-01 12:00:00.250 RTK fixed, 14 satellites, age 0.8 s, HDOP 0.7, 3.1 mm";
@@ -189,6 +214,40 @@ void log_line_basalt(benchmark::State& state) {
     });
 }
 
+// What a line cannot do without: its place in a buffer, and its share of the call that writes a full one.
+class BareLog {
+public:
+    explicit BareLog(const std::filesystem::path& path)
+        : m_file(::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_APPEND | O_CLOEXEC, 0666)) {}
+    ~BareLog() {
+        send();
+        ::close(m_file);
+    }
+    BareLog(const BareLog&) = delete;
+    BareLog& operator=(const BareLog&) = delete;
+
+    void write(const std::string& line) {
+        if (m_used + line.size() > sizeof m_bytes) {
+            send();
+        }
+        std::memcpy(m_bytes + m_used, line.data(), line.size());
+        m_used += line.size();
+    }
+
+private:
+    void send() { benchmark::DoNotOptimize(::write(m_file, m_bytes, std::exchange(m_used, 0))); }
+
+    int m_file;
+    std::size_t m_used = 0;
+    char m_bytes[8192];
+};
+
+void log_line_limit(benchmark::State& state) {
+    const std::string line = std::string(LINE) + "\r\n";
+    run(state,
+        [&line] { return [log = std::make_unique<BareLog>(log_path()), &line] { log->write(line); }; });
+}
+
 void log_line_fputs(benchmark::State& state) {
     const std::string line = std::string(LINE) + "\r\n";
     run(state, [&line] {
@@ -229,8 +288,12 @@ BENCHMARK(hex_encode_abseil)->Name("hex_encode/abseil")->Apply(sizes);
 #ifdef HAS_BOOST_HEX
 BENCHMARK(hex_encode_boost)->Name("hex_encode/boost")->Apply(sizes);
 #endif
-BENCHMARK(digits_copied)->Name("hex_encode/limit_memcpy_of_the_digits")->Apply(sizes);
-BENCHMARK(digits_copied)->Name("hex_decode/limit_memcpy_of_the_digits")->Apply(sizes);
+BENCHMARK(encode_limit)->Name("hex_encode/limit_zeros_and_memcpy")->Apply(sizes);
+BENCHMARK(decode_limit<Bytes>)->Name("hex_decode/limit_zeros_and_memcpy")->Apply(sizes);
+BENCHMARK(decode_limit<std::string>)
+    ->Name("hex_decode_text/limit_zeros_and_memcpy")
+    ->ArgName("bytes")
+    ->Arg(6);
 // Text may not hold zeros, as 64 KiB of random bytes do.
 BENCHMARK(hex_decode_text_basalt)->Name("hex_decode_text/basalt")->ArgName("bytes")->Arg(6);
 #ifdef BENCH_HAS_ABSL
@@ -251,6 +314,7 @@ void lines(benchmark::internal::Benchmark* row) {
 }
 
 BENCHMARK(log_line_basalt)->Name("log_line/basalt")->Apply(lines);
+BENCHMARK(log_line_limit)->Name("log_line/limit_memcpy_and_write")->Apply(lines);
 BENCHMARK(log_line_fputs)->Name("log_line/fputs")->Apply(lines);
 #ifdef BENCH_HAS_SPDLOG
 BENCHMARK(log_line_spdlog)->Name("log_line/spdlog_basic_file")->Apply(lines);

@@ -55,6 +55,14 @@ Bytes decode(const std::string& hex) {
     return bytes;
 }
 
+bool has_zero(const std::string& text) {
+    // A short text has just been written in pieces, which the wide reads of find() would wait for.
+    if (text.size() < 16) {
+        return std::find(text.begin(), text.end(), '\0') != text.end();
+    }
+    return text.find('\0') != std::string::npos;
+}
+
 }  // namespace
 
 std::string StringToHexString(const std::string& s) {
@@ -79,7 +87,7 @@ bool IsHexString(const std::string& s) {
 
 std::string HexStringToString(const std::string& hex) {
     auto text = decode<std::string>(hex);
-    if (text.find('\0') != std::string::npos) {
+    if (has_zero(text)) {
         throw std::runtime_error("Null terminator in hex string");
     }
     return text;

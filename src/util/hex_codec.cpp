@@ -1,5 +1,8 @@
 #include "src/util/hex_codec.h"
 
+#include <cstdint>
+#include <cstring>
+
 #if BASALT_HAS_VECTOR_HEX
 #include <immintrin.h>
 #define BASALT_AVX2 [[gnu::target("avx2")]]
@@ -11,10 +14,53 @@ namespace basalt::util {
 
 // The lanes, the same in both widths:
 //  - a nibble n becomes '0' + n, and 'a' - '0' - 10 more where n > 9;
-//  - a character c is a digit when c - '0' < 10 or (c | 0x20) - 'a' < 6, unsigned: saturating subtraction of
-//    the bound leaves 0. Its value is c & 0xF, and 9 more for a letter;
-//  - a pair of values becomes a byte by a multiplication of 16-bit lanes: the first character is the low
-//  half.
+//  - a character's value as a decimal digit is one of 0 to 9, moved to the top of the range and back with
+//    saturation so that everything else comes to 16 or more; its value as a letter likewise by a saturating
+//    addition of 10; the smaller of the two is its value, 16 or more when it is no digit;
+//  - a pair of values becomes a byte in 16-bit lanes, of which the first character is the low half.
+// A last block that is not whole is taken together with what lies before it, a second time.
+
+namespace {
+
+void store_4(void* to, __m128i lanes) {
+    const std::int32_t word = _mm_cvtsi128_si32(lanes);
+    std::memcpy(to, &word, sizeof word);
+}
+__m128i load_8(const void* from) {
+    return _mm_loadl_epi64(static_cast<const __m128i*>(from));
+}
+void store_8(void* to, __m128i lanes) {
+    _mm_storel_epi64(static_cast<__m128i*>(to), lanes);
+}
+__m128i load_16(const void* from) {
+    return _mm_loadu_si128(static_cast<const __m128i*>(from));
+}
+void store_16(void* to, __m128i lanes) {
+    _mm_storeu_si128(static_cast<__m128i*>(to), lanes);
+}
+__m128i upper_8(__m128i lanes) {
+    return _mm_unpackhi_epi64(lanes, lanes);
+}
+
+// Of sixteen digits; `largest` becomes the largest values met.
+__m128i to_pairs(__m128i c, __m128i& largest) {
+    const __m128i at_top =
+        _mm_subs_epu8(_mm_add_epi8(c, _mm_set1_epi8(static_cast<char>(0xFF - '9'))), _mm_set1_epi8(6));
+    const __m128i decimal = _mm_sub_epi8(at_top, _mm_set1_epi8(static_cast<char>(0xF0)));
+    const __m128i from_a =
+        _mm_sub_epi8(_mm_and_si128(c, _mm_set1_epi8(static_cast<char>(0xDF))), _mm_set1_epi8('A'));
+    const __m128i value = _mm_min_epu8(decimal, _mm_adds_epu8(from_a, _mm_set1_epi8(10)));
+    largest = _mm_max_epu8(largest, value);
+    const __m128i high = _mm_and_si128(_mm_slli_epi16(value, 4), _mm_set1_epi16(0xF0));
+    return _mm_or_si128(high, _mm_srli_epi16(value, 8));
+}
+
+bool are_digits(__m128i largest) {
+    const __m128i too_large = _mm_subs_epu8(largest, _mm_set1_epi8(15));
+    return _mm_movemask_epi8(_mm_cmpeq_epi8(too_large, _mm_setzero_si128())) == 0xFFFF;
+}
+
+}  // namespace
 
 void encode_hex_sse2(const unsigned char* bytes, std::size_t count, char* digits) {
     const __m128i nibble = _mm_set1_epi8(0x0F);
@@ -36,29 +82,37 @@ void encode_hex_sse2(const unsigned char* bytes, std::size_t count, char* digits
 }
 
 bool decode_hex_sse2(const char* digits, std::size_t count, unsigned char* bytes) {
-    __m128i bad = _mm_setzero_si128();
-    const auto to_pairs = [&bad](__m128i c) {
-        const __m128i from_0 = _mm_sub_epi8(c, _mm_set1_epi8('0'));
-        const __m128i from_a = _mm_sub_epi8(_mm_or_si128(c, _mm_set1_epi8(0x20)), _mm_set1_epi8('a'));
-        const __m128i is_decimal =
-            _mm_cmpeq_epi8(_mm_subs_epu8(from_0, _mm_set1_epi8(9)), _mm_setzero_si128());
-        const __m128i is_letter =
-            _mm_cmpeq_epi8(_mm_subs_epu8(from_a, _mm_set1_epi8(5)), _mm_setzero_si128());
-        bad = _mm_or_si128(bad, _mm_cmpeq_epi8(_mm_or_si128(is_decimal, is_letter), _mm_setzero_si128()));
-        const __m128i value =
-            _mm_add_epi8(_mm_and_si128(c, _mm_set1_epi8(0x0F)), _mm_and_si128(is_letter, _mm_set1_epi8(9)));
-        const __m128i high = _mm_and_si128(_mm_slli_epi16(value, 4), _mm_set1_epi16(0xF0));
-        return _mm_or_si128(high, _mm_srli_epi16(value, 8));
-    };
-    std::size_t done = 0;
-    for (; count - done >= 16; done += 16) {
-        const auto* const in = reinterpret_cast<const __m128i*>(digits + 2 * done);
-        const __m128i first = to_pairs(_mm_loadu_si128(in));
-        const __m128i second = to_pairs(_mm_loadu_si128(in + 1));
-        _mm_storeu_si128(reinterpret_cast<__m128i*>(bytes + done), _mm_packus_epi16(first, second));
+    if (count < 4) {
+        return decode_hex_portable(digits, count, bytes);
     }
-    const bool rest = decode_hex_portable(digits + 2 * done, count - done, bytes + done);
-    return rest && _mm_movemask_epi8(bad) == 0;
+    __m128i largest = _mm_setzero_si128();
+    if (count < 8) {
+        const std::size_t last = count - 4;
+        const __m128i both = _mm_unpacklo_epi64(load_8(digits), load_8(digits + 2 * last));
+        const __m128i pairs = to_pairs(both, largest);
+        const __m128i packed = _mm_packus_epi16(pairs, pairs);
+        store_4(bytes, packed);
+        store_4(bytes + last, _mm_srli_epi64(packed, 32));
+        return are_digits(largest);
+    }
+    if (count < 16) {
+        const std::size_t last = count - 8;
+        const __m128i first = to_pairs(load_16(digits), largest);
+        const __m128i packed = _mm_packus_epi16(first, to_pairs(load_16(digits + 2 * last), largest));
+        store_8(bytes, packed);
+        store_8(bytes + last, upper_8(packed));
+        return are_digits(largest);
+    }
+    const auto block = [&](std::size_t at) {
+        const __m128i first = to_pairs(load_16(digits + 2 * at), largest);
+        const __m128i second = to_pairs(load_16(digits + 2 * at + 16), largest);
+        store_16(bytes + at, _mm_packus_epi16(first, second));
+    };
+    for (std::size_t done = 0; done + 16 < count; done += 16) {
+        block(done);
+    }
+    block(count - 16);
+    return are_digits(largest);
 }
 
 BASALT_AVX2 void encode_hex_avx2(const unsigned char* bytes, std::size_t count, char* digits) {
@@ -83,39 +137,34 @@ BASALT_AVX2 void encode_hex_avx2(const unsigned char* bytes, std::size_t count, 
 
 namespace {
 
-struct Pairs {
-    __m256i bytes;  // in 16-bit lanes
-    __m256i bad;    // not 0 where a character is no digit
-};
-
-BASALT_AVX2 inline Pairs to_pairs_avx2(__m256i c) {
-    const __m256i from_0 = _mm256_sub_epi8(c, _mm256_set1_epi8('0'));
-    const __m256i from_a = _mm256_sub_epi8(_mm256_or_si256(c, _mm256_set1_epi8(0x20)), _mm256_set1_epi8('a'));
-    const __m256i zero = _mm256_setzero_si256();
-    const __m256i is_decimal = _mm256_cmpeq_epi8(_mm256_subs_epu8(from_0, _mm256_set1_epi8(9)), zero);
-    const __m256i is_letter = _mm256_cmpeq_epi8(_mm256_subs_epu8(from_a, _mm256_set1_epi8(5)), zero);
-    const __m256i value = _mm256_add_epi8(_mm256_and_si256(c, _mm256_set1_epi8(0x0F)),
-                                          _mm256_and_si256(is_letter, _mm256_set1_epi8(9)));
-    return {_mm256_maddubs_epi16(value, _mm256_set1_epi16(0x0110)),
-            _mm256_cmpeq_epi8(_mm256_or_si256(is_decimal, is_letter), zero)};
+// As to_pairs(), with 32 digits.
+BASALT_AVX2 inline __m256i to_pairs_avx2(__m256i c, __m256i& largest) {
+    const __m256i at_top = _mm256_subs_epu8(
+        _mm256_add_epi8(c, _mm256_set1_epi8(static_cast<char>(0xFF - '9'))), _mm256_set1_epi8(6));
+    const __m256i decimal = _mm256_sub_epi8(at_top, _mm256_set1_epi8(static_cast<char>(0xF0)));
+    const __m256i from_a = _mm256_sub_epi8(_mm256_and_si256(c, _mm256_set1_epi8(static_cast<char>(0xDF))),
+                                           _mm256_set1_epi8('A'));
+    const __m256i value = _mm256_min_epu8(decimal, _mm256_adds_epu8(from_a, _mm256_set1_epi8(10)));
+    largest = _mm256_max_epu8(largest, value);
+    return _mm256_maddubs_epi16(value, _mm256_set1_epi16(0x0110));
 }
 
 }  // namespace
 
 BASALT_AVX2 bool decode_hex_avx2(const char* digits, std::size_t count, unsigned char* bytes) {
-    __m256i bad = _mm256_setzero_si256();
+    __m256i largest = _mm256_setzero_si256();
     std::size_t done = 0;
     for (; count - done >= 32; done += 32) {
         const auto* const in = reinterpret_cast<const __m256i*>(digits + 2 * done);
-        const Pairs first = to_pairs_avx2(_mm256_loadu_si256(in));
-        const Pairs second = to_pairs_avx2(_mm256_loadu_si256(in + 1));
-        bad = _mm256_or_si256(bad, _mm256_or_si256(first.bad, second.bad));
-        const __m256i packed = _mm256_packus_epi16(first.bytes, second.bytes);
+        const __m256i first = to_pairs_avx2(_mm256_loadu_si256(in), largest);
+        const __m256i second = to_pairs_avx2(_mm256_loadu_si256(in + 1), largest);
+        const __m256i packed = _mm256_packus_epi16(first, second);
         _mm256_storeu_si256(reinterpret_cast<__m256i*>(bytes + done),
                             _mm256_permute4x64_epi64(packed, 0b11'01'10'00));
     }
     const bool rest = decode_hex_sse2(digits + 2 * done, count - done, bytes + done);
-    return rest && _mm256_testz_si256(bad, bad) != 0;
+    return rest &&
+           are_digits(_mm_max_epu8(_mm256_castsi256_si128(largest), _mm256_extracti128_si256(largest, 1)));
 }
 
 #endif

@@ -56,7 +56,7 @@ inline bool decode_hex_portable(const char* digits, std::size_t count, unsigned 
 }
 
 #if BASALT_HAS_VECTOR_HEX
-// 16 bytes at a time; every processor of this architecture runs these.
+// 16 bytes at a time, less than that at once; every processor of this architecture runs these.
 void encode_hex_sse2(const unsigned char* bytes, std::size_t count, char* digits);
 bool decode_hex_sse2(const char* digits, std::size_t count, unsigned char* bytes);
 // 32 bytes at a time; only where __builtin_cpu_supports("avx2").
@@ -68,13 +68,10 @@ inline bool can_use_avx2() {
 }
 #endif
 
-// Below this many bytes the tables are as fast as the lanes.
-inline constexpr std::size_t WORTH_LANES = 32;
-
 // Writes two lower-case digits for each byte, high nibble first.
 inline void encode_hex(const unsigned char* bytes, std::size_t count, char* digits) {
 #if BASALT_HAS_VECTOR_HEX
-    if (count >= WORTH_LANES) {
+    if (count >= 32) {
         return can_use_avx2() ? encode_hex_avx2(bytes, count, digits) : encode_hex_sse2(bytes, count, digits);
     }
 #endif
@@ -85,11 +82,11 @@ inline void encode_hex(const unsigned char* bytes, std::size_t count, char* digi
 // written then has no meaning.
 inline bool decode_hex(const char* digits, std::size_t count, unsigned char* bytes) {
 #if BASALT_HAS_VECTOR_HEX
-    if (count >= WORTH_LANES) {
-        return can_use_avx2() ? decode_hex_avx2(digits, count, bytes) : decode_hex_sse2(digits, count, bytes);
-    }
-#endif
+    return count >= 32 && can_use_avx2() ? decode_hex_avx2(digits, count, bytes)
+                                         : decode_hex_sse2(digits, count, bytes);
+#else
     return decode_hex_portable(digits, count, bytes);
+#endif
 }
 
 }  // namespace basalt::util

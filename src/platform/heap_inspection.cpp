@@ -91,7 +91,7 @@ const char* check_quick_lists(const QuickLists& lists, const RegionTable& region
                 return "a quick list runs astray";
             }
             const std::uint64_t head = head_of(block);
-            if ((head & TAG_BITS) != QUICK_TAG || size_of(head) != list * BLOCK_ALIGNMENT) {
+            if ((head & TAG_BITS) != QUICK_TAG || QuickLists::list_of(size_of(head)) != list) {
                 return "a quick list holds a block that does not belong there";
             }
             bytes += size_of(head);

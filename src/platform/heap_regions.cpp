@@ -14,15 +14,21 @@ RegionTable::~RegionTable() {
 }
 
 const Region* RegionTable::search(const std::byte* address) const {
-    const Region* first = m_regions;
-    const Region* after =
-        std::upper_bound(first, first + m_count, address,
-                         [](const std::byte* a, const Region& region) { return a < region.begin; });
-    if (after == first || address >= (after - 1)->begin + (after - 1)->size) {
+    if (m_count == 0) {
         return nullptr;
     }
-    m_recent = static_cast<std::size_t>(after - 1 - first);
-    return after - 1;
+    // By halves without a branch: where blocks of many regions come in any order, none could be foretold.
+    const Region* last_before = m_regions;
+    for (std::size_t rest = m_count; rest > 1;) {
+        const std::size_t half = rest / 2;
+        last_before = last_before[half].begin <= address ? last_before + half : last_before;
+        rest -= half;
+    }
+    if (address < last_before->begin || address >= last_before->begin + last_before->size) {
+        return nullptr;
+    }
+    m_recent = static_cast<std::size_t>(last_before - m_regions);
+    return last_before;
 }
 
 bool RegionTable::reserve_one() {

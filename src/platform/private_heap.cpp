@@ -219,6 +219,11 @@ void PrivateHeap::set_aside(Block* block) {
         return;
     }
     forbid_access(block, size);
+    if (size >= QuickLists::SMALL_LIMIT) {
+        if (Block* before = m_quick.take_first(QuickLists::LARGE)) {
+            put_back(before);
+        }
+    }
     m_quick.insert(block, size);
     // Wherever the blocks lie, they keep no more idle regions from being seen as such than may be kept.
     const std::size_t spare = m_mapped_shared - m_live_shared;

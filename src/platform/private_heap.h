@@ -9,7 +9,7 @@
 #include "src/platform/heap_free_lists.h"
 #include "src/platform/heap_quick_lists.h"
 #include "src/platform/heap_regions.h"
-#include "src/platform/lock.h"
+#include "src/platform/leaning_lock.h"
 
 namespace basalt::platform {
 
@@ -75,7 +75,7 @@ private:
     // Leading members are what every allocation touches.
     std::uint64_t m_magic;
     std::uint64_t m_tag;  // marks the heads of this heap's live blocks
-    Lock m_lock;
+    LeaningLock m_lock;
     std::size_t m_live_shared = 0;    // bytes of the live blocks in shared regions
     std::size_t m_mapped_shared = 0;  // bytes of the regions that many blocks share
     QuickLists m_quick;

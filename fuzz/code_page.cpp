@@ -6,23 +6,18 @@
 
 #include <climits>
 #include <cstdint>
-#include <cstdlib>
 #include <cstring>
 #include <string>
 #include <vector>
 
 #include "basalt/frame.h"
+#include "fuzz/input.h"
 #include "src/platform/code_page.h"
 
 namespace {
 
 using namespace basalt::platform;
-
-void require(bool holds) {
-    if (!holds) {
-        std::abort();
-    }
-}
+using basalt::fuzz::require;
 
 // Both directions, cut and emptied as they are, against the whole conversion.
 void check_buffers(const std::string& bytes, const std::wstring& wide, int n) {

@@ -1,25 +1,20 @@
 // Hexadecimal text: every form of the codec against the portable one, and both directions against each other.
 #include <algorithm>
 #include <cstdint>
-#include <cstdlib>
 #include <stdexcept>
 #include <string>
 #include <vector>
 
 #include "basalt/util/hex.h"
+#include "fuzz/input.h"
 #include "src/util/hex_codec.h"
 
 namespace {
 
 using namespace basalt;
 using namespace basalt::util;
+using basalt::fuzz::require;
 using Bytes = std::vector<unsigned char>;
-
-void require(bool holds) {
-    if (!holds) {
-        std::abort();
-    }
-}
 
 // In buffers of exactly the size needed, so that the sanitizer sees what reaches beyond.
 template <class Decode>

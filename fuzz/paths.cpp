@@ -1,21 +1,16 @@
 // The path classes against their model, on any path. The disk is asked about names that are not there.
 #include <cstdint>
-#include <cstdlib>
 #include <string>
 
 #include "basalt/files.h"
+#include "fuzz/input.h"
 #include "tests/files/path_model.h"
 
 namespace {
 
+using basalt::fuzz::require;
 using vex_util::CFilePath;
 using vex_util::Path;
-
-void require(bool holds) {
-    if (!holds) {
-        std::abort();
-    }
-}
 
 // Below a folder that does not exist, so that the answers do not depend on the machine.
 constexpr wchar_t NOWHERE[] = L"no such folder/";

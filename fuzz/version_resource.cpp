@@ -6,19 +6,15 @@
 
 #include <algorithm>
 #include <cstdint>
-#include <cstdlib>
 #include <string>
 #include <vector>
 
+#include "fuzz/input.h"
+
 namespace {
 
+using basalt::fuzz::require;
 using Bytes = std::vector<unsigned char>;
-
-void require(bool holds) {
-    if (!holds) {
-        std::abort();
-    }
-}
 
 void query(const Bytes& block, const wchar_t* path, std::size_t unit) {
     void* value = nullptr;

@@ -1,8 +1,7 @@
 #!/usr/bin/env bash
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
-# locale, a system short of everything, results to the bit, the package, exported symbols, hardening and
-# the same bytes from another folder, sanitizers,
-# documentation, twenty seconds of each fuzzer (FUZZ_SECONDS=N: longer).
+# locale, a system short of everything, the package, exported symbols, hardening and the same bytes from another
+# folder, results to the bit, sanitizers, documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 20).
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
 #        format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan docs fuzz
@@ -69,26 +68,26 @@ step_docs() {
     cmake -S . -B build/docs -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_DOCS=ON
     cmake --build build/docs --target docs
 }
+step_fuzz_one() {  # program; begins with the kept inputs, and what is found goes into the first folder
+    local name corpus
+    name=$(basename "$1")
+    corpus=("build/fuzz/corpus/$name" "fuzz/corpus/${name#fuzz_}")
+    mkdir -p "${corpus[0]}"
+    [ -d "${corpus[1]}" ] || unset "corpus[1]"
+    "$1" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-20}" -max_len=2000 -timeout=10 -print_final_stats=1 \
+        -artifact_prefix="build/fuzz/$name-" 2>"$1.log" || { tail -n 40 "$1.log"; return 255; }
+    echo "$name: $(grep -c . "$1.log") lines, $(grep executed_units "$1.log")"
+}
 step_fuzz() {
-    local program name corpus
-    [ -f fuzz/CMakeLists.txt ] || { echo "no fuzzer yet"; return; }
     cmake --preset fuzz >/dev/null
     cmake --build --preset fuzz
-    for program in build/fuzz/fuzz/fuzz_*; do
-        [ -x "$program" ] || continue
-        name=$(basename "$program")
-        # begins with the kept inputs; what is found goes into the first folder
-        corpus=("build/fuzz/corpus/$name" "fuzz/corpus/${name#fuzz_}")
-        mkdir -p "${corpus[0]}"
-        [ -d "${corpus[1]}" ] || unset "corpus[1]"
-        "$program" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-20}" -timeout=10 -print_final_stats=1 \
-            2>"$program.log" || { tail -n 40 "$program.log"; return 1; }
-        echo "$name: $(grep -c . "$program.log") lines, $(grep executed_units "$program.log")"
-    done
+    # two at a time; 255 ends the others as well
+    find build/fuzz/fuzz -maxdepth 1 -name 'fuzz_*' -type f -executable | sort |
+        xargs -P 2 -I {} bash scripts/check.sh --step fuzz_one {}
 }
 
 if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit holds
-    "step_$2"
+    "step_$2" "${@:3}"
     exit
 fi
 steps=("$@")

@@ -120,15 +120,11 @@ void* PrivateHeap::resize(void* payload, std::size_t size, DWORD& error) {
         }
         Block* block = block_of(payload);
         old_size = size_of(head_of(block)) - HEAD_BYTES;
-        const bool single = region->single;
-        const bool done = single ? resize_single(block, need, *region) : resize_in_place(block, need);
+        const bool done = region->single ? resize_single(block, need, *region) : resize_in_place(block, need);
         if (done) {
             forbid_access(payload_of(block), size_of(head_of(block)) - HEAD_BYTES);
             permit_access(payload_of(block), size);
             return payload_of(block);
-        }
-        if (single) {
-            return nullptr;
         }
     }
     // The caller owns the old block and nobody knows the new one: copying needs no lock.

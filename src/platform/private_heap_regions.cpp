@@ -67,7 +67,8 @@ Block* PrivateHeap::map_single_region(std::size_t need) {
         return nullptr;
     }
     if (size >= LARGE_PAGE) {
-        prefer_large_pages(begin, size & ~(LARGE_PAGE - 1));
+        // All of it: the system moves only pages that are alike.
+        prefer_large_pages(begin, size);
     }
     Block* block = add_region(begin, size, true);
     set_head(block, m_tag | (size - REGION_OVERHEAD) | LAST_OF_REGION);

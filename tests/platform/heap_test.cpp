@@ -1,6 +1,7 @@
 #include "src/platform/heap.h"
 
 #include <gtest/gtest.h>
+#include <sys/mman.h>
 
 #include <algorithm>
 #include <array>
@@ -238,6 +239,26 @@ TEST(Heap, SurvivesEachSystemCallFailing) {
         ++failures;
     }
     EXPECT_GT(failures, 20);
+}
+
+// The system moves only pages that are alike: those of a large block, whole large pages and the rest behind
+// them, once were not, and neither are those of which a host has locked some.
+TEST(Heap, EnlargesLargeBlocksWhosePagesAreNotAlike) {
+    const Heap heap(0);
+    for (const std::size_t size : {2 * MIB, 6 * MIB + 100 * KIB}) {
+        auto* block = static_cast<unsigned char*>(heap.take(size));
+        std::memset(block, 7, size);
+        block = static_cast<unsigned char*>(heap.resize(block, 2 * size));
+        ASSERT_NE(block, nullptr) << size;
+        const std::uintptr_t page = (reinterpret_cast<std::uintptr_t>(block) + MIB) & ~(MIB - 1);
+        ASSERT_EQ(madvise(reinterpret_cast<void*>(page), 64 * KIB, MADV_DONTDUMP), 0);
+        block = static_cast<unsigned char*>(heap.resize(block, 3 * size));
+        ASSERT_NE(block, nullptr) << size << ", part of it changed by the host";
+        Model::expect_fill(block, size, 7);
+        block[3 * size - 1] = 1;
+        EXPECT_EQ(heap.free(block), 1);
+        sound(heap.handle);
+    }
 }
 
 TEST(Heap, MapsNothingMoreOnceTheSystemRefuses) {

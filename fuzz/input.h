@@ -4,13 +4,16 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstdio>
 #include <cstdlib>
 #include <cstring>
 
 namespace basalt::fuzz {
 
-inline void require(bool holds) {
+// Ends the program where it does not hold; says whose call it was.
+inline void require(bool holds, const char* file = __builtin_FILE(), int line = __builtin_LINE()) {
     if (!holds) {
+        std::fprintf(stderr, "%s:%d: not so\n", file, line);
         std::abort();
     }
 }

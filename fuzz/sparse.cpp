@@ -163,10 +163,10 @@ private:
         std::optional<std::pair<SparseArrayModel::Cell, Value>> next() {
             const SparseArrayModel& model = pair.model;
             for (;; ++position, cell.reset()) {
-                if (position >= (selected ? model.selection.size() : model.blocks())) {
-                    return {};
-                }
                 if (!cell) {
+                    if (position >= (selected ? model.selection.size() : model.blocks())) {
+                        return {};
+                    }
                     open_block = selected ? static_cast<std::size_t>(model.selection[position]) : position;
                 }
                 if (const auto found = model.next_in_block(open_block, cell)) {

@@ -16,6 +16,7 @@ thread_local bool failure_stays = false;
 thread_local bool has_struck = false;
 thread_local int chosen_number = 0;
 std::atomic<long> balance{0};
+std::atomic<long> refused{0};
 
 // Whether a call has to fail; errno is set then.
 bool fails_now(int number) {
@@ -60,7 +61,11 @@ void* __wrap_mremap(void* pages, size_t old_size, size_t new_size, int flags) {
 }
 
 int __wrap_munmap(void* pages, size_t size) {
-    const int result = fails_now(ENOMEM) ? -1 : __real_munmap(pages, size);
+    if (fails_now(ENOMEM)) {
+        refused += static_cast<long>(size);
+        return -1;
+    }
+    const int result = __real_munmap(pages, size);
     balance -= result == 0 ? static_cast<long>(size) : 0;
     return result;
 }
@@ -125,6 +130,14 @@ SystemFailure::~SystemFailure() {
 
 bool SystemFailure::struck() {
     return has_struck;
+}
+
+bool system_call_fails(int number) {
+    return fails_now(number);
+}
+
+long refused_to_unmap() {
+    return refused;
 }
 
 long mapped_balance() {

@@ -17,6 +17,13 @@ public:
     static bool struck();  // whether a call was made to fail
 };
 
+// For further calls that a program wraps: whether this one has to fail; errno is set then, to the value
+// chosen or else to this one.
+bool system_call_fails(int number);
+
+// Bytes that were made to stay mapped.
+long refused_to_unmap();
+
 // Bytes mapped minus bytes unmapped by this program through the calls above.
 long mapped_balance();
 

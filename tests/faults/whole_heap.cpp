@@ -1,0 +1,95 @@
+// The general-purpose heap of the whole program, other libraries' use of it too, made to fail: the program's
+// own malloc in front of the C library's. It stands in for tests/support/failing_new.cpp and heap_calls.cpp.
+#include <cerrno>
+#include <cstddef>
+
+#include "tests/support/failing_new.h"
+#include "tests/support/heap_calls.h"
+
+namespace {
+
+constinit thread_local long calls_left = 0;  // until one fails; 0: none will
+constinit thread_local bool failure_stays = false;
+constinit thread_local bool has_fired = false;
+constinit thread_local long live_blocks = 0;
+
+bool must_fail() {
+    if (has_fired) {
+        return failure_stays;
+    }
+    has_fired = calls_left > 0 && --calls_left == 0;
+    return has_fired;
+}
+
+template <class Take>
+void* taken(const void* before, Take take) {
+    if (must_fail()) {
+        errno = ENOMEM;
+        return nullptr;
+    }
+    void* const block = take();
+    live_blocks += block != nullptr && before == nullptr ? 1 : 0;
+    return block;
+}
+
+}  // namespace
+
+extern "C" {
+
+void* __libc_malloc(std::size_t);
+void* __libc_calloc(std::size_t, std::size_t);
+void* __libc_realloc(void*, std::size_t);
+void* __libc_memalign(std::size_t, std::size_t);
+void __libc_free(void*);
+
+void* malloc(std::size_t size) {
+    return taken(nullptr, [=] { return __libc_malloc(size); });
+}
+void* calloc(std::size_t count, std::size_t size) {
+    return taken(nullptr, [=] { return __libc_calloc(count, size); });
+}
+void* realloc(void* block, std::size_t size) {
+    return taken(block, [=] { return __libc_realloc(block, size); });
+}
+void* aligned_alloc(std::size_t alignment, std::size_t size) {
+    return taken(nullptr, [=] { return __libc_memalign(alignment, size); });
+}
+int posix_memalign(void** block, std::size_t alignment, std::size_t size) {
+    *block = taken(nullptr, [=] { return __libc_memalign(alignment, size); });
+    return *block != nullptr ? 0 : ENOMEM;
+}
+void free(void* block) {
+    live_blocks -= block != nullptr ? 1 : 0;
+    __libc_free(block);
+}
+}
+
+FailAllocation::FailAllocation(long nth, bool forever) {
+    calls_left = nth;
+    failure_stays = forever;
+    has_fired = false;
+}
+
+FailAllocation::~FailAllocation() {
+    calls_left = 0;
+    has_fired = false;
+}
+
+bool FailAllocation::fired() const {
+    return has_fired;
+}
+
+long live_allocations() {
+    return live_blocks;
+}
+
+namespace basalt::test {
+
+HeapFailure::HeapFailure(int) {}
+HeapFailure::~HeapFailure() = default;
+
+bool HeapFailure::struck() {
+    return false;
+}
+
+}  // namespace basalt::test

@@ -1,10 +1,12 @@
 #!/usr/bin/env bash
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
 # locale, a system short of everything, the package, exported symbols, hardening and the same bytes from another
-# folder, results to the bit, sanitizers, documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 20).
+# folder, results to the bit, sanitizers, every call that can fail failing, many threads at once
+# (STRESS_SECONDS=N each, 5), documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 20).
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
-#        format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan docs fuzz
+#        format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan faults stress
+#        docs fuzz
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
@@ -64,6 +66,22 @@ step_exact() {
 }
 step_asan() { test_with asan; }
 step_tsan() { TSAN_OPTIONS=halt_on_error=1 test_with tsan; }
+step_faults() {  # as it is, where other libraries' allocations fail too, and under the sanitizers
+    local preset
+    for preset in clang asan; do
+        cmake --preset $preset >/dev/null
+        cmake --build --preset $preset --target faults
+        build/$preset/tests/faults
+    done
+}
+step_stress() {
+    local try
+    cmake --preset tsan >/dev/null
+    cmake --build --preset tsan --target stress
+    export TSAN_OPTIONS=halt_on_error=1
+    for try in $(seq 20); do build/tsan/tests/stress 1 first_use; done | tail -n 1
+    build/tsan/tests/stress "${STRESS_SECONDS:-5}"
+}
 step_docs() {
     cmake -S . -B build/docs -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_DOCS=ON
     cmake --build build/docs --target docs
@@ -92,7 +110,8 @@ if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit 
 fi
 steps=("$@")
 if [ ${#steps[@]} -eq 0 ]; then
-    steps=(format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan docs fuzz)
+    steps=(format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan faults
+        stress docs fuzz)
 fi
 need_packages "${BUILD_PACKAGES[@]}" "${TEST_PACKAGES[@]}" "${CHECK_PACKAGES[@]}"
 mkdir -p build

@@ -1,0 +1,83 @@
+// A log that all write, mapped blocks and block allocators while somebody cleans up, questions to the disk,
+// texts, and the settings and queries of the environment.
+#include <fstream>
+#include <string>
+
+#include "basalt/basalt.h"
+#include "tests/stress/stress.h"
+#include "tests/support/scratch_folder.h"
+
+namespace basalt::stress {
+
+namespace {
+
+constexpr int THREADS = 6;
+
+void use_memory_on_files(Random& random) {
+    const auto size = static_cast<unsigned long>(1 + draw(random, 20'000));
+    const vex_util::CMemoryMap map(size);
+    auto* const bytes = static_cast<char*>(static_cast<void*>(map));
+    require(bytes != nullptr && bytes[size - 1] == 0, "a fresh block reads as zero");
+    bytes[size - 1] = 1;
+    vex_lib::vlVmAllocator allocator(4096, 512);
+    require(allocator.Alloc(512) != nullptr, "a block on a file");
+}
+
+void use_texts(const CString& name, int thread) {
+    require(vex_util::CFilePath::FileExists(name) && !vex_util::CFilePath::IsDirectory(name),
+            "the log is there");
+    require(vex_util::Path::GetPath(name, 8) == L".log", "its extension");
+    wchar_t wide[20];
+    char narrow[20];
+    _char2tchar("\xC3\xBC", wide, 19);
+    _tchar2char(wide, narrow, 19);
+    require(std::string(narrow) == "\xC3\xBC", "there and back");
+    _setLanguageVersion(static_cast<basalt_language>(thread + 1));
+    const basalt_language language = _languageVersion();
+    require(language >= 1 && language <= THREADS, "some thread's language");
+    require(_operatingsystem() == 11 && _checkForHighResolution() == 1.0, "settled once");
+    require(_random_uint16() < 65535 && HexStringToString(StringToHexString("abc")) == "abc", "reentrant");
+}
+
+// Every line is one thread's, whole.
+long lines_of(const std::string& path) {
+    std::ifstream file(path);
+    long lines = 0;
+    for (std::string line; std::getline(file, line); ++lines) {
+        require(line.size() >= 2 && line.back() == '\r' && line.front() >= '0' &&
+                    line.front() < '0' + THREADS && line.find_first_not_of(line.front()) == line.size() - 1,
+                "each text of the log is whole");
+    }
+    return lines;
+}
+
+}  // namespace
+
+long stress_files(double seconds) {
+    const test::ScratchFolder folder;
+    const std::string path = folder / "stress.log";
+    const CString name(path.c_str());
+    vex_util::FileLogger log(path.c_str());
+    std::atomic<long> written = 0;
+    const long rounds = run_threads(THREADS, seconds, [&](int thread, Random& random) {
+        CString text(static_cast<wchar_t>(L'0' + thread), 1 + draw(random, 300));
+        text += L'\n';
+        log.Write(text);
+        ++written;
+        use_texts(name, thread);
+        if (draw(random, 4) == 0) {
+            use_memory_on_files(random);
+        }
+        if (thread == 0) {
+            vex_util::CMemoryMap::CleanUp();
+            vex_util::HiResTimer timer;
+            require(timer.GetElapsedS() >= 0 && _currentjavatime() > 0, "time passes");
+        }
+    });
+    log.Close();
+    require(lines_of(path) == written, "every text is in the log");
+    require(folder.names().size() == 1, "no temporary file stays");
+    return rounds;
+}
+
+}  // namespace basalt::stress

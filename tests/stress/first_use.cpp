@@ -1,0 +1,72 @@
+// The first calls of a process, made by all threads at once and by each in another order.
+#include <latch>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "basalt/basalt.h"
+#include "tests/stress/stress.h"
+
+namespace basalt::stress {
+
+namespace {
+
+constexpr int THREADS = 8;
+
+const std::vector<std::function<void()>>& first_calls() {
+    static const std::vector<std::function<void()>> calls = {
+        [] { require(_operatingsystem() == 11, "the release"); },
+        [] { require(_handheldVersion() == 1, "the desktop"); },
+        [] { require(_checkForHighResolution() == 1.0, "the factor"); },
+        [] { require(_languageVersion() == 15, "the language"); },
+        [] { require(!_tempFilePath().IsEmpty(), "the folder"); },
+        [] {
+            wchar_t wide[8];
+            _char2tchar("\xC3\xBC", wide, 7);
+            require(wide[0] == 0xFC && wide[1] == 0, "the encoding");
+        },
+        [] { require(vex_util::HiResTimer().GetElapsedS() >= 0, "the clock"); },
+        [] { require(_currentjavatime() > 1'700'000'000'000U, "the epoch"); },
+        [] { require(VersionInfo().GetMajorVersion() == 1, "no version yet"); },
+        [] { static_cast<void>(VersionInfo().InitVersionInfo(nullptr)); },
+        [] { static_cast<void>(MACAddressFromMIBTable().Create()); },
+        [] {
+            void* const block = vex_lib::vlSharedMemoryHeap::Alloc(100);
+            require(block != nullptr, "the shared heap");
+            vex_lib::vlSharedMemoryHeap::Free(block);
+        },
+        [] { require(static_cast<void*>(vex_util::CMemoryMap(100)) != nullptr, "the table of handles"); },
+        [] { require(vex_lib::vlVmAllocator(4096, 4096).Alloc(4096) != nullptr, "a temporary file"); },
+        [] { require(DeleteObject(CreateSolidBrush(1)) != 0, "the table of drawing objects"); },
+        [] { require(GetStockObject(BLACK_PEN) != nullptr, "the stock objects"); },
+        [] { vex_util::mfc::DumpBitmap(nullptr, CString(L"/nowhere/at.all")); },
+        [] { require(IsHexString(StringToHexString(std::string(100, 'x'))), "the choice of a codec"); },
+        [] {
+            vex_util::Sparse2DArray array(8, 16, 64);
+            require(array.Insert(1, 1, "eight by") && array.Find(1, 1) != nullptr, "a lock's barriers");
+        },
+    };
+    return calls;
+}
+
+}  // namespace
+
+long first_use() {
+    const auto& calls = first_calls();
+    std::latch start(THREADS);
+    std::vector<std::thread> threads;
+    for (std::size_t thread = 0; thread < THREADS; ++thread) {
+        threads.emplace_back([&, thread] {
+            start.arrive_and_wait();
+            for (std::size_t i = 0; i < calls.size(); ++i) {
+                calls[(thread / 2 * 5 + i) % calls.size()]();  // in pairs, so that two always meet
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    return THREADS * static_cast<long>(calls.size());
+}
+
+}  // namespace basalt::stress

@@ -1,0 +1,37 @@
+// Many threads at once for a while: what the headers allow to be done at the same time.
+#ifndef BASALT_TESTS_STRESS_STRESS_H
+#define BASALT_TESTS_STRESS_STRESS_H
+
+#include <atomic>
+#include <functional>
+#include <random>
+
+namespace basalt::stress {
+
+// Ends the program, saying what does not hold.
+void require(bool holds, const char* what);
+
+// What a thread draws its choices from; no two threads the same, and every run the same.
+using Random = std::mt19937;
+
+inline int draw(Random& random, int below) {
+    return static_cast<int>(random() % static_cast<unsigned>(below));
+}
+
+// The thread's number and its choices. Called over and over, in every thread, until the time is up.
+using Round = std::function<void(int thread, Random& random)>;
+
+// How often all threads together went round.
+long run_threads(int count, double seconds, const Round& round);
+
+// Each for so many seconds; the answer is how often its threads went round.
+long stress_sparse(double seconds);
+long stress_heaps(double seconds);
+long stress_files(double seconds);
+long stress_graphics(double seconds);
+// What is made at its first use, by all threads at once: good for one try a process.
+long first_use();
+
+}  // namespace basalt::stress
+
+#endif

@@ -1,6 +1,5 @@
 #include "src/platform/bmp_file.h"
 
-#include <fcntl.h>
 #include <stdio.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -11,6 +10,7 @@
 #include "src/platform/error_from_errno.h"
 #include "src/platform/file_name.h"
 #include "src/platform/file_size_signal.h"
+#include "src/platform/open_for_writing.h"
 #include "src/platform/pixel_format.h"
 #include "src/platform/pixel_rows.h"
 
@@ -86,7 +86,7 @@ void write_row(const Surface& surface, int y, Writer& writer) {
 }
 
 FILE* open_file(const char* name) {
-    const int file = ::open(name, O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666);
+    const int file = open_for_writing(name, 0);
     if (file < 0) {
         return nullptr;
     }

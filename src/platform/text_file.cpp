@@ -14,6 +14,7 @@
 #include "src/platform/code_page.h"
 #include "src/platform/file_name.h"
 #include "src/platform/file_size_signal.h"
+#include "src/platform/open_for_writing.h"
 #include "src/platform/out_of_memory.h"
 
 namespace basalt::platform {
@@ -34,8 +35,7 @@ std::unique_ptr<TextFile> TextFile::open(const char* path) noexcept {
         // The constructor is private, and want of memory caught.
         // NOLINTNEXTLINE(bugprone-unhandled-exception-at-new)
         std::unique_ptr<TextFile> file(new TextFile);
-        constexpr int FLAGS = O_WRONLY | O_CREAT | O_TRUNC | O_APPEND | O_CLOEXEC;
-        file->m_file = ::open(system_name(path).c_str(), FLAGS, 0666);
+        file->m_file = open_for_writing(system_name(path).c_str(), O_APPEND);
         return file->m_file >= 0 ? std::move(file) : nullptr;
     });
 }

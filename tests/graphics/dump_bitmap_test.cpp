@@ -1,4 +1,6 @@
 #include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include <cstdint>
 #include <cstdlib>
@@ -202,6 +204,16 @@ TEST_F(DumpBitmapTest, LeavesNoFileForWhatIsNoBitmap) {
     dump(surface, file("no such folder/a.bmp"));
     dump(surface, file(""));
     EXPECT_FALSE(fs::exists(file("no such folder")));
+}
+
+TEST_F(DumpBitmapTest, DoesNotWaitForAPipeThatNobodyReads) {
+    const fs::path pipe = file("pipe");
+    ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
+    TestSurface surface(4, 4, 32);
+    alarm(20);
+    dump(surface, pipe);
+    alarm(0);
+    EXPECT_TRUE(fs::is_fifo(pipe)) << "it is not ours to delete";
 }
 
 TEST_F(DumpBitmapTest, ReportsNothingWithoutMemory) {

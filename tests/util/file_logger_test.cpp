@@ -1,7 +1,10 @@
 #include "basalt/util/file_logger.h"
 
+#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/resource.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include <csignal>
 #include <cstdlib>
@@ -240,6 +243,32 @@ TEST_F(FileLog, full_disk_is_silent) {
     log.Write(L"still usable");
     log.Close();
     EXPECT_EQ(contents(file), "still usable");
+}
+
+TEST_F(FileLog, pipe_that_nobody_reads_is_refused_and_one_that_is_read_is_written_to) {
+    const fs::path pipe = folder / "pipe";
+    ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
+    alarm(20);  // a call that waits for a reader ends here
+    FileLogger log(pipe.c_str());
+    log.Write(L"lost");
+    log.Close();
+    const int reader = open(pipe.c_str(), O_RDONLY | O_NONBLOCK);
+    log.Open(pipe.c_str());
+    const CString text(L'x', 100'000);  // more than a pipe holds
+    std::size_t taken = 0;
+    std::thread reading([&] {
+        char bytes[4096];
+        for (ssize_t count = -1; count != 0 || taken == 0; count = read(reader, bytes, sizeof bytes)) {
+            taken += count > 0 ? static_cast<std::size_t>(count) : 0;
+            std::this_thread::yield();
+        }
+    });
+    log.Write(text);
+    log.Close();
+    reading.join();
+    EXPECT_EQ(taken, 100'000U);
+    close(reader);
+    alarm(0);
 }
 
 TEST_F(FileLog, limit_on_file_sizes_is_silent) {

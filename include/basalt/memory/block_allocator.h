@@ -37,10 +37,10 @@ public:
     vlVmAllocator& operator=(const vlVmAllocator&) = delete;
 
     /// A block of exactly blockSize bytes, zero at its first use and as it was left later; null for any other
-    /// size, and when there is no memory, address space, file or room on the disk. Nothing is left behind then
-    /// but, where a file just made could not be opened again, that file, empty.
-    /// The block freed last in a file is used again first, and a file with free blocks before a new one.
-    /// Constant time, but for making a file.
+    /// size, and when there is no memory, address space, file or room on the disk. Nothing is left behind
+    /// then but, where a file just made could not be opened again, that file, empty. The block freed last in
+    /// a file is used again first, and a file with free blocks before a new one. Constant time, but for
+    /// making a file.
     void* Alloc(std::uint64_t size) override;
 
     /// Frees a block; any other address (null, foreign, inside a block, freed already) is ignored. The time

@@ -40,7 +40,7 @@ public:
 
     /// Closes the log, then opens a file, created or emptied.
     /// @param path in the active code page, either separator; bytes that are no character of it are kept.
-    /// Null, empty or a file that cannot be opened leaves the log closed
+    /// Null, empty or a file that cannot be opened, such as a pipe that nobody reads, leaves the log closed
     void Open(const char* path);
     /// Writes what is buffered and closes the file; nothing when the log is closed.
     void Close();

@@ -93,7 +93,7 @@ step_fuzz_one() {  # program; begins with the kept inputs, and what is found goe
     mkdir -p "${corpus[0]}"
     [ -d "${corpus[1]}" ] || unset "corpus[1]"
     [ "$name" != fuzz_code_page ] || export LOCPATH=$PWD/build/fuzz/locales ASAN_OPTIONS=detect_leaks=0
-    "$1" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-20}" -max_len=2000 -len_control=0 -timeout=10 \
+    "$1" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-20}" -max_len=2000 -len_control=0 -timeout=30 \
         -print_final_stats=1 -artifact_prefix="build/fuzz/$name-" 2>"$1.log" ||
         { tail -n 40 "$1.log"; return 255; }
     echo "$name: $(grep -c . "$1.log") lines, $(grep executed_units "$1.log")"

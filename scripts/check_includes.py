@@ -12,7 +12,8 @@ FAMILIES = {"frame": set(), "geo": set(), "util": set(), "files": set(), "memory
             "sparse": {"memory"}, "graphics": {"frame", "geo"}}
 STANDARD = re.compile(r"^[a-z_0-9]+$|^(stddef|stdint|string)\.h$")  # <vector>, and what C shares
 INTRINSICS = {"immintrin.h", "emmintrin.h"}
-SOURCES = [f"{folder}/**/*{ending}" for folder in ("include", "src", "bench", "fuzz", "examples")  # tests hold texts
+SOURCES = [f"{folder}/**/*{ending}"  # not those of tests, which hold texts
+           for folder in ("include", "src", "bench", "fuzz", "examples", "console", "tools")
            for ending in (".h", ".cpp")]
 
 

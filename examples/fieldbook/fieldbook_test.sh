@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # The program from the outside: known errors found again, points against what awk makes of them, every refusal.
 # Usage: fieldbook_test.sh PROGRAM DATA_DIRECTORY
-. "$(dirname "$0")/../support/program_test.sh"
+. "$(dirname "$0")/../../console/program_test.sh"
 cp "$data"/fieldbook.csv book.csv
 cp "$data"/axis.csv axis.csv
 

@@ -1,11 +1,8 @@
 // A field book's reduction, traverse and setting-out.
 
-#include <basalt/version.h>
-
 #include <filesystem>
 #include <string>
 #include <system_error>
-#include <vector>
 
 #include "input_error.h"
 #include "options.h"
@@ -25,14 +22,8 @@ void spare_inputs(const Options& options) {
     }
 }
 
-std::string run(const std::vector<std::string>& arguments) {
-    const Options options = parse_options(arguments);
-    if (options.help) {
-        return USAGE;
-    }
-    if (options.version) {
-        return "fieldbook " BASALT_VERSION "\n";
-    }
+std::string run(const CommandLine& line) {
+    const Options options = parse_options(line);
     const Results results = compute(options);
     if (options.csv) {
         spare_inputs(options);
@@ -44,5 +35,5 @@ std::string run(const std::vector<std::string>& arguments) {
 }  // namespace
 
 int main(int count, char** arguments) {
-    return run_program("fieldbook", run, count, arguments);
+    return run_program({"fieldbook", SYNTAX, run}, count, arguments);
 }

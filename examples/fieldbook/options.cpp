@@ -2,11 +2,10 @@
 
 #include <string_view>
 
-#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 
-const char* const USAGE =
+const Syntax SYNTAX = {
     "Usage: fieldbook BOOK.csv [OPTION]...\n"
     "\n"
     "Reads a total station's field book, brings the two faces together, computes and balances the traverse,\n"
@@ -28,7 +27,11 @@ const char* const USAGE =
     "  --version            print the version and exit\n"
     "\n"
     "Exit status: 0 success, 1 the results could not be written or memory ran out, 2 bad arguments or "
-    "input.\n";
+    "input.\n",
+    {"--alignment", "--csv", "--interval", "--sagitta", "--target-height", "--scale", "--wgs84",
+     "--precision"},
+    {},
+};
 
 namespace {
 
@@ -118,16 +121,8 @@ void set_option(Options& options, std::string_view name, const std::string& valu
 
 }  // namespace
 
-Options parse_options(const std::vector<std::string>& arguments) {
-    const CommandLine line =
-        parse_command_line(arguments, {"--alignment", "--csv", "--interval", "--sagitta", "--target-height",
-                                       "--scale", "--wgs84", "--precision"});
+Options parse_options(const CommandLine& line) {
     Options options;
-    options.help = line.help;
-    options.version = line.version;
-    if (line.help || line.version) {
-        return options;
-    }
     for (const auto& [name, value] : line.options) {
         set_option(options, name, value);
     }

@@ -6,20 +6,19 @@
 
 #include <optional>
 #include <string>
-#include <vector>
 
 #include "angles.h"
 #include "precision.h"
 
 /// A control point and where it lies on the earth.
+#include "command_line.h"
+
 struct EarthAnchor {
     std::string name;
     geo_llh position;
 };
 
 struct Options {
-    bool help = false;
-    bool version = false;
     std::string book;                      ///< path
     std::optional<std::string> alignment;  ///< path
     std::optional<std::string> csv;        ///< path
@@ -31,10 +30,10 @@ struct Options {
     InstrumentPrecision precision = {3.0 * RADIANS_PER_SECOND, 0.002, 2e-6};
 };
 
-/// Reads the arguments that follow the program's name. InputError for anything it does not know.
-Options parse_options(const std::vector<std::string>& arguments);
+/// InputError for values and operands that cannot be used.
+Options parse_options(const CommandLine& line);
 
-/// What --help prints.
-extern const char* const USAGE;
+/// What --help prints, and the options taken.
+extern const Syntax SYNTAX;
 
 #endif

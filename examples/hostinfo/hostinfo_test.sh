@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # The program from the outside: its facts against what the system's own tools say, and every refusal.
 # Usage: hostinfo_test.sh PROGRAM
-. "$(dirname "$0")/../support/program_test.sh"
+. "$(dirname "$0")/../../console/program_test.sh"
 export LC_ALL=C.UTF-8
 
 # is NAME EXPECTED: the fact of that name

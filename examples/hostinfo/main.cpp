@@ -1,7 +1,5 @@
 // What a host shows in its about box and writes into its diagnostics log.
 
-#include <basalt/version.h>
-
 #include <string>
 #include <vector>
 
@@ -12,14 +10,8 @@
 
 namespace {
 
-std::string run(const std::vector<std::string>& arguments) {
-    const Options options = parse_options(arguments);
-    if (options.help) {
-        return USAGE;
-    }
-    if (options.version) {
-        return "hostinfo " BASALT_VERSION "\n";
-    }
+std::string run(const CommandLine& line) {
+    const Options options = parse_options(line);
     const std::vector<Section> facts = gather_facts(options);
     const CString text = text_report(facts);
     if (options.log) {
@@ -31,5 +23,5 @@ std::string run(const std::vector<std::string>& arguments) {
 }  // namespace
 
 int main(int count, char** arguments) {
-    return run_program("hostinfo", run, count, arguments);
+    return run_program({"hostinfo", SYNTAX, run}, count, arguments);
 }

@@ -2,11 +2,10 @@
 
 #include <string_view>
 
-#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 
-const char* const USAGE =
+const Syntax SYNTAX = {
     "Usage: hostinfo [OPTION]... [PATH]\n"
     "\n"
     "Shows what a host program knows about itself and its machine: version, system, folders, language,\n"
@@ -19,7 +18,10 @@ const char* const USAGE =
     "  --help               print this and exit\n"
     "  --version            print the version and exit\n"
     "\n"
-    "Exit status: 0 success, 1 the output could not be written or memory ran out, 2 bad arguments.\n";
+    "Exit status: 0 success, 1 the output could not be written or memory ran out, 2 bad arguments.\n",
+    {"--log", "--root", "--product"},
+    {"--json"},
+};
 
 namespace {
 
@@ -38,14 +40,8 @@ void set_option(Options& options, std::string_view name, const std::string& valu
 
 }  // namespace
 
-Options parse_options(const std::vector<std::string>& arguments) {
-    const CommandLine line = parse_command_line(arguments, {"--log", "--root", "--product"}, {"--json"});
+Options parse_options(const CommandLine& line) {
     Options options;
-    options.help = line.help;
-    options.version = line.version;
-    if (line.help || line.version) {
-        return options;
-    }
     for (const auto& [name, value] : line.options) {
         set_option(options, name, value);
     }

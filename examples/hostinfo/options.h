@@ -4,11 +4,10 @@
 
 #include <optional>
 #include <string>
-#include <vector>
+
+#include "command_line.h"
 
 struct Options {
-    bool help = false;
-    bool version = false;
     bool json = false;
     std::optional<std::string> log;      ///< path
     std::optional<std::string> root;     ///< folder
@@ -16,10 +15,10 @@ struct Options {
     std::optional<std::string> path;     ///< to be taken apart; the program's own otherwise
 };
 
-/// Reads the arguments that follow the program's name. InputError for anything it does not know.
-Options parse_options(const std::vector<std::string>& arguments);
+/// InputError for values and operands that cannot be used.
+Options parse_options(const CommandLine& line);
 
-/// What --help prints.
-extern const char* const USAGE;
+/// What --help prints, and the options taken.
+extern const Syntax SYNTAX;
 
 #endif

@@ -1,7 +1,6 @@
 // The palette's ranges, its colours nearest to others, and a chart of them all.
 
 #include <basalt/graphics.h>
-#include <basalt/version.h>
 
 #include <cstddef>
 #include <string>
@@ -72,14 +71,8 @@ std::string draw_chart(const ColorPalette& palette, const std::string& file) {
     return "Picture\n" + table.text();
 }
 
-std::string run(const std::vector<std::string>& arguments) {
-    const Options options = parse_options(arguments);
-    if (options.help) {
-        return USAGE;
-    }
-    if (options.version) {
-        return "palette " BASALT_VERSION "\n";
-    }
+std::string run(const CommandLine& line) {
+    const Options options = parse_options(line);
     const ColorPalette palette;
     std::string report = options.colours.empty() ? list_ranges() : list_nearest(palette, options.colours);
     if (options.picture) {
@@ -91,5 +84,5 @@ std::string run(const std::vector<std::string>& arguments) {
 }  // namespace
 
 int main(int count, char** arguments) {
-    return run_program("palette", run, count, arguments);
+    return run_program({"palette", SYNTAX, run}, count, arguments);
 }

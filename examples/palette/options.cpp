@@ -5,11 +5,10 @@
 #include <cstdint>
 #include <string_view>
 
-#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 
-const char* const USAGE =
+const Syntax SYNTAX = {
     "Usage: palette [COLOUR]... [--picture FILE]\n"
     "\n"
     "Finds the palette's colours nearest to others, given as RRGGBB or #RRGGBB, and the colour for text "
@@ -22,7 +21,10 @@ const char* const USAGE =
     "  --help          print this and exit\n"
     "  --version       print the version and exit\n"
     "\n"
-    "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad arguments.\n";
+    "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad arguments.\n",
+    {"--picture"},
+    {},
+};
 
 namespace {
 
@@ -39,14 +41,8 @@ COLORREF parse_colour(std::string_view given) {
 
 }  // namespace
 
-Options parse_options(const std::vector<std::string>& arguments) {
-    const CommandLine line = parse_command_line(arguments, {"--picture"});
+Options parse_options(const CommandLine& line) {
     Options options;
-    options.help = line.help;
-    options.version = line.version;
-    if (line.help || line.version) {
-        return options;
-    }
     for (const std::string& colour : line.operands) {
         options.colours.push_back(parse_colour(colour));
     }

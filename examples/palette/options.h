@@ -8,17 +8,17 @@
 #include <string>
 #include <vector>
 
+#include "command_line.h"
+
 struct Options {
-    bool help = false;
-    bool version = false;
     std::vector<COLORREF> colours;
     std::optional<std::string> picture;
 };
 
-/// Reads the arguments that follow the program's name. InputError for anything it does not know.
-Options parse_options(const std::vector<std::string>& arguments);
+/// InputError for values and operands that cannot be used.
+Options parse_options(const CommandLine& line);
 
-/// What --help prints.
-extern const char* const USAGE;
+/// What --help prints, and the options taken.
+extern const Syntax SYNTAX;
 
 #endif

@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # The program from the outside: its figures, its picture as another program reads it, and every refusal.
 # Usage: palette_test.sh PROGRAM
-. "$(dirname "$0")/../support/program_test.sh"
+. "$(dirname "$0")/../../console/program_test.sh"
 
 # line TEXT: some line of the report has these words
 line() {

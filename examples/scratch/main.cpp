@@ -1,7 +1,6 @@
 // A job that needs more memory than it may take: sorts a laser scan on temporary files and grids it.
 
 #include <basalt/memory.h>
-#include <basalt/version.h>
 
 #include <algorithm>
 #include <chrono>
@@ -9,7 +8,6 @@
 #include <memory>
 #include <stdexcept>
 #include <string>
-#include <vector>
 
 #include "cell_reader.h"
 #include "interrupt.h"
@@ -73,7 +71,9 @@ void merge_into(PointStore& store, PointRuns& runs, std::uint64_t expected) {
 }
 
 std::string line_of(const Cell& cell) {
-    const auto metres = [](std::int32_t millimetres) { return "," + fixed_text(millimetres / 1000.0, 3); };
+    const auto metres = [](std::int32_t millimetres) {
+        return std::string(1, ',').append(fixed_text(millimetres / 1000.0, 3));
+    };
     return std::to_string(cell.row) + "," + std::to_string(cell.column) + "," + std::to_string(cell.points) +
            metres(cell.lowest) + metres(cell.median) + metres(cell.highest) + "\n";
 }
@@ -103,7 +103,8 @@ std::string read_cells(const PointStore& store, bool wants_text, Outcome& outcom
     return text;
 }
 
-std::string sort_and_grid(const Options& options) {
+std::string sort_and_grid(const CommandLine& line) {
+    const Options options = parse_options(line);
     catch_interrupts();
     // What a run that was killed has left in the folder.
     vex_util::CMemoryMap::CleanUp();
@@ -135,21 +136,10 @@ std::string sort_and_grid(const Options& options) {
     return write_report(outcome);
 }
 
-std::string run(const std::vector<std::string>& arguments) {
-    const Options options = parse_options(arguments);
-    if (options.help) {
-        return USAGE;
-    }
-    if (options.version) {
-        return "scratch " BASALT_VERSION "\n";
-    }
-    return sort_and_grid(options);
-}
-
 }  // namespace
 
 int main(int count, char** arguments) {
-    const int code = run_program("scratch", run, count, arguments);
+    const int code = run_program({"scratch", SYNTAX, sort_and_grid}, count, arguments);
     end_as_interrupted();
     return code;
 }

@@ -1,11 +1,10 @@
 #include "options.h"
 
-#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 #include "scan.h"
 
-const char* const USAGE =
+const Syntax SYNTAX = {
     "Usage: scratch [OPTION]...\n"
     "\n"
     "Generates a laser scan, sorts it into cells of one metre on temporary files, and reports the ground's\n"
@@ -17,7 +16,10 @@ const char* const USAGE =
     "  --version     print the version and exit\n"
     "\n"
     "Files are made in the folder that TMPDIR names, else in /tmp. Ctrl-C ends the job and leaves none.\n"
-    "Exit status: 0 success, 1 a file could not be written or room ran out, 2 bad arguments.\n";
+    "Exit status: 0 success, 1 a file could not be written or room ran out, 2 bad arguments.\n",
+    {"--points", "--cells"},
+    {},
+};
 
 namespace {
 
@@ -32,14 +34,8 @@ std::int64_t parse_points(const std::string& text) {
 
 }  // namespace
 
-Options parse_options(const std::vector<std::string>& arguments) {
-    const CommandLine line = parse_command_line(arguments, {"--points", "--cells"});
+Options parse_options(const CommandLine& line) {
     Options options;
-    options.help = line.help;
-    options.version = line.version;
-    if (line.help || line.version) {
-        return options;
-    }
     refuse_operands(line);
     for (const auto& [name, value] : line.options) {
         if (name == "--points") {

@@ -5,19 +5,18 @@
 #include <cstdint>
 #include <optional>
 #include <string>
-#include <vector>
+
+#include "command_line.h"
 
 struct Options {
-    bool help = false;
-    bool version = false;
     std::optional<std::int64_t> points;
     std::optional<std::string> cells;  ///< path
 };
 
-/// Reads the arguments that follow the program's name. InputError for anything it does not know.
-Options parse_options(const std::vector<std::string>& arguments);
+/// InputError for values and operands that cannot be used.
+Options parse_options(const CommandLine& line);
 
-/// What --help prints.
-extern const char* const USAGE;
+/// What --help prints, and the options taken.
+extern const Syntax SYNTAX;
 
 #endif

@@ -2,7 +2,7 @@
 # The program from the outside: cells against what awk makes of the same scan, a job beyond its memory limit,
 # and that nothing stays in the temporary folder however it ends.
 # Usage: scratch_test.sh PROGRAM
-. "$(dirname "$0")/../support/program_test.sh"
+. "$(dirname "$0")/../../console/program_test.sh"
 mkdir temporary
 export TMPDIR=$work/temporary
 

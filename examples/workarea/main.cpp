@@ -1,7 +1,5 @@
 // Area, elevations, slope and earthwork of a work area, computed over a sparse array of terrain cells.
 
-#include <basalt/version.h>
-
 #include <chrono>
 #include <filesystem>
 #include <memory>
@@ -66,7 +64,8 @@ void spare_inputs(const Options& options) {
     }
 }
 
-std::string measure(const Options& options) {
+std::string measure(const CommandLine& line) {
+    const Options options = parse_options(line);
     // Small inputs first: a mistake in them is told before a large terrain is read.
     if (options.picture) {
         spare_inputs(options);
@@ -100,19 +99,8 @@ std::string measure(const Options& options) {
     return write_report(outcome);
 }
 
-std::string run(const std::vector<std::string>& arguments) {
-    const Options options = parse_options(arguments);
-    if (options.help) {
-        return USAGE;
-    }
-    if (options.version) {
-        return "workarea " BASALT_VERSION "\n";
-    }
-    return measure(options);
-}
-
 }  // namespace
 
 int main(int count, char** arguments) {
-    return run_program("workarea", run, count, arguments);
+    return run_program({"workarea", SYNTAX, measure}, count, arguments);
 }

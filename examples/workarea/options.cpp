@@ -3,12 +3,11 @@
 #include <cmath>
 #include <string_view>
 
-#include "command_line.h"
 #include "input_error.h"
 #include "number_parsing.h"
 #include "synthetic_terrain.h"
 
-const char* const USAGE =
+const Syntax SYNTAX = {
     "Usage: workarea TERRAIN.asc [OPTION]...\n"
     "       workarea --synthetic N [OPTION]...\n"
     "\n"
@@ -29,7 +28,10 @@ const char* const USAGE =
     "  --version            print the version and exit\n"
     "\n"
     "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad arguments or "
-    "input.\n";
+    "input.\n",
+    {"--boundary", "--view", "--grade", "--picture", "--synthetic"},
+    {"--legend"},
+};
 
 namespace {
 
@@ -88,15 +90,8 @@ void set_option(Options& options, std::string_view name, const std::string& valu
 
 }  // namespace
 
-Options parse_options(const std::vector<std::string>& arguments) {
-    const CommandLine line = parse_command_line(
-        arguments, {"--boundary", "--view", "--grade", "--picture", "--synthetic"}, {"--legend"});
+Options parse_options(const CommandLine& line) {
     Options options;
-    options.help = line.help;
-    options.version = line.version;
-    if (line.help || line.version) {
-        return options;
-    }
     for (const auto& [name, value] : line.options) {
         set_option(options, name, value);
     }

@@ -5,7 +5,8 @@
 #include <cstdint>
 #include <optional>
 #include <string>
-#include <vector>
+
+#include "command_line.h"
 
 /// A rectangle in the terrain's own coordinates, degrees.
 struct DegreeBox {
@@ -16,8 +17,6 @@ struct DegreeBox {
 };
 
 struct Options {
-    bool help = false;
-    bool version = false;
     std::string terrain;  ///< path; empty with synthetic
     std::optional<std::int64_t> synthetic;
     std::optional<std::string> boundary;
@@ -27,10 +26,10 @@ struct Options {
     bool legend = false;
 };
 
-/// Reads the arguments that follow the program's name. InputError for anything it does not know.
-Options parse_options(const std::vector<std::string>& arguments);
+/// InputError for values and operands that cannot be used.
+Options parse_options(const CommandLine& line);
 
-/// What --help prints.
-extern const char* const USAGE;
+/// What --help prints, and the options taken.
+extern const Syntax SYNTAX;
 
 #endif

@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # The program from the outside: figures against what awk makes of the same files, and every refusal.
 # Usage: workarea_test.sh PROGRAM DATA_DIRECTORY
-. "$(dirname "$0")/../support/program_test.sh"
+. "$(dirname "$0")/../../console/program_test.sh"
 terrain=$data/jacksboro.asc
 boundary=$data/boundary.csv
 

@@ -1,6 +1,6 @@
 // Numbers from text the same way in every locale.
-#ifndef EXAMPLES_NUMBER_PARSING_H
-#define EXAMPLES_NUMBER_PARSING_H
+#ifndef CONSOLE_NUMBER_PARSING_H
+#define CONSOLE_NUMBER_PARSING_H
 
 #include <charconv>
 #include <cmath>

@@ -1,6 +1,6 @@
 // Bad input, said in one line that names where it stands.
-#ifndef EXAMPLES_INPUT_ERROR_H
-#define EXAMPLES_INPUT_ERROR_H
+#ifndef CONSOLE_INPUT_ERROR_H
+#define CONSOLE_INPUT_ERROR_H
 
 #include <cstddef>
 #include <stdexcept>

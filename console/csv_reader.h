@@ -1,6 +1,6 @@
 // Comma-separated files, line by line, with the place of every field.
-#ifndef EXAMPLES_CSV_READER_H
-#define EXAMPLES_CSV_READER_H
+#ifndef CONSOLE_CSV_READER_H
+#define CONSOLE_CSV_READER_H
 
 #include <cstddef>
 #include <cstdio>

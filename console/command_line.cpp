@@ -9,15 +9,14 @@ namespace {
 
 class Parser {
 public:
-    Parser(const std::vector<std::string>& arguments, const std::vector<std::string_view>& names,
-           const std::vector<std::string_view>& flags)
-        : m_arguments(arguments), m_names(names), m_flags(flags) {}
+    Parser(const std::vector<std::string>& arguments, const Syntax& syntax)
+        : m_arguments(arguments), m_syntax(syntax) {}
 
     CommandLine parse() {
         bool only_operands = false;
         for (; m_at < m_arguments.size() && !m_line.help && !m_line.version; ++m_at) {
             const std::string& argument = m_arguments[m_at];
-            if (only_operands || argument.size() < 2 || argument[0] != '-') {
+            if (only_operands || is_operand(argument)) {
                 m_line.operands.push_back(argument);
             } else if (argument == "--") {
                 only_operands = true;
@@ -25,7 +24,7 @@ public:
                 m_line.help = true;
             } else if (argument == "--version") {
                 m_line.version = true;
-            } else if (is_one_of(m_flags, argument)) {
+            } else if (is_one_of(m_syntax.flags, argument)) {
                 m_line.flags.push_back(argument);
             } else {
                 take_option(argument);
@@ -35,6 +34,11 @@ public:
     }
 
 private:
+    static bool is_operand(const std::string& argument) {
+        return argument.size() < 2 || argument[0] != '-' || argument[1] == '.' ||
+               (argument[1] >= '0' && argument[1] <= '9');
+    }
+
     static bool is_one_of(const std::vector<std::string_view>& names, std::string_view name) {
         return std::find(names.begin(), names.end(), name) != names.end();
     }
@@ -42,8 +46,8 @@ private:
     void take_option(const std::string& argument) {
         const std::size_t equals = argument.find('=');
         const std::string name = argument.substr(0, equals);
-        if (!is_one_of(m_names, name)) {
-            throw InputError(is_one_of(m_flags, name)
+        if (!is_one_of(m_syntax.names, name)) {
+            throw InputError(is_one_of(m_syntax.flags, name)
                                  ? "option " + name + " takes no value"
                                  : "unknown option " + quoted(argument) + " (--help lists them)");
         }
@@ -59,18 +63,15 @@ private:
     }
 
     const std::vector<std::string>& m_arguments;
-    const std::vector<std::string_view>& m_names;
-    const std::vector<std::string_view>& m_flags;
+    const Syntax& m_syntax;
     std::size_t m_at = 0;
     CommandLine m_line;
 };
 
 }  // namespace
 
-CommandLine parse_command_line(const std::vector<std::string>& arguments,
-                               const std::vector<std::string_view>& names,
-                               const std::vector<std::string_view>& flags) {
-    return Parser(arguments, names, flags).parse();
+CommandLine parse_command_line(const std::vector<std::string>& arguments, const Syntax& syntax) {
+    return Parser(arguments, syntax).parse();
 }
 
 std::string file_operand(const CommandLine& line, const std::string& what) {

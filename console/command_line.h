@@ -1,6 +1,6 @@
 // The arguments of a program.
-#ifndef EXAMPLES_COMMAND_LINE_H
-#define EXAMPLES_COMMAND_LINE_H
+#ifndef CONSOLE_COMMAND_LINE_H
+#define CONSOLE_COMMAND_LINE_H
 
 #include <string>
 #include <string_view>
@@ -15,11 +15,17 @@ struct CommandLine {
     std::vector<std::string> flags;                            ///< names as given
 };
 
-/// Reads `--name VALUE`, `--name=VALUE`, `--flag`, `--help`, `--version` and operands; behind `--` everything
-/// is an operand. Nothing behind --help or --version is looked at. InputError for all else.
-CommandLine parse_command_line(const std::vector<std::string>& arguments,
-                               const std::vector<std::string_view>& names,
-                               const std::vector<std::string_view>& flags = {});
+/// What a program takes.
+struct Syntax {
+    const char* usage;                    ///< what --help prints
+    std::vector<std::string_view> names;  ///< options with a value
+    std::vector<std::string_view> flags;  ///< options without one, besides --help and --version
+};
+
+/// Reads `--name VALUE`, `--name=VALUE`, `--flag`, `--help`, `--version` and operands. A minus before a digit
+/// or a point begins a number, which is an operand; behind `--` everything is one. Nothing behind --help or
+/// --version is looked at. InputError for all else.
+CommandLine parse_command_line(const std::vector<std::string>& arguments, const Syntax& syntax);
 
 /// The one operand of a program that takes a file at most, empty when there is none. InputError for a second
 /// one and for an empty name; `what` names the file in it.

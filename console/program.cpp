@@ -1,11 +1,14 @@
 #include "program.h"
 
+#include <basalt/version.h>
+
 #include <cerrno>
 #include <cstdio>
 #include <exception>
 #include <new>
 #include <stdexcept>
 #include <system_error>
+#include <vector>
 
 #include "input_error.h"
 
@@ -20,18 +23,22 @@ void write_all(std::FILE* file, const std::string& text, const std::string& name
     }
 }
 
+std::string text_of(const Program& program, const CommandLine& line) {
+    if (line.help) {
+        return program.syntax.usage;
+    }
+    return line.version ? std::string(program.name) + " " BASALT_VERSION "\n" : program.run(line);
+}
+
 }  // namespace
 
-int run_program(const char* name, Command command, int count, char** arguments) {
-    const auto complain = [name](const char* message, ExitCode code) {
-        std::fprintf(stderr, "%s: %s\n", name, message);
+int exit_status_of(const std::string& name, const std::function<int()>& work) {
+    const auto complain = [&name](const char* message, ExitCode code) {
+        std::fprintf(stderr, "%s: %s\n", name.c_str(), message);
         return code;
     };
     try {
-        const std::string text =
-            command(std::vector<std::string>(arguments + (count > 0 ? 1 : 0), arguments + count));
-        write_all(stdout, text, "standard output");
-        return SUCCESS;
+        return work();
     } catch (const InputError& error) {
         return complain(error.what(), BAD_INPUT);
     } catch (const std::bad_alloc&) {
@@ -39,6 +46,18 @@ int run_program(const char* name, Command command, int count, char** arguments) 
     } catch (const std::exception& error) {
         return complain(error.what(), FAILURE);
     }
+}
+
+int run_program(const Program& program, int count, char** arguments) {
+    return exit_status_of(program.name, [&] {
+        const std::vector<std::string> words(arguments + (count > 0 ? 1 : 0), arguments + count);
+        print(text_of(program, parse_command_line(words, program.syntax)));
+        return SUCCESS;
+    });
+}
+
+void print(const std::string& text) {
+    write_all(stdout, text, "standard output");
 }
 
 void write_file(const std::string& path, const std::string& text) {

@@ -1,0 +1,32 @@
+// What every command-line program here does at its two ends: one line for an error, an exit status, and a
+// report that is not lost on a full disk.
+#ifndef CONSOLE_PROGRAM_H
+#define CONSOLE_PROGRAM_H
+
+#include <functional>
+#include <string>
+
+#include "command_line.h"
+
+struct Program {
+    const char* name;
+    const Syntax& syntax;
+    std::string (*run)(const CommandLine& line);  ///< makes the text for standard output
+};
+
+/// Runs a program and prints its text, its usage or its version. Exit status: 0 success, 1 when the text
+/// cannot be written or anything else failed, 2 for an InputError; an error is one line `name: message` on
+/// standard error.
+int run_program(const Program& program, int count, char** arguments);
+
+/// Does the work of a program that writes its output itself, and answers for what it throws as run_program()
+/// does.
+int exit_status_of(const std::string& name, const std::function<int()>& work);
+
+/// Prints a text whole. std::runtime_error, with the system's reason, when that fails.
+void print(const std::string& text);
+
+/// Writes a file whole. std::runtime_error, naming it and the system's reason, when that fails.
+void write_file(const std::string& path, const std::string& text);
+
+#endif

@@ -1,0 +1,73 @@
+// What a command is: its texts, its options, and what it does with a line.
+#ifndef TOOLS_COMMAND_H
+#define TOOLS_COMMAND_H
+
+#include <functional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "command_line.h"
+#include "fields.h"
+#include "format.h"
+#include "row.h"
+
+struct Option {
+    const char* name;
+    const char* value;  ///< what it takes, for the help; empty for a flag
+    const char* help;   ///< one line
+};
+
+/// @name Options of many commands
+/// @{
+inline constexpr Option CSV = {"--csv", "", "fields are separated by commas, read and written"};
+inline constexpr Option DEGREES = {"--degrees", "",
+                                   "angles are degrees instead of radians, read and written"};
+inline constexpr Option INVERSE = {"--inverse", "", "the other way: read what is written otherwise"};
+inline constexpr Option KEEP = {"--keep", "", "write the line as it was, then the results"};
+inline constexpr Option PRECISION = {"--precision", "N",
+                                     "digits of metres and seconds behind the point, 0 to 9 (default: 4)"};
+/// @}
+
+/// A shell line that works as it stands, and all that it prints.
+struct Example {
+    const char* shell;
+    const char* output;
+};
+
+/// Which lines hold fields.
+enum class Lines {
+    MARKED,   ///< all but blank ones and those that begin with #, which are copied
+    UNMARKED  ///< all: anything may be a text
+};
+
+/// Reads a line's fields and writes its results. InputError, which may come after some were written, refuses
+/// the line.
+using Filter = std::function<void(Fields&, Row&)>;
+
+struct Command {
+    const char* name;
+    const char* operands;  ///< as the usage shows them, empty for none
+    const char* summary;   ///< one line
+    const char* fields;    ///< what is read and written: units, ranges, axes; lines of at most 96 characters
+    std::vector<Option> options;
+    std::vector<Example> examples;
+    /// Takes operands and options of its own. InputError for those that cannot be used.
+    Filter (*make)(const CommandLine& line, const Format& format);
+    Lines lines = Lines::MARKED;
+    char separator = ' ';  ///< between the fields it writes, unless --csv says otherwise
+};
+
+/// Whether an option was given that takes no value.
+bool has_flag(const CommandLine& line, const Option& option);
+
+/// The value given with an option, or null.
+const std::string* value_of(const CommandLine& line, const Option& option);
+
+/// The operands, for a command that takes exactly so many; `usage` names them in the InputError otherwise.
+const std::vector<std::string>& operands(const CommandLine& line, std::size_t count, const char* usage);
+
+/// What the options of many commands say.
+Format format_of(const Command& command, const CommandLine& line);
+
+#endif

@@ -1,0 +1,47 @@
+// The fields of a line, read from the left.
+#ifndef TOOLS_FIELDS_H
+#define TOOLS_FIELDS_H
+
+#include <cstddef>
+#include <cstdint>
+#include <string_view>
+
+#include "format.h"
+
+/// Fields between blanks, or between commas with blanks around them. What does not fit is an InputError that
+/// says what was expected: `what`, a few words with the unit.
+class Fields {
+public:
+    Fields(std::string_view line, const Format& format) : m_format(format), m_line(line) {}
+
+    std::string_view text(const char* what);
+    /// A finite number.
+    double number(const char* what);
+    /// A finite number from `low` to `high`.
+    double number(const char* what, double low, double high);
+    std::int64_t whole(const char* what, std::int64_t low, std::int64_t high);
+    /// @name Angles as the options say, in radians
+    /// @{
+    double angle(const char* what);
+    double latitude();
+    double longitude() { return angle("a longitude"); }
+    /// @}
+
+    /// The line as a whole, of which nothing is left then.
+    std::string_view whole_line();
+    /// Whether there is no further field.
+    bool ended() const { return m_ended || m_at == m_line.size(); }
+    /// What was not read, without blanks at its ends.
+    std::string_view rest() const;
+
+private:
+    [[noreturn]] void fail(const char* what, std::string_view found) const;
+    void skip_blanks();
+
+    const Format& m_format;
+    std::string_view m_line;
+    std::size_t m_at = 0;
+    bool m_ended = false;  ///< no comma, and so no field, follows
+};
+
+#endif

@@ -1,0 +1,12 @@
+// Every line of standard input through a filter to standard output.
+#ifndef TOOLS_FILTER_H
+#define TOOLS_FILTER_H
+
+#include "command.h"
+
+/// Runs a command with its arguments. A line that it refuses is told on standard error, with its number, and
+/// left out.
+/// @return 0, or 1 when a line was refused
+int run_filter(const Command& command, const CommandLine& line);
+
+#endif

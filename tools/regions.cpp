@@ -1,0 +1,67 @@
+// Points and polygons in the plane.
+#include <basalt/geo.h>
+
+#include <optional>
+#include <vector>
+
+#include "commands.h"
+#include "csv_reader.h"
+#include "input_error.h"
+#include "number_parsing.h"
+
+namespace {
+
+constexpr Option TOLERANCE = {"--tolerance", "METRES",
+                              "a point within this distance of the outline is inside too"};
+
+constexpr double FARTHEST = 1e12;
+
+std::vector<geo_nee> read_polygon(const std::string& path) {
+    CsvReader reader(path);
+    std::vector<geo_nee> vertices;
+    while (reader.next()) {
+        const double north = reader.number(0, "a northing in metres", -FARTHEST, FARTHEST);
+        vertices.push_back({north, reader.number(1, "an easting in metres", -FARTHEST, FARTHEST), 0});
+    }
+    if (vertices.size() > 1 && vertices.front().north == vertices.back().north &&
+        vertices.front().east == vertices.back().east) {
+        vertices.pop_back();
+    }
+    if (vertices.size() < 3) {
+        throw InputError(path, "a polygon has three vertices at least");
+    }
+    return vertices;
+}
+
+Filter make_contains(const CommandLine& line, const Format&) {
+    const std::vector<geo_nee> polygon = read_polygon(operands(line, 1, "POLYGON.csv")[0]);
+    std::optional<double> tolerance;
+    if (const std::string* text = value_of(line, TOLERANCE)) {
+        tolerance = parse_number(*text);
+        if (!tolerance || *tolerance < 0) {
+            throw InputError("--tolerance takes metres from 0 on, not " + quoted(*text));
+        }
+    }
+    return [polygon, tolerance, count = static_cast<int>(polygon.size())](Fields& fields, Row& row) {
+        const double north = fields.number("a northing in metres");
+        const geo_nee point = {north, fields.number("an easting in metres"), 0};
+        row.whole(tolerance ? geo_point_in_poly_2(count, polygon.data(), &point, *tolerance)
+                            : geo_point_in_poly(count, polygon.data(), &point));
+    };
+}
+
+}  // namespace
+
+const Command CONTAINS = {
+    "contains",
+    "POLYGON.csv",
+    "whether a point lies in a polygon",
+    "Reads NORTH EAST in metres. Writes 1 for a point inside or on a vertex, else 0. POLYGON.csv has a\n"
+    "vertex NORTH,EAST on each line, in either order; more fields, blank lines and what follows a # are\n"
+    "passed over, and the first vertex may be repeated at the end. A point on an edge may be either;\n"
+    "--tolerance brings the outline in.",
+    {TOLERANCE, CSV, KEEP},
+    {{"printf '0,0\\n0,10\\n10,10\\n10,0\\n' >site.csv; printf '5 5\\n5 15\\n' | basalt contains site.csv "
+      "--keep",
+      "5 5 1\n5 15 0"}},
+    make_contains};

@@ -21,7 +21,7 @@ test_with() {  # preset
 step_clang() { test_with clang; }
 step_headers() { scripts/check_headers.sh build/clang; }
 step_tidy() {
-    git ls-files 'src/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/clang --quiet
+    git ls-files 'src/*.cpp' 'tools/*.cpp' 'console/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/clang --quiet
 }
 step_elsewhere() {
     # a time zone off the full hour, on both sides of the year's changes; a locale whose decimal sign is a comma

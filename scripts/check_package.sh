@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
-# Installs the library, moves the installed tree, and builds outside programs against it: by find_package, by a
-# bare compiler line with pkg-config (the README's program too), and as a subproject; each shared and static.
+# Installs the library and its tool, moves the installed tree, runs the tool there, and builds outside programs
+# against the library: by find_package, by a bare compiler line with pkg-config (the README's program too), and as a
+# subproject; each shared and static.
 # Usage: scripts/check_package.sh
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
@@ -29,6 +30,11 @@ check() {  # ON or OFF: shared or static
         echo "the installed files name the place they were built or installed in"
         return 1
     fi
+
+    # the moved tool finds the moved library, and its pages came along
+    [ "$("$prefix/bin/basalt" hex <<<ok)" = 6f6b ]
+    grep -q '^\.TH basalt' "$prefix/share/man/man1/basalt.1"
+    bash -n "$prefix/share/bash-completion/completions/basalt"
 
     build tests/package/find_package "$work/found-$kind" -DCMAKE_PREFIX_PATH="$prefix" \
         -DCMAKE_CXX_FLAGS="${warnings[*]}" -Dbasalt_DIR="$prefix/$libdir/cmake/basalt"

@@ -62,12 +62,12 @@ Filter make_llh2xyz(const CommandLine& line, const Format&) {
 
 Filter make_neu(const CommandLine& line, const Format& format) {
     const auto read = has_flag(line, GEODETIC) ? read_llh : read_xyz;
-    const geo_vector origin = read_operand(operands(line, 1, "ORIGIN")[0], "ORIGIN", format, read);
-    try {
+    const auto read_origin = [read](Fields& fields) {
+        const geo_vector origin = read(fields);
         geodetic(origin);
-    } catch (const InputError& error) {
-        throw InputError(std::string("ORIGIN: ") + error.what());
-    }
+        return origin;
+    };
+    const geo_vector origin = read_operand(operands(line, 1, "ORIGIN")[0], "ORIGIN", format, read_origin);
     return [read, origin](Fields& fields, Row& row) {
         const geo_vector point = read(fields);
         geo_nee local = {};

@@ -128,12 +128,10 @@ void write_feet(double metres, int denominator, const Format& format, Row& row) 
     if (feet == INT_MAX) {
         throw InputError("the length is too large for feet and inches");
     }
-    const double unit = denominator == 0 ? std::pow(10, format.precision) : 1;
-    inches = denominator == 0 ? std::round(inches * unit) / unit : std::floor(inches);
-    if (over != 0 && over == under) {  // the fraction rounded up to a whole inch
-        inches += 1;
-        over = 0;
-    }
+    const double unit = std::pow(10, format.precision);
+    // A fraction that rounds up to a whole inch comes as none, and the inches as they are.
+    const bool carried = over == 0 && inches - std::floor(inches) >= 0.5;
+    inches = denominator == 0 ? std::round(inches * unit) / unit : std::floor(inches) + (carried ? 1 : 0);
     if (inches >= 12) {
         inches -= 12;
         ++feet;

@@ -1,5 +1,5 @@
-# Debian packages, made by cpack: the library, what is needed to build against it, and its documentation.
-# scripts/packages_debian.sh makes all of them, the static archive included, and the source archive.
+# Debian packages, made by cpack: the library, what is needed to build against it, the tool, and the documentation.
+# scripts/debian_packages.sh makes all of them, the static archive included, and the source archive.
 set(CPACK_PACKAGE_NAME basalt)
 set(CPACK_PACKAGE_CONTACT "The basalt authors <basalt@localhost>")
 set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "${PROJECT_DESCRIPTION}")
@@ -29,6 +29,14 @@ set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS
   "${CPACK_DEBIAN_RUNTIME_PACKAGE_NAME} (= ${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE}), libpixman-1-dev")
 set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION "Headers and archives of basalt
  What a program needs to be built against the basalt runtime library.")
+
+set(CPACK_DEBIAN_TOOLS_PACKAGE_NAME basalt)
+set(CPACK_DEBIAN_TOOLS_PACKAGE_SECTION science)
+set(CPACK_DEBIAN_TOOLS_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_TOOLS_PACKAGE_DEPENDS
+  "${CPACK_DEBIAN_RUNTIME_PACKAGE_NAME} (= ${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE})")
+set(CPACK_COMPONENT_TOOLS_DESCRIPTION "Geodesy, time and text conversions as filters
+ The basalt runtime library's conversions over standard input, line by line.")
 
 set(CPACK_DEBIAN_DOCUMENTATION_PACKAGE_NAME basalt-doc)
 set(CPACK_DEBIAN_DOCUMENTATION_PACKAGE_SECTION doc)

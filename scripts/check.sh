@@ -44,7 +44,7 @@ step_hardening() {
     mkdir -p $again/basalt
     git ls-files -z | xargs -0 cp --parents -t $again/basalt
     cmake -S $again/basalt -B $again/build -G Ninja -DCMAKE_BUILD_TYPE=Release -DBUILD_SHARED_LIBS=ON \
-        -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF
+        -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_TOOLS=OFF
     cmake --build $again/build --target basalt
     scripts/check_hardening.sh $installed/libbasalt.so $again/build/src/libbasalt.so
 }
@@ -83,7 +83,8 @@ step_stress() {
     build/tsan/tests/stress "${STRESS_SECONDS:-5}"
 }
 step_docs() {
-    cmake -S . -B build/docs -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_DOCS=ON
+    cmake -S . -B build/docs -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF \
+        -DBASALT_BUILD_TOOLS=OFF -DBASALT_BUILD_DOCS=ON
     cmake --build build/docs --target docs
 }
 step_fuzz_one() {  # program; begins with the kept inputs, and what is found goes into the first folder

@@ -47,6 +47,8 @@ tar -xf basalt-*.tar.gz -C source --strip-components=1
     g++ -std=c++17 package/consumer.cpp -o bare-static $(pkg-config --cflags basalt) -l:libbasalt.a \
         $(pkg-config --static --libs-only-l basalt | sed 's/-lbasalt//')
 } >build.log 2>&1 || { tail -n 40 build.log; exit 1; }
+basalt --version
+ls /usr/share/man/man1/basalt.1* >/dev/null || { echo "the tool has no manual page"; exit 1; }
 for program in found/consumer sub/consumer ./bare ./bare-static; do
     "$program" || { echo "$program failed"; exit 1; }
 done

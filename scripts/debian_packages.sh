@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Makes the Debian packages (library, development files with the static archive, documentation) and the source
+# Makes the Debian packages (library, development files with the static archive, tool, documentation) and the source
 # archive in build/debian, and prints them. The source archive is of the last commit.
 # Usage: scripts/debian_packages.sh
 set -euo pipefail
@@ -12,26 +12,28 @@ rm -rf "$work"
 mkdir -p "$work"
 build() {  # name, cmake options
     cmake -S . -B "$work/$1" -G Ninja -DCMAKE_BUILD_TYPE=Release -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF \
-        -DCMAKE_INSTALL_PREFIX=/usr -DCMAKE_INSTALL_LIBDIR="lib/$(dpkg-architecture -qDEB_HOST_MULTIARCH)" "${@:2}"
+        -DCMAKE_SKIP_INSTALL_RPATH=ON -DCMAKE_INSTALL_PREFIX=/usr -DCMAKE_INSTALL_LIBDIR="lib/$(dpkg-architecture -qDEB_HOST_MULTIARCH)" "${@:2}"
     cmake --build "$work/$1"
 }
 {
     build shared -DBUILD_SHARED_LIBS=ON -DBASALT_BUILD_DOCS=ON
     cmake --build "$work/shared" --target docs
-    build static -DBUILD_SHARED_LIBS=OFF
+    build static -DBUILD_SHARED_LIBS=OFF -DBASALT_BUILD_TOOLS=OFF
 
     cat >"$work/packages.cmake" <<END
 include("$work/shared/CPackConfig.cmake")
 set(CPACK_PACKAGE_DIRECTORY "$work")
 set(CPACK_INSTALL_CMAKE_PROJECTS
     "$work/shared;basalt;runtime;/" "$work/shared;basalt;development;/" "$work/shared;basalt;documentation;/"
+    "$work/shared;basalt;tools;/"
     "$work/static;basalt;archive;/")
 # the archive joins the development files
-set(CPACK_COMPONENTS_ALL runtime development archive documentation)
+set(CPACK_COMPONENTS_ALL runtime development archive tools documentation)
 set(CPACK_COMPONENTS_GROUPING ONE_PER_GROUP)
 set(CPACK_COMPONENT_DEVELOPMENT_GROUP development)
 set(CPACK_COMPONENT_ARCHIVE_GROUP development)
 set(CPACK_COMPONENT_RUNTIME_GROUP runtime)
+set(CPACK_COMPONENT_TOOLS_GROUP tools)
 set(CPACK_COMPONENT_DOCUMENTATION_GROUP documentation)
 END
     cpack --config "$work/packages.cmake"

@@ -2,10 +2,8 @@
 
 #include <gtest/gtest.h>
 
-#include <thread>
-#include <vector>
-
 #include "src/platform/codec.h"
+#include "tests/support/threads.h"
 
 namespace {
 
@@ -95,20 +93,14 @@ TEST_F(CodecGuardTest, a_lock_that_could_not_be_made_keeps_the_codec_from_starti
 
 TEST_F(CodecGuardTest, threads_share_one_run) {
     CodecGuard guard(FAKE);
-    std::vector<std::thread> threads;
-    for (int t = 0; t < 4; ++t) {
-        threads.emplace_back([&guard] {
-            for (int i = 0; i < 5000; ++i) {
-                guard.AddImage();
-                EXPECT_TRUE(guard.Start());
-                EXPECT_NE(codec.running, 0U) << "no run ends while one of its images is alive";
-                guard.ReleaseImage();
-            }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    basalt::test::run_threads(4, [&](int) {
+        for (int i = 0; i < 5000; ++i) {
+            guard.AddImage();
+            EXPECT_TRUE(guard.Start());
+            EXPECT_NE(codec.running, 0U) << "no run ends while one of its images is alive";
+            guard.ReleaseImage();
+        }
+    });
 }
 
 TEST_F(CodecGuardTest, the_modules_own_runs_the_image_codec) {

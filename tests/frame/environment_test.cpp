@@ -5,12 +5,11 @@
 
 #include <bit>
 #include <cstdlib>
-#include <thread>
 #include <utility>
-#include <vector>
 
 #include "src/frame/environment_state.h"
 #include "src/platform/version_query.h"
+#include "tests/support/threads.h"
 
 namespace {
 
@@ -186,19 +185,13 @@ TEST_F(Environment, tick_0_does_not_reseed_a_fresh_library) {
 
 // For the thread sanitizer, which sees any of them unsynchronised.
 TEST_F(Environment, threads_that_ask_first_get_the_same_answers) {
-    std::vector<std::thread> threads;
-    for (int t = 0; t < 4; ++t) {
-        threads.emplace_back([] {
-            EXPECT_EQ(_handheldVersion(), 1U);
-            EXPECT_EQ(_checkForHighResolution(), 1.0);
-            EXPECT_LT(_random_uint16(), 65535);
-            _setLanguageVersion(15);
-            EXPECT_EQ(_languageVersion(), 15U);
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    basalt::test::run_threads(4, [&](int) {
+        EXPECT_EQ(_handheldVersion(), 1U);
+        EXPECT_EQ(_checkForHighResolution(), 1.0);
+        EXPECT_LT(_random_uint16(), 65535);
+        _setLanguageVersion(15);
+        EXPECT_EQ(_languageVersion(), 15U);
+    });
 }
 
 }  // namespace

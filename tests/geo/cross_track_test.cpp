@@ -1,8 +1,6 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
-#include <limits>
-#include <numbers>
 #include <string>
 
 #include "basalt/geo.h"
@@ -12,10 +10,9 @@
 
 namespace {
 
-using basalt::geo::cross_track;
+using namespace plain;
 
-constexpr double PI = std::numbers::pi;
-constexpr double INF = std::numeric_limits<double>::infinity();
+using basalt::geo::cross_track;
 
 /// A point some metres to the right of the line from a towards b, `along` metres from a.
 geo_llh beside(const geo_llh& a, const geo_llh& b, double along, double right) {
@@ -41,7 +38,7 @@ TEST(CrossTrack, IsPositiveOnTheLeft) {
 TEST(CrossTrack, AgreesWithTheSearchByMetres) {
     const std::uint64_t seed = 31;
     SCOPED_TRACE("seed " + std::to_string(seed));
-    plain::Random random(seed);
+    Random random(seed);
     int ended = 0;
     for (int i = 0; i < 150; ++i) {
         const geo_llh a = {random.real(-1.5, 1.5), random.real(-PI, PI), 0};
@@ -65,7 +62,7 @@ TEST(CrossTrack, AgreesWithTheSearchByMetres) {
 }
 
 TEST(CrossTrack, AnswersWhereStepsOfAMetreNeverSettle) {
-    plain::Random random(32);
+    Random random(32);
     for (const double off : {2e-6, 1e-4, 3e-3, 0.02, 0.1, 0.3, 0.5}) {
         for (int i = 0; i < 500; ++i) {
             const geo_llh a = {random.real(-1.4, 1.4), random.real(-PI, PI), 0};
@@ -94,7 +91,7 @@ TEST(CrossTrack, TakesAFewPassesAnywhere) {
     EXPECT_LE(passes, 8);
     const std::uint64_t seed = 33;
     SCOPED_TRACE("seed " + std::to_string(seed));
-    plain::Random random(seed);
+    Random random(seed);
     for (int i = 0; i < 20000; ++i) {
         const auto anywhere = [&] { return geo_llh{std::asin(random.real(-1, 1)), random.real(-PI, PI), 0}; };
         const geo_llh start = anywhere();

@@ -2,8 +2,6 @@
 
 #include <algorithm>
 #include <cmath>
-#include <limits>
-#include <numbers>
 #include <string>
 
 #include "basalt/geo.h"
@@ -12,9 +10,7 @@
 
 namespace {
 
-constexpr double PI = std::numbers::pi;
-constexpr double INF = std::numeric_limits<double>::infinity();
-const double NOT_A_NUMBER = std::nan("");
+using namespace plain;
 
 geo_vector cartesian(const geo_llh& llh) {
     geo_vector xyz = {};
@@ -112,7 +108,7 @@ TEST(Ellipsoid, TakesExtremesAsNumbers) {
 TEST(Ellipsoid, DecidesAsThePlainIteration) {
     const std::uint64_t seed = 11;
     SCOPED_TRACE("seed " + std::to_string(seed));
-    plain::Random random(seed);
+    Random random(seed);
     for (int i = 0; i < 40000; ++i) {
         const double heights[] = {0.0, random.real(-11e3, 20e3), random.real(0, 20e6),
                                   random.real(-6.4e6, 0)};

@@ -1,17 +1,13 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
-#include <limits>
-#include <numbers>
 
 #include "basalt/geo.h"
 #include "tests/geo/plain_forms.h"
 
 namespace {
 
-constexpr double PI = std::numbers::pi;
-constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
-constexpr double INF = std::numeric_limits<double>::infinity();
+using namespace plain;
 
 void expect_observation(const geo_hvd& actual, const geo_hvd& expected, double tolerance) {
     EXPECT_NEAR(actual.horizontal, expected.horizontal, tolerance);

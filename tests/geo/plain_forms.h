@@ -6,11 +6,17 @@
 #include <cmath>
 #include <cstddef>
 #include <cstdint>
+#include <limits>
+#include <numbers>
 #include <vector>
 
 #include "basalt/geo.h"
 
 namespace plain {
+
+inline constexpr double PI = std::numbers::pi;
+inline constexpr double INF = std::numeric_limits<double>::infinity();
+inline constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
 
 inline void cross(const geo_nee& vj, const geo_nee& vi, const geo_nee& p, int& inside) {
     if ((vi.north <= p.north && p.north < vj.north) || (vj.north <= p.north && p.north < vi.north)) {
@@ -158,6 +164,25 @@ public:
     int below(int n) { return static_cast<int>(bits() % static_cast<std::uint32_t>(n)); }
     /// In [low, high); exact steps of 2^-32 of the range.
     double real(double low, double high) { return low + (high - low) * (bits() * 0x1p-32); }
+
+    /// A number that provokes: a grid value shared by many, one a unit in the last place beside it, one that
+    /// is no grid value, an extreme, or not a number.
+    double awkward() {
+        static constexpr double EXTREMES[] = {
+            0.0, -0.0, 5e-324,       GEO_NULL, 1e-200,  1e154, 1e160,     -1.7e308, 1.7e308,
+            INF, -INF, NOT_A_NUMBER, 1e-8,     -1e-170, 0.1,   1.0 / 3.0, 2e100,    4503599627370497.0};
+        const double grid = below(6);
+        switch (below(8)) {
+            case 0:
+                return std::nextafter(grid, below(2) == 0 ? -1.0 : 9.0);
+            case 1:
+                return real(0.0, 5.0);
+            case 2:
+                return below(4) == 0 ? EXTREMES[below(18)] : grid;
+            default:
+                return grid;
+        }
+    }
 
 private:
     std::uint64_t m_state;

@@ -2,7 +2,6 @@
 
 #include <cmath>
 #include <limits>
-#include <numbers>
 #include <string>
 
 #include "basalt/geo.h"
@@ -10,7 +9,7 @@
 
 namespace {
 
-constexpr double PI = std::numbers::pi;
+using namespace plain;
 
 TEST(RayIntersection, FactsOfMeetingAndMissing) {
     struct Fact {
@@ -49,7 +48,7 @@ TEST(RayIntersection, FactsOfMeetingAndMissing) {
 TEST(RayIntersection, FindsATargetSightedFromTwoStations) {
     const std::uint64_t seed = 7;
     SCOPED_TRACE("seed " + std::to_string(seed));
-    plain::Random random(seed);
+    Random random(seed);
     for (int i = 0; i < 5000; ++i) {
         const auto point = [&] { return geo_nee{random.real(0, 1000), random.real(0, 1000), 0.0}; };
         const geo_nee p1 = point();

@@ -2,11 +2,10 @@
 
 #include <chrono>
 #include <cstdint>
-#include <thread>
-#include <vector>
 
 #include "basalt/geo.h"
 #include "tests/geo/plain_forms.h"
+#include "tests/support/threads.h"
 
 namespace {
 
@@ -154,18 +153,12 @@ TEST(JavaTime, ReadsTheClockOnAnyThread) {
         return static_cast<std::uint64_t>(
             duration_cast<milliseconds>(system_clock::now().time_since_epoch()).count());
     };
-    std::vector<std::thread> threads;
-    for (int i = 0; i < 4; ++i) {
-        threads.emplace_back([&] {
-            const std::uint64_t before = now();
-            const std::uint64_t ours = _currentjavatime();
-            EXPECT_LE(before, ours);
-            EXPECT_LE(ours, now());
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    basalt::test::run_threads(4, [&](int) {
+        const std::uint64_t before = now();
+        const std::uint64_t ours = _currentjavatime();
+        EXPECT_LE(before, ours);
+        EXPECT_LE(ours, now());
+    });
 }
 
 }  // namespace

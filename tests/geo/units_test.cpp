@@ -2,16 +2,13 @@
 
 #include <cmath>
 #include <limits>
-#include <numbers>
 
 #include "basalt/geo.h"
 #include "tests/geo/plain_forms.h"
 
 namespace {
 
-constexpr double PI = std::numbers::pi;
-constexpr double INF = std::numeric_limits<double>::infinity();
-constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
+using namespace plain;
 
 struct Dms {
     int degrees = -1, minutes = -1;
@@ -104,7 +101,7 @@ TEST(FeetAndInches, ReduceTheFractionByHalves) {
 }
 
 TEST(FeetAndInches, ComeBackWithinHalfAFraction) {
-    plain::Random random(7);
+    Random random(7);
     SCOPED_TRACE("seed 7");
     for (int i = 0; i < 20000; ++i) {
         const double metres = random.real(0.0, 1000.0);
@@ -140,7 +137,7 @@ TEST(UnboundedBearing, ReducesAnySize) {
     EXPECT_EQ(_normalisedbearing(GEO_NULL), GEO_NULL);
     EXPECT_EQ(_normalisedbearing(-INF), -INF);
     EXPECT_TRUE(std::isnan(_normalisedbearing(NOT_A_NUMBER)));
-    plain::Random random(9);
+    Random random(9);
     SCOPED_TRACE("seed 9");
     for (int i = 0; i < 2000; ++i) {
         const double angle = random.real(-100.0, 100.0);

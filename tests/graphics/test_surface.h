@@ -12,7 +12,8 @@
 #include "basalt/graphics.h"
 #include "basalt/platform/drawing.h"
 #include "src/frame/environment_state.h"
-#include "tests/support/failing_new.h"
+
+#include "tests/support/with_failing_allocations.h"
 
 namespace basalt::test {
 
@@ -124,24 +125,6 @@ inline void expect_same(const Picture& actual, const Picture& expected) {
         for (int x = 0; x < actual.width; ++x) {
             ASSERT_EQ(actual.at(x, y), expected.at(x, y)) << std::hex << "at " << x << ", " << y;
         }
-    }
-}
-
-// Calls act() with the nth allocation failing, for n = 1, 2, 3, ... until none fails, and check(fired) after
-// each. What act() takes it has to give back.
-template <class Act, class Check>
-void with_failing_allocations(Act act, Check check) {
-    bool fired = true;
-    for (long nth = 1; fired; ++nth) {
-        SCOPED_TRACE(testing::Message() << "allocation " << nth);
-        const long live = live_allocations();
-        {
-            const FailAllocation failure(nth);
-            act();
-            fired = failure.fired();
-        }
-        EXPECT_EQ(live_allocations(), live);
-        check(fired);
     }
 }
 

@@ -11,9 +11,11 @@
 #include <type_traits>
 
 #include "src/platform/file.h"
-#include "tests/support/failing_new.h"
+#include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
+#include "tests/support/with_failing_calls.h"
+#include "tests/support/with_failing_allocations.h"
 
 namespace {
 thread_local bool heap_is_exhausted = false;
@@ -179,56 +181,40 @@ TEST(MemoryMap, every_failing_call_is_made_up_for_by_the_heap) {
     const ScratchFolder folder;
     const long mapped = mapped_balance();
     const long descriptors = open_descriptors();
-    const long live = live_allocations();
-    for (const auto then : {SystemFailure::Then::RECOVERS, SystemFailure::Then::STAYS}) {
-        bool fails = true;
-        for (int n = 1; fails; ++n) {
-            CMemoryMap map;
-            bool is_made = false;
-            {
-                const SystemFailure failure(n, then);
-                is_made = map.Create(SIZE);
-                fails = SystemFailure::struck();
-            }
-            EXPECT_TRUE(is_made);
-            EXPECT_TRUE(is_usable(map, SIZE));
-            EXPECT_EQ(folder.names().size(), fails ? 0U : 1U) << n;
-            EXPECT_EQ(open_descriptors(), descriptors);
-            {
-                CMemoryMap none;
-                const SystemFailure failure(1, then);
-                heap_is_exhausted = true;
-                is_made = none.Create(SIZE);
-                heap_is_exhausted = false;
-            }
-            EXPECT_FALSE(is_made);
-            map.Destroy();
-            EXPECT_EQ(folder.names(), Names{});
-        }
+    CMemoryMap map;
+    bool is_made = false;
+    basalt::test::with_failing_calls([&] { is_made = map.Create(SIZE); },
+                                     [&](bool fails) {
+                                         EXPECT_TRUE(is_made);
+                                         EXPECT_TRUE(is_usable(map, SIZE));
+                                         EXPECT_EQ(folder.names().size(), fails ? 0U : 1U);
+                                         EXPECT_EQ(open_descriptors(), descriptors);
+                                         map.Destroy();
+                                         EXPECT_EQ(folder.names(), Names{});
+                                     });
+    {
+        const SystemFailure failure(1);
+        heap_is_exhausted = true;
+        is_made = map.Create(SIZE);
+        heap_is_exhausted = false;
     }
-    bool has_failed = true;
-    for (long n = 1; has_failed; ++n) {
-        CMemoryMap map;
-        {
-            const FailAllocation failure(n);
+    EXPECT_FALSE(is_made);
+    with_failing_allocations([&] { map.Create(SIZE); },
+                             [&](bool failed) {
+                                 EXPECT_TRUE(is_usable(map, SIZE));
+                                 EXPECT_EQ(folder.names().size(), failed ? 0U : 1U);
+                                 map.Destroy();
+                             });
+    with_failing_allocations(
+        [&] {
             map.Create(SIZE);
-            has_failed = failure.fired();
-        }
-        EXPECT_TRUE(is_usable(map, SIZE));
-        EXPECT_EQ(folder.names().size(), has_failed ? 0U : 1U) << n;
-        folder.write("~stale.mem");
-        {
-            const FailAllocation failure(n);
             CMemoryMap::CleanUp();
-        }
-        {
-            const FailAllocation failure(n);
             map.Destroy();
-        }
-        std::filesystem::remove(folder / "~stale.mem");
-        EXPECT_EQ(open_descriptors(), descriptors);
-    }
-    EXPECT_EQ(live_allocations(), live);
+        },
+        [&](bool) {
+            EXPECT_EQ(open_descriptors(), descriptors);
+            folder.write("~stale.mem");
+        });
     EXPECT_EQ(mapped_balance(), mapped);
 }
 

@@ -11,8 +11,9 @@
 #include "basalt/platform/error.h"
 #include "src/platform/virtual_memory.h"
 #include "tests/support/debug_output.h"
-#include "tests/support/failing_new.h"
+#include "tests/support/open_descriptors.h"
 #include "tests/support/system_failures.h"
+#include "tests/support/with_failing_allocations.h"
 
 // The calls of the library into the platform, on their way through.
 namespace {
@@ -233,19 +234,12 @@ TEST(MMapFileAllocator, failures_are_null_and_unreported) {
         EXPECT_EQ(Mapped::Alloc(nullptr, 4096, RESERVE, &handle), nullptr);
     }
     EXPECT_EQ(handle, 0U);
-    const long live = live_allocations();
-    bool has_failed = true;
-    for (long n = 1; has_failed; ++n) {
-        void* view = nullptr;
-        {
-            const FailAllocation failure(n);
-            view = Mapped::Alloc(nullptr, 4096, RESERVE, &handle);
-            has_failed = failure.fired();
-        }
-        EXPECT_EQ(view == nullptr, has_failed);
-        EXPECT_EQ(view == nullptr ? 1 : Mapped::Free(view, 0, RELEASE, handle), 1);
-    }
-    EXPECT_EQ(live_allocations(), live);
+    void* view = nullptr;
+    with_failing_allocations([&] { view = Mapped::Alloc(nullptr, 4096, RESERVE, &handle); },
+                             [&](bool failed) {
+                                 EXPECT_EQ(view == nullptr, failed);
+                                 EXPECT_EQ(view == nullptr ? 1 : Mapped::Free(view, 0, RELEASE, handle), 1);
+                             });
     EXPECT_EQ(mapped_balance(), mapped);
     EXPECT_EQ(output.take(), Pieces{});
 }

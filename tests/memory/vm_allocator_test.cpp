@@ -11,6 +11,7 @@
 
 #include "basalt/memory.h"
 #include "tests/support/heap_calls.h"
+#include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
 

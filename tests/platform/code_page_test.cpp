@@ -4,9 +4,10 @@
 
 #include <clocale>
 #include <cstdlib>
-#include <filesystem>
 #include <memory>
 #include <random>
+
+#include "tests/support/locales.h"
 
 namespace {
 
@@ -124,19 +125,16 @@ TEST(CodePage, missing_locale_is_utf8) {
 
 // Encodings other than UTF-8, from locales made here where the system has the parts.
 TEST(CodePage, single_and_double_byte_encodings) {
-    const std::filesystem::path folder =
-        std::filesystem::temp_directory_path() / ("basalt_locales_" + std::to_string(std::random_device{}()));
-    std::filesystem::create_directory(folder);
-    const auto make = [&](const char* charmap) {
-        const std::string command = "localedef -c -i POSIX -f " + std::string(charmap) + " '" +
-                                    (folder / charmap).string() + "' >/dev/null 2>&1";
-        return std::system(command.c_str()) != -1 && std::filesystem::exists(folder / charmap / "LC_CTYPE");
-    };
-    const bool made = make("ISO-8859-15") && make("EUC-JP") && make("BIG5-HKSCS") && make("SHIFT_JISX0213") &&
-                      make("TCVN5712-1") && make("TSCII");
+    const test_locales::Folder locales;
+    for (const char* encoding :
+         {"ISO-8859-15", "EUC-JP", "BIG5-HKSCS", "SHIFT_JISX0213", "TCVN5712-1", "TSCII"}) {
+        if (!locales.has(encoding)) {
+            GTEST_SKIP() << "localedef cannot make a locale with " << encoding;
+        }
+    }
     // In a process of its own, since the C library keeps some memory for each locale opened by LOCPATH.
     const auto convert = [&] {
-        setenv("LOCPATH", folder.c_str(), 1);
+        locales.enter("C");
         const CodePage latin("ISO-8859-15");
         EXPECT_EQ(latin.widen("\xA4 \xE9"), L"\x20AC \xE9");
         EXPECT_EQ(latin.narrow(L"\x20AC \xE9 \x416"), "\xA4 \xE9 ?");
@@ -167,14 +165,8 @@ TEST(CodePage, single_and_double_byte_encodings) {
         }
         std::_Exit(testing::Test::HasFailure() ? 1 : 0);
     };
-    if (made) {
-        GTEST_FLAG_SET(death_test_style, "fast");
-        EXPECT_EXIT(convert(), testing::ExitedWithCode(0), "");
-    }
-    std::filesystem::remove_all(folder);
-    if (!made) {
-        GTEST_SKIP() << "localedef cannot make the locales";
-    }
+    GTEST_FLAG_SET(death_test_style, "fast");
+    EXPECT_EXIT(convert(), testing::ExitedWithCode(0), "");
 }
 
 TEST(CodePage, locale_of_the_process_and_thread_stays) {

@@ -2,11 +2,11 @@
 #include <gtest/gtest.h>
 
 #include <climits>
-#include <thread>
 #include <vector>
 
 #include "src/platform/graphics_handles.h"
 #include "tests/platform/drawing_support.h"
+#include "tests/support/threads.h"
 
 namespace {
 
@@ -219,23 +219,17 @@ TEST(Handle, TableFillsUpAndRecovers) {
 }
 
 TEST(Handle, ThreadsUseTheirOwnObjectsAtOnce) {
-    std::vector<std::thread> threads;
-    for (int t = 0; t < 4; ++t) {
-        threads.emplace_back([t] {
-            for (int i = 0; i < 300; ++i) {
-                const auto colour = static_cast<COLORREF>(t * 1000 + i);
-                const Canvas canvas(5, 4, 32);
-                HBRUSH const brush = CreateSolidBrush(colour);
-                const RECT all = {0, 0, 5, 4};
-                EXPECT_NE(FillRect(canvas, &all, brush), 0);
-                EXPECT_NE(DeleteObject(brush), 0);
-                EXPECT_EQ(GetPixel(canvas, 4, 3), colour);
-            }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    basalt::test::run_threads(4, [&](int t) {
+        for (int i = 0; i < 300; ++i) {
+            const auto colour = static_cast<COLORREF>(t * 1000 + i);
+            const Canvas canvas(5, 4, 32);
+            HBRUSH const brush = CreateSolidBrush(colour);
+            const RECT all = {0, 0, 5, 4};
+            EXPECT_NE(FillRect(canvas, &all, brush), 0);
+            EXPECT_NE(DeleteObject(brush), 0);
+            EXPECT_EQ(GetPixel(canvas, 4, 3), colour);
+        }
+    });
 }
 
 TEST(Bitmap, TakesItsRowsPaddedTo16Bits) {

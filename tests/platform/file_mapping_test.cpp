@@ -13,8 +13,10 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/file.h"
+#include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
+#include "tests/support/with_failing_calls.h"
 
 namespace {
 
@@ -128,19 +130,16 @@ TEST(FileMapping, every_failing_call_leaves_nothing_behind) {
     const ScratchFolder folder;
     const long descriptors = open_descriptors();
     const long mapped = mapped_balance();
-    for (const auto then : {SystemFailure::Then::RECOVERS, SystemFailure::Then::STAYS}) {
-        bool fails = true;
-        for (int n = 1; fails; ++n) {
-            const HANDLE file = make_file(folder.wide(L"file"));
-            HANDLE mapping = nullptr;
-            char* view = nullptr;
-            {
-                const SystemFailure failure(n, then);
-                mapping = make_mapping(file);
-                view = mapping != nullptr ? map(mapping) : nullptr;
-                fails = SystemFailure::struck();
-            }
-            EXPECT_EQ(view == nullptr, fails) << n;
+    HANDLE file = make_file(folder.wide(L"file"));
+    HANDLE mapping = nullptr;
+    char* view = nullptr;
+    basalt::test::with_failing_calls(
+        [&] {
+            mapping = make_mapping(file);
+            view = mapping != nullptr ? map(mapping) : nullptr;
+        },
+        [&](bool fails) {
+            EXPECT_EQ(view == nullptr, fails);
             if (view != nullptr) {
                 const SystemFailure failure(1);
                 EXPECT_EQ(UnmapViewOfFile(view), 0);
@@ -152,8 +151,9 @@ TEST(FileMapping, every_failing_call_leaves_nothing_behind) {
             EXPECT_EQ(mapped_balance(), mapped);
             EXPECT_EQ(open_descriptors(), descriptors);
             EXPECT_TRUE(folder.names().empty());
-        }
-    }
+            file = make_file(folder.wide(L"file"));
+        });
+    CloseHandle(file);
 }
 
 // The signal of the limit would end the process; the host's arrangements for it stay as they are.

@@ -13,6 +13,7 @@
 #include "basalt/platform/error.h"
 #include "src/platform/file.h"
 #include "src/platform/wildcard.h"
+#include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
 

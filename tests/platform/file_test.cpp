@@ -15,9 +15,11 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/file_name.h"
-#include "tests/support/failing_new.h"
+#include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
+#include "tests/support/with_failing_calls.h"
+#include "tests/support/with_failing_allocations.h"
 
 namespace {
 
@@ -218,25 +220,19 @@ TEST(File, every_failing_call_leaves_nothing_behind) {
     folder.write("existing");
     const std::wstring existing = folder.wide(L"existing");
     const long descriptors = open_descriptors();
-    for (const auto then : {SystemFailure::Then::RECOVERS, SystemFailure::Then::STAYS}) {
-        for (const DWORD disposition : {CREATE_NEW, OPEN_EXISTING}) {
-            const std::wstring name = disposition == CREATE_NEW ? folder.wide(L"new") : existing;
-            bool fails = true;
-            for (int n = 1; fails; ++n) {
-                HANDLE file = nullptr;
-                {
-                    const SystemFailure failure(n, then);
-                    file = open(name, disposition, 0);
-                    fails = SystemFailure::struck();
-                }
-                EXPECT_EQ(file == INVALID_HANDLE_VALUE, fails) << n;
-                EXPECT_EQ(GetLastError() != 0, fails);
-                EXPECT_EQ(folder.names().contains("new"), disposition == CREATE_NEW && !fails);
-                CloseHandle(file);
-                EXPECT_EQ(open_descriptors(), descriptors);
-            }
-            DeleteFileW(folder.wide(L"new").c_str());
-        }
+    HANDLE file = nullptr;
+    for (const DWORD disposition : {CREATE_NEW, OPEN_EXISTING}) {
+        const std::wstring name = disposition == CREATE_NEW ? folder.wide(L"new") : existing;
+        basalt::test::with_failing_calls([&] { file = open(name, disposition, 0); },
+                                         [&](bool fails) {
+                                             EXPECT_EQ(file == INVALID_HANDLE_VALUE, fails);
+                                             EXPECT_EQ(GetLastError() != 0, fails);
+                                             EXPECT_EQ(folder.names().contains("new"),
+                                                       disposition == CREATE_NEW && !fails);
+                                             CloseHandle(file);
+                                             EXPECT_EQ(open_descriptors(), descriptors);
+                                             DeleteFileW(folder.wide(L"new").c_str());
+                                         });
     }
     for (int n = 1; folder.names() == Names{"existing"}; ++n) {
         bool fails = false;
@@ -250,24 +246,16 @@ TEST(File, every_failing_call_leaves_nothing_behind) {
     }
     {
         const SystemFailure interrupted(1, SystemFailure::Then::RECOVERS, EINTR);
-        const HANDLE file = open(existing, CREATE_NEW);
+        file = open(existing, CREATE_NEW);
         EXPECT_NE(file, INVALID_HANDLE_VALUE) << "a signal only makes the call begin anew";
         EXPECT_EQ(CloseHandle(file), 1);
     }
-    bool has_failed = true;
-    for (long n = 1; has_failed; ++n) {
-        HANDLE file = nullptr;
-        {
-            const FailAllocation failure(n);
-            file = CreateFileW(existing.c_str(), BOTH, 0, nullptr, CREATE_NEW, FILE_FLAG_DELETE_ON_CLOSE,
-                               nullptr);
-            has_failed = failure.fired();
-        }
-        EXPECT_EQ(file == INVALID_HANDLE_VALUE, has_failed);
-        CloseHandle(file);
-        EXPECT_EQ(folder.names(), Names{});
-    }
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE) << "of the last one's close, which was none";
+    with_failing_allocations([&] { file = open(existing, CREATE_NEW); },
+                             [&](bool fails) {
+                                 EXPECT_EQ(file == INVALID_HANDLE_VALUE, fails);
+                                 EXPECT_EQ(CloseHandle(file), fails ? 0 : 1);
+                                 EXPECT_EQ(folder.names(), Names{});
+                             });
 }
 
 }  // namespace

@@ -9,7 +9,6 @@
 #include <cstring>
 #include <map>
 #include <random>
-#include <thread>
 #include <utility>
 #include <vector>
 
@@ -17,6 +16,7 @@
 #include "src/platform/heap_inspection.h"
 #include "src/platform/heap_sanitizer.h"
 #include "tests/support/system_failures.h"
+#include "tests/support/threads.h"
 
 namespace {
 
@@ -148,36 +148,31 @@ TEST(Heap, FollowsTheModelUnderRandomUse) {
 
 TEST(Heap, EightThreadsShareOne) {
     const Heap heap(0);
-    std::vector<std::thread> threads;
-    for (unsigned number = 1; number <= 8; ++number) {
-        threads.emplace_back([&heap, number] {
-            std::mt19937_64 random(number);
-            std::array<std::pair<unsigned char*, std::size_t>, 32> blocks{};
-            for (int step = 0; step < 3000; ++step) {
-                auto& [block, size] = blocks[random() % blocks.size()];
-                for (std::size_t i = 0; i < size; i += 64) {
-                    ASSERT_EQ(block[i], number);
-                }
-                if (random() % 2 == 0) {
-                    ASSERT_EQ(heap.free(std::exchange(block, nullptr)), 1);
-                    size = 0;
-                } else {
-                    size = random() % 4000;
-                    void* fresh = block != nullptr ? heap.resize(block, size) : heap.take(size);
-                    ASSERT_NE(fresh, nullptr);
-                    block = static_cast<unsigned char*>(fresh);
-                    std::memset(block, static_cast<int>(number), size);
-                }
-                if (step % 1000 == 0) {
-                    HeapCompact(heap.handle, 0);
-                    ASSERT_STREQ(inspect_heap(heap.handle).fault, nullptr);
-                }
+    basalt::test::run_threads(8, [&](int thread) {
+        const auto number = static_cast<unsigned>(thread + 1);
+        std::mt19937_64 random(number);
+        std::array<std::pair<unsigned char*, std::size_t>, 32> blocks{};
+        for (int step = 0; step < 3000; ++step) {
+            auto& [block, size] = blocks[random() % blocks.size()];
+            for (std::size_t i = 0; i < size; i += 64) {
+                ASSERT_EQ(block[i], number);
             }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+            if (random() % 2 == 0) {
+                ASSERT_EQ(heap.free(std::exchange(block, nullptr)), 1);
+                size = 0;
+            } else {
+                size = random() % 4000;
+                void* fresh = block != nullptr ? heap.resize(block, size) : heap.take(size);
+                ASSERT_NE(fresh, nullptr);
+                block = static_cast<unsigned char*>(fresh);
+                std::memset(block, static_cast<int>(number), size);
+            }
+            if (step % 1000 == 0) {
+                HeapCompact(heap.handle, 0);
+                ASSERT_STREQ(inspect_heap(heap.handle).fault, nullptr);
+            }
+        }
+    });
     sound(heap.handle);
 }
 

@@ -10,7 +10,8 @@
 #include <cstdarg>
 #include <mutex>
 #include <thread>
-#include <vector>
+
+#include "tests/support/threads.h"
 
 namespace {
 
@@ -55,7 +56,7 @@ TEST_P(LockTest, LetsOneThreadInAtATimeAndWakesTheSleepers) {
     int inside = 0;
     int entered = 0;
     int refused = 0;
-    const auto work = [&] {
+    basalt::test::run_threads(THREADS, [&](int) {
         for (int round = 0; round < ROUNDS; ++round) {
             const std::lock_guard guard(before_any_constructor);
             EXPECT_EQ(++inside, 1);
@@ -66,14 +67,7 @@ TEST_P(LockTest, LetsOneThreadInAtATimeAndWakesTheSleepers) {
             --inside;
             ++entered;
         }
-    };
-    std::vector<std::thread> threads;
-    for (int i = 0; i < THREADS; ++i) {
-        threads.emplace_back(work);
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    });
     EXPECT_EQ(entered, THREADS * ROUNDS);
     EXPECT_EQ(refused, THREADS * ROUNDS) << "not recursive";
     EXPECT_TRUE(before_any_constructor.try_lock());

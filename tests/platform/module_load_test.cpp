@@ -8,6 +8,8 @@
 #include <fstream>
 #include <string>
 
+#include "tests/support/open_descriptors.h"
+
 namespace {
 
 constexpr char LIBRARY[] = BASALT_LIBRARY_PATH;
@@ -67,11 +69,6 @@ std::size_t mappings() {
     return static_cast<std::size_t>(std::count(std::istreambuf_iterator<char>(maps), {}, '\n'));
 }
 
-std::size_t open_descriptors() {
-    return static_cast<std::size_t>(std::distance(std::filesystem::directory_iterator("/proc/self/fd"),
-                                                  std::filesystem::directory_iterator()));
-}
-
 // One run of a host: settings are fresh, then changed; texts are converted (a first-use object); blocks of
 // the shared heap, small ones and one with a region of its own, are left behind for the unloading to release.
 void load_use_and_unload() {
@@ -101,7 +98,7 @@ void load_use_and_unload() {
 struct Footprint {
     std::size_t kilobytes = mapped_kilobytes();
     std::size_t maps = mappings();
-    std::size_t descriptors = open_descriptors();
+    long descriptors = basalt::test::open_descriptors();
 };
 
 TEST(ModuleLoad, a_thousand_loads_leave_nothing_behind) {

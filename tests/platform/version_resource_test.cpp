@@ -10,6 +10,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/module_file_name.h"
+#include "tests/support/scratch_folder.h"
 #include "tests/support/version_block.h"
 
 namespace {
@@ -166,8 +167,6 @@ TEST(VersionQuery, spoilt_blocks_give_nothing_outside_themselves) {
 
 class VersionResourceFile : public testing::Test {
 protected:
-    ~VersionResourceFile() override { std::filesystem::remove(path); }
-
     DWORD size_of(const ProgramFile& program) const {
         program.write(path);
         DWORD handle = 1;
@@ -178,8 +177,8 @@ protected:
         return size;
     }
 
-    const std::filesystem::path path =
-        std::filesystem::temp_directory_path() / ("basalt_program_" + std::to_string(std::random_device{}()));
+    const ScratchFolder folder;
+    const std::filesystem::path path = folder / "program";
     const Bytes block = block_of(survey_resource());
 };
 

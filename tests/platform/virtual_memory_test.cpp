@@ -8,13 +8,13 @@
 #include <algorithm>
 #include <cstdint>
 #include <cstdlib>
-#include <thread>
-#include <vector>
 
 #include "basalt/platform/error.h"
 #include "src/platform/pages.h"
-#include "tests/support/failing_new.h"
 #include "tests/support/system_failures.h"
+#include "tests/support/with_failing_calls.h"
+#include "tests/support/threads.h"
+#include "tests/support/with_failing_allocations.h"
 
 namespace {
 
@@ -140,15 +140,10 @@ TEST(VirtualMemory, what_is_not_reserved_is_refused) {
 
 TEST(VirtualMemory, every_failing_call_leaves_things_as_they_were) {
     const long mapped = mapped_balance();
-    for (const auto then : {SystemFailure::Then::RECOVERS, SystemFailure::Then::STAYS}) {
-        bool fails = true;
-        for (int n = 1; fails; ++n) {
-            char* pages = nullptr;
-            {
-                const SystemFailure failure(n, then);
-                pages = commit(nullptr, 3 * PAGE);
-                fails = SystemFailure::struck();
-            }
+    char* pages = nullptr;
+    basalt::test::with_failing_calls(
+        [&] { pages = commit(nullptr, 3 * PAGE); },
+        [&](bool fails) {
             // A refused unmapping on the way can be neither repaired nor told.
             EXPECT_TRUE(pages != nullptr || fails);
             if (pages != nullptr) {
@@ -163,39 +158,26 @@ TEST(VirtualMemory, every_failing_call_leaves_things_as_they_were) {
                 EXPECT_EQ(pages[0], 'x');
                 EXPECT_EQ(release(pages), 1);
             }
-        }
-    }
-    bool has_failed = true;
-    for (long n = 1; has_failed; ++n) {
-        char* pages = nullptr;
-        {
-            const FailAllocation failure(n);
-            pages = reserve(PAGE);
-            has_failed = failure.fired();
-        }
-        EXPECT_EQ(pages == nullptr, has_failed);
-        EXPECT_EQ(pages == nullptr ? 1 : release(pages), 1);
-    }
+        });
+    with_failing_allocations([&] { pages = reserve(PAGE); },
+                             [&](bool fails) {
+                                 EXPECT_EQ(pages == nullptr, fails);
+                                 EXPECT_EQ(pages == nullptr ? 1 : release(pages), 1);
+                             });
     EXPECT_GE(mapped_balance(), mapped);
 }
 
 TEST(VirtualMemory, threads_keep_to_their_own_ranges) {
-    std::vector<std::thread> threads;
-    for (int i = 0; i < 4; ++i) {
-        threads.emplace_back([i] {
-            for (int round = 0; round < 500; ++round) {
-                char* const base = reserve(3 * PAGE);
-                char* const page = commit(base + PAGE, PAGE);
-                ASSERT_EQ(page, base + PAGE);
-                ASSERT_EQ(std::count(page, page + PAGE, 0), static_cast<long>(PAGE));
-                std::fill(page, page + PAGE, static_cast<char>('a' + i));
-                ASSERT_EQ(release(base), 1);
-            }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    basalt::test::run_threads(4, [&](int i) {
+        for (int round = 0; round < 500; ++round) {
+            char* const base = reserve(3 * PAGE);
+            char* const page = commit(base + PAGE, PAGE);
+            ASSERT_EQ(page, base + PAGE);
+            ASSERT_EQ(std::count(page, page + PAGE, 0), static_cast<long>(PAGE));
+            std::fill(page, page + PAGE, static_cast<char>('a' + i));
+            ASSERT_EQ(release(base), 1);
+        }
+    });
 }
 
 }  // namespace

@@ -21,18 +21,6 @@ TEST(Selection, WorksByWholeBlocks) {
     EXPECT_EQ(visit_selected(array), (std::vector<Visited>{{3, 3, 1}, {20, 3, 2}}));
 }
 
-TEST(Selection, FollowsTheTreesOrder) {
-    Sparse2DArray array(8, 16, 64);
-    for (int by = 0; by < 5; ++by) {
-        for (int bx = 0; bx < 5; ++bx) {
-            insert_value(array, 16 * bx, 16 * by, static_cast<std::uint64_t>(5 * by + bx));
-        }
-    }
-    EXPECT_TRUE(select(array, 20, 20, 40, 40));
-    EXPECT_EQ(visit_selected(array),
-              (std::vector<Visited>{{32, 16, 7}, {16, 16, 6}, {32, 32, 12}, {16, 32, 11}}));
-}
-
 TEST(Selection, RowsAscendAndColumnsAscendWithinARow) {
     for (const int side : {2, 4, 16, 32}) {
         SCOPED_TRACE(side);
@@ -80,14 +68,6 @@ TEST(Selection, OnlyNewBlocksRaiseTheFlag) {
     EXPECT_TRUE(array.IsSelectionDirty());
     EXPECT_EQ(visit_selected(array), (std::vector<Visited>{{0, 0, 1}}));
     EXPECT_TRUE(array.IsSelectionDirty());
-}
-
-TEST(Selection, ReversedCornersAreAppliedAsGiven) {
-    Sparse2DArray array(8, 16, 64);
-    insert_value(array, 0, 0, 1);
-    EXPECT_TRUE(select(array, 15, 15, 0, 0));
-    EXPECT_TRUE(select(array, 12, 3, 2, 1));
-    EXPECT_FALSE(select(array, 16, 0, 0, 0));
 }
 
 TEST(Visit, EndsWhenTheCallbackSaysSo) {

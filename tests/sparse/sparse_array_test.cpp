@@ -29,17 +29,6 @@ TEST(SparseArray, OverwritesInPlaceAndKeepsTheAddress) {
     EXPECT_EQ(visit_all(array), (std::vector<Visited>{{5, -7, 2}}));
 }
 
-TEST(SparseArray, NegativeCellsFallIntoBlocksBelowZero) {
-    Sparse2DArray array(8, 16, 64);
-    insert_value(array, -1, -1, 1);
-    insert_value(array, -16, -16, 2);
-    insert_value(array, 0, 0, 3);
-    ASSERT_TRUE(select(array, -16, -16, -16, -16));
-    EXPECT_EQ(visit_selected(array), (std::vector<Visited>{{-16, -16, 2}, {-1, -1, 1}}));
-    ASSERT_TRUE(select(array, 0, 0, 0, 0));
-    EXPECT_EQ(visit_selected(array), (std::vector<Visited>{{0, 0, 3}}));
-}
-
 TEST(SparseArray, WholeThirtyTwoBitPlaneIsAddressable) {
     for (const std::size_t side : {1U, 2U, 16U, 128U}) {
         SCOPED_TRACE(side);
@@ -112,19 +101,6 @@ TEST(SparseArray, SlotsComeFromTheChunksTopDownAndLastFreedFirst) {
     EXPECT_EQ(insert(4), slot0);
     EXPECT_EQ(insert(5), next2 - SIZE);
     check_invariants(array);
-}
-
-TEST(SparseArray, RemoveAnswersWhetherTheCellHeldAnElement) {
-    Sparse2DArray array(8, 16, 64);
-    EXPECT_FALSE(array.Remove(0, 0));
-    insert_value(array, 0, 0, 1);
-    EXPECT_FALSE(array.Remove(1, 0));
-    EXPECT_FALSE(array.Remove(100, 100));
-    EXPECT_TRUE(array.Remove(0, 0));
-    EXPECT_FALSE(array.Remove(0, 0));
-    EXPECT_EQ(array.Find(0, 0), nullptr);
-    EXPECT_TRUE(select(array, 0, 0, 0, 0));
-    EXPECT_TRUE(visit_selected(array).empty());
 }
 
 TEST(SparseArray, OddParametersAreRoundedUp) {

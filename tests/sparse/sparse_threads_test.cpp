@@ -5,24 +5,16 @@
 #include <array>
 #include <atomic>
 #include <thread>
-#include <vector>
 
 #include "src/sparse/lock.h"
 #include "tests/sparse/array_inspection.h"
 #include "tests/sparse/visit_recorder.h"
+#include "tests/support/threads.h"
 
 namespace vex_util::testing {
 namespace {
 
-void run_threads(int count, const std::function<void(int)>& work) {
-    std::vector<std::thread> threads;
-    for (int i = 0; i < count; ++i) {
-        threads.emplace_back(work, i);
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
-}
+using basalt::test::run_threads;
 
 TEST(Lock, AdmitsOneThreadAtATimeAndItsOwnerAgain) {
     CriticalSectionWrapper section;
@@ -35,27 +27,6 @@ TEST(Lock, AdmitsOneThreadAtATimeAndItsOwnerAgain) {
         }
     });
     EXPECT_EQ(counter, 80000);
-}
-
-TEST(Lock, SleepersAreWokenOneAfterTheOther) {
-    CriticalSectionWrapper section;
-    std::atomic<int> entered{0};
-    std::vector<std::thread> threads;
-    {
-        const AutoCriticalSection held(section);
-        for (int i = 0; i < 6; ++i) {
-            threads.emplace_back([&] {
-                const AutoCriticalSection mine(section);
-                ++entered;
-            });
-        }
-        std::this_thread::sleep_for(std::chrono::milliseconds(30));  // long past spinning: all are asleep
-        EXPECT_EQ(entered, 0);
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
-    EXPECT_EQ(entered, 6);
 }
 
 TEST(SparseArrayThreads, ShareOneArray) {

@@ -144,14 +144,4 @@ long mapped_balance() {
     return balance;
 }
 
-long open_descriptors() {
-    DIR* const folder = __real_opendir("/proc/self/fd");
-    long count = 0;
-    while (__real_readdir(folder) != nullptr) {
-        ++count;
-    }
-    closedir(folder);
-    return count;
-}
-
 }  // namespace basalt::test

@@ -14,14 +14,18 @@
 #include <random>
 #include <sstream>
 #include <string>
-#include <thread>
-#include <type_traits>
 #include <vector>
 
 #include "tests/support/failing_new.h"
+#include "tests/support/locales.h"
+#include "tests/support/open_descriptors.h"
+#include "tests/support/scratch_folder.h"
+#include "tests/support/threads.h"
+#include "tests/support/with_failing_allocations.h"
 
 namespace {
 
+using basalt::test::open_descriptors;
 using vex_util::FileLogger;
 namespace fs = std::filesystem;
 using namespace std::string_literals;
@@ -33,9 +37,6 @@ std::string contents(const fs::path& file) {
 
 class FileLog : public testing::Test {
 protected:
-    FileLog() { fs::create_directory(folder); }
-    ~FileLog() override { fs::remove_all(folder); }
-
     // The lines of the file, each of which has to be "<writer> <number> <filler>".
     static std::vector<int> counted_lines(const std::string& text, char writer) {
         std::vector<int> numbers;
@@ -68,8 +69,8 @@ protected:
         return numbers;
     }
 
-    const fs::path folder =
-        fs::temp_directory_path() / ("basalt_log_" + std::to_string(std::random_device{}()));
+    const basalt::test::ScratchFolder scratch;
+    const fs::path folder = scratch.path();
     const fs::path file = folder / "a log.txt";
 };
 
@@ -144,11 +145,6 @@ TEST_F(FileLog, separators_are_told_in_names_that_are_no_text) {
     }
 }
 
-TEST_F(FileLog, has_one_owner) {
-    EXPECT_FALSE(std::is_copy_constructible_v<FileLogger>);
-    EXPECT_FALSE(std::is_copy_assignable_v<FileLogger>);
-}
-
 TEST_F(FileLog, texts_of_every_length_arrive_whole) {
     const unsigned seed = std::random_device{}();
     SCOPED_TRACE(seed);
@@ -217,17 +213,11 @@ TEST_F(FileLog, two_logs_on_one_file_do_not_cut_each_others_texts) {
 
 TEST_F(FileLog, threads_write_whole_texts) {
     FileLogger log(file.c_str());
-    std::vector<std::thread> threads;
-    for (const char writer : {'a', 'b', 'c'}) {
-        threads.emplace_back([&log, writer] {
-            for (int i = 0; i < 500; ++i) {
-                write_line(log, writer, i);
-            }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    basalt::test::run_threads(3, [&](int writer) {
+        for (int i = 0; i < 500; ++i) {
+            write_line(log, "abc"[writer], i);
+        }
+    });
     log.Close();
     for (const char writer : {'a', 'b', 'c'}) {
         EXPECT_EQ(counted_lines(contents(file), writer), up_to(500));
@@ -288,23 +278,15 @@ TEST_F(FileLog, limit_on_file_sizes_is_silent) {
 }
 
 TEST_F(FileLog, opening_without_memory_is_silent_and_leaves_no_file_open) {
-    const auto open_files = [] {
-        return std::distance(fs::directory_iterator("/proc/self/fd"), fs::directory_iterator());
-    };
-    const auto before = open_files();
-    bool fired = true;
-    for (long nth = 1; fired; ++nth) {
-        FileLogger log;
-        {
-            const FailAllocation guard(nth);
-            log.Open(file.c_str());
-            fired = guard.fired();
-        }
-        EXPECT_EQ(open_files(), before + (fired ? 0 : 1)) << nth;
-        log.Write(L"text");
-        log.Close();
-        EXPECT_EQ(fs::exists(file) ? contents(file) : "", fired ? "" : "text") << nth;
-    }
+    const auto before = open_descriptors();
+    FileLogger log;
+    with_failing_allocations([&] { log.Open(file.c_str()); },
+                             [&](bool fired) {
+                                 EXPECT_EQ(open_descriptors(), before + (fired ? 0 : 1));
+                                 log.Write(L"text");
+                                 log.Close();
+                                 EXPECT_EQ(fs::exists(file) ? contents(file) : "", fired ? "" : "text");
+                             });
 }
 
 // In encodings other than UTF-8, of locales made here; each in a process of its own, since the environment is
@@ -317,6 +299,7 @@ TEST_F(FileLog, follows_the_environments_encoding) {
         std::string expected;
     };
     const std::wstring most_of_a_piece(255, L'x');
+    const test_locales::Folder locales;
     GTEST_FLAG_SET(death_test_style, "threadsafe");
     for (const Row& row :
          {Row{"ISO-8859-15", "caf\xE9", "caf\xC3\xA9", L"\x20AC \xE9 \x65E5 \xD800\n", "\xA4 \xE9 ? ?\r\n"},
@@ -326,14 +309,11 @@ TEST_F(FileLog, follows_the_environments_encoding) {
           Row{"BIG5-HKSCS", "log", "log",
               most_of_a_piece + L"\xCA\x304\n" + most_of_a_piece.substr(2) + L"\xCA\nz\xCA",
               std::string(255, 'x') + "\x88\x62\r\n" + std::string(253, 'x') + "\x88\x66\r\nz\x88\x66"}}) {
-        const fs::path locales = folder.parent_path() / ("basalt_log_locale_"s + row.charmap);
-        const std::string command =
-            "localedef -c -i POSIX -f "s + row.charmap + " '" + locales.string() + "/test' >/dev/null 2>&1";
-        fs::create_directory(locales);
-        const bool made = std::system(command.c_str()) != -1 && fs::exists(locales / "test" / "LC_CTYPE");
+        if (!locales.has(row.charmap)) {
+            GTEST_SKIP() << "localedef cannot make the locales";
+        }
         const auto log_in_that_locale = [&] {
-            setenv("LOCPATH", locales.c_str(), 1);
-            setenv("LC_ALL", "test", 1);
+            locales.enter(row.charmap);
             fs::create_directories((folder / row.name_on_disk).parent_path());
             FileLogger log((folder.string() + "/" + row.name).c_str());
             log.Write(row.text.c_str());
@@ -342,13 +322,7 @@ TEST_F(FileLog, follows_the_environments_encoding) {
             fs::remove_all(folder);  // of the test that runs again in this process
             std::_Exit(right ? 0 : 1);
         };
-        if (made) {
-            EXPECT_EXIT(log_in_that_locale(), testing::ExitedWithCode(0), "") << row.charmap;
-        }
-        fs::remove_all(locales);
-        if (!made) {
-            GTEST_SKIP() << "localedef cannot make the locales";
-        }
+        EXPECT_EXIT(log_in_that_locale(), testing::ExitedWithCode(0), "") << row.charmap;
     }
 }
 

@@ -6,10 +6,9 @@
 #include <cmath>
 #include <limits>
 #include <random>
-#include <thread>
-#include <vector>
 
 #include "src/platform/performance_counter.h"
+#include "tests/support/threads.h"
 
 namespace {
 
@@ -69,13 +68,7 @@ TEST(TimersDeathTest, tick_length_is_determined_once_by_the_first_timers) {
     GTEST_FLAG_SET(death_test_style, "threadsafe");
     const auto check = [] {
         bool right = HiResTimer::s_llFrequency == 0.0;
-        std::vector<std::thread> threads;
-        for (int t = 0; t < 4; ++t) {
-            threads.emplace_back([] { HiResTimer().GetElapsedS(); });
-        }
-        for (std::thread& thread : threads) {
-            thread.join();
-        }
+        basalt::test::run_threads(4, [&](int) { HiResTimer().GetElapsedS(); });
         right = right && HiResTimer::s_llFrequency == 1e-9 && frequency_queries == 1;
         // A host may take the value back, or put its own in its place.
         HiResTimer::s_llFrequency = 0.0;

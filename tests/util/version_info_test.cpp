@@ -5,11 +5,11 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <filesystem>
-#include <random>
+#include <optional>
 
-#include "tests/support/failing_new.h"
+#include "tests/support/scratch_folder.h"
 #include "tests/support/version_block.h"
+#include "tests/support/with_failing_allocations.h"
 
 namespace {
 
@@ -49,10 +49,7 @@ namespace {
 
 class Version : public testing::Test {
 protected:
-    ~Version() override {
-        program_name = nullptr;
-        std::filesystem::remove(m_path);
-    }
+    ~Version() override { program_name = nullptr; }
 
     void run_as(const Bytes& section, const std::string& section_name = ".version_resource") {
         ProgramFile(section, section_name).write(m_path);
@@ -72,8 +69,8 @@ protected:
     VersionInfo m_info;
 
 private:
-    const std::string m_path =
-        std::filesystem::temp_directory_path() / ("basalt_program_" + std::to_string(std::random_device{}()));
+    const ScratchFolder m_folder;
+    const std::string m_path = m_folder / "program";
     const std::wstring m_name = std::wstring(m_path.begin(), m_path.end());
 };
 
@@ -176,20 +173,15 @@ TEST_F(Version, file_that_cannot_be_read_leaves_everything_as_it_was) {
 
 TEST_F(Version, lack_of_memory_leaves_everything_as_it_was) {
     run_as(survey_resource());
-    bool failed = true;
-    for (long nth = 1; failed; ++nth) {
-        bool result;
-        {
-            const FailAllocation guard(nth, true);
-            result = m_info.InitVersionInfo(nullptr);
-            failed = guard.fired();
-        }
-        ASSERT_EQ(result, !failed) << nth;
-        if (failed) {
-            ASSERT_STREQ(m_info.GetVersionString(), L" 01.00.00.01");
-        }
-    }
-    expect_survey(m_info);
+    std::optional<VersionInfo> info(std::in_place);
+    bool result = false;
+    with_failing_allocations([&] { result = info->InitVersionInfo(nullptr); },
+                             [&](bool failed) {
+                                 EXPECT_EQ(result, !failed);
+                                 EXPECT_STREQ(info->GetVersionString(),
+                                              failed ? L" 01.00.00.01" : L"Survey 04.01.02.305");
+                                 info.emplace();
+                             });
 }
 
 }  // namespace

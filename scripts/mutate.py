@@ -101,7 +101,7 @@ def tell(results):
     heads = ["noticed", "from above", "survived", "explained", "equivalent", "not compiled"]
     print(f"{'':12}{''.join(f'{head:>14}' for head in heads)}  noticed of counted")
     for name, row in table.items():
-        counted = row["noticed"] + row["survived"] + row["explained"]
+        counted = row["noticed"] + row["survived"]
         share = f"{100 * row['noticed'] / counted:.1f} %" if counted else "-"
         print(f"{name:12}{''.join(f'{row[head]:14d}' for head in heads)}  {share}")
     return new

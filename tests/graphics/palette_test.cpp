@@ -148,7 +148,9 @@ TEST(ClosestColour, AgreesWithTheScan) {
 
 TEST(ComplementaryColour, IsDarkOverLight) {
     EXPECT_EQ(_complementarycolor(0x808080), 0xFFFFFFU);
-    EXPECT_EQ(_complementarycolor(0x818080), 0x505050U);
+    for (const std::uint32_t lighter : {0x818080U, 0x808180U, 0x808081U}) {
+        EXPECT_EQ(_complementarycolor(lighter), 0x505050U);
+    }
     EXPECT_EQ(_complementarycolor(0xFF000000), 0xFFFFFFU);
 }
 

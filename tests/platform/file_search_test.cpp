@@ -198,7 +198,16 @@ TEST(FileSearch, every_failing_call_is_told_and_leaves_nothing_open) {
             EXPECT_EQ(open_descriptors(), descriptors);
         }
     }
+    // Folders alone, told as such even where the system says no more of them.
+    std::filesystem::create_directory(folder / "within");
     WIN32_FIND_DATAW entry = {};
+    bool fails = true;
+    for (int n = 1; fails; ++n) {
+        const SystemFailure failure(n);
+        const HANDLE found = FindFirstFileW(folder.wide(L"within/*").c_str(), &entry);
+        fails = SystemFailure::struck();
+        EXPECT_TRUE(FindClose(found) == 0 || entry.dwFileAttributes == FILE_ATTRIBUTE_DIRECTORY) << n;
+    }
     EXPECT_EQ(FindNextFileW(nullptr, &entry), 0);
     EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
     const HANDLE found = FindFirstFileW(folder.wide(L"*").c_str(), &entry);

@@ -185,6 +185,7 @@ TEST(CStringFormat, integers) {
     EXPECT_EQ(formatted(L"%hd %hhu %I32d %ld", 0x18000, 0x1FF, INT64_C(0x1FFFFFFFF), 5L), L"-32768 255 -1 5");
     EXPECT_EQ(formatted(L"%u %d", static_cast<signed char>(-1), std::uint8_t{200}), L"4294967295 200");
     EXPECT_EQ(formatted(L"%*d|%-*d|%*d|%.*d", 4, 1, 4, 2, -4, 3, 3, 4), L"   1|2   |3   |004");
+    EXPECT_EQ(formatted(L"[%.0d]", 0), L"[]");
 }
 
 TEST(CStringFormat, floating_point) {

@@ -94,6 +94,11 @@ TEST(FilledRectangle, EndsBeforeItsLastSidesAndAtTheSurface) {
     EXPECT_NE(FillRect(canvas, &all, static_cast<HBRUSH>(GetStockObject(NULL_BRUSH))), 0);
     EXPECT_EQ(canvas.picture(), Picture(2, 2));
     EXPECT_EQ(FillRect(canvas, nullptr, static_cast<HBRUSH>(GetStockObject(WHITE_BRUSH))), 0);
+    int stock = WHITE_BRUSH;
+    for (const COLORREF grey : {0xFFFFFFU, 0xC0C0C0U, 0x808080U, 0x404040U, 0U}) {
+        EXPECT_NE(FillRect(canvas, &all, static_cast<HBRUSH>(GetStockObject(stock++))), 0);
+        EXPECT_EQ(GetPixel(canvas, 1, 1), grey);
+    }
 }
 
 /// A rounded rectangle's pixel, by where its middle lies.

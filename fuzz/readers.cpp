@@ -9,9 +9,9 @@
 #include <string_view>
 #include <vector>
 
+#include "console/input_error.h"
 #include "examples/fieldbook/alignment.h"
 #include "examples/fieldbook/book_reader.h"
-#include "console/input_error.h"
 #include "examples/workarea/boundary_reader.h"
 #include "examples/workarea/esri_grid_reader.h"
 #include "fuzz/input.h"

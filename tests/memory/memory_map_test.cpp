@@ -14,8 +14,8 @@
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
-#include "tests/support/with_failing_calls.h"
 #include "tests/support/with_failing_allocations.h"
+#include "tests/support/with_failing_calls.h"
 
 namespace {
 thread_local bool heap_is_exhausted = false;

@@ -12,9 +12,9 @@
 #include "basalt/platform/error.h"
 #include "src/platform/pages.h"
 #include "tests/support/system_failures.h"
-#include "tests/support/with_failing_calls.h"
 #include "tests/support/threads.h"
 #include "tests/support/with_failing_allocations.h"
+#include "tests/support/with_failing_calls.h"
 
 namespace {
 

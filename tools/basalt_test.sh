@@ -223,6 +223,7 @@ misused "--precision takes a whole number from 0 to 9, not '10'" ftin --precisio
 misused "--denominator takes a whole number from 1 to 1000000, not '0'" ftin --denominator 0
 misused "unexpected argument '5' (--help shows what is taken)" dms 5
 misused "POLYGON.csv is missing (--help shows what is taken)" contains
+misused "B is missing (--help shows what is taken)" crosstrack 0,1
 misused "ORIGIN '-1,2': expected z in metres, but the line ends before it" neu -1,2
 misused "ORIGIN '0,0,0': the point is too near the earth's centre to have a latitude" neu 0,0,0
 misused "B '1,2,3': expected its end, not '3'" crosstrack 0,1 1,2,3

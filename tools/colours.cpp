@@ -31,7 +31,7 @@ void write_colour(COLORREF colour, Row& row) {
 }
 
 Filter make_palette(const CommandLine& line, const Format&) {
-    const std::string& what = operands(line, 1, "what to write, nearest or colour,")[0];
+    const std::string& what = line.operands[0];
     if (what == "nearest") {
         return [palette = ColorPalette()](Fields& fields, Row& row) {
             const unsigned char number = palette.FindClosestColor(read_colour(fields));

@@ -17,15 +17,21 @@ const std::string* value_of(const CommandLine& line, const Option& option) {
     return given != line.options.end() ? &given->second : nullptr;
 }
 
-const std::vector<std::string>& operands(const CommandLine& line, std::size_t count, const char* usage) {
-    if (line.operands.size() < count) {
-        throw InputError(std::string(usage) + " is missing (--help shows what is taken)");
+void check_operands(const Command& command, const CommandLine& line) {
+    std::size_t count = 0;
+    std::string_view words = command.operands;
+    while (!words.empty()) {
+        const std::size_t end = std::min(words.find(' '), words.size());
+        if (count == line.operands.size()) {
+            throw InputError(std::string(words.substr(0, end)) + " is missing (--help shows what is taken)");
+        }
+        ++count;
+        words.remove_prefix(std::min(end + 1, words.size()));
     }
     if (line.operands.size() > count) {
         throw InputError("unexpected argument " + quoted(line.operands[count]) +
                          " (--help shows what is taken)");
     }
-    return line.operands;
 }
 
 Format format_of(const Command& command, const CommandLine& line) {

@@ -47,12 +47,13 @@ using Filter = std::function<void(Fields&, Row&)>;
 
 struct Command {
     const char* name;
-    const char* operands;  ///< as the usage shows them, empty for none
+    const char* operands;  ///< a word for each, as the usage shows them
     const char* summary;   ///< one line
     const char* fields;    ///< what is read and written: units, ranges, axes; lines of at most 96 characters
     std::vector<Option> options;
     std::vector<Example> examples;
-    /// Takes operands and options of its own. InputError for those that cannot be used.
+    /// Takes the operands, as many as there are words, and the options of its own. InputError for those that
+    /// cannot be used.
     Filter (*make)(const CommandLine& line, const Format& format);
     Lines lines = Lines::MARKED;
     char separator = ' ';  ///< between the fields it writes, unless --csv says otherwise
@@ -64,8 +65,8 @@ bool has_flag(const CommandLine& line, const Option& option);
 /// The value given with an option, or null.
 const std::string* value_of(const CommandLine& line, const Option& option);
 
-/// The operands, for a command that takes exactly so many; `usage` names them in the InputError otherwise.
-const std::vector<std::string>& operands(const CommandLine& line, std::size_t count, const char* usage);
+/// InputError unless there are as many operands as the command has words for them.
+void check_operands(const Command& command, const CommandLine& line);
 
 /// What the options of many commands say.
 Format format_of(const Command& command, const CommandLine& line);

@@ -40,8 +40,7 @@ geo_llh geodetic(const geo_vector& xyz) {
     return llh;
 }
 
-Filter make_xyz2llh(const CommandLine& line, const Format&) {
-    operands(line, 0, "");
+Filter make_xyz2llh(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh llh = geodetic(read_xyz(fields));
         row.angle(llh.latitude);
@@ -50,8 +49,7 @@ Filter make_xyz2llh(const CommandLine& line, const Format&) {
     };
 }
 
-Filter make_llh2xyz(const CommandLine& line, const Format&) {
-    operands(line, 0, "");
+Filter make_llh2xyz(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_vector xyz = read_llh(fields);
         row.metres(xyz.x);
@@ -67,7 +65,7 @@ Filter make_neu(const CommandLine& line, const Format& format) {
         geodetic(origin);
         return origin;
     };
-    const geo_vector origin = read_operand(operands(line, 1, "ORIGIN")[0], "ORIGIN", format, read_origin);
+    const geo_vector origin = read_operand(line.operands[0], "ORIGIN", format, read_origin);
     return [read, origin](Fields& fields, Row& row) {
         const geo_vector point = read(fields);
         geo_nee local = {};

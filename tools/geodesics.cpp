@@ -6,8 +6,7 @@
 
 namespace {
 
-Filter make_direct(const CommandLine& line, const Format&) {
-    operands(line, 0, "");
+Filter make_direct(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh start = read_place(fields);
         const double azimuth = fields.angle("an azimuth");
@@ -21,16 +20,14 @@ Filter make_direct(const CommandLine& line, const Format&) {
     };
 }
 
-Filter make_distance(const CommandLine& line, const Format&) {
-    operands(line, 0, "");
+Filter make_distance(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh from = read_place(fields);
         row.metres(geo_vincenty_distance(from, read_place(fields)));
     };
 }
 
-Filter make_bearing(const CommandLine& line, const Format&) {
-    operands(line, 0, "");
+Filter make_bearing(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh from = read_place(fields);
         row.bearing(geo_vincenty_bearing(from, read_place(fields)));
@@ -38,9 +35,8 @@ Filter make_bearing(const CommandLine& line, const Format&) {
 }
 
 Filter make_crosstrack(const CommandLine& line, const Format& format) {
-    const std::vector<std::string>& given = operands(line, 2, "A or B");
-    const geo_llh a = read_operand(given[0], "A", format, read_place);
-    const geo_llh b = read_operand(given[1], "B", format, read_place);
+    const geo_llh a = read_operand(line.operands[0], "A", format, read_place);
+    const geo_llh b = read_operand(line.operands[1], "B", format, read_place);
     return
         [a, b](Fields& fields, Row& row) { row.metres(geo_vincenty_crosstrack(a, b, read_place(fields))); };
 }

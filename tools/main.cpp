@@ -41,6 +41,7 @@ int run_command(const Command& command, const std::vector<std::string>& argument
     if (line.version) {
         return run_itself({"--version"});
     }
+    check_operands(command, line);
     return run_filter(command, line);
 }
 

@@ -34,7 +34,7 @@ std::vector<geo_nee> read_polygon(const std::string& path) {
 }
 
 Filter make_contains(const CommandLine& line, const Format&) {
-    const std::vector<geo_nee> polygon = read_polygon(operands(line, 1, "POLYGON.csv")[0]);
+    const std::vector<geo_nee> polygon = read_polygon(line.operands[0]);
     std::optional<double> tolerance;
     if (const std::string* text = value_of(line, TOLERANCE)) {
         tolerance = parse_number(*text);

@@ -52,7 +52,6 @@ void read_mjd(Fields& fields, Row& row, int digits) {
 }
 
 Filter make_mjd(const CommandLine& line, const Format& format) {
-    operands(line, 0, "");
     if (has_flag(line, INVERSE)) {
         return [digits = format.precision](Fields& fields, Row& row) { read_mjd(fields, row, digits); };
     }
@@ -86,7 +85,6 @@ void read_gps(Fields& fields, Row& row, int digits) {
 }
 
 Filter make_gps(const CommandLine& line, const Format& format) {
-    operands(line, 0, "");
     const auto convert = has_flag(line, INVERSE) ? read_gps : write_gps;
     return [convert, digits = format.precision](Fields& fields, Row& row) { convert(fields, row, digits); };
 }
@@ -123,7 +121,6 @@ void read_javatime(Fields& fields, Row& row) {
 }
 
 Filter make_javatime(const CommandLine& line, const Format&) {
-    operands(line, 0, "");
     return has_flag(line, INVERSE) ? read_javatime : write_javatime;
 }
 

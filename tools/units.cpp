@@ -68,7 +68,6 @@ Sexagesimal rounded(double radians, int digits) {
 }
 
 Filter make_dms(const CommandLine& line, const Format& format) {
-    operands(line, 0, "");
     if (has_flag(line, INVERSE)) {
         return [](Fields& fields, Row& row) {
             const Signed degrees = read_signed(fields, "whole degrees");
@@ -146,7 +145,6 @@ void write_feet(double metres, int denominator, const Format& format, Row& row) 
 }
 
 Filter make_ftin(const CommandLine& line, const Format& format) {
-    operands(line, 0, "");
     const std::string* given = value_of(line, DENOMINATOR);
     if (has_flag(line, INVERSE)) {
         if (given != nullptr) {

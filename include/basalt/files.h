@@ -95,7 +95,7 @@ public:
     /// @}
 
 private:
-    void split();
+    BASALT_LOCAL void split();
 
     CString m_full_path;
     CString m_drive;

@@ -52,14 +52,14 @@ private:
     struct Segment;
     struct SegmentIndex;
 
-    MemoryMappedFile* CreateMemoryMappedFile();
-    void DestroyMemoryMappedFile(MemoryMappedFile* mapped);
+    BASALT_LOCAL MemoryMappedFile* CreateMemoryMappedFile();
+    BASALT_LOCAL void DestroyMemoryMappedFile(MemoryMappedFile* mapped);
 
-    Segment* create_segment();
-    void destroy_segment(Segment* segment);
-    Segment* find_segment(const void* block) const;
-    bool add_chunk(Segment* segment);
-    bool reserve_index_entry();
+    BASALT_LOCAL Segment* create_segment();
+    BASALT_LOCAL void destroy_segment(Segment* segment);
+    BASALT_LOCAL Segment* find_segment(const void* block) const;
+    BASALT_LOCAL bool add_chunk(Segment* segment);
+    BASALT_LOCAL bool reserve_index_entry();
 
     Segment* m_empty = nullptr;          // no block in use, latest first
     Segment* m_partial = nullptr;        // blocks to hand out: those of the first

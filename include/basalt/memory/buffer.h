@@ -43,9 +43,9 @@ public:
     static void Test();
 
 private:
-    bool round_up(std::uint64_t& size) const;
-    void* Alloc(std::uint64_t, std::uint64_t size);
-    void Free(void*);
+    BASALT_LOCAL bool round_up(std::uint64_t& size) const;
+    BASALT_LOCAL void* Alloc(std::uint64_t, std::uint64_t size);
+    BASALT_LOCAL void Free(void*);
 
     void* m_data = nullptr;
     std::uint32_t m_size = 0;

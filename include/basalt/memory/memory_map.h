@@ -53,7 +53,7 @@ public:
     static void CleanUp();
 
 private:
-    bool create_on_file();
+    BASALT_LOCAL bool create_on_file();
 
     void* m_data;
     std::uint32_t m_size;

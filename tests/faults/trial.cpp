@@ -8,6 +8,7 @@
 #include "src/platform/heap_inspection.h"
 #include "tests/faults/more_system_calls.h"
 #include "tests/faults/trial.h"
+#include "tests/support/open_descriptors.h"
 
 namespace basalt::faults {
 

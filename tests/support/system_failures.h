@@ -27,9 +27,6 @@ long refused_to_unmap();
 // Bytes mapped minus bytes unmapped by this program through the calls above.
 long mapped_balance();
 
-// Descriptors open in this process: readings that agree say that none has leaked in between.
-long open_descriptors();
-
 }  // namespace basalt::test
 
 #endif

@@ -17,8 +17,8 @@ get_target_property(basalt_soversion basalt SOVERSION)
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_NAME "libbasalt${basalt_soversion}")
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_SECTION libs)
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_SHLIBDEPS ON)
-set(CPACK_DEBIAN_RUNTIME_PACKAGE_GENERATE_SHLIBS ON)
-set(CPACK_DEBIAN_RUNTIME_PACKAGE_GENERATE_SHLIBS_POLICY ">=")
+set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS ON)
+set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS_POLICY ">=")
 set(CPACK_COMPONENT_RUNTIME_DESCRIPTION "Runtime library for surveying and machine control
  Survey geometry and geodesy, a sparse grid store, allocators on mapped memory,
  logs, paths, colours and bitmaps.")
@@ -32,7 +32,8 @@ set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION "Headers and archives of basalt
 
 set(CPACK_DEBIAN_TOOLS_PACKAGE_NAME basalt)
 set(CPACK_DEBIAN_TOOLS_PACKAGE_SECTION science)
-set(CPACK_DEBIAN_TOOLS_PACKAGE_SHLIBDEPS ON)
+# The library of the same build brings all that the tool needs.
+set(CPACK_DEBIAN_TOOLS_PACKAGE_SHLIBDEPS OFF)
 set(CPACK_DEBIAN_TOOLS_PACKAGE_DEPENDS
   "${CPACK_DEBIAN_RUNTIME_PACKAGE_NAME} (= ${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE})")
 set(CPACK_COMPONENT_TOOLS_DESCRIPTION "Geodesy, time and text conversions as filters

@@ -25,6 +25,9 @@ scripts/debian_packages.sh
 "${as_root[@]}" rm -rf "$root/work"
 "${as_root[@]}" mkdir "$root/work"
 "${as_root[@]}" cp -r build/debian/*.deb build/debian/*.tar.gz tests/package "$root/work/"
+# programs read their own file through it
+"${as_root[@]}" mount -t proc proc "$root/proc"
+trap '"${as_root[@]}" umount "$root/proc"' EXIT
 
 # Everything below runs inside, offline.
 "${as_root[@]}" chroot "$root" bash -euo pipefail -s <<'INSIDE'

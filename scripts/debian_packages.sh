@@ -23,10 +23,8 @@ build() {  # name, cmake options
     cat >"$work/packages.cmake" <<END
 include("$work/shared/CPackConfig.cmake")
 set(CPACK_PACKAGE_DIRECTORY "$work")
-set(CPACK_INSTALL_CMAKE_PROJECTS
-    "$work/shared;basalt;runtime;/" "$work/shared;basalt;development;/" "$work/shared;basalt;documentation;/"
-    "$work/shared;basalt;tools;/"
-    "$work/static;basalt;archive;/")
+# what both have is the shared one's, which comes last
+set(CPACK_INSTALL_CMAKE_PROJECTS "$work/static;basalt;ALL;/" "$work/shared;basalt;ALL;/")
 # the archive joins the development files
 set(CPACK_COMPONENTS_ALL runtime development archive tools documentation)
 set(CPACK_COMPONENTS_GROUPING ONE_PER_GROUP)

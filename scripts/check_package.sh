@@ -38,7 +38,8 @@ check() {  # ON or OFF: shared or static
 
     build tests/package/find_package "$work/found-$kind" -DCMAKE_PREFIX_PATH="$prefix" \
         -DCMAKE_CXX_FLAGS="${warnings[*]}" -Dbasalt_DIR="$prefix/$libdir/cmake/basalt"
-    build tests/package/subdirectory "$work/sub-$kind" -DBUILD_SHARED_LIBS="$kind" -DBASALT_SOURCE_DIR="$PWD"
+    build tests/package/subdirectory "$work/sub-$kind" -DBUILD_SHARED_LIBS="$kind" -DBASALT_SOURCE_DIR="$PWD" \
+        -DCMAKE_BUILD_TYPE=Debug
 
     local flags
     flags=$(PKG_CONFIG_PATH=$prefix/$libdir/pkgconfig pkg-config --cflags --libs basalt)

@@ -22,17 +22,17 @@ if [ ! -f "$root/ready" ]; then
     "${as_root[@]}" touch "$root/ready"
 fi
 scripts/debian_packages.sh
-"${as_root[@]}" rm -rf "$root/work"
-"${as_root[@]}" mkdir "$root/work"
-"${as_root[@]}" cp -r build/debian/*.deb build/debian/*.tar.gz tests/package "$root/work/"
+"${as_root[@]}" rm -rf "$root/outside"
+"${as_root[@]}" mkdir "$root/outside"
+"${as_root[@]}" cp -r build/debian/*.deb build/debian/*.tar.gz tests/package "$root/outside/"
 # programs read their own file through it
 "${as_root[@]}" mount -t proc proc "$root/proc"
 trap '"${as_root[@]}" umount "$root/proc"' EXIT
 
 # Everything below runs inside, offline.
 "${as_root[@]}" chroot "$root" bash -euo pipefail -s <<'INSIDE'
-cd /work
-files() { find / -xdev \( -path /work -o -path /proc -o -path /var/lib/dpkg -o -path /var/log -o -path /var/cache \) \
+cd /outside
+files() { find / -xdev \( -path /outside -o -path /proc -o -path /var/lib/dpkg -o -path /var/log -o -path /var/cache \) \
     -prune -o -print | sort; }
 files >before
 dpkg -i ./*.deb >install.log 2>&1 || { cat install.log; exit 1; }
@@ -43,7 +43,7 @@ mkdir source
 tar -xf basalt-*.tar.gz -C source --strip-components=1
 {
     configure package/find_package found
-    configure package/subdirectory sub -DBASALT_SOURCE_DIR=/work/source
+    configure package/subdirectory sub -DBASALT_SOURCE_DIR=/outside/source
     # shellcheck disable=SC2046  # the flags are words
     g++ -std=c++17 package/consumer.cpp -o bare $(pkg-config --cflags --libs basalt)
     # shellcheck disable=SC2046

@@ -15,15 +15,14 @@ constexpr double RADIANS_PER_DEGREE = 0.017453292519943295;
 constexpr double METRES_PER_FOOT = 0.3048006096012192;
 constexpr double INCHES_PER_FOOT = 12.0;
 constexpr double SECONDS_ROUNDING = 5e-6;
-/// The first value whose whole part an int does not hold.
-constexpr double FIRST_TOO_LARGE = 2147483648.0;
 /// A bearing this large is 160,000 turns away, the most that are taken off one by one.
 constexpr double MOST_STEPPED = 1e6;
 constexpr std::uint32_t LARGEST_FINITE_FACTORIAL = 170;
 
 /// Whole part of a value above -1: the largest integer for one that is larger still, 0 for NaN.
 int whole_part(double value) {
-    if (value < FIRST_TOO_LARGE) [[likely]] {
+    constexpr double FIRST_TOO_LARGE = 2147483648.0;
+    if (value < FIRST_TOO_LARGE) {
         return static_cast<int>(value);
     }
     return std::isnan(value) ? 0 : std::numeric_limits<int>::max();
@@ -49,14 +48,11 @@ double _degtorad(double degrees) {
 void _radtodms(double radians, int* degrees, int* minutes, double* seconds) {
     const double angle = radians / RADIANS_PER_DEGREE;
     double rest = std::abs(angle) * 3600.0 + SECONDS_ROUNDING;
-    const double all_degrees = rest / 3600.0;
-    const int whole_degrees = whole_part(all_degrees);
+    const int whole_degrees = whole_part(rest / 3600.0);
     rest -= whole_degrees * 3600.0;
-    // Where an int holds the degrees it holds the minutes: with the sign below, a tenth of the time less.
-    const bool fits = all_degrees < FIRST_TOO_LARGE;
-    const int whole_minutes = fits ? static_cast<int>(rest / 60.0) : whole_part(rest / 60.0);
+    const int whole_minutes = whole_part(rest / 60.0);
     rest -= whole_minutes * 60.0;
-    *degrees = std::signbit(angle) ? -whole_degrees : whole_degrees;
+    *degrees = angle >= 0.0 ? whole_degrees : -whole_degrees;
     *minutes = whole_minutes;
     *seconds = rest - SECONDS_ROUNDING;
 }

@@ -127,13 +127,16 @@ TEST_P(LockTest, EveryThreadCanBecomeTheFavouriteInTurn) {
     EXPECT_EQ(counter, THREADS);
 }
 
-TEST_P(LockTest, WhoeverWaitsForAFavouriteAsleepInsideIsWoken) {
+// The favourite sleeps inside while another thread comes; before that it calls once_inside.
+template <class Call>
+void expect_the_other_waits_for_the_favourite(Call once_inside) {
     LeaningLock lock;
     std::atomic<bool> inside{false};
     std::atomic<bool> left{false};
     std::thread favourite([&] {
         enter_alone(lock, LONG_RUN);
         const std::lock_guard guard(lock);
+        once_inside();
         inside = true;
         std::this_thread::sleep_for(std::chrono::milliseconds(30));  // the other is long past spinning
         left = true;
@@ -148,27 +151,13 @@ TEST_P(LockTest, WhoeverWaitsForAFavouriteAsleepInsideIsWoken) {
     favourite.join();
 }
 
+TEST_P(LockTest, WhoeverWaitsForAFavouriteAsleepInsideIsWoken) {
+    expect_the_other_waits_for_the_favourite([] {});
+}
+
 // A process may lose the call between the favour and its end, by a filter of system calls.
 TEST(LeaningLockTest, FavourEndsAlsoWhereTheBarrierHasGoneMeanwhile) {
-    LeaningLock lock;
-    std::atomic<bool> inside{false};
-    std::atomic<bool> left{false};
-    std::thread favourite([&] {
-        enter_alone(lock, LONG_RUN);
-        const std::lock_guard guard(lock);
-        without_barrier = true;
-        inside = true;
-        std::this_thread::sleep_for(std::chrono::milliseconds(30));
-        left = true;
-    });
-    while (!inside) {
-        std::this_thread::yield();
-    }
-    {
-        const std::lock_guard guard(lock);
-        EXPECT_TRUE(left);
-    }
-    favourite.join();
+    expect_the_other_waits_for_the_favourite([] { without_barrier = true; });
     without_barrier = false;
 }
 

@@ -54,11 +54,15 @@ using SynchronizedPool = Pool<std::pmr::synchronized_pool_resource>;
 constexpr std::size_t CHUNK = 2048;
 constexpr std::size_t LIVE_CHUNKS = 100'000;
 
-// The sparse array's life: chunks taken one by one, each written, then all freed. The allocator is new.
+// The sparse array's life: chunks taken one by one, each written, then all freed. The allocator is new, and
+// so are the pages under malloc.
 template <class Allocator>
 void chunks(benchmark::State& state) {
     std::vector<void*> live(LIVE_CHUNKS);
     for (auto _ : state) {
+        state.PauseTiming();
+        malloc_trim(0);
+        state.ResumeTiming();
         Allocator allocator;
         for (void*& chunk : live) {
             chunk = allocator.take(CHUNK);
@@ -164,6 +168,7 @@ template <class Allocator, bool TIMES_DROP>
 void fresh(benchmark::State& state) {
     std::vector<void*> live(FRESH_BLOCKS);
     while (state.KeepRunningBatch(FRESH_BLOCKS)) {
+        malloc_trim(0);
         Allocator allocator;
         const double taking = timed([&] {
             for (void*& block : live) {

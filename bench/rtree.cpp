@@ -11,6 +11,7 @@
 #include <random>
 #include <vector>
 
+#include "bench/rtree_blocks.h"
 #include "src/sparse/rtree.h"
 
 #if __has_include(<boost/geometry/index/rtree.hpp>)
@@ -25,42 +26,16 @@
 
 #if __has_include(<spatialindex/SpatialIndex.h>)
 #define HAVE_SPATIALINDEX 1
-#include <spatialindex/SpatialIndex.h>
+#include "bench/rtree_spatialindex.h"
 #endif
 
 namespace {
 
+using bench::Block;
+using bench::orders_of_blocks;
+using bench::shuffled_blocks;
+using bench::windows;
 using vex_util::slRTree;
-
-struct Block {
-    int min[2], max[2];
-};
-
-// A square of 16 x 16 blocks, block by block without a gap, in random order; the order is the identifier.
-std::vector<Block> shuffled_blocks(int count) {
-    const int side = static_cast<int>(std::ceil(std::sqrt(count)));
-    std::vector<Block> blocks;
-    for (int i = 0; i < count; ++i) {
-        const int x = i % side * 16, y = i / side * 16;
-        blocks.push_back({{x, y}, {x + 15, y + 15}});
-    }
-    std::shuffle(blocks.begin(), blocks.end(), std::mt19937(1));
-    return blocks;
-}
-
-// Windows that meet `hits` blocks each (hits a square times the side ratio), anywhere in the square of
-// blocks.
-std::vector<Block> windows(int count, int across, int down) {
-    const int side = static_cast<int>(std::ceil(std::sqrt(count)));
-    std::mt19937 random(2);
-    std::vector<Block> result;
-    for (int i = 0; i < 1000; ++i) {
-        const int x = std::uniform_int_distribution<int>(0, side - across - 1)(random) * 16;
-        const int y = std::uniform_int_distribution<int>(0, side - down - 2)(random) * 16;
-        result.push_back({{x + 3, y + 5}, {x + 16 * across - 4, y + 16 * down - 2}});
-    }
-    return result;
-}
 
 void fill(slRTree& tree, const std::vector<Block>& blocks) {
     int id = 0;
@@ -69,10 +44,11 @@ void fill(slRTree& tree, const std::vector<Block>& blocks) {
 }
 
 void insert(benchmark::State& state) {
-    const auto blocks = shuffled_blocks(static_cast<int>(state.range(0)));
+    const auto orders = orders_of_blocks(static_cast<int>(state.range(0)));
+    std::size_t next = 0;
     for (auto _ : state) {
         slRTree tree;
-        fill(tree, blocks);
+        fill(tree, orders[next++ % orders.size()]);
         benchmark::DoNotOptimize(tree);
     }
     state.SetItemsProcessed(state.iterations() * state.range(0));
@@ -119,10 +95,13 @@ std::vector<Value> values(const std::vector<Block>& blocks) {
 }
 
 void boost_insert(benchmark::State& state) {
-    const auto all = values(shuffled_blocks(static_cast<int>(state.range(0))));
+    std::vector<std::vector<Value>> orders;
+    for (const auto& blocks : orders_of_blocks(static_cast<int>(state.range(0))))
+        orders.push_back(values(blocks));
+    std::size_t next = 0;
     for (auto _ : state) {
         BoostTree tree;
-        for (const Value& v : all)
+        for (const Value& v : orders[next++ % orders.size()])
             tree.insert(v);
         benchmark::DoNotOptimize(tree);
     }
@@ -172,64 +151,22 @@ void boost_window(benchmark::State& state, bool packed) {
 #endif
 
 #if HAVE_SPATIALINDEX
-namespace si = SpatialIndex;
-
-si::Region region(const Block& b) {
-    const double low[2] = {static_cast<double>(b.min[0]), static_cast<double>(b.min[1])};
-    const double high[2] = {static_cast<double>(b.max[0]), static_cast<double>(b.max[1])};
-    return {low, high, 2};
-}
-
-class SpatialTree {
-public:
-    explicit SpatialTree(const std::vector<Block>& blocks) {
-        si::id_type own = 0;
-        m_tree.reset(si::RTree::createNewRTree(*m_storage, 0.5, 8, 8, 2, si::RTree::RV_QUADRATIC, own));
-        si::id_type id = 0;
-        for (const Block& b : blocks) {
-            m_tree->insertData(0, nullptr, region(b), id++);
-        }
-    }
-    void search(const Block& q, std::vector<int>& found) const {
-        found.clear();
-        Collector collector(found);
-        m_tree->intersectsWithQuery(region(q), collector);
-    }
-
-private:
-    class Collector : public si::IVisitor {
-    public:
-        explicit Collector(std::vector<int>& ids) : m_ids(ids) {}
-        void visitNode(const si::INode&) override {}
-        void visitData(const si::IData& data) override {
-            m_ids.push_back(static_cast<int>(data.getIdentifier()));
-        }
-        void visitData(std::vector<const si::IData*>&) override {}
-
-    private:
-        std::vector<int>& m_ids;
-    };
-
-    std::unique_ptr<si::IStorageManager> m_storage{si::StorageManager::createNewMemoryStorageManager()};
-    std::unique_ptr<si::ISpatialIndex> m_tree;
-};
-
 void spatial_insert(benchmark::State& state) {
     const auto blocks = shuffled_blocks(static_cast<int>(state.range(0)));
     for (auto _ : state) {
-        SpatialTree tree(blocks);
+        bench::SpatialTree tree(blocks);
         benchmark::DoNotOptimize(tree);
     }
 }
 
-const SpatialTree& spatial_stored() {
-    static const SpatialTree tree(shuffled_blocks(STORED));
+const bench::SpatialTree& spatial_stored() {
+    static const bench::SpatialTree tree(shuffled_blocks(STORED));
     return tree;
 }
 
 void spatial_window(benchmark::State& state) {
     const auto queries = windows(STORED, static_cast<int>(state.range(0)), static_cast<int>(state.range(1)));
-    const SpatialTree& tree = spatial_stored();
+    const bench::SpatialTree& tree = spatial_stored();
     std::vector<int> found;
     std::size_t i = 0;
     for (auto _ : state) {

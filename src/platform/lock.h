@@ -1,4 +1,4 @@
-// Mutex of two words, for locks that are taken millions of times a second and seldom fought over.
+// Mutex of three words, for locks that are taken millions of times a second and seldom fought over.
 #ifndef BASALT_SRC_PLATFORM_LOCK_H
 #define BASALT_SRC_PLATFORM_LOCK_H
 
@@ -30,17 +30,19 @@ public:
         // a barrier on every thread of the process.
         m_held.store(0, std::memory_order_release);
         std::atomic_signal_fence(std::memory_order_seq_cst);
-        if (m_waiting.load(std::memory_order_relaxed) != 0) {
+        if (m_wanted.load(std::memory_order_relaxed) != 0) {
             wake_one();
         }
     }
 
 private:
     void lock_contended() noexcept;
+    bool spin_for_it() noexcept;
     void wake_one() noexcept;
 
-    std::atomic<std::uint32_t> m_held{0};     // 1 while held; the word that waiting threads sleep on
-    std::atomic<std::uint32_t> m_waiting{0};  // threads asleep or about to be
+    std::atomic<std::uint32_t> m_held{0};      // 1 while held
+    std::atomic<std::uint32_t> m_wanted{0};    // 1 while who leaves has to wake one; the word to sleep on
+    std::atomic<std::uint32_t> m_sleepers{0};  // threads asleep, about to be, or woken and not yet inside
 };
 
 }  // namespace basalt::platform

@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Makes the reference, these pages and the docstrings of the public headers, and prints the path of its front page.
+# Makes the reference of the pages of docs/ and the docstrings of the public headers, and prints its front page's path.
 # A warning of Doxygen is an error, and so is a link to a page or picture that is not there.
 # Usage: scripts/docs.sh
 set -euo pipefail

@@ -86,11 +86,7 @@ step_stress() {
     for try in $(seq 20); do build/tsan/tests/stress 1 first_use; done | tail -n 1
     build/tsan/tests/stress "${STRESS_SECONDS:-5}"
 }
-step_docs() {
-    cmake -S . -B build/docs -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF \
-        -DBASALT_BUILD_TOOLS=OFF -DBASALT_BUILD_DOCS=ON
-    cmake --build build/docs --target docs
-}
+step_docs() { scripts/docs.sh; }
 step_fuzz_one() {  # program; begins with the kept inputs, and what is found goes into the first folder
     local name corpus
     name=$(basename "$1")

@@ -41,3 +41,4 @@ for subject in "${subjects[@]}"; do
     [ ${#page[@]} -eq 0 ] || python3 scripts/bench_table.py "${page[@]}" "$subject" "build/bench/$subject".*.json
 done
 [ ${#page[@]} -eq 0 ] || scripts/sizes.sh "${page[@]}"
+[ ${#page[@]} -eq 0 ] || scripts/header_cost.sh "${page[@]}"

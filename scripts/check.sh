@@ -1,11 +1,11 @@
 #!/usr/bin/env bash
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
-# locale, a system short of everything, the package, exported symbols, hardening and the same bytes from another
-# folder, results to the bit, sanitizers, every call that can fail failing, many threads at once
+# locale, a system short of everything, the package, exported symbols, the binary interface, hardening and the same
+# bytes from another folder, results to the bit, sanitizers, every call that can fail failing, many threads at once
 # (STRESS_SECONDS=N each, 5), documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 10).
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
-#        format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan stress docs fuzz
+#        format includes clang headers tidy elsewhere limits package symbols abi hardening exact asan tsan stress docs fuzz
 #        faults (alone; among the tests of clang and asan it runs anyway)
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
@@ -19,15 +19,21 @@ test_with() {  # preset
     ctest --preset "$1" -j "$(nproc)"
 }
 step_clang() { test_with clang; }
-step_headers() { scripts/check_headers.sh build/clang; }
+step_headers() {
+    cmake --preset clang >/dev/null  # makes version.h
+    scripts/check_headers.sh build/clang
+}
 step_tidy() {
-    git ls-files 'src/*.cpp' 'tools/*.cpp' 'console/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/clang --quiet
+    cmake --preset asan >/dev/null  # for the commands that it knows
+    git ls-files 'src/*.cpp' 'tools/*.cpp' 'console/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/asan --quiet
 }
 step_elsewhere() {
     # a time zone off the full hour, on both sides of the year's changes; a locale whose decimal sign is a comma
     localedef -i de_DE -f UTF-8 build/de_DE.UTF-8 || [ -d build/de_DE.UTF-8 ]
+    cmake --preset dev >/dev/null
+    cmake --build --preset dev
     TZ='<+1245>-12:45<+1345>,M9.5.0/2:45,M4.1.0/3:45' LOCPATH=$PWD/build LC_ALL=de_DE.UTF-8 \
-        ctest --preset clang -j "$(nproc)"
+        ctest --preset dev -j "$(nproc)" -E '^(faults|stress.*)$'
 }
 step_limits() { scripts/check_limits.sh build/clang; }
 step_package() { scripts/check_package.sh; }
@@ -35,6 +41,11 @@ installed=build/package/library-ON/src  # what the package step built
 step_symbols() {
     [ -d $installed ] || step_package
     scripts/check_symbols.sh $installed/libbasalt.so
+}
+step_abi() {
+    cmake --preset dev >/dev/null
+    cmake --build --preset dev --target basalt
+    scripts/check_abi.sh build/dev/src/libbasalt.so
 }
 step_hardening() {
     [ -d $installed ] || step_package
@@ -53,11 +64,15 @@ step_exact() {
     local test=tests/geo/exact_results_test.cpp program=build/exact_results sources
     # time scales hold whole numbers alone, and need the platform's clock
     sources=$(ls src/geo/*.cpp | grep -v time_scales)
-    for compiler in g++ clang++; do
-        for level in -O0 -O2 -O3; do
-            $compiler -std=c++20 $level -ffp-contract=off -I. -Iinclude $sources $test -o $program \
-                -lgtest -lgtest_main
-            $program --gtest_brief=1
+    for level in -O0 -O2 -O3; do
+        for compiler in g++ clang++; do
+            # shellcheck disable=SC2086  # the sources are words
+            $compiler -std=c++20 $level -ffp-contract=off -I. -Iinclude $sources $test -o $program$level-$compiler \
+                -lgtest -lgtest_main &
+        done
+        wait
+        for compiler in g++ clang++; do
+            $program$level-$compiler --gtest_brief=1
         done
     done
     [ -d $installed ] || step_package
@@ -65,8 +80,8 @@ step_exact() {
     LD_LIBRARY_PATH=$installed $program --gtest_brief=1
 }
 step_asan() { test_with asan; }
-step_tsan() {  # the library with many threads; of what has but one, nothing is to be seen here
-    cmake --preset tsan -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_TOOLS=OFF
+step_tsan() {
+    cmake --preset tsan
     cmake --build --preset tsan
     TSAN_OPTIONS=halt_on_error=1 ctest --preset tsan -j "$(nproc)" -E '^(faults|stress.*)$'
 }
@@ -90,28 +105,28 @@ step_docs() { scripts/docs.sh; }
 step_fuzz_one() {  # program; begins with the kept inputs, and what is found goes into the first folder
     local name corpus
     name=$(basename "$1")
-    corpus=("build/fuzz/corpus/$name" "fuzz/corpus/${name#fuzz_}")
+    corpus=("build/asan/corpus/$name" "fuzz/corpus/${name#fuzz_}")
     mkdir -p "${corpus[0]}"
     [ -d "${corpus[1]}" ] || unset "corpus[1]"
-    [ "$name" != fuzz_code_page ] || export LOCPATH=$PWD/build/fuzz/locales ASAN_OPTIONS=detect_leaks=0
+    [ "$name" != fuzz_code_page ] || export LOCPATH=$PWD/build/asan/locales ASAN_OPTIONS=detect_leaks=0
     "$1" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-10}" -max_len=2000 -len_control=0 -timeout=30 \
-        -print_final_stats=1 -artifact_prefix="build/fuzz/$name-" 2>"$1.log" ||
+        -print_final_stats=1 -artifact_prefix="build/asan/$name-" 2>"$1.log" ||
         { tail -n 40 "$1.log"; return 255; }
     echo "$name: $(grep -c . "$1.log") lines, $(grep executed_units "$1.log")"
 }
 step_fuzz() {
     local encoding
-    cmake --preset fuzz >/dev/null
-    cmake --build --preset fuzz
+    cmake --preset asan >/dev/null
+    cmake --build --preset asan
     # the encodings that the text fuzzer opens beside the system's own; the C library never frees what it reads
     # of them, which is no leak of this library's
-    mkdir -p build/fuzz/locales
+    mkdir -p build/asan/locales
     for encoding in ISO-8859-1 EUC-KR; do
-        [ -d "build/fuzz/locales/$encoding" ] ||
-            localedef -c -i POSIX -f $encoding "build/fuzz/locales/$encoding" || true
+        [ -d "build/asan/locales/$encoding" ] ||
+            localedef -c -i POSIX -f $encoding "build/asan/locales/$encoding" || true
     done
     # two at a time; 255 ends the others as well
-    find build/fuzz/fuzz -maxdepth 1 -name 'fuzz_*' -type f -executable | sort |
+    find build/asan/fuzz -maxdepth 1 -name 'fuzz_*' -type f -executable | sort |
         xargs -P 2 -I {} bash scripts/check.sh --step fuzz_one {}
 }
 
@@ -121,7 +136,7 @@ if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit 
 fi
 steps=("$@")
 if [ ${#steps[@]} -eq 0 ]; then
-    steps=(format includes clang headers tidy elsewhere limits package symbols hardening exact asan tsan stress
+    steps=(format includes clang headers tidy elsewhere limits package symbols abi hardening exact asan tsan stress
         docs fuzz)
 fi
 need_packages "${BUILD_PACKAGES[@]}" "${TEST_PACKAGES[@]}" "${CHECK_PACKAGES[@]}"

@@ -4,12 +4,15 @@
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-for header in include/basalt/*.h include/basalt/*/*.h; do
+alone() {  # build directory, header
+    local standard compiler
     for standard in c++17 c++20; do
         for compiler in g++ clang++; do
-            echo "#include \"${header#include/}\"" |
+            echo "#include \"${2#include/}\"" |
                 $compiler -std=$standard -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror -fsyntax-only \
-                    -Iinclude -I"$1/include" -x c++ - || { echo "$header: $compiler $standard"; exit 1; }
+                    -Iinclude -I"$1/include" -x c++ - || { echo "$2: $compiler $standard"; return 255; }
         done
     done
-done
+}
+export -f alone
+printf '%s\n' include/basalt/*.h include/basalt/*/*.h | xargs -P "$(nproc)" -I {} bash -c 'alone "$@"' alone "$1" {}

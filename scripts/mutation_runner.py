@@ -50,7 +50,8 @@ class Build:
         mirror(self.tree)
         linker = "-fuse-ld=lld" if shutil.which("ld.lld") else ""
         run(["cmake", "-S", self.tree, "-B", self.folder, "-G", "Ninja", "-DCMAKE_BUILD_TYPE=None",
-             "-DBUILD_SHARED_LIBS=OFF", "-DBASALT_BUILD_EXAMPLES=OFF", "-DBASALT_BUILD_TOOLS=OFF", "-DBASALT_INSTALL=OFF",
+             "-DBUILD_SHARED_LIBS=OFF", "-DBASALT_BUILD_EXAMPLES=OFF", "-DBASALT_BUILD_TOOLS=OFF",
+             "-DBASALT_INSTALL=OFF",
              f"-DCMAKE_CXX_FLAGS={FLAGS}", f"-DCMAKE_EXE_LINKER_FLAGS={linker}"])
         run(["ninja", "-C", self.folder, f"-j{jobs}", *(f"{family}_tests" for family in FAMILIES)])
         self.compile, self.link = {}, {}

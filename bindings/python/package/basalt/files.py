@@ -1,4 +1,8 @@
-"""Paths taken apart and put together, and what lies in a folder."""
+"""Paths taken apart and put together, and what lies in a folder, as the library's hosts see them.
+
+What is put together has backslashes between its parts, which the library takes wherever it takes a path; other programs
+want them replaced by slashes.
+"""
 import typing
 
 from ._basalt import combine_path as combine

@@ -1,11 +1,11 @@
 #!/usr/bin/env bash
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
-# locale, a system short of everything, the package, exported symbols, the binary interface, hardening and the same
-# bytes from another folder, results to the bit, sanitizers, every call that can fail failing, many threads at once
+# locale, a system short of everything, the package, exported symbols, the binary interface, the Python package,
+# hardening and the same bytes from another folder, results to the bit, sanitizers, every call that can fail failing, many threads at once
 # (STRESS_SECONDS=N each, 5), documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 10).
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
-#        format includes clang headers tidy elsewhere limits package symbols abi hardening exact asan tsan stress docs fuzz
+#        format includes clang headers tidy elsewhere limits package symbols abi python hardening exact asan tsan stress docs fuzz
 #        faults (alone; among the tests of clang and asan it runs anyway)
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
@@ -46,6 +46,10 @@ step_abi() {
     cmake --preset dev >/dev/null
     cmake --build --preset dev --target basalt
     scripts/check_abi.sh build/dev/src/libbasalt.so
+}
+step_python() {
+    [ -d $installed ] || step_package
+    BASALT_LIBRARY=$PWD/build/package/library-OFF scripts/python.sh
 }
 step_hardening() {
     [ -d $installed ] || step_package
@@ -136,7 +140,7 @@ if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit 
 fi
 steps=("$@")
 if [ ${#steps[@]} -eq 0 ]; then
-    steps=(format includes clang headers tidy elsewhere limits package symbols abi hardening exact asan tsan stress
+    steps=(format includes clang headers tidy elsewhere limits package symbols abi python hardening exact asan tsan stress
         docs fuzz)
 fi
 need_packages "${BUILD_PACKAGES[@]}" "${TEST_PACKAGES[@]}" "${CHECK_PACKAGES[@]}"

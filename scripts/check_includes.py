@@ -13,7 +13,7 @@ FAMILIES = {"frame": set(), "geo": set(), "util": set(), "files": set(), "memory
 STANDARD = re.compile(r"^[a-z_0-9]+$|^(stddef|stdint|string)\.h$")  # <vector>, and what C shares
 INTRINSICS = {"immintrin.h", "emmintrin.h"}
 SOURCES = [f"{folder}/**/*{ending}"  # not those of tests, which hold texts
-           for folder in ("include", "src", "bench", "fuzz", "examples", "console", "tools")
+           for folder in ("include", "src", "bench", "bindings", "fuzz", "examples", "console", "tools")
            for ending in (".h", ".cpp")]
 
 

@@ -1,0 +1,71 @@
+"""The extension module: universal functions of NumPy, batches of a sparse array, paths and hexadecimal text."""
+import numpy as np
+import numpy.typing as npt
+
+GEO_NULL: float
+
+_calculate_observation: np.ufunc
+_reduce_observation: np.ufunc
+_spiral_deltas: np.ufunc
+_xyz_to_llh: np.ufunc
+arc_angle: np.ufunc
+arc_length: np.ufunc
+bearing_intersection: np.ufunc
+bisected_bearing: np.ufunc
+calendar_to_java_time: np.ufunc
+covariance_to_llh: np.ufunc
+covariance_to_neu: np.ufunc
+cross_track: np.ufunc
+curvature_radii: np.ufunc
+date_to_mjd: np.ufunc
+direct: np.ufunc
+divergence: np.ufunc
+dms_to_radians: np.ufunc
+feet_inches_to_metres: np.ufunc
+first_face: np.ufunc
+follow: np.ufunc
+follow_grade: np.ufunc
+follow_height_change: np.ufunc
+gps_to_mjd: np.ufunc
+grade: np.ufunc
+great_circle_bearing: np.ufunc
+great_circle_distance: np.ufunc
+grid_bearing: np.ufunc
+horizontal_distance: np.ufunc
+in_polygon: np.ufunc
+in_polygon_or_near: np.ufunc
+java_time_to_calendar: np.ufunc
+lines_cross: np.ufunc
+llh_to_xyz: np.ufunc
+metres_to_feet_inches: np.ufunc
+mjd_to_date: np.ufunc
+mjd_to_gps: np.ufunc
+normalise_bearing: np.ufunc
+on_line: np.ufunc
+on_polyline: np.ufunc
+radians_to_dms: np.ufunc
+slope_angle: np.ufunc
+slope_distance: np.ufunc
+spiral_deflection: np.ufunc
+triangle_area: np.ufunc
+xyz_to_local: np.ufunc
+
+def split_path(path: str) -> tuple[str, str, str, str]: ...
+def combine_path(first: str, second: str) -> str: ...
+def set_extension(path: str, extension: str) -> str: ...
+def files_in_directory(directory: str, pattern: str) -> list[str]: ...
+def bytes_to_hex(bytes: bytes) -> str: ...
+def hex_to_bytes(text: str) -> bytes: ...
+
+_Cells = npt.NDArray[np.int32]
+_Bytes = npt.NDArray[np.uint8]
+_Flags = npt.NDArray[np.bool_]
+
+class SparseBytes:
+    def __init__(self, element_size: int, block_side: int, elements_per_chunk: int) -> None: ...
+    def insert(self, x: _Cells, y: _Cells, elements: _Bytes) -> None: ...
+    def find(self, x: _Cells, y: _Cells) -> tuple[_Bytes, _Flags]: ...
+    def remove(self, x: _Cells, y: _Cells) -> _Flags: ...
+    def clear(self) -> None: ...
+    def select(self, min_x: int, min_y: int, max_x: int, max_y: int) -> tuple[_Cells, _Cells, _Bytes]: ...
+    def all(self) -> tuple[_Cells, _Cells, _Bytes]: ...

@@ -1,0 +1,4 @@
+"""Angles in degrees, minutes and seconds; lengths in US survey feet, inches and fractions: universal functions."""
+from ._basalt import dms_to_radians, feet_inches_to_metres, metres_to_feet_inches, radians_to_dms
+
+__all__ = ["dms_to_radians", "feet_inches_to_metres", "metres_to_feet_inches", "radians_to_dms"]

@@ -1,0 +1,47 @@
+"""Builds the library of this repository as a static archive and the extension module on top of it.
+
+With BASALT_LIBRARY set to a build folder of the library, static and released, that one serves.
+"""
+import os
+import pathlib
+import shlex
+import subprocess
+
+import numpy
+import pybind11
+from setuptools import Extension, setup
+from setuptools.command.build_ext import build_ext
+
+HERE = pathlib.Path(__file__).resolve().parent
+ROOT = HERE.parent.parent
+LIBRARY = pathlib.Path(os.environ.get("BASALT_LIBRARY", ROOT / "build" / "python" / "library"))
+
+
+class BuildWithLibrary(build_ext):
+    def run(self):
+        if "BASALT_LIBRARY" not in os.environ:
+            subprocess.run(["cmake", "-S", ROOT, "-B", LIBRARY, "-DCMAKE_BUILD_TYPE=Release", "-DBUILD_SHARED_LIBS=OFF",
+                            "-DBASALT_BUILD_TESTS=OFF", "-DBASALT_BUILD_EXAMPLES=OFF", "-DBASALT_BUILD_TOOLS=OFF",
+                            "-DBASALT_INSTALL=OFF"], check=True)
+            subprocess.run(["cmake", "--build", LIBRARY, "--target", "basalt", "--parallel", str(os.cpu_count())],
+                           check=True)
+        super().run()
+
+
+def words_of_pkg_config(option):
+    return shlex.split(subprocess.run(["pkg-config", option, "pixman-1"], check=True, capture_output=True,
+                                      text=True).stdout)
+
+
+setup(
+    ext_modules=[Extension(
+        "basalt._basalt",
+        sources=[str(file.relative_to(HERE)) for file in sorted((HERE / "src").glob("*.cpp"))],
+        depends=[str(HERE / "src" / "universal.h"), str(LIBRARY / "src" / "libbasalt.a")],
+        include_dirs=[str(HERE / "src"), str(ROOT / "include"), str(LIBRARY / "include"), pybind11.get_include(),
+                      numpy.get_include()],
+        extra_compile_args=["-std=c++20", "-O3", "-ffp-contract=off", "-fvisibility=hidden", "-Wall", "-Wextra"],
+        extra_link_args=[str(LIBRARY / "src" / "libbasalt.a"), *words_of_pkg_config("--libs")],
+    )],
+    cmdclass={"build_ext": BuildWithLibrary},
+)

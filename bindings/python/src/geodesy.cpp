@@ -1,0 +1,119 @@
+// The WGS84 ellipsoid, lines on it, and covariances of positions.
+#include <limits>
+
+#include "basalt/geo.h"
+#include "universal.h"
+
+namespace basalt_python {
+
+namespace {
+
+constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
+
+// Arguments: x, y, z, six numbers; six numbers out.
+template <int (*TRANSFORM)(const geo_vector*, const double*, double*)>
+void each_covariance(char** arguments, const npy_intp* sizes, const npy_intp* steps, void*) {
+    for (npy_intp i = 0; i < sizes[0]; ++i) {
+        const auto number = [&](int argument, npy_intp offset) {
+            return *reinterpret_cast<const double*>(arguments[argument] + i * steps[argument] + offset);
+        };
+        const geo_vector position{number(0, 0), number(1, 0), number(2, 0)};
+        double covariance[6];
+        for (npy_intp k = 0; k < 6; ++k) {
+            covariance[k] = number(3, k * steps[5]);
+        }
+        TRANSFORM(&position, covariance, covariance);
+        for (npy_intp k = 0; k < 6; ++k) {
+            *reinterpret_cast<double*>(arguments[4] + i * steps[4] + k * steps[6]) = covariance[k];
+        }
+    }
+    forget_float_flags();
+}
+
+template <int (*TRANSFORM)(const geo_vector*, const double*, double*)>
+void add_covariance(pybind11::module_& m, const char* name, const char* text) {
+    static PyUFuncGenericFunction loop = &each_covariance<TRANSFORM>;
+    static char types[] = {NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE};
+    add_general(m, name, text, "(),(),(),(6)->(6)", &loop, types, 4, 1);
+}
+
+}  // namespace
+
+void add_geodesy(pybind11::module_& m) {
+    add(m, "llh_to_xyz",
+        "llh_to_xyz(latitude, longitude, height): (x, y, z), metres; NaN where all three are 0, which is "
+        "refused "
+        "as a record never set (_llh2xyz).",
+        [](double latitude, double longitude, double height) {
+            const geo_llh llh{latitude, longitude, height};
+            geo_vector xyz{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER};
+            _llh2xyz(&llh, &xyz);
+            return std::tuple{xyz.x, xyz.y, xyz.z};
+        });
+    add(m, "_xyz_to_llh", "See xyz_to_llh.", [](double x, double y, double z, double tolerance) {
+        const geo_vector xyz{x, y, z};
+        geo_llh llh{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER};
+        _xyz2llh(&xyz, &llh, tolerance);
+        return std::tuple{llh.latitude, llh.longitude, llh.height};
+    });
+    add(m, "xyz_to_local",
+        "xyz_to_local(origin_x, origin_y, origin_z, x, y, z): (north, east, elevation) in the plane that "
+        "touches "
+        "the ellipsoid below the origin, metres; NaN where the origin cannot be converted (_xyz2nez).",
+        [](double ox, double oy, double oz, double x, double y, double z) {
+            const geo_vector origin{ox, oy, oz};
+            const geo_vector point{x, y, z};
+            geo_nee out{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER};
+            _xyz2nez(&origin, &point, &out);
+            return std::tuple{out.north, out.east, out.elevation};
+        });
+    add(m, "curvature_radii",
+        "curvature_radii(latitude): (meridian, prime_vertical), metres (_wgs84curvature).",
+        [](double latitude) {
+            double meridian = 0, prime_vertical = 0;
+            _wgs84curvature(latitude, meridian, prime_vertical);
+            return std::tuple{meridian, prime_vertical};
+        });
+    add(m, "direct",
+        "direct(latitude, longitude, azimuth, distance): (latitude, longitude, azimuth) at the end of a "
+        "geodesic; "
+        "azimuths in [-pi, pi], the longitude not wrapped (geo_vincenty_direct).",
+        [](double latitude, double longitude, double azimuth, double distance) {
+            geo_llh end{};
+            double at_end = 0;
+            geo_vincenty_direct({latitude, longitude, 0}, azimuth, distance, at_end, end);
+            return std::tuple{end.latitude, end.longitude, at_end};
+        });
+    add(m, "great_circle_distance",
+        "great_circle_distance(latitude1, longitude1, latitude2, longitude2): metres on a sphere of 6371 km, "
+        "up to "
+        "0.6 % off (geo_vincenty_distance).",
+        [](double lat1, double lon1, double lat2, double lon2) {
+            return geo_vincenty_distance({lat1, lon1, 0}, {lat2, lon2, 0});
+        });
+    add(m, "great_circle_bearing",
+        "great_circle_bearing(latitude1, longitude1, latitude2, longitude2): radians in [0, 2 pi) "
+        "(geo_vincenty_bearing).",
+        [](double lat1, double lon1, double lat2, double lon2) {
+            return geo_vincenty_bearing({lat1, lon1, 0}, {lat2, lon2, 0});
+        });
+    add(m, "cross_track",
+        "cross_track(latitude1, longitude1, latitude2, longitude2, latitude, longitude): metres from the "
+        "line that "
+        "leaves point 1 with the bearing of point 2, positive left of it (geo_vincenty_crosstrack).",
+        [](double lat1, double lon1, double lat2, double lon2, double lat, double lon) {
+            return geo_vincenty_crosstrack({lat1, lon1, 0}, {lat2, lon2, 0}, {lat, lon, 0});
+        });
+    add_covariance<&Varxyz2varllh>(m, "covariance_to_llh",
+                                   "covariance_to_llh(x, y, z, covariance): covariance of latitude, "
+                                   "longitude, height. Six numbers along the "
+                                   "last axis: variances of 0, 1, 2, covariances 01, 02, 12; GEO_NULL for a "
+                                   "position that cannot be converted "
+                                   "(Varxyz2varllh).");
+    add_covariance<&Varxyz2varneu>(
+        m, "covariance_to_neu",
+        "covariance_to_neu(x, y, z, covariance): covariance of north, east, up; as covariance_to_llh "
+        "(Varxyz2varneu).");
+}
+
+}  // namespace basalt_python

@@ -1,0 +1,110 @@
+// Measures of the plane, curves and the intersection of bearings.
+#include <limits>
+
+#include "basalt/geo.h"
+#include "universal.h"
+
+namespace basalt_python {
+
+namespace {
+
+constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
+using Point = std::tuple<double, double, double>;
+
+geo_nee flat(double north, double east) {
+    return {north, east, 0};
+}
+
+}  // namespace
+
+void add_plane(pybind11::module_& m) {
+    add(m, "horizontal_distance",
+        "horizontal_distance(north1, east1, north2, east2): metres (geo_horz_dist).",
+        [](double n1, double e1, double n2, double e2) { return geo_horz_dist(flat(n1, e1), flat(n2, e2)); });
+    add(m, "slope_distance",
+        "slope_distance(north1, east1, elevation1, north2, east2, elevation2): metres (geo_slope_dist).",
+        [](double n1, double e1, double h1, double n2, double e2, double h2) {
+            return geo_slope_dist({n1, e1, h1}, {n2, e2, h2});
+        });
+    add(m, "grid_bearing",
+        "grid_bearing(north1, east1, north2, east2): radians in [0, 2 pi), 0 for equal points "
+        "(geo_grid_bearing).",
+        [](double n1, double e1, double n2, double e2) {
+            return geo_grid_bearing(flat(n1, e1), flat(n2, e2));
+        });
+    add(m, "slope_angle",
+        "slope_angle(north1, east1, elevation1, north2, east2, elevation2): radians from the level, positive "
+        "uphill (geo_gradient).",
+        [](double n1, double e1, double h1, double n2, double e2, double h2) {
+            return geo_gradient({n1, e1, h1}, {n2, e2, h2});
+        });
+    add(m, "grade",
+        "grade(north1, east1, elevation1, north2, east2, elevation2): rise over run, positive uphill "
+        "(geo_gradient2).",
+        [](double n1, double e1, double h1, double n2, double e2, double h2) {
+            return geo_gradient2({n1, e1, h1}, {n2, e2, h2});
+        });
+    add(m, "normalise_bearing", "normalise_bearing(angle): radians in [0, 2 pi) (_normalisedbearing).",
+        [](double angle) { return _normalisedbearing(angle); });
+    add(m, "divergence",
+        "divergence(bearing1, bearing2): the turn from the one to the other, radians (geo_grid_divergence).",
+        [](double b1, double b2) { return geo_grid_divergence(b1, b2); });
+    add(m, "bisected_bearing", "bisected_bearing(bearing1, bearing2): radians (geo_bisected_bearing).",
+        [](double b1, double b2) { return geo_bisected_bearing(b1, b2); });
+    add(m, "triangle_area",
+        "triangle_area(north1, east1, north2, east2, north3, east3): square metres (geo_triangle_area).",
+        [](double n1, double e1, double n2, double e2, double n3, double e3) {
+            return geo_triangle_area(flat(n1, e1), flat(n2, e2), flat(n3, e3));
+        });
+    add(m, "bearing_intersection",
+        "bearing_intersection(north1, east1, north2, east2, bearing1, bearing2): (north, east) where two "
+        "rays "
+        "meet; NaN where they do not (geo_grid_bb_intersect).",
+        [](double n1, double e1, double n2, double e2, double b1, double b2) {
+            geo_nee out{NOT_A_NUMBER, NOT_A_NUMBER, 0};
+            const int met = geo_grid_bb_intersect(flat(n1, e1), flat(n2, e2), b1, b2, out);
+            return met == 1 ? std::tuple{out.north, out.east} : std::tuple{NOT_A_NUMBER, NOT_A_NUMBER};
+        });
+
+    add(m, "arc_length", "arc_length(angle, radius): metres of an arc (geo_arc_angle_to_length).",
+        [](double angle, double radius) { return geo_arc_angle_to_length(angle, radius); });
+    add(m, "arc_angle", "arc_angle(length, radius): radians of an arc (geo_arc_length_to_angle).",
+        [](double length, double radius) { return geo_arc_length_to_angle(length, radius); });
+    add(m, "spiral_deflection",
+        "spiral_deflection(length, spiral_constant): radians; the constant is 2 R L, square metres "
+        "(geo_spiral_deflection).",
+        [](double length, double constant) { return geo_spiral_deflection(length, constant); });
+    add(m, "_spiral_deltas", "spiral_deltas(length, spiral_constant, tolerance): (x, y), metres.",
+        [](double length, double constant, double tolerance) {
+            double x = 0, y = 0;
+            geo_spiral_deltas(length, constant, tolerance, x, y);
+            return std::tuple{x, y};
+        });
+
+    add(m, "follow",
+        "follow(north, east, elevation, bearing, distance, slope_angle): the point reached over a horizontal "
+        "distance (geo_grid_follow).",
+        [](double n, double e, double h, double bearing, double distance, double angle) {
+            geo_nee out{};
+            geo_grid_follow({n, e, h}, bearing, distance, angle, out);
+            return Point{out.north, out.east, out.elevation};
+        });
+    add(m, "follow_grade",
+        "follow_grade(north, east, elevation, bearing, distance, grade): as follow, the slope a ratio "
+        "(geo_grid_follow2).",
+        [](double n, double e, double h, double bearing, double distance, double grade) {
+            geo_nee out{};
+            geo_grid_follow2({n, e, h}, bearing, distance, grade, out);
+            return Point{out.north, out.east, out.elevation};
+        });
+    add(m, "follow_height_change",
+        "follow_height_change(north, east, elevation, bearing, distance, height_change): as follow, with the "
+        "change of height in metres (geo_grid_follow3).",
+        [](double n, double e, double h, double bearing, double distance, double change) {
+            geo_nee out{};
+            geo_grid_follow3({n, e, h}, bearing, distance, change, out);
+            return Point{out.north, out.east, out.elevation};
+        });
+}
+
+}  // namespace basalt_python

@@ -1,0 +1,112 @@
+// Time scales, angle and length units.
+#include <cstdint>
+#include <limits>
+#include <stdexcept>
+
+#include "basalt/geo.h"
+#include "universal.h"
+
+namespace basalt_python {
+
+namespace {
+
+// Whole numbers come as 64 bits; one that the library's type does not hold is refused, not cut.
+template <class T>
+T narrow(std::int64_t value) {
+    if (value < std::numeric_limits<T>::min() || value > std::numeric_limits<T>::max()) {
+        throw std::out_of_range("a whole number is out of range");
+    }
+    return static_cast<T>(value);
+}
+std::uint16_t bits16(std::int64_t value) {
+    return narrow<std::uint16_t>(value);
+}
+
+using Whole = std::int64_t;
+
+}  // namespace
+
+void add_time_and_units(pybind11::module_& m) {
+    add(m, "date_to_mjd",
+        "date_to_mjd(year, month, day): Modified Julian Date, whole days from 1858-11-17 (_greg2mjd).",
+        [](Whole year, Whole month, Whole day) {
+            return Whole{_greg2mjd(bits16(year), bits16(month), bits16(day))};
+        });
+    add(m, "mjd_to_date", "mjd_to_date(mjd): (year, month, day, weekday), weekday 0 for Sunday (_mjd2greg).",
+        [](Whole mjd) {
+            std::uint16_t year = 0, month = 0, day = 0, weekday = 0;
+            _mjd2greg(narrow<std::uint32_t>(mjd), year, month, day, weekday);
+            return std::tuple{Whole{year}, Whole{month}, Whole{day}, Whole{weekday}};
+        });
+    add(m, "mjd_to_gps",
+        "mjd_to_gps(mjd, seconds_of_day): (week, seconds_of_week), without leap seconds (_mjd2gps).",
+        [](Whole mjd, double seconds) {
+            std::uint16_t week = 0;
+            double seconds_of_week = 0;
+            _mjd2gps(narrow<std::uint32_t>(mjd), seconds, week, seconds_of_week);
+            return std::tuple{Whole{week}, seconds_of_week};
+        });
+    add(m, "gps_to_mjd", "gps_to_mjd(week, seconds_of_week): MJD with its fraction (_gps2mjd).",
+        [](Whole week, double seconds) { return _gps2mjd(bits16(week), seconds); });
+    add(m, "calendar_to_java_time",
+        "calendar_to_java_time(year, month, day, hour, minute, second, millisecond): milliseconds since "
+        "1970, UTC; "
+        "2^64 - 1 for what is no time (_systime2javatime).",
+        [](Whole year, Whole month, Whole day, Whole hour, Whole minute, Whole second, Whole millisecond) {
+            SYSTEMTIME time{};
+            time.wYear = bits16(year);
+            time.wMonth = bits16(month);
+            time.wDay = bits16(day);
+            time.wHour = bits16(hour);
+            time.wMinute = bits16(minute);
+            time.wSecond = bits16(second);
+            time.wMilliseconds = bits16(millisecond);
+            return _systime2javatime(&time);
+        });
+    add(m, "java_time_to_calendar",
+        "java_time_to_calendar(milliseconds): (year, month, day, hour, minute, second, millisecond, weekday) "
+        "(_javatime2systemtime).",
+        [](std::uint64_t milliseconds) {
+            SYSTEMTIME t{};
+            _javatime2systemtime(milliseconds, &t);
+            return std::tuple{Whole{t.wYear},         Whole{t.wMonth},    Whole{t.wDay},
+                              Whole{t.wHour},         Whole{t.wMinute},   Whole{t.wSecond},
+                              Whole{t.wMilliseconds}, Whole{t.wDayOfWeek}};
+        });
+
+    add(m, "radians_to_dms",
+        "radians_to_dms(radians): (degrees, minutes, seconds); the sign is lost where degrees are 0 "
+        "(_radtodms).",
+        [](double radians) {
+            int degrees = 0, minutes = 0;
+            double seconds = 0;
+            _radtodms(radians, &degrees, &minutes, &seconds);
+            return std::tuple{Whole{degrees}, Whole{minutes}, seconds};
+        });
+    add(m, "dms_to_radians", "dms_to_radians(degrees, minutes, seconds): radians (_dmstorad).",
+        [](Whole degrees, Whole minutes, double seconds) {
+            double radians = 0;
+            _dmstorad(narrow<int>(degrees), narrow<int>(minutes), seconds, &radians);
+            return radians;
+        });
+    add(m, "metres_to_feet_inches",
+        "metres_to_feet_inches(metres, fraction_denominator): (positive, feet, inches, numerator, "
+        "denominator) in US "
+        "survey feet (_mtoftin).",
+        [](double metres, Whole fraction) {
+            bool positive = true;
+            int feet = 0, numerator = 0, denominator = 0;
+            double inches = 0;
+            _mtoftin(metres, narrow<int>(fraction), &positive, &feet, &inches, &numerator, &denominator);
+            return std::tuple{positive, Whole{feet}, inches, Whole{numerator}, Whole{denominator}};
+        });
+    add(m, "feet_inches_to_metres",
+        "feet_inches_to_metres(feet, inches, numerator, denominator): metres (_ftintom).",
+        [](Whole feet, double inches, Whole numerator, Whole denominator) {
+            double metres = 0;
+            _ftintom(narrow<int>(feet), inches, narrow<int>(numerator), narrow<int>(denominator), &metres);
+            return metres;
+        });
+}
+
+}  // namespace basalt_python

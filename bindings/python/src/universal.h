@@ -1,0 +1,146 @@
+// NumPy universal functions made of plain ones: NumPy broadcasts, converts what has another type, walks
+// strides without a copy and releases its lock around the loops that stand here.
+#ifndef BASALT_BINDINGS_PYTHON_UNIVERSAL_H
+#define BASALT_BINDINGS_PYTHON_UNIVERSAL_H
+
+#include <pybind11/pybind11.h>
+
+#define NPY_NO_DEPRECATED_API NPY_1_7_API_VERSION
+#define PY_ARRAY_UNIQUE_SYMBOL basalt_python_array
+#define PY_UFUNC_UNIQUE_SYMBOL basalt_python_ufunc
+#ifndef BASALT_PYTHON_MODULE
+#define NO_IMPORT_ARRAY
+#define NO_IMPORT_UFUNC
+#endif
+#include <numpy/arrayobject.h>
+#include <numpy/ufuncobject.h>
+
+#include <cfenv>
+#include <cstdint>
+#include <exception>
+#include <tuple>
+#include <type_traits>
+#include <utility>
+
+namespace basalt_python {
+
+template <class T>
+constexpr char type_number() {
+    if constexpr (std::is_same_v<T, double>) {
+        return NPY_DOUBLE;
+    } else if constexpr (std::is_same_v<T, bool>) {
+        return NPY_BOOL;
+    } else if constexpr (std::is_same_v<T, std::uint64_t>) {
+        return NPY_UINT64;
+    } else {
+        static_assert(std::is_same_v<T, std::int64_t>, "integers travel as 64 bits, whole numbers of Python");
+        return NPY_INT64;
+    }
+}
+
+template <class T>
+struct Results {
+    using Tuple = std::tuple<T>;
+};
+template <class... T>
+struct Results<std::tuple<T...>> {
+    using Tuple = std::tuple<T...>;
+};
+
+// Numbers that are not what the caller expected are answers here, as documented, and no reason for NumPy to
+// warn of the flags that their computation left.
+inline void forget_float_flags() {
+    std::feclearexcept(FE_ALL_EXCEPT);
+}
+
+// An exception may not pass through NumPy, which holds no lock of the interpreter meanwhile.
+template <class Loop>
+void as_python_error(Loop loop) noexcept {
+    const auto raise = [](PyObject* type, const char* text) {
+        NPY_ALLOW_C_API_DEF
+        NPY_ALLOW_C_API
+        PyErr_SetString(type, text);
+        NPY_DISABLE_C_API
+    };
+    try {
+        loop();
+    } catch (const std::bad_alloc&) {
+        raise(PyExc_MemoryError, "out of memory");
+    } catch (const std::exception& error) {
+        raise(PyExc_ValueError, error.what());
+    }
+}
+
+// A kernel is a lambda without captures: numbers in, a number or a tuple of numbers out.
+template <class Kernel, class Signature = decltype(&Kernel::operator())>
+struct Universal;
+
+template <class Kernel, class Out, class... In>
+struct Universal<Kernel, Out (Kernel::*)(In...) const> {
+    using Tuple = typename Results<Out>::Tuple;
+    static constexpr int INPUTS = sizeof...(In);
+    static constexpr int OUTPUTS = static_cast<int>(std::tuple_size_v<Tuple>);
+
+    static void run(char** arguments, const npy_intp* sizes, const npy_intp* steps, void*) {
+        as_python_error([&] {
+            step_through(arguments, *sizes, steps, std::make_index_sequence<INPUTS>{},
+                         std::make_index_sequence<OUTPUTS>{});
+        });
+        forget_float_flags();
+    }
+
+    template <std::size_t... I, std::size_t... O>
+    static void step_through(char** arguments, npy_intp count, const npy_intp* steps,
+                             std::index_sequence<I...>, std::index_sequence<O...>) {
+        for (npy_intp i = 0; i < count; ++i) {
+            const Tuple results{Kernel{}(*reinterpret_cast<const In*>(arguments[I] + i * steps[I])...)};
+            ((*reinterpret_cast<std::tuple_element_t<O, Tuple>*>(
+                  arguments[INPUTS + O] + i * steps[INPUTS + O]) = std::get<O>(results)),
+             ...);
+        }
+    }
+
+    template <std::size_t... O>
+    static pybind11::object make(const char* name, const char* text, std::index_sequence<O...>) {
+        static PyUFuncGenericFunction loop = &run;
+        static void* nothing = nullptr;
+        static char types[] = {type_number<In>()..., type_number<std::tuple_element_t<O, Tuple>>()...};
+        PyObject* made =
+            PyUFunc_FromFuncAndData(&loop, &nothing, types, 1, INPUTS, OUTPUTS, PyUFunc_None, name, text, 0);
+        if (made == nullptr) {
+            throw pybind11::error_already_set();
+        }
+        return pybind11::reinterpret_steal<pybind11::object>(made);
+    }
+};
+
+// Adds a universal function to a module; name and text have static storage.
+template <class Kernel>
+void add(pybind11::module_& module, const char* name, const char* text, Kernel) {
+    using Made = Universal<Kernel>;
+    module.attr(name) = Made::make(name, text, std::make_index_sequence<Made::OUTPUTS>{});
+}
+
+// Adds one whose items are arrays themselves, by NumPy's signature; the loop is NumPy's generic one.
+inline void add_general(pybind11::module_& module, const char* name, const char* text, const char* signature,
+                        PyUFuncGenericFunction* loop, char* types, int inputs, int outputs) {
+    static void* nothing = nullptr;
+    PyObject* made = PyUFunc_FromFuncAndDataAndSignature(loop, &nothing, types, 1, inputs, outputs,
+                                                         PyUFunc_None, name, text, 0, signature);
+    if (made == nullptr) {
+        throw pybind11::error_already_set();
+    }
+    module.attr(name) = pybind11::reinterpret_steal<pybind11::object>(made);
+}
+
+void add_plane(pybind11::module_& module);
+void add_polygons(pybind11::module_& module);
+void add_observations(pybind11::module_& module);
+void add_geodesy(pybind11::module_& module);
+void add_time_and_units(pybind11::module_& module);
+void add_sparse(pybind11::module_& module);
+void add_text(pybind11::module_& module);
+
+}  // namespace basalt_python
+
+#endif

@@ -24,6 +24,7 @@ TEST(RayIntersection, FactsOfMeetingAndMissing) {
         {"second points away", {0, 0, 1}, {10, -10, 2}, 0, 1.5 * PI, 0, 0, 0},
         {"first points away", {0, 0, 1}, {10, -10, 2}, PI, PI / 2, 0, 0, 0},
         {"second runs south", {10, -10, 0}, {20, 0, 0}, PI / 2, PI, 1, 10, 0},
+        {"second runs south, first oblique from an easting", {0, 3, 0}, {20, 10, 0}, PI / 4, PI, 1, 7, 10},
         {"diagonals", {0, 0, 0}, {0, 10, 0}, PI / 4, 1.75 * PI, 1, 5, 5},
         {"bearings of several turns", {0, 0, 0}, {0, 10, 0}, PI / 4 + 8 * PI, -PI / 4, 1, 5, 5},
         {"equal bearings", {0, 0, 0}, {10, 10, 0}, 1, 1, 0, 0, 0},

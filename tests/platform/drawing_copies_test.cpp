@@ -250,6 +250,21 @@ TEST(TransparentCopy, ComparesColoursNotTheUnusedByte) {
     EXPECT_EQ(canvas.picture().values, (std::vector<std::uint32_t>{7, 0xAA112234}));
 }
 
+TEST(TransparentCopy, OfOneBitTakesTheColoursOfTheDestination) {
+    Picture bits(2, 1);
+    bits.at(1, 0) = 1;
+    const Canvas source(bits, 1);
+    const Canvas canvas(2, 1, 32);
+    SetBkColor(source, 0xFF0000);
+    SetTextColor(canvas, 0x0000FF);
+    SetBkColor(canvas, 0x00FF00);
+    EXPECT_NE(TransparentBlt(canvas, 0, 0, 2, 1, source, 0, 0, 2, 1, 0x000000), 0);
+    EXPECT_EQ(canvas.picture().at(0, 0), 0U) << "the key";
+    EXPECT_EQ(canvas.picture().at(1, 0), 0x00FF00U) << "its background";
+    EXPECT_NE(TransparentBlt(canvas, 0, 0, 2, 1, source, 0, 0, 2, 1, 0xFFFFFF), 0);
+    EXPECT_EQ(canvas.picture().at(0, 0), 0xFF0000U) << "its text";
+}
+
 TEST(TransparentCopy, OntoItsOwnSurfaceReadsThePictureBefore) {
     std::mt19937 random(15);
     SCOPED_TRACE("seed 15");
@@ -390,6 +405,8 @@ TEST(Transform, ReachesAllCallsOrIsRefused) {
     EXPECT_NE(GradientFill(canvas, corners, 2, &mesh, 1, 0), 0);
     EXPECT_EQ(canvas.picture().at(2, 0), 0xFF0000U);
     EXPECT_EQ(canvas.picture().at(5, 0), 0xFF0000U);
+    EXPECT_EQ(canvas.picture().at(1, 0), 0U);
+    EXPECT_EQ(canvas.picture().at(6, 0), 0U);
     EXPECT_EQ(canvas.picture().at(2, 1), 0U);
     EXPECT_NE(BitBlt(source, 0, 0, 8, 8, canvas, 0, 0, SRCCOPY), 0) << "from a shifted source";
     EXPECT_EQ(source.picture().at(0, 3), 0xFF0000U);

@@ -54,6 +54,15 @@ TEST(Pixel, TakesTheNearestColourOfItsDepth) {
         EXPECT_EQ(std::count(picture.values.begin(), picture.values.end(), 0U),
                   fact.stored == 0 && fact.drawn != 0x336699 ? 38 : 34);
     }
+    // Four bits: red 1, green 2, blue 4, at half and at full strength; two greys between.
+    for (std::uint32_t value = 0; value < 16; ++value) {
+        const COLORREF level = value < 8 ? 0x80 : 0xFF;
+        const COLORREF expected = value == 7   ? 0xC0C0C0
+                                  : value == 8 ? 0x808080
+                                               : (value & 1) * level | (value >> 1 & 1) * level << 8 |
+                                                     (value >> 2 & 1) * level << 16;
+        EXPECT_EQ(GetPixel(Canvas(Picture(1, 1, value), 4), 0, 0), expected) << value;
+    }
     const Canvas canvas(Picture(1, 1, 0xAB332211), 32);
     EXPECT_EQ(GetPixel(canvas, 0, 0), 0x112233U) << "the unused byte is not told";
     EXPECT_EQ(canvas.picture().at(0, 0), 0xAB332211U) << "but kept";

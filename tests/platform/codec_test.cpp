@@ -28,6 +28,9 @@ protected:
         EXPECT_EQ(GdipGetImageEncoders(count, size - 1, &m_encoder), Gdiplus::InsufficientBuffer);
         ASSERT_EQ(GdipGetImageEncoders(count, size, &m_encoder), Gdiplus::Ok);
         EXPECT_EQ(m_encoder.FormatID, ImageFormatBMP);
+        const CLSID published = {
+            0x557CF400, 0x1A04, 0x11D3, {0x9A, 0x73, 0x00, 0x00, 0xF8, 0x1E, 0xF3, 0x2E}};
+        EXPECT_EQ(m_encoder.Clsid, published);
     }
     void TearDown() override { GdiplusShutdown(m_token); }
 

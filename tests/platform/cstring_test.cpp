@@ -39,7 +39,7 @@ TEST(CString, characters_by_position) {
     text.SetAt(1, L'X');
     text.SetAt(3, L'Y');
     text.SetAt(-1, L'Z');
-    EXPECT_EQ(text, L"aXc");
+    EXPECT_STREQ(text, L"aXc");
     EXPECT_EQ(text[0], L'a');
     EXPECT_EQ(text[std::size_t{2}], L'c');
     EXPECT_EQ(text[3], L'\0');

@@ -37,11 +37,14 @@ setup(
     ext_modules=[Extension(
         "basalt._basalt",
         sources=[str(file.relative_to(HERE)) for file in sorted((HERE / "src").glob("*.cpp"))],
-        depends=[str(HERE / "src" / "universal.h"), str(LIBRARY / "src" / "libbasalt.a")],
+        depends=[str(HERE / "src" / "universal.h"), str(HERE / "src" / "exported.map"),
+                 str(LIBRARY / "src" / "libbasalt.a")],
         include_dirs=[str(HERE / "src"), str(ROOT / "include"), str(LIBRARY / "include"), pybind11.get_include(),
                       numpy.get_include()],
         extra_compile_args=["-std=c++20", "-O3", "-ffp-contract=off", "-fvisibility=hidden", "-Wall", "-Wextra"],
-        extra_link_args=[str(LIBRARY / "src" / "libbasalt.a"), *words_of_pkg_config("--libs")],
+        # The library's own symbols stay inside: a host that has loaded another basalt would otherwise lend its own.
+        extra_link_args=[f"-Wl,--version-script={HERE / 'src' / 'exported.map'}", str(LIBRARY / "src" / "libbasalt.a"),
+                         *words_of_pkg_config("--libs")],
     )],
     cmdclass={"build_ext": BuildWithLibrary},
 )

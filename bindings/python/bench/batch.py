@@ -25,12 +25,12 @@ def milliseconds(work):
 def compare(name, ours, theirs):
     pairs = [(milliseconds(ours), milliseconds(theirs)) for _ in range(ROUNDS)]
     bound, plain = (min(column) for column in zip(*pairs))
-    print(f"{name:24}{bound:12.2f}{plain:12.2f}{plain / bound:9.0%}")
+    print(f"{name:30}{bound:12.2f}{plain:12.2f}{plain / bound:9.0%}")
 
 
 def main():
     loops = PlainLoops()
-    print(f"{'':24}{'Python, ms':>12}{'C++, ms':>12}{'speed':>9}")
+    print(f"{'':30}{'Python, ms':>12}{'C++, ms':>12}{'speed':>9}")
     for name in FUNCTIONS:
         call = next(getattr(module, name) for module in (geo, time_scales, units) if hasattr(module, name))
         made = columns(name, COUNT)
@@ -47,7 +47,7 @@ def main():
     north, east = random.uniform(-110, 110, (2, COUNT))
     inside = np.empty(COUNT, dtype=bool)
     compare("in_polygon, 100", lambda: geo.in_polygon(north, east, outline[:, 0], outline[:, 1], out=inside),
-            lambda: loops.in_polygon(north, east, outline, inside))
+            lambda: loops.outline("in_polygon", north, east, outline, inside))
 
 
 if __name__ == "__main__":

@@ -42,8 +42,7 @@ void add_covariance(pybind11::module_& m, const char* name, const char* text) {
 void add_geodesy(pybind11::module_& m) {
     add(m, "llh_to_xyz",
         "llh_to_xyz(latitude, longitude, height): (x, y, z), metres; NaN where all three are 0, which is "
-        "refused "
-        "as a record never set (_llh2xyz).",
+        "refused as a record never set (_llh2xyz).",
         [](double latitude, double longitude, double height) {
             const geo_llh llh{latitude, longitude, height};
             geo_vector xyz{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER};
@@ -58,8 +57,8 @@ void add_geodesy(pybind11::module_& m) {
     });
     add(m, "xyz_to_local",
         "xyz_to_local(origin_x, origin_y, origin_z, x, y, z): (north, east, elevation) in the plane that "
-        "touches "
-        "the ellipsoid below the origin, metres; NaN where the origin cannot be converted (_xyz2nez).",
+        "touches the ellipsoid below the origin, metres; NaN where the origin cannot be converted "
+        "(_xyz2nez).",
         [](double ox, double oy, double oz, double x, double y, double z) {
             const geo_vector origin{ox, oy, oz};
             const geo_vector point{x, y, z};
@@ -74,10 +73,15 @@ void add_geodesy(pybind11::module_& m) {
             _wgs84curvature(latitude, meridian, prime_vertical);
             return std::tuple{meridian, prime_vertical};
         });
+    add(m, "llh_equal",
+        "llh_equal(latitude1, longitude1, height1, latitude2, longitude2, height2): whether the points are "
+        "less than 0.5 mm apart in space (llh_equal).",
+        [](double lat1, double lon1, double h1, double lat2, double lon2, double h2) {
+            return llh_equal({lat1, lon1, h1}, {lat2, lon2, h2}) != 0;
+        });
     add(m, "direct",
         "direct(latitude, longitude, azimuth, distance): (latitude, longitude, azimuth) at the end of a "
-        "geodesic; "
-        "azimuths in [-pi, pi], the longitude not wrapped (geo_vincenty_direct).",
+        "geodesic; azimuths in [-pi, pi], the longitude not wrapped (geo_vincenty_direct).",
         [](double latitude, double longitude, double azimuth, double distance) {
             geo_llh end{};
             double at_end = 0;
@@ -85,9 +89,8 @@ void add_geodesy(pybind11::module_& m) {
             return std::tuple{end.latitude, end.longitude, at_end};
         });
     add(m, "great_circle_distance",
-        "great_circle_distance(latitude1, longitude1, latitude2, longitude2): metres on a sphere of 6371 km, "
-        "up to "
-        "0.6 % off (geo_vincenty_distance).",
+        "great_circle_distance(latitude1, longitude1, latitude2, longitude2): metres on a sphere of 6371 "
+        "km, up to 0.6 % off (geo_vincenty_distance).",
         [](double lat1, double lon1, double lat2, double lon2) {
             return geo_vincenty_distance({lat1, lon1, 0}, {lat2, lon2, 0});
         });
@@ -99,17 +102,16 @@ void add_geodesy(pybind11::module_& m) {
         });
     add(m, "cross_track",
         "cross_track(latitude1, longitude1, latitude2, longitude2, latitude, longitude): metres from the "
-        "line that "
-        "leaves point 1 with the bearing of point 2, positive left of it (geo_vincenty_crosstrack).",
+        "line that leaves point 1 with the bearing of point 2, positive left of it "
+        "(geo_vincenty_crosstrack).",
         [](double lat1, double lon1, double lat2, double lon2, double lat, double lon) {
             return geo_vincenty_crosstrack({lat1, lon1, 0}, {lat2, lon2, 0}, {lat, lon, 0});
         });
     add_covariance<&Varxyz2varllh>(m, "covariance_to_llh",
                                    "covariance_to_llh(x, y, z, covariance): covariance of latitude, "
-                                   "longitude, height. Six numbers along the "
-                                   "last axis: variances of 0, 1, 2, covariances 01, 02, 12; GEO_NULL for a "
-                                   "position that cannot be converted "
-                                   "(Varxyz2varllh).");
+                                   "longitude, height. Six numbers along the last axis: variances of 0, 1, "
+                                   "2, covariances 01, 02, 12; GEO_NULL for a position that cannot be "
+                                   "converted (Varxyz2varllh).");
     add_covariance<&Varxyz2varneu>(
         m, "covariance_to_neu",
         "covariance_to_neu(x, y, z, covariance): covariance of north, east, up; as covariance_to_llh "

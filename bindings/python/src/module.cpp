@@ -20,7 +20,9 @@ PYBIND11_MODULE(_basalt, module) {
         throw pybind11::error_already_set();
     }
     module.attr("GEO_NULL") = GEO_NULL;
+    module.attr("GEO_INFINITY") = GEO_INFINITY;
     basalt_python::add_plane(module);
+    basalt_python::add_vectors(module);
     basalt_python::add_polygons(module);
     basalt_python::add_observations(module);
     basalt_python::add_geodesy(module);

@@ -9,8 +9,7 @@ namespace basalt_python {
 void add_observations(pybind11::module_& m) {
     add(m, "first_face",
         "first_face(horizontal, vertical): (horizontal, vertical) of an observation brought to the first "
-        "face, "
-        "radians (geo_normalise_obs).",
+        "face, radians (geo_normalise_obs).",
         [](double horizontal, double vertical) {
             geo_hvd obs{horizontal, vertical, 0};
             geo_normalise_obs(obs);

@@ -21,6 +21,35 @@ void add_plane(pybind11::module_& m) {
     add(m, "horizontal_distance",
         "horizontal_distance(north1, east1, north2, east2): metres (geo_horz_dist).",
         [](double n1, double e1, double n2, double e2) { return geo_horz_dist(flat(n1, e1), flat(n2, e2)); });
+    add(m, "horizontal_distance_squared",
+        "horizontal_distance_squared(north1, east1, north2, east2): square metres (geo_horz_distSq).",
+        [](double n1, double e1, double n2, double e2) {
+            return geo_horz_distSq(flat(n1, e1), flat(n2, e2));
+        });
+    add(m, "height_difference",
+        "height_difference(elevation1, elevation2): metres, positive where the second is higher "
+        "(geo_vert_dist).",
+        [](double h1, double h2) {
+            return geo_vert_dist({0, 0, h1}, {0, 0, h2});
+        });
+    add(m, "points_equal",
+        "points_equal(north1, east1, elevation1, north2, east2, elevation2): whether each differs by less "
+        "than 0.5 mm (nee_equal).",
+        [](double n1, double e1, double h1, double n2, double e2, double h2) {
+            return nee_equal({n1, e1, h1}, {n2, e2, h2}) != 0;
+        });
+    add(m, "distances_equal",
+        "distances_equal(distance1, distance2): whether they differ by less than 0.5 mm, or both are "
+        "GEO_NULL (geo_dist_equal).",
+        [](double a, double b) { return geo_dist_equal(a, b); });
+    add(m, "midpoint",
+        "midpoint(north1, east1, elevation1, north2, east2, elevation2): (north, east, elevation); "
+        "GEO_NULL where either point's is (geo_grid_centroid).",
+        [](double n1, double e1, double h1, double n2, double e2, double h2) {
+            geo_nee out{};
+            geo_grid_centroid({n1, e1, h1}, {n2, e2, h2}, out);
+            return Point{out.north, out.east, out.elevation};
+        });
     add(m, "slope_distance",
         "slope_distance(north1, east1, elevation1, north2, east2, elevation2): metres (geo_slope_dist).",
         [](double n1, double e1, double h1, double n2, double e2, double h2) {
@@ -33,8 +62,8 @@ void add_plane(pybind11::module_& m) {
             return geo_grid_bearing(flat(n1, e1), flat(n2, e2));
         });
     add(m, "slope_angle",
-        "slope_angle(north1, east1, elevation1, north2, east2, elevation2): radians from the level, positive "
-        "uphill (geo_gradient).",
+        "slope_angle(north1, east1, elevation1, north2, east2, elevation2): radians from the level, "
+        "positive uphill (geo_gradient).",
         [](double n1, double e1, double h1, double n2, double e2, double h2) {
             return geo_gradient({n1, e1, h1}, {n2, e2, h2});
         });
@@ -49,6 +78,12 @@ void add_plane(pybind11::module_& m) {
     add(m, "divergence",
         "divergence(bearing1, bearing2): the turn from the one to the other, radians (geo_grid_divergence).",
         [](double b1, double b2) { return geo_grid_divergence(b1, b2); });
+    add(m, "divergence_of_lines",
+        "divergence_of_lines(a_north1, a_east1, a_north2, a_east2, b_north1, b_east1, b_north2, b_east2): "
+        "the angle between two directions, each from one point to another, radians (geo_grid_divergence).",
+        [](double an1, double ae1, double an2, double ae2, double bn1, double be1, double bn2, double be2) {
+            return geo_grid_divergence(flat(an1, ae1), flat(an2, ae2), flat(bn1, be1), flat(bn2, be2));
+        });
     add(m, "bisected_bearing", "bisected_bearing(bearing1, bearing2): radians (geo_bisected_bearing).",
         [](double b1, double b2) { return geo_bisected_bearing(b1, b2); });
     add(m, "triangle_area",
@@ -58,8 +93,7 @@ void add_plane(pybind11::module_& m) {
         });
     add(m, "bearing_intersection",
         "bearing_intersection(north1, east1, north2, east2, bearing1, bearing2): (north, east) where two "
-        "rays "
-        "meet; NaN where they do not (geo_grid_bb_intersect).",
+        "rays meet; NaN where they do not (geo_grid_bb_intersect).",
         [](double n1, double e1, double n2, double e2, double b1, double b2) {
             geo_nee out{NOT_A_NUMBER, NOT_A_NUMBER, 0};
             const int met = geo_grid_bb_intersect(flat(n1, e1), flat(n2, e2), b1, b2, out);
@@ -70,6 +104,10 @@ void add_plane(pybind11::module_& m) {
         [](double angle, double radius) { return geo_arc_angle_to_length(angle, radius); });
     add(m, "arc_angle", "arc_angle(length, radius): radians of an arc (geo_arc_length_to_angle).",
         [](double length, double radius) { return geo_arc_length_to_angle(length, radius); });
+    add(m, "arc_half_chord",
+        "arc_half_chord(radius, separation): metres, for an arc that stands off its chord by the "
+        "separation; the diameter where that reaches the radius (geo_arc_to_chord).",
+        [](double radius, double separation) { return geo_arc_to_chord(radius, separation); });
     add(m, "spiral_deflection",
         "spiral_deflection(length, spiral_constant): radians; the constant is 2 R L, square metres "
         "(geo_spiral_deflection).",
@@ -82,8 +120,8 @@ void add_plane(pybind11::module_& m) {
         });
 
     add(m, "follow",
-        "follow(north, east, elevation, bearing, distance, slope_angle): the point reached over a horizontal "
-        "distance (geo_grid_follow).",
+        "follow(north, east, elevation, bearing, distance, slope_angle): the point reached over a "
+        "horizontal distance (geo_grid_follow).",
         [](double n, double e, double h, double bearing, double distance, double angle) {
             geo_nee out{};
             geo_grid_follow({n, e, h}, bearing, distance, angle, out);
@@ -98,8 +136,8 @@ void add_plane(pybind11::module_& m) {
             return Point{out.north, out.east, out.elevation};
         });
     add(m, "follow_height_change",
-        "follow_height_change(north, east, elevation, bearing, distance, height_change): as follow, with the "
-        "change of height in metres (geo_grid_follow3).",
+        "follow_height_change(north, east, elevation, bearing, distance, height_change): as follow, with "
+        "the change of height in metres (geo_grid_follow3).",
         [](double n, double e, double h, double bearing, double distance, double change) {
             geo_nee out{};
             geo_grid_follow3({n, e, h}, bearing, distance, change, out);

@@ -59,36 +59,32 @@ void add_outline_test(pybind11::module_& m, const char* name, const char* text, 
 void add_polygons(pybind11::module_& m) {
     add_outline_test<false>(m, "in_polygon",
                             "in_polygon(north, east, norths, easts): whether points lie inside polygons, "
-                            "whose vertices lie along the "
-                            "last axis; on an edge what rounding leaves (geo_point_in_poly).",
+                            "whose vertices lie along the last axis; on an edge what rounding leaves "
+                            "(geo_point_in_poly).",
                             [](int n, const geo_nee* polygon, const geo_nee& point, double) {
                                 return geo_point_in_poly(n, polygon, &point);
                             });
     add_outline_test<true>(m, "in_polygon_or_near",
                            "in_polygon_or_near(north, east, norths, easts, tolerance): as in_polygon, or "
-                           "within so many metres of the "
-                           "outline (geo_point_in_poly_2).",
+                           "within so many metres of the outline (geo_point_in_poly_2).",
                            [](int n, const geo_nee* polygon, const geo_nee& point, double tolerance) {
                                return geo_point_in_poly_2(n, polygon, &point, tolerance);
                            });
     add_outline_test<true>(m, "on_polyline",
-                           "on_polyline(north, east, norths, easts, tolerance): whether points lie within so "
-                           "many metres of a closed "
-                           "chain of segments (geo_point_on_polyline).",
+                           "on_polyline(north, east, norths, easts, tolerance): whether points lie within "
+                           "so many metres of a closed chain of segments (geo_point_on_polyline).",
                            [](int n, const geo_nee* vertices, const geo_nee& point, double tolerance) {
                                return geo_point_on_polyline(n, vertices, &point, tolerance);
                            });
     add(m, "on_line",
-        "on_line(north1, east1, north2, east2, north, east, tolerance): whether a point lies within so many "
-        "metres "
-        "of a segment (geo_point_on_line).",
+        "on_line(north1, east1, north2, east2, north, east, tolerance): whether a point lies within so "
+        "many metres of a segment (geo_point_on_line).",
         [](double n1, double e1, double n2, double e2, double n, double e, double tolerance) {
             return geo_point_on_line({n1, e1, 0}, {n2, e2, 0}, {n, e, 0}, tolerance) != 0;
         });
     add(m, "lines_cross",
         "lines_cross(p_north1, p_east1, p_north2, p_east2, q_north1, q_east1, q_north2, q_east2): whether "
-        "two "
-        "segments cross (geo_lines_cross).",
+        "two segments cross (geo_lines_cross).",
         [](double pn1, double pe1, double pn2, double pe2, double qn1, double qe1, double qn2, double qe2) {
             return geo_lines_cross({pn1, pe1, 0}, {pn2, pe2, 0}, {qn1, qe1, 0}, {qn2, qe2, 0}) != 0;
         });

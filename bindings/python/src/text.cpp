@@ -2,7 +2,10 @@
 #include <pybind11/pybind11.h>
 #include <pybind11/stl.h>
 
-#include <cstdint>
+#include <cstddef>
+#include <cwchar>
+#include <memory>
+#include <stdexcept>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -17,45 +20,73 @@ namespace {
 
 namespace py = pybind11;
 
-CString wide(const std::wstring& text) {
-    if (text.find(L'\0') != std::wstring::npos) {
+// A path of Python: a text or what has __fspath__. Bytes of a name that are no UTF-8 stand in it as the
+// values 0xDC80 to 0xDCFF, which is what the library makes of them too; pybind11's own conversions refuse
+// those.
+CString wide(const py::object& path) {
+    const auto text = py::reinterpret_steal<py::object>(PyOS_FSPath(path.ptr()));
+    if (!text) {
+        throw py::error_already_set();
+    }
+    if (!py::isinstance<py::str>(text)) {
+        throw py::type_error("a path is a str or leads to one");
+    }
+    Py_ssize_t length = 0;
+    const std::unique_ptr<wchar_t, decltype(&PyMem_Free)> characters(
+        PyUnicode_AsWideCharString(text.ptr(), &length), &PyMem_Free);
+    if (characters == nullptr) {
+        throw py::error_already_set();
+    }
+    if (std::wcslen(characters.get()) != static_cast<std::size_t>(length)) {
         throw std::invalid_argument("a zero in a path");
     }
-    return CString(text.c_str());
+    return CString(characters.get());
 }
 
-std::wstring plain(const CString& text) {
-    return text.GetString();
+py::str plain(const CString& text) {
+    PyObject* made = PyUnicode_FromWideChar(text.GetString(), text.GetLength());
+    if (made == nullptr) {
+        throw py::error_already_set();
+    }
+    return py::reinterpret_steal<py::str>(made);
+}
+
+// Asks the disk, which may be a slow one, while other threads run.
+template <class Work>
+auto meanwhile(Work work) {
+    const py::gil_scoped_release others_run;
+    return work();
 }
 
 }  // namespace
 
 void add_text(pybind11::module_& module) {
-    module.def("split_path", [](const std::wstring& path) {
-        const vex_util::CFilePath parts(wide(path));
+    module.def("split_path", [](const py::object& path) {
+        const auto parts = meanwhile([whole = wide(path)] { return vex_util::CFilePath(whole); });
         return std::tuple{plain(parts.Drive()), plain(parts.DirectoryOnly()), plain(parts.FileNameOnly()),
                           plain(parts.Extension())};
     });
-    module.def("combine_path", [](const std::wstring& first, const std::wstring& second) {
-        vex_util::CFilePath path;
-        path.Combine(wide(first), wide(second));
-        return plain(path);
+    module.def("combine_path", [](const py::object& first, const py::object& second) {
+        return plain(meanwhile([a = wide(first), b = wide(second)] {
+            vex_util::CFilePath path;
+            path.Combine(a, b);
+            return path;
+        }));
     });
-    module.def("set_extension", [](const std::wstring& path, const std::wstring& extension) {
-        vex_util::CFilePath parts(wide(path));
-        parts.SetExtension(wide(extension));
-        return plain(parts);
+    module.def("set_extension", [](const py::object& path, const py::object& extension) {
+        return plain(meanwhile([whole = wide(path), last = wide(extension)] {
+            vex_util::CFilePath parts(whole);
+            parts.SetExtension(last);
+            return parts;
+        }));
     });
-    module.def("files_in_directory", [](const std::wstring& directory, const std::wstring& pattern) {
-        vex_util::CFilePath path(wide(directory));
-        std::vector<CString> found;
-        {
-            const py::gil_scoped_release others_run;
-            found = path.GetFilesInDirectory(wide(pattern));
-        }
-        std::vector<std::wstring> names;
+    module.def("files_in_directory", [](const py::object& directory, const py::object& pattern) {
+        const auto found = meanwhile([whole = wide(directory), chosen = wide(pattern)] {
+            return vex_util::CFilePath(whole).GetFilesInDirectory(chosen);
+        });
+        py::list names;
         for (const CString& name : found) {
-            names.push_back(plain(name));
+            names.append(plain(name));
         }
         return names;
     });

@@ -24,6 +24,13 @@ std::uint16_t bits16(std::int64_t value) {
 
 using Whole = std::int64_t;
 
+auto calendar_of(std::uint64_t milliseconds) {
+    SYSTEMTIME t{};
+    _javatime2systemtime(milliseconds, &t);
+    return std::tuple{Whole{t.wYear},   Whole{t.wMonth},  Whole{t.wDay},          Whole{t.wHour},
+                      Whole{t.wMinute}, Whole{t.wSecond}, Whole{t.wMilliseconds}, Whole{t.wDayOfWeek}};
+}
+
 }  // namespace
 
 void add_time_and_units(pybind11::module_& m) {
@@ -50,8 +57,7 @@ void add_time_and_units(pybind11::module_& m) {
         [](Whole week, double seconds) { return _gps2mjd(bits16(week), seconds); });
     add(m, "calendar_to_java_time",
         "calendar_to_java_time(year, month, day, hour, minute, second, millisecond): milliseconds since "
-        "1970, UTC; "
-        "2^64 - 1 for what is no time (_systime2javatime).",
+        "1970, UTC; 2^64 - 1 for what is no time (_systime2javatime).",
         [](Whole year, Whole month, Whole day, Whole hour, Whole minute, Whole second, Whole millisecond) {
             SYSTEMTIME time{};
             time.wYear = bits16(year);
@@ -63,17 +69,24 @@ void add_time_and_units(pybind11::module_& m) {
             time.wMilliseconds = bits16(millisecond);
             return _systime2javatime(&time);
         });
-    add(m, "java_time_to_calendar",
-        "java_time_to_calendar(milliseconds): (year, month, day, hour, minute, second, millisecond, weekday) "
-        "(_javatime2systemtime).",
-        [](std::uint64_t milliseconds) {
-            SYSTEMTIME t{};
-            _javatime2systemtime(milliseconds, &t);
-            return std::tuple{Whole{t.wYear},         Whole{t.wMonth},    Whole{t.wDay},
-                              Whole{t.wHour},         Whole{t.wMinute},   Whole{t.wSecond},
-                              Whole{t.wMilliseconds}, Whole{t.wDayOfWeek}};
-        });
+    add(
+        m, "java_time_to_calendar",
+        "java_time_to_calendar(milliseconds): (year, month, day, hour, minute, second, millisecond, "
+        "weekday) (_javatime2systemtime).",
+        [](Whole milliseconds) {
+            if (milliseconds < 0) {
+                throw std::out_of_range("a whole number is out of range");
+            }
+            return calendar_of(static_cast<std::uint64_t>(milliseconds));
+        },
+        [](std::uint64_t milliseconds) { return calendar_of(milliseconds); });
+    m.def("current_java_time", &_currentjavatime,
+          "Milliseconds since 1970 by the machine's clock (_currentjavatime).");
 
+    add(m, "degrees_to_radians", "degrees_to_radians(degrees): radians (_degtorad).",
+        [](double degrees) { return _degtorad(degrees); });
+    add(m, "factorial", "factorial(n): in double precision, infinite from 171 on (factorial).",
+        [](Whole n) { return factorial(narrow<std::uint32_t>(n)); });
     add(m, "radians_to_dms",
         "radians_to_dms(radians): (degrees, minutes, seconds); the sign is lost where degrees are 0 "
         "(_radtodms).",
@@ -91,8 +104,7 @@ void add_time_and_units(pybind11::module_& m) {
         });
     add(m, "metres_to_feet_inches",
         "metres_to_feet_inches(metres, fraction_denominator): (positive, feet, inches, numerator, "
-        "denominator) in US "
-        "survey feet (_mtoftin).",
+        "denominator) in US survey feet (_mtoftin).",
         [](double metres, Whole fraction) {
             bool positive = true;
             int feet = 0, numerator = 0, denominator = 0;

@@ -15,6 +15,7 @@
 #include <numpy/arrayobject.h>
 #include <numpy/ufuncobject.h>
 
+#include <array>
 #include <cfenv>
 #include <cstdint>
 #include <exception>
@@ -101,24 +102,28 @@ struct Universal<Kernel, Out (Kernel::*)(In...) const> {
     }
 
     template <std::size_t... O>
-    static pybind11::object make(const char* name, const char* text, std::index_sequence<O...>) {
-        static PyUFuncGenericFunction loop = &run;
-        static void* nothing = nullptr;
-        static char types[] = {type_number<In>()..., type_number<std::tuple_element_t<O, Tuple>>()...};
-        PyObject* made =
-            PyUFunc_FromFuncAndData(&loop, &nothing, types, 1, INPUTS, OUTPUTS, PyUFunc_None, name, text, 0);
-        if (made == nullptr) {
-            throw pybind11::error_already_set();
-        }
-        return pybind11::reinterpret_steal<pybind11::object>(made);
+    static constexpr std::array<char, INPUTS + OUTPUTS> types_of(std::index_sequence<O...>) {
+        return {type_number<In>()..., type_number<std::tuple_element_t<O, Tuple>>()...};
     }
+    static constexpr auto TYPES = types_of(std::make_index_sequence<OUTPUTS>{});
 };
 
-// Adds a universal function to a module; name and text have static storage.
-template <class Kernel>
-void add(pybind11::module_& module, const char* name, const char* text, Kernel) {
-    using Made = Universal<Kernel>;
-    module.attr(name) = Made::make(name, text, std::make_index_sequence<Made::OUTPUTS>{});
+// Adds a universal function to a module; name and text have static storage. Of several kernels, for other
+// types of the same numbers, NumPy takes the first whose types hold what it is given.
+template <class Kernel, class... Others>
+void add(pybind11::module_& module, const char* name, const char* text, Kernel, Others...) {
+    using First = Universal<Kernel>;
+    constexpr int KERNELS = 1 + sizeof...(Others);
+    static PyUFuncGenericFunction loops[] = {&First::run, &Universal<Others>::run...};
+    static void* nothing[KERNELS] = {};
+    static auto types =
+        std::array<std::array<char, First::TYPES.size()>, KERNELS>{First::TYPES, Universal<Others>::TYPES...};
+    PyObject* made = PyUFunc_FromFuncAndData(loops, nothing, types[0].data(), KERNELS, First::INPUTS,
+                                             First::OUTPUTS, PyUFunc_None, name, text, 0);
+    if (made == nullptr) {
+        throw pybind11::error_already_set();
+    }
+    module.attr(name) = pybind11::reinterpret_steal<pybind11::object>(made);
 }
 
 // Adds one whose items are arrays themselves, by NumPy's signature; the loop is NumPy's generic one.
@@ -134,6 +139,7 @@ inline void add_general(pybind11::module_& module, const char* name, const char*
 }
 
 void add_plane(pybind11::module_& module);
+void add_vectors(pybind11::module_& module);
 void add_polygons(pybind11::module_& module);
 void add_observations(pybind11::module_& module);
 void add_geodesy(pybind11::module_& module);

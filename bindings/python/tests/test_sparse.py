@@ -60,7 +60,7 @@ def test_cells_of_the_whole_plane_and_none_beyond():
 
 
 def test_elements_are_plain_and_results_live_on_their_own():
-    for bad in ("O", [("a", "O")], "V0"):
+    for bad in ("O", [("a", "O")], "V0", ("f8", (3,))):
         with pytest.raises(TypeError):
             Sparse2DArray(bad)
     with pytest.raises(ValueError):
@@ -74,6 +74,35 @@ def test_elements_are_plain_and_results_live_on_their_own():
     array = Sparse2DArray("i8")
     array.insert([], [], [])
     assert array.find([], [])[0].shape == (0,)
+
+
+def test_nothing_is_cut_on_the_way_in():
+    whole = Sparse2DArray("i2")
+    whole.insert([0, 1], 0, [-(2**15), 2**15 - 1])
+    whole.insert(2, 0, np.uint64(7))
+    assert whole.find([0, 1, 2], 0)[0].tolist() == [-(2**15), 2**15 - 1, 7]
+    for bad in (2**15, [2**40], np.uint64(2**64 - 1)):
+        with pytest.raises(ValueError):
+            whole.insert(0, 0, bad)
+    for bad in (1.5, [2.0], 1j, np.array(["7"])):
+        with pytest.raises(TypeError):
+            whole.insert(0, 0, bad)
+    single = Sparse2DArray("f4")
+    single.insert([0, 1, 2], 0, np.array([0.5, -1.0, 3.0]))  # narrower numbers of the same kind are asked for
+    assert single.find([0, 1, 2], 0)[0].tolist() == [0.5, -1.0, 3.0]
+    with pytest.raises(TypeError):
+        single.insert(0, 0, np.array([1j]))
+
+
+def test_fields_go_by_their_names():
+    array = Sparse2DArray([("height", "f8"), ("count", "i4")])
+    array.insert([0, 1], 0, [(1.5, 2), (2.5, 3)])
+    array.insert([2], 0, np.array([(3.5, 4)], [("height", "f4"), ("count", "i8")]))
+    assert array.find([0, 1, 2], 0)[0].tolist() == [(1.5, 2), (2.5, 3), (3.5, 4)]
+    for other in ([("count", "i4"), ("height", "f8")], [("height", "f8")], [("height", "f8"), ("count", "f8")], "f8"):
+        with pytest.raises(TypeError):
+            array.insert(0, 0, np.zeros((), other))
+    assert array.find(0, 0)[0].item() == (1.5, 2)
 
 
 def test_threads_share_an_array():

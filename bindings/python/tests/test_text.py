@@ -1,4 +1,6 @@
 """Paths and hexadecimal text."""
+import os
+
 import pytest
 
 from basalt import files, hexadecimal
@@ -24,3 +26,15 @@ def test_paths_are_taken_apart_and_put_together(tmp_path):
     (tmp_path / "b.txt").touch()
     listed = files.files_in_directory(f"{tmp_path}/", "*.csv")
     assert [path.replace("\\", "/") for path in listed] == [str(tmp_path / "a.csv")]
+
+
+def test_names_that_are_no_text_lead_to_their_files(tmp_path):
+    name = os.fsdecode(b"level\xff.csv")
+    (tmp_path / name).touch()
+    (listed,) = files.files_in_directory(f"{tmp_path}/", "*.csv")
+    assert os.path.exists(listed.replace("\\", "/")) and listed.endswith(name)
+    assert files.split(tmp_path / name)[2:] == (name[:-4], "csv")
+    assert files.split(tmp_path).name == ""  # a directory is one wherever the disk says so
+    for bad in (b"/site", 5, None):
+        with pytest.raises(TypeError):
+            files.split(bad)

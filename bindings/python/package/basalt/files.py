@@ -3,6 +3,7 @@
 What is put together has backslashes between its parts, which the library takes wherever it takes a path; other programs
 want them replaced by slashes.
 """
+import os
 import typing
 
 from ._basalt import combine_path as combine
@@ -20,6 +21,6 @@ class Parts(typing.NamedTuple):
     extension: str
 
 
-def split(path: str) -> Parts:
+def split(path: str | os.PathLike[str]) -> Parts:
     """The parts of a path (vex_util::CFilePath): "/site/day 1/levels.csv" has "site/day 1", "levels" and "csv"."""
     return Parts(*split_path(path))

@@ -3,23 +3,29 @@
 Angles are radians, bearings clockwise from north, lengths metres. Components are separate arrays in the order north,
 east, elevation; latitude, longitude, height; x, y, z. Most functions are NumPy universal functions: they broadcast,
 read arrays where they stand, take out= and where=, and let other threads run. A result that the library leaves
-unformed is NaN; GEO_NULL, a field never set, stays what it is.
+unformed is NaN; GEO_NULL, a field never set, stays what it is, and so does GEO_INFINITY.
 """
-from ._basalt import (GEO_NULL, _calculate_observation, _reduce_observation, _spiral_deltas, _xyz_to_llh, arc_angle,
-                      arc_length, bearing_intersection, bisected_bearing, covariance_to_llh, covariance_to_neu,
-                      cross_track, curvature_radii, direct, divergence, first_face, follow, follow_grade,
-                      follow_height_change, grade, great_circle_bearing, great_circle_distance, grid_bearing,
-                      horizontal_distance, in_polygon, in_polygon_or_near, lines_cross, llh_to_xyz, normalise_bearing,
-                      on_line, on_polyline, slope_angle, slope_distance, spiral_deflection, triangle_area,
+from ._basalt import (GEO_INFINITY, GEO_NULL, _calculate_observation, _reduce_observation, _spiral_deltas, _xyz_to_llh,
+                      arc_angle, arc_half_chord, arc_length, bearing_intersection, bisected_bearing, covariance_to_llh,
+                      covariance_to_neu, cross_track, curvature_radii, direct, distances_equal, divergence,
+                      divergence_of_lines, first_face, follow, follow_grade, follow_height_change, grade,
+                      great_circle_bearing, great_circle_distance, grid_bearing, height_difference,
+                      horizontal_distance, horizontal_distance_squared, in_polygon, in_polygon_or_near, lines_cross,
+                      llh_equal, llh_to_xyz, midpoint, normalise_bearing, on_line, on_polyline, points_equal,
+                      slope_angle, slope_distance, spiral_deflection, triangle_area, vector_bearing, vector_distance,
+                      vector_length, vector_slope_angle, vector_slope_angle_along_x, vector_slope_angle_along_y,
                       xyz_to_local)
 
-__all__ = ["GEO_NULL", "arc_angle", "arc_length", "bearing_intersection", "bisected_bearing",
-           "calculate_observation", "covariance_to_llh", "covariance_to_neu", "cross_track", "curvature_radii",
-           "direct", "divergence", "first_face", "follow", "follow_grade", "follow_height_change", "grade",
-           "great_circle_bearing", "great_circle_distance", "grid_bearing", "horizontal_distance", "in_polygon",
-           "in_polygon_or_near", "lines_cross", "llh_to_xyz", "normalise_bearing", "on_line", "on_polyline",
-           "reduce_observation", "slope_angle", "slope_distance", "spiral_deflection", "spiral_deltas",
-           "triangle_area", "xyz_to_llh", "xyz_to_local"]
+__all__ = ["GEO_INFINITY", "GEO_NULL", "arc_angle", "arc_half_chord", "arc_length", "bearing_intersection",
+           "bisected_bearing", "calculate_observation", "covariance_to_llh", "covariance_to_neu", "cross_track",
+           "curvature_radii", "direct", "distances_equal", "divergence", "divergence_of_lines", "first_face", "follow",
+           "follow_grade", "follow_height_change", "grade", "great_circle_bearing", "great_circle_distance",
+           "grid_bearing", "height_difference", "horizontal_distance", "horizontal_distance_squared", "in_polygon",
+           "in_polygon_or_near", "lines_cross", "llh_equal", "llh_to_xyz", "midpoint", "normalise_bearing", "on_line",
+           "on_polyline", "points_equal", "reduce_observation", "slope_angle", "slope_distance", "spiral_deflection",
+           "spiral_deltas", "triangle_area", "vector_bearing", "vector_distance", "vector_length",
+           "vector_slope_angle", "vector_slope_angle_along_x", "vector_slope_angle_along_y", "xyz_to_llh",
+           "xyz_to_local"]
 
 
 def xyz_to_llh(x, y, z, tolerance=5e-10, **options):

@@ -25,6 +25,27 @@ def _cells(x, y):
             x.shape)
 
 
+def _elements(given, dtype):
+    """What is given as an array of the dtype. Nothing is cut and no field taken for another on the way."""
+    if getattr(given, "dtype", None) == dtype:
+        return given if isinstance(given, np.ndarray) else np.asarray(given)
+    if dtype.names is not None:  # tuples have no names; records that have go by theirs
+        if hasattr(given, "dtype") and (given.dtype.names != dtype.names or
+                                        not np.can_cast(given.dtype, dtype, "same_kind")):
+            raise TypeError(f"elements are {dtype}, not {given.dtype}")
+        return np.asarray(given, dtype=dtype)
+    natural = np.asarray(given)
+    if natural.dtype.kind in "iu" and dtype.kind in "iu":
+        made = natural.astype(dtype)
+        if not np.array_equal(made, natural):
+            raise ValueError(f"{dtype} does not hold a number that is given")
+        return made
+    numbers = natural.dtype.kind in "biufc" and dtype.kind in "biufc"
+    if natural.size and (numbers or hasattr(given, "dtype")) and not np.can_cast(natural.dtype, dtype, "same_kind"):
+        raise TypeError(f"elements are {dtype}, not {natural.dtype}")
+    return np.asarray(given, dtype=dtype)
+
+
 class Sparse2DArray:
     """Elements of one dtype by cell (vex_util::Sparse2DArray), in batches.
 
@@ -34,8 +55,8 @@ class Sparse2DArray:
 
     def __init__(self, dtype: npt.DTypeLike, block_side: int = 16, elements_per_chunk: int = 1024):
         self._dtype = np.dtype(dtype)
-        if self._dtype.hasobject or self._dtype.itemsize == 0:
-            raise TypeError(f"elements are plain bytes of a fixed size, not {self._dtype}")
+        if self._dtype.hasobject or self._dtype.itemsize == 0 or self._dtype.subdtype is not None:
+            raise TypeError(f"elements are plain bytes of a fixed size, or records of such, not {self._dtype}")
         if not (0 < block_side <= 4096 and 0 < elements_per_chunk <= 2**24):
             raise ValueError("block_side is 1 to 4096 cells, elements_per_chunk 1 to 2^24")
         self._array = SparseBytes(self._dtype.itemsize, block_side, elements_per_chunk)
@@ -45,9 +66,12 @@ class Sparse2DArray:
         return self._dtype
 
     def insert(self, x: npt.ArrayLike, y: npt.ArrayLike, elements: npt.ArrayLike) -> None:
-        """Copies elements into their cells, over those already there; a later one of the same cell wins."""
+        """Copies elements into their cells, over those already there; a later one of the same cell wins.
+
+        Numbers of another dtype are converted where nothing is cut by that; records have the dtype's field names.
+        """
         x, y, shape = _cells(x, y)
-        elements = np.broadcast_to(np.asarray(elements, dtype=self._dtype), shape)
+        elements = np.broadcast_to(_elements(elements, self._dtype), shape)
         self._array.insert(x, y, np.ascontiguousarray(elements).reshape(-1).view(np.uint8))
 
     def find(self, x: npt.ArrayLike, y: npt.ArrayLike) -> tuple[np.ndarray, np.ndarray]:

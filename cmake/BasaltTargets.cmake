@@ -22,14 +22,6 @@ if(BASALT_HARDEN AND NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
   target_link_options(basalt_options INTERFACE -Wl,-z,relro,-z,now,-z,noexecstack)
 endif()
 
-# Clang links its sanitizers' runtimes into each program, where they come before the tests' own operator new.
-if(CMAKE_CXX_COMPILER_ID MATCHES "Clang" AND CMAKE_CXX_FLAGS MATCHES "-fsanitize=.*address")
-  execute_process(COMMAND ${CMAKE_CXX_COMPILER} -print-file-name=libclang_rt.asan-${CMAKE_SYSTEM_PROCESSOR}.so
-    OUTPUT_VARIABLE runtime OUTPUT_STRIP_TRAILING_WHITESPACE)
-  cmake_path(GET runtime PARENT_PATH runtime_folder)
-  add_link_options(-shared-libsan -Wl,-rpath,${runtime_folder})
-endif()
-
 # The same sources give the same bytes, wherever they stand.
 target_compile_options(basalt_options INTERFACE -ffile-prefix-map=${PROJECT_SOURCE_DIR}=.
   -ffile-prefix-map=${PROJECT_BINARY_DIR}=build)

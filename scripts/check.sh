@@ -1,11 +1,12 @@
 #!/usr/bin/env bash
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
 # locale, a system short of everything, the package, exported symbols, the binary interface, the Python package,
-# hardening and the same bytes from another folder, results to the bit, sanitizers, every call that can fail failing, many threads at once
-# (STRESS_SECONDS=N each, 5), documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 10).
+# hardening and the same bytes from another folder, results to the bit, sanitizers, every call that can fail failing,
+# many threads at once (STRESS_SECONDS=N each, 5), documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 10).
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
-#        format includes clang headers tidy elsewhere limits package symbols abi python hardening exact asan tsan stress docs fuzz
+#        format includes clang headers tidy elsewhere limits package symbols abi python hardening exact asan tsan
+#        stress docs fuzz
 #        faults (alone; among the tests of clang and asan it runs anyway)
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
@@ -48,8 +49,9 @@ step_abi() {
     scripts/check_abi.sh build/dev/src/libbasalt.so
 }
 step_python() {
-    [ -d $installed ] || step_package
-    BASALT_LIBRARY=$PWD/build/package/library-OFF scripts/python.sh
+    local static=$PWD/build/package/library-OFF
+    [ -f "$static/src/libbasalt.a" ] || step_package
+    BASALT_LIBRARY=$static scripts/python.sh
 }
 step_hardening() {
     [ -d $installed ] || step_package
@@ -65,18 +67,23 @@ step_hardening() {
 }
 step_exact() {
     # one number folded from thousands of results: whoever compiles it, and as the optimised library gives it
-    local test=tests/geo/exact_results_test.cpp program=build/exact_results sources
+    local test=tests/geo/exact_results_test.cpp program=build/exact_results sources level compiler running compilation
     # time scales hold whole numbers alone, and need the platform's clock
     sources=$(ls src/geo/*.cpp | grep -v time_scales)
     for level in -O0 -O2 -O3; do
+        running=()
         for compiler in g++ clang++; do
             # shellcheck disable=SC2086  # the sources are words
-            $compiler -std=c++20 $level -ffp-contract=off -I. -Iinclude $sources $test -o $program$level-$compiler \
+            $compiler -std=c++20 $level -ffp-contract=off -I. -Iinclude $sources $test -o $program-$compiler \
                 -lgtest -lgtest_main &
+            running+=($!)
         done
-        wait
+        # each by its number: a bare wait forgets who failed, and an older program would run
+        for compilation in "${running[@]}"; do
+            wait "$compilation"
+        done
         for compiler in g++ clang++; do
-            $program$level-$compiler --gtest_brief=1
+            $program-$compiler --gtest_brief=1
         done
     done
     [ -d $installed ] || step_package

@@ -12,6 +12,7 @@ FAMILIES = {"frame": set(), "geo": set(), "util": set(), "files": set(), "memory
             "sparse": {"memory"}, "graphics": {"frame", "geo"}}
 STANDARD = re.compile(r"^[a-z_0-9]+$|^(stddef|stdint|string)\.h$")  # <vector>, and what C shares
 INTRINSICS = {"immintrin.h", "emmintrin.h"}
+OUTSIDE = {"bindings", "console", "examples", "tools"}
 SOURCES = [f"{folder}/**/*{ending}"  # not those of tests, which hold texts
            for folder in ("include", "src", "bench", "bindings", "fuzz", "examples", "console", "tools")
            for ending in (".h", ".cpp")]
@@ -41,6 +42,9 @@ def main():
         text = file.read_bytes()
         if any(byte > 126 or (byte < 32 and byte != 10) for byte in text):
             errors.append(f"{path}: not plain ASCII with LF line ends")
+        if path.parts[0] in OUTSIDE and re.search(r'^\s*#\s*include\s*"(src|tests|bench)/', text.decode("ascii", "replace"),
+                                                  re.M):
+            errors.append(f"{path}: may include include/basalt/ alone")
         if path.parts[0] not in ("include", "src"):
             continue
         room = path.parts[1] if path.parts[0] == "src" and len(path.parts) > 2 else None

@@ -11,7 +11,8 @@ need_packages "${BUILD_PACKAGES[@]}" libgeographiclib-dev libboost1.81-dev libsp
     python3
 work=build/header_cost
 mkdir -p $work
-cmake -S . -B $work/library -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_TOOLS=OFF >$work/log
+cmake -S . -B $work/library -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF \
+    -DBASALT_BUILD_TOOLS=OFF >$work/log
 
 headers=(basalt/{geo,sparse,memory,frame,util,files,graphics,basalt}.h GeographicLib/Geodesic.hpp
     GeographicLib/Geocentric.hpp boost/geometry.hpp openvdb/openvdb.h spdlog/spdlog.h filesystem vector)
@@ -30,7 +31,7 @@ for _ in $(seq "${ROUNDS:-7}"); do
     for header in $(printf '%s\n' empty "${headers[@]}" | shuf); do
         began=$(date +%s%N)
         compile "$header" -fsyntax-only
-        taken=$((($(date +%s%N) - began) / 10000))
+        taken=$((($(date +%s%N) - began) / 1000))
         [ $taken -ge "${least[$header]}" ] || least[$header]=$taken
     done
 done
@@ -39,8 +40,8 @@ done
     echo "| header | lines | milliseconds |"
     echo "|---|---:|---:|"
     for header in "${headers[@]}"; do
-        LC_ALL=C awk -v name="$header" -v lines="${lines[$header]}" -v ns=$((least[$header] - least[empty])) \
-            'BEGIN { printf "| `%s` | %d | %.0f |\n", name, lines, ns / 100 }'
+        LC_ALL=C awk -v name="$header" -v lines="${lines[$header]}" -v us=$((least[$header] - least[empty])) \
+            'BEGIN { printf "| `%s` | %d | %.0f |\n", name, lines, us / 1000 }'
     done
 } >$work/table
 cat $work/table

@@ -26,4 +26,5 @@ BUILD_PACKAGES=(g++ cmake ninja-build pkg-config libpixman-1-dev)
 TEST_PACKAGES=(libgtest-dev)
 PEER_PACKAGES=(libbenchmark-dev libabsl-dev libopenvdb-dev libtbb-dev libboost1.81-dev libgeos-dev
     libspatialindex-dev libgeographiclib-dev libproj-dev libspdlog-dev libcairo2-dev)
-CHECK_PACKAGES=(abigail-tools binutils clang clang-format clang-tidy doxygen git libclang-rt-14-dev llvm locales python3)
+CHECK_PACKAGES=(abigail-tools binutils clang clang-format clang-tidy doxygen git libclang-rt-14-dev llvm locales
+    python3)

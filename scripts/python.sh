@@ -7,8 +7,8 @@ set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
 
-need_packages "${BUILD_PACKAGES[@]}" python3-dev python3-numpy python3-pip python3-pybind11 pybind11-dev python3-pytest \
-    python3-setuptools python3-venv python3-wheel
+need_packages "${BUILD_PACKAGES[@]}" python3-dev python3-numpy python3-pip python3-pybind11 pybind11-dev \
+    python3-pytest python3-setuptools python3-venv python3-wheel
 work=build/python
 [ -x $work/environment/bin/python ] || /usr/bin/python3 -m venv --system-site-packages $work/environment
 python=$PWD/$work/environment/bin/python

@@ -17,6 +17,10 @@ ROOT = HERE.parent.parent
 LIBRARY = pathlib.Path(os.environ.get("BASALT_LIBRARY", ROOT / "build" / "python" / "library"))
 
 
+WORK = LIBRARY / "python"  # what setuptools makes: beside the library that it is made of
+WORK.mkdir(parents=True, exist_ok=True)
+
+
 class BuildWithLibrary(build_ext):
     def run(self):
         if "BASALT_LIBRARY" not in os.environ:
@@ -37,7 +41,7 @@ setup(
     ext_modules=[Extension(
         "basalt._basalt",
         sources=[str(file.relative_to(HERE)) for file in sorted((HERE / "src").glob("*.cpp"))],
-        depends=[str(HERE / "src" / "universal.h"), str(HERE / "src" / "exported.map"),
+        depends=[__file__, str(HERE / "src" / "universal.h"), str(HERE / "src" / "exported.map"),
                  str(LIBRARY / "src" / "libbasalt.a")],
         include_dirs=[str(HERE / "src"), str(ROOT / "include"), str(LIBRARY / "include"), pybind11.get_include(),
                       numpy.get_include()],
@@ -47,4 +51,5 @@ setup(
                          *words_of_pkg_config("--libs")],
     )],
     cmdclass={"build_ext": BuildWithLibrary},
+    options={"build": {"build_base": str(WORK)}, "egg_info": {"egg_base": str(WORK)}},
 )

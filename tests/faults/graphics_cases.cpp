@@ -84,6 +84,20 @@ void check_drawing() {
         t.expect(t.attempt(draw) || t.struck(), "0 only for a failure");
         t.expect(draw(), "drawn afterwards");
     });
+    check("BitBlt and TransparentBlt within a surface", [](Trial& t) {
+        const Surface surface;
+        const XFORM twice = {2, 0, 0, 2, 0, 0};
+        SetGraphicsMode(surface.dc, GM_ADVANCED);
+        const auto draw = [&] {
+            SetPixel(surface.dc, 0, 0, 0xFF);
+            return TransparentBlt(surface.dc, 1, 1, 20, 10, surface.dc, 0, 0, 10, 5, 0xFFFFFF) != 0 &&
+                   SetWorldTransform(surface.dc, &twice) != 0 &&
+                   BitBlt(surface.dc, 5, 5, 5, 5, surface.dc, 0, 0, SRCCOPY) != 0;
+        };
+        t.expect(t.attempt(draw) || t.struck(), "0 only for a failure");
+        ModifyWorldTransform(surface.dc, nullptr, MWT_IDENTITY);
+        t.expect(draw() && GetPixel(surface.dc, 5, 5) == 0xFF, "drawn afterwards");
+    });
     check("_gradientfill, _transparentblt", [](Trial& t) {
         _operatingsystem();
         const Surface from;

@@ -36,6 +36,20 @@ void check_heaps() {
         t.expect(fills(heap->Alloc(100), 100) && fills(heap->Alloc(LARGE), LARGE), "blocks");
         t.attempt([&] { heap.reset(); });
     });
+    check("vlWinHeapAllocator::Alloc, more regions than the record holds", [](Trial& t) {
+        vlWinHeapAllocator heap(0);
+        std::vector<void*> blocks(40);
+        t.attempt([&] {
+            for (void*& block : blocks) {
+                block = heap.Alloc(LARGE);
+            }
+        });
+        for (void* const block : blocks) {
+            t.expect(t.struck() || block != nullptr, "null only for a failure");
+            heap.Free(block);
+        }
+        t.expect(fills(heap.Alloc(LARGE), LARGE), "a block afterwards");
+    });
     for (const auto& [name, size] : {std::pair("vlWinHeapAllocator::Alloc, a new region", std::size_t{100}),
                                      std::pair("vlWinHeapAllocator::Alloc, mapped alone", LARGE)}) {
         check(name, [size = size](Trial& t) {

@@ -177,6 +177,8 @@ TEST_F(FileQueries, lists_odd_names_and_finds_each_again) {
     EXPECT_EQ(file.GetFilesInDirectory(L"*.txt").size(), 4U);
     EXPECT_EQ(file.GetFilesInDirectory(L"?t?.t*t"), std::vector{file.Directory() + L"\\été.txt"});
     EXPECT_TRUE(file.GetFilesInDirectory(L"").empty());
+    EXPECT_EQ(file.GetFilesInDirectory(L"été.txt"), std::vector{file.Directory() + L"\\été.txt"});
+    EXPECT_TRUE(file.GetFilesInDirectory(L"none.txt").empty());
     EXPECT_TRUE(CFilePath(at(L"missing/job.txt")).GetFilesInDirectory(L"*").empty());
 }
 

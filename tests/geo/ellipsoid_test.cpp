@@ -162,6 +162,14 @@ TEST(Ellipsoid, LocalFramePointsNorthEastAndUp) {
                     (n + at.height) * std::cos(at.latitude) * step, 1e-8);
         EXPECT_LT(std::abs(out.north), 1e-5);
     }
+    // On the axis every direction is south; the meridian of Greenwich decides.
+    const geo_vector pole = {0, 0, 6356752.3142};
+    const geo_vector point = {-3, 4, pole.z + 5};
+    geo_nee out = {};
+    ASSERT_EQ(_xyz2nez(&pole, &point, &out), 1);
+    EXPECT_NEAR(out.north, 3.0, 1e-8);
+    EXPECT_NEAR(out.east, 4.0, 1e-8);
+    EXPECT_NEAR(out.elevation, 5.0, 1e-8);
 }
 
 TEST(Ellipsoid, EqualWithinHalfAMillimetreOfSpace) {

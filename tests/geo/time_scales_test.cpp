@@ -37,6 +37,7 @@ TEST(ModifiedJulianDate, FollowsTheCalendar) {
     }
     EXPECT_EQ(_greg2mjd(1858, 11, 16), 0xFFFFFFFFU);
     EXPECT_EQ(_greg2mjd(2023, 2, 31), _greg2mjd(2023, 3, 3));
+    EXPECT_EQ(_greg2mjd(2023, 14, 29), _greg2mjd(2024, 2, 29)) << "months run over into the next year";
 }
 
 /// The conversion to a date as it is written in the journal, year cut to 16 bits before the day of the week.

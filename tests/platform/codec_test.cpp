@@ -54,6 +54,8 @@ TEST_F(CodecTest, LeavesNoFileWhereNoneCanBeWritten) {
     EXPECT_EQ(GetLastError(), ERROR_FILE_NOT_FOUND);
     EXPECT_EQ(save(canvas.bitmap(), m_folder.wide(L"")), Gdiplus::Win32Error);
     EXPECT_EQ(save(canvas.bitmap(), L""), Gdiplus::Win32Error);
+    EXPECT_EQ(save(canvas.bitmap(), file(L"\xD800.bmp")), Gdiplus::Win32Error);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_NAME);
     if (std::filesystem::exists("/dev/full")) {
         EXPECT_EQ(save(canvas.bitmap(), L"/dev/full"), Gdiplus::Win32Error);
         EXPECT_EQ(GetLastError(), ERROR_DISK_FULL);
@@ -103,7 +105,16 @@ TEST_F(CodecTest, RefusesWhatItCannotWrite) {
     EXPECT_EQ(GdipSaveImageToFile(image, nullptr, &m_encoder.Clsid, nullptr), Gdiplus::InvalidParameter);
     EXPECT_NE(DeleteObject(bitmap), 0);
     EXPECT_EQ(GdipSaveImageToFile(image, name.c_str(), &m_encoder.Clsid, nullptr), Gdiplus::InvalidParameter);
+    EXPECT_EQ(GdipSaveImageToFile(nullptr, name.c_str(), &m_encoder.Clsid, nullptr),
+              Gdiplus::InvalidParameter);
+    EXPECT_EQ(GdipSaveImageToFile(image, name.c_str(), nullptr, nullptr), Gdiplus::InvalidParameter);
     EXPECT_EQ(GdipDisposeImage(image), Gdiplus::Ok);
+    EXPECT_EQ(GdipDisposeImage(nullptr), Gdiplus::InvalidParameter);
+    UINT count = 0;
+    EXPECT_EQ(GdipGetImageEncodersSize(&count, nullptr), Gdiplus::InvalidParameter);
+    EXPECT_EQ(GdipGetImageEncodersSize(nullptr, &count), Gdiplus::InvalidParameter);
+    EXPECT_EQ(GdipGetImageEncoders(1, sizeof m_encoder, nullptr), Gdiplus::InvalidParameter);
+    EXPECT_EQ(GdipGetImageEncoders(2, sizeof m_encoder, &m_encoder), Gdiplus::InvalidParameter);
     EXPECT_TRUE(m_folder.names().empty());
 }
 
@@ -111,7 +122,13 @@ TEST(Codec, AnswersOnlyWhileItRuns) {
     UINT count = 0;
     UINT size = 0;
     EXPECT_EQ(GdipGetImageEncodersSize(&count, &size), Gdiplus::GdiplusNotInitialized);
+    GpBitmap* image = nullptr;
+    EXPECT_EQ(GdipGetImageEncoders(1, size, nullptr), Gdiplus::GdiplusNotInitialized);
+    EXPECT_EQ(GdipCreateBitmapFromHBITMAP(nullptr, nullptr, &image), Gdiplus::GdiplusNotInitialized);
+    EXPECT_EQ(GdipSaveImageToFile(image, L"", nullptr, nullptr), Gdiplus::GdiplusNotInitialized);
+    EXPECT_EQ(GdipDisposeImage(image), Gdiplus::GdiplusNotInitialized);
     std::uintptr_t tokens[2] = {};
+    EXPECT_EQ(GdiplusStartup(&tokens[0], nullptr, nullptr), Gdiplus::InvalidParameter);
     GdiplusStartupInput input = {2, nullptr, 0, 0};
     EXPECT_EQ(GdiplusStartup(&tokens[0], &input, nullptr), Gdiplus::UnsupportedGdiplusVersion);
     input.GdiplusVersion = 1;

@@ -220,6 +220,13 @@ TEST(CStringFormat, whatever_does_not_fit_is_harmless) {
     EXPECT_EQ(formatted(L"100%% %y %n %", 1), L"100% %y %n %");
     EXPECT_EQ(formatted(L"%p %p", reinterpret_cast<void*>(0xBEEF), nullptr),
               L"000000000000BEEF 0000000000000000");
+    EXPECT_EQ(formatted(L"%p", 0xBEEF), L"000000000000BEEF");
+    const wchar_t* const wide = L"wide";
+    const char* const narrow = "narrow";
+    EXPECT_EQ(formatted(L"%p %p", wide, narrow),
+              formatted(L"%p %p", static_cast<const void*>(wide), static_cast<const void*>(narrow)));
+    EXPECT_EQ(formatted(L"%d[%*d]", 1), L"1[]");
+    EXPECT_EQ(formatted(L"[%*d]", L"text", 5), L"[5]") << "a width that is no number is none";
     EXPECT_EQ(formatted(nullptr, 1), L"");
     EXPECT_EQ(formatted(L"%99999999999d", 1).size(), 1'000'000U);
     EXPECT_EQ(formatted(L"%*.*f|%-*s", INT_MIN, INT_MAX, 1.0, INT_MIN, L"").size(), 2'000'003U);

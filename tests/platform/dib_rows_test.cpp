@@ -137,6 +137,9 @@ TEST(DibRows, RefuseAHeaderThatDoesNotFit) {
     EXPECT_EQ(question.header.biHeight, 2);
     EXPECT_EQ(question.header.biBitCount, 32);
     EXPECT_EQ(question.header.biSizeImage, 24U);
+    DibHeader size_only(3, 2, 24);
+    EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), 1, 1, nullptr, size_only.info(), DIB_RGB_COLORS), 1);
+    EXPECT_EQ(size_only.header.biSizeImage, 24U) << "of all rows, each of 12 bytes";
     EXPECT_EQ(bits[6], 0U);
 }
 

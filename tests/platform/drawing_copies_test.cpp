@@ -352,6 +352,28 @@ TEST(TransformedCopy, TakesTheSourcePixelUnderEachMiddle) {
     }
 }
 
+TEST(TransformedCopy, OntoItsOwnSurfaceReadsThePictureBefore) {
+    std::mt19937 random(22);
+    SCOPED_TRACE("seed 22");
+    const Picture before = drawing::random_picture(12, 12, 32, random);
+    const Canvas canvas(before, 32);
+    const Canvas source(before, 32);
+    const Canvas expected(before, 32);
+    const XFORM twice = {2, 0, 0, 2, 0, 0};
+    const XFORM turn = turned(90, 6, 6);
+    for (const Canvas* const each : {&canvas, &source, &expected}) {
+        EXPECT_NE(SetGraphicsMode(*each, GM_ADVANCED), 0);
+        EXPECT_NE(SetWorldTransform(*each, &twice), 0);
+    }
+    EXPECT_NE(BitBlt(canvas, 2, 1, 4, 5, canvas, 0, 0, SRCCOPY), 0);
+    EXPECT_NE(BitBlt(expected, 2, 1, 4, 5, source, 0, 0, SRCCOPY), 0);
+    EXPECT_NE(BitBlt(canvas, 0, 0, 0, 5, canvas, 0, 0, SRCCOPY), 0) << "of no width";
+    EXPECT_EQ(canvas.picture(), expected.picture());
+    EXPECT_NE(SetWorldTransform(source, &turn), 0);
+    EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, source, 0, 0, SRCCOPY), 0) << "from a turned source";
+    EXPECT_EQ(canvas.picture(), expected.picture());
+}
+
 TEST(Transform, ReachesAllCallsOrIsRefused) {
     const Canvas canvas(8, 8, 32);
     const Canvas source(Picture(8, 8, 5), 32);
@@ -416,6 +438,10 @@ TEST(Transform, ReachesAllCallsOrIsRefused) {
     const XFORM far = {1, 0.5F, 0, 1, 3e38F, -3e38F};
     EXPECT_NE(SetWorldTransform(canvas, &tiny), 0);
     EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, source, 0, 0, SRCCOPY), 0);
+    EXPECT_EQ(GetLastError(), ERROR_ARITHMETIC_OVERFLOW);
+    const RECT all = {0, 0, 8, 8};
+    EXPECT_EQ(FillRect(canvas, &all, static_cast<HBRUSH>(GetStockObject(WHITE_BRUSH))), 0);
+    EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, nullptr, 0, 0, WHITENESS), 0);
     EXPECT_EQ(DPtoLP(canvas, points, 2), 0);
     EXPECT_EQ(points[0].x, 1);
     EXPECT_NE(DPtoLP(canvas, points + 1, 1), 0);

@@ -119,6 +119,7 @@ TEST(Wrapper, OwnsOneHandle) {
     EXPECT_EQ(lent->GetSafeHdc(), dc.GetSafeHdc());
     EXPECT_TRUE(lent->DeleteDC());
     EXPECT_FALSE(dc.DeleteDC());
+    EXPECT_EQ(CDC::FromHandle(nullptr), nullptr);
 }
 
 TEST(Wrapper, OfTheStockBitmapIsWholeAgainAfterItsEnd) {

@@ -73,9 +73,15 @@ TEST(LastError, from_errno) {
         DWORD code;
     };
     for (const auto& [number, code] :
-         {Row{0, 0}, Row{ENOENT, 2}, Row{ENOTDIR, 3}, Row{EMFILE, 4}, Row{ENFILE, 4}, Row{EACCES, 5},
-          Row{EPERM, 5}, Row{EBADF, 6}, Row{ENOMEM, 8}, Row{EEXIST, 80}, Row{EINVAL, 87}, Row{ENOSPC, 112},
-          Row{EDQUOT, 112}, Row{ENAMETOOLONG, 206}, Row{EAGAIN, 1450}, Row{-1, 31}, Row{99999, 31}}) {
+         {Row{0, 0},           Row{ENOENT, 2},         Row{ENOTDIR, 3},     Row{EMFILE, 4},
+          Row{ENFILE, 4},      Row{EACCES, 5},         Row{EPERM, 5},       Row{EBADF, 6},
+          Row{ENOMEM, 8},      Row{EEXIST, 80},        Row{EINVAL, 87},     Row{ENOSPC, 112},
+          Row{EDQUOT, 112},    Row{ENAMETOOLONG, 206}, Row{EAGAIN, 1450},   Row{-1, 31},
+          Row{99999, 31},      Row{EISDIR, 5},         Row{EXDEV, 17},      Row{EROFS, 19},
+          Row{ETXTBSY, 32},    Row{ENOSYS, 50},        Row{EOPNOTSUPP, 50}, Row{ENODEV, 55},
+          Row{ENXIO, 55},      Row{ENOTEMPTY, 145},    Row{EBUSY, 170},     Row{EFBIG, 223},
+          Row{EOVERFLOW, 534}, Row{EINTR, 995},        Row{EFAULT, 998},    Row{EILSEQ, 1113},
+          Row{EIO, 1117},      Row{ETIMEDOUT, 1460},   Row{ELOOP, 1921}}) {
         errno = number;
         basalt::platform::set_last_error_from_errno();
         EXPECT_EQ(GetLastError(), code) << number;

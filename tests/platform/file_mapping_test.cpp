@@ -52,6 +52,7 @@ TEST(FileMapping, holds_its_space_and_its_lock_without_a_descriptor) {
     const long mapped = mapped_balance();
     const HANDLE file = make_file(name);
     const HANDLE mapping = make_mapping(file);
+    const HANDLE second = make_mapping(file);
     ASSERT_NE(mapping, nullptr);
     struct stat status = {};
     ASSERT_EQ(stat((folder / "file").c_str(), &status), 0);
@@ -68,6 +69,9 @@ TEST(FileMapping, holds_its_space_and_its_lock_without_a_descriptor) {
 
     EXPECT_EQ(map(mapping), nullptr) << "a mapping has one view";
     EXPECT_EQ(GetLastError(), ERROR_NOT_SUPPORTED);
+    EXPECT_EQ(map(second), nullptr) << "and so has a file";
+    EXPECT_EQ(GetLastError(), ERROR_FILE_INVALID);
+    EXPECT_EQ(CloseHandle(second), 1);
     EXPECT_EQ(make_mapping(file), nullptr);
     EXPECT_EQ(GetLastError(), ERROR_FILE_INVALID);
 

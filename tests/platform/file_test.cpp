@@ -160,6 +160,14 @@ TEST(File, deletes_what_it_opened_and_nothing_else) {
     EXPECT_EQ(CloseHandle(relative), 1);
     EXPECT_EQ(folder.names(), Names{});
 
+    const auto gone = folder / "gone";
+    std::filesystem::create_directory(gone);
+    std::filesystem::current_path(gone);
+    std::filesystem::remove(gone);
+    const DWORD error = open_error(L"relative", CREATE_NEW);
+    std::filesystem::current_path(before);
+    EXPECT_EQ(error, ERROR_PATH_NOT_FOUND) << "its folder is no more";
+
     const HANDLE replaced = open(folder.wide(L"replaced"), CREATE_NEW);
     std::filesystem::remove(folder / "replaced");
     folder.write("replaced", "somebody else's");

@@ -298,6 +298,7 @@ TEST(Heap, MaximumBoundsWhatIsMapped) {
     void* whole = heap.take(2 * MIB - 64);
     EXPECT_NE(whole, nullptr) << "single blocks may be as large as the maximum allows";
     EXPECT_EQ(heap.take(4000), nullptr);
+    EXPECT_EQ(heap.resize(whole, 4 * MIB), nullptr);
     EXPECT_EQ(heap.free(whole), 1);
     EXPECT_NE(heap.take(HeapCompact(heap.handle, 0)), nullptr);
 }
@@ -320,6 +321,8 @@ TEST(Heap, RefusesAbsurdSizes) {
 TEST(Heap, TellsWhatIsNoLiveBlock) {
     const Heap heap(0);
     const Heap other(0);
+    int local = 0;
+    EXPECT_EQ(heap.free(&local), 0) << "of a heap that has no memory yet";
     auto* first = static_cast<char*>(heap.take(100));
     auto* second = static_cast<char*>(heap.take(100));
     void* third = heap.take(100);
@@ -329,7 +332,6 @@ TEST(Heap, TellsWhatIsNoLiveBlock) {
     EXPECT_EQ(heap.free(second), 1);
     EXPECT_EQ(heap.free(third), 1) << "joins the one before";
     EXPECT_EQ(heap.free(large), 1);
-    int local = 0;
     for (void* wrong :
          {static_cast<void*>(second), third, large, static_cast<void*>(first + 16), foreign,
           static_cast<void*>(first + 1), static_cast<void*>(first - 16), static_cast<void*>(&local)}) {
@@ -354,6 +356,9 @@ TEST(Heap, RefusesWhatIsNoHeap) {
         EXPECT_EQ(HeapDestroy(wrong), 0);
         EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
     }
+    const Heap heap(0);
+    EXPECT_EQ(HeapAlloc(heap.handle, 8, 1), nullptr) << "a flag";
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
     EXPECT_EQ(HeapCreate(1, 0, 0), nullptr);
     EXPECT_EQ(HeapCreate(0, 2, 1), nullptr);
     EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);

@@ -43,6 +43,8 @@ TEST(TemporaryFile, is_new_and_empty_and_named_as_published) {
     EXPECT_EQ(GetLastError(), ERROR_PATH_NOT_FOUND);
     EXPECT_EQ(GetTempFileNameW(std::wstring(MAX_PATH - 13, L'x').c_str(), L"vma", 0, name), 0U);
     EXPECT_EQ(GetLastError(), ERROR_FILENAME_EXCED_RANGE);
+    EXPECT_EQ(GetTempFileNameW(L"/tmp", L"\xD800", 0, name), 0U);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_NAME);
     EXPECT_EQ(GetTempFileNameW(L"/tmp", L"vma", 7, name), 0U);
     EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
     {

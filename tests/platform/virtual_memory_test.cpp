@@ -123,6 +123,8 @@ TEST(VirtualMemory, what_is_not_reserved_is_refused) {
     EXPECT_EQ(release(base + PAGE), 0);
     EXPECT_EQ(release(nullptr), 0);
     EXPECT_EQ(GetLastError(), ERROR_INVALID_ADDRESS);
+    EXPECT_EQ(VirtualAlloc(base, SIZE_MAX, MEM_RESERVE, PAGE_NOACCESS), nullptr) << "beyond the last address";
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_ADDRESS);
     EXPECT_EQ(reserve(SIZE_MAX), nullptr);
     EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
     EXPECT_EQ(reserve(0), nullptr);

@@ -19,7 +19,7 @@ CONDITION = re.compile(r"\b(if|for|while|switch|case|catch|operator)\b|\?|&&|\|\
 def read_entries(path):
     """[(file, lines)]: a file's name; then lines of it as they follow each other, and the reason after '#'."""
     entries, file, lines = [], None, []
-    for text in path.read_text().splitlines()[2:]:
+    for text in path.read_text().splitlines()[3:]:
         if not text:
             file = None
         elif file is None:

@@ -38,7 +38,7 @@ void check_heaps() {
     });
     check("vlWinHeapAllocator::Alloc, more regions than the record holds", [](Trial& t) {
         vlWinHeapAllocator heap(0);
-        std::vector<void*> blocks(40);
+        std::vector<void*> blocks(42);
         t.attempt([&] {
             for (void*& block : blocks) {
                 block = heap.Alloc(LARGE);

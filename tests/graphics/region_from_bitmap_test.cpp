@@ -63,7 +63,7 @@ TEST(RegionFromBitmap, ComparesAtEveryDepth) {
     for (const int depth : {1, 4, 8, 16, 24, 32}) {
         SCOPED_TRACE(depth);
         for (const COLORREF key : colours) {
-            TestSurface surface(random_picture(random, 37, 9, colours), depth);
+            TestSurface surface(random_picture(random, 101, 9, colours), depth);
             const Picture stored = surface.picture();
             expect_region(surface.bitmap(), stored, key);
         }

@@ -305,6 +305,7 @@ TEST(Heap, MaximumBoundsWhatIsMapped) {
 
 TEST(Heap, RefusesAbsurdSizes) {
     const Heap heap(0);
+    const Heap small(64 * KIB);
     void* block = heap.take(10);
     for (const std::size_t size :
          {SIZE_MAX, SIZE_MAX - 7, SIZE_MAX - 4096, SIZE_MAX / 2, std::size_t{1} << 47}) {
@@ -312,6 +313,7 @@ TEST(Heap, RefusesAbsurdSizes) {
         EXPECT_EQ(heap.take(size), nullptr);
         EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
         EXPECT_EQ(heap.resize(block, size), nullptr);
+        EXPECT_EQ(small.take(size), nullptr);
     }
     EXPECT_EQ(heap.free(block), 1);
     const Heap boundless(SIZE_MAX);

@@ -264,7 +264,9 @@ TEST_F(FileLog, pipe_that_nobody_reads_is_refused_and_one_that_is_read_is_writte
 TEST_F(FileLog, limit_on_file_sizes_is_silent) {
     constexpr rlim_t LIMIT = 20'000;
     const auto log_beyond_it = [&] {
-        const rlimit limit = {LIMIT, LIMIT};
+        rlimit limit = {};
+        getrlimit(RLIMIT_FSIZE, &limit);
+        limit.rlim_cur = LIMIT;
         setrlimit(RLIMIT_FSIZE, &limit);
         FileLogger log(file.c_str());
         for (int i = 0; i < 1000; ++i) {

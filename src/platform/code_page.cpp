@@ -3,10 +3,13 @@
 #include <langinfo.h>
 
 #include <algorithm>
+#include <atomic>
 #include <climits>
+#include <cstddef>
 #include <cstdlib>
 #include <cwchar>
 #include <cwctype>
+#include <new>
 
 #include "src/platform/file_name.h"
 
@@ -15,6 +18,8 @@ namespace basalt::platform {
 namespace {
 
 constexpr char UTF8_LOCALE[] = "C.UTF-8";
+
+constinit std::atomic<CodePage*> s_open = nullptr;  // the active one, once it is
 
 // Puts a locale in force for the calling thread and the one before back at the end.
 class ScopedLocale {
@@ -158,8 +163,14 @@ CodePage::CodePage(const char* locale_name)
 }
 
 CodePage::~CodePage() {
+    close();
+}
+
+void CodePage::close() noexcept {
     if (m_locale != nullptr) {
         freelocale(m_locale);
+        m_locale = nullptr;
+        m_is_utf8 = true;
     }
 }
 
@@ -230,8 +241,21 @@ bool CodePage::is_space(wchar_t ch) const {
 }
 
 const CodePage& active_code_page() {
-    static const CodePage environment(environment_locale_name());
-    return environment;
+    // Not destroyed with the statics: a host's own may convert text until the last of them has gone.
+    alignas(CodePage) static std::byte s_storage[sizeof(CodePage)];
+    static const CodePage& s_environment = []() -> const CodePage& {
+        auto* const page = new (s_storage) CodePage(environment_locale_name());
+        s_open.store(page);
+        return *page;
+    }();
+    return s_environment;
+}
+
+// At unload, and after all statics at the end of the process.
+[[gnu::destructor]] void close_active_code_page() {
+    if (CodePage* const page = s_open.load()) {
+        page->close();
+    }
 }
 
 std::wstring widen_by_locale(std::string_view text, locale_t locale) {

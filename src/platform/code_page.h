@@ -49,13 +49,16 @@ public:
     wchar_t to_upper(wchar_t ch) const;
     bool is_space(wchar_t ch) const;
 
+    // Gives the locale back; what is left is UTF-8 with ASCII classes.
+    void close() noexcept;
+
 private:
-    // Null only where not even the system's UTF-8 locale is installed: ASCII classes then.
+    // Null when closed, and where not even the system's UTF-8 locale is installed: ASCII classes then.
     locale_t m_locale;
     bool m_is_utf8;
 };
 
-// The environment's, opened at the first use and closed at unload.
+// The environment's, opened at the first use and closed when the library is unloaded or all statics are gone.
 const CodePage& active_code_page();
 
 inline std::wstring widen(std::string_view text) {

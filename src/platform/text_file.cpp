@@ -28,6 +28,14 @@ std::string system_name(const char* path) {
     return name;
 }
 
+// Those that are open; the newest first.
+constinit Lock s_files_lock;
+constinit TextFile* s_files = nullptr;
+
+[[gnu::destructor]] void send_what_is_left() {
+    TextFile::send_all();
+}
+
 }  // namespace
 
 std::unique_ptr<TextFile> TextFile::open(const char* path) noexcept {
@@ -36,14 +44,46 @@ std::unique_ptr<TextFile> TextFile::open(const char* path) noexcept {
         // NOLINTNEXTLINE(bugprone-unhandled-exception-at-new)
         std::unique_ptr<TextFile> file(new TextFile);
         file->m_file = open_for_writing(system_name(path).c_str(), O_APPEND);
-        return file->m_file >= 0 ? std::move(file) : nullptr;
+        if (file->m_file < 0) {
+            return std::unique_ptr<TextFile>();
+        }
+        file->m_owner = ::getpid();
+        const std::lock_guard guard(s_files_lock);
+        file->m_next = s_files;
+        if (s_files != nullptr) {
+            s_files->m_previous = file.get();
+        }
+        s_files = file.get();
+        return file;
     });
 }
 
 TextFile::~TextFile() {
-    if (m_file >= 0) {
-        send(m_size);
-        ::close(m_file);
+    if (m_file < 0) {
+        return;
+    }
+    {
+        const std::lock_guard guard(s_files_lock);
+        (m_previous != nullptr ? m_previous->m_next : s_files) = m_next;
+        if (m_next != nullptr) {
+            m_next->m_previous = m_previous;
+        }
+    }
+    send(m_size);
+    ::close(m_file);
+}
+
+void TextFile::send_all() noexcept {
+    const std::unique_lock files(s_files_lock, std::try_to_lock);
+    if (!files) {
+        return;
+    }
+    const pid_t process = ::getpid();
+    for (TextFile* file = s_files; file != nullptr; file = file->m_next) {
+        const std::unique_lock guard(file->m_lock, std::try_to_lock);
+        if (guard && file->m_owner == process) {
+            file->send(file->m_size);
+        }
     }
 }
 

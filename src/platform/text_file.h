@@ -2,6 +2,8 @@
 #ifndef BASALT_SRC_PLATFORM_TEXT_FILE_H
 #define BASALT_SRC_PLATFORM_TEXT_FILE_H
 
+#include <sys/types.h>
+
 #include <climits>
 #include <cstddef>
 #include <memory>
@@ -31,6 +33,11 @@ public:
     // is lost. Threads: thread-safe; each text is whole.
     void write(std::wstring_view text) noexcept;
 
+    // Sends the buffers of all that are open out: what the end of the process does, as for a stream of the C
+    // library. A file that a thread writes to meanwhile is left out, since that thread may never come back, and
+    // so is one that a parent process opened: it sends the same bytes itself.
+    static void send_all() noexcept;
+
 private:
     // Bytes. Two pages, since the system has the more to do the more often one is written in parts.
     static constexpr std::size_t BUFFER = 8192;
@@ -40,6 +47,9 @@ private:
     void send(std::size_t count) noexcept;
 
     int m_file = -1;
+    pid_t m_owner = 0;
+    TextFile* m_next = nullptr;  // open files
+    TextFile* m_previous = nullptr;
     Lock m_lock;
     std::size_t m_size = 0;
     char m_bytes[BUFFER + (PIECE + 1) * MB_LEN_MAX];  // with room behind the buffer for any piece

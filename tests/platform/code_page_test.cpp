@@ -123,6 +123,22 @@ TEST(CodePage, missing_locale_is_utf8) {
     }
 }
 
+TEST(CodePage, closed_one_keeps_utf8_and_knows_ascii_classes) {
+    CodePage page("C.UTF-8");
+    page.close();
+    EXPECT_EQ(page.widen("\xE2\x82\xAC"), L"\x20AC");
+    EXPECT_EQ(page.narrow(L"\x20AC"), "\xE2\x82\xAC");
+    const std::wstring upper = L"@AZ[`az{\xC9";
+    const std::wstring lower = L"@az[`az{\xC9";
+    for (std::size_t i = 0; i < upper.size(); ++i) {
+        EXPECT_EQ(page.to_lower(upper[i]), lower[i]);
+        EXPECT_EQ(page.to_upper(lower[i]), lower[i] >= L'a' && lower[i] <= L'z' ? lower[i] - 32 : lower[i]);
+    }
+    for (const wchar_t ch : L"\x08\t\n\r\x0E !\x2003"s) {
+        EXPECT_EQ(page.is_space(ch), ch == L' ' || ch == L'\t' || ch == L'\n' || ch == L'\r') << int{ch};
+    }
+}
+
 // Encodings other than UTF-8, from locales made here where the system has the parts.
 TEST(CodePage, single_and_double_byte_encodings) {
     const test_locales::Folder locales;
@@ -179,23 +195,30 @@ TEST(CodePage, locale_of_the_process_and_thread_stays) {
     EXPECT_EQ(uselocale(nullptr), thread_before);
 }
 
-// The environment is read once a process, so each case asks in a process of its own.
+// The environment is read once a process, and here before main, so each case is the whole life of a process.
 TEST(CodePage, environment_names_the_encoding) {
     struct Row {
-        const char *all, *ctype, *lang;
-        bool is_utf8;
+        const char *all, *ctype, *lang, *euro;
     };
+    constexpr char LATIN[] = "ISO-8859-15";
+    constexpr char UTF8_EURO[] = "\xE2\x82\xAC";
+    const test_locales::Folder locales;
+    if (!locales.has(LATIN)) {
+        GTEST_SKIP() << "localedef cannot make a locale with " << LATIN;
+    }
     GTEST_FLAG_SET(death_test_style, "threadsafe");
-    const auto check = [](const Row& row) {
-        setenv("LC_ALL", row.all, 1);
+    for (const Row& row :
+         {Row{LATIN, "", "", "\xA4"}, Row{"", LATIN, "C", "\xA4"}, Row{"", "", LATIN, "\xA4"},
+          Row{"C", LATIN, LATIN, UTF8_EURO}, Row{"", "POSIX", LATIN, UTF8_EURO},
+          Row{"no_SUCH.locale", LATIN, LATIN, UTF8_EURO}, Row{"", "", "", UTF8_EURO}}) {
+        locales.enter(row.all);
         setenv("LC_CTYPE", row.ctype, 1);
         setenv("LANG", row.lang, 1);
-        std::exit(narrow(L"\x20AC") == (row.is_utf8 ? "\xE2\x82\xAC" : "?") ? 0 : 1);
-    };
-    for (const Row& row : {Row{"", "", "", true}, Row{"C", "", "", true}, Row{"POSIX", "", "", true},
-                           Row{"", "C.UTF-8", "C", true}, Row{"", "", "no_SUCH.locale", true}}) {
-        EXPECT_EXIT(check(row), testing::ExitedWithCode(0), "")
+        EXPECT_EXIT(std::_Exit(narrow(L"\x20AC") == row.euro ? 0 : 1), testing::ExitedWithCode(0), "")
             << row.all << '|' << row.ctype << '|' << row.lang;
+    }
+    for (const char* const variable : {"LOCPATH", "LC_ALL", "LC_CTYPE", "LANG"}) {
+        unsetenv(variable);
     }
 }
 

@@ -4,8 +4,11 @@
 #include <gtest/gtest.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <atomic>
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
@@ -22,6 +25,20 @@
 #include "tests/support/scratch_folder.h"
 #include "tests/support/threads.h"
 #include "tests/support/with_failing_allocations.h"
+
+namespace {
+
+std::atomic<std::size_t> taken_at_once = SIZE_MAX;
+
+}  // namespace
+
+/// Stands in for the system's (linked with --wrap): it may take a part of what it is given.
+extern "C" {
+ssize_t __real_write(int file, const void* bytes, std::size_t count);
+ssize_t __wrap_write(int file, const void* bytes, std::size_t count) {
+    return __real_write(file, bytes, std::min(count, taken_at_once.load()));
+}
+}
 
 namespace {
 
@@ -222,6 +239,38 @@ TEST_F(FileLog, threads_write_whole_texts) {
     for (const char writer : {'a', 'b', 'c'}) {
         EXPECT_EQ(counted_lines(contents(file), writer), up_to(500));
     }
+}
+
+TEST_F(FileLog, what_a_log_left_open_holds_is_sent_once_when_its_process_exits) {
+    GTEST_FLAG_SET(death_test_style, "fast");
+    const auto leave_open = [&] {
+        static FileLogger* const left = new FileLogger(file.c_str());
+        static FileLogger* const another = new FileLogger((folder / "another").c_str());
+        left->Write(L"left");
+        another->Write(L"another");
+        // A child's end leaves its parent's texts alone.
+        const pid_t child = fork();
+        if (child == 0) {
+            std::exit(0);
+        }
+        waitpid(child, nullptr, 0);
+        EXPECT_EQ(contents(file), "");
+        std::exit(testing::Test::HasFailure() ? 1 : 0);
+    };
+    EXPECT_EXIT(leave_open(), testing::ExitedWithCode(0), "");
+    EXPECT_EQ(contents(file), "left");
+    EXPECT_EQ(contents(folder / "another"), "another");
+}
+
+TEST_F(FileLog, what_the_system_takes_in_parts_is_whole) {
+    FileLogger log(file.c_str());
+    taken_at_once = 7;
+    for (int i = 0; i < 1000; ++i) {
+        write_line(log, 'a', i);
+    }
+    log.Close();
+    taken_at_once = SIZE_MAX;
+    EXPECT_EQ(counted_lines(contents(file), 'a'), up_to(1000));
 }
 
 TEST_F(FileLog, full_disk_is_silent) {

@@ -8,8 +8,9 @@
 /// predicate), infinities and overflow follow IEEE arithmetic, and a field equal to #GEO_NULL takes part as
 /// the number it is. Every call ends after a bounded number of steps, none throws or allocates.
 ///
-/// Accuracy: results follow the stated formulas operation by operation in double precision; those without
-/// trigonometry are the same bit for bit on every compiler and processor.
+/// Accuracy: results follow the stated formulas in double precision, operation by operation except on the
+/// ellipsoid (conversions, frames, geodesics, variances), where shorter ways to the same values may end in the
+/// last places otherwise; those without trigonometry are the same bit for bit on every compiler and processor.
 ///
 /// Threads: every function is reentrant.
 #ifndef BASALT_GEO_H

@@ -27,7 +27,7 @@ std::uint16_t terminator_index(int converted) {
 
 void _tchar2wchar(const wchar_t* source, wchar_t* destination, int n) {
     const int length = length_up_to(source, n);
-    std::wmemcpy(destination, source, static_cast<std::size_t>(length));
+    std::wmemmove(destination, source, static_cast<std::size_t>(length));
     destination[length] = L'\0';
 }
 

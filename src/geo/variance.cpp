@@ -40,8 +40,9 @@ Matrix latitude_longitude_height(const geo_llh& at) {
     double prime_vertical = 0.0;
     _wgs84curvature(at.latitude, meridian, prime_vertical);
     const LocalFrame frame = frame_at(at);
-    return {over(frame.north, meridian + at.height),
-            over(frame.east, (prime_vertical + at.height) * std::cos(at.latitude)), frame.up};
+    geo_vector longitude = over(frame.east, (prime_vertical + at.height) * std::cos(at.latitude));
+    longitude.z = 0.0;  // on the axis too, where nothing divided by nothing is no number
+    return {over(frame.north, meridian + at.height), longitude, frame.up};
 }
 
 /// J Q J^T at a position; six #GEO_NULL when it cannot be converted.

@@ -15,7 +15,8 @@ namespace vex_util {
 namespace {
 
 constexpr int LONGEST_NAME = 259;  // characters
-constexpr int MAX_DRAWS = 1000;    // of the 65,535 numbers; with all of them taken there is no end else
+constexpr int NUMBERS = 65'535;    // from 0
+constexpr int DRAWS = 1000;  // the next number after that, so that the last free one is found, and an end
 
 // The full name of a number's file in the temporary folder as it is now; empty when there is no folder or the
 // name would not fit.
@@ -33,8 +34,8 @@ CString file_name(std::uint16_t number) {
 HANDLE create_file(std::uint16_t& number) {
     HANDLE file = INVALID_HANDLE_VALUE;
     DWORD error = ERROR_FILE_EXISTS;
-    for (int draw = 0; draw < MAX_DRAWS && error == ERROR_FILE_EXISTS; ++draw) {
-        number = _random_uint16();
+    for (int tried = 0; tried < DRAWS + NUMBERS && error == ERROR_FILE_EXISTS; ++tried) {
+        number = tried < DRAWS ? _random_uint16() : static_cast<std::uint16_t>((number + 1) % NUMBERS);
         const CString name = file_name(number);
         if (name.IsEmpty()) {
             return INVALID_HANDLE_VALUE;

@@ -13,7 +13,7 @@ DWORD GetTempPathW(DWORD length, wchar_t* buffer) {
         const char* const configured = std::getenv("TMPDIR");
         const bool is_set = configured != nullptr && *configured != '\0';
         std::wstring folder = basalt::platform::wide_from_file_name(is_set ? configured : "/tmp");
-        if (folder.back() != L'/') {
+        if (folder.back() != L'/' && folder.back() != L'\\') {
             folder += L'/';
         }
         const auto needed = static_cast<DWORD>(folder.size());

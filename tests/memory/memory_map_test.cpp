@@ -143,7 +143,24 @@ TEST(MemoryMap, deletes_the_file_it_made_and_a_stale_one_of_its_name_in_the_fold
     }
 }
 
-TEST(MemoryMap, a_thousand_names_taken_lead_to_the_heap) {
+TEST(MemoryMap, the_last_free_number_is_found) {
+    const ScratchFolder folder;
+    const std::string taken[] = {folder / "odd",
+                                 folder / "even"};  // a file has hardly more than 65,000 names
+    folder.write("odd");
+    folder.write("even");
+    char name[20];
+    for (int number = 0; number < 65'535; ++number) {
+        std::snprintf(name, sizeof name, "~%07i.mem", number);
+        if (number != 54'321) {
+            ASSERT_EQ(link(taken[number % 2].c_str(), (folder / name).c_str()), 0);
+        }
+    }
+    const CMemoryMap map(SIZE);
+    EXPECT_TRUE(std::filesystem::exists(folder / "~0054321.mem"));
+}
+
+TEST(MemoryMap, with_all_numbers_taken_a_block_comes_from_the_heap) {
     const ScratchFolder folder;
     CMemoryMap map;
     {

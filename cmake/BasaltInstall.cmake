@@ -29,9 +29,8 @@ set(config_dir ${CMAKE_INSTALL_LIBDIR}/cmake/basalt)
 install(EXPORT basalt-targets NAMESPACE basalt:: DESTINATION ${config_dir} COMPONENT development)
 configure_package_config_file(cmake/basalt-config.cmake.in ${PROJECT_BINARY_DIR}/basalt-config.cmake
   INSTALL_DESTINATION ${config_dir})
-# Before 1.0 a minor version may change the interface.
 write_basic_package_version_file(${PROJECT_BINARY_DIR}/basalt-config-version.cmake
-  COMPATIBILITY SameMinorVersion)
+  COMPATIBILITY SameMajorVersion)
 install(FILES ${PROJECT_BINARY_DIR}/basalt-config.cmake ${PROJECT_BINARY_DIR}/basalt-config-version.cmake
   cmake/BasaltVersionResource.cmake cmake/version_resource.cpp.in
   DESTINATION ${config_dir} COMPONENT development)

@@ -25,8 +25,6 @@ public:
     void combine(std::span<std::uint32_t> source, const std::uint32_t* destination,
                  std::uint32_t brush) const {
         switch (m_table) {
-            case 0xCC:
-                break;
             case 0x88:
                 for (std::size_t i = 0; i < source.size(); ++i) {
                     source[i] &= destination[i];

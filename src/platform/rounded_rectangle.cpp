@@ -31,10 +31,7 @@ public:
         const double ratio = static_cast<double>(down) / static_cast<double>(m_height);
         const double across = static_cast<double>(m_width) * std::sqrt(1 - ratio * ratio);
         auto columns = static_cast<std::int64_t>((static_cast<double>(m_width) - across) / 2);
-        // Rounding may have gone past the border on either side.
-        while (columns > 0 && is_inside(columns - 1, down)) {
-            --columns;
-        }
+        // Cut down to a whole number from half a column short of the border, which rounding is far less than.
         while (!is_inside(columns, down)) {
             ++columns;
         }

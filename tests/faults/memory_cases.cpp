@@ -36,20 +36,24 @@ void check_heaps() {
         t.expect(fills(heap->Alloc(100), 100) && fills(heap->Alloc(LARGE), LARGE), "blocks");
         t.attempt([&] { heap.reset(); });
     });
-    check("vlWinHeapAllocator::Alloc, more regions than the record holds", [](Trial& t) {
-        vlWinHeapAllocator heap(0);
-        std::vector<void*> blocks(42);
-        t.attempt([&] {
+    for (const std::size_t last_size : {std::size_t{100}, LARGE}) {
+        check("vlWinHeapAllocator::Alloc, more regions than the record holds", [=](Trial& t) {
+            vlWinHeapAllocator heap(0);
+            std::vector<void*> blocks(40);
             for (void*& block : blocks) {
                 block = heap.Alloc(LARGE);
+                t.expect(block != nullptr, "as many as it holds");
             }
+            void* last = nullptr;
+            t.attempt([&] { last = heap.Alloc(last_size); });
+            t.expect(t.struck() || last != nullptr, "null only for a failure");
+            t.expect(fills(heap.Alloc(last_size), last_size), "a block afterwards");
+            for (void* const block : blocks) {
+                heap.Free(block);
+            }
+            heap.Free(last);
         });
-        for (void* const block : blocks) {
-            t.expect(t.struck() || block != nullptr, "null only for a failure");
-            heap.Free(block);
-        }
-        t.expect(fills(heap.Alloc(LARGE), LARGE), "a block afterwards");
-    });
+    }
     for (const auto& [name, size] : {std::pair("vlWinHeapAllocator::Alloc, a new region", std::size_t{100}),
                                      std::pair("vlWinHeapAllocator::Alloc, mapped alone", LARGE)}) {
         check(name, [size = size](Trial& t) {

@@ -60,6 +60,10 @@ public:
         EXPECT_EQ(number(14, 4), 40U);
         EXPECT_EQ(number(26, 2), 1U);
         EXPECT_EQ(number(30, 4), 0U);
+        EXPECT_EQ(number(34, 4), row_bytes() * static_cast<std::size_t>(height()));
+        EXPECT_EQ(number(38, 8), 0U) << "no resolution is known";
+        EXPECT_EQ(number(46, 4), depth() > 8 ? 0U : 1U << depth());
+        EXPECT_EQ(number(50, 4), 0U) << "all colours matter";
     }
     int width() const { return static_cast<int>(number(18, 4)); }
     int height() const { return static_cast<int>(number(22, 4)); }

@@ -70,6 +70,39 @@ TEST(RotateBitmap, TurnsClockwise) {
     EXPECT_EQ(rotated(picture, -90.0F).at(0, 3), 0xFFFFFFU);
 }
 
+// Against the turn in doubles, but where what single precision leaves open decides.
+TEST(RotateBitmap, TurnsByAnyAngleToThePixel) {
+    std::mt19937 random(92);
+    SCOPED_TRACE("seed 92");
+    constexpr int WIDTH = 61;
+    constexpr int HEIGHT = 40;
+    const Picture picture = random_picture(random, WIDTH, HEIGHT, COLOURS);
+    for (const float angle : {0.5F, 12.5F, 45.0F, 117.25F, -63.4F, 359.0F}) {
+        SCOPED_TRACE(angle);
+        const Picture turned = rotated(picture, angle);
+        const double radians = static_cast<double>(angle) * std::numbers::pi / 180;
+        int compared = 0;
+        for (int y = 0; y < HEIGHT; ++y) {
+            for (int x = 0; x < WIDTH; ++x) {
+                const double right = x + 0.5 - WIDTH / 2;
+                const double down = y + 0.5 - HEIGHT / 2;
+                const double from_x = right * std::cos(radians) + down * std::sin(radians) + WIDTH / 2;
+                const double from_y = down * std::cos(radians) - right * std::sin(radians) + HEIGHT / 2;
+                const auto is_open = [](double at) { return std::abs(at - std::round(at)) < 1e-3; };
+                if (is_open(from_x) || is_open(from_y)) {
+                    continue;
+                }
+                const auto column = static_cast<int>(std::floor(from_x));
+                const auto row = static_cast<int>(std::floor(from_y));
+                ASSERT_EQ(turned.at(x, y), picture.has(column, row) ? picture.at(column, row) : UNCOVERED)
+                    << x << ' ' << y;
+                ++compared;
+            }
+        }
+        EXPECT_GT(compared, WIDTH * HEIGHT * 9 / 10);
+    }
+}
+
 TEST(RotateBitmap, ChangesNothingOnFailure) {
     Picture picture(6, 4, 0);
     picture.at(1, 1) = 0x123456;

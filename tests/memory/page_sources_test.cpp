@@ -178,10 +178,13 @@ TEST(SharedMemoryAllocator, nothing_else_is_served) {
     EXPECT_EQ(Virtual::Alloc(reserved.base(), 0, COMMIT, nullptr), nullptr);
     EXPECT_EQ(Virtual::Free(reserved.base(), 0, DECOMMIT, 0), 0);
     EXPECT_EQ(output.take(), Pieces{});
+    SetLastError(ERROR_SUCCESS);
     EXPECT_EQ(Virtual::Alloc(nullptr, BEYOND, RESERVE, nullptr), nullptr);
     EXPECT_EQ(output.take(), report_of(ERROR_INVALID_PARAMETER));
+    SetLastError(ERROR_SUCCESS);
     EXPECT_EQ(Virtual::Alloc(reserved.base(), BEYOND, COMMIT, nullptr), nullptr);
     EXPECT_EQ(output.take(), report_of(ERROR_INVALID_PARAMETER));
+    SetLastError(ERROR_SUCCESS);
     EXPECT_EQ(Virtual::Free(reserved.base(), BEYOND, DECOMMIT, 0), 0);
     EXPECT_EQ(output.take(), report_of(ERROR_INVALID_PARAMETER));
     EXPECT_EQ(calls, std::vector<Call>{});

@@ -182,6 +182,25 @@ TEST(VmAllocator, without_memory_for_more_state_takes_back_and_reuses) {
     EXPECT_EQ(allocator.Alloc(4), static_cast<char*>(blocks.back()) + 4);
 }
 
+// The record of a segment has a pointer for every 2^14 blocks, and one more for a single block beyond.
+TEST(VmAllocator, serves_one_block_more_than_a_chunk_of_records_holds) {
+    const ScratchFolder folder;
+    constexpr int BLOCKS = (1 << 14) + 1;
+    constexpr std::uint32_t SIZE = 16;
+    vlVmAllocator allocator(BLOCKS * SIZE, SIZE);
+    std::set<void*> blocks;
+    for (int i = 0; i < BLOCKS; ++i) {
+        blocks.insert(allocator.Alloc(SIZE));
+    }
+    EXPECT_EQ(blocks.size(), static_cast<std::size_t>(BLOCKS));
+    EXPECT_EQ(blocks.count(nullptr), 0U);
+    EXPECT_EQ(folder.names().size(), 1U) << "one segment";
+    for (void* const block : blocks) {
+        allocator.Free(block);
+    }
+    EXPECT_EQ(blocks.count(allocator.Alloc(SIZE)), 1U);
+}
+
 TEST(VmAllocator, without_a_temporary_folder_or_bookkeeping_gives_null) {
     const ScratchFolder folder;
     for (const std::string& name : {folder / "missing", "/" + std::string(300, 'x')}) {

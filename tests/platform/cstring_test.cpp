@@ -195,6 +195,10 @@ TEST(CStringFormat, floating_point) {
     EXPECT_EQ(huge.size(), 316U);
     EXPECT_EQ(huge.substr(0, 6), L"100000");
     EXPECT_EQ(formatted(L"%.*f", -1, 0.5), L"0.500000") << "a negative precision is none";
+    for (int width = 3; width < 600; ++width) {
+        ASSERT_EQ(formatted(L"%*.1f", width, 1.5),
+                  std::wstring(static_cast<std::size_t>(width - 3), L' ') + L"1.5");
+    }
 }
 
 TEST(CStringFormat, texts_are_written_as_what_they_are) {

@@ -177,6 +177,35 @@ TEST(BlockCopy, WithoutASourceTakesBrushAndDestination) {
               (std::vector<std::uint32_t>{0x112233, 0xFF0F0F0F, 0, 0xFFFFFFFF, 0x00F0F0F0}));
 }
 
+// A brush that draws nothing keeps back every operation that its values would decide, and no other.
+TEST(BlockCopy, WithoutABrushMakesWhatNeedsNone) {
+    constexpr std::uint32_t TO = 0x00CC5533;
+    constexpr std::uint32_t FROM = 0x00AA330F;
+    const Canvas source(Picture(1, 1, FROM), 32);
+    for (DWORD number = 0; number < 256; ++number) {
+        const Canvas canvas(Picture(1, 1, TO), 32);
+        SelectObject(canvas, GetStockObject(NULL_BRUSH));
+        const DWORD rop = number << 16;
+        EXPECT_NE(BitBlt(canvas, 0, 0, 1, 1, source, 0, 0, rop), 0);
+        const bool is_kept_back = (number >> 4) != (number & 0xF);
+        EXPECT_EQ(canvas.picture().at(0, 0), is_kept_back ? TO : combined(rop, 0, FROM, TO)) << number;
+    }
+}
+
+TEST(BlockCopy, WithoutASourceFillsTheTransformedBoxAlone) {
+    const Canvas canvas(Picture(20, 6, 7), 32);
+    const XFORM twice = {2, 0, 0, 2, 0, 0};
+    SetGraphicsMode(canvas, GM_ADVANCED);
+    SetWorldTransform(canvas, &twice);
+    EXPECT_NE(BitBlt(canvas, 2, 1, 3, 1, nullptr, 0, 0, BLACKNESS), 0);
+    const Picture picture = canvas.picture();
+    for (int y = 0; y < picture.height; ++y) {
+        for (int x = 0; x < picture.width; ++x) {
+            EXPECT_EQ(picture.at(x, y), x >= 4 && x < 10 && (y == 2 || y == 3) ? 0U : 7U) << x << ' ' << y;
+        }
+    }
+}
+
 struct Stretch {
     int x, y, width, height, source_x, source_y, source_width, source_height;
 };

@@ -48,6 +48,7 @@ TEST(Context, OfTheScreenHasDepthButNoPixels) {
     EXPECT_EQ(DeleteDC(screen), 0);
     HDC const memory = CreateCompatibleDC(screen);
     EXPECT_EQ(ReleaseDC(nullptr, memory), 0);
+    EXPECT_EQ(ReleaseDC(reinterpret_cast<HWND>(screen), screen), 0) << "there are no windows";
     EXPECT_EQ(ReleaseDC(nullptr, screen), 1);
     EXPECT_EQ(ReleaseDC(nullptr, screen), 0);
     EXPECT_NE(DeleteDC(memory), 0);

@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cerrno>
 #include <cstdint>
 #include <cstring>
 #include <map>
@@ -346,6 +347,23 @@ TEST(Heap, TellsWhatIsNoLiveBlock) {
     EXPECT_EQ(sound(heap.handle).live_blocks, 1U);
 }
 
+// What a caller has written may look like a block's head, but no block lies there.
+TEST(Heap, TellsAMisalignedBlockByItsPlaceAlone) {
+    const Heap heap(0);
+    auto* const block = static_cast<unsigned char*>(heap.take(100));
+    constexpr int HEAD = 8;
+    for (const int offset : {1, 2, 4, 8}) {
+        const auto copy_head = [&]() __attribute__((no_sanitize("address"))) {
+            for (int i = 0; i < HEAD; ++i) {
+                block[16 + offset - HEAD + i] = block[i - HEAD];
+            }
+        };
+        copy_head();
+        EXPECT_EQ(heap.free(block + 16 + offset), 0) << offset;
+    }
+    EXPECT_EQ(heap.free(block), 1);
+}
+
 TEST(Heap, RefusesWhatIsNoHeap) {
     alignas(4096) static char page[4096];
     for (HANDLE wrong : {HANDLE{nullptr}, static_cast<HANDLE>(page), static_cast<HANDLE>(page + 8)}) {
@@ -404,6 +422,46 @@ TEST(Heap, CompactAnswersTheLargestFreeBlock) {
     EXPECT_LT(beside, 44 * KIB);
     heap.free(block);
     EXPECT_GT(HeapCompact(heap.handle, 0), 60 * KIB) << "a used heap keeps a region";
+}
+
+// A new block may have no room but among those of its own size class, where not every block is large enough.
+TEST(Heap, FullHeapGivesABlockOfNearlyTheSizeAgain) {
+    const Heap heap(64 * KIB);
+    std::vector<void*> blocks;
+    while (void* block = heap.take(5000)) {
+        blocks.push_back(block);
+    }
+    ASSERT_GT(blocks.size(), 5U);
+    EXPECT_EQ(heap.free(blocks[3]), 1);
+    EXPECT_EQ(heap.take(5008), nullptr);
+    EXPECT_EQ(heap.take(4990), blocks[3]);
+}
+
+TEST(Heap, CompactGivesBackThePagesOfEveryFreeBlock) {
+    constexpr std::size_t SIZE = 100 * KIB;
+    constexpr std::size_t PAGE = 4 * KIB;
+    const Heap heap(0);
+    std::vector<void*> blocks(20);
+    for (void*& block : blocks) {
+        block = heap.take(SIZE);
+        std::memset(block, 1, SIZE);
+    }
+    for (std::size_t i = 0; i < blocks.size(); i += 2) {
+        EXPECT_EQ(heap.free(blocks[i]), 1);
+    }
+    HeapCompact(heap.handle, 0);
+    for (std::size_t i = 0; i < blocks.size(); ++i) {
+        // between what the heap keeps at either end
+        const std::uintptr_t begin = (reinterpret_cast<std::uintptr_t>(blocks[i]) + 2 * PAGE) & ~(PAGE - 1);
+        std::array<unsigned char, SIZE / PAGE - 4> pages{};
+        if (mincore(reinterpret_cast<void*>(begin), pages.size() * PAGE, pages.data()) != 0) {
+            ASSERT_EQ(errno, ENOMEM) << "given back with its region";
+        }
+        const bool is_live = i % 2 == 1;
+        EXPECT_TRUE(std::all_of(pages.begin(), pages.end(), [&](unsigned char page) {
+            return ((page & 1) != 0) == is_live;
+        })) << i;
+    }
 }
 
 std::vector<void*> take_many(const Heap& heap, std::size_t size, std::size_t count) {

@@ -203,6 +203,13 @@ TEST(RTree, SwapAndRemoveAll) {
     EXPECT_EQ(RTreeInspector::dump(a), of_b);
     EXPECT_EQ(RTreeInspector::dump(b), of_a);
     EXPECT_EQ(RTreeInspector::check(b), "");
+    // Both go on with the nodes that they have now.
+    fill(a, 500, 3000);
+    fill(b, 0, 3000);
+    EXPECT_EQ(RTreeInspector::check(a), "");
+    EXPECT_EQ(RTreeInspector::check(b), "");
+    EXPECT_EQ(search(a, EVERYTHING).size(), 3000u);
+    EXPECT_EQ(search(b, EVERYTHING).size(), 3001u);
     a.RemoveAll();
     EXPECT_EQ(RTreeInspector::dump(a), "L0{}");
     EXPECT_EQ(search(a, EVERYTHING), Ids{});

@@ -19,15 +19,20 @@ tests_of() {  # compiler, optimisation
         cmake --build "$folder" &&
         ctest --test-dir "$folder" -j "$(nproc)" --output-on-failure
 }
+# Left out is what valgrind itself changes: it loads without unmapping all, and puts memory elsewhere than at an
+# address that is asked for.
+not_under_valgrind=ModuleLoad.a_thousand_loads_leave_nothing_behind:VirtualMemory.an_address_of_ones_own
+not_under_valgrind+=:SharedMemoryAllocator.a_failing_piece_ends_it_and_is_reported
 under_valgrind() {
-    local program name status=0
+    local program status=0
     cmake --preset dev && cmake --build --preset dev || return 1
     for program in build/dev/tests/*_tests; do
-        name=$(basename "$program")
-        valgrind -q --error-exitcode=9 --leak-check=full --suppressions=tests/support/valgrind.supp "$program" \
-            --gtest_brief=1 || { echo "$name: exit status $?"; status=1; }
-        echo "$name: done"
+        # the tests' own operator new stays, which fails where they say
+        valgrind -q --error-exitcode=9 --leak-check=full --show-leak-kinds=definite --errors-for-leak-kinds=definite \
+            --soname-synonyms=somalloc=nouserintercepts --suppressions=tests/support/valgrind.supp \
+            "$program" --gtest_brief=1 --gtest_filter="-$not_under_valgrind" || { echo "$program: exit status $?"; status=1; }
     done
+    echo "$(grep -c PASSED $work/valgrind.log) programs of tests passed"
     return $status
 }
 

@@ -2,9 +2,10 @@
 """Compares what no test runs with what tests/uncovered.txt explains.
 Usage: scripts/uncovered.py COVERAGE.json      gcovr's JSON of a run of all tests; scripts/coverage.sh makes it
 
-Fails for a line that is neither run nor explained, for an explanation that no longer fits, and when less than 95 % of
-the branches are taken or explained. A branch is explained by an entry that holds its line. Only lines with a condition
-count: elsewhere the compiler's branches are ways out of inlined calls by an exception, and guards of static objects.
+Fails for a line that is neither run nor explained, for an explanation that no longer fits (one "by chance" may), and
+when less than 95 % of the branches are taken or explained. A branch is explained by an entry that holds its line. Only
+lines with a condition count: elsewhere the compiler's branches are ways out of inlined calls by an exception, and guards
+of static objects.
 """
 import json
 import re
@@ -17,7 +18,7 @@ CONDITION = re.compile(r"\b(if|for|while|switch|case|catch|operator)\b|\?|&&|\|\
 
 
 def read_entries(path):
-    """[(file, lines)]: a file's name; then lines of it as they follow each other, and the reason after '#'."""
+    """[(file, lines, by chance)]: a file's name; then lines as they follow each other, and the reason after '#'."""
     entries, file, lines = [], None, []
     for text in path.read_text().splitlines()[3:]:
         if not text:
@@ -25,7 +26,7 @@ def read_entries(path):
         elif file is None:
             file = text
         elif text.startswith("# "):
-            entries.append((file, lines))
+            entries.append((file, lines, text.startswith("# by chance")))
             lines = []
         elif not text.startswith("  "):  # two blanks more: the reason goes on
             lines.append(text)
@@ -49,7 +50,7 @@ def main():
     files = read_coverage(sys.argv[1])
     sources = {name: [line.strip() for line in (ROOT / name).read_text().splitlines()] for name in files}
     explained, faults = set(), []
-    for name, lines in read_entries(ROOT / "tests/uncovered.txt"):
+    for name, lines, by_chance in read_entries(ROOT / "tests/uncovered.txt"):
         source, found = sources.get(name, []), False
         for first in range(len(source) - len(lines) + 1):
             if source[first:first + len(lines)] == lines:
@@ -58,7 +59,7 @@ def main():
                 if any(count == 0 or 0 in branches for count, branches in known):
                     explained.update((name, n) for n in places)
                     found = True
-        if not found:
+        if not found and not by_chance:
             faults.append(f"{name}: explained, but run or no more there: {lines[0]}")
     runs = missing_lines = branches = taken = excused = 0
     for name, lines in sorted(files.items()):

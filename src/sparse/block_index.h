@@ -63,10 +63,10 @@ private:
     void Place(const Entry& added) noexcept;
 
     std::size_t Home(std::uint64_t key) const noexcept {
-        // Multiplicative hashing: the product's top bits depend on every bit of both coordinates. Alone it maps
-        // a line of blocks to places with one stride, which for some slopes is next to none: hundreds of tries.
-        // Folding makes lines crooked and leaves neighbours apart.
-        const std::uint64_t folded = key ^ key >> 32 ^ key >> 11;
+        // Multiplicative hashing: the product's top bits depend on every bit of both coordinates, and rows,
+        // columns and squares of blocks hardly meet. Without folding a slanted line has one stride in the
+        // table, which for some slopes is next to none: hundreds of tries.
+        const std::uint64_t folded = key ^ key >> 32;
         return static_cast<std::size_t>((folded * 0x9E3779B97F4A7C15U) >> m_shift);
     }
 

@@ -304,6 +304,17 @@ TEST(Heap, MaximumBoundsWhatIsMapped) {
     EXPECT_NE(heap.take(HeapCompact(heap.handle, 0)), nullptr);
 }
 
+TEST(Heap, MaximumBoundsALargeBlockThatGrows) {
+    const Heap heap(128 * MIB);
+    void* block = heap.take(100 * MIB);
+    ASSERT_NE(block, nullptr);
+    EXPECT_EQ(heap.resize(block, 200 * MIB), nullptr);
+    block = heap.resize(block, 120 * MIB);
+    ASSERT_NE(block, nullptr);
+    EXPECT_EQ(heap.take(10 * MIB), nullptr);
+    EXPECT_EQ(heap.free(block), 1);
+}
+
 TEST(Heap, RefusesAbsurdSizes) {
     const Heap heap(0);
     const Heap small(64 * KIB);

@@ -246,6 +246,12 @@ TEST_F(FileLog, what_a_log_left_open_holds_is_sent_once_when_its_process_exits) 
     const auto leave_open = [&] {
         static FileLogger* const left = new FileLogger(file.c_str());
         static FileLogger* const another = new FileLogger((folder / "another").c_str());
+        // in the midst of others that come and go
+        FileLogger oldest((folder / "oldest").c_str());
+        FileLogger midst((folder / "midst").c_str());
+        FileLogger newest((folder / "newest").c_str());
+        midst.Close();
+        oldest.Close();
         left->Write(L"left");
         another->Write(L"another");
         // A child's end leaves its parent's texts alone.

@@ -15,7 +15,7 @@ root=$PWD/build/debian-root
 if [ ! -f "$root/ready" ]; then
     # shellcheck source=/dev/null
     suite=$(. /etc/os-release && echo "$VERSION_CODENAME")
-    mirror=$(apt-get indextargets --format '$(SITE)' 'Created-By: Packages' | grep -v security | head -n 1)
+    mirror=$(apt-get indextargets --format '$(SITE)' 'Created-By: Packages' | awk '!/security/ && !found++')
     "${as_root[@]}" debootstrap --variant=minbase \
         --include=ca-certificates,cmake,g++,libpixman-1-dev,ninja-build,pkg-config "$suite" "$root" "$mirror" \
         >build/debian-root.log 2>&1 || { tail -n 20 build/debian-root.log; exit 1; }
@@ -36,7 +36,7 @@ files() { find / -xdev \( -path /outside -o -path /proc -o -path /var/lib/dpkg -
     -prune -o -print | sort; }
 files >before
 dpkg -i ./*.deb >install.log 2>&1 || { cat install.log; exit 1; }
-ldconfig -p | grep -q 'libbasalt\.so' || { echo "the loader does not know the library"; exit 1; }
+[[ $(ldconfig -p) == *libbasalt.so* ]] || { echo "the loader does not know the library"; exit 1; }
 
 configure() { cmake -S "$1" -B "$2" -G Ninja -DCMAKE_BUILD_TYPE=Release "${@:3}" && cmake --build "$2"; }
 mkdir source
@@ -55,7 +55,7 @@ ls /usr/share/man/man1/basalt.1* >/dev/null || { echo "the tool has no manual pa
 for program in found/consumer sub/consumer ./bare ./bare-static; do
     "$program" || { echo "$program failed"; exit 1; }
 done
-! ldd bare-static | grep -q basalt || { echo "the static program asks for the shared library"; exit 1; }
+[[ $(ldd bare-static) != *libbasalt* ]] || { echo "the static program asks for the shared library"; exit 1; }
 
 dpkg --purge $(dpkg-query -W -f '${Package}\n' '*basalt*') >remove.log 2>&1 || { cat remove.log; exit 1; }
 files >after

@@ -12,7 +12,7 @@ show_help() {  # prints the calling script's opening comment when the first argu
 need_packages() {  # package names; nothing is asked of the network when all are there
     local missing=()
     for package in "$@"; do
-        dpkg-query -W -f '${db:Status-Status}' "$package" 2>/dev/null | grep -q '^installed' || missing+=("$package")
+        [[ $(dpkg-query -W -f '${db:Status-Status}' "$package" 2>/dev/null || true) == installed* ]] || missing+=("$package")
     done
     [ ${#missing[@]} -eq 0 ] && return
     local run=()

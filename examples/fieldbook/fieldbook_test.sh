@@ -7,7 +7,7 @@ cp "$data"/axis.csv axis.csv
 
 # shows LINE: the report has this line, runs of blanks counting as one
 shows() {
-    sed 's/  */ /g; s/^ //' out | grep -qxF -- "$1" || fail "no line '$1'"
+    grep -qxF -- "$1" <<<"$(sed 's/  */ /g; s/^ //' out)" || fail "no line '$1'"
 }
 
 # The errors that were put into the sample.

@@ -5,7 +5,7 @@
 
 # line TEXT: some line of the report has these words
 line() {
-    tr -s ' ' <out | grep -qx " $1" || fail "no line '$1' in: $(cat out)"
+    grep -qx " $1" <<<"$(tr -s ' ' <out)" || fail "no line '$1' in: $(cat out)"
 }
 
 succeeds

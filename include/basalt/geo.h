@@ -9,8 +9,9 @@
 /// the number it is. Every call ends after a bounded number of steps, none throws or allocates.
 ///
 /// Accuracy: results follow the stated formulas in double precision, operation by operation except on the
-/// ellipsoid (conversions, frames, geodesics, variances), where shorter ways to the same values may end in the
-/// last places otherwise; those without trigonometry are the same bit for bit on every compiler and processor.
+/// ellipsoid (conversions, frames, geodesics, variances), where shorter ways to the same values may end in
+/// the last places otherwise; those without trigonometry are the same bit for bit on every compiler and
+/// processor.
 ///
 /// Threads: every function is reentrant.
 #ifndef BASALT_GEO_H

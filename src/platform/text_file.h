@@ -34,8 +34,8 @@ public:
     void write(std::wstring_view text) noexcept;
 
     // Sends the buffers of all that are open out: what the end of the process does, as for a stream of the C
-    // library. A file that a thread writes to meanwhile is left out, since that thread may never come back, and
-    // so is one that a parent process opened: it sends the same bytes itself.
+    // library. A file that a thread writes to meanwhile is left out, since that thread may never come back,
+    // and so is one that a parent process opened: it sends the same bytes itself.
     static void send_all() noexcept;
 
 private:

@@ -17,10 +17,10 @@ namespace vex_util {
 /// A log file. It holds the texts written to it and nothing else: no time stamps, levels or line ends; the
 /// host formats every line.
 ///
-/// Texts are buffered and reach the file when the buffer of 8 KiB is full, at Close(), at destruction, and, of
-/// a log that is still open, when the process returns from main or exits; one that is killed or aborts loses
-/// its last ones. The buffer goes out between two texts, so whatever else happens to the process, and whoever
-/// else appends to the file, each text shorter than the buffer is in it whole or not at all.
+/// Texts are buffered and reach the file when the buffer of 8 KiB is full, at Close(), at destruction, and,
+/// of a log that is still open, when the process returns from main or exits; one that is killed or aborts
+/// loses its last ones. The buffer goes out between two texts, so whatever else happens to the process, and
+/// whoever else appends to the file, each text shorter than the buffer is in it whole or not at all.
 ///
 /// Failures are silent: what cannot be opened stays closed, and what cannot be written, on a full disk or
 /// beyond the limit on file sizes, is lost; the text in which the room ends is cut there.

@@ -55,11 +55,9 @@ TEST(Pixel, TakesTheNearestColourOfItsDepth) {
                   fact.stored == 0 && fact.drawn != 0x336699 ? 38 : 34);
     }
     const Canvas five_bits(1, 1, 16);
-    for (std::uint32_t level = 0; level < 256; ++level) {
+    for (int level = 0; level < 256; ++level) {
         SetPixel(five_bits, 0, 0, RGB(level, 0, 255 - level));
-        const auto nearest = [](std::uint32_t value) {
-            return static_cast<std::uint32_t>(value * 31 / 255.0 + 0.5);
-        };
+        const auto nearest = [](int value) { return static_cast<std::uint32_t>(value * 31 / 255.0 + 0.5); };
         EXPECT_EQ(five_bits.picture().at(0, 0), nearest(level) << 10 | nearest(255 - level)) << level;
     }
     // Four bits: red 1, green 2, blue 4, at half and at full strength; two greys between.

@@ -94,6 +94,18 @@ TEST(Wildcards, match_as_a_plain_recursion_does) {
     EXPECT_TRUE(basalt::platform::matches_wildcards(L"[\\]", L"[\\*"));
 }
 
+// Short names are kept without asking for memory; what is short ends somewhere.
+TEST(FileSearch, finds_names_of_any_length) {
+    const ScratchFolder folder;
+    folder.write("file");
+    const std::wstring name = folder.wide(L"file");
+    const std::size_t end = name.size() - 4;
+    for (const std::size_t length : {510U, 511U, 512U, 513U, 4095U}) {
+        const std::wstring longer = name.substr(0, end) + std::wstring(length - name.size(), L'\\') + L"file";
+        EXPECT_EQ(search(longer), WideNames{L"file"}) << length;
+    }
+}
+
 TEST(FileSearch, names_what_matches) {
     const ScratchFolder folder;
     for (const char* name : {"a.txt", "b.txt", "A.TXT", ".hidden", "plain", "~0004711.mem", "\xC3\xA9.txt"}) {

@@ -100,21 +100,6 @@ TEST(File, both_separators_lead_to_folders) {
     EXPECT_FALSE(std::filesystem::exists(folder / "a/b/x"));
 }
 
-TEST(File, names_of_any_length_lead_to_their_file) {
-    const ScratchFolder folder;
-    for (const std::size_t length : {510U, 511U, 512U, 513U, 4095U}) {
-        SCOPED_TRACE(length);
-        const std::wstring name = folder.wide(L"file");
-        const std::size_t end = name.size() - 4;
-        const HANDLE file =
-            open(name.substr(0, end) + std::wstring(length - name.size(), L'\\') + L"file", CREATE_NEW);
-        ASSERT_NE(file, INVALID_HANDLE_VALUE);
-        EXPECT_EQ(folder.names(), Names{"file"});
-        CloseHandle(file);
-        EXPECT_TRUE(folder.names().empty());
-    }
-}
-
 TEST(File, failures_have_their_published_codes) {
     const ScratchFolder folder;
     folder.write("file");

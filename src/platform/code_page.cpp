@@ -252,7 +252,7 @@ const CodePage& active_code_page() {
 }
 
 // At unload, and after all statics at the end of the process.
-[[gnu::destructor]] void close_active_code_page() {
+[[gnu::destructor]] static void close_active_code_page() {
     if (CodePage* const page = s_open.load()) {
         page->close();
     }

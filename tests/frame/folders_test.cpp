@@ -125,6 +125,7 @@ TEST_F(TemporaryFolder, is_the_environments_at_each_call) {
         {"/var/tmp", L"/var/tmp/"},
         {"/var/tmp/", L"/var/tmp/"},
         {"/no such folder", L"/no such folder/"},
+        {"/var\\tmp\\", L"/var\\tmp\\"},  // either separator
         {"relative", L"relative/"},
         {"/m\xC3\xBCll\xF0\x9F\x97\x91", L"/m\u00FCll\U0001F5D1/"},
     };

@@ -15,8 +15,8 @@ namespace vex_util {
 namespace {
 
 constexpr int LONGEST_NAME = 259;  // characters
-constexpr int NUMBERS = 65'535;    // from 0
-constexpr int DRAWS = 1000;  // the next number after that, so that the last free one is found, and an end
+constexpr int NUMBERS = 65'535;    // that can be drawn, from 0
+constexpr int DRAWS = 1000;        // then each in turn, so that the last free one is found
 
 // The full name of a number's file in the temporary folder as it is now; empty when there is no folder or the
 // name would not fit.

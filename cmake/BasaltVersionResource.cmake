@@ -47,5 +47,7 @@ function(basalt_add_version_resource target)
   get_target_property(binary_dir ${target} BINARY_DIR)
   set(source "${binary_dir}/${target}_version_resource.cpp")
   configure_file("${CMAKE_CURRENT_FUNCTION_LIST_DIR}/version_resource.cpp.in" "${source}" @ONLY)
+  # its names are its own where a host joins sources
+  set_source_files_properties("${source}" PROPERTIES SKIP_UNITY_BUILD_INCLUSION ON)
   target_sources(${target} PRIVATE "${source}")
 endfunction()

@@ -13,7 +13,7 @@ namespace basalt::geo {
 
 namespace {
 
-constexpr int MOST_PASSES = 100;
+constexpr int MOST_FOOT_PASSES = 100;
 /// Closer than this the point is on the line; metres.
 constexpr double ON_THE_LINE = 1e-6;
 /// What the coordinates of a foot resolve, metres.
@@ -110,7 +110,7 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
         }
         // Not "miss < width": NaN ends the search too.
         const bool square_at_once = passes == 1 && std::abs(sight.skew()) < RAY_TOLERANCE;
-        if (square_at_once || !(miss >= goal.width) || passes == MOST_PASSES) {
+        if (square_at_once || !(miss >= goal.width) || passes == MOST_FOOT_PASSES) {
             break;
         }
         (sight.skew() > goal.aim ? low : high) = along;

@@ -17,7 +17,7 @@ constexpr double SEMI_MINOR_AXIS2 = 40408299984087.055;
 constexpr double FLATTENING_16TH = 0.00020955066654671753;
 
 constexpr double SETTLED = 1e-12;
-constexpr int MOST_PASSES = 100;
+constexpr int MOST_ARC_PASSES = 100;
 
 }  // namespace
 
@@ -49,7 +49,7 @@ bool GeodesicLine::settle(double first, double closeness, const Directions& dire
     arc.sigma = first;
     directions(beyond, arc);
     double change = std::abs(first - TWO_PI);
-    for (int pass = 0; change > SETTLED && pass < MOST_PASSES; ++pass) {
+    for (int pass = 0; change > SETTLED && pass < MOST_ARC_PASSES; ++pass) {
         if (pass > 0) {
             directions(beyond, arc);
         }

@@ -8,7 +8,7 @@
 namespace vex_lib {
 namespace {
 
-constexpr unsigned long LARGEST_SIZE = std::numeric_limits<std::uint32_t>::max();
+constexpr unsigned long LARGEST_SEGMENT = std::numeric_limits<std::uint32_t>::max();
 
 }  // namespace
 
@@ -16,7 +16,7 @@ constexpr unsigned long LARGEST_SIZE = std::numeric_limits<std::uint32_t>::max()
 vlVmAllocator::vlVmAllocator(unsigned long segmentSize, unsigned long blockSize)
     : m_segment_size(static_cast<std::uint32_t>(segmentSize)),
       m_block_size(static_cast<std::uint32_t>(blockSize)),
-      m_bookkeeping(blockSize != 0 && blockSize <= segmentSize && segmentSize <= LARGEST_SIZE
+      m_bookkeeping(blockSize != 0 && blockSize <= segmentSize && segmentSize <= LARGEST_SEGMENT
                         ? new (std::nothrow) vlHeapAllocator
                         : nullptr) {}
 

@@ -8,14 +8,14 @@
 namespace vex_lib {
 namespace {
 
-constexpr std::uint64_t LARGEST_SIZE = std::numeric_limits<std::uint32_t>::max();
+constexpr std::uint64_t LARGEST_BUFFER = std::numeric_limits<std::uint32_t>::max();
 
 }  // namespace
 
 vlVmBuffer::vlVmBuffer(unsigned long initialSize, unsigned long reserve, unsigned long step)
     : m_step(static_cast<std::uint32_t>(step)),
       m_reserve(static_cast<std::uint32_t>(reserve)),
-      m_step_fits(step <= LARGEST_SIZE) {
+      m_step_fits(step <= LARGEST_BUFFER) {
     Alloc(0, initialSize);
 }
 
@@ -25,13 +25,13 @@ vlVmBuffer::~vlVmBuffer() {
 
 // The room that growing to `size` takes; false when it cannot be had.
 bool vlVmBuffer::round_up(std::uint64_t& size) const {
-    if (!m_step_fits || size > LARGEST_SIZE) {
+    if (!m_step_fits || size > LARGEST_BUFFER) {
         return false;
     }
     if (m_step != 0) {
         size = (size / m_step + 1) * m_step;
     }
-    return size <= LARGEST_SIZE;
+    return size <= LARGEST_BUFFER;
 }
 
 void* vlVmBuffer::Alloc(std::uint64_t, std::uint64_t size) {

@@ -6,14 +6,13 @@
 #include <string_view>
 
 #include "src/platform/code_page.h"
+#include "src/platform/text_or_empty.h"
+
+using basalt::platform::text_or_empty;
 
 namespace {
 
 constexpr auto MAX_LENGTH = static_cast<std::size_t>(std::numeric_limits<int>::max());
-
-std::wstring_view view_of(const wchar_t* text) {
-    return text != nullptr ? std::wstring_view(text) : std::wstring_view();
-}
 
 std::size_t clamp_to_size(int position, std::size_t size) {
     return std::min(static_cast<std::size_t>(std::max(position, 0)), size);
@@ -36,7 +35,7 @@ int sign(int comparison) {
 }  // namespace
 
 CString::CString(const wchar_t* text) {
-    const std::wstring_view characters = view_of(text);
+    const std::wstring_view characters = text_or_empty(text);
     append(characters.data(), characters.size());
 }
 
@@ -106,11 +105,11 @@ int CString::ReverseFind(wchar_t character) const noexcept {
 }
 
 int CString::FindOneOf(const wchar_t* characters) const noexcept {
-    return position_or_none(m_text.find_first_of(view_of(characters)));
+    return position_or_none(m_text.find_first_of(text_or_empty(characters)));
 }
 
 int CString::Compare(const wchar_t* other) const noexcept {
-    return sign(m_text.compare(view_of(other)));
+    return sign(m_text.compare(text_or_empty(other)));
 }
 
 void CString::SetAt(int position, wchar_t character) noexcept {
@@ -130,7 +129,7 @@ CString& CString::operator+=(const CString& other) {
 }
 
 CString& CString::operator+=(const wchar_t* other) {
-    const std::wstring_view text = view_of(other);
+    const std::wstring_view text = text_or_empty(other);
     append(text.data(), text.size());
     return *this;
 }
@@ -147,7 +146,7 @@ int CString::Insert(int position, wchar_t character) {
 }
 
 int CString::Insert(int position, const wchar_t* text) {
-    const std::wstring_view characters = view_of(text);
+    const std::wstring_view characters = text_or_empty(text);
     require_length(m_text.size() + characters.size());
     m_text.insert(clamp_to_size(position, m_text.size()), characters);
     return GetLength();
@@ -170,8 +169,8 @@ int CString::Replace(wchar_t old_character, wchar_t new_character) noexcept {
 }
 
 int CString::Replace(const wchar_t* old_text, const wchar_t* new_text) {
-    const std::wstring_view old_part = view_of(old_text);
-    const std::wstring_view new_part = view_of(new_text);
+    const std::wstring_view old_part = text_or_empty(old_text);
+    const std::wstring_view new_part = text_or_empty(new_text);
     if (old_part.empty()) {
         return 0;
     }

@@ -5,15 +5,13 @@
 
 #include "basalt/platform/cstring.h"
 #include "src/platform/code_page.h"
+#include "src/platform/text_or_empty.h"
 
 using basalt::platform::active_code_page;
 using basalt::platform::CodePage;
+using basalt::platform::text_or_empty;
 
 namespace {
-
-std::wstring_view view_of(const wchar_t* text) {
-    return text != nullptr ? std::wstring_view(text) : std::wstring_view();
-}
 
 template <class Matches>
 void trim_left(std::wstring& text, Matches matches) {
@@ -31,8 +29,9 @@ auto is_white_space() {
 
 // Over a copy of the characters: they may belong to the text being trimmed.
 auto is_one_of(const wchar_t* characters) {
-    return
-        [set = std::wstring(view_of(characters))](wchar_t ch) { return set.find(ch) != std::wstring::npos; };
+    return [set = std::wstring(text_or_empty(characters))](wchar_t ch) {
+        return set.find(ch) != std::wstring::npos;
+    };
 }
 
 auto is_equal_to(wchar_t character) {
@@ -43,7 +42,7 @@ auto is_equal_to(wchar_t character) {
 
 int CString::CompareNoCase(const wchar_t* other) const {
     const CodePage& code_page = active_code_page();
-    const std::wstring_view others = view_of(other);
+    const std::wstring_view others = text_or_empty(other);
     const std::size_t shared = std::min(m_text.size(), others.size());
     for (std::size_t i = 0; i < shared; ++i) {
         const wchar_t a = code_page.to_lower(m_text[i]);

@@ -28,10 +28,10 @@ struct Area {
     pixman_region32_t bands;
 };
 
-struct Region : GraphicsObject {
+struct DrawingRegion : GraphicsObject {
     static constexpr GraphicsKind KIND = GraphicsKind::REGION;
-    Region() : GraphicsObject(KIND) {}
-    ~Region() override { lent.Detach(); }
+    DrawingRegion() : GraphicsObject(KIND) {}
+    ~DrawingRegion() override { lent.Detach(); }
 
     Area area;
     CRgn lent;  // what CRgn::FromHandle lends
@@ -44,7 +44,7 @@ static_assert(sizeof(RECT) == sizeof(pixman_box32_t) &&
               offsetof(RECT, bottom) == offsetof(pixman_box32_t, y2));
 
 // The library's functions read the regions they are given, but do not say so.
-pixman_region32_t* bands_of(const Region& region) {
+pixman_region32_t* bands_of(const DrawingRegion& region) {
     return const_cast<pixman_region32_t*>(&region.area.bands);
 }
 
@@ -73,14 +73,14 @@ bool combine(pixman_region32_t* result, pixman_region32_t* a, pixman_region32_t*
            pixman_region32_union(result, result, &rest.bands);
 }
 
-HRGN keep_region(std::unique_ptr<Region> region) {
+HRGN keep_region(std::unique_ptr<DrawingRegion> region) {
     return static_cast<HRGN>(basalt::platform::keep_graphics_object(std::move(region)));
 }
 
 }  // namespace
 
 HRGN basalt::platform::create_region(std::span<const RECT> rectangles) {
-    std::unique_ptr<Region> region(new (std::nothrow) Region);
+    std::unique_ptr<DrawingRegion> region(new (std::nothrow) DrawingRegion);
     // The library writes to standard error about a single rectangle that is reversed.
     const bool holds_none =
         rectangles.empty() || (rectangles.size() == 1 && (rectangles[0].left >= rectangles[0].right ||
@@ -103,9 +103,9 @@ HRGN CreateRectRgn(int left, int top, int right, int bottom) {
 }
 
 int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {
-    auto* const result = object_of<Region>(destination);
-    const auto* const first = result != nullptr ? object_of<Region>(a) : nullptr;
-    const auto* const second = first == nullptr || mode == RGN_COPY ? first : object_of<Region>(b);
+    auto* const result = object_of<DrawingRegion>(destination);
+    const auto* const first = result != nullptr ? object_of<DrawingRegion>(a) : nullptr;
+    const auto* const second = first == nullptr || mode == RGN_COPY ? first : object_of<DrawingRegion>(b);
     if (second == nullptr) {
         return RGN_ERROR;
     }
@@ -123,12 +123,12 @@ int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {
 }
 
 BOOL PtInRegion(HRGN region, int x, int y) {
-    const auto* const found = object_of<Region>(region);
+    const auto* const found = object_of<DrawingRegion>(region);
     return found != nullptr && pixman_region32_contains_point(bands_of(*found), x, y, nullptr) ? 1 : 0;
 }
 
 int GetRgnBox(HRGN region, RECT* box) {
-    const auto* const found = object_of<Region>(region);
+    const auto* const found = object_of<DrawingRegion>(region);
     if (found == nullptr) {
         return RGN_ERROR;
     }
@@ -144,13 +144,13 @@ int GetRgnBox(HRGN region, RECT* box) {
 }
 
 BOOL EqualRgn(HRGN a, HRGN b) {
-    const auto* const first = object_of<Region>(a);
-    const auto* const second = first != nullptr ? object_of<Region>(b) : nullptr;
+    const auto* const first = object_of<DrawingRegion>(a);
+    const auto* const second = first != nullptr ? object_of<DrawingRegion>(b) : nullptr;
     return second != nullptr && pixman_region32_equal(bands_of(*first), bands_of(*second)) ? 1 : 0;
 }
 
 CRgn* CRgn::FromHandle(HRGN region) {
-    auto* const object = object_of<Region>(region);
+    auto* const object = object_of<DrawingRegion>(region);
     if (object == nullptr) {
         return nullptr;
     }

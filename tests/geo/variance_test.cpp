@@ -10,7 +10,7 @@ namespace {
 
 using Six = std::array<double, 6>;
 
-constexpr double A = 6378137.0;
+constexpr double SEMI_MAJOR = 6378137.0;
 
 Six to_llh(const geo_vector& at, const Six& covariance) {
     Six out = {};
@@ -25,7 +25,8 @@ Six to_neu(const geo_vector& at, const Six& covariance) {
 }
 
 TEST(Variance, KeepsAnIsotropicOneInEveryFrame) {
-    for (const geo_vector& at : {geo_vector{A, 0.0, 0.0}, {4.0e6, -1.5e6, 4.7e6}, {1.0, 2.0, -6.4e6}}) {
+    for (const geo_vector& at :
+         {geo_vector{SEMI_MAJOR, 0.0, 0.0}, {4.0e6, -1.5e6, 4.7e6}, {1.0, 2.0, -6.4e6}}) {
         const Six out = to_neu(at, {4.0, 4.0, 4.0, 0.0, 0.0, 0.0});
         for (std::size_t i = 0; i < 6; ++i) {
             EXPECT_NEAR(out[i], i < 3 ? 4.0 : 0.0, 1e-14) << i;
@@ -34,7 +35,7 @@ TEST(Variance, KeepsAnIsotropicOneInEveryFrame) {
 }
 
 TEST(Variance, TurnsTheAxesAtTheEquator) {
-    const geo_vector at = {A, 0.0, 0.0};
+    const geo_vector at = {SEMI_MAJOR, 0.0, 0.0};
     EXPECT_EQ(to_neu(at, {1.0, 0.0, 0.0, 0.0, 0.0, 0.0}), (Six{0.0, 0.0, 1.0, 0.0, 0.0, 0.0}));
     EXPECT_EQ(to_llh(at, {1.0, 0.0, 0.0, 0.0, 0.0, 0.0}), (Six{0.0, 0.0, 1.0, 0.0, 0.0, 0.0}));
     // x is up, y east, z north: each covariance has a place of its own.

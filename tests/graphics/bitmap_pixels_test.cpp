@@ -16,12 +16,12 @@ using vex_util::mfc::GetDIBits;
 
 using Pixels = std::unique_ptr<unsigned char[]>;
 
-constexpr int DEPTHS[] = {1, 4, 8, 16, 24, 32};
+constexpr int EVERY_DEPTH[] = {1, 4, 8, 16, 24, 32};
 
 TEST(BitmapPixels, AreTheStoredRowsTopFirstPaddedToFourBytes) {
     std::mt19937 random(81);
     SCOPED_TRACE("seed 81");
-    for (const int depth : DEPTHS) {
+    for (const int depth : EVERY_DEPTH) {
         for (const int width : {1, 2, 3, 7, 8, 9, 15, 16, 17, 31, 32, 33, 100}) {
             SCOPED_TRACE(testing::Message() << depth << " bits, width " << width);
             const int height = 5;

@@ -13,7 +13,7 @@ using vex_util::mfc::GetDIBits;
 using vex_util::mfc::RegionFromBitmap;
 using vex_util::mfc::RotateBitmap;
 
-constexpr COLORREF KEY = 0xC08040;
+constexpr COLORREF MASK_KEY = 0xC08040;
 constexpr int MASK_COPY_NEEDS = 10;  // five surfaces
 constexpr int CORNERS_NEED = 4;      // a surface, two brushes
 constexpr int ROTATION_NEEDS = 4;    // a context, a surface, a brush
@@ -56,7 +56,7 @@ protected:
 
     static Picture source_picture() {
         Picture picture(12, 12, 0x445566);
-        picture.at(3, 4) = KEY;
+        picture.at(3, 4) = MASK_KEY;
         return picture;
     }
 
@@ -66,7 +66,7 @@ protected:
         Picture after = source_picture();
         after.at(3, 4) = 0x112233;
         m_dest.put(before);
-        _transparentblt(m_dest.dc(), 0, 0, 0, 0, m_source.dc(), 0, 0, 12, 12, KEY);
+        _transparentblt(m_dest.dc(), 0, 0, 0, 0, m_source.dc(), 0, 0, 12, 12, MASK_KEY);
         expect_same(m_dest.picture(), possible ? after : before);
     }
     void expect_gradient(bool rounded) {
@@ -79,7 +79,7 @@ protected:
     void expect_turned(bool possible) {
         const Picture before = source_picture();
         Picture after(12, 12, 0x445566);
-        after.at(8, 7) = KEY;
+        after.at(8, 7) = MASK_KEY;
         m_dest.put(before);
         EXPECT_EQ(RotateBitmap(&m_source.context(), &m_dest.bitmap(), 180.0F), possible);
         expect_same(m_dest.picture(), possible ? after : before);
@@ -90,7 +90,7 @@ protected:
         EXPECT_EQ(pixels != nullptr, possible);
         EXPECT_EQ(header.biWidth, 12);
         CRgn region;
-        EXPECT_EQ(RegionFromBitmap(region, m_dest.bitmap(), KEY), possible);
+        EXPECT_EQ(RegionFromBitmap(region, m_dest.bitmap(), MASK_KEY), possible);
         EXPECT_EQ(region.GetSafeHandle() != nullptr, possible);
         m_dest.select();
     }

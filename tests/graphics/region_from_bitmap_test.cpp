@@ -12,7 +12,7 @@ namespace {
 using namespace basalt::test;
 using vex_util::mfc::RegionFromBitmap;
 
-constexpr COLORREF KEY = 0xC08040;
+constexpr COLORREF TRANSPARENT = 0xC08040;
 
 void expect_region(CBitmap& bitmap, const Picture& picture, COLORREF key) {
     CRgn region;
@@ -29,16 +29,18 @@ TEST(RegionFromBitmap, HoldsThePixelsNotOfTheColour) {
     std::mt19937 random(101);
     SCOPED_TRACE("seed 101");
     const std::vector<std::vector<COLORREF>> mixes = {
-        {KEY, 0xFFFFFF}, {KEY, KEY, KEY, KEY, KEY, KEY, 0x102030}, {0xFFFFFF, 0xC08041, 0x408040, KEY}};
+        {TRANSPARENT, 0xFFFFFF},
+        {TRANSPARENT, TRANSPARENT, TRANSPARENT, TRANSPARENT, TRANSPARENT, TRANSPARENT, 0x102030},
+        {0xFFFFFF, 0xC08041, 0x408040, TRANSPARENT}};
     for (int width = 1; width <= 200; width += width < 70 ? 1 : 29) {
         SCOPED_TRACE(width);
         Picture picture = random_picture(random, width, 7, mixes[random() % mixes.size()]);
         for (int x = 0; x < width; ++x) {  // rows that are alike, and rows of one colour
             picture.at(x, 3) = picture.at(x, 2);
-            picture.at(x, 5) = width % 2 == 0 ? KEY : 0xFFFFFF;
+            picture.at(x, 5) = width % 2 == 0 ? TRANSPARENT : 0xFFFFFF;
         }
         TestSurface surface(picture);
-        expect_region(surface.bitmap(), picture, KEY);
+        expect_region(surface.bitmap(), picture, TRANSPARENT);
     }
 }
 
@@ -46,12 +48,12 @@ TEST(RegionFromBitmap, ReadsLargeBitmapsInPieces) {
     std::mt19937 random(102);
     SCOPED_TRACE("seed 102");
     for (const auto& [width, height] : {std::pair(3, 9000), std::pair(20000, 3)}) {
-        Picture picture(width, height, KEY);
+        Picture picture(width, height, TRANSPARENT);
         for (int i = 0; i < 300; ++i) {
             picture.pixels[random() % picture.pixels.size()] = 0;
         }
         TestSurface surface(picture);
-        expect_region(surface.bitmap(), picture, KEY);
+        expect_region(surface.bitmap(), picture, TRANSPARENT);
     }
 }
 
@@ -120,7 +122,7 @@ TEST(RegionFromBitmap, LeavesTheRegionAloneOnFailure) {
 }
 
 TEST(RegionFromBitmap, ThrowsOrFailsWithoutMemory) {
-    Picture picture(100, 4, KEY);
+    Picture picture(100, 4, TRANSPARENT);
     for (int x = 0; x < 100; x += 2) {
         picture.at(x, x % 4) = 0;
     }
@@ -134,7 +136,7 @@ TEST(RegionFromBitmap, ThrowsOrFailsWithoutMemory) {
             CRgn region;
             made = false;
             try {
-                made = RegionFromBitmap(region, bitmap, KEY);
+                made = RegionFromBitmap(region, bitmap, TRANSPARENT);
             } catch (const std::bad_alloc&) {
                 ++thrown;
             }

@@ -9,7 +9,7 @@ namespace {
 using namespace basalt::test;
 
 constexpr COLORREF KEY = 0x00C08040;
-const std::vector<COLORREF> COLOURS = {KEY, 0x000000, 0xFFFFFF, 0x123456, 0xC08041, KEY};
+const std::vector<COLORREF> INKS = {KEY, 0x000000, 0xFFFFFF, 0x123456, 0xC08041, KEY};
 
 struct Copy {
     int x, y, width, height;                          // destination
@@ -61,8 +61,8 @@ TEST(TransparentCopy, IsThePlatformsFromTheNtFamilyOn) {
     for (const int code : {5, 6, 7, 9, 10, 11}) {
         const StoredOsCode os(code);
         for (const Copy& copy : copies(random, true)) {
-            Picture expected = random_picture(random, 40, 30, COLOURS);
-            const Picture source = random_picture(random, 32, 24, COLOURS);
+            Picture expected = random_picture(random, 40, 30, INKS);
+            const Picture source = random_picture(random, 32, 24, INKS);
             TestSurface dest(expected);
             const TestSurface from(source);
             EXPECT_NE(copy_transparent(copy, dest.dc(), from.dc(), KEY), 0);
@@ -81,8 +81,8 @@ TEST(TransparentCopy, GoesByMasksInTheNinetiesFamily) {
         const StoredOsCode os(code);
         for (const int depth : {24, 32}) {
             for (Copy copy : copies(random, false)) {
-                Picture expected = random_picture(random, 40, 30, COLOURS);
-                const Picture source = random_picture(random, 32, 24, COLOURS);
+                Picture expected = random_picture(random, 40, 30, INKS);
+                const Picture source = random_picture(random, 32, 24, INKS);
                 TestSurface dest(expected, depth);
                 TestSurface from(source);
                 paint_transparent(copy, expected, source, KEY);
@@ -145,8 +145,8 @@ TEST(TransparentCopy, IsAnAndFromTheOriginWhileTheSystemIsNotKnown) {
     for (const int code : {0, 1}) {
         const StoredOsCode os(code);
         for (const Copy& copy : copies(random, true)) {
-            Picture expected = random_picture(random, 40, 30, COLOURS);
-            const Picture source = random_picture(random, 32, 24, COLOURS);
+            Picture expected = random_picture(random, 40, 30, INKS);
+            const Picture source = random_picture(random, 32, 24, INKS);
             TestSurface dest(expected);
             const TestSurface from(source);
             for (int j = 0; j < copy.height; ++j) {

@@ -12,19 +12,17 @@
 #include <vector>
 
 #include "basalt/memory/memory_map.h"
+#include "tests/memory/mapped_bytes.h"
 #include "tests/support/scratch_folder.h"
 
 namespace {
 
+using basalt::test::bytes;
 using basalt::test::ScratchFolder;
 using vex_util::CMemoryMap;
 using Names = std::set<std::string>;
 
-constexpr unsigned long SIZE = 100'000;
-
-char* bytes(const CMemoryMap& map) {
-    return static_cast<char*>(static_cast<void*>(map));
-}
+constexpr unsigned long SHARED_SIZE = 100'000;
 
 // A child process that runs a function with one end of a pipe, and is over when this is.
 class Child {
@@ -76,8 +74,8 @@ TEST(MemoryMapProcesses, many_processes_share_the_folder) {
             children.push_back(std::make_unique<Child>([](int ready) {
                 static std::vector<CMemoryMap> maps(40);
                 for (CMemoryMap& map : maps) {
-                    map.Create(SIZE);
-                    std::fill_n(bytes(map), SIZE, 'x');
+                    map.Create(SHARED_SIZE);
+                    std::fill_n(bytes(map), SHARED_SIZE, 'x');
                 }
                 Child::tell_and_wait(ready);
             }));
@@ -96,15 +94,15 @@ TEST(MemoryMapProcesses, many_processes_share_the_folder) {
 
 TEST(MemoryMapProcesses, an_owner_that_exits_takes_its_files_along) {
     const ScratchFolder folder;
-    CMemoryMap ours(SIZE);
+    CMemoryMap ours(SHARED_SIZE);
     Child child([](int ready) {
-        static CMemoryMap* const map = new CMemoryMap(SIZE);
+        static CMemoryMap* const map = new CMemoryMap(SHARED_SIZE);
         EXPECT_NE(bytes(*map), nullptr);
         Child::tell(ready);
     });
     child.end(0);  // waits for it
     EXPECT_EQ(folder.names().size(), 1U) << "those of its parent stay";
-    bytes(ours)[SIZE - 1] = 'x';
+    bytes(ours)[SHARED_SIZE - 1] = 'x';
 }
 
 }  // namespace

@@ -11,6 +11,7 @@
 #include <type_traits>
 
 #include "src/platform/file.h"
+#include "tests/memory/mapped_bytes.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
@@ -30,6 +31,7 @@ void* __wrap_calloc(size_t count, size_t size) {
 
 namespace {
 
+using basalt::test::bytes;
 using basalt::test::mapped_balance;
 using basalt::test::open_descriptors;
 using basalt::test::ScratchFolder;
@@ -38,10 +40,6 @@ using vex_util::CMemoryMap;
 using Names = std::set<std::string>;
 
 constexpr unsigned long SIZE = 100'000;
-
-char* bytes(const CMemoryMap& map) {
-    return static_cast<char*>(static_cast<void*>(map));
-}
 
 bool is_usable(const CMemoryMap& map, std::size_t size) {
     char* const data = bytes(map);

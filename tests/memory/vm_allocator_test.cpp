@@ -32,13 +32,13 @@ TEST(VmAllocator, refuses_what_it_does_not_serve) {
     EXPECT_TRUE(folder.names().empty());
     EXPECT_NE(allocator.Alloc(30), nullptr);
 
-    constexpr unsigned long BEYOND = 1UL << 32;
+    constexpr unsigned long OVERFLOW_32 = 1UL << 32;
     for (const auto& [segment, block] :
-         {std::pair(100UL, 0UL), std::pair(0UL, 0UL), std::pair(100UL, 101UL), std::pair(BEYOND + 100, 30UL),
-          std::pair(BEYOND + 100, BEYOND + 30)}) {
+         {std::pair(100UL, 0UL), std::pair(0UL, 0UL), std::pair(100UL, 101UL),
+          std::pair(OVERFLOW_32 + 100, 30UL), std::pair(OVERFLOW_32 + 100, OVERFLOW_32 + 30)}) {
         vlVmAllocator none(segment, block);
         EXPECT_EQ(none.Alloc(block), nullptr) << segment << ' ' << block;
-        EXPECT_EQ(none.Alloc(block % BEYOND), nullptr) << segment << ' ' << block;
+        EXPECT_EQ(none.Alloc(block % OVERFLOW_32), nullptr) << segment << ' ' << block;
         none.Free(&none);
     }
 }
@@ -186,11 +186,11 @@ TEST(VmAllocator, without_memory_for_more_state_takes_back_and_reuses) {
 TEST(VmAllocator, serves_one_block_more_than_a_chunk_of_records_holds) {
     const ScratchFolder folder;
     constexpr int BLOCKS = (1 << 14) + 1;
-    constexpr std::uint32_t SIZE = 16;
-    vlVmAllocator allocator(BLOCKS * SIZE, SIZE);
+    constexpr std::uint32_t EACH = 16;
+    vlVmAllocator allocator(BLOCKS * EACH, EACH);
     std::set<void*> blocks;
     for (int i = 0; i < BLOCKS; ++i) {
-        blocks.insert(allocator.Alloc(SIZE));
+        blocks.insert(allocator.Alloc(EACH));
     }
     EXPECT_EQ(blocks.size(), static_cast<std::size_t>(BLOCKS));
     EXPECT_EQ(blocks.count(nullptr), 0U);
@@ -198,7 +198,7 @@ TEST(VmAllocator, serves_one_block_more_than_a_chunk_of_records_holds) {
     for (void* const block : blocks) {
         allocator.Free(block);
     }
-    EXPECT_EQ(blocks.count(allocator.Alloc(SIZE)), 1U);
+    EXPECT_EQ(blocks.count(allocator.Alloc(EACH)), 1U);
 }
 
 TEST(VmAllocator, without_a_temporary_folder_or_bookkeeping_gives_null) {

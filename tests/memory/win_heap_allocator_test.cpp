@@ -26,7 +26,7 @@ using vex_lib::vlAllocator;
 using vex_lib::vlSharedMemoryHeap;
 using vex_lib::vlWinHeapAllocator;
 
-constexpr std::size_t BEYOND = std::size_t{1} << 60;
+constexpr std::size_t BEYOND_MEMORY = std::size_t{1} << 60;
 
 TEST(ReportLastError, WritesThreePiecesAndKeepsTheCode) {
     const DebugOutput output;
@@ -44,7 +44,7 @@ TEST(WinHeapAllocator, ReportsAsDescribed) {
     const Pieces no_memory = report_of(ERROR_NOT_ENOUGH_MEMORY);
     EXPECT_EQ(heap.Alloc(64 * 1024), nullptr);
     EXPECT_EQ(output.take(), no_memory);
-    EXPECT_EQ(heap.ReAlloc(nullptr, BEYOND), nullptr);
+    EXPECT_EQ(heap.ReAlloc(nullptr, BEYOND_MEMORY), nullptr);
     EXPECT_EQ(output.take(), no_memory);
 
     auto* block = static_cast<char*>(heap.Alloc(6));

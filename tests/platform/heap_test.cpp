@@ -449,13 +449,13 @@ TEST(Heap, FullHeapGivesABlockOfNearlyTheSizeAgain) {
 }
 
 TEST(Heap, CompactGivesBackThePagesOfEveryFreeBlock) {
-    constexpr std::size_t SIZE = 100 * KIB;
+    constexpr std::size_t EACH = 100 * KIB;
     constexpr std::size_t PAGE = 4 * KIB;
     const Heap heap(0);
     std::vector<void*> blocks(20);
     for (void*& block : blocks) {
-        block = heap.take(SIZE);
-        std::memset(block, 1, SIZE);
+        block = heap.take(EACH);
+        std::memset(block, 1, EACH);
     }
     for (std::size_t i = 0; i < blocks.size(); i += 2) {
         EXPECT_EQ(heap.free(blocks[i]), 1);
@@ -464,7 +464,7 @@ TEST(Heap, CompactGivesBackThePagesOfEveryFreeBlock) {
     for (std::size_t i = 0; i < blocks.size(); ++i) {
         // between what the heap keeps at either end
         const std::uintptr_t begin = (reinterpret_cast<std::uintptr_t>(blocks[i]) + 2 * PAGE) & ~(PAGE - 1);
-        std::array<unsigned char, SIZE / PAGE - 4> pages{};
+        std::array<unsigned char, EACH / PAGE - 4> pages{};
         if (mincore(reinterpret_cast<void*>(begin), pages.size() * PAGE, pages.data()) != 0) {
             ASSERT_EQ(errno, ENOMEM) << "given back with its region";
         }

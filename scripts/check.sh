@@ -25,8 +25,10 @@ step_headers() {
     scripts/check_headers.sh build/clang
 }
 step_tidy() {
-    cmake --preset asan >/dev/null  # for the commands that it knows
-    git ls-files 'src/*.cpp' 'tools/*.cpp' 'console/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/asan --quiet
+    # for the command that compiles each source alone
+    cmake --preset asan -B build/tidy -DBASALT_JOIN_SOURCES=OFF -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_FUZZERS=OFF \
+        -DBASALT_BUILD_EXAMPLES=OFF -DCMAKE_EXPORT_COMPILE_COMMANDS=ON >/dev/null
+    git ls-files 'src/*.cpp' 'tools/*.cpp' 'console/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/tidy --quiet
 }
 step_elsewhere() {
     # a time zone off the full hour, on both sides of the year's changes; a locale whose decimal sign is a comma

@@ -1,4 +1,5 @@
-// Rectangles with rounded corners.
+#include "src/platform/rounded_rectangle.h"
+
 #include <algorithm>
 #include <cmath>
 #include <cstdlib>
@@ -59,21 +60,48 @@ private:
     std::int64_t m_height;
 };
 
+void fill_row(Surface& surface, std::int64_t y, std::int64_t begin, std::int64_t end, std::uint32_t value) {
+    const RECT part = part_on(surface, {begin, y, end, y + 1});
+    if (part.left < part.right) {
+        fill_pixels(surface.depth, surface.row(part.top), part.left, part.right - part.left, value);
+    }
+}
+
 struct Painter {
     Surface& surface;
     Paint brush;
     Paint pen;
 
     void paint(const Paint& paint, std::int64_t y, std::int64_t begin, std::int64_t end) const {
-        const RECT part = part_on(surface, {begin, y, end, y + 1});
-        if (paint.draws && part.left < part.right) {
-            fill_pixels(surface.depth, surface.row(part.top), part.left, part.right - part.left,
-                        value_of_colour(surface.depth, paint.colour));
+        if (paint.draws) {
+            fill_row(surface, y, begin, end, value_of_colour(surface.depth, paint.colour));
         }
     }
 };
 
 }  // namespace
+
+void basalt::platform::fill_outside_rounding(HDC dc, const RECT& rectangle, int diameter, COLORREF colour,
+                                             COLORREF key) {
+    auto* const context = object_of<Context>(dc);
+    const std::optional<PixelShift> shift = context != nullptr ? required_shift(*context) : std::nullopt;
+    if (!shift) {
+        return;
+    }
+    Surface& surface = context->surface();
+    const std::uint32_t value = value_of_colour(surface.depth, colour);
+    const Box box = shifted(rectangle, *shift);
+    if (box.is_empty() || value == value_of_colour(surface.depth, key)) {
+        return;
+    }
+    const RoundedBox shape(box, diameter, diameter);
+    const RECT part = part_on(surface, box);
+    for (std::int64_t y = part.top; y < part.bottom; ++y) {
+        const std::int64_t inset = shape.inset(y);
+        fill_row(surface, y, box.left, box.left + inset, value);
+        fill_row(surface, y, box.right - inset, box.right, value);
+    }
+}
 
 BOOL RoundRect(HDC dc, int left, int top, int right, int bottom, int width, int height) {
     auto* const context = object_of<Context>(dc);

@@ -76,9 +76,7 @@ TEST(HexCodec, every_form_refuses_each_character_that_is_no_digit_at_every_place
 
 TEST(Hex, encodes_every_byte) {
     EXPECT_EQ(VectorToHexString({0x00, 0xAB, 0x7F}), "00ab7f");
-    EXPECT_EQ(VectorToHexString({}), "");
-    EXPECT_EQ(StringToHexString("A\0B"s), "410042");
-    EXPECT_EQ(StringToHexString("\xFF\x80"), "ff80");
+    EXPECT_EQ(StringToHexString("A\0\xFF"s), "4100ff");
 }
 
 TEST(Hex, digits_are_told_from_all_other_characters) {
@@ -98,40 +96,26 @@ TEST(Hex, digits_are_told_from_all_other_characters) {
 TEST(Hex, decodes_pairs_in_either_case) {
     EXPECT_EQ(HexStringToVector("00AB7f"), (Bytes{0x00, 0xAB, 0x7F}));
     EXPECT_EQ(HexStringToString("414243"), "ABC");
-    EXPECT_TRUE(HexStringToVector("").empty());
     EXPECT_EQ(HexStringToString(""), "");
-    EXPECT_EQ(HexStringToVector("41\0"
-                                "42"s),
-              Bytes{0x41})
-        << "the text ends at its first zero";
-    EXPECT_EQ(HexStringToVector("4\0"
-                                "42"s),
-              Bytes{})
-        << "and leaves a digit alone";
-}
-
-TEST(Hex, lone_last_digit_is_ignored) {
-    EXPECT_EQ(HexStringToVector("7"), Bytes{});
-    EXPECT_EQ(HexStringToVector("41f"), Bytes{0x41});
+    const std::string with_zeros = "41\0004\0002"s;
+    EXPECT_EQ(HexStringToVector(with_zeros), Bytes{0x41}) << "the text ends at its first zero";
+    EXPECT_EQ(HexStringToVector(with_zeros.substr(3)), Bytes{}) << "and leaves a digit alone";
+    EXPECT_EQ(HexStringToVector("41f"), Bytes{0x41}) << "as does its end";
     EXPECT_EQ(HexStringToString("410"), "A") << "a lone 0 is no zero byte";
     EXPECT_EQ(HexStringToVector("4g4"), Bytes{0x50});
 }
 
 TEST(Hex, zero_byte_is_refused_in_text) {
-    const auto expect_refusal = [](const std::string& text) {
+    std::string long_text(200, '4');
+    long_text.append("00");
+    for (const char* const text : {"00AB", "4100", "0041", "zz00", long_text.c_str()}) {
         try {
             HexStringToString(text);
             ADD_FAILURE() << text;
         } catch (const std::exception& error) {
             EXPECT_STREQ(error.what(), "Null terminator in hex string");
         }
-    };
-    for (const char* text : {"00AB", "4100", "0041", "zz00"}) {
-        expect_refusal(text);
     }
-    std::string long_text(200, '4');
-    expect_refusal(long_text.append("00"));
-    EXPECT_EQ(HexStringToString("0001"s.substr(2)), "\x01");
 }
 
 // The rule for pairs, in 8 bits, on lower-case characters.

@@ -4,8 +4,10 @@
 #include <time.h>
 
 #include <cmath>
+#include <initializer_list>
 #include <limits>
 #include <random>
+#include <string>
 
 #include "src/platform/performance_counter.h"
 #include "tests/support/threads.h"
@@ -48,6 +50,15 @@ protected:
     void SetUp() override { counter = {.is_set = true, .ticks = 5 * SECOND}; }
     void TearDown() override { counter = {}; }
     static void pass(double seconds) { counter.ticks += std::llround(seconds * 1e9); }
+    // Polls as many seconds apart: an x for each that reports a period.
+    static std::string polls(PeriodicTimer& timer, bool drop, std::initializer_list<double> gaps) {
+        std::string answers;
+        for (const double gap : gaps) {
+            pass(gap);
+            answers += timer.Update(drop) ? 'x' : '-';
+        }
+        return answers;
+    }
 };
 
 TEST(PerformanceCounter, counts_the_machines_monotonic_nanoseconds) {
@@ -89,82 +100,52 @@ TEST_F(Timers, stopwatch_counts_from_its_last_reset) {
     pass(1.9999999);
     EXPECT_EQ(timer.GetElapsedMs(), 1999UL) << "cut off, not rounded";
     EXPECT_EQ(timer.GetElapsedS(), 1.9999999F);
-    const HiResTimer copy = timer;
+    HiResTimer copy = timer;
     timer.Reset();
     pass(0.25);
     EXPECT_EQ(timer.GetElapsed(), 0.25F);
-    EXPECT_EQ(HiResTimer(copy).GetElapsed(), 2.25F) << "a copy runs on from the same start";
-}
+    EXPECT_EQ(copy.GetElapsed(), 2.25F) << "a copy runs on from the same start";
 
-TEST_F(Timers, long_times_keep_their_milliseconds_and_wrap_at_32_bits) {
-    HiResTimer timer;
+    timer.Reset();
     counter.ticks += ((std::int64_t{1} << 32) + 12'345) * 1'000'000 + 999'999;
-    EXPECT_EQ(timer.GetElapsedMs(), 12'345UL);
+    EXPECT_EQ(timer.GetElapsedMs(), 12'345UL) << "of 32 bits";
     EXPECT_EQ(timer.GetElapsedS(), 4294979.641999999F);
 }
 
-TEST_F(Timers, period_carries_its_overshoot) {
+TEST_F(Timers, period_carries_its_overshoot_unless_that_is_dropped) {
     PeriodicTimer timer;
-    pass(0.999);
-    EXPECT_FALSE(timer.Update(false));
-    pass(1.301);  // 2.3 s: two periods, of which one is reported
-    EXPECT_TRUE(timer.Update(false));
-    EXPECT_FALSE(timer.Update(false));
-    pass(0.6999);
-    EXPECT_FALSE(timer.Update(false));
-    pass(0.0002);
-    EXPECT_TRUE(timer.Update(false));
-}
-
-TEST_F(Timers, dropped_remainder_starts_a_whole_period) {
-    PeriodicTimer timer(1.0F, false);
-    pass(2.3);
-    EXPECT_TRUE(timer.Update(true));
-    pass(0.9999);
-    EXPECT_FALSE(timer.Update(true));
-    pass(0.0002);
-    EXPECT_TRUE(timer.Update(true));
+    // After 2.3 s two periods have passed, of which one is reported.
+    EXPECT_EQ(polls(timer, false, {0.999, 1.301, 0.0, 0.6999, 0.0002}), "-x--x");
+    PeriodicTimer dropping(1.0F, false);
+    EXPECT_EQ(polls(dropping, true, {2.3, 0.9999, 0.0002}), "x-x");
 }
 
 TEST_F(Timers, start_due_reports_at_once_and_exactly_one_period) {
     PeriodicTimer timer(0.5F, true);
-    EXPECT_TRUE(timer.Update(false));
-    EXPECT_FALSE(timer.Update(false));
+    EXPECT_EQ(polls(timer, false, {0.0, 0.0}), "x-");
     timer.Reset(0.25F, true);
-    EXPECT_TRUE(timer.Update(false));
-    EXPECT_FALSE(timer.Update(false));
+    EXPECT_EQ(polls(timer, false, {0.0, 0.0}), "x-");
 }
 
 TEST_F(Timers, resets_keep_the_carry_unless_they_start_due) {
     PeriodicTimer timer(1.0F, false);
-    pass(1.75);
-    EXPECT_TRUE(timer.Update(false));  // carries 0.75
+    EXPECT_EQ(polls(timer, false, {1.75}), "x");  // carries 0.75
     timer.Reset();
-    pass(0.25);
-    EXPECT_TRUE(timer.Update(false));  // carries 0
-    pass(1.5);
-    EXPECT_TRUE(timer.Update(false));  // carries 0.5
+    EXPECT_EQ(polls(timer, false, {0.25, 1.5}), "xx");  // carries 0, then 0.5
     pass(0.375);
     timer.Reset(2.0F, false);
-    pass(1.25);
-    EXPECT_FALSE(timer.Update(false));
-    pass(0.25);
-    EXPECT_TRUE(timer.Update(false)) << "0.5 carried into the new period of 2";
+    EXPECT_EQ(polls(timer, false, {1.25, 0.25}), "-x") << "0.5 carried into the new period of 2";
 }
 
 TEST_F(Timers, periods_that_are_none) {
-    const float nan = std::numeric_limits<float>::quiet_NaN();
-    PeriodicTimer never(nan, true);
-    pass(1000.0);
-    EXPECT_FALSE(never.Update(false));
+    PeriodicTimer never(std::numeric_limits<float>::quiet_NaN(), true);
+    EXPECT_EQ(polls(never, false, {1000.0}), "-");
 
     PeriodicTimer always(0.0F, false);
-    EXPECT_TRUE(always.Update(true));
-    EXPECT_TRUE(always.Update(true));
-    EXPECT_TRUE(always.Update(false));
-    EXPECT_FALSE(always.Update(true)) << "the remainder of a division by 0 is carried";
+    EXPECT_EQ(polls(always, true, {0.0, 0.0}), "xx");
+    EXPECT_EQ(polls(always, false, {0.0, 0.0}), "x-") << "the remainder of a division by 0 is carried";
     always.Reset(1.0F, true);
-    EXPECT_TRUE(always.Update(false));
+    EXPECT_EQ(polls(always, false, {0.0}), "x");
 }
 
 // Ten hours of polls at random times: the k-th report comes at the first poll after k periods, within the

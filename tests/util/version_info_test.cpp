@@ -58,11 +58,10 @@ class Version : public testing::Test {
 protected:
     ~Version() override { program_name = nullptr; }
 
-    void run_as(const Bytes& section, const std::string& section_name = ".version_resource") {
-        ProgramFile(section, section_name).write(m_path);
+    void run_as(const VersionNode& resource) {
+        ProgramFile(block_of(resource)).write(m_path);
         program_name = &m_name;
     }
-    void run_as(const VersionNode& resource) { run_as(block_of(resource)); }
 
     static void expect_survey(VersionInfo& info) {
         EXPECT_STREQ(info.GetVersionString(), L"Survey 04.01.02.305");
@@ -100,26 +99,21 @@ TEST_F(Version, resource_of_this_program) {
                  L"ap \x1F30D %d 04.01.02.305");
 }
 
-TEST_F(Version, fresh_object_has_defaults_and_keeps_them_without_a_resource) {
-    EXPECT_STREQ(m_info.GetVersionString(), L" 01.00.00.01");
-    run_as(block_of(survey_resource()), ".another_section");
-    EXPECT_FALSE(m_info.InitVersionInfo(nullptr));
-    EXPECT_STREQ(m_info.GetVersionString(), L" 01.00.00.01");
-}
-
-TEST_F(Version, texts_of_the_first_translation_alone) {
+TEST_F(Version, each_reading_replaces_what_it_finds) {
     run_as(survey_resource());
     EXPECT_TRUE(m_info.InitVersionInfo(nullptr));
     expect_survey(m_info);
-    const VersionInfo copy = m_info;
-    EXPECT_STREQ(VersionInfo(copy).GetProductName(), L"Survey");
-}
-
-TEST_F(Version, second_reading_replaces_what_it_finds) {
-    run_as(survey_resource());
-    m_info.InitVersionInfo(nullptr);
+    VersionInfo copy = m_info;
+    EXPECT_STREQ(copy.GetProductName(), L"Survey");
 
     VersionNode next = survey_resource();
+    next.children[0].children.clear();
+    next.children[1].children[0].value.resize(3);
+    run_as(next);
+    EXPECT_TRUE(m_info.InitVersionInfo(nullptr));
+    expect_survey(m_info);  // a translation that is cut is none
+
+    next = survey_resource();
     next.value.clear();
     next.children[0].children = {{u"040904b0", {}, true, {text_node(u"Comment", u"new")}}};
     run_as(next);
@@ -135,17 +129,6 @@ TEST_F(Version, second_reading_replaces_what_it_finds) {
     EXPECT_TRUE(m_info.InitVersionInfo(nullptr));
     EXPECT_STREQ(m_info.GetVersionString(), L" 65535.00.07.100");
     EXPECT_STREQ(m_info.GetComment(), L"new") << "without a translation the texts stay";
-}
-
-TEST_F(Version, translation_that_is_cut_is_none) {
-    run_as(survey_resource());
-    m_info.InitVersionInfo(nullptr);
-    VersionNode next = survey_resource();
-    next.children[0].children.clear();
-    next.children[1].children[0].value.resize(3);
-    run_as(next);
-    EXPECT_TRUE(m_info.InitVersionInfo(nullptr));
-    expect_survey(m_info);
 }
 
 TEST_F(Version, program_without_a_name_that_fits_has_no_resource) {
@@ -171,12 +154,15 @@ TEST_F(Version, file_that_cannot_be_read_leaves_everything_as_it_was) {
         ASSERT_EQ(result, !failed) << nth;
         ASSERT_STREQ(m_info.GetVersionString(), failed ? L" 01.00.00.01" : L"Survey 04.01.02.305");
     }
+}
+
+TEST_F(Version, file_that_is_read_bit_by_bit_is_whole) {
+    run_as(survey_resource());
     readings_are_short = true;
-    VersionInfo bit_by_bit;
-    EXPECT_TRUE(bit_by_bit.InitVersionInfo(nullptr));
+    EXPECT_TRUE(m_info.InitVersionInfo(nullptr));
     readings_are_short = false;
     EXPECT_FALSE(asked_for_another_rest);
-    expect_survey(bit_by_bit);
+    expect_survey(m_info);
 }
 
 TEST_F(Version, lack_of_memory_leaves_everything_as_it_was) {

@@ -5,11 +5,11 @@
 
 #include <bit>
 #include <cstdlib>
+#include <set>
 #include <utility>
 
 #include "src/frame/environment_state.h"
 #include "src/platform/version_query.h"
-#include "tests/support/threads.h"
 
 namespace {
 
@@ -70,19 +70,14 @@ protected:
     }
 };
 
-TEST_F(Environment, operating_system_is_detected_once) {
-    EXPECT_EQ(_operatingsystem(), 11U);
-    fake.minor = 1;
-    EXPECT_EQ(_operatingsystem(), 11U);
-    EXPECT_EQ(fake.queries, 1);
-}
-
-TEST_F(Environment, undetermined_release_is_asked_for_again_at_every_call) {
+TEST_F(Environment, operating_system_is_asked_for_until_it_is_determined) {
     fake.minor = 3;
     EXPECT_EQ(_operatingsystem(), 0U);
     fake.query_works = false;
     EXPECT_EQ(_operatingsystem(), 0U);
     fake = {.queries = 2};
+    EXPECT_EQ(_operatingsystem(), 11U);
+    fake.minor = 1;
     EXPECT_EQ(_operatingsystem(), 11U);
     EXPECT_EQ(fake.queries, 3);
 }
@@ -100,32 +95,18 @@ TEST_F(Environment, version_number_is_0_and_detects_at_every_call) {
 }
 
 TEST_F(Environment, handheld_capabilities) {
-    struct Row {
-        basalt_hh code;
-        bool radio, modem, rtk, default_font;
-        bool takes_generation_flag, takes_rtk_flag;
-    };
-    constexpr Row ROWS[] = {
-        {1, false, false, false, true, false, false},  {2, false, false, false, true, false, false},
-        {3, false, true, false, true, false, false},   {4, false, false, false, true, false, false},
-        {5, true, false, false, true, false, false},   {6, true, false, false, true, true, false},
-        {7, false, true, true, true, false, false},    {8, true, false, false, false, false, false},
-        {9, false, false, false, false, false, false}, {10, false, true, false, true, false, false},
-        {11, false, true, false, true, false, true},   {12, false, false, false, true, false, false},
-        {13, false, false, false, true, true, false},  {14, false, true, false, true, false, false},
-        {15, false, false, false, true, false, false},
-    };
-    for (const Row& row : ROWS) {
-        SCOPED_TRACE(row.code);
+    for (basalt_hh code = 1; code <= 15; ++code) {
+        const auto is_one_of = [code](const std::set<basalt_hh>& codes) { return codes.contains(code); };
         for (const bool flag : {false, true}) {
-            environment.handheld_code.store(row.code);
+            SCOPED_TRACE(testing::Message() << code << ' ' << flag);
+            environment.handheld_code.store(code);
             environment.new_generation.store(flag);
             environment.rtk_option.store(flag);
-            EXPECT_EQ(_handheldCanHaveInBuildKV7Radio(), row.radio);
-            EXPECT_EQ(_handheldCanHaveInBuildModem(), row.modem);
-            EXPECT_EQ(_handheldCanHaveInBuildKestraRTK(), row.rtk || (row.takes_rtk_flag && flag));
-            EXPECT_EQ(_isDefaultFontSize(), row.default_font);
-            EXPECT_EQ(_isNewLumoOS(), row.takes_generation_flag && flag);
+            EXPECT_EQ(_handheldCanHaveInBuildKV7Radio(), is_one_of({5, 6, 8}));
+            EXPECT_EQ(_handheldCanHaveInBuildModem(), is_one_of({3, 7, 10, 11, 14}));
+            EXPECT_EQ(_handheldCanHaveInBuildKestraRTK(), code == 7 || (code == 11 && flag));
+            EXPECT_EQ(_isDefaultFontSize(), !is_one_of({8, 9}));
+            EXPECT_EQ(_isNewLumoOS(), flag && is_one_of({6, 13}));
         }
     }
 }
@@ -181,17 +162,6 @@ TEST_F(Environment, tick_0_does_not_reseed_a_fresh_library) {
     std::srand(99);
     set_tick(0);
     EXPECT_EQ(_random_uint16(), unseeded);
-}
-
-// For the thread sanitizer, which sees any of them unsynchronised.
-TEST_F(Environment, threads_that_ask_first_get_the_same_answers) {
-    basalt::test::run_threads(4, [&](int) {
-        EXPECT_EQ(_handheldVersion(), 1U);
-        EXPECT_EQ(_checkForHighResolution(), 1.0);
-        EXPECT_LT(_random_uint16(), 65535);
-        _setLanguageVersion(15);
-        EXPECT_EQ(_languageVersion(), 15U);
-    });
 }
 
 }  // namespace

@@ -7,17 +7,10 @@
 
 namespace {
 
-TEST(ReverseBytes, published_example) {
-    unsigned char bytes[] = {1, 2, 3, 4, 5};
-    _reversebytes(bytes, 5);
-    const unsigned char expected[] = {5, 4, 3, 2, 1};
-    EXPECT_TRUE(std::equal(bytes, bytes + 5, expected));
-    _reversebytes(nullptr, 0);
-}
-
 // Every count around the widths of the words, at every alignment, and nothing outside the range.
 TEST(ReverseBytes, agrees_with_the_byte_loop) {
     constexpr std::size_t MARGIN = 8;
+    _reversebytes(nullptr, 0);
     for (std::uint32_t count = 0; count <= 100; ++count) {
         for (std::size_t offset = 0; offset < 8; ++offset) {
             std::vector<unsigned char> bytes(count + offset + MARGIN);

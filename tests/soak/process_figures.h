@@ -8,9 +8,7 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <filesystem>
 #include <fstream>
-#include <iterator>
 
 #include "basalt/memory.h"
 #include "src/platform/heap_inspection.h"
@@ -23,12 +21,6 @@ inline std::size_t resident_bytes() {
     std::size_t resident = 0;
     status >> total >> resident;
     return resident * static_cast<std::size_t>(sysconf(_SC_PAGESIZE));
-}
-
-// The one that counts them is among them.
-inline std::size_t open_descriptors() {
-    const std::filesystem::directory_iterator all("/proc/self/fd");
-    return static_cast<std::size_t>(std::distance(begin(all), end(all)));
 }
 
 // Bytes that the general-purpose heap and the shared heap have of the system.

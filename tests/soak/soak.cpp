@@ -10,6 +10,7 @@
 
 #include "tests/soak/process_figures.h"
 #include "tests/soak/site.h"
+#include "tests/support/open_descriptors.h"
 
 namespace {
 
@@ -25,7 +26,7 @@ constexpr int STEPS_A_TICK = 20;
 struct SiteFigures {
     double cpu_seconds = 0;
     std::size_t resident = 0;
-    std::size_t descriptors = 0;
+    long descriptors = 0;
     std::size_t heaps = 0;  // at their largest
 };
 
@@ -53,7 +54,7 @@ SiteFigures work(Site& site, double share) {
     site.finish();
     figures.cpu_seconds = cpu_seconds() - before;
     figures.resident = resident_bytes();
-    figures.descriptors = open_descriptors();
+    figures.descriptors = basalt::test::open_descriptors();
     return figures;
 }
 
@@ -64,7 +65,7 @@ double mib(std::size_t bytes) {
 struct Span {
     double cpu_milliseconds = 0;  // of a site, mean
     std::size_t resident = 0;     // the most
-    std::size_t descriptors = 0;  // the most
+    long descriptors = 0;         // the most
 };
 
 // A tenth of the sites, so that one that happened to be disturbed does not decide.
@@ -79,7 +80,7 @@ Span summary(const std::vector<SiteFigures>& sites, std::size_t first, std::size
 }
 
 void report_line(const char* when, const Span& span) {
-    std::printf("%-12s %9.2f ms a site, resident %8.3f MiB, descriptors %zu\n", when, span.cpu_milliseconds,
+    std::printf("%-12s %9.2f ms a site, resident %8.3f MiB, descriptors %ld\n", when, span.cpu_milliseconds,
                 mib(span.resident), span.descriptors);
 }
 

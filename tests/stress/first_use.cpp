@@ -1,11 +1,11 @@
 // The first calls of a process, made by all threads at once and by each in another order.
 #include <latch>
 #include <string>
-#include <thread>
 #include <vector>
 
 #include "basalt/basalt.h"
 #include "tests/stress/stress.h"
+#include "tests/support/threads.h"
 
 namespace basalt::stress {
 
@@ -54,18 +54,13 @@ const std::vector<std::function<void()>>& first_calls() {
 long first_use() {
     const auto& calls = first_calls();
     std::latch start(THREADS);
-    std::vector<std::thread> threads;
-    for (std::size_t thread = 0; thread < THREADS; ++thread) {
-        threads.emplace_back([&, thread] {
-            start.arrive_and_wait();
-            for (std::size_t i = 0; i < calls.size(); ++i) {
-                calls[(thread / 2 * 5 + i) % calls.size()]();  // in pairs, so that two always meet
-            }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    test::run_threads(THREADS, [&](int thread) {
+        start.arrive_and_wait();
+        for (std::size_t i = 0; i < calls.size(); ++i) {
+            const auto pair = static_cast<std::size_t>(thread / 2);  // so that two always meet
+            calls[(pair * 5 + i) % calls.size()]();
+        }
+    });
     return THREADS * static_cast<long>(calls.size());
 }
 

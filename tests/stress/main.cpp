@@ -1,13 +1,13 @@
 // Runs one subject, or all but first_use, and prints how often the threads went round. A data race is the
 // thread sanitizer's to find; what is wrong without one ends the program. Usage: stress [SECONDS [SUBJECT]]
+#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <string_view>
-#include <thread>
-#include <vector>
 
 #include "basalt/platform/error.h"
 #include "tests/stress/stress.h"
+#include "tests/support/threads.h"
 
 namespace basalt::stress {
 
@@ -21,21 +21,15 @@ void require(bool holds, const char* what) {
 long run_threads(int count, double seconds, const Round& round) {
     const auto end = std::chrono::steady_clock::now() + std::chrono::duration<double>(seconds);
     std::atomic<long> rounds = 0;
-    std::vector<std::thread> threads;
-    for (int thread = 0; thread < count; ++thread) {
-        threads.emplace_back([&, thread] {
-            Random random(static_cast<unsigned>(thread + 1));
-            long mine = 0;
-            do {
-                round(thread, random);
-                ++mine;
-            } while (std::chrono::steady_clock::now() < end);
-            rounds += mine;
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    test::run_threads(count, [&](int thread) {
+        Random random(static_cast<unsigned>(thread + 1));
+        long mine = 0;  // what all count at once would order their rounds, and hide a race
+        do {
+            round(thread, random);
+            ++mine;
+        } while (std::chrono::steady_clock::now() < end);
+        rounds += mine;
+    });
     return rounds;
 }
 

@@ -4,8 +4,10 @@
 
 #include <cstdlib>
 #include <filesystem>
-#include <random>
+#include <optional>
 #include <string>
+
+#include "tests/support/scratch_folder.h"
 
 namespace test_locales {
 
@@ -14,21 +16,16 @@ namespace test_locales {
 class Folder {
 public:
     Folder() {
-        const char* const inherited = std::getenv(VARIABLE);
-        m_owner = inherited == nullptr;
-        if (m_owner) {
-            m_path = std::filesystem::temp_directory_path() /
-                     ("basalt_locales_" + std::to_string(std::random_device{}()));
-            std::filesystem::create_directory(m_path);
-            setenv(VARIABLE, m_path.c_str(), 1);
-        } else {
+        if (const char* const inherited = std::getenv(VARIABLE)) {
             m_path = inherited;
+        } else {
+            m_path = m_own.emplace().path();
+            setenv(VARIABLE, m_path.c_str(), 1);
         }
     }
     ~Folder() {
-        if (m_owner) {
+        if (m_own) {
             unsetenv(VARIABLE);
-            std::filesystem::remove_all(m_path);
         }
     }
     Folder(const Folder&) = delete;
@@ -56,8 +53,8 @@ public:
 private:
     static constexpr char VARIABLE[] = "BASALT_TEST_LOCALES";
 
+    std::optional<basalt::test::ScratchFolder> m_own;
     std::filesystem::path m_path;
-    bool m_owner;
 };
 
 }  // namespace test_locales

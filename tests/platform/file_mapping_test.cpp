@@ -13,6 +13,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/file.h"
+#include "tests/platform/error_of.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
@@ -20,6 +21,7 @@
 
 namespace {
 
+using basalt::test::error_of;
 using basalt::test::mapped_balance;
 using basalt::test::open_descriptors;
 using basalt::test::ScratchFolder;
@@ -41,10 +43,6 @@ char* map(HANDLE mapping, std::size_t size = SIZE) {
     return static_cast<char*>(MapViewOfFile(mapping, FILE_MAP_ALL_ACCESS, 0, 0, size));
 }
 
-bool is_zero(const char* bytes, std::size_t size) {
-    return std::all_of(bytes, bytes + size, [](char byte) { return byte == 0; });
-}
-
 TEST(FileMapping, holds_its_space_and_its_lock_without_a_descriptor) {
     const ScratchFolder folder;
     const std::wstring name = folder.wide(L"file");
@@ -62,25 +60,20 @@ TEST(FileMapping, holds_its_space_and_its_lock_without_a_descriptor) {
     char* const view = map(mapping);
     ASSERT_NE(view, nullptr);
     EXPECT_EQ(open_descriptors(), descriptors);
-    EXPECT_TRUE(is_zero(view, SIZE));
+    EXPECT_EQ(std::count(view, view + SIZE, 0), static_cast<long>(SIZE));
     std::fill_n(view, SIZE, 'x');
-    EXPECT_EQ(DeleteFileW(name.c_str()), 0);
-    EXPECT_EQ(GetLastError(), ERROR_SHARING_VIOLATION);
+    EXPECT_EQ(error_of(DeleteFileW(name.c_str())), ERROR_SHARING_VIOLATION);
 
-    EXPECT_EQ(map(mapping), nullptr) << "a mapping has one view";
-    EXPECT_EQ(GetLastError(), ERROR_NOT_SUPPORTED);
-    EXPECT_EQ(map(second), nullptr) << "and so has a file";
-    EXPECT_EQ(GetLastError(), ERROR_FILE_INVALID);
+    EXPECT_EQ(error_of(map(mapping)), ERROR_NOT_SUPPORTED) << "a mapping has one view";
+    EXPECT_EQ(error_of(map(second)), ERROR_FILE_INVALID) << "and so has a file";
     EXPECT_EQ(CloseHandle(second), 1);
-    EXPECT_EQ(make_mapping(file), nullptr);
-    EXPECT_EQ(GetLastError(), ERROR_FILE_INVALID);
+    EXPECT_EQ(error_of(make_mapping(file)), ERROR_FILE_INVALID);
 
-    EXPECT_EQ(UnmapViewOfFile(view + 1), 0);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_ADDRESS);
+    EXPECT_EQ(error_of(UnmapViewOfFile(view + 1)), ERROR_INVALID_ADDRESS);
     EXPECT_EQ(UnmapViewOfFile(view), 1);
     EXPECT_EQ(UnmapViewOfFile(view), 0);
-    EXPECT_EQ(DeleteFileW(name.c_str()), 0) << "held until the handle is closed";
-    EXPECT_EQ(GetLastError(), ERROR_SHARING_VIOLATION);
+    EXPECT_EQ(error_of(DeleteFileW(name.c_str())), ERROR_SHARING_VIOLATION)
+        << "held until the handle is closed";
     EXPECT_EQ(CloseHandle(mapping), 1);
     EXPECT_EQ(CloseHandle(file), 1);
     EXPECT_TRUE(folder.names().empty());
@@ -110,22 +103,20 @@ TEST(FileMapping, a_view_outlives_its_handles_and_keeps_the_lock) {
 TEST(FileMapping, other_uses_are_refused) {
     const ScratchFolder folder;
     const HANDLE file = make_file(folder.wide(L"file"));
-    const auto code = [](const void* result) {
-        EXPECT_EQ(result, nullptr);
-        return GetLastError();
-    };
-    EXPECT_EQ(code(make_mapping(INVALID_HANDLE_VALUE, 0)), ERROR_INVALID_PARAMETER);
-    EXPECT_EQ(code(make_mapping(file, 0)), ERROR_FILE_INVALID) << "an empty file";
-    EXPECT_EQ(code(make_mapping(nullptr)), ERROR_INVALID_HANDLE);
-    EXPECT_EQ(code(make_mapping(file, SIZE_MAX)), ERROR_FILE_TOO_LARGE);
-    EXPECT_EQ(code(CreateFileMappingW(file, nullptr, PAGE_NOACCESS, 0, 1, nullptr)), ERROR_INVALID_PARAMETER);
-    EXPECT_EQ(code(CreateFileMappingW(file, nullptr, PAGE_READWRITE, 0, 1, L"n")), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(make_mapping(INVALID_HANDLE_VALUE, 0)), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(make_mapping(file, 0)), ERROR_FILE_INVALID) << "an empty file";
+    EXPECT_EQ(error_of(make_mapping(nullptr)), ERROR_INVALID_HANDLE);
+    EXPECT_EQ(error_of(make_mapping(file, SIZE_MAX)), ERROR_FILE_TOO_LARGE);
+    EXPECT_EQ(error_of(CreateFileMappingW(file, nullptr, PAGE_NOACCESS, 0, 1, nullptr)),
+              ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(CreateFileMappingW(file, nullptr, PAGE_READWRITE, 0, 1, L"n")),
+              ERROR_INVALID_PARAMETER);
     const HANDLE mapping = make_mapping(file);
-    EXPECT_EQ(code(make_mapping(mapping)), ERROR_INVALID_HANDLE) << "a mapping is no file";
-    EXPECT_EQ(code(map(file)), ERROR_INVALID_HANDLE) << "a file is no mapping";
-    EXPECT_EQ(code(map(mapping, SIZE + 1)), ERROR_INVALID_PARAMETER);
-    EXPECT_EQ(code(MapViewOfFile(mapping, 4, 0, 0, SIZE)), ERROR_INVALID_PARAMETER);
-    EXPECT_EQ(code(MapViewOfFile(mapping, FILE_MAP_ALL_ACCESS, 0, 4096, SIZE)), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(make_mapping(mapping)), ERROR_INVALID_HANDLE) << "a mapping is no file";
+    EXPECT_EQ(error_of(map(file)), ERROR_INVALID_HANDLE) << "a file is no mapping";
+    EXPECT_EQ(error_of(map(mapping, SIZE + 1)), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(MapViewOfFile(mapping, 4, 0, 0, SIZE)), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(MapViewOfFile(mapping, FILE_MAP_ALL_ACCESS, 0, 4096, SIZE)), ERROR_INVALID_PARAMETER);
     CloseHandle(mapping);
     CloseHandle(file);
 }
@@ -146,8 +137,7 @@ TEST(FileMapping, every_failing_call_leaves_nothing_behind) {
             EXPECT_EQ(view == nullptr, fails);
             if (view != nullptr) {
                 const SystemFailure failure(1);
-                EXPECT_EQ(UnmapViewOfFile(view), 0);
-                EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
+                EXPECT_EQ(error_of(UnmapViewOfFile(view)), ERROR_NOT_ENOUGH_MEMORY);
             }
             EXPECT_EQ(view == nullptr ? 1 : UnmapViewOfFile(view), 1) << "it stayed when that was refused";
             CloseHandle(mapping);
@@ -182,8 +172,7 @@ TEST(FileMapping, a_limit_on_file_sizes_is_a_failed_call) {
         const rlimit limit = {4096, before.rlim_max};
         setrlimit(RLIMIT_FSIZE, &limit);
         const HANDLE file = make_file(folder.wide(L"file"));
-        EXPECT_EQ(make_mapping(file), nullptr);
-        EXPECT_EQ(GetLastError(), ERROR_FILE_TOO_LARGE);
+        EXPECT_EQ(error_of(make_mapping(file)), ERROR_FILE_TOO_LARGE);
         const HANDLE small = make_mapping(file, 4096);
         EXPECT_NE(small, nullptr);
         setrlimit(RLIMIT_FSIZE, &before);

@@ -10,11 +10,13 @@
 #include <string>
 
 #include "basalt/platform/error.h"
+#include "tests/platform/error_of.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
 
 namespace {
 
+using basalt::test::error_of;
 using basalt::test::ScratchFolder;
 using basalt::test::SystemFailure;
 using Names = std::set<std::string>;
@@ -38,23 +40,19 @@ TEST(TemporaryFile, is_new_and_empty_and_named_as_published) {
     // The longest folder leaves room for the name, and is told by its length from one that is not there.
     const std::wstring longest = std::wstring(MAX_PATH - 14 - folder.path().size(), L'/') +
                                  folder.wide(L"").substr(0, folder.path().size());
-    const UINT last = GetTempFileNameW(longest.c_str(), L"vma", 0, name);
-    ASSERT_NE(last, 0U);
-    char text[40];
-    std::snprintf(text, sizeof text, "vma%X.tmp", last);
-    expected.insert(text);
+    ASSERT_NE(GetTempFileNameW(longest.c_str(), L"vma", 0, name), 0U);
+    const std::wstring_view last = std::wstring_view(name).substr(longest.size() + 1);
+    expected.emplace(last.begin(), last.end());
     EXPECT_EQ(folder.names(), expected);
 
     const wchar_t untouched[] = L"untouched";
     std::wmemcpy(name, untouched, std::size(untouched));
-    EXPECT_EQ(GetTempFileNameW(folder.wide(L"missing").c_str(), L"vma", 0, name), 0U);
-    EXPECT_EQ(GetLastError(), ERROR_PATH_NOT_FOUND);
-    EXPECT_EQ(GetTempFileNameW(std::wstring(MAX_PATH - 13, L'x').c_str(), L"vma", 0, name), 0U);
-    EXPECT_EQ(GetLastError(), ERROR_FILENAME_EXCED_RANGE);
-    EXPECT_EQ(GetTempFileNameW(L"/tmp", L"\xD800", 0, name), 0U);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_NAME);
-    EXPECT_EQ(GetTempFileNameW(L"/tmp", L"vma", 7, name), 0U);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(GetTempFileNameW(folder.wide(L"missing").c_str(), L"vma", 0, name)),
+              ERROR_PATH_NOT_FOUND);
+    EXPECT_EQ(error_of(GetTempFileNameW(std::wstring(MAX_PATH - 13, L'x').c_str(), L"vma", 0, name)),
+              ERROR_FILENAME_EXCED_RANGE);
+    EXPECT_EQ(error_of(GetTempFileNameW(L"/tmp", L"\xD800", 0, name)), ERROR_INVALID_NAME);
+    EXPECT_EQ(error_of(GetTempFileNameW(L"/tmp", L"vma", 7, name)), ERROR_INVALID_PARAMETER);
     {
         const SystemFailure taken(1, SystemFailure::Then::STAYS, EEXIST);
         EXPECT_EQ(GetTempFileNameW(L"/tmp", L"vma", 0, name), 0U);

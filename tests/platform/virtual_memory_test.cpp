@@ -11,6 +11,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/pages.h"
+#include "tests/platform/error_of.h"
 #include "tests/support/system_failures.h"
 #include "tests/support/threads.h"
 #include "tests/support/with_failing_allocations.h"
@@ -18,6 +19,7 @@
 
 namespace {
 
+using basalt::test::error_of;
 using basalt::test::mapped_balance;
 using basalt::test::SystemFailure;
 
@@ -93,8 +95,7 @@ TEST(VirtualMemory, decommitted_pages_are_zero_even_in_locked_memory) {
 
 TEST(VirtualMemory, an_address_of_ones_own) {
     char* const base = reserve(4 * GRANULE);
-    EXPECT_EQ(reserve(GRANULE, base + GRANULE), nullptr) << "taken";
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_ADDRESS);
+    EXPECT_EQ(error_of(reserve(GRANULE, base + GRANULE)), ERROR_INVALID_ADDRESS) << "taken";
     EXPECT_EQ(release(base), 1);
     EXPECT_EQ(reserve(PAGE, base + GRANULE + 5), base + GRANULE) << "brought down to a granule";
     EXPECT_EQ(commit(base + GRANULE, 5 + PAGE), base + GRANULE) << "up to the end of what was asked for";
@@ -112,29 +113,23 @@ TEST(VirtualMemory, what_is_not_reserved_is_refused) {
     char* const next = reserve(GRANULE, base + GRANULE);  // perhaps, and then it is another reservation
     const long mapped = mapped_balance();
     for (char* const address : {base - 1, base + GRANULE - 1, reinterpret_cast<char*>(PAGE)}) {
-        SetLastError(0);
-        EXPECT_EQ(commit(address, 2), nullptr);
-        EXPECT_EQ(GetLastError(), ERROR_INVALID_ADDRESS);
+        EXPECT_EQ(error_of(commit(address, 2)), ERROR_INVALID_ADDRESS);
         EXPECT_EQ(decommit(address, 2), 0);
     }
     EXPECT_EQ(commit(base, SIZE_MAX), nullptr);
     EXPECT_EQ(decommit(base, SIZE_MAX), 0);
     EXPECT_EQ(decommit(base + PAGE, 0), 0);
     EXPECT_EQ(release(base + PAGE), 0);
-    EXPECT_EQ(release(nullptr), 0);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_ADDRESS);
-    EXPECT_EQ(VirtualAlloc(base, SIZE_MAX, MEM_RESERVE, PAGE_NOACCESS), nullptr) << "beyond the last address";
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_ADDRESS);
-    EXPECT_EQ(reserve(SIZE_MAX), nullptr);
-    EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
-    EXPECT_EQ(reserve(0), nullptr);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(release(nullptr)), ERROR_INVALID_ADDRESS);
+    EXPECT_EQ(error_of(VirtualAlloc(base, SIZE_MAX, MEM_RESERVE, PAGE_NOACCESS)), ERROR_INVALID_ADDRESS)
+        << "beyond the last address";
+    EXPECT_EQ(error_of(reserve(SIZE_MAX)), ERROR_NOT_ENOUGH_MEMORY);
+    EXPECT_EQ(error_of(reserve(0)), ERROR_INVALID_PARAMETER);
     EXPECT_EQ(commit(base, 0), nullptr);
     EXPECT_EQ(VirtualAlloc(nullptr, PAGE, MEM_RESERVE, PAGE_READWRITE), nullptr);
     EXPECT_EQ(VirtualAlloc(nullptr, PAGE, MEM_COMMIT | MEM_RESERVE, PAGE_READWRITE), nullptr);
     EXPECT_EQ(VirtualFree(base, PAGE, MEM_RELEASE), 0);
-    EXPECT_EQ(VirtualFree(base, 0, MEM_RELEASE | MEM_DECOMMIT), 0);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(error_of(VirtualFree(base, 0, MEM_RELEASE | MEM_DECOMMIT)), ERROR_INVALID_PARAMETER);
     EXPECT_EQ(mapped_balance(), mapped);
     EXPECT_EQ(release(base), 1);
     EXPECT_EQ(next != nullptr ? release(next) : 1, 1);
@@ -154,8 +149,7 @@ TEST(VirtualMemory, every_failing_call_leaves_things_as_they_were) {
                      {+[](char* at) { return commit(at, PAGE) != nullptr ? 1 : 0; },
                       +[](char* at) { return decommit(at, PAGE); }, +[](char* at) { return release(at); }}) {
                     const SystemFailure failure(1);
-                    EXPECT_EQ(call(pages), 0);
-                    EXPECT_EQ(GetLastError(), ERROR_NOT_ENOUGH_MEMORY);
+                    EXPECT_EQ(error_of(call(pages)), ERROR_NOT_ENOUGH_MEMORY);
                 }
                 EXPECT_EQ(pages[0], 'x');
                 EXPECT_EQ(release(pages), 1);

@@ -5,20 +5,24 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include <chrono>
+#include <ctime>
 #include <filesystem>
 #include <set>
 #include <string>
 
 #include "basalt/platform/error.h"
 #include "src/platform/file.h"
+#include "src/platform/ticks.h"
 #include "src/platform/wildcard.h"
+#include "tests/platform/error_of.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
 
 namespace {
 
+using basalt::platform::tick_count;
+using basalt::test::error_of;
 using basalt::test::open_descriptors;
 using basalt::test::ScratchFolder;
 using basalt::test::SystemFailure;
@@ -39,8 +43,7 @@ WideNames search(const std::wstring& path) {
     } while (FindNextFileW(found, &entry) != 0);
     const DWORD error = GetLastError();
     EXPECT_EQ(FindClose(found), 1);
-    EXPECT_EQ(FindClose(found), 0);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
+    EXPECT_EQ(error_of(FindClose(found)), ERROR_INVALID_HANDLE);
     SetLastError(error);
     return names;
 }
@@ -54,10 +57,6 @@ WIN32_FIND_DATAW entry_of(const std::wstring& path) {
     WIN32_FIND_DATAW entry = {};
     EXPECT_EQ(FindClose(FindFirstFileW(path.c_str(), &entry)), 1);
     return entry;
-}
-
-std::uint64_t ticks(const FILETIME& time) {
-    return std::uint64_t{time.dwHighDateTime} << 32 | time.dwLowDateTime;
 }
 
 TEST(Wildcards, match_as_a_plain_recursion_does) {
@@ -121,7 +120,6 @@ TEST(FileSearch, names_what_matches) {
     WideNames all = texts;
     all.merge(WideNames{L".", L"..", L"A.TXT", L".hidden", L"plain", L"~0004711.mem"});
     EXPECT_EQ(search(folder.wide(L"*")), all);
-    EXPECT_EQ(search(folder.wide(L"*.*")), all);
 
     EXPECT_EQ(search(folder.wide(L"a.txt")), WideNames{L"a.txt"});
     EXPECT_EQ(GetLastError(), ERROR_NO_MORE_FILES);
@@ -129,7 +127,6 @@ TEST(FileSearch, names_what_matches) {
     const auto before = std::filesystem::current_path();
     std::filesystem::current_path(folder.path());
     EXPECT_EQ(search(L"pl*"), WideNames{L"plain"});
-    EXPECT_EQ(search(L"plain"), WideNames{L"plain"});
     std::filesystem::current_path(before);
 
     EXPECT_EQ(search_error(folder.wide(L"*.none")), ERROR_FILE_NOT_FOUND);
@@ -163,19 +160,14 @@ TEST(FileSearch, tells_kinds_sizes_and_times) {
     // and 2001-09-09 01:46:40, 10^9 seconds after 1970.
     const timespec times[] = {{-1, 700}, {1'000'000'000, 0}};
     ASSERT_EQ(utimensat(AT_FDCWD, (folder / "file").c_str(), times, 0), 0);
-    std::filesystem::resize_file(folder / "folder/../file", 5);
-    ASSERT_EQ(utimensat(AT_FDCWD, (folder / "file").c_str(), times, 0), 0);
     const WIN32_FIND_DATAW file = entry_of(folder.wide(L"file"));
-    EXPECT_EQ(ticks(file.ftLastAccessTime), 116'444'735'990'000'007U);
-    EXPECT_EQ(ticks(file.ftLastWriteTime), 126'444'736'000'000'000U);
-    const std::uint64_t now =
-        116'444'736'000'000'000U +
-        static_cast<std::uint64_t>(std::chrono::duration_cast<std::chrono::nanoseconds>(
-                                       std::chrono::system_clock::now().time_since_epoch())
-                                       .count()) /
-            100;
-    EXPECT_LE(ticks(file.ftCreationTime), now) << "created here and now, whatever the other times say";
-    EXPECT_GT(ticks(file.ftCreationTime), now - 600'000'000U);
+    EXPECT_EQ(tick_count(file.ftLastAccessTime), 116'444'735'990'000'007);
+    EXPECT_EQ(tick_count(file.ftLastWriteTime), 126'444'736'000'000'000);
+    timespec clock = {};
+    clock_gettime(CLOCK_REALTIME, &clock);
+    const std::int64_t now = basalt::platform::ticks_of(clock);
+    EXPECT_LE(tick_count(file.ftCreationTime), now) << "created here and now, whatever the other times say";
+    EXPECT_GT(tick_count(file.ftCreationTime), now - 600'000'000);
     EXPECT_EQ(file.nFileSizeLow, 5U);
     ASSERT_EQ(truncate((folder / "file").c_str(), (off_t{3} << 32) + 7), 0);
     EXPECT_EQ(entry_of(folder.wide(L"file")).nFileSizeHigh, 3U);
@@ -191,22 +183,13 @@ TEST(FileSearch, every_failing_call_is_told_and_leaves_nothing_open) {
         const std::size_t expected = path.back() == L'*' ? 4 : 1;
         bool fails = true;
         for (int n = 1; fails; ++n) {
-            WIN32_FIND_DATAW entry = {};
             std::size_t count = 0;
-            DWORD error = 0;
             {
                 const SystemFailure failure(n, SystemFailure::Then::STAYS);
-                const HANDLE found = FindFirstFileW(path.c_str(), &entry);
-                bool goes_on = found != INVALID_HANDLE_VALUE;
-                while (goes_on) {
-                    ++count;
-                    goes_on = FindNextFileW(found, &entry) != 0;
-                }
-                error = GetLastError();
-                FindClose(found);
+                count = search(path).size();
                 fails = SystemFailure::struck();
             }
-            EXPECT_EQ(error == ERROR_NO_MORE_FILES && count == expected, !fails) << n;
+            EXPECT_EQ(GetLastError() == ERROR_NO_MORE_FILES && count == expected, !fails) << n;
             EXPECT_EQ(open_descriptors(), descriptors);
         }
     }
@@ -220,8 +203,7 @@ TEST(FileSearch, every_failing_call_is_told_and_leaves_nothing_open) {
         fails = SystemFailure::struck();
         EXPECT_TRUE(FindClose(found) == 0 || entry.dwFileAttributes == FILE_ATTRIBUTE_DIRECTORY) << n;
     }
-    EXPECT_EQ(FindNextFileW(nullptr, &entry), 0);
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
+    EXPECT_EQ(error_of(FindNextFileW(nullptr, &entry)), ERROR_INVALID_HANDLE);
     const HANDLE found = FindFirstFileW(folder.wide(L"*").c_str(), &entry);
     EXPECT_EQ(CloseHandle(found), 0) << "a search is no file";
     EXPECT_EQ(FindClose(found), 1);

@@ -74,23 +74,17 @@ TEST(VersionQuery, finds_values_by_their_path) {
 }
 
 TEST(VersionQuery, text_ends_at_its_terminator_or_where_its_length_says) {
-    const auto block_with = [](const Bytes& value, std::size_t claimed) {
+    const auto text_of = [](const Bytes& value, std::size_t claimed) {
         Bytes block = below_strings({{u"Key", value, true, {text_node(u"x", u"y")}}});
         put_word(block, FIRST_BELOW_STRINGS + 2, claimed);
-        return block;
+        return text_at(block, L"\\StringFileInfo\\Key");
     };
-    EXPECT_EQ(text_at(block_with(utf16(u"ab"), 2), L"\\StringFileInfo\\Key"), L"ab") << "no terminator";
-    EXPECT_EQ(text_at(block_with(utf16(u"abcd"), 3), L"\\StringFileInfo\\Key"), L"abc")
-        << "cut by its length";
-    EXPECT_EQ(text_at(block_with(utf16({u'a', u'b', 0, u'd'}), 4), L"\\StringFileInfo\\Key"), L"ab")
-        << "ends early";
-    EXPECT_EQ(text_at(block_with(utf16({u'a', u'b', 0, 0}), 0xFFFF), L"\\StringFileInfo\\Key"), L"ab")
-        << "claims too much";
+    EXPECT_EQ(text_of(utf16(u"ab"), 2), L"ab") << "no terminator";
+    EXPECT_EQ(text_of(utf16(u"abcd"), 3), L"abc") << "cut by its length";
+    EXPECT_EQ(text_of(utf16({u'a', u'b', 0, u'd'}), 4), L"ab") << "ends early";
+    EXPECT_EQ(text_of(utf16({u'a', u'b', 0, 0}), 0xFFFF), L"ab") << "claims too much";
     const Bytes halves = utf16({0xDC00, u'a', 0xD83C, u'b', 0xD83C});
-    EXPECT_EQ(wide_from_utf16(halves.data(), 5),
-              L"\xFFFD"
-              L"a\xFFFD"
-              L"b\xFFFD");
+    EXPECT_EQ(wide_from_utf16(halves.data(), 5), L"\uFFFDa\uFFFDb\uFFFD");
 }
 
 TEST(VersionQuery, length_of_a_text_that_says_it_is_none_is_in_units_all_the_same) {
@@ -188,13 +182,14 @@ TEST_F(VersionResourceFile, is_read_from_its_section) {
     const ProgramFile program(section);
     ASSERT_EQ(size_of(program), block.size());
     Bytes data(block.size() + 1, 0x55);
-    EXPECT_NE(GetFileVersionInfoW(path.wstring().c_str(), 0, static_cast<DWORD>(data.size()), data.data()),
-              0);
+    const auto read = [&](std::size_t room) {
+        return GetFileVersionInfoW(path.wstring().c_str(), 0, static_cast<DWORD>(room), data.data());
+    };
+    EXPECT_NE(read(data.size()), 0);
     EXPECT_EQ(data.back(), 0x55);
     data.pop_back();
     EXPECT_EQ(data, block);
-    EXPECT_EQ(
-        GetFileVersionInfoW(path.wstring().c_str(), 0, static_cast<DWORD>(block.size() - 1), data.data()), 0);
+    EXPECT_EQ(read(block.size() - 1), 0);
     EXPECT_EQ(GetLastError(), 122U);
 }
 

@@ -1,15 +1,16 @@
 #include "basalt/platform/error.h"
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <unistd.h>
 
 #include <array>
 #include <cerrno>
+#include <cstdio>
 #include <cstdlib>
 #include <cwchar>
 #include <string>
 #include <thread>
+#include <utility>
 
 #include "src/platform/error_from_errno.h"
 #include "src/platform/error_message.h"
@@ -30,23 +31,16 @@ std::wstring message_of(DWORD code) {
 // What a function writes to standard error.
 template <class Function>
 std::string standard_error_of(Function function) {
-    std::array<int, 2> ends{};
-    EXPECT_EQ(pipe(ends.data()), 0);
+    std::FILE* const file = std::tmpfile();
     const int kept = dup(STDERR_FILENO);
-    dup2(ends[1], STDERR_FILENO);
-    close(ends[1]);
-    std::string output;
-    std::thread reader([&] {
-        std::array<char, 512> bytes;
-        for (ssize_t n; (n = read(ends[0], bytes.data(), bytes.size())) > 0;) {
-            output.append(bytes.data(), static_cast<std::size_t>(n));
-        }
-    });
+    dup2(fileno(file), STDERR_FILENO);
     function();
     dup2(kept, STDERR_FILENO);
     close(kept);
-    reader.join();
-    close(ends[0]);
+    std::rewind(file);
+    std::string output(200'000, '\0');
+    output.resize(std::fread(output.data(), 1, output.size(), file));
+    std::fclose(file);
     return output;
 }
 
@@ -68,20 +62,15 @@ TEST(LastError, result_codes) {
 }
 
 TEST(LastError, from_errno) {
-    struct Row {
-        int number;
-        DWORD code;
-    };
+    using Row = std::pair<int, DWORD>;
     for (const auto& [number, code] :
-         {Row{0, 0},           Row{ENOENT, 2},         Row{ENOTDIR, 3},     Row{EMFILE, 4},
-          Row{ENFILE, 4},      Row{EACCES, 5},         Row{EPERM, 5},       Row{EBADF, 6},
-          Row{ENOMEM, 8},      Row{EEXIST, 80},        Row{EINVAL, 87},     Row{ENOSPC, 112},
-          Row{EDQUOT, 112},    Row{ENAMETOOLONG, 206}, Row{EAGAIN, 1450},   Row{-1, 31},
-          Row{99999, 31},      Row{EISDIR, 5},         Row{EXDEV, 17},      Row{EROFS, 19},
-          Row{ETXTBSY, 32},    Row{ENOSYS, 50},        Row{EOPNOTSUPP, 50}, Row{ENODEV, 55},
-          Row{ENXIO, 55},      Row{ENOTEMPTY, 145},    Row{EBUSY, 170},     Row{EFBIG, 223},
-          Row{EOVERFLOW, 534}, Row{EINTR, 995},        Row{EFAULT, 998},    Row{EILSEQ, 1113},
-          Row{EIO, 1117},      Row{ETIMEDOUT, 1460},   Row{ELOOP, 1921}}) {
+         {Row{0, 0},        {ENOENT, 2},    {ENOTDIR, 3},     {EMFILE, 4},         {ENFILE, 4},
+          {EACCES, 5},      {EPERM, 5},     {EBADF, 6},       {ENOMEM, 8},         {EEXIST, 80},
+          {EINVAL, 87},     {ENOSPC, 112},  {EDQUOT, 112},    {ENAMETOOLONG, 206}, {EAGAIN, 1450},
+          {-1, 31},         {99999, 31},    {EISDIR, 5},      {EXDEV, 17},         {EROFS, 19},
+          {ETXTBSY, 32},    {ENOSYS, 50},   {EOPNOTSUPP, 50}, {ENODEV, 55},        {ENXIO, 55},
+          {ENOTEMPTY, 145}, {EBUSY, 170},   {EFBIG, 223},     {EOVERFLOW, 534},    {EINTR, 995},
+          {EFAULT, 998},    {EILSEQ, 1113}, {EIO, 1117},      {ETIMEDOUT, 1460},   {ELOOP, 1921}}) {
         errno = number;
         basalt::platform::set_last_error_from_errno();
         EXPECT_EQ(GetLastError(), code) << number;

@@ -4,8 +4,8 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <filesystem>
 #include <fstream>
+#include <memory>
 #include <string>
 
 #include "tests/support/open_descriptors.h"
@@ -23,45 +23,25 @@ constexpr bool MAPPINGS_ARE_OURS = !__has_feature(address_sanitizer) && !__has_f
 constexpr bool MAPPINGS_ARE_OURS = true;
 #endif
 
-class Module {
-public:
-    Module() : m_handle(dlopen(LIBRARY, RTLD_NOW | RTLD_LOCAL)) {}
-    ~Module() {
-        if (m_handle != nullptr) {
-            dlclose(m_handle);
-        }
-    }
-    Module(const Module&) = delete;
-    Module& operator=(const Module&) = delete;
-
-    // A function by its mangled name.
-    template <class Function>
-    Function* get(const char* symbol) const {
-        return m_handle != nullptr ? reinterpret_cast<Function*>(dlsym(m_handle, symbol)) : nullptr;
-    }
-
-private:
-    void* m_handle;
+struct Unload {
+    void operator()(void* library) const { dlclose(library); }
 };
+using Module = std::unique_ptr<void, Unload>;
 
-bool is_loaded() {
-    void* const handle = dlopen(LIBRARY, RTLD_NOW | RTLD_NOLOAD);
-    if (handle != nullptr) {
-        dlclose(handle);
-    }
-    return handle != nullptr;
+Module load(int further_flags = 0) {
+    return Module(dlopen(LIBRARY, RTLD_NOW | RTLD_LOCAL | further_flags));
 }
 
-std::size_t mapped_kilobytes() {
-    std::ifstream status("/proc/self/status");
-    for (std::string word; status >> word;) {
-        if (word == "VmSize:") {
-            std::size_t kilobytes = 0;
-            status >> kilobytes;
-            return kilobytes;
-        }
-    }
-    return 0;
+// A function by its mangled name.
+template <class Function>
+Function* function_of(const Module& module, const char* symbol) {
+    return module != nullptr ? reinterpret_cast<Function*>(dlsym(module.get(), symbol)) : nullptr;
+}
+
+std::size_t mapped_pages() {
+    std::size_t pages = 0;
+    std::ifstream("/proc/self/statm") >> pages;
+    return pages;
 }
 
 std::size_t mappings() {
@@ -72,13 +52,13 @@ std::size_t mappings() {
 // One run of a host: settings are fresh, then changed; texts are converted (a first-use object); blocks of
 // the shared heap, small ones and one with a region of its own, are left behind for the unloading to release.
 void load_use_and_unload() {
-    const Module module;
-    auto* const language = module.get<std::uint32_t()>("_Z16_languageVersionv");
-    auto* const set_language = module.get<void(std::uint32_t)>("_Z19_setLanguageVersionj");
-    auto* const operating_system = module.get<std::uint32_t()>("_Z16_operatingsystemv");
-    auto* const last_error = module.get<std::uint32_t()>("_Z12GetLastErrorv");
-    auto* const allocate = module.get<void*(std::size_t)>("_ZN7vex_lib18vlSharedMemoryHeap5AllocEm");
-    auto* const construct_text = module.get<void(void*, const char*)>("_ZN7CStringC1EPKc");
+    const Module module = load();
+    auto* const language = function_of<std::uint32_t()>(module, "_Z16_languageVersionv");
+    auto* const set_language = function_of<void(std::uint32_t)>(module, "_Z19_setLanguageVersionj");
+    auto* const operating_system = function_of<std::uint32_t()>(module, "_Z16_operatingsystemv");
+    auto* const last_error = function_of<std::uint32_t()>(module, "_Z12GetLastErrorv");
+    auto* const allocate = function_of<void*(std::size_t)>(module, "_ZN7vex_lib18vlSharedMemoryHeap5AllocEm");
+    auto* const construct_text = function_of<void(void*, const char*)>(module, "_ZN7CStringC1EPKc");
     ASSERT_TRUE(language && set_language && operating_system && last_error && allocate && construct_text);
     ASSERT_EQ(language(), 15U);
     set_language(7);
@@ -96,7 +76,7 @@ void load_use_and_unload() {
 }
 
 struct Footprint {
-    std::size_t kilobytes = mapped_kilobytes();
+    std::size_t pages = mapped_pages();
     std::size_t maps = mappings();
     long descriptors = basalt::test::open_descriptors();
 };
@@ -110,12 +90,12 @@ TEST(ModuleLoad, a_thousand_loads_leave_nothing_behind) {
     }
     for (int round = 0; round < 1000; ++round) {
         load_use_and_unload();
-        ASSERT_FALSE(is_loaded()) << "round " << round;
+        ASSERT_EQ(load(RTLD_NOLOAD), nullptr) << "round " << round;
     }
     const Footprint after;
     EXPECT_EQ(after.descriptors, before.descriptors);
     if (MAPPINGS_ARE_OURS) {
-        EXPECT_EQ(after.kilobytes, before.kilobytes);
+        EXPECT_EQ(after.pages, before.pages);
         EXPECT_EQ(after.maps, before.maps);
     }
 }

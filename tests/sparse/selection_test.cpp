@@ -1,7 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <climits>
-#include <optional>
 #include <stdexcept>
 #include <vector>
 
@@ -10,65 +8,6 @@
 
 namespace vex_util::testing {
 namespace {
-
-TEST(Selection, WorksByWholeBlocks) {
-    Sparse2DArray array(8, 16, 64);
-    insert_value(array, 3, 3, 1);
-    insert_value(array, 20, 3, 2);
-    EXPECT_TRUE(select(array, 0, 0, 4, 4));
-    EXPECT_EQ(visit_selected(array), (std::vector<Visited>{{3, 3, 1}}));
-    EXPECT_TRUE(select(array, 15, 0, 16, 0));
-    EXPECT_EQ(visit_selected(array), (std::vector<Visited>{{3, 3, 1}, {20, 3, 2}}));
-}
-
-TEST(Selection, RowsAscendAndColumnsAscendWithinARow) {
-    for (const int side : {2, 4, 16, 32}) {
-        SCOPED_TRACE(side);
-        Sparse2DArray array(8, static_cast<std::size_t>(side), 7);
-        std::vector<Visited> expected;
-        for (int y = -side; y < 0; ++y) {
-            for (int x = side; x < 2 * side; ++x) {
-                if ((x * 7 + y * 3) % 4 != 0) {
-                    expected.push_back({x, y, static_cast<std::uint64_t>(expected.size())});
-                }
-            }
-        }
-        for (auto v = expected.rbegin(); v != expected.rend(); ++v) {
-            insert_value(array, v->x, v->y, v->value);
-        }
-        select(array, side, -1, side, -1);
-        EXPECT_EQ(visit_selected(array), expected);
-        EXPECT_EQ(visit_all(array), expected);
-    }
-}
-
-TEST(Selection, NothingFoundDropsTheOldSelectionAndLowersTheFlag) {
-    Sparse2DArray array(8, 16, 64);
-    EXPECT_FALSE(array.IsSelectionDirty());
-    EXPECT_TRUE(visit_selected(array).empty());
-    insert_value(array, 0, 0, 1);
-    EXPECT_TRUE(array.IsSelectionDirty());
-    EXPECT_TRUE(select(array, 0, 0, 0, 0));
-    EXPECT_FALSE(array.IsSelectionDirty());
-    array.SetSelectionDirty(true);
-    EXPECT_FALSE(select(array, 16, 0, 20, 20));
-    EXPECT_FALSE(array.IsSelectionDirty());
-    EXPECT_TRUE(visit_selected(array).empty());
-}
-
-TEST(Selection, OnlyNewBlocksRaiseTheFlag) {
-    Sparse2DArray array(8, 16, 64);
-    insert_value(array, 0, 0, 1);
-    select(array, 0, 0, 100, 100);
-    insert_value(array, 1, 0, 2);
-    array.Find(500, 500);
-    array.Remove(1, 0);
-    EXPECT_FALSE(array.IsSelectionDirty());
-    insert_value(array, 16, 0, 3);
-    EXPECT_TRUE(array.IsSelectionDirty());
-    EXPECT_EQ(visit_selected(array), (std::vector<Visited>{{0, 0, 1}}));
-    EXPECT_TRUE(array.IsSelectionDirty());
-}
 
 TEST(Visit, EndsWhenTheCallbackSaysSo) {
     Sparse2DArray array(8, 4, 64);

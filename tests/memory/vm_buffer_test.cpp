@@ -59,7 +59,6 @@ TEST(VmBuffer, resizes_exactly_downwards_and_by_the_step_upwards) {
 
     EXPECT_EQ(buffer.ReSize(0), nullptr);
     EXPECT_EQ(buffer.GetData(), nullptr);
-    EXPECT_EQ(buffer.ReSize(0), nullptr);
     EXPECT_EQ(requested_by(64), 128U) << "grows again from nothing";
 }
 

@@ -8,6 +8,7 @@
 #include "basalt/frame.h"
 #include "basalt/platform.h"
 #include "basalt/util.h"
+#include "src/platform/error_message.h"
 #include "tests/faults/trial.h"
 
 namespace basalt::faults {
@@ -113,6 +114,17 @@ void check_log() {
 }
 
 void check_programs() {
+    check("FormatMessageW", [](Trial& t) {
+        constexpr DWORD SYSTEM_TEXT = 0x1300;
+        wchar_t* text = nullptr;
+        const auto ask = [&] { return FormatMessageW(SYSTEM_TEXT, nullptr, 5, 0, &text, 0, nullptr) != 0; };
+        const bool told = t.attempt(ask);
+        t.expect(told ? text != nullptr : t.struck() && GetLastError() == ERROR_NOT_ENOUGH_MEMORY,
+                 "the text, or why there is none");
+        LocalFree(text);
+        t.expect(ask(), "the text afterwards");
+        LocalFree(text);
+    });
     check("MACAddressFromMIBTable::Create", [](Trial& t) {
         MACAddressFromMIBTable expected;
         expected.Create();

@@ -1,5 +1,6 @@
 #include "src/platform/file.h"
 
+#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
@@ -78,6 +79,22 @@ TEST(File, is_held_alone_and_deleted_on_close) {
     EXPECT_EQ(open_descriptors(), descriptors);
     EXPECT_EQ(CloseHandle(file), 0);
     EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
+}
+
+// A host that runs without a console may have no standard input.
+TEST(File, may_get_descriptor_0) {
+    const ScratchFolder folder;
+    const int input = dup(STDIN_FILENO);
+    close(STDIN_FILENO);
+    const HANDLE file = open(folder.wide(L"first"), CREATE_NEW, FILE_FLAG_DELETE_ON_CLOSE);
+    EXPECT_NE(file, INVALID_HANDLE_VALUE);
+    EXPECT_NE(fcntl(STDIN_FILENO, F_GETFD), -1) << "the lowest free number is the file's";
+    CloseHandle(file);
+    EXPECT_EQ(folder.names(), Names{});
+    if (input >= 0) {
+        dup2(input, STDIN_FILENO);
+        close(input);
+    }
 }
 
 TEST(File, without_delete_on_close_it_stays) {

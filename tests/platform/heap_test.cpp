@@ -362,6 +362,7 @@ TEST(Heap, ChunksComeInRisingOrderAndGoBackToTheSystem) {
     const Heap heap(0);
     SetLastError(ERROR_ACCESS_DENIED);
     EXPECT_EQ(error_of(HeapCompact(heap.handle, 0)), ERROR_SUCCESS) << "nothing was taken yet";
+    EXPECT_EQ(sound(heap.handle).largest_free, 0U);
     const std::vector<void*> chunks = take_many(heap, 2048, 20'000);
     std::size_t falls = 0;
     for (std::size_t i = 1; i < chunks.size(); ++i) {

@@ -2,6 +2,7 @@
 #include "src/platform/leaning_lock.h"
 
 #include <gtest/gtest.h>
+#include <linux/membarrier.h>
 #include <sys/syscall.h>
 
 #include <atomic>
@@ -20,6 +21,7 @@ using basalt::platform::Lock;
 
 constinit Lock before_any_constructor;
 std::atomic<bool> without_barrier{false};
+std::atomic<int> barriers{0};
 
 }  // namespace
 
@@ -38,6 +40,7 @@ long __wrap_syscall(long number, ...) {
         argument = va_arg(list, long);
     }
     va_end(list);
+    barriers += number == SYS_membarrier && a[0] == MEMBARRIER_CMD_PRIVATE_EXPEDITED ? 1 : 0;
     return __real_syscall(number, a[0], a[1], a[2], a[3], a[4], a[5]);
 }
 }
@@ -117,6 +120,7 @@ TEST_P(LockTest, EveryThreadCanBecomeTheFavouriteInTurn) {
     LeaningLock lock;
     long counter = 0;
     constexpr int THREADS = 8;  // more than a lock has favourites in its life
+    const int barriers_before = barriers;
     for (int i = 0; i < THREADS; ++i) {
         std::thread([&] {
             enter_alone(lock, LONG_RUN);
@@ -125,6 +129,7 @@ TEST_P(LockTest, EveryThreadCanBecomeTheFavouriteInTurn) {
         }).join();
     }
     EXPECT_EQ(counter, THREADS);
+    EXPECT_EQ(barriers > barriers_before, !GetParam()) << "no favour without one";
 }
 
 // The favourite sleeps inside while another thread comes; before that it calls once_inside.

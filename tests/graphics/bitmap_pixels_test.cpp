@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
-#include <cstdint>
+#include <algorithm>
+#include <cstring>
 #include <memory>
 #include <new>
 #include <random>
@@ -16,44 +17,27 @@ using vex_util::mfc::GetDIBits;
 
 using Pixels = std::unique_ptr<unsigned char[]>;
 
-constexpr int EVERY_DEPTH[] = {1, 4, 8, 16, 24, 32};
-
 TEST(BitmapPixels, AreTheStoredRowsTopFirstPaddedToFourBytes) {
     std::mt19937 random(81);
     SCOPED_TRACE("seed 81");
-    for (const int depth : EVERY_DEPTH) {
+    for (const int depth : drawing::DEPTHS) {
         for (const int width : {1, 2, 3, 7, 8, 9, 15, 16, 17, 31, 32, 33, 100}) {
             SCOPED_TRACE(testing::Message() << depth << " bits, width " << width);
-            const int height = 5;
-            const int bits = width * depth;
-            const int given_row = (bits + 15) / 16 * 2;  // rows come padded to 16 bits
-            const int row = (bits + 31) / 32 * 4;
-            std::vector<unsigned char> given(static_cast<std::size_t>(given_row * height));
-            for (unsigned char& byte : given) {
-                byte = static_cast<unsigned char>(random());
-            }
+            // Rows come padded to 16 bits, with anything in the padding.
+            std::vector<unsigned char> given(drawing::packed(Picture(width, 5), depth, 16).size());
+            std::generate(given.begin(), given.end(), [&] { return static_cast<unsigned char>(random()); });
             CBitmap bitmap;
-            ASSERT_NE(bitmap.CreateBitmap(width, height, 1, static_cast<UINT>(depth), given.data()), 0);
+            ASSERT_NE(bitmap.CreateBitmap(width, 5, 1, static_cast<UINT>(depth), given.data()), 0);
             BITMAPINFOHEADER header;
             const Pixels pixels(GetDIBits(bitmap, header));
             ASSERT_NE(pixels, nullptr);
-            EXPECT_EQ(header.biSize, 40U);
-            EXPECT_EQ(header.biWidth, width);
-            EXPECT_EQ(header.biHeight, -height);
-            EXPECT_EQ(header.biPlanes, 1);
-            EXPECT_EQ(header.biBitCount, depth);
-            EXPECT_EQ(header.biCompression, BI_RGB);
-            EXPECT_EQ(header.biSizeImage, static_cast<DWORD>(row * height));  // the platform's addition
-            EXPECT_EQ(header.biXPelsPerMeter | header.biYPelsPerMeter, 0);
-            EXPECT_EQ(header.biClrUsed | header.biClrImportant, 0U);
-            for (int y = 0; y < height; ++y) {
-                for (int bit = 0; bit < bits; ++bit) {
-                    const int mask = 0x80 >> bit % 8;
-                    ASSERT_EQ(pixels[static_cast<std::size_t>(y * row + bit / 8)] & mask,
-                              given[static_cast<std::size_t>(y * given_row + bit / 8)] & mask)
-                        << "row " << y << " bit " << bit;
-                }
-            }
+            drawing::DibHeader expected(width, -5, depth);
+            expected.header.biSizeImage =
+                static_cast<DWORD>((width * depth + 31) / 32 * 4 * 5);  // the platform's addition
+            EXPECT_EQ(std::memcmp(&header, &expected.header, sizeof header), 0);
+            const std::vector bytes(pixels.get(), pixels.get() + expected.header.biSizeImage);
+            EXPECT_EQ(drawing::unpacked(bytes, width, 5, depth, 32),
+                      drawing::unpacked(given, width, 5, depth, 16));
         }
     }
 }

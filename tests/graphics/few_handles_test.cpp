@@ -26,27 +26,22 @@ public:
     TakenHandles(const TakenHandles&) = delete;
     TakenHandles& operator=(const TakenHandles&) = delete;
 
+    // How many were left.
+    std::size_t take() {
+        const std::size_t before = m_brushes.size();
+        while (HBRUSH const brush = CreateSolidBrush(0)) {
+            m_brushes.push_back(brush);
+        }
+        return m_brushes.size() - before;
+    }
     void give_back(std::size_t count) {
         for (; count > 0; --count) {
             DeleteObject(m_brushes.back());
             m_brushes.pop_back();
         }
     }
-    // How many are left to others.
-    std::size_t left() {
-        const std::size_t before = m_brushes.size();
-        take();
-        const std::size_t count = m_brushes.size() - before;
-        give_back(count);
-        return count;
-    }
 
 private:
-    void take() {
-        while (HBRUSH const brush = CreateSolidBrush(0)) {
-            m_brushes.push_back(brush);
-        }
-    }
     std::vector<HBRUSH> m_brushes;
 };
 
@@ -66,31 +61,31 @@ protected:
         Picture after = source_picture();
         after.at(3, 4) = 0x112233;
         m_dest.put(before);
-        _transparentblt(m_dest.dc(), 0, 0, 0, 0, m_source.dc(), 0, 0, 12, 12, MASK_KEY);
+        _transparentblt(m_dest, 0, 0, 0, 0, m_source, 0, 0, 12, 12, MASK_KEY);
         expect_same(m_dest.picture(), possible ? after : before);
     }
     void expect_gradient(bool rounded) {
         const StoredOsCode os(NT);
         m_dest.put(Picture(12, 12, 0));
-        _gradientfill(m_dest.dc(), 0, 0, 12, 12, 6, 0xFFFFFF, 0x336699, 1.0F, 0);
-        EXPECT_EQ(GetPixel(m_dest.dc(), 0, 0), rounded ? 0xFFFFFFU : 0x336699U);
-        EXPECT_EQ(GetPixel(m_dest.dc(), 6, 6), 0x336699U);
+        _gradientfill(m_dest, 0, 0, 12, 12, 6, 0xFFFFFF, 0x336699, 1.0F, 0);
+        EXPECT_EQ(GetPixel(m_dest, 0, 0), rounded ? 0xFFFFFFU : 0x336699U);
+        EXPECT_EQ(GetPixel(m_dest, 6, 6), 0x336699U);
     }
     void expect_turned(bool possible) {
         const Picture before = source_picture();
         Picture after(12, 12, 0x445566);
         after.at(8, 7) = MASK_KEY;
         m_dest.put(before);
-        EXPECT_EQ(RotateBitmap(&m_source.context(), &m_dest.bitmap(), 180.0F), possible);
+        EXPECT_EQ(RotateBitmap(&m_source.context(), &m_dest.free_bitmap(), 180.0F), possible);
         expect_same(m_dest.picture(), possible ? after : before);
     }
     void expect_read(bool possible) {
         BITMAPINFOHEADER header;
-        const std::unique_ptr<unsigned char[]> pixels(GetDIBits(m_dest.bitmap(), header));
+        const std::unique_ptr<unsigned char[]> pixels(GetDIBits(m_dest.free_bitmap(), header));
         EXPECT_EQ(pixels != nullptr, possible);
         EXPECT_EQ(header.biWidth, 12);
         CRgn region;
-        EXPECT_EQ(RegionFromBitmap(region, m_dest.bitmap(), MASK_KEY), possible);
+        EXPECT_EQ(RegionFromBitmap(region, m_dest.free_bitmap(), MASK_KEY), possible);
         EXPECT_EQ(region.GetSafeHandle() != nullptr, possible);
         m_dest.select();
     }
@@ -110,8 +105,8 @@ TEST_F(FewHandles, AreEnoughOrNothingIsHalfDoneAndAllComeBack) {
             expect_turned(left >= ROTATION_NEEDS);
             expect_read(left >= 1);
         }
-        EXPECT_EQ(taken.left(), left);
-        taken.give_back(1);
+        EXPECT_EQ(taken.take(), left);
+        taken.give_back(left + 1);
     }
 }
 

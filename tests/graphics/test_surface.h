@@ -4,15 +4,12 @@
 
 #include <gtest/gtest.h>
 
-#include <cstddef>
-#include <cstdint>
 #include <random>
 #include <vector>
 
 #include "basalt/graphics.h"
-#include "basalt/platform/drawing.h"
 #include "src/frame/environment_state.h"
-
+#include "tests/support/drawing.h"
 #include "tests/support/with_failing_allocations.h"
 
 namespace basalt::test {
@@ -32,20 +29,7 @@ private:
     int m_before = static_cast<int>(frame::environment.os_code.load());
 };
 
-struct Picture {
-    int width;
-    int height;
-    std::vector<COLORREF> pixels;
-
-    Picture(int w, int h, COLORREF colour = 0)
-        : width(w), height(h), pixels(static_cast<std::size_t>(w) * static_cast<std::size_t>(h), colour) {}
-    bool has(int x, int y) const { return x >= 0 && x < width && y >= 0 && y < height; }
-    COLORREF& at(int x, int y) {
-        return pixels[static_cast<std::size_t>(y) * static_cast<std::size_t>(width) +
-                      static_cast<std::size_t>(x)];
-    }
-    COLORREF at(int x, int y) const { return const_cast<Picture*>(this)->at(x, y); }
-};
+using drawing::Picture;
 
 // Colours drawn from a few, so that any one of them is common.
 inline Picture random_picture(std::mt19937& random, int width, int height,
@@ -57,65 +41,42 @@ inline Picture random_picture(std::mt19937& random, int width, int height,
     return picture;
 }
 
-// A bitmap in a memory context.
-class TestSurface {
+inline int between(std::mt19937& random, int low, int high) {
+    return low + static_cast<int>(random() % static_cast<unsigned>(high - low + 1));
+}
+
+// A canvas whose picture holds colours.
+class TestSurface : public drawing::Canvas {
 public:
-    TestSurface(int width, int height, int depth = 32) : m_width(width), m_height(height) {
-        m_bitmap.CreateBitmap(width, height, 1, static_cast<UINT>(depth), nullptr);
-        m_dc.CreateCompatibleDC(nullptr);
-        m_before = m_dc.SelectObject(&m_bitmap);
-        EXPECT_NE(m_before, nullptr);
-    }
-    explicit TestSurface(const Picture& picture, int depth = 32)
-        : TestSurface(picture.width, picture.height, depth) {
+    TestSurface(int its_width, int its_height, int its_depth = 32)
+        : Canvas(its_width, its_height, its_depth) {}
+    explicit TestSurface(const Picture& picture, int its_depth = 32)
+        : Canvas(picture.width, picture.height, its_depth) {
         put(picture);
     }
-    ~TestSurface() { deselect(); }
-    TestSurface(const TestSurface&) = delete;
-    TestSurface& operator=(const TestSurface&) = delete;
-
-    HDC dc() const { return m_dc; }
-    CDC& context() { return m_dc; }
+    CDC& context() { return *CDC::FromHandle(*this); }
     // The bitmap, free of the context.
-    CBitmap& bitmap() {
+    CBitmap& free_bitmap() {
         deselect();
-        return m_bitmap;
+        return *CBitmap::FromHandle(bitmap());
     }
-    void select() { m_before = m_dc.SelectObject(&m_bitmap); }
-
     void put(const Picture& picture) {
-        for (int y = 0; y < m_height; ++y) {
-            for (int x = 0; x < m_width; ++x) {
-                SetPixel(m_dc, x, y, picture.at(x, y));
+        for (int y = 0; y < height; ++y) {
+            for (int x = 0; x < width; ++x) {
+                SetPixel(*this, x, y, picture.at(x, y));
             }
         }
     }
     Picture picture() {
-        if (m_before == nullptr) {
-            select();
-        }
-        Picture picture(m_width, m_height);
-        for (int y = 0; y < m_height; ++y) {
-            for (int x = 0; x < m_width; ++x) {
-                picture.at(x, y) = GetPixel(m_dc, x, y);
+        select();
+        Picture picture(width, height);
+        for (int y = 0; y < height; ++y) {
+            for (int x = 0; x < width; ++x) {
+                picture.at(x, y) = GetPixel(*this, x, y);
             }
         }
         return picture;
     }
-
-private:
-    void deselect() {
-        if (m_before != nullptr) {
-            m_dc.SelectObject(m_before);
-            m_before = nullptr;
-        }
-    }
-
-    int m_width;
-    int m_height;
-    CBitmap m_bitmap;
-    CDC m_dc;
-    CBitmap* m_before = nullptr;
 };
 
 inline void expect_same(const Picture& actual, const Picture& expected) {

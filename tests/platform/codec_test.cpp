@@ -6,7 +6,7 @@
 #include <filesystem>
 #include <string>
 
-#include "tests/platform/drawing_support.h"
+#include "tests/support/drawing.h"
 #include "tests/support/failing_new.h"
 #include "tests/support/scratch_folder.h"
 

@@ -3,7 +3,7 @@
 
 #include <climits>
 
-#include "tests/platform/drawing_support.h"
+#include "tests/support/drawing.h"
 
 namespace {
 
@@ -24,29 +24,23 @@ TEST(DibRows, ComeAsStoredInEitherOrder) {
             const Canvas canvas(picture, depth);
             for (const bool top_first : {false, true}) {
                 SCOPED_TRACE(testing::Message() << depth << " bits, width " << width << ", " << top_first);
-                DibHeader dib(width, top_first ? -5 : 5, depth);
-                std::vector<unsigned char> bytes = room_for(width, 5, depth);
-                // The middle rows, and then more than there are.
-                EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), 1, 2, bytes.data(), dib.info(), DIB_RGB_COLORS),
-                          2);
-                EXPECT_EQ(dib.header.biSizeImage, static_cast<DWORD>(bytes.size() / 5 * 2));
-                EXPECT_EQ(bytes[bytes.size() / 5 * 2], 0xA5);
-                Picture rows = drawing::unpacked(bytes, width, 2, depth, 32);
-                for (int y = 0; y < 2; ++y) {
-                    for (int x = 0; x < width; ++x) {
-                        EXPECT_EQ(rows.at(x, y), picture.at(x, top_first ? 1 + y : 3 - y));
-                    }
-                }
-                EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), 3, UINT_MAX, bytes.data(), dib.info(), 0), 2);
-                EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), 0, 5, bytes.data(), dib.info(), 0), 5);
-                Picture padded = picture;
-                if (!top_first) {
-                    for (int y = 0; y < 5; ++y) {
-                        std::copy_n(&picture.values[static_cast<std::size_t>((4 - y) * width)], width,
-                                    &padded.values[static_cast<std::size_t>(y * width)]);
-                    }
-                }
-                EXPECT_EQ(bytes, drawing::packed(padded, depth, 32)) << "with zeros in the padding";
+                const std::vector<unsigned char> all =
+                    drawing::packed(top_first ? picture : drawing::upside_down(picture), depth, 32);
+                const std::size_t row = all.size() / 5;
+                const auto expect_rows = [&](UINT first, UINT asked, int there) {
+                    DibHeader dib(width, top_first ? -5 : 5, depth);
+                    std::vector<unsigned char> bytes = room_for(width, 5, depth);
+                    std::vector<unsigned char> expected = bytes;
+                    const std::size_t size = row * static_cast<std::size_t>(there);
+                    std::copy_n(&all[row * first], size, expected.data());
+                    EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), first, asked, bytes.data(), dib.info(), 0),
+                              there);
+                    EXPECT_EQ(bytes, expected) << "with zeros in the padding";
+                    EXPECT_EQ(dib.header.biSizeImage, size);
+                };
+                expect_rows(1, 2, 2);
+                expect_rows(3, UINT_MAX, 2);
+                expect_rows(0, 5, 5);
             }
         }
     }
@@ -63,21 +57,16 @@ TEST(DibRows, BringATableWithThemAndColoursToAnotherDepth) {
             dib.table[0] = {1, 2, 3, 4};
             std::vector<unsigned char> bytes = room_for(21, 3, to);
             EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), 0, 3, bytes.data(), dib.info(), DIB_RGB_COLORS), 3);
-            const Picture values = drawing::unpacked(bytes, 21, 3, to, 32);
             const Canvas model(21, 3, to);
             for (int i = 0; i < 63; ++i) {
-                const COLORREF nearest = SetPixel(model, i % 21, i / 21, GetPixel(canvas, i % 21, i / 21));
-                const std::uint32_t value = values.at(i % 21, i / 21);
-                COLORREF colour = drawing::swapped(value & 0xFFFFFF);
-                if (to <= 8) {
-                    const RGBQUAD& entry = dib.table[value];
-                    colour = RGB(entry.rgbRed, entry.rgbGreen, entry.rgbBlue);
-                    EXPECT_EQ(entry.rgbReserved, 0);
-                } else if (to == 16) {
-                    const Canvas code(Picture(1, 1, value), 16);
-                    colour = GetPixel(code, 0, 0);
-                }
-                EXPECT_EQ(colour, nearest);
+                SetPixel(model, i % 21, i / 21, GetPixel(canvas, i % 21, i / 21));
+            }
+            EXPECT_EQ(drawing::unpacked(bytes, 21, 3, to, 32), (from == to ? canvas : model).picture());
+            for (std::uint32_t value = 0; to <= 8 && value < 1U << to; ++value) {
+                const RGBQUAD& entry = dib.table[value];
+                EXPECT_EQ(RGB(entry.rgbRed, entry.rgbGreen, entry.rgbBlue),
+                          GetPixel(Canvas(Picture(1, 1, value), to), 0, 0));
+                EXPECT_EQ(entry.rgbReserved, 0);
             }
             EXPECT_EQ(dib.table[0].rgbBlue, to <= 8 ? 0 : 1) << "a table is written at 8 bits and fewer";
         }
@@ -116,20 +105,16 @@ TEST(DibRows, RefuseAHeaderThatDoesNotFit) {
     EXPECT_EQ(get(good), 2);
     EXPECT_EQ(get(good, 2), 0);
     EXPECT_EQ(get(good, 0, 1), 0);
-    for (const DibHeader& bad : {DibHeader(4, 2, 32), DibHeader(3, 3, 32), DibHeader(3, INT_MIN, 32),
-                                 DibHeader(3, 2, 2), DibHeader(-3, 2, 32), DibHeader(3, 2, 0)}) {
+    DibHeader compressed = good, planeless = good, other = good;
+    compressed.header.biCompression = 3;
+    planeless.header.biPlanes = 0;
+    other.header.biSize = 12;
+    for (const DibHeader& bad :
+         {DibHeader(4, 2, 32), DibHeader(3, 3, 32), DibHeader(3, INT_MIN, 32), DibHeader(3, 2, 2),
+          DibHeader(-3, 2, 32), DibHeader(3, 2, 0), compressed, planeless, other}) {
         EXPECT_EQ(get(bad), 0);
         EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
     }
-    DibHeader odd = good;
-    odd.header.biCompression = 3;
-    EXPECT_EQ(get(odd), 0);
-    odd = good;
-    odd.header.biPlanes = 0;
-    EXPECT_EQ(get(odd), 0);
-    odd = good;
-    odd.header.biSize = 12;
-    EXPECT_EQ(get(odd), 0);
     EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), 0, 2, bits, nullptr, DIB_RGB_COLORS), 0);
     DibHeader question(0, 0, 0);
     EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), 0, 0, nullptr, question.info(), DIB_RGB_COLORS), 1);

@@ -2,42 +2,47 @@
 // transforms.
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <climits>
 #include <cmath>
-#include <numbers>
+#include <utility>
 
 #include "src/platform/row_kernels.h"
-#include "tests/platform/drawing_support.h"
+#include "tests/support/drawing.h"
 
 namespace {
 
 using drawing::all_ones;
 using drawing::Canvas;
 using drawing::Picture;
+using drawing::Stretch;
 
 constexpr COLORREF TEXT = 0x0000FF;
 constexpr COLORREF BACKGROUND = 0x00FF00;
+constexpr COLORREF SOURCE_BACKGROUND = 0xFF0000;
 
-/// What a source value arrives as, by the rules for monochrome; other depths meet their equals only.
-std::uint32_t arriving(std::uint32_t value, int from, int to) {
-    if (from == to) {
-        return value;
+/// What a source's values arrive as: the nearest colours', but by the rules for monochrome from and to one
+/// bit.
+Picture arriving(Picture picture, int from, int to) {
+    for (std::uint32_t& value : picture.pixels) {
+        const Canvas source(Picture(1, 1, value), from);
+        const Canvas target(1, 1, to);
+        const COLORREF colour = GetPixel(source, 0, 0);
+        SetPixel(target, 0, 0, from > 1 ? colour : value != 0 ? BACKGROUND : TEXT);
+        if (from != to && to > 1) {
+            value = target.picture().at(0, 0);
+        } else if (from != to) {
+            value = colour == SetPixel(source, 0, 0, SOURCE_BACKGROUND) ? 1 : 0;
+        }
     }
-    const auto stored = [](COLORREF colour, int depth) {
-        const Canvas canvas(1, 1, depth);
-        SetPixel(canvas, 0, 0, colour);
-        return canvas.picture().at(0, 0);
-    };
-    if (from == 1) {
-        return stored(value != 0 ? BACKGROUND : TEXT, to);
-    }
-    const std::uint32_t telling = from == 32 ? 0xFFFFFF : from == 16 ? 0x7FFF : all_ones(from);
-    return (value & telling) == stored(BACKGROUND, from) ? 1 : 0;
+    return picture;
 }
 
 struct Block {
     int x, y, width, height, source_x, source_y;
+
+    BOOL copy(HDC to, HDC from, DWORD rop) const {
+        return BitBlt(to, x, y, width, height, from, source_x, source_y, rop);
+    }
 };
 
 constexpr Block BLOCKS[] = {
@@ -69,8 +74,9 @@ std::uint32_t combined(DWORD rop, std::uint32_t brush, std::uint32_t source, std
     return result;
 }
 
-Picture expected_copy(const Picture& to, int to_depth, const Picture& from, int from_depth,
-                      const Block& block, DWORD rop, std::uint32_t brush) {
+/// Copies from a picture of what the source's values arrive as.
+Picture expected_copy(const Picture& to, int depth, const Picture& arrived, const Block& block, DWORD rop,
+                      std::uint32_t brush) {
     Picture result = to;
     for (int y = 0; y < to.height; ++y) {
         for (int x = 0; x < to.width; ++x) {
@@ -78,9 +84,9 @@ Picture expected_copy(const Picture& to, int to_depth, const Picture& from, int 
             const std::int64_t j = std::int64_t{y} - block.y;
             const std::int64_t source_x = block.source_x + i;
             const std::int64_t source_y = block.source_y + j;
-            if (i >= 0 && j >= 0 && i < block.width && j < block.height && from.has(source_x, source_y)) {
-                const std::uint32_t source = arriving(from.at(source_x, source_y), from_depth, to_depth);
-                result.at(x, y) = combined(rop, brush, source, to.at(x, y)) & all_ones(to_depth);
+            if (i >= 0 && j >= 0 && i < block.width && j < block.height && arrived.has(source_x, source_y)) {
+                result.at(x, y) =
+                    combined(rop, brush, arrived.at(source_x, source_y), to.at(x, y)) & all_ones(depth);
             }
         }
     }
@@ -93,17 +99,13 @@ TEST(BlockCopy, CombinesStoredValuesAtEveryDepthAndPlace) {
     const DWORD operations[] = {SRCCOPY, SRCAND, SRCPAINT, NOTSRCCOPY, SRCINVERT, 0x00B8074A};
     for (const int from_depth : drawing::DEPTHS) {
         for (const int to_depth : drawing::DEPTHS) {
-            if (from_depth != to_depth && from_depth != 1 && to_depth != 1) {
-                continue;
-            }
             const Picture to = drawing::random_picture(23, 9, to_depth, random);
-            Picture from = drawing::random_picture(24, 9, from_depth, random);
-            const Canvas source(from, from_depth);
+            const Canvas source(drawing::random_picture(24, 9, from_depth, random), from_depth);
             for (const int x : {2, 7, 8}) {
-                SetPixel(source, x, 3, BACKGROUND);
+                SetPixel(source, x, 3, SOURCE_BACKGROUND);
             }
-            from = source.picture();
-            SetBkColor(source, BACKGROUND);
+            const Picture arrived = arriving(source.picture(), from_depth, to_depth);
+            SetBkColor(source, SOURCE_BACKGROUND);
             for (const Block& block : BLOCKS) {
                 const DWORD rop = operations[random() % 6];
                 SCOPED_TRACE(testing::Message() << from_depth << " to " << to_depth << " bits, at " << block.x
@@ -111,31 +113,10 @@ TEST(BlockCopy, CombinesStoredValuesAtEveryDepthAndPlace) {
                 const Canvas canvas(to, to_depth);
                 SetTextColor(canvas, TEXT);
                 SetBkColor(canvas, BACKGROUND);
-                // A new context's brush is white; 32 bits store that with the high byte 0.
-                const std::uint32_t white = to_depth == 16 ? 0x7FFF : all_ones(to_depth) & 0xFFFFFF;
-                EXPECT_NE(BitBlt(canvas, block.x, block.y, block.width, block.height, source, block.source_x,
-                                 block.source_y, rop),
-                          0);
-                EXPECT_EQ(canvas.picture(), expected_copy(to, to_depth, from, from_depth, block, rop, white));
-            }
-        }
-    }
-}
-
-TEST(BlockCopy, BringsColoursToTheNearestOfAnotherDepth) {
-    std::mt19937 random(12);
-    SCOPED_TRACE("seed 12");
-    for (const int from_depth : {4, 8, 16, 24, 32}) {
-        for (const int to_depth : {4, 8, 16, 24, 32}) {
-            const Picture from = drawing::random_picture(9, 4, from_depth, random);
-            const Canvas source(from, from_depth);
-            const Canvas canvas(9, 4, to_depth);
-            const Canvas model(9, 4, to_depth);
-            EXPECT_NE(BitBlt(canvas, 0, 0, 9, 4, source, 0, 0, SRCCOPY), 0);
-            for (int i = 0; i < 36; ++i) {
-                SetPixel(model, i % 9, i / 9, GetPixel(source, i % 9, i / 9));
-                EXPECT_EQ(GetPixel(canvas, i % 9, i / 9), GetPixel(model, i % 9, i / 9))
-                    << from_depth << " to " << to_depth;
+                EXPECT_NE(block.copy(canvas, source, rop), 0);
+                // A new context's brush is white.
+                EXPECT_EQ(canvas.picture(),
+                          expected_copy(to, to_depth, arrived, block, rop, drawing::white(to_depth)));
             }
         }
     }
@@ -151,64 +132,36 @@ TEST(BlockCopy, OntoItsOwnSurfaceReadsBeforeItWrites) {
                  {Block{1, 0, 1499, 6, 0, 0}, Block{0, 0, 1499, 6, 1, 0}, Block{3, 2, 1490, 4, 0, 0},
                   Block{0, 0, 1490, 4, 3, 2}, Block{0, 1, 1490, 4, 3, 0}, Block{600, 0, 900, 6, 0, 0}}) {
                 const Canvas canvas(before, depth);
-                EXPECT_NE(BitBlt(canvas, block.x, block.y, block.width, block.height, canvas, block.source_x,
-                                 block.source_y, rop),
-                          0);
-                EXPECT_EQ(canvas.picture(), expected_copy(before, depth, before, depth, block, rop, 0))
+                EXPECT_NE(block.copy(canvas, canvas, rop), 0);
+                EXPECT_EQ(canvas.picture(), expected_copy(before, depth, before, block, rop, 0))
                     << depth << " bits, from " << block.source_x << " to " << block.x;
             }
         }
     }
 }
 
-TEST(BlockCopy, WithoutASourceTakesBrushAndDestination) {
-    const Canvas canvas(Picture(5, 1, 0x00F0F0F0), 32);
-    HBRUSH const brush = CreateSolidBrush(0x332211);
-    HGDIOBJ const replaced = SelectObject(canvas, brush);
-    EXPECT_NE(BitBlt(canvas, 0, 0, 1, 1, nullptr, 0, 0, PATCOPY), 0);
-    EXPECT_NE(BitBlt(canvas, 1, 0, 1, 1, nullptr, 0, 0, DSTINVERT), 0);
-    EXPECT_NE(BitBlt(canvas, 2, 0, 1, 1, nullptr, 0, 0, BLACKNESS), 0);
-    EXPECT_NE(BitBlt(canvas, 3, 0, 1, 9, nullptr, 0, 0, WHITENESS), 0);
-    SelectObject(canvas, GetStockObject(NULL_BRUSH));
-    EXPECT_NE(BitBlt(canvas, 4, 0, 1, 1, nullptr, 0, 0, PATCOPY), 0);
-    SelectObject(canvas, replaced);
-    EXPECT_NE(DeleteObject(brush), 0);
-    EXPECT_EQ(canvas.picture().values,
-              (std::vector<std::uint32_t>{0x112233, 0xFF0F0F0F, 0, 0xFFFFFFFF, 0x00F0F0F0}));
-}
-
 // A brush that draws nothing keeps back every operation that its values would decide, and no other.
-TEST(BlockCopy, WithoutABrushMakesWhatNeedsNone) {
+TEST(BlockCopy, MakesEveryOperationAndAsksForNoSourceWithoutNeed) {
     constexpr std::uint32_t TO = 0x00CC5533;
     constexpr std::uint32_t FROM = 0x00AA330F;
     const Canvas source(Picture(1, 1, FROM), 32);
+    HBRUSH const brush = CreateSolidBrush(0x332211);
     for (DWORD number = 0; number < 256; ++number) {
-        const Canvas canvas(Picture(1, 1, TO), 32);
-        SelectObject(canvas, GetStockObject(NULL_BRUSH));
         const DWORD rop = number << 16;
-        EXPECT_NE(BitBlt(canvas, 0, 0, 1, 1, source, 0, 0, rop), 0);
-        const bool is_kept_back = (number >> 4) != (number & 0xF);
-        EXPECT_EQ(canvas.picture().at(0, 0), is_kept_back ? TO : combined(rop, 0, FROM, TO)) << number;
-    }
-}
-
-TEST(BlockCopy, WithoutASourceFillsTheTransformedBoxAlone) {
-    const Canvas canvas(Picture(20, 6, 7), 32);
-    const XFORM twice = {2, 0, 0, 2, 0, 0};
-    SetGraphicsMode(canvas, GM_ADVANCED);
-    SetWorldTransform(canvas, &twice);
-    EXPECT_NE(BitBlt(canvas, 2, 1, 3, 1, nullptr, 0, 0, BLACKNESS), 0);
-    const Picture picture = canvas.picture();
-    for (int y = 0; y < picture.height; ++y) {
-        for (int x = 0; x < picture.width; ++x) {
-            EXPECT_EQ(picture.at(x, y), x >= 4 && x < 10 && (y == 2 || y == 3) ? 0U : 7U) << x << ' ' << y;
+        const bool needs_brush = (number >> 4) != (number & 0xF);
+        const bool needs_source = (number >> 2 & 0x33) != (number & 0x33);
+        for (HGDIOBJ const selected : {HGDIOBJ{brush}, GetStockObject(NULL_BRUSH)}) {
+            const Canvas canvas(Picture(1, 1, TO), 32);
+            HGDIOBJ const replaced = SelectObject(canvas, selected);
+            EXPECT_NE(BitBlt(canvas, 0, 0, 1, 9, needs_source ? HDC{source} : nullptr, 0, 0, rop), 0);
+            SelectObject(canvas, replaced);
+            EXPECT_EQ(canvas.picture().at(0, 0),
+                      needs_brush && selected != brush ? TO : combined(rop, 0x112233, FROM, TO))
+                << number;
         }
     }
+    EXPECT_NE(DeleteObject(brush), 0);
 }
-
-struct Stretch {
-    int x, y, width, height, source_x, source_y, source_width, source_height;
-};
 
 TEST(TransparentCopy, LeavesOneColourOutAtEveryDepthAndSize) {
     const Stretch stretches[] = {{0, 0, 23, 9, 0, 0, 23, 9},
@@ -225,113 +178,70 @@ TEST(TransparentCopy, LeavesOneColourOutAtEveryDepthAndSize) {
                                  {-1000, -1000, INT_MAX, 2000, 0, 0, INT_MAX, 9}};
     std::mt19937 random(14);
     SCOPED_TRACE("seed 14");
-    for (const int depth : drawing::DEPTHS) {
-        Picture from = drawing::random_picture(23, 9, depth, random);
-        const Canvas source(from, depth);
+    for (const int from_depth : drawing::DEPTHS) {
+        const Canvas source(drawing::random_picture(23, 9, from_depth, random), from_depth);
         const COLORREF key = GetPixel(source, 4, 4);
         for (int i = 0; i < 80; ++i) {
-            const auto x = static_cast<int>(random() % 23);
-            const auto y = static_cast<int>(random() % 9);
-            SetPixel(source, x, y, key);
-            if (depth == 32) {
-                from = source.picture();
-            }
+            SetPixel(source, static_cast<int>(random() % 23), static_cast<int>(random() % 9), key);
         }
-        from = source.picture();
-        for (const Stretch& s : stretches) {
-            const Picture to = drawing::random_picture(23, 9, depth, random);
-            const Canvas canvas(to, depth);
-            EXPECT_NE(TransparentBlt(canvas, s.x, s.y, s.width, s.height, source, s.source_x, s.source_y,
-                                     s.source_width, s.source_height, key),
-                      0);
-            Picture expected = to;
-            for (int y = 0; y < to.height; ++y) {
-                for (int x = 0; x < to.width; ++x) {
-                    const std::int64_t i = std::int64_t{x} - s.x;
-                    const std::int64_t j = std::int64_t{y} - s.y;
-                    if (i < 0 || j < 0 || i >= s.width || j >= s.height || s.source_width == 0 ||
-                        s.source_height == 0) {
-                        continue;
-                    }
-                    const std::int64_t source_x = s.source_x + (2 * i + 1) * s.source_width / (2LL * s.width);
-                    const std::int64_t source_y =
-                        s.source_y + (2 * j + 1) * s.source_height / (2LL * s.height);
-                    if (from.has(source_x, source_y) &&
-                        GetPixel(source, static_cast<int>(source_x), static_cast<int>(source_y)) != key) {
-                        expected.at(x, y) = from.at(source_x, source_y);
+        SetBkColor(source, SOURCE_BACKGROUND);
+        const Picture from = source.picture();
+        for (const int depth : drawing::DEPTHS) {
+            const Picture arrived = arriving(from, from_depth, depth);
+            for (const Stretch& s : stretches) {
+                // Onto a copy of the source from itself, and onto another surface.
+                const bool onto_itself = from_depth == depth && random() % 2 == 0;
+                const Picture to = onto_itself ? from : drawing::random_picture(23, 9, depth, random);
+                const Canvas canvas(to, depth);
+                SetTextColor(canvas, TEXT);
+                SetBkColor(canvas, BACKGROUND);
+                EXPECT_NE(TransparentBlt(canvas, s.x, s.y, s.width, s.height,
+                                         onto_itself ? HDC{canvas} : HDC{source}, s.source_x, s.source_y,
+                                         s.source_width, s.source_height, key | 0xFF000000),
+                          0);
+                Picture expected = to;
+                for (int y = 0; y < to.height; ++y) {
+                    for (int x = 0; x < to.width; ++x) {
+                        const std::int64_t i = std::int64_t{x} - s.x;
+                        const std::int64_t j = std::int64_t{y} - s.y;
+                        if (i < 0 || j < 0 || i >= s.width || j >= s.height) {
+                            continue;
+                        }
+                        const std::int64_t column =
+                            s.source_x + (2 * i + 1) * s.source_width / (2LL * s.width);
+                        const std::int64_t row =
+                            s.source_y + (2 * j + 1) * s.source_height / (2LL * s.height);
+                        if (s.source_width > 0 && s.source_height > 0 && from.has(column, row) &&
+                            GetPixel(source, static_cast<int>(column), static_cast<int>(row)) != key) {
+                            expected.at(x, y) = arrived.at(column, row);
+                        }
                     }
                 }
+                EXPECT_EQ(canvas.picture(), expected) << from_depth << " to " << depth << " bits, to " << s.x
+                                                      << ' ' << s.width << ", " << onto_itself;
             }
-            EXPECT_EQ(canvas.picture(), expected) << depth << " bits, to " << s.x << ' ' << s.width;
         }
         EXPECT_EQ(TransparentBlt(source, 0, 0, -1, 1, source, 0, 0, 1, 1, key), 0);
         EXPECT_EQ(TransparentBlt(source, 0, 0, 1, 1, source, 0, 0, 1, -1, key), 0);
     }
 }
 
-TEST(TransparentCopy, ComparesColoursNotTheUnusedByte) {
-    Picture from(2, 1);
-    from.at(0, 0) = 0xAA112233;
-    from.at(1, 0) = 0xAA112234;
-    const Canvas source(from, 32);
-    const Canvas canvas(Picture(2, 1, 7), 32);
-    EXPECT_NE(TransparentBlt(canvas, 0, 0, 2, 1, source, 0, 0, 2, 1, 0xFF332211), 0);
-    EXPECT_EQ(canvas.picture().values, (std::vector<std::uint32_t>{7, 0xAA112234}));
-}
-
-TEST(TransparentCopy, OfOneBitTakesTheColoursOfTheDestination) {
-    Picture bits(2, 1);
-    bits.at(1, 0) = 1;
-    const Canvas source(bits, 1);
-    const Canvas canvas(2, 1, 32);
-    SetBkColor(source, 0xFF0000);
-    SetTextColor(canvas, 0x0000FF);
-    SetBkColor(canvas, 0x00FF00);
-    EXPECT_NE(TransparentBlt(canvas, 0, 0, 2, 1, source, 0, 0, 2, 1, 0x000000), 0);
-    EXPECT_EQ(canvas.picture().at(0, 0), 0U) << "the key";
-    EXPECT_EQ(canvas.picture().at(1, 0), 0x00FF00U) << "its background";
-    EXPECT_NE(TransparentBlt(canvas, 0, 0, 2, 1, source, 0, 0, 2, 1, 0xFFFFFF), 0);
-    EXPECT_EQ(canvas.picture().at(0, 0), 0xFF0000U) << "its text";
-}
-
-TEST(TransparentCopy, OntoItsOwnSurfaceReadsThePictureBefore) {
-    std::mt19937 random(15);
-    SCOPED_TRACE("seed 15");
-    const Picture before = drawing::random_picture(12, 6, 8, random);
-    const Canvas canvas(before, 8);
-    const Canvas source(before, 8);
-    const Canvas expected(before, 8);
-    EXPECT_NE(TransparentBlt(canvas, 1, 1, 11, 5, canvas, 0, 0, 6, 6, 0xFFFFFF), 0);
-    EXPECT_NE(TransparentBlt(expected, 1, 1, 11, 5, source, 0, 0, 6, 6, 0xFFFFFF), 0);
+TEST(TransformedCopy, OntoItsOwnSurfaceReadsThePictureBefore) {
+    std::mt19937 random(22);
+    SCOPED_TRACE("seed 22");
+    const Picture before = drawing::random_picture(12, 12, 32, random);
+    const Canvas canvas(before, 32);
+    const Canvas source(before, 32);
+    const Canvas expected(before, 32);
+    const XFORM twice = {2, 0, 0, 2, 0, 0};
+    for (const Canvas* const each : {&canvas, &source, &expected}) {
+        EXPECT_NE(SetGraphicsMode(*each, GM_ADVANCED), 0);
+        EXPECT_NE(SetWorldTransform(*each, &twice), 0);
+    }
+    EXPECT_NE(BitBlt(canvas, 2, 1, 4, 5, canvas, 0, 0, SRCCOPY), 0);
+    EXPECT_NE(BitBlt(expected, 2, 1, 4, 5, source, 0, 0, SRCCOPY), 0);
+    EXPECT_NE(BitBlt(canvas, 0, 0, 0, 5, canvas, 0, 0, SRCCOPY), 0) << "of no width";
     EXPECT_EQ(canvas.picture(), expected.picture());
-}
-
-/// Where the middle of a destination pixel comes from, and by how much it misses the border of a pixel.
-struct Origin {
-    std::int64_t x, y;
-    double margin;
-};
-
-Origin origin(const XFORM& t, int x, int y) {
-    const double determinant = double{t.eM11} * t.eM22 - double{t.eM12} * t.eM21;
-    const double px = x + 0.5 - t.eDx;
-    const double py = y + 0.5 - t.eDy;
-    const double u = (px * t.eM22 - py * t.eM21) / determinant;
-    const double v = (py * t.eM11 - px * t.eM12) / determinant;
-    return {static_cast<std::int64_t>(std::floor(u)), static_cast<std::int64_t>(std::floor(v)),
-            std::min(std::fabs(u - std::round(u)), std::fabs(v - std::round(v)))};
-}
-
-XFORM turned(double degrees, double x, double y) {
-    const double a = degrees * std::numbers::pi / 180;
-    const double c = std::cos(a);
-    const double s = std::sin(a);
-    return {static_cast<float>(c),
-            static_cast<float>(s),
-            static_cast<float>(-s),
-            static_cast<float>(c),
-            static_cast<float>(x - x * c + y * s),
-            static_cast<float>(y - x * s - y * c)};
 }
 
 TEST(TransformedCopy, TakesTheSourcePixelUnderEachMiddle) {
@@ -339,7 +249,7 @@ TEST(TransformedCopy, TakesTheSourcePixelUnderEachMiddle) {
     SCOPED_TRACE("seed 21");
     std::vector<XFORM> transforms;
     for (const double angle : {30.0, 45.0, 123.4, -77.0, 359.0}) {
-        transforms.push_back(turned(angle, 20, 15));
+        transforms.push_back(drawing::turn_about(angle, 20, 15));
     }
     transforms.push_back({2.37F, 0, 0, 0.71F, -10, 3});
     transforms.push_back({-1, 0, 0, 1, 40, 0});
@@ -361,7 +271,7 @@ TEST(TransformedCopy, TakesTheSourcePixelUnderEachMiddle) {
                 int ties = 0;
                 for (int y = 0; y < to.height; ++y) {
                     for (int x = 0; x < to.width; ++x) {
-                        const Origin o = origin(t, x, y);
+                        const drawing::Origin o = drawing::origin(t, x, y);
                         const bool is_in = o.x >= 2 && o.x < 39 && o.y >= 1 && o.y < 41;
                         std::uint32_t expected = to.at(x, y);
                         if (is_in && from.has(o.x + 2, o.y - 1)) {
@@ -381,33 +291,9 @@ TEST(TransformedCopy, TakesTheSourcePixelUnderEachMiddle) {
     }
 }
 
-TEST(TransformedCopy, OntoItsOwnSurfaceReadsThePictureBefore) {
-    std::mt19937 random(22);
-    SCOPED_TRACE("seed 22");
-    const Picture before = drawing::random_picture(12, 12, 32, random);
-    const Canvas canvas(before, 32);
-    const Canvas source(before, 32);
-    const Canvas expected(before, 32);
-    const XFORM twice = {2, 0, 0, 2, 0, 0};
-    const XFORM turn = turned(90, 6, 6);
-    for (const Canvas* const each : {&canvas, &source, &expected}) {
-        EXPECT_NE(SetGraphicsMode(*each, GM_ADVANCED), 0);
-        EXPECT_NE(SetWorldTransform(*each, &twice), 0);
-    }
-    EXPECT_NE(BitBlt(canvas, 2, 1, 4, 5, canvas, 0, 0, SRCCOPY), 0);
-    EXPECT_NE(BitBlt(expected, 2, 1, 4, 5, source, 0, 0, SRCCOPY), 0);
-    EXPECT_NE(BitBlt(canvas, 0, 0, 0, 5, canvas, 0, 0, SRCCOPY), 0) << "of no width";
-    EXPECT_EQ(canvas.picture(), expected.picture());
-    EXPECT_NE(SetWorldTransform(source, &turn), 0);
-    EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, source, 0, 0, SRCCOPY), 0) << "from a turned source";
-    EXPECT_EQ(canvas.picture(), expected.picture());
-}
-
-TEST(Transform, ReachesAllCallsOrIsRefused) {
+TEST(Transform, IsRefusedWhereItCannotBe) {
     const Canvas canvas(8, 8, 32);
-    const Canvas source(Picture(8, 8, 5), 32);
     const XFORM quarter = {0, 1, -1, 0, 8, 0};
-    const XFORM shift = {1, 0, 0, 1, 2, -3};
     const XFORM flat = {1, 2, 2, 4, 0, 0};
     const XFORM endless = {INFINITY, 0, 0, 1, 0, 0};
     EXPECT_EQ(SetWorldTransform(canvas, &quarter), 0) << "in the compatible mode";
@@ -419,28 +305,45 @@ TEST(Transform, ReachesAllCallsOrIsRefused) {
     EXPECT_EQ(ModifyWorldTransform(canvas, &quarter, 4), 0);
     EXPECT_NE(SetWorldTransform(canvas, &quarter), 0);
     EXPECT_EQ(SetGraphicsMode(canvas, GM_COMPATIBLE), 0) << "while a transform is set";
+    ModifyWorldTransform(canvas, nullptr, MWT_IDENTITY);
+    EXPECT_EQ(SetMapMode(canvas, MM_ANISOTROPIC), MM_TEXT);
+    EXPECT_EQ(SetMapMode(canvas, 2), 0);
+    EXPECT_EQ(GetMapMode(canvas), MM_ANISOTROPIC);
+    POINT point = {6, 1};
+    EXPECT_EQ(DPtoLP(canvas, &point, -1), 0);
+    EXPECT_EQ(DPtoLP(canvas, nullptr, 1), 0);
+    EXPECT_NE(DPtoLP(canvas, nullptr, 0), 0);
+}
+
+constexpr TRIVERTEX BLUE_SQUARE[] = {{0, 0, 0xFF00, 0, 0, 0}, {4, 4, 0xFF00, 0, 0, 0}};
+constexpr GRADIENT_RECT FIRST_TO_SECOND = {0, 1};
+
+TEST(Transform, ByAQuarterReachesAllCallsOrIsRefused) {
+    const Canvas canvas(Picture(8, 8, 3), 32);
+    const Canvas source(Picture(8, 8, 5), 32);
+    const XFORM quarter = {0, 1, -1, 0, 8, 0};
+    const XFORM shift = {1, 0, 0, 1, 2, -3};
+    SetGraphicsMode(canvas, GM_ADVANCED);
+    EXPECT_NE(SetWorldTransform(canvas, &quarter), 0);
     // Point (1, 2) is at the pixel border (6, 1); the pixel to its right and below is (6, 1).
     EXPECT_EQ(SetPixel(canvas, 1, 2, 0xFF), 0xFFU);
     EXPECT_EQ(canvas.picture().at(6, 1), 0xFF0000U);
     EXPECT_EQ(GetPixel(canvas, 1, 2), 0xFFU);
     POINT points[2] = {{6, 1}, {8, 0}};
     EXPECT_NE(DPtoLP(canvas, points, 2), 0);
-    EXPECT_EQ(points[0].x, 1);
-    EXPECT_EQ(points[0].y, 2);
-    EXPECT_EQ(points[1].x, 0);
-    EXPECT_EQ(points[1].y, 0);
+    EXPECT_EQ(std::pair(points[0].x, points[0].y), std::pair(1, 2));
+    EXPECT_EQ(std::pair(points[1].x, points[1].y), std::pair(0, 0));
     const RECT r = {1, 0, 3, 2};
     EXPECT_NE(FillRect(canvas, &r, static_cast<HBRUSH>(GetStockObject(WHITE_BRUSH))), 0);
-    Picture expected(8, 8);
-    for (int y = 1; y < 3; ++y) {
+    Picture expected(8, 8, 3);
+    for (const int y : {1, 2}) {
         expected.at(6, y) = expected.at(7, y) = 0xFFFFFF;
     }
     EXPECT_EQ(canvas.picture(), expected);
-    EXPECT_NE(BitBlt(canvas, 1, 0, 2, 2, nullptr, 0, 0, BLACKNESS), 0);
-    EXPECT_EQ(canvas.picture(), Picture(8, 8));
-    const TRIVERTEX corners[2] = {{0, 0, 0xFF00, 0, 0, 0}, {4, 4, 0xFF00, 0, 0, 0}};
-    const GRADIENT_RECT mesh = {0, 1};
-    EXPECT_EQ(GradientFill(canvas, corners, 2, &mesh, 1, 0), 0);
+    EXPECT_NE(BitBlt(canvas, 1, 0, 2, 1, nullptr, 0, 0, BLACKNESS), 0);
+    expected.at(7, 1) = expected.at(7, 2) = 0;
+    EXPECT_EQ(canvas.picture(), expected);
+    EXPECT_EQ(GradientFill(canvas, BLUE_SQUARE, 2, &FIRST_TO_SECOND, 1, 0), 0);
     EXPECT_EQ(RoundRect(canvas, 0, 0, 4, 4, 1, 1), 0);
     EXPECT_EQ(TransparentBlt(canvas, 0, 0, 4, 4, source, 0, 0, 4, 4, 0), 0);
     EXPECT_EQ(GetLastError(), ERROR_NOT_SUPPORTED);
@@ -449,43 +352,47 @@ TEST(Transform, ReachesAllCallsOrIsRefused) {
     EXPECT_NE(ModifyWorldTransform(canvas, &quarter, MWT_RIGHTMULTIPLY), 0);
     EXPECT_NE(BitBlt(canvas, 0, 3, 2, 1, source, 0, 0, SRCCOPY), 0);
     // (0..2, 3..4), shifted to (2..4, 0..1), turned to columns 7..8 and rows 2..4
-    expected = Picture(8, 8);
     expected.at(7, 2) = expected.at(7, 3) = 5;
     EXPECT_EQ(canvas.picture(), expected);
+}
+
+TEST(Transform, ByWholePixelsIsAShift) {
+    const Canvas canvas(8, 8, 32);
+    const Canvas source(Picture(8, 8, 5), 32);
+    const XFORM shift = {1, 0, 0, 1, 2, -3};
+    SetGraphicsMode(canvas, GM_ADVANCED);
     EXPECT_NE(SetWorldTransform(canvas, &shift), 0);
-    EXPECT_NE(GradientFill(canvas, corners, 2, &mesh, 1, 0), 0);
-    EXPECT_EQ(canvas.picture().at(2, 0), 0xFF0000U);
-    EXPECT_EQ(canvas.picture().at(5, 0), 0xFF0000U);
-    EXPECT_EQ(canvas.picture().at(1, 0), 0U);
-    EXPECT_EQ(canvas.picture().at(6, 0), 0U);
-    EXPECT_EQ(canvas.picture().at(2, 1), 0U);
+    EXPECT_NE(GradientFill(canvas, BLUE_SQUARE, 2, &FIRST_TO_SECOND, 1, 0), 0);
+    Picture expected(8, 8);
+    for (int x = 2; x < 6; ++x) {
+        expected.at(x, 0) = 0xFF0000;
+    }
+    EXPECT_EQ(canvas.picture(), expected);
     EXPECT_NE(BitBlt(source, 0, 0, 8, 8, canvas, 0, 0, SRCCOPY), 0) << "from a shifted source";
     EXPECT_EQ(source.picture().at(0, 3), 0xFF0000U);
     EXPECT_EQ(source.picture().at(0, 2), 5U);
-    // Steps and places far beyond any surface.
+}
+
+TEST(Transform, OfStepsAndPlacesFarBeyondAnySurfaceDrawsNothing) {
+    const Canvas canvas(Picture(8, 8, 3), 32);
+    const Canvas source(Picture(8, 8, 5), 32);
     const XFORM tiny = {1e-30F, 0, 0, 1e-30F, 0, 0};
     const XFORM far = {1, 0.5F, 0, 1, 3e38F, -3e38F};
+    const RECT all = {0, 0, 8, 8};
+    POINT points[2] = {{1, 2}, {0, 0}};
+    SetGraphicsMode(canvas, GM_ADVANCED);
     EXPECT_NE(SetWorldTransform(canvas, &tiny), 0);
     EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, source, 0, 0, SRCCOPY), 0);
     EXPECT_EQ(GetLastError(), ERROR_ARITHMETIC_OVERFLOW);
-    const RECT all = {0, 0, 8, 8};
     EXPECT_EQ(FillRect(canvas, &all, static_cast<HBRUSH>(GetStockObject(WHITE_BRUSH))), 0);
     EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, nullptr, 0, 0, WHITENESS), 0);
     EXPECT_EQ(DPtoLP(canvas, points, 2), 0);
     EXPECT_EQ(points[0].x, 1);
     EXPECT_NE(DPtoLP(canvas, points + 1, 1), 0);
     EXPECT_NE(SetWorldTransform(canvas, &far), 0);
-    expected = canvas.picture();
     EXPECT_NE(BitBlt(canvas, INT_MIN, INT_MIN, INT_MAX, INT_MAX, source, 0, 0, SRCCOPY), 0);
     EXPECT_EQ(SetPixel(canvas, 0, 0, 0), CLR_INVALID);
-    EXPECT_EQ(canvas.picture(), expected);
-    ModifyWorldTransform(canvas, nullptr, MWT_IDENTITY);
-    EXPECT_EQ(SetMapMode(canvas, MM_ANISOTROPIC), MM_TEXT);
-    EXPECT_EQ(SetMapMode(canvas, 2), 0);
-    EXPECT_EQ(GetMapMode(canvas), MM_ANISOTROPIC);
-    EXPECT_EQ(DPtoLP(canvas, points, -1), 0);
-    EXPECT_EQ(DPtoLP(canvas, nullptr, 1), 0);
-    EXPECT_NE(DPtoLP(canvas, nullptr, 0), 0);
+    EXPECT_EQ(canvas.picture(), Picture(8, 8, 3));
 }
 
 TEST(TransparentCopy, KernelsAgree) {
@@ -509,11 +416,9 @@ TEST(TransparentCopy, KernelsAgree) {
         EXPECT_EQ(to, plain);
         EXPECT_EQ(portable, plain);
         basalt::platform::fill_words(to.data(), count, 42);
-        EXPECT_EQ(to, [&] {
-            std::vector<std::uint32_t> filled(count, 42);
-            filled.push_back(0x55555555);
-            return filled;
-        }());
+        std::vector<std::uint32_t> filled(count, 42);
+        filled.push_back(0x55555555);
+        EXPECT_EQ(to, filled);
     }
 }
 

@@ -366,7 +366,7 @@ TEST(Heap, ChunksComeInRisingOrderAndGoBackToTheSystem) {
     const std::vector<void*> chunks = take_many(heap, 2048, 20'000);
     std::size_t falls = 0;
     for (std::size_t i = 1; i < chunks.size(); ++i) {
-        falls += chunks[i] < chunks[i - 1] ? 1 : 0;
+        falls += chunks[i] < chunks[i - 1] ? 1U : 0U;
     }
     EXPECT_LE(falls, sound(heap.handle).regions);
     free_all(heap, chunks);

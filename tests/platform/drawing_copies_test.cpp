@@ -356,6 +356,26 @@ TEST(Transform, ByAQuarterReachesAllCallsOrIsRefused) {
     EXPECT_EQ(canvas.picture(), expected);
 }
 
+TEST(Transform, JoinsWithAnotherBeforeOrAfter) {
+    constexpr XFORM first = {1, 2, 1, 3, 0, 0};
+    constexpr XFORM second = {2, 1, 1, 1, 0, 0};
+    constexpr POINT logical = {10, 20};
+    const struct {
+        DWORD mode;
+        POINT device;  // x m11 + y m21, x m12 + y m22, twice
+    } ways[] = {{MWT_RIGHTMULTIPLY, {140, 110}}, {MWT_LEFTMULTIPLY, {70, 170}}};
+    for (const auto& way : ways) {
+        const Canvas canvas(1, 1, 32);
+        SetGraphicsMode(canvas, GM_ADVANCED);
+        SetWorldTransform(canvas, &first);
+        EXPECT_NE(ModifyWorldTransform(canvas, &second, way.mode), 0);
+        POINT point = way.device;
+        EXPECT_NE(DPtoLP(canvas, &point, 1), 0);
+        EXPECT_EQ(point.x, logical.x) << way.mode;
+        EXPECT_EQ(point.y, logical.y) << way.mode;
+    }
+}
+
 TEST(Transform, ByWholePixelsIsAShift) {
     const Canvas canvas(8, 8, 32);
     const Canvas source(Picture(8, 8, 5), 32);

@@ -165,10 +165,10 @@ TEST_F(FileLog, killed_process_leaves_whole_texts) {
 TEST_F(FileLog, threads_and_other_logs_on_the_file_do_not_cut_each_others_texts) {
     FileLogger log(file.c_str());
     FileLogger other(file.c_str());
-    basalt::test::run_threads(3, [&](int writer) { write_lines(writer < 2 ? log : other, "abc"[writer]); });
+    basalt::test::run_threads(4, [&](int writer) { write_lines(writer < 3 ? log : other, "abcd"[writer]); });
     log.Close();
     other.Close();
-    EXPECT_EQ(lines_in_order(), (LineCounts{{'a', 1000}, {'b', 1000}, {'c', 1000}}));
+    EXPECT_EQ(lines_in_order(), (LineCounts{{'a', 1000}, {'b', 1000}, {'c', 1000}, {'d', 1000}}));
 }
 
 TEST_F(FileLog, what_a_log_left_open_holds_is_sent_once_when_its_process_exits) {

@@ -81,7 +81,7 @@ TEST(Gradients, AreVerticalBelowATenthOfAMillimetre) {
     EXPECT_DOUBLE_EQ(geo_gradient(from, {3.0, 4.0, 15.0}), PI / 4);
     EXPECT_EQ(geo_gradient2(from, {3.0, 4.0, 7.5}), -0.5);
     EXPECT_EQ(geo_gradient2(from, {0.0001, 0.0, 10.0}), 0.0);
-    const geo_nee up = {0.00005, 0.0, 12.0};
+    const geo_nee up = {0.00005, 0.0, 10.05};
     const geo_nee level = {0.00005, 0.0, 10.0};
     EXPECT_EQ(geo_gradient(from, up), PI / 2);
     EXPECT_EQ(geo_gradient2(from, up), GEO_INFINITY);
@@ -117,7 +117,7 @@ TEST(Divergence, IsTheSmallerAngle) {
     EXPECT_EQ(geo_grid_divergence(150.0, 0.0), 2 * PI - 150.0);
     EXPECT_EQ(geo_grid_divergence(0.0, 150.0), -150.0);
     const geo_nee origin = {0.0, 0.0, 0.0};
-    EXPECT_DOUBLE_EQ(geo_grid_divergence(origin, {1, 0, 0}, {5, 5, 0}, {5, 4, 0}), PI / 2);
+    EXPECT_DOUBLE_EQ(geo_grid_divergence(origin, {1, 0, 0}, {5, 5, 0}, {6, 4, 0}), PI / 4);
 }
 
 TEST(BisectedBearing, HalvesTheSmallerTurn) {

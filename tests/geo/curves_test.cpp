@@ -22,7 +22,7 @@ TEST(ArcConversions, GiveNothingForAMarkerOrARadiusBelowHalfAMillimetre) {
 }
 
 TEST(ArcToChord, IsHalfTheChordUpToTheRadius) {
-    EXPECT_EQ(geo_arc_to_chord(13, 8), 12.0);
+    EXPECT_EQ(geo_arc_to_chord(13.0 / 256, 8.0 / 256), 12.0 / 256);  // a half chord far below a unit
     EXPECT_EQ(geo_arc_to_chord(0, 0), 0.0);
     EXPECT_EQ(geo_arc_to_chord(100, 100), 200.0);
     EXPECT_EQ(geo_arc_to_chord(100, INF), 200.0);

@@ -157,9 +157,8 @@ TEST(SharedMemoryHeap, HoldsObjectsOfDerivedClasses) {
     struct Huge : vlSharedMemoryHeap {
         char data[std::size_t{1} << 46];
     };
-    const auto live = [] {
-        return basalt::platform::inspect_heap(vlSharedMemoryHeap::GetHeapHandle()).live_blocks;
-    };
+    const auto report = [] { return basalt::platform::inspect_heap(vlSharedMemoryHeap::GetHeapHandle()); };
+    const auto live = [&] { return report().live_blocks; };
     const DebugOutput output;
     const std::size_t before = live();
     int made = 0;
@@ -179,9 +178,10 @@ TEST(SharedMemoryHeap, HoldsObjectsOfDerivedClasses) {
         EXPECT_EQ(vlSharedMemoryHeap::Alloc(std::size_t{5} << 20), nullptr);
     }
     output.take();
-    void* block = vlSharedMemoryHeap::Alloc(10);
+    vlSharedMemoryHeap::Free(vlSharedMemoryHeap::Alloc(10));
+    EXPECT_NE(report().quick_blocks, 0U);
     vlSharedMemoryHeap::Compact();
-    vlSharedMemoryHeap::Free(block);
+    EXPECT_EQ(report().quick_blocks, 0U) << "joined with their neighbours";
     EXPECT_EQ(output.take(), Pieces{});
 }
 

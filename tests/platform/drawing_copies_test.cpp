@@ -221,8 +221,12 @@ TEST(TransparentCopy, LeavesOneColourOutAtEveryDepthAndSize) {
                                                       << ' ' << s.width << ", " << onto_itself;
             }
         }
-        EXPECT_EQ(TransparentBlt(source, 0, 0, -1, 1, source, 0, 0, 1, 1, key), 0);
-        EXPECT_EQ(TransparentBlt(source, 0, 0, 1, 1, source, 0, 0, 1, -1, key), 0);
+        for (int negative = 0; negative < 4; ++negative) {
+            int sizes[] = {1, 1, 1, 1};
+            sizes[negative] = -1;
+            EXPECT_EQ(TransparentBlt(source, 0, 0, sizes[0], sizes[1], source, 0, 0, sizes[2], sizes[3], key),
+                      0);
+        }
     }
 }
 
@@ -311,7 +315,9 @@ TEST(Transform, IsRefusedWhereItCannotBe) {
     EXPECT_EQ(GetMapMode(canvas), MM_ANISOTROPIC);
     POINT point = {6, 1};
     EXPECT_EQ(DPtoLP(canvas, &point, -1), 0);
+    SetLastError(ERROR_SUCCESS);
     EXPECT_EQ(DPtoLP(canvas, nullptr, 1), 0);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
     EXPECT_NE(DPtoLP(canvas, nullptr, 0), 0);
 }
 

@@ -42,7 +42,7 @@ check() {  # ON or OFF: shared or static
         -DCMAKE_CXX_FLAGS="${warnings[*]}" -Dbasalt_DIR="$prefix/$libdir/cmake/basalt"
     # one folder for both kinds: the objects are the same
     build tests/package/subdirectory "$work/sub" -DBUILD_SHARED_LIBS="$kind" -DBASALT_SOURCE_DIR="$PWD" \
-        -DCMAKE_BUILD_TYPE=None
+        -DCMAKE_BUILD_TYPE=None -DBASALT_JOIN_SOURCES=ON
     "$work/sub/consumer"
 
     local flags

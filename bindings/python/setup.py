@@ -9,6 +9,7 @@ import subprocess
 
 import numpy
 import pybind11
+from pybind11.setup_helpers import ParallelCompile
 from setuptools import Extension, setup
 from setuptools.command.build_ext import build_ext
 
@@ -37,6 +38,7 @@ def words_of_pkg_config(option):
                                       text=True).stdout)
 
 
+ParallelCompile(default=os.cpu_count()).install()
 setup(
     ext_modules=[Extension(
         "basalt._basalt",

@@ -125,8 +125,7 @@ TEST(RoundedCorners, StandInTheRectanglesOwnPlace) {
     }
 }
 
-// The corners of a rectangle far beyond the surface were drawn in full, in minutes, before what is seen was
-// copied.
+// Its corners were once drawn in full, seen or not, which took minutes.
 TEST(RoundedCorners, OfARectangleFarLargerThanTheSurface) {
     const StoredOsCode os(NT);
     for (const RECT& r : {RECT{-39000, -20, 70, 39000}, RECT{12, -39900, 40000, 60}}) {

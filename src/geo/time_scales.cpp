@@ -63,8 +63,12 @@ constexpr std::uint32_t days_since_1858(std::uint16_t year, std::uint16_t month,
 
 /// The last day whose year 16 bits hold.
 constexpr std::uint32_t LAST_WHOLE_YEAR_DAY = days_since_1858(65535, 12, 31);
-/// The last day four times which, counted from MJD -2468570 as Fliegel and Van Flandern do, 31 bits hold.
-constexpr std::uint32_t LAST_DAY = (std::uint32_t{1} << 29) - 1 - 2468570;
+/// Days before MJD 0 from which Fliegel and Van Flandern count.
+constexpr std::uint32_t FLIEGEL_OFFSET = 2468570;
+/// The last day four times which, so counted, 31 bits hold.
+constexpr std::uint32_t LAST_DAY = (std::uint32_t{1} << 29) - 1 - FLIEGEL_OFFSET;
+/// The first day of that count, -4900-03-01; it and the days up to 1858 are numbers below 2^32.
+constexpr std::uint32_t FIRST_DAY = 0U - FLIEGEL_OFFSET;
 
 struct Date {
     std::uint16_t year, month, day;
@@ -112,15 +116,23 @@ std::uint16_t day_of_week(const Date& date) {
     return static_cast<std::uint16_t>((first_of_january + day_of_year - 1) % 7);
 }
 
-/// _mjd2greg() beyond LAST_WHOLE_YEAR_DAY; apart, since saving registers for it cost days within a third.
+/// _mjd2greg() of other days than 0 to LAST_WHOLE_YEAR_DAY; apart, since saving registers for it cost days
+/// within a third.
 [[gnu::noinline]] void far_date(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month,
                                 std::uint16_t& day, std::uint16_t& weekday) {
-    const bool reached = mjd <= LAST_DAY;
-    const Date date = reached ? date_of(mjd) : Date{0, 0, 0};
+    constexpr std::uint32_t CYCLES = 13;  // of 400 years: past the year 0 from FIRST_DAY on
+    constexpr std::uint32_t DAYS_PER_CYCLE = 146097;
+    Date date = {0, 0, 0};
+    if (mjd <= LAST_DAY) {
+        date = date_of(mjd);
+    } else if (mjd >= FIRST_DAY) {
+        date = date_of(mjd + CYCLES * DAYS_PER_CYCLE);
+        date.year = static_cast<std::uint16_t>(date.year - CYCLES * 400);
+    }
     year = date.year;
     month = date.month;
     day = date.day;
-    weekday = reached ? day_of_week(date) : std::uint16_t{0};
+    weekday = month != 0 ? day_of_week(date) : std::uint16_t{0};
 }
 
 }  // namespace

@@ -52,9 +52,26 @@ TEST(ModifiedJulianDate, FollowsTheCalendar) {
         const std::uint32_t farther = mjd * 158;
         ASSERT_EQ(date_of(farther), expected_date(farther)) << farther;
     }
-    EXPECT_EQ(_greg2mjd(1858, 11, 16), 0xFFFFFFFFU);
     EXPECT_EQ(_greg2mjd(2023, 2, 31), _greg2mjd(2023, 3, 3));
     EXPECT_EQ(_greg2mjd(2023, 14, 29), _greg2mjd(2024, 2, 29)) << "months run over into the next year";
+}
+
+TEST(ModifiedJulianDate, CountsDaysBefore1858BackwardsFrom0) {
+    const sys_days first = std::chrono::year(1) / std::chrono::January / 1;
+    for (sys_days day = first; day < MJD_0; day += std::chrono::days(1)) {
+        const std::chrono::year_month_day date = day;
+        Day expected;
+        expected.year = static_cast<std::uint16_t>(static_cast<int>(date.year()));
+        expected.month = static_cast<std::uint16_t>(static_cast<unsigned>(date.month()));
+        expected.day = static_cast<std::uint16_t>(static_cast<unsigned>(date.day()));
+        expected.day_of_week = static_cast<std::uint16_t>(std::chrono::weekday(day).c_encoding());
+        const auto mjd = static_cast<std::uint32_t>((day - MJD_0).count());
+        ASSERT_EQ(_greg2mjd(expected.year, expected.month, expected.day), mjd);
+        ASSERT_EQ(date_of(mjd), expected) << (day - MJD_0).count();
+    }
+    EXPECT_EQ(date_of(0U - 678941), (Day{0, 1, 1, 0})) << "a day late, as in the year 65536";
+    EXPECT_EQ(date_of(0U - 2468570), (Day{65536 - 4900, 3, 1, 2}));
+    EXPECT_EQ(date_of(0U - 2468571), Day());
 }
 
 TEST(ModifiedJulianDate, CutsFarYearsTo16BitsAndAnswersNothingBeyondTheLastDay) {
@@ -69,7 +86,7 @@ TEST(ModifiedJulianDate, CutsFarYearsTo16BitsAndAnswersNothingBeyondTheLastDay) 
     }
     EXPECT_EQ(date_of(23257591).year, 0);
     EXPECT_EQ(date_of(534402342), Day());
-    EXPECT_EQ(date_of(0xFFFFFFFF), Day());
+    EXPECT_EQ(date_of(0x80000000), Day());
 }
 
 using Week = std::pair<std::uint16_t, double>;

@@ -14,7 +14,7 @@
 #include "basalt/platform/calendar.h"
 
 /// MJD of a date.
-/// @param year 1858 or later for a date the result can hold; earlier days count backwards from 2^32
+/// @param year days before 1858-11-17 count backwards from 2^32
 /// @param month 1 to 12
 /// @param day 1 to 31
 /// @return whole days since 1858-11-17
@@ -26,14 +26,15 @@
 BASALT_API std::uint32_t _greg2mjd(std::uint16_t year, std::uint16_t month, std::uint16_t day);
 
 /// Date and day of the week of an MJD.
-/// @param mjd whole days since 1858-11-17
+/// @param mjd whole days since 1858-11-17; 2^32 - n for n days before it, as _greg2mjd() gives them
 /// @param[out] year the year
 /// @param[out] month 1 to 12
 /// @param[out] day 1 to 31
 /// @param[out] dayOfWeek 0 (Sunday) to 6
 ///
-/// Bad input: from 23257591 on, the year 65536, only the low 16 bits of the year are left and the day of the
-/// week is that of the year so cut; from 534402342 on all four are 0.
+/// Bad input: before the year 1 and from 23257591 on, the year 65536, only the low 16 bits of the year are
+/// left and the day of the week is that of the year so cut; from 534402342 on all four are 0, up to 2^32 -
+/// 2468571, the day before -4900-03-01.
 ///
 /// Source: as _greg2mjd().
 BASALT_API void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std::uint16_t& day,
@@ -49,9 +50,11 @@ BASALT_API void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t&
 /// Bad input: days before 1980-01-06 count backwards from 2^32.
 BASALT_API void _mjd2gps(std::uint32_t mjd, double secondsOfDay, std::uint16_t& week, double& secondsOfWeek);
 
-/// MJD with a day fraction of a GPS time; good to a microsecond.
+/// MJD with a day fraction of a GPS time.
 /// @param week GPS week
 /// @param secondsOfWeek any number of seconds since its beginning
+///
+/// Accuracy: 1.1 microseconds up to week 4000, 7 at the last week.
 BASALT_API double _gps2mjd(std::uint16_t week, double secondsOfWeek);
 
 /// Milliseconds since 1970-01-01 00:00 of a calendar time.

@@ -18,6 +18,9 @@ constexpr int MOST_FOOT_PASSES = 100;
 constexpr double ON_THE_LINE = 1e-6;
 /// What the coordinates of a foot resolve, metres.
 constexpr double FINEST_STEP = 5e-9;
+/// Closer than this to the point's antipode every direction leads to the point and none is square to the
+/// line: from here on rounding alone would settle what is; metres.
+constexpr double AT_THE_ANTIPODE = FINEST_STEP / RAY_TOLERANCE;
 /// How far from where the search by steps would end the foot may be, metres: the distance changes by 0.4 % of
 /// it, what ellipsoid and sphere differ by.
 constexpr double FOOT_TOLERANCE = 5e-5;
@@ -103,14 +106,16 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
         }
         const Goal goal(sight.distance * SPHERE_RADIUS, side);
         const double miss = std::abs(sight.skew() - goal.aim);
-        if (miss < best_miss) {
+        const bool is_opposite = sight.cosine < 0.0 && sight.distance * SPHERE_RADIUS < AT_THE_ANTIPODE;
+        if (miss < best_miss && !is_opposite) {
             best_foot = foot;
             best = sight;
             best_miss = miss;
         }
         // Not "miss < width": NaN ends the search too.
-        const bool square_at_once = passes == 1 && std::abs(sight.skew()) < RAY_TOLERANCE;
-        if (square_at_once || !(miss >= goal.width) || passes == MOST_FOOT_PASSES) {
+        const bool is_square =
+            !(miss >= goal.width) || (passes == 1 && std::abs(sight.skew()) < RAY_TOLERANCE);
+        if ((is_square && !is_opposite) || passes == MOST_FOOT_PASSES) {
             break;
         }
         (sight.skew() > goal.aim ? low : high) = along;

@@ -45,7 +45,10 @@ bool geo_dist_equal(double a, double b) {
 }
 
 double geo_grid_bearing(const geo_nee& from, const geo_nee& to) {
-    return geo_normalised_bearing(std::atan2(to.east - from.east, to.north - from.north));
+    // A difference of -0, from a coordinate of -0, would turn the bearing of coincident points round.
+    const double east = to.east - from.east + 0.0;
+    const double north = to.north - from.north + 0.0;
+    return geo_normalised_bearing(std::atan2(east, north));
 }
 
 double geo_gradient(const geo_nee& from, const geo_nee& to) {

@@ -73,6 +73,7 @@ TEST(GridBearing, TurnsClockwiseFromNorth) {
         EXPECT_DOUBLE_EQ(geo_vector_direction(v), eighth * PI / 4);
     }
     EXPECT_EQ(geo_grid_bearing(origin, origin), 0.0);
+    EXPECT_EQ(geo_grid_bearing({0.0, 0.0, 0.0}, {-0.0, -0.0, 0.0}), 0.0);
     EXPECT_EQ(geo_grid_bearing(origin, {1.0, -1e-20, 0.0}), 0.0);
 }
 

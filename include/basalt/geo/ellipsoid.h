@@ -14,14 +14,16 @@
 
 /// Geodetic point of a Cartesian one, by iteration on the latitude.
 /// @param xyz Cartesian point, metres
-/// @param[out] llh geodetic point: latitude in [-pi/2, pi/2], longitude in [-pi, pi], 0 on the axis
+/// @param[out] llh geodetic point: latitude in [-pi/2, pi/2], longitude in [-pi, pi], 0 on the
+/// axis (pi for an x of -0)
 /// @param tolerance radians: the latitude has settled when two passes agree within it. 5e-10 is the
 /// library's own; with 0 they must agree exactly; from 10 on, or NaN, the first estimate is kept (right at
 /// height 0; up to 34 m off at 10 km).
-/// @return 1; 0 with llh untouched at the earth's centre, for NaN coordinates, and for a latitude that has
-/// not settled in ten passes: with 5e-10, at places within 290 km of the centre
+/// @return 1; 0 with llh untouched at the earth's centre, for NaN coordinates (but 1 and NaN where the first
+/// estimate is kept), and for a latitude that has not settled in ten passes: with 5e-10, at places within
+/// 291 km of the centre
 ///
-/// Accuracy with 5e-10, heights -11 km to 20,000 km: 4e-12 radians, 0.01 mm in height. Coordinates beyond
+/// Accuracy with 5e-10, heights -11 km to 20,000 km: 4e-12 radians, 0.011 mm in height. Coordinates beyond
 /// 1e154 m count as infinite, x and y below 1e-162 m as 0.
 ///
 /// Source: W. Heiskanen, H. Moritz, Physical Geodesy, 1967, section 5-3.
@@ -33,7 +35,7 @@ BASALT_API int _xyz2llh(const geo_vector* xyz, geo_llh* llh, double tolerance);
 /// @return 1; 0 with xyz untouched when latitude, longitude and height are all exactly 0: the point on the
 /// equator at longitude 0 and height 0 is refused as a record never set
 ///
-/// Bad input: NaN, or an infinite latitude or longitude, gives NaN, with 1.
+/// Bad input: NaN, or an infinite latitude or longitude, gives NaN in what depends on it, with 1.
 ///
 /// Source: W. Heiskanen, H. Moritz, Physical Geodesy, 1967, eq. 5-3.
 BASALT_API int _llh2xyz(const geo_llh* llh, geo_vector* xyz);
@@ -45,6 +47,8 @@ BASALT_API int _llh2xyz(const geo_llh* llh, geo_vector* xyz);
 /// @param point Cartesian point, metres
 /// @param[out] out local point, metres
 /// @return always 1; out is untouched when the origin cannot be converted, see _xyz2llh()
+///
+/// Bad input: a point that is not finite, or nearly overflows, may give NaN.
 BASALT_API int _xyz2nez(const geo_vector* origin, const geo_vector* point, geo_nee* out);
 
 /// Principal radii of curvature.

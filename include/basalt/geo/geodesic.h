@@ -20,8 +20,9 @@
 /// @param[out] finalAzimuth forward azimuth at the end, radians in [-pi, pi], not normalised
 /// @param[out] end the end; its longitude is not wrapped into any range, its height is the start's
 ///
-/// Bad input: NaN or an infinity in what is read gives NaN in all but the height. The series settles in 3 to
-/// 5 passes; distances beyond 1e10 m may not settle at all and get the hundredth pass.
+/// Bad input: NaN or an infinity in what is read gives NaN in what depends on it; a longitude is only added
+/// to. The series settles in 5 passes at most, mostly 3; distances beyond 1e10 m may not settle at all and
+/// get the hundredth pass.
 ///
 /// Source: T. Vincenty, "Direct and inverse solutions of geodesics on the ellipsoid", Survey Review 176,
 /// 1975.
@@ -29,8 +30,8 @@ BASALT_API void geo_vincenty_direct(geo_llh start, double azimuth, double distan
                                     geo_llh& end);
 
 /// Great-circle distance on a sphere of radius 6,371,000 m: up to 0.6 % off the ellipsoid's.
-/// @return metres in [0, 20015087]: 0 only for equal places, the largest at the antipode. A latitude beyond a
-/// pole may give NaN.
+/// @return metres in [0, 20015087]: 0 for equal places and for what underflows, below 1e-155 m; the largest
+/// at the antipode. A latitude beyond a pole may give NaN.
 ///
 /// Source: R. Sinnott, "Virtues of the haversine", Sky and Telescope 68(2), 1984.
 BASALT_API double geo_vincenty_distance(geo_llh a, geo_llh b);

@@ -88,7 +88,8 @@ BASALT_API double geo_vector_length(geo_vector& a, geo_vector& b);
 BASALT_API double geo_vector_len(geo_vector& v);
 
 /// Bearing of a local vector (x east, y north).
-/// @return normalised bearing, radians in [0, 2 pi); 0 for a vector without horizontal part
+/// @return normalised bearing, radians in [0, 2 pi); for a vector without horizontal part 0, or pi when its y
+/// is -0, as after geo_vector_reverse()
 BASALT_API double geo_vector_direction(geo_vector& v);
 
 /// Angle of slope of a local vector against its horizontal part.

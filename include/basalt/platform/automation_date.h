@@ -16,8 +16,9 @@ using DATE = double;
 
 /// Converts calendar time to an automation date. Weekday and milliseconds are not looked at.
 /// @return 1, or 0 with ERROR_INVALID_PARAMETER and `date` as it was for what is no date (nothing is rolled
-/// over: 31 April is none), no time of day, or a year before 100 Accuracy: the nearest double, give or take
-/// one: 2e-5 s and better.
+/// over: 31 April is none), no time of day, or a year before 100
+///
+/// Accuracy: the nearest double, give or take one: 2e-5 s and better.
 BASALT_API int SystemTimeToVariantTime(SYSTEMTIME* time, DATE* date);
 
 /// Converts an automation date to calendar time, to the nearest second; milliseconds are 0.

@@ -3,8 +3,8 @@
 ///
 /// Both split at `\` and `/` alike; what they compose has `\`, and the system is given `/` for either. A
 /// drive letter is a name like any other here. File names are UTF-8 on the disk whatever the locale; bytes
-/// that are not are kept as the values 0xDC80 to 0xDCFF and lead back to the same file. Nothing throws but
-/// std::bad_alloc and std::length_error, for want of memory or length.
+/// that are not are listed as the values 0xDC80 to 0xDCFF, a `\` within a name as 0xDC5C, and lead back to
+/// the same file. Nothing throws but std::bad_alloc and std::length_error, for want of memory or length.
 #ifndef BASALT_FILES_H
 #define BASALT_FILES_H
 
@@ -74,7 +74,8 @@ public:
     /// Whether there is a directory of this path. A wildcard path asks for its first match.
     bool IsDirectory() const;
     /// When the entry of this path was made, where the file system knows it, or else last changed; all zero
-    /// when there is none. A wildcard path asks for its second match, or the only one.
+    /// when there is none, or it lies in a folder that may be read but not entered. Times before 1601 and
+    /// after 30828 are brought to those years. A wildcard path asks for its second match, or the only one.
     FILETIME GetCreationTime() const;
     /// When the entry of this path was last read, in the same way.
     FILETIME GetLastAccessTime() const;
@@ -88,7 +89,7 @@ public:
     static bool GetLastAccessTime(const CString& path, FILETIME& time);
     /// The entries of Directory() that match a pattern, each behind Directory() and a backslash, in the
     /// system's order: subdirectories, the folder itself and the one above it too. For a relative path
-    /// that is a folder of the root.
+    /// that is a folder of the root; for a path with a part too long to split it is the root itself.
     /// @param pattern an asterisk for any characters, a question mark for one; case counts, and two asterisks
     /// with a dot between match everything
     std::vector<CString> GetFilesInDirectory(const CString& pattern);

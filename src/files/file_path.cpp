@@ -1,4 +1,7 @@
+#include <new>
+
 #include "basalt/files.h"
+#include "basalt/platform/error.h"
 #include "src/files/handle_scoper.h"
 #include "src/platform/file.h"
 #include "src/platform/file_search.h"
@@ -9,9 +12,29 @@ namespace {
 using basalt::platform::first_match_attributes;
 using SearchScoper = HANDLEScoperBase<FindFileHandleCloser>;
 
+// For a search that failed: an answer that there is nothing would be made up if it was for want of memory.
+void require_memory() {
+    if (GetLastError() == ERROR_NOT_ENOUGH_MEMORY) {
+        throw std::bad_alloc();
+    }
+}
+
+// 0 when there is no entry.
+DWORD attributes_of(const CString& path) {
+    const DWORD attributes = first_match_attributes(path);
+    if (attributes == 0) {
+        require_memory();
+    }
+    return attributes;
+}
+
 HANDLE find_first(const CString& path, WIN32_FIND_DATAW& entry) {
     const HANDLE search = FindFirstFileW(path, &entry);
-    return search != INVALID_HANDLE_VALUE ? search : nullptr;
+    if (search == INVALID_HANDLE_VALUE) {
+        require_memory();
+        return nullptr;
+    }
+    return search;
 }
 
 // A time of the second entry, or of the first where that is the only one. False when there is none.
@@ -21,7 +44,9 @@ bool find_time(const CString& path, FILETIME WIN32_FIND_DATAW::*which, FILETIME&
     if (!search.is_open()) {
         return false;
     }
-    FindNextFileW(search.get(), &entry);
+    if (FindNextFileW(search.get(), &entry) == 0) {
+        require_memory();
+    }
     time = entry.*which;
     return true;
 }
@@ -147,12 +172,12 @@ FILETIME CFilePath::GetLastAccessTime() const {
 }
 
 bool CFilePath::FileExists(const CString& path) {
-    const DWORD attributes = first_match_attributes(path);
+    const DWORD attributes = attributes_of(path);
     return attributes != 0 && (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0;
 }
 
 bool CFilePath::IsDirectory(const CString& path) {
-    return (first_match_attributes(path) & FILE_ATTRIBUTE_DIRECTORY) != 0;
+    return (attributes_of(path) & FILE_ATTRIBUTE_DIRECTORY) != 0;
 }
 
 bool CFilePath::GetFileCreationTime(const CString& path, FILETIME& time) {

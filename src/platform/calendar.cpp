@@ -69,6 +69,6 @@ BOOL FileTimeToSystemTime(const FILETIME* ticks, SYSTEMTIME* time) {
 void GetSystemTime(SYSTEMTIME* time) {
     timespec now{};
     clock_gettime(CLOCK_REALTIME, &now);
-    const FILETIME ticks = file_time(std::max<std::int64_t>(ticks_of(now), 0));
+    const FILETIME ticks = file_time(ticks_of(now));
     FileTimeToSystemTime(&ticks, time);
 }

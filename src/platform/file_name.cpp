@@ -2,6 +2,7 @@
 
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <iterator>
 
@@ -12,9 +13,12 @@
 namespace basalt::platform {
 namespace {
 
-// Low surrogates, which no UTF-8 holds.
-constexpr wchar_t FIRST_BYTE = 0xDC80;
-constexpr wchar_t LAST_BYTE = 0xDCFF;
+// Low surrogates, which no UTF-8 holds: a byte's value is added to the first.
+constexpr wchar_t BYTES = 0xDC00;
+
+constexpr bool stands_for_byte(wchar_t ch) {
+    return ch == BYTES + L'\\' || (ch >= BYTES + 0x80 && ch <= BYTES + 0xFF);
+}
 
 }  // namespace
 
@@ -24,7 +28,7 @@ bool file_name_from_wide(std::wstring_view name, std::string& result) {
     for (const wchar_t ch : name) {
         if (ch == L'\\') {
             result.push_back('/');
-        } else if (ch >= FIRST_BYTE && ch <= LAST_BYTE) {
+        } else if (stands_for_byte(ch)) {
             result.push_back(static_cast<char>(ch & 0xFF));
         } else if (is_unicode_scalar(ch)) {
             char bytes[MAX_UTF8_BYTES];
@@ -62,6 +66,11 @@ void wide_from_file_name(std::string_view name, std::wstring& result) {
     for (const char byte : name) {
         result.push_back(wide_from_byte(byte));
     }
+}
+
+void wide_from_system_name(std::string_view name, std::wstring& result) {
+    wide_from_file_name(name, result);
+    std::replace(result.begin(), result.end(), L'\\', static_cast<wchar_t>(BYTES + L'\\'));
 }
 
 std::wstring wide_from_file_name(std::string_view name) {

@@ -10,7 +10,7 @@
 namespace basalt::platform {
 
 // The name the system knows: UTF-8, each `\` a `/`. False for text with values that are no characters; those
-// from 0xDC80 to 0xDCFF stand for single bytes.
+// from 0xDC80 to 0xDCFF and 0xDC5C stand for single bytes, the last for a `\` that is part of a name.
 bool file_name_from_wide(std::wstring_view name, std::string& result);
 
 // The same for the time of a call. A name in ASCII that is not very long, as nearly all are, takes no memory.
@@ -40,6 +40,8 @@ constexpr wchar_t wide_from_byte(char byte) {
 std::wstring wide_from_file_name(std::string_view name);
 // The same in the storage that the result has.
 void wide_from_file_name(std::string_view name, std::wstring& result);
+// The same of a name that the system gave, where a `\` is no separator: it would lead somewhere else.
+void wide_from_system_name(std::string_view name, std::wstring& result);
 
 // The published code of an errno value that a call gave for a path: a missing file is told from a missing
 // folder.

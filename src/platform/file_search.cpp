@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <iterator>
 #include <memory>
+#include <new>
 #include <string>
 #include <string_view>
 
@@ -75,16 +76,20 @@ DWORD attributes_of(mode_t mode) {
     return S_ISDIR(mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
 }
 
-void describe(const struct statx& status, std::wstring_view name, WIN32_FIND_DATAW& entry) {
+void describe(std::wstring_view name, mode_t mode, WIN32_FIND_DATAW& entry) {
     entry = {};
-    entry.dwFileAttributes = attributes_of(status.stx_mode);
+    entry.dwFileAttributes = attributes_of(mode);
+    name.copy(entry.cFileName, std::size(entry.cFileName) - 1);
+}
+
+void describe(std::wstring_view name, const struct statx& status, WIN32_FIND_DATAW& entry) {
+    describe(name, status.stx_mode, entry);
     const bool knows_creation = (status.stx_mask & STATX_BTIME) != 0;
     entry.ftCreationTime = file_time(knows_creation ? status.stx_btime : status.stx_ctime);
     entry.ftLastAccessTime = file_time(status.stx_atime);
     entry.ftLastWriteTime = file_time(status.stx_mtime);
     entry.nFileSizeHigh = static_cast<DWORD>(status.stx_size >> 32);
     entry.nFileSizeLow = static_cast<DWORD>(status.stx_size & 0xFFFFFFFF);
-    name.copy(entry.cFileName, std::size(entry.cFileName) - 1);
 }
 
 // What a link leads to, or the link itself where that is nothing. A link is rare, so it is not followed at
@@ -126,7 +131,7 @@ DWORD FileSearch::advance() {
         if (m_found == nullptr) {
             return errno == 0 ? ERROR_NO_MORE_FILES : error_from_errno(errno);
         }
-        basalt::platform::wide_from_file_name(m_found->d_name, m_name);
+        basalt::platform::wide_from_system_name(m_found->d_name, m_name);
     } while (!matches_wildcards(m_name, m_pattern));
     return ERROR_SUCCESS;
 }
@@ -138,15 +143,14 @@ DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
             return error;
         }
         struct statx status = {};
-        if (!query(dirfd(m_folder), m_found->d_name, status)) {
-            if (errno == ENOENT) {
-                continue;  // deleted meanwhile
-            }
+        if (query(dirfd(m_folder), m_found->d_name, status)) {
+            describe(m_name, status, entry);
+        } else if (errno == ENOENT) {
+            continue;  // deleted meanwhile
+        } else {
             // A folder that may be read but not entered tells names and kinds alone.
-            status = {};
-            status.stx_mode = m_found->d_type == DT_DIR ? S_IFDIR : S_IFREG;
+            describe(m_name, m_found->d_type == DT_DIR ? S_IFDIR : S_IFREG, entry);
         }
-        describe(status, m_name, entry);
         return ERROR_SUCCESS;
     }
 }
@@ -197,7 +201,7 @@ DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& e
         struct statx status = {};
         const DWORD error = query_path(path, [&](const char* name) { return query(AT_FDCWD, name, status); });
         if (error == ERROR_SUCCESS) {
-            describe(status, sought.last, entry);
+            describe(sought.last, status, entry);
         }
         return error;
     }
@@ -237,7 +241,11 @@ void basalt::platform::for_each_match(const wchar_t* path, const std::function<v
         return;
     }
     FileSearch search;
-    if (open_folder(sought, search) == ERROR_SUCCESS) {
+    const DWORD error = open_folder(sought, search);
+    if (error == ERROR_NOT_ENOUGH_MEMORY) {
+        throw std::bad_alloc();
+    }
+    if (error == ERROR_SUCCESS) {
         while (search.advance() == ERROR_SUCCESS) {
             visit(search.name());
         }

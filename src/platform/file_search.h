@@ -12,7 +12,8 @@
 // What a search tells of an entry; links answer for what they lead to, and for themselves where they lead
 // nowhere.
 struct WIN32_FIND_DATAW {
-    DWORD dwFileAttributes;   // FILE_ATTRIBUTE_DIRECTORY, or FILE_ATTRIBUTE_NORMAL for everything else
+    DWORD dwFileAttributes;  // FILE_ATTRIBUTE_DIRECTORY, or FILE_ATTRIBUTE_NORMAL for everything else
+    // Times and size are 0 where the folder may be read but not entered.
     FILETIME ftCreationTime;  // of the last change of the entry where the file system keeps no creation time
     FILETIME ftLastAccessTime;
     FILETIME ftLastWriteTime;

@@ -25,7 +25,8 @@ DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
         basalt::platform::set_last_error_from_errno();
         return 0;
     }
-    const std::wstring wide = basalt::platform::wide_from_file_name({link, static_cast<std::size_t>(length)});
+    std::wstring wide;
+    basalt::platform::wide_from_system_name({link, static_cast<std::size_t>(length)}, wide);
     const std::size_t copied = std::min<std::size_t>(wide.size(), size - 1);
     std::copy_n(wide.data(), copied, name);
     name[copied] = L'\0';

@@ -4,7 +4,9 @@
 
 #include <time.h>
 
+#include <algorithm>
 #include <cstdint>
+#include <limits>
 
 #include "basalt/platform/calendar.h"
 
@@ -25,10 +27,16 @@ constexpr std::int64_t tick_count(const FILETIME& time) {
     return static_cast<std::int64_t>(std::uint64_t{time.dwHighDateTime} << 32 | time.dwLowDateTime);
 }
 
-// Seconds may be negative, nanoseconds never; they are cut to ticks. A time 29,000 years from now or farther
-// is outside the range.
+// Seconds may be negative, nanoseconds never; they are cut to ticks. Times before 1601 come to the first tick
+// and those after 30828 to the last second that a signed count holds whole: some file systems keep such
+// times.
 constexpr std::int64_t ticks_of(std::int64_t seconds_since_1970, std::int64_t nanoseconds) {
-    return (seconds_since_1970 + SECONDS_BEFORE_1970) * TICKS_PER_SECOND + nanoseconds / NANOSECONDS_PER_TICK;
+    constexpr std::int64_t LAST_SECOND = std::numeric_limits<std::int64_t>::max() / TICKS_PER_SECOND - 1;
+    if (seconds_since_1970 < -SECONDS_BEFORE_1970) {
+        return 0;
+    }
+    const std::int64_t seconds = std::min(seconds_since_1970, LAST_SECOND - SECONDS_BEFORE_1970);
+    return (seconds + SECONDS_BEFORE_1970) * TICKS_PER_SECOND + nanoseconds / NANOSECONDS_PER_TICK;
 }
 
 inline std::int64_t ticks_of(const timespec& time) {

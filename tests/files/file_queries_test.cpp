@@ -121,8 +121,9 @@ TEST_F(FileQueries, lists_odd_names_and_finds_each_again) {
     for (const std::wstring& name : expected) {
         make_file(utf8_from_wide(name));
     }
-    expected.insert({L".", L"..", L"dir.d", L"latin\xDCE9.txt"});
+    expected.insert({L".", L"..", L"dir.d", L"latin\xDCE9.txt", L"back\xDC5Cslash"});
     make_file("latin\xE9.txt");
+    make_file("back\\slash");
     fs::create_directory(root / "dir.d");
     CFilePath folder(text(wide_root));
     ASSERT_TRUE(folder.IsDirectory());
@@ -152,6 +153,9 @@ TEST_F(FileQueries, lists_odd_names_and_finds_each_again) {
 TEST_F(FileQueries, folders_without_permission) {
     fs::create_directory(root / "closed");
     make_file("closed/file");
+    fs::create_directory(root / "listed");
+    make_file("listed/file");
+    ASSERT_EQ(chmod((root / "listed").c_str(), 0744), 0);
     const auto check = [&] {
         chmod((root / "closed").c_str(), 0);
         if (geteuid() == 0 && (chmod(root.c_str(), 0755) != 0 || seteuid(65'534) != 0)) {
@@ -160,6 +164,12 @@ TEST_F(FileQueries, folders_without_permission) {
         EXPECT_TRUE(CFilePath::IsDirectory(at(L"closed")));
         EXPECT_FALSE(CFilePath::FileExists(at(L"closed/file")));
         EXPECT_TRUE(CFilePath(at(L"closed")).GetFilesInDirectory(L"*").empty());
+        if (geteuid() == 65'534) {
+            FILETIME time{1, 2};
+            EXPECT_TRUE(CFilePath::FileExists(at(L"listed/f*")));
+            EXPECT_TRUE(CFilePath::GetLastAccessTime(at(L"listed/f*"), time));
+            EXPECT_EQ(ticks(time), 0U) << "a time that nobody told";
+        }
         std::_Exit(testing::Test::HasFailure() ? 1 : 0);
     };
     GTEST_FLAG_SET(death_test_style, "fast");
@@ -167,7 +177,7 @@ TEST_F(FileQueries, folders_without_permission) {
     fs::permissions(root / "closed", fs::perms::owner_all);
 }
 
-TEST_F(FileQueries, nothing_leaks_when_memory_runs_out) {
+TEST_F(FileQueries, nothing_leaks_and_nothing_is_made_up_when_memory_runs_out) {
     for (int i = 0; i < 10; ++i) {
         make_file("a rather long name for a job " + std::to_string(i));
     }
@@ -180,6 +190,17 @@ TEST_F(FileQueries, nothing_leaks_when_memory_runs_out) {
                                  EXPECT_EQ(listed, fired ? 0U : 10U);
                                  EXPECT_EQ(open_descriptors(), descriptors);
                              });
+    fs::create_directory(root / "d\xC3\xA9j\xC3\xA0");
+    const CString name = at(L"d\xE9j\xE0");
+    bool right = true;
+    const auto ask = [&] {
+        FILETIME time;
+        right = true;
+        const CFilePath path(name);
+        right = path.FileNameOnly().IsEmpty() && CFilePath::IsDirectory(name) &&
+                CFilePath::GetLastAccessTime(name, time);
+    };
+    EXPECT_GT(with_failing_allocations(ask, [&](bool) { EXPECT_TRUE(right); }), 5);
 }
 
 }  // namespace

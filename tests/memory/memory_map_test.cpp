@@ -176,8 +176,14 @@ TEST(MemoryMap, clean_up_deletes_what_nobody_holds) {
         folder.write(name);
     }
     std::filesystem::create_directory(folder / "~folder.mem");
+    // A name that would lead elsewhere if its `\` were a separator.
+    std::filesystem::create_directory(folder / "~within");
+    folder.write("~within/kept.mem");
+    folder.write("~within\\kept.mem");
     const CMemoryMap map(SIZE);
     CMemoryMap::CleanUp();
+    EXPECT_TRUE(std::filesystem::remove(folder / "~within/kept.mem"));
+    EXPECT_TRUE(std::filesystem::remove(folder / "~within"));
     Names left = folder.names();
     for (const char* name : {"x~0000001.mem", "~0000001.tmp", "~0000001.MEM", "vma1.tmp", "~folder.mem"}) {
         EXPECT_EQ(left.erase(name), 1U) << name;

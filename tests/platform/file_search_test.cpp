@@ -166,6 +166,18 @@ TEST(FileSearch, tells_kinds_sizes_and_times) {
     EXPECT_EQ(entry_of(folder.wide(L"file")).nFileSizeLow, 7U);
 }
 
+TEST(FileSearch, brings_times_beyond_the_count_to_its_ends) {
+    using basalt::platform::ticks_of;
+    constexpr std::int64_t FIRST = -11'644'473'600;  // 1601, in seconds from 1970
+    constexpr std::int64_t LAST = 910'692'730'084;   // the last one that 2^63 - 1 ticks hold whole
+    EXPECT_EQ(ticks_of(FIRST, 100), 1);
+    EXPECT_EQ(ticks_of(FIRST - 1, 999'999'999), 0);
+    EXPECT_EQ(ticks_of(INT64_MIN, 0), 0);
+    EXPECT_EQ(ticks_of(LAST, 999'999'999), 9'223'372'036'849'999'999);
+    EXPECT_EQ(ticks_of(LAST + 1, 0), 9'223'372'036'840'000'000);
+    EXPECT_EQ(ticks_of(INT64_MAX, 999'999'999), 9'223'372'036'849'999'999);
+}
+
 TEST(FileSearch, every_failing_call_is_told_and_leaves_nothing_open) {
     const ScratchFolder folder;
     folder.write("a");

@@ -1,10 +1,12 @@
 #include "src/platform/bmp_file.h"
 
-#include <stdio.h>
+#include <stdlib.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include <cerrno>
+#include <climits>
+#include <cstring>
 
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
@@ -21,12 +23,23 @@ namespace {
 constexpr std::uint32_t FILE_HEADER_BYTES = 14;
 constexpr std::uint32_t IMAGE_HEADER_BYTES = 40;
 
-// Bytes of numbers with the lowest first, and what they are written to.
+// A file being written, with a buffer of its own: where opening has emptied a file, nothing may be left that
+// can run out of memory. The first error stands; nothing is written after it.
 class Writer {
 public:
-    explicit Writer(FILE* file) : m_file(file) {}
+    explicit Writer(int file) noexcept : m_file(file) {}
 
-    void bytes(const void* from, std::size_t count) { ::fwrite_unlocked(from, 1, count, m_file); }
+    void bytes(const void* from, std::size_t count) {
+        if (count > sizeof m_buffer - m_size) {
+            flush();
+            if (count > sizeof m_buffer) {
+                write(static_cast<const char*>(from), count);
+                return;
+            }
+        }
+        std::memcpy(m_buffer + m_size, from, count);
+        m_size += count;
+    }
     void word16(std::uint32_t value) {
         const unsigned char both[] = {static_cast<unsigned char>(value & 0xFF),
                                       static_cast<unsigned char>(value >> 8 & 0xFF)};
@@ -37,8 +50,24 @@ public:
         word16(value >> 16);
     }
 
+    void flush() {
+        write(m_buffer, m_size);
+        m_size = 0;
+    }
+    // 0, or the errno value of the first failure.
+    int error() const { return m_error; }
+
 private:
-    FILE* m_file;
+    void write(const char* from, std::size_t count) {
+        if (m_error == 0 && !write_whole(m_file, from, count)) {
+            m_error = errno;
+        }
+    }
+
+    const int m_file;
+    int m_error = 0;
+    std::size_t m_size = 0;
+    char m_buffer[16384];
 };
 
 void write_headers(const Surface& surface, Writer& writer) {
@@ -85,24 +114,23 @@ void write_row(const Surface& surface, int y, Writer& writer) {
     });
 }
 
-FILE* open_file(const char* name) {
-    const int file = open_for_writing(name, 0);
-    if (file < 0) {
-        return nullptr;
+// Whether the path, no link followed, is that file's; then it is deleted.
+bool delete_if_it_is(const char* path, const struct stat& file) {
+    struct stat there = {};
+    if (::lstat(path, &there) != 0 || there.st_dev != file.st_dev || there.st_ino != file.st_ino) {
+        return false;
     }
-    FILE* const stream = ::fdopen(file, "w");
-    if (stream == nullptr) {
-        const int error = errno;
-        ::close(file);
-        errno = error;
-    }
-    return stream;
+    ::unlink(path);
+    return true;
 }
 
-// A device or pipe that was named is not this layer's to delete.
-bool is_regular_file(FILE* file) {
-    struct stat status = {};
-    return ::fstat(::fileno(file), &status) == 0 && S_ISREG(status.st_mode);
+// Deletes the file that was begun, wherever links lead to it, unless another has taken its place meanwhile. A
+// device or pipe that was named is not this layer's to delete.
+void delete_begun(const char* name, const struct stat& begun) {
+    char path[PATH_MAX];
+    if (S_ISREG(begun.st_mode) && !delete_if_it_is(name, begun) && ::realpath(name, path) != nullptr) {
+        delete_if_it_is(path, begun);
+    }
 }
 
 }  // namespace
@@ -113,33 +141,32 @@ bool write_bmp_file(const Surface& surface, const wchar_t* name) {
         SetLastError(ERROR_INVALID_NAME);
         return false;
     }
-    FILE* const file = open_file(file_name.c_str());
-    if (file == nullptr) {
+    const int file = open_for_writing(file_name.c_str(), 0);
+    if (file < 0) {
         set_last_error_from_errno();
         return false;
     }
-    const bool may_be_deleted = is_regular_file(file);
+    struct stat begun = {};
+    (void)::fstat(file, &begun);  // if it cannot be told, the file stays, empty
     const FileSizeSignalHeld held;
     Writer writer(file);
     write_headers(surface, writer);
-    for (int y = surface.height - 1; y >= 0 && ::ferror_unlocked(file) == 0; --y) {
+    for (int y = surface.height - 1; y >= 0 && writer.error() == 0; --y) {
         write_row(surface, y, writer);
     }
-    // The stream's error outlives errno; the call that closes it may be the first to fail.
-    const bool written = ::fflush_unlocked(file) == 0 && ::ferror_unlocked(file) == 0;
-    const int error = errno;
-    const bool closed = ::fclose(file) == 0;
-    if (written && closed) {
+    writer.flush();
+    int error = writer.error();
+    if (error != 0) {
+        (void)!::ftruncate(file, 0);  // no part of a picture by another name either; no device or pipe minds
+    }
+    if (::close(file) != 0 && error == 0) {
+        error = errno;
+    }
+    if (error == 0) {
         return true;
     }
-    if (written) {
-        set_last_error_from_errno();
-    } else {
-        SetLastError(error_from_errno(error));
-    }
-    if (may_be_deleted) {
-        ::unlink(file_name.c_str());
-    }
+    SetLastError(error_from_errno(error));
+    delete_begun(file_name.c_str(), begun);
     return false;
 }
 

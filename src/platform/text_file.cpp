@@ -1,15 +1,18 @@
 #include "src/platform/text_file.h"
 
 #include <fcntl.h>
+#include <pthread.h>
 #include <sys/resource.h>
 #include <sys/single_threaded.h>
 #include <unistd.h>
 
-#include <cerrno>
+#include <atomic>
+#include <cstdint>
 #include <cstring>
 #include <mutex>
 #include <optional>
 #include <string>
+#include <utility>
 
 #include "src/platform/code_page.h"
 #include "src/platform/file_name.h"
@@ -32,6 +35,17 @@ std::string system_name(const char* path) {
 constinit Lock s_files_lock;
 constinit TextFile* s_files = nullptr;
 
+// How many forks lie between the process that loaded the library and this one, so that a process knows what
+// it wrote itself; asking the system who this is would double the time of a short text.
+constinit std::atomic<std::uint32_t> s_generation = 0;
+
+// Once, under the lock of the files; the C library forgets it when the library is unloaded.
+bool counts_forks() {
+    static constinit bool counts = false;
+    counts = counts || ::pthread_atfork(nullptr, nullptr, [] { ++s_generation; }) == 0;
+    return counts;
+}
+
 [[gnu::destructor]] void send_what_is_left() {
     TextFile::send_all();
 }
@@ -47,8 +61,12 @@ std::unique_ptr<TextFile> TextFile::open(const char* path) noexcept {
         if (file->m_file < 0) {
             return std::unique_ptr<TextFile>();
         }
-        file->m_owner = ::getpid();
         const std::lock_guard guard(s_files_lock);
+        if (!counts_forks()) {
+            ::close(std::exchange(file->m_file, -1));
+            return std::unique_ptr<TextFile>();
+        }
+        file->m_writer = s_generation;
         file->m_next = s_files;
         if (s_files != nullptr) {
             s_files->m_previous = file.get();
@@ -78,10 +96,9 @@ void TextFile::send_all() noexcept {
     if (!files) {
         return;
     }
-    const pid_t process = ::getpid();
     for (TextFile* file = s_files; file != nullptr; file = file->m_next) {
         const std::unique_lock guard(file->m_lock, std::try_to_lock);
-        if (guard && file->m_owner == process) {
+        if (guard && file->m_writer == s_generation) {
             file->send(file->m_size);
         }
     }
@@ -94,6 +111,7 @@ void TextFile::write(std::wstring_view text) noexcept {
     if (__libc_single_threaded == 0) {
         guard.lock();
     }
+    m_writer = s_generation.load(std::memory_order_relaxed);
     std::size_t before = m_size;
     std::mbstate_t state{};
     while (!text.empty()) {
@@ -114,14 +132,7 @@ void TextFile::send(std::size_t count) noexcept {
     if (::getrlimit(RLIMIT_FSIZE, &limit) != 0 || limit.rlim_cur != RLIM_INFINITY) {
         held.emplace();
     }
-    for (std::size_t sent = 0; sent < count;) {
-        const ssize_t taken = ::write(m_file, m_bytes + sent, count - sent);
-        if (taken > 0) {
-            sent += static_cast<std::size_t>(taken);
-        } else if (taken == 0 || errno != EINTR) {
-            break;
-        }
-    }
+    write_whole(m_file, m_bytes, count);
     m_size -= count;
     std::memmove(m_bytes, m_bytes + count, m_size);
 }

@@ -2,10 +2,9 @@
 #ifndef BASALT_SRC_PLATFORM_TEXT_FILE_H
 #define BASALT_SRC_PLATFORM_TEXT_FILE_H
 
-#include <sys/types.h>
-
 #include <climits>
 #include <cstddef>
+#include <cstdint>
 #include <memory>
 #include <string_view>
 
@@ -35,7 +34,8 @@ public:
 
     // Sends the buffers of all that are open out: what the end of the process does, as for a stream of the C
     // library. A file that a thread writes to meanwhile is left out, since that thread may never come back,
-    // and so is one that a parent process opened: it sends the same bytes itself.
+    // and so is one that a parent process opened and this one has not written to: the parent sends the same
+    // bytes itself.
     static void send_all() noexcept;
 
 private:
@@ -47,7 +47,7 @@ private:
     void send(std::size_t count) noexcept;
 
     int m_file = -1;
-    pid_t m_owner = 0;
+    std::uint32_t m_writer = 0;  // generation of the process that opened it or wrote to it last
     TextFile* m_next = nullptr;  // open files
     TextFile* m_previous = nullptr;
     Lock m_lock;

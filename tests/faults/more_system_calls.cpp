@@ -6,7 +6,6 @@
 #include <unistd.h>
 
 #include <cerrno>
-#include <cstdio>
 
 #include "tests/faults/more_system_calls.h"
 #include "tests/support/system_failures.h"
@@ -22,15 +21,15 @@ long files_kept = 0;
 extern "C" {
 
 int __real_access(const char*, int);
-int __real_fclose(std::FILE*);
-std::FILE* __real_fdopen(int, const char*);
-int __real_fflush_unlocked(std::FILE*);
+int __real_close(int);
 int __real_fstatat(int, const char*, struct stat*, int);
+int __real_ftruncate(int, off_t);
 int __real_getifaddrs(struct ifaddrs**);
 int __real_lstat(const char*, struct stat*);
 locale_t __real_newlocale(int, const char*, locale_t);
 ssize_t __real_pread(int, void*, size_t, off_t);
 ssize_t __real_readlink(const char*, char*, size_t);
+char* __real_realpath(const char*, char*);
 int __real_stat(const char*, struct stat*);
 int __real_unlink(const char*);
 ssize_t __real_write(int, const void*, size_t);
@@ -39,24 +38,24 @@ int __wrap_access(const char* path, int mode) {
     return system_call_fails(EACCES) ? -1 : __real_access(path, mode);
 }
 // The file is closed all the same, as the system does it.
-int __wrap_fclose(std::FILE* file) {
-    const int result = __real_fclose(file);
-    return system_call_fails(ENOSPC) ? EOF : result;
-}
-std::FILE* __wrap_fdopen(int file, const char* mode) {
-    return system_call_fails(ENOMEM) ? nullptr : __real_fdopen(file, mode);
-}
-int __wrap_fflush_unlocked(std::FILE* file) {
-    return system_call_fails(ENOSPC) ? EOF : __real_fflush_unlocked(file);
+int __wrap_close(int file) {
+    const int result = __real_close(file);
+    return system_call_fails(EIO) ? -1 : result;
 }
 int __wrap_fstatat(int folder, const char* path, struct stat* status, int flags) {
     return system_call_fails(EIO) ? -1 : __real_fstatat(folder, path, status, flags);
+}
+int __wrap_ftruncate(int file, off_t size) {
+    return system_call_fails(EIO) ? -1 : __real_ftruncate(file, size);
 }
 int __wrap_getifaddrs(struct ifaddrs** list) {
     return system_call_fails(ENOMEM) ? -1 : __real_getifaddrs(list);
 }
 int __wrap_lstat(const char* path, struct stat* status) {
     return system_call_fails(EIO) ? -1 : __real_lstat(path, status);
+}
+char* __wrap_realpath(const char* path, char* resolved) {
+    return system_call_fails(EIO) ? nullptr : __real_realpath(path, resolved);
 }
 locale_t __wrap_newlocale(int mask, const char* name, locale_t base) {
     return system_call_fails(ENOMEM) ? nullptr : __real_newlocale(mask, name, base);

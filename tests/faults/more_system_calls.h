@@ -1,5 +1,5 @@
-// Makes further system calls fail (linked with --wrap): access, fclose, fdopen, fflush_unlocked, fstatat,
-// getifaddrs, lstat, newlocale, pread, readlink, stat, unlink, write.
+// Makes further system calls fail (linked with --wrap): access, close, fstatat, ftruncate,
+// getifaddrs, lstat, newlocale, pread, readlink, realpath, stat, unlink, write.
 #ifndef BASALT_TESTS_FAULTS_MORE_SYSTEM_CALLS_H
 #define BASALT_TESTS_FAULTS_MORE_SYSTEM_CALLS_H
 

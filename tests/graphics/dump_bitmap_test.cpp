@@ -1,4 +1,5 @@
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -121,12 +122,38 @@ TEST_F(DumpBitmapTest, DoesNotWaitForAPipeThatNobodyReads) {
     EXPECT_TRUE(fs::is_fifo(pipe)) << "it is not ours to delete";
 }
 
-TEST_F(DumpBitmapTest, ReportsNothingWithoutMemory) {
+TEST_F(DumpBitmapTest, ReportsNothingAndLeavesNoPartWithoutMemory) {
     Canvas canvas(Picture(20, 20, 0x112233), 32);
     canvas.deselect();
     const CString name(file("a.bmp").c_str());
-    with_failing_allocations([&] { DumpBitmap(canvas.bitmap(), name); }, [](bool) {});  // nor does it throw
-    EXPECT_EQ(bytes_of(file("a.bmp")), expected_file(canvas));
+    const std::vector<unsigned char> whole = expected_file(canvas);
+    with_failing_allocations(
+        [&] {
+            fs::remove(file("a.bmp"));
+            DumpBitmap(canvas.bitmap(), name);
+        },
+        [&](bool fired) {
+            EXPECT_TRUE(fired || fs::exists(file("a.bmp")));
+            EXPECT_TRUE(!fs::exists(file("a.bmp")) || bytes_of(file("a.bmp")) == whole);
+        });
+}
+
+TEST_F(DumpBitmapTest, LeavesNoPartOfAPictureByAnyName) {
+    std::ofstream(file("target.bmp")) << "what was there before";
+    fs::create_hard_link(file("target.bmp"), file("other name.bmp"));
+    fs::create_symlink("target.bmp", file("link.bmp"));
+    Canvas canvas(100, 100, 32);
+    rlimit limit = {};
+    ASSERT_EQ(getrlimit(RLIMIT_FSIZE, &limit), 0);
+    const rlimit small = {1000, limit.rlim_max};
+    ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &small), 0);
+    dump(canvas, file("link.bmp"));
+    ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &limit), 0);
+    EXPECT_TRUE(fs::is_symlink(file("link.bmp"))) << "it is not ours to delete";
+    EXPECT_FALSE(fs::exists(file("target.bmp")));
+    EXPECT_EQ(fs::file_size(file("other name.bmp")), 0U);
+    dump(canvas, file("link.bmp"));
+    EXPECT_EQ(bytes_of(file("target.bmp")), expected_file(canvas));
 }
 
 TEST_F(DumpBitmapTest, SharesARunOfTheCodecAmongThreads) {

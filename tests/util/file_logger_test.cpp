@@ -9,6 +9,7 @@
 
 #include <algorithm>
 #include <atomic>
+#include <cerrno>
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
@@ -31,10 +32,16 @@ std::atomic<std::size_t> taken_at_once = SIZE_MAX;
 
 }  // namespace
 
-/// Stands in for the system's (linked with --wrap): it may take a part of what it is given.
+/// Stands in for the system's (linked with --wrap): it may take a part of what it is given, and a signal may
+/// come before every other of its calls.
 extern "C" {
 ssize_t __real_write(int file, const void* bytes, std::size_t count);
 ssize_t __wrap_write(int file, const void* bytes, std::size_t count) {
+    static std::atomic<unsigned> calls = 0;
+    if (taken_at_once != SIZE_MAX && ++calls % 2 == 0) {
+        errno = EINTR;
+        return -1;
+    }
     return __real_write(file, bytes, std::min(count, taken_at_once.load()));
 }
 }
@@ -196,6 +203,22 @@ TEST_F(FileLog, what_a_log_left_open_holds_is_sent_once_when_its_process_exits) 
     EXPECT_EXIT(leave_open(), testing::ExitedWithCode(0), "");
     EXPECT_EQ(contents(file), "left");
     EXPECT_EQ(contents(folder / "another"), "another");
+}
+
+TEST_F(FileLog, what_a_forked_child_wrote_itself_is_sent_when_it_exits) {
+    const auto become_a_daemon = [&] {
+        auto* const log = new FileLogger(file.c_str());
+        log->Write(L"parent;");
+        const pid_t child = fork();
+        if (child != 0) {
+            waitpid(child, nullptr, 0);
+            _exit(0);
+        }
+        log->Write(L"child;");
+        std::exit(0);
+    };
+    EXPECT_EXIT(become_a_daemon(), testing::ExitedWithCode(0), "");
+    EXPECT_EQ(contents(file), "parent;child;");
 }
 
 TEST_F(FileLog, what_the_system_takes_in_parts_is_whole) {

@@ -35,6 +35,7 @@ BASALT_API int _transparentblt(HDC dest, int xDest, int yDest, int wDest, int hD
 /// @param mode 0 from left to right, 1 from top to bottom; handed on to ::GradientFill, which draws nothing
 /// for another
 ///
+/// At 16 bits a pixel a channel of the gradient is cut to its 5 bits, where other drawing takes the nearest.
 /// Corners need a right side right of the left one and a bottom below the top; the gradient alone takes
 /// opposite sides in any order.
 BASALT_API void _gradientfill(HDC hdc, int left, int top, int right, int bottom, int cornerRadius,

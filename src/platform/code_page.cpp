@@ -66,13 +66,19 @@ std::size_t encode_kept(char* bytes, std::mbstate_t& state) {
 std::size_t encode_in_scope(wchar_t ch, char* bytes, std::mbstate_t& state) {
     std::mbstate_t before = state;
     const std::size_t length = is_unicode_scalar(ch) ? std::wcrtomb(bytes, ch, &state) : FAILED;
-    if (length != FAILED) {
+    if (length != FAILED && std::mbsinit(&state) == 0) {
         return length;
     }
-    const std::size_t kept = encode_kept(bytes, before);
-    bytes[kept] = '?';
+    char kept[MB_LEN_MAX];
+    const std::size_t kept_length = encode_kept(kept, before);
+    // The C library leaves out those of U+E0000 to U+E007F that an encoding lacks: no failure, and no bytes.
+    if (length != FAILED && !std::equal(bytes, bytes + length, kept, kept + kept_length)) {
+        return length;
+    }
+    std::copy_n(kept, kept_length, bytes);
+    bytes[kept_length] = '?';
     state = {};
-    return kept + 1;
+    return kept_length + 1;
 }
 
 // Answers the end of what was written, with what is kept back if that is the end of the text.

@@ -147,6 +147,7 @@ TEST(CodePage, single_and_double_byte_encodings) {
         const CodePage latin("ISO-8859-15");
         EXPECT_EQ(latin.widen("\xA4 \xE9"), L"\x20AC \xE9");
         EXPECT_EQ(latin.narrow(L"\x20AC \xE9 \x416"), "\xA4 \xE9 ?");
+        EXPECT_EQ(latin.narrow(L"a\U000E0041\U000E007F|"), "a??|") << "which the C library leaves out";
         const CodePage japanese("EUC-JP");
         EXPECT_EQ(japanese.widen("a\xC6\xFC\xB1"), L"a\x65E5\xFFFD") << "the last character is split";
         EXPECT_EQ(japanese.narrow(L"a\x65E5\xD800z"), "a\xC6\xFC?z");
@@ -155,6 +156,7 @@ TEST(CodePage, single_and_double_byte_encodings) {
         EXPECT_EQ(hong_kong.widen("\x88\x62z\x88\x62"), L"\xCA\x304z\xCA\x304");
         EXPECT_EQ(hong_kong.narrow(L"\xCA\x304z\xCA\x416\xCA\xD800\xCA"),
                   "\x88\x62z\x88\x66\xC7\xFA\x88\x66?\x88\x66");
+        EXPECT_EQ(hong_kong.narrow(L"\xCA\U000E0041\x304"), "\x88\x66??") << "no mark of what is kept back";
         EXPECT_EQ(CodePage("SHIFT_JISX0213").widen("\x82\xF5z"), L"\x304B\x309Az");
         const CodePage vietnamese("TCVN5712-1");
         EXPECT_EQ(vietnamese.widen("ba"), L"ba");

@@ -14,12 +14,29 @@ constexpr std::uint32_t BOUNDARY = std::uint32_t{32} << 20;
 
 // Bytes of the piece at the front of a range of `rest` bytes, which stops at the next boundary of 32 MiB; one
 // that begins at a boundary stops a byte short of the next. The sum is meant to have 32 bits.
-std::uint32_t piece_size(const std::byte* start, std::uint32_t rest) {
-    const auto offset = static_cast<std::uint32_t>(reinterpret_cast<std::uintptr_t>(start) % BOUNDARY);
+std::uint32_t piece_size(std::uintptr_t start, std::uint32_t rest) {
+    const auto offset = static_cast<std::uint32_t>(start % BOUNDARY);
     if (rest + offset < BOUNDARY) {
         return rest;
     }
     return offset == 0 ? BOUNDARY - 1 : BOUNDARY - offset;
+}
+
+// Calls `work` with the address and size of each piece of a range until it answers false, which is reported
+// and answered. Addresses are numbers here: the range may be any, null as well.
+template <class Work>
+bool for_each_piece(void* address, std::uint32_t size, Work work) {
+    auto piece = reinterpret_cast<std::uintptr_t>(address);
+    for (std::uint32_t rest = size; rest > 0;) {
+        const std::uint32_t bytes = piece_size(piece, rest);
+        if (!work(reinterpret_cast<void*>(piece), bytes)) {
+            ReportLastError();
+            return false;
+        }
+        piece += bytes;
+        rest -= bytes;
+    }
+    return true;
 }
 
 // Whether a size has 32 bits; what has more is reported as an invalid parameter.
@@ -48,19 +65,13 @@ void* commit(void* address, unsigned long size) {
         return nullptr;
     }
     void* base = nullptr;
-    auto* piece = static_cast<std::byte*>(address);
-    for (auto rest = static_cast<std::uint32_t>(size); rest > 0;) {
-        const std::uint32_t bytes = piece_size(piece, rest);
-        void* const pages = VirtualAlloc(piece, bytes, MEM_COMMIT, PAGE_READWRITE);
-        if (pages == nullptr) {
-            ReportLastError();
-            return nullptr;
-        }
-        base = base == nullptr ? pages : base;
-        piece += bytes;
-        rest -= bytes;
-    }
-    return base;
+    const bool done =
+        for_each_piece(address, static_cast<std::uint32_t>(size), [&](void* piece, DWORD bytes) {
+            void* const pages = VirtualAlloc(piece, bytes, MEM_COMMIT, PAGE_READWRITE);
+            base = base == nullptr ? pages : base;
+            return pages != nullptr;
+        });
+    return done ? base : nullptr;
 }
 
 int decommit(void* address, unsigned long size) {
@@ -68,17 +79,10 @@ int decommit(void* address, unsigned long size) {
         return 0;
     }
     int result = 0;
-    auto* piece = static_cast<std::byte*>(address);
-    for (auto rest = static_cast<std::uint32_t>(size); rest > 0;) {
-        const std::uint32_t bytes = piece_size(piece, rest);
+    for_each_piece(address, static_cast<std::uint32_t>(size), [&](void* piece, DWORD bytes) {
         result = VirtualFree(piece, bytes, MEM_DECOMMIT);
-        if (result == 0) {
-            ReportLastError();
-            return 0;
-        }
-        piece += bytes;
-        rest -= bytes;
-    }
+        return result != 0;
+    });
     return result;
 }
 

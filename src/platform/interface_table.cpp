@@ -50,11 +50,16 @@ MIB_IFROW row_of(const sockaddr_ll& link, const char* name) {
     return row;
 }
 
-// Calls `visit` with each row, in the system's order; the result is 0 or what the system refused.
-template <class Visit>
-DWORD visit_interfaces(const Visit& visit) {
+// Calls `visit` with the row of each interface whose index is wanted, in the system's order; the result is 0
+// or what the system refused.
+template <class Wanted, class Visit>
+DWORD visit_interfaces(const Wanted& wanted, const Visit& visit) {
     if (stand_in != nullptr) {
-        std::for_each(stand_in->begin(), stand_in->end(), visit);
+        for (const MIB_IFROW& row : *stand_in) {
+            if (wanted(row.dwIndex)) {
+                visit(row);
+            }
+        }
         return ERROR_SUCCESS;
     }
     ifaddrs* first = nullptr;
@@ -67,7 +72,9 @@ DWORD visit_interfaces(const Visit& visit) {
         if (entry->ifa_addr != nullptr && entry->ifa_addr->sa_family == AF_PACKET) {
             sockaddr_ll link;
             std::memcpy(&link, entry->ifa_addr, sizeof link);
-            visit(row_of(link, entry->ifa_name));
+            if (wanted(static_cast<DWORD>(link.sll_ifindex))) {
+                visit(row_of(link, entry->ifa_name));
+            }
         }
     }
     return ERROR_SUCCESS;
@@ -78,7 +85,8 @@ DWORD visit_interfaces(const Visit& visit) {
 DWORD GetIfTable(MIB_IFTABLE* table, DWORD* size, BOOL sorted) {
     std::size_t count = 0;
     std::size_t needed = offsetof(MIB_IFTABLE, table);
-    const DWORD error = visit_interfaces([&](const MIB_IFROW& row) {
+    const auto any = [](DWORD) { return true; };
+    const DWORD error = visit_interfaces(any, [&](const MIB_IFROW& row) {
         needed += sizeof row;
         if (needed <= *size) {
             table->table[count] = row;
@@ -101,13 +109,11 @@ DWORD GetIfTable(MIB_IFTABLE* table, DWORD* size, BOOL sorted) {
 }
 
 DWORD GetIfEntry(MIB_IFROW* row) {
-    const DWORD index = row->dwIndex;
     bool found = false;
-    const DWORD error = visit_interfaces([&](const MIB_IFROW& candidate) {
-        if (candidate.dwIndex == index) {
-            *row = candidate;
-            found = true;
-        }
+    const auto is_this = [index = row->dwIndex](DWORD candidate) { return candidate == index; };
+    const DWORD error = visit_interfaces(is_this, [&](const MIB_IFROW& candidate) {
+        *row = candidate;
+        found = true;
     });
     return error != ERROR_SUCCESS || found ? error : ERROR_FILE_NOT_FOUND;
 }

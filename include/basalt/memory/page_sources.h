@@ -21,7 +21,8 @@ class BASALT_API vlSharedMemoryAllocator {
 public:
     /// Reserves a range, or commits pages of one.
     /// @param address reserve: where the range is to begin, brought down to a multiple of 64 KiB, or null for
-    ///        anywhere; commit: the first byte to use
+    ///        anywhere; commit: the first byte to use; null reserves the first
+    ///        piece as well, and any further one fails
     /// @param size bytes, up to 2^32 - 1, whose pages are reserved or committed whole; committing 0 does
     ///        nothing and gives null, unreported
     /// @param type 0x1000 commits, 0x2000 reserves

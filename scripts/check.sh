@@ -2,7 +2,8 @@
 # The deeper checks, each a step: format, include directions, Clang, headers, clang-tidy, another time zone and
 # locale, a system short of everything, the package, exported symbols, the binary interface, the Python package,
 # hardening and the same bytes from another folder, results to the bit, sanitizers, every call that can fail failing,
-# many threads at once (STRESS_SECONDS=N each, 5), documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 10).
+# many threads at once (STRESS_SECONDS=N each, 5), documentation, the fuzzers, two at a time (FUZZ_SECONDS=N each, 60,
+# or FUZZ_UNTIL=T, seconds since 1970: by then, 10 to 60 each).
 # Stops at the first step that fails.
 # Usage: scripts/check.sh [step ...]             all steps, or only those named:
 #        format includes clang headers tidy elsewhere limits package symbols abi python hardening exact asan tsan
@@ -122,13 +123,13 @@ step_fuzz_one() {  # program; begins with the kept inputs, and what is found goe
     mkdir -p "${corpus[0]}"
     [ -d "${corpus[1]}" ] || unset "corpus[1]"
     [ "$name" != fuzz_code_page ] || export LOCPATH=$PWD/build/asan/locales ASAN_OPTIONS=detect_leaks=0
-    "$1" "${corpus[@]}" -max_total_time="${FUZZ_SECONDS:-10}" -max_len=2000 -len_control=0 -timeout=30 \
+    "$1" "${corpus[@]}" -max_total_time="$FUZZ_SECONDS" -max_len=2000 -len_control=0 -timeout=30 \
         -print_final_stats=1 -artifact_prefix="build/asan/$name-" 2>"$1.log" ||
         { tail -n 40 "$1.log"; return 255; }
     echo "$name: $(grep -c . "$1.log") lines, $(grep executed_units "$1.log")"
 }
 step_fuzz() {
-    local encoding
+    local encoding targets left
     cmake --preset asan >/dev/null
     cmake --build --preset asan
     # the encodings that the text fuzzer opens beside the system's own; the C library never frees what it reads
@@ -138,9 +139,14 @@ step_fuzz() {
         [ -d "build/asan/locales/$encoding" ] ||
             localedef -c -i POSIX -f $encoding "build/asan/locales/$encoding" || true
     done
+    mapfile -t targets < <(find build/asan/fuzz -maxdepth 1 -name 'fuzz_*' -type f -executable | sort)
+    if [ -z "${FUZZ_SECONDS:-}" ] && [ -n "${FUZZ_UNTIL:-}" ]; then
+        left=$(((FUZZ_UNTIL - $(date +%s)) * 2 / (${#targets[@]} + 1)))  # an odd one runs alone
+        FUZZ_SECONDS=$((left < 10 ? 10 : left > 60 ? 60 : left))
+    fi
+    export FUZZ_SECONDS=${FUZZ_SECONDS:-60}
     # two at a time; 255 ends the others as well
-    find build/asan/fuzz -maxdepth 1 -name 'fuzz_*' -type f -executable | sort |
-        xargs -P 2 -I {} bash scripts/check.sh --step fuzz_one {}
+    printf '%s\n' "${targets[@]}" | xargs -P 2 -I {} bash scripts/check.sh --step fuzz_one {}
 }
 
 if [ "${1:-}" = --step ]; then  # one step in a shell of its own, where errexit holds

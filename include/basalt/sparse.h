@@ -21,9 +21,10 @@ namespace vex_util {
 /// std::bad_alloc and the array is as it was before the call.
 ///
 /// Threads: thread-safe, one recursive lock per array, held by every operation to its end and while a
-/// callback runs. Two arrays may be assigned to each other at the same time. A pointer from Find is used
-/// outside the lock: see to it that no other thread removes, clears or assigns meanwhile. Construction and
-/// destruction are for one thread.
+/// callback runs. Two arrays may be assigned to each other at the same time, by the visitor of one of them
+/// too; but two threads that each visit an array and call the other's wait for ever. A pointer from Find is
+/// used outside the lock: see to it that no other thread removes, clears or assigns meanwhile. Construction
+/// and destruction are for one thread.
 class BASALT_API Sparse2DArray {
 public:
     /// An empty array.
@@ -41,7 +42,8 @@ public:
     /// Takes over the source's parameters and copies of its elements; blocks without an element are left
     /// behind. Afterwards the selection is empty and the flag tells whether there is any block. Assigning an
     /// array to itself changes nothing. Ends a visit of this array that is under way once its callback
-    /// returns.
+    /// returns. The copy is made before the old elements are given up; where there is no memory for both,
+    /// RemoveAll() goes first.
     Sparse2DArray& operator=(Sparse2DArray& source);
 
     /// Releases everything; no other thread may use the array any more.

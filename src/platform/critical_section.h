@@ -39,6 +39,21 @@ inline void EnterCriticalSection(CRITICAL_SECTION* section) {
     section->depth = 1;
 }
 
+// 1 when the section was entered, 0 where entering would wait.
+inline int TryEnterCriticalSection(CRITICAL_SECTION* section) {
+    const void* const self = __builtin_thread_pointer();
+    if (section->owner.load(std::memory_order_relaxed) == self) {
+        ++section->depth;
+        return 1;
+    }
+    if (!section->lock.try_lock()) {
+        return 0;
+    }
+    section->owner.store(self, std::memory_order_relaxed);
+    section->depth = 1;
+    return 1;
+}
+
 inline void LeaveCriticalSection(CRITICAL_SECTION* section) {
     if (--section->depth == 0) {
         section->owner.store(nullptr, std::memory_order_relaxed);

@@ -9,6 +9,22 @@ void LeaningLock::enter_as_any(std::uintptr_t self) noexcept {
     if (m_favour.load(std::memory_order_relaxed) != 0) {
         end_favour();
     }
+    note_entry(self);
+}
+
+bool LeaningLock::try_enter_as_any(std::uintptr_t self) noexcept {
+    if (!m_lock.try_lock()) {
+        return false;
+    }
+    if (m_favour.load(std::memory_order_relaxed) != 0 && !try_end_favour()) {
+        m_lock.unlock();
+        return false;
+    }
+    note_entry(self);
+    return true;
+}
+
+void LeaningLock::note_entry(std::uintptr_t self) noexcept {
     m_inside = nullptr;
     if (self != m_last) {
         m_last = self;
@@ -46,6 +62,19 @@ void LeaningLock::end_favour() noexcept {
     while (inside.load(std::memory_order_acquire) != 0) {
         sleep_on(inside, 1, period);
     }
+}
+
+// The favour stays with a favourite that is inside: nobody enters by the ordinary lock before it has been
+// ended.
+bool LeaningLock::try_end_favour() noexcept {
+    const ErrnoKept kept;
+    const std::uintptr_t favour = m_favour.load(std::memory_order_relaxed);
+    m_favour.store(0, std::memory_order_relaxed);
+    if (barrier_on_all_threads() && m_words[favour & TURN_BITS].load(std::memory_order_acquire) == 0) {
+        return true;
+    }
+    m_favour.store(favour, std::memory_order_relaxed);
+    return false;
 }
 
 void LeaningLock::wake(Word& inside) noexcept {

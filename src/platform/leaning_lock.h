@@ -28,6 +28,13 @@ public:
         }
     }
 
+    // Fails where lock() would wait.
+    bool try_lock() noexcept {
+        const auto self = reinterpret_cast<std::uintptr_t>(__builtin_thread_pointer());
+        const std::uintptr_t favour = m_favour.load(std::memory_order_relaxed);
+        return ((favour & ~TURN_BITS) == self && enter_as_favourite(favour)) || try_enter_as_any(self);
+    }
+
     void unlock() noexcept {
         Word* const inside = m_inside;
         if (inside == nullptr) {
@@ -66,8 +73,11 @@ private:
     }
 
     void enter_as_any(std::uintptr_t self) noexcept;
+    bool try_enter_as_any(std::uintptr_t self) noexcept;
+    void note_entry(std::uintptr_t self) noexcept;
     void favour(std::uintptr_t self) noexcept;
     void end_favour() noexcept;
+    bool try_end_favour() noexcept;
     void wake(Word& inside) noexcept;
 
     // All but the words are written by who holds the lock alone.

@@ -29,7 +29,7 @@ void BlockPool::AddSlab() {
     if (m_slabs.size() == m_slabs.capacity()) {
         m_slabs.reserve(2 * m_slabs.size() + 8);
     }
-    const Slab& slab = m_slabs.emplace_back(std::max(blockBytes, m_bytes / GROWTH_DIVISOR));
+    const Slab& slab = m_slabs.emplace_back(std::max(blockBytes, m_bytes / GROWTH_DIVISOR), blockBytes);
     m_next = slab.Begin();
     m_left = slab.Bytes() / blockBytes;
     m_bytes += slab.Bytes();

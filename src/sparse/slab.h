@@ -13,25 +13,31 @@ namespace vex_util {
 
 inline constexpr std::size_t CACHE_LINE = 64;
 
-// So many bytes or more on a cache line's boundary, on large pages where they fill one to a fair part: faults
-// on ordinary pages would cost more than everything an insertion does. Untouched, and without memory of its
-// own until it is used.
+// About so many bytes on a cache line's boundary, for whole units. On large pages where they fill one to a
+// fair part: faults on ordinary pages would cost more than everything an insertion does. Untouched, and
+// without memory of its own until it is used.
 class Slab {
 public:
     Slab() noexcept = default;
-    // Throws std::bad_alloc.
-    explicit Slab(std::size_t bytes) : m_bytes(bytes) {
+    // The bytes, a unit at least, are brought up to whole large pages unless more than an eighth of them
+    // could not be used: by no unit, or by the one that is asked for alone. Throws std::bad_alloc.
+    explicit Slab(std::size_t bytes, std::size_t unit = 1) : m_bytes(bytes) {
         using namespace basalt::platform;
         if (bytes > std::numeric_limits<std::ptrdiff_t>::max()) {
             throw std::bad_alloc();
         }
-        if (bytes >= LARGE_PAGE / 4) {
-            m_bytes = (bytes + LARGE_PAGE - 1) & ~(LARGE_PAGE - 1);
+        const std::size_t large = (bytes + LARGE_PAGE - 1) & ~(LARGE_PAGE - 1);
+        const std::size_t idle = bytes == unit ? large - bytes : large % unit;
+        if (bytes >= LARGE_PAGE / 4 && idle <= large / 8) {
+            m_bytes = large;
+        }
+        const std::size_t on_large_pages = m_bytes & ~(LARGE_PAGE - 1);
+        if (on_large_pages != 0) {
             m_alignment = std::align_val_t{LARGE_PAGE};
         }
         m_begin = static_cast<std::byte*>(::operator new[](m_bytes, m_alignment));
-        if (bytes >= LARGE_PAGE / 4) {
-            prefer_large_pages(m_begin, m_bytes);
+        if (on_large_pages != 0) {
+            prefer_large_pages(m_begin, on_large_pages);
         }
     }
     ~Slab() { ::operator delete[](m_begin, m_alignment); }

@@ -1,22 +1,6 @@
-#include <functional>
-#include <memory>
-
 #include "src/sparse/sparse_array_storage.h"
 
 namespace vex_util {
-namespace {
-
-struct LockedInAddressOrder {
-    // Two arrays assigned to each other by two threads would otherwise each hold one lock and wait for the
-    // other.
-    LockedInAddressOrder(CriticalSectionWrapper& a, CriticalSectionWrapper& b)
-        : first(std::less<>{}(&a, &b) ? a : b), second(std::less<>{}(&a, &b) ? b : a) {}
-
-    AutoCriticalSection first;
-    AutoCriticalSection second;
-};
-
-}  // namespace
 
 Sparse2DArray::Sparse2DArray(std::size_t elementSize, std::size_t blockSide, std::size_t elementsPerChunk)
     : m_storage(new Storage(elementSize, blockSide, elementsPerChunk)) {}
@@ -27,7 +11,7 @@ Sparse2DArray& Sparse2DArray::operator=(Sparse2DArray& source) {
     if (this == &source) {
         return *this;
     }
-    const LockedInAddressOrder locked(m_storage->lock, source.m_storage->lock);
+    const AutoCriticalSectionPair locked(m_storage->lock, source.m_storage->lock);
     const SparseContents& from = source.m_storage->contents;
     SparseContents copy(from.ElementSize(), from.Grid().Side(), from.ElementsPerChunk());
     copy.CopyNonEmptyBlocks(from);

@@ -116,6 +116,48 @@ TEST_P(LockTest, FavouriteAndOthersAreNeverInsideTogether) {
     }
 }
 
+TEST_P(LockTest, TryingNeverWaitsAndNeverLetsTwoIn) {
+    for (int round = 0; round < 20; ++round) {
+        LeaningLock lock;
+        std::atomic<bool> is_favourite{false};
+        std::atomic<bool> over{false};
+        long counter = 0;
+        long entered[2] = {};
+        std::thread favourite([&] {
+            enter_alone(lock, LONG_RUN / 50);
+            {
+                const std::lock_guard guard(lock);
+                is_favourite = true;
+                while (!over) {
+                    std::this_thread::yield();
+                }
+                over = false;
+            }
+            while (!over) {
+                if (const std::unique_lock guard(lock, std::try_to_lock); guard) {
+                    counter = counter + 1;
+                    ++entered[0];
+                }
+            }
+        });
+        while (!is_favourite) {
+            std::this_thread::yield();
+        }
+        EXPECT_FALSE(lock.try_lock());
+        EXPECT_FALSE(lock.try_lock()) << "also after a look at the favourite";
+        over = true;
+        while (entered[1] < 100) {
+            if (const std::unique_lock guard(lock, std::try_to_lock); guard) {
+                counter = counter + 1;
+                ++entered[1];
+            }
+        }
+        over = true;
+        favourite.join();
+        ASSERT_EQ(counter, entered[0] + entered[1]) << "round " << round;
+    }
+}
+
 TEST_P(LockTest, EveryThreadCanBecomeTheFavouriteInTurn) {
     LeaningLock lock;
     long counter = 0;

@@ -76,6 +76,28 @@ TEST(SparseArrayThreads, AssignTwoArraysToEachOther) {
     check_invariants(b);
 }
 
+// The visitor holds one lock throughout, so the thread that assigns the other way may not hold the other.
+TEST(SparseArrayThreads, AssignInAVisitAgainstAnotherThread) {
+    Sparse2DArray arrays[2] = {{8, 4, 4}, {8, 4, 4}};
+    for (const int visited : {0, 1}) {
+        Sparse2DArray& from = arrays[visited];
+        Sparse2DArray& to = arrays[1 - visited];
+        insert_value(from, 1, 1, 1);
+        for (int round = 0; round < 20; ++round) {
+            std::thread other;
+            const Visitor assign = [&](const Visited&) {
+                other = std::thread([&] { from = to; });
+                std::this_thread::sleep_for(std::chrono::milliseconds(round < 3 ? 20 : 0));
+                to = from;
+                return false;
+            };
+            from.IterateAll(call_visitor, &assign);
+            other.join();
+            ASSERT_NE(from.Find(1, 1), nullptr);
+        }
+    }
+}
+
 TEST(SparseArrayThreads, AVisitKeepsOthersWaiting) {
     Sparse2DArray array(8, 4, 4);
     insert_value(array, 0, 0, 1);

@@ -148,12 +148,24 @@ TEST(CodePage, single_and_double_byte_encodings) {
         EXPECT_EQ(latin.widen("\xA4 \xE9"), L"\x20AC \xE9");
         EXPECT_EQ(latin.narrow(L"\x20AC \xE9 \x416"), "\xA4 \xE9 ?");
         EXPECT_EQ(latin.narrow(L"a\U000E0041\U000E007F|"), "a??|") << "which the C library leaves out";
+        wchar_t room[] = L"###";
+        EXPECT_EQ(latin.widen_to("\xA4\xE9z", room, 2), 3U);
+        EXPECT_EQ(std::wstring(room), L"\x20AC\xE9#") << "nothing behind the room";
+        char line[100];
+        std::mbstate_t at_start{};
+        std::wstring_view cut(L"\x20AC\n\xE9\0z", 5);
+        EXPECT_EQ(std::string(line, latin.narrow_line_piece(cut, 5, line, at_start)), "\xA4\r\n\xE9");
+        EXPECT_TRUE(cut.empty());
+        CodePage closed("ISO-8859-15");
+        closed.close();
+        EXPECT_EQ(closed.narrow(L"\x20AC"), "\xE2\x82\xAC");
         const CodePage japanese("EUC-JP");
         EXPECT_EQ(japanese.widen("a\xC6\xFC\xB1"), L"a\x65E5\xFFFD") << "the last character is split";
         EXPECT_EQ(japanese.narrow(L"a\x65E5\xD800z"), "a\xC6\xFC?z");
         // Encodings in which one character becomes two, or waits for a mark that belongs to it.
         const CodePage hong_kong("BIG5-HKSCS");
         EXPECT_EQ(hong_kong.widen("\x88\x62z\x88\x62"), L"\xCA\x304z\xCA\x304");
+        EXPECT_EQ(hong_kong.widen("\x88\x62\xFF"), L"\xCA\x304\xFFFD");
         EXPECT_EQ(hong_kong.narrow(L"\xCA\x304z\xCA\x416\xCA\xD800\xCA"),
                   "\x88\x62z\x88\x66\xC7\xFA\x88\x66?\x88\x66");
         EXPECT_EQ(hong_kong.narrow(L"\xCA\U000E0041\x304"), "\x88\x66??") << "no mark of what is kept back";
@@ -182,12 +194,11 @@ TEST(CodePage, single_and_double_byte_encodings) {
 
 TEST(CodePage, locale_of_the_process_and_thread_stays) {
     const std::string process_before = std::setlocale(LC_ALL, nullptr);
-    const locale_t thread_before = uselocale(nullptr);
     CodePage("C").widen("\xFF");
     CodePage("C").narrow(L"\x20AC");
     widen("\xE2\x82\xAC");
     EXPECT_EQ(std::setlocale(LC_ALL, nullptr), process_before);
-    EXPECT_EQ(uselocale(nullptr), thread_before);
+    EXPECT_EQ(uselocale(nullptr), LC_GLOBAL_LOCALE) << "here or in a test before";
 }
 
 // The environment is read once a process, and here before main, so each case is the whole life of a process.

@@ -19,9 +19,9 @@ inline constexpr std::size_t CACHE_LINE = 64;
 class Slab {
 public:
     Slab() noexcept = default;
-    // The bytes, a unit at least, are brought up to whole large pages unless more than an eighth of them
-    // could not be used: by no unit, or by the one that is asked for alone. Throws std::bad_alloc.
-    explicit Slab(std::size_t bytes, std::size_t unit = 1) : m_bytes(bytes) {
+    // The bytes, a unit at least, are brought up to whole large pages; down to whole units where more than an
+    // eighth of those could not be used, by any unit or by the only one. Throws std::bad_alloc.
+    explicit Slab(std::size_t bytes, std::size_t unit = 1) : m_bytes(bytes / unit * unit) {
         using namespace basalt::platform;
         if (bytes > std::numeric_limits<std::ptrdiff_t>::max()) {
             throw std::bad_alloc();

@@ -90,9 +90,9 @@ Moment parse_moment(std::string_view text) {
     }
     moment.mjd = _greg2mjd(static_cast<std::uint16_t>(year), static_cast<std::uint16_t>(month),
                            static_cast<std::uint16_t>(day));
-    // A day past the month's end, or before the first MJD, comes back as another.
+    // A day past the month's end comes back as another, and days before the first MJD are beyond the last.
     const Date date = date_of(moment.mjd);
-    if (date.year != year || date.month != month || date.day != day) {
+    if (moment.mjd > LAST_MJD || date.year != year || date.month != month || date.day != day) {
         fail("a date from 1858-11-17 to 65535-12-31");
     }
     return moment;

@@ -3,8 +3,10 @@
 namespace basalt::frame {
 
 CodecGuard::~CodecGuard() {
-    const std::lock_guard hold(m_lock);
-    ShutDown();
+    // In a forked child a thread that is not there may hold it for ever.
+    if (const std::unique_lock hold(m_lock, std::try_to_lock); hold) {
+        ShutDown();
+    }
 }
 
 void CodecGuard::AddImage() {

@@ -15,6 +15,7 @@
 #include "src/platform/open_for_writing.h"
 #include "src/platform/pixel_format.h"
 #include "src/platform/pixel_rows.h"
+#include "src/platform/write_whole.h"
 
 namespace basalt::platform {
 
@@ -156,18 +157,23 @@ bool write_bmp_file(const Surface& surface, const wchar_t* name) {
     }
     writer.flush();
     int error = writer.error();
-    if (error != 0) {
-        (void)!::ftruncate(file, 0);  // no part of a picture by another name either; no device or pipe minds
-    }
-    if (::close(file) != 0 && error == 0) {
+    // As long as one descriptor is open the file is told from any other; closing one may be what fails.
+    const int last = ::fcntl(file, F_DUPFD_CLOEXEC, 0);
+    if (last >= 0 && ::close(file) != 0 && error == 0) {
         error = errno;
     }
-    if (error == 0) {
-        return true;
+    const int open = last >= 0 ? last : file;
+    if (error != 0) {
+        (void)!::ftruncate(open, 0);  // no part of a picture by another name either; no device or pipe minds
+        delete_begun(file_name.c_str(), begun);
     }
-    SetLastError(error_from_errno(error));
-    delete_begun(file_name.c_str(), begun);
-    return false;
+    if (::close(open) != 0 && error == 0 && last < 0) {
+        error = errno;
+    }
+    if (error != 0) {
+        SetLastError(error_from_errno(error));
+    }
+    return error == 0;
 }
 
 }  // namespace basalt::platform

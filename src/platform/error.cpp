@@ -8,43 +8,32 @@
 #include <cstddef>
 
 #include "src/platform/utf8.h"
+#include "src/platform/write_whole.h"
 
 using basalt::platform::DebugOutputHandler;
 
 namespace {
 
-// Plain data: a thread_local with a destructor would keep the library from being unloaded.
-constinit thread_local DWORD last_error = ERROR_SUCCESS;
+// Plain data: a thread_local with a destructor would keep the library from being unloaded. In the threads'
+// first memory: what is asked for at its first use, by a thread that reports to be out of memory, ends the
+// process.
+[[gnu::tls_model("initial-exec")]] constinit thread_local DWORD last_error = ERROR_SUCCESS;
 
 constinit std::atomic<DebugOutputHandler> debug_output_handler = nullptr;
 
-// Straight to the descriptor: the host's stdio buffers, their locks and their orientation stay untouched.
-void write_to_standard_error(const char* bytes, std::size_t count) {
-    while (count > 0) {
-        const ssize_t written = ::write(STDERR_FILENO, bytes, count);
-        if (written < 0 && errno == EINTR) {
-            continue;
-        }
-        if (written <= 0) {
-            return;
-        }
-        bytes += written;
-        count -= static_cast<std::size_t>(written);
-    }
-}
-
-// Through a buffer on the stack, since the failure being reported may be a lack of memory.
+// Through a buffer on the stack, since the failure being reported may be a lack of memory, and straight to
+// the descriptor: the host's stdio buffers, their locks and their orientation stay untouched.
 void write_as_utf8(const wchar_t* text) {
     std::array<char, 1024> buffer;
     std::size_t used = 0;
     for (; *text != L'\0'; ++text) {
         if (buffer.size() - used < basalt::platform::MAX_UTF8_BYTES) {
-            write_to_standard_error(buffer.data(), used);
+            basalt::platform::write_whole(STDERR_FILENO, buffer.data(), used);
             used = 0;
         }
         used += basalt::platform::encode_utf8(*text, buffer.data() + used);
     }
-    write_to_standard_error(buffer.data(), used);
+    basalt::platform::write_whole(STDERR_FILENO, buffer.data(), used);
 }
 
 }  // namespace

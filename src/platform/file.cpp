@@ -1,13 +1,12 @@
 #include "src/platform/file.h"
 
-#include <unistd.h>
-
 #include <atomic>
 #include <memory>
 #include <string>
 
 #include "basalt/platform/error.h"
 #include "src/platform/file_name.h"
+#include "src/platform/forks.h"
 #include "src/platform/handle_table.h"
 #include "src/platform/open_file.h"
 #include "src/platform/out_of_memory.h"
@@ -16,6 +15,8 @@ using basalt::platform::fail_with;
 using basalt::platform::file_name_from_wide;
 using basalt::platform::OpenFile;
 using basalt::platform::or_out_of_memory;
+using basalt::platform::ProcessMark;
+using basalt::platform::this_process;
 
 namespace {
 
@@ -24,14 +25,17 @@ constexpr DWORD KNOWN_FLAGS = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_NORMAL | FI
 
 // The process that last opened a delete-on-close file: in a forked child, whose copy of the table may be
 // locked for ever, not the child unless it has done so itself.
-constinit std::atomic<pid_t> s_owner = 0;
+constinit std::atomic<ProcessMark> s_owner = ProcessMark();
+// Since then nobody else deletes what is made.
+constinit std::atomic<bool> s_is_over = false;
 
 // At the process's end or at unload.
 struct DeletesWhatIsLeft {
     ~DeletesWhatIsLeft() {
-        if (s_owner.load() != getpid()) {
+        if (s_owner.load() != this_process()) {
             return;
         }
+        s_is_over.store(true);
         basalt::platform::for_each_object([](basalt::platform::HandleObject& object) {
             if (object.kind() == OpenFile::KIND) {
                 static_cast<OpenFile&>(object).delete_at_exit();
@@ -42,7 +46,7 @@ struct DeletesWhatIsLeft {
 
 void delete_at_exit() {
     static const DeletesWhatIsLeft s_rest;
-    s_owner.store(getpid());
+    s_owner.store(this_process());
 }
 
 }  // namespace
@@ -67,7 +71,14 @@ HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_AT
         }
         const DWORD error = file->open(
             path, disposition == CREATE_NEW ? OpenFile::Mode::CREATE : OpenFile::Mode::EXISTING, deletes);
-        return error == ERROR_SUCCESS ? handle.give() : fail_with(error, INVALID_HANDLE_VALUE);
+        if (error != ERROR_SUCCESS) {
+            return fail_with(error, INVALID_HANDLE_VALUE);
+        }
+        const HANDLE given = handle.give();
+        if (deletes && s_is_over.load()) {
+            file->delete_at_exit();  // for a thread that goes on while the process ends
+        }
+        return given;
     });
 }
 

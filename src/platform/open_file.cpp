@@ -5,6 +5,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <filesystem>
 #include <mutex>
@@ -71,6 +72,9 @@ DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
     if (no_folder && !path.empty()) {
         return ERROR_PATH_NOT_FOUND;
     }
+    if (!count_forks()) {
+        return ERROR_NOT_ENOUGH_MEMORY;
+    }
     const bool creates = mode == Mode::CREATE;
     for (int attempt = 0; attempt < MAX_ATTEMPTS; ++attempt) {
         const int descriptor = open_descriptor(path, creates ? O_RDWR | O_CREAT | O_EXCL : O_RDWR);
@@ -84,7 +88,7 @@ DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
             m_delete_path = delete_on_close ? std::move(absolute) : std::string();
             m_device = status.st_dev;
             m_inode = status.st_ino;
-            m_process = getpid();
+            m_process = this_process();
             m_is_open = true;
             return ERROR_SUCCESS;
         }
@@ -111,10 +115,17 @@ DWORD OpenFile::reserve(std::uint64_t size) noexcept {
         return ERROR_FILE_TOO_LARGE;
     }
     const FileSizeSignalHeld held;
-    int number;
+    // In pieces: a file system in memory gives up a call that a signal interrupts, with all that it had
+    // reserved, and a host's timer may come sooner than a large file is done.
+    constexpr off_t PIECE = off_t{8} << 20;
+    const auto end = static_cast<off_t>(size);
+    int number = 0;
+    off_t done = 0;
     do {
-        number = posix_fallocate(m_descriptor, 0, static_cast<off_t>(size));
-    } while (number == EINTR);
+        const off_t piece = std::min(PIECE, end - done);
+        number = posix_fallocate(m_descriptor, done, piece);
+        done += number == 0 ? piece : 0;
+    } while (number == EINTR || (number == 0 && done < end));
     return error_from_errno(number);
 }
 
@@ -152,7 +163,7 @@ bool OpenFile::unmap(std::byte* view, std::size_t size) noexcept {
 void OpenFile::delete_if_asked() noexcept {
     // A forked child has copies of its parent's files, and somebody may have replaced the file by force.
     struct stat status = {};
-    if (!m_delete_path.empty() && m_process == getpid() && stat(m_delete_path.c_str(), &status) == 0 &&
+    if (!m_delete_path.empty() && m_process == this_process() && stat(m_delete_path.c_str(), &status) == 0 &&
         status.st_dev == m_device && status.st_ino == m_inode) {
         unlink(m_delete_path.c_str());
     }
@@ -177,7 +188,7 @@ void OpenFile::close() noexcept {
 
 void OpenFile::delete_at_exit() noexcept {
     // In a forked child the lock of a parent's file may be held by a thread that does not exist there.
-    if (m_process == getpid()) {
+    if (m_process == this_process()) {
         const std::lock_guard<Lock> guard(m_guard);
         delete_if_asked();
     }

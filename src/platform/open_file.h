@@ -7,6 +7,7 @@
 #include <string>
 
 #include "basalt/platform/types.h"
+#include "src/platform/forks.h"
 #include "src/platform/handle_table.h"
 #include "src/platform/lock.h"
 
@@ -54,7 +55,7 @@ private:
     std::string m_delete_path;         // absolute; empty when the file is to stay
     std::uint64_t m_device = 0;
     std::uint64_t m_inode = 0;
-    int m_process = 0;
+    ProcessMark m_process;
 };
 
 // Deletes a file that nobody has open. ERROR_SUCCESS, or what went wrong.

@@ -1,24 +1,24 @@
 #include "src/platform/text_file.h"
 
 #include <fcntl.h>
-#include <pthread.h>
 #include <sys/resource.h>
 #include <sys/single_threaded.h>
 #include <unistd.h>
 
 #include <atomic>
-#include <cstdint>
 #include <cstring>
 #include <mutex>
+#include <new>
 #include <optional>
 #include <string>
-#include <utility>
 
 #include "src/platform/code_page.h"
 #include "src/platform/file_name.h"
 #include "src/platform/file_size_signal.h"
+#include "src/platform/forks.h"
 #include "src/platform/open_for_writing.h"
 #include "src/platform/out_of_memory.h"
+#include "src/platform/write_whole.h"
 
 namespace basalt::platform {
 
@@ -35,16 +35,7 @@ std::string system_name(const char* path) {
 constinit Lock s_files_lock;
 constinit TextFile* s_files = nullptr;
 
-// How many forks lie between the process that loaded the library and this one, so that a process knows what
-// it wrote itself; asking the system who this is would double the time of a short text.
-constinit std::atomic<std::uint32_t> s_generation = 0;
-
-// Once, under the lock of the files; the C library forgets it when the library is unloaded.
-bool counts_forks() {
-    static constinit bool counts = false;
-    counts = counts || ::pthread_atfork(nullptr, nullptr, [] { ++s_generation; }) == 0;
-    return counts;
-}
+constinit std::atomic<bool> s_handles_forks = false;
 
 [[gnu::destructor]] void send_what_is_left() {
     TextFile::send_all();
@@ -57,16 +48,15 @@ std::unique_ptr<TextFile> TextFile::open(const char* path) noexcept {
         // The constructor is private, and want of memory caught.
         // NOLINTNEXTLINE(bugprone-unhandled-exception-at-new)
         std::unique_ptr<TextFile> file(new TextFile);
+        if (!register_fork_handlers(s_handles_forks,
+                                    {before_fork, after_fork_in_parent, after_fork_in_child})) {
+            return std::unique_ptr<TextFile>();
+        }
         file->m_file = open_for_writing(system_name(path).c_str(), O_APPEND);
         if (file->m_file < 0) {
             return std::unique_ptr<TextFile>();
         }
         const std::lock_guard guard(s_files_lock);
-        if (!counts_forks()) {
-            ::close(std::exchange(file->m_file, -1));
-            return std::unique_ptr<TextFile>();
-        }
-        file->m_writer = s_generation;
         file->m_next = s_files;
         if (s_files != nullptr) {
             s_files->m_previous = file.get();
@@ -87,7 +77,7 @@ TextFile::~TextFile() {
             m_next->m_previous = m_previous;
         }
     }
-    send(m_size);
+    send_own();
     ::close(m_file);
 }
 
@@ -98,8 +88,8 @@ void TextFile::send_all() noexcept {
     }
     for (TextFile* file = s_files; file != nullptr; file = file->m_next) {
         const std::unique_lock guard(file->m_lock, std::try_to_lock);
-        if (guard && file->m_writer == s_generation) {
-            file->send(file->m_size);
+        if (guard) {
+            file->send_own();
         }
     }
 }
@@ -111,7 +101,7 @@ void TextFile::write(std::wstring_view text) noexcept {
     if (__libc_single_threaded == 0) {
         guard.lock();
     }
-    m_writer = s_generation.load(std::memory_order_relaxed);
+    m_is_own = true;
     std::size_t before = m_size;
     std::mbstate_t state{};
     while (!text.empty()) {
@@ -122,6 +112,35 @@ void TextFile::write(std::wstring_view text) noexcept {
             before = 0;
         }
     }
+}
+
+// What a forked child has not added to is its parent's to send.
+void TextFile::send_own() noexcept {
+    if (m_is_own) {
+        send(m_size);
+    }
+}
+
+// So that the list is whole in the child, and its lock is free there.
+void TextFile::before_fork() noexcept {
+    s_files_lock.lock();
+}
+
+void TextFile::after_fork_in_parent() noexcept {
+    s_files_lock.unlock();
+}
+
+// A thread that was writing to a file is not here to finish: its lock is made anew. What the file held then
+// may be cut anywhere, and is the parent's in any case.
+void TextFile::after_fork_in_child() noexcept {
+    for (TextFile* file = s_files; file != nullptr; file = file->m_next) {
+        if (!file->m_lock.try_lock()) {
+            file->m_size = 0;
+        }
+        new (&file->m_lock) Lock;
+        file->m_is_own = false;
+    }
+    s_files_lock.unlock();
 }
 
 // Takes bytes off the front of the buffer and gives them to the system.

@@ -4,7 +4,6 @@
 
 #include <climits>
 #include <cstddef>
-#include <cstdint>
 #include <memory>
 #include <string_view>
 
@@ -21,7 +20,8 @@ public:
     // narrow text in the active code page, either separator; bytes that are no character of it go to the
     // system as they are. Null for a file that cannot be opened, and for want of memory.
     static std::unique_ptr<TextFile> open(const char* path) noexcept;
-    // Sends the buffer out and closes the file.
+    // Sends the buffer out and closes the file; a forked child that has not written to it leaves the sending
+    // to its parent.
     ~TextFile();
     TextFile(const TextFile&) = delete;
     TextFile& operator=(const TextFile&) = delete;
@@ -32,10 +32,8 @@ public:
     // is lost. Threads: thread-safe; each text is whole.
     void write(std::wstring_view text) noexcept;
 
-    // Sends the buffers of all that are open out: what the end of the process does, as for a stream of the C
-    // library. A file that a thread writes to meanwhile is left out, since that thread may never come back,
-    // and so is one that a parent process opened and this one has not written to: the parent sends the same
-    // bytes itself.
+    // Sends the buffers of all that are open out, as closing them does: the end of the process. A file that a
+    // thread writes to meanwhile is left out, since that thread may never come back.
     static void send_all() noexcept;
 
 private:
@@ -44,10 +42,14 @@ private:
     static constexpr std::size_t PIECE = 256;  // characters that are converted at once
 
     TextFile() = default;
+    void send_own() noexcept;
     void send(std::size_t count) noexcept;
+    static void before_fork() noexcept;
+    static void after_fork_in_parent() noexcept;
+    static void after_fork_in_child() noexcept;
 
     int m_file = -1;
-    std::uint32_t m_writer = 0;  // generation of the process that opened it or wrote to it last
+    bool m_is_own = true;        // whether this process opened it or wrote to it
     TextFile* m_next = nullptr;  // open files
     TextFile* m_previous = nullptr;
     Lock m_lock;

@@ -94,6 +94,10 @@ DWORD reserve(void* address, std::size_t size, Range& range) {
         if (pages == MAP_FAILED) {
             return errno == ENOMEM ? ERROR_NOT_ENOUGH_MEMORY : ERROR_INVALID_ADDRESS;
         }
+        if (pages != range.pages()) {  // to systems before 4.17 the address is a wish
+            munmap(pages, range.size());
+            return ERROR_INVALID_ADDRESS;
+        }
     }
     reservation.key() = range.base;
     reservation.mapped() = range.end;

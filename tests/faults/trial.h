@@ -57,6 +57,7 @@ public:
 
     // Whether the last attempt had a call that was made to fail; whether any had.
     bool struck() const { return m_struck; }
+    bool fails_memory() const { return m_failure.source != Source::SYSTEM; }
     bool was_ever_struck() const { return m_was_ever_struck; }
     const std::string& fault() const { return m_fault; }
     const test::ScratchFolder& folder() const { return m_folder; }

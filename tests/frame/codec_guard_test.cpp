@@ -1,6 +1,8 @@
 #include "src/frame/codec_guard.h"
 
 #include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 #include "src/platform/codec.h"
 #include "tests/support/threads.h"
@@ -32,6 +34,8 @@ constexpr CodecCalls FAKE = {
             codec.running = 0;
         },
 };
+
+CodecGuard* guard_in_use = nullptr;
 
 class CodecGuardTest : public testing::Test {
 protected:
@@ -108,6 +112,26 @@ TEST_F(CodecGuardTest, the_modules_own_runs_the_image_codec) {
     EXPECT_EQ(GdipGetImageEncodersSize(&count, &size), Gdiplus::Ok);
     basalt::frame::codec_guard.ReleaseImage();
     EXPECT_EQ(GdipGetImageEncodersSize(&count, &size), Gdiplus::GdiplusNotInitialized);
+}
+
+TEST_F(CodecGuardTest, a_child_forked_while_the_lock_is_held_ends) {
+    constexpr CodecCalls FORKING = {
+        .start = []() -> std::uintptr_t {
+            const pid_t child = fork();
+            if (child == 0) {
+                alarm(10);
+                guard_in_use->~CodecGuard();
+                _exit(0);
+            }
+            int status = -1;
+            waitpid(child, &status, 0);
+            return status == 0 ? 1 : 0;
+        },
+        .shut_down = [](std::uintptr_t) {},
+    };
+    CodecGuard guard(FORKING);
+    guard_in_use = &guard;
+    EXPECT_TRUE(guard.Start());
 }
 
 }  // namespace

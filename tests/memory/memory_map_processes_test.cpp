@@ -105,4 +105,18 @@ TEST(MemoryMapProcesses, an_owner_that_exits_takes_its_files_along) {
     bytes(ours)[SHARED_SIZE - 1] = 'x';
 }
 
+TEST(MemoryMapProcesses, a_block_made_while_the_process_ends_leaves_no_file) {
+    const ScratchFolder folder;
+    Child child([](int ready) {
+        std::atexit([] {  // runs when the files that are left have been deleted: those were first made later
+            static CMemoryMap* const late = new CMemoryMap(SHARED_SIZE);
+            bytes(*late)[SHARED_SIZE - 1] = 'x';
+        });
+        const CMemoryMap first(SHARED_SIZE);
+        Child::tell(ready);
+    });
+    child.end(0);
+    EXPECT_EQ(folder.names(), Names{});
+}
+
 }  // namespace

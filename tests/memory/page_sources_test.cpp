@@ -132,6 +132,11 @@ TEST(SharedMemoryAllocator, works_in_pieces_that_stop_at_32_mebibytes) {
         EXPECT_EQ(row.start[0] + row.start[row.size - 1], 0) << "zero once more";
         EXPECT_NE(Virtual::Free(row.start, row.size, DECOMMIT, 0), 0);
     }
+    // No address: the first piece is reserved as well, a second one cannot be.
+    void* const anywhere = Virtual::Alloc(nullptr, 4096, COMMIT, nullptr);
+    EXPECT_NE(anywhere, nullptr);
+    EXPECT_NE(Virtual::Free(anywhere, 0, RELEASE, 0), 0);
+    EXPECT_TRUE(output.take().empty());
     // The sum of rest and offset has 32 bits: it comes to 0x1000, and the range is one piece.
     calls.clear();
     failing_call = 1;

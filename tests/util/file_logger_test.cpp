@@ -221,6 +221,42 @@ TEST_F(FileLog, what_a_forked_child_wrote_itself_is_sent_when_it_exits) {
     EXPECT_EQ(contents(file), "parent;child;");
 }
 
+TEST_F(FileLog, a_child_forked_while_threads_write_writes_too_and_sends_nothing_twice) {
+    FileLogger log(file.c_str());
+    log.Write(L"parent");
+    FileLogger other((folder / "other").c_str());
+    std::atomic<bool> over{false};
+    std::thread writing([&] {
+        while (!over) {
+            other.Write(L"some text of the parent that is being written\n");
+        }
+    });
+    for (int round = 0; round < 50; ++round) {
+        const pid_t child = fork();
+        if (child == 0) {
+            alarm(10);
+            log.Close();
+            other.Write(L"child\n");
+            other.Close();
+            _exit(0);
+        }
+        int status = -1;
+        waitpid(child, &status, 0);
+        ASSERT_EQ(status, 0) << "the child waits for a thread that it does not have";
+    }
+    over = true;
+    writing.join();
+    log.Close();
+    other.Close();
+    EXPECT_EQ(contents(file), "parent") << "from the parent alone";
+    const std::string text = contents(folder / "other");
+    std::size_t children = 0;
+    for (std::size_t at = 0; (at = text.find("child\r\n", at)) != std::string::npos; ++at) {
+        ++children;
+    }
+    EXPECT_EQ(children, 50U);
+}
+
 TEST_F(FileLog, what_the_system_takes_in_parts_is_whole) {
     FileLogger log(file.c_str());
     taken_at_once = 7;

@@ -19,8 +19,8 @@ namespace vex_util {
 ///
 /// Texts are buffered and reach the file when the buffer of 8 KiB is full, at Close(), at destruction, and,
 /// of a log that is still open, when the process returns from main or exits; one that is killed or aborts
-/// loses its last ones. A forked child that exits sends what its logs hold, its parent's texts among it,
-/// where it has written to them itself. The buffer goes out between two texts, so whatever else happens to
+/// loses its last ones. A forked child sends what a log holds, its parent's texts among it, only where it has
+/// written to that log itself. The buffer goes out between two texts, so whatever else happens to
 /// the process, and whoever else appends to the file, each text shorter than the buffer is in it whole or not
 /// at all.
 ///

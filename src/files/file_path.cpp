@@ -20,7 +20,7 @@ void require_memory() {
 }
 
 // 0 when there is no entry.
-DWORD attributes_of(const CString& path) {
+DWORD entry_attributes(const CString& path) {
     const DWORD attributes = first_match_attributes(path);
     if (attributes == 0) {
         require_memory();
@@ -172,12 +172,12 @@ FILETIME CFilePath::GetLastAccessTime() const {
 }
 
 bool CFilePath::FileExists(const CString& path) {
-    const DWORD attributes = attributes_of(path);
+    const DWORD attributes = entry_attributes(path);
     return attributes != 0 && (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0;
 }
 
 bool CFilePath::IsDirectory(const CString& path) {
-    return (attributes_of(path) & FILE_ATTRIBUTE_DIRECTORY) != 0;
+    return (entry_attributes(path) & FILE_ATTRIBUTE_DIRECTORY) != 0;
 }
 
 bool CFilePath::GetFileCreationTime(const CString& path, FILETIME& time) {

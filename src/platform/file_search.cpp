@@ -103,6 +103,8 @@ bool query(int folder, const char* name, struct statx& status) {
         struct statx target = {};
         if (statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &target) == 0) {
             status = target;
+        } else if (errno == ENOMEM) {
+            return false;
         }
     }
     return true;
@@ -115,8 +117,12 @@ bool query_mode(const char* name, mode_t& mode) {
         return false;
     }
     mode = status.st_mode;
-    if (S_ISLNK(mode) && fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT) == 0) {
-        mode = status.st_mode;
+    if (S_ISLNK(mode)) {
+        if (fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT) == 0) {
+            mode = status.st_mode;
+        } else if (errno == ENOMEM) {
+            return false;
+        }
     }
     return true;
 }
@@ -147,6 +153,8 @@ DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
             describe(m_name, status, entry);
         } else if (errno == ENOENT) {
             continue;  // deleted meanwhile
+        } else if (errno == ENOMEM) {
+            return ERROR_NOT_ENOUGH_MEMORY;
         } else {
             // A folder that may be read but not entered tells names and kinds alone.
             describe(m_name, m_found->d_type == DT_DIR ? S_IFDIR : S_IFREG, entry);
@@ -233,22 +241,23 @@ DWORD basalt::platform::first_match_attributes(const wchar_t* path) noexcept {
 
 void basalt::platform::for_each_match(const wchar_t* path, const std::function<void(const wchar_t*)>& visit) {
     const Sought sought(path);
-    if (!sought.has_wildcards) {
-        mode_t mode = 0;
-        if (!sought.last.empty() && query_mode_of_path(path, mode) == ERROR_SUCCESS) {
-            visit(sought.last.data());
-        }
-        return;
-    }
-    FileSearch search;
-    const DWORD error = open_folder(sought, search);
-    if (error == ERROR_NOT_ENOUGH_MEMORY) {
-        throw std::bad_alloc();
-    }
-    if (error == ERROR_SUCCESS) {
-        while (search.advance() == ERROR_SUCCESS) {
+    DWORD error = ERROR_SUCCESS;
+    if (sought.has_wildcards) {
+        FileSearch search;
+        error = open_folder(sought, search);
+        while (error == ERROR_SUCCESS && (error = search.advance()) == ERROR_SUCCESS) {
             visit(search.name());
         }
+    } else if (!sought.last.empty()) {
+        mode_t mode = 0;
+        error = query_mode_of_path(path, mode);
+        if (error == ERROR_SUCCESS) {
+            visit(sought.last.data());
+        }
+    }
+    // An incomplete list is no answer.
+    if (error == ERROR_NOT_ENOUGH_MEMORY) {
+        throw std::bad_alloc();
     }
 }
 

@@ -195,7 +195,9 @@ void time_scales(Numbers& in, Input& input) {
     const std::uint32_t mjd = input.word();
     _mjd2greg(mjd, year, month, day, weekday);
     require(month <= 12 && day <= 31 && weekday <= 6);
-    require(mjd < 15021 || mjd > 23257590 || _greg2mjd(year, month, day) == mjd);
+    constexpr std::uint32_t FIRST_DAY_OF_YEAR_1 = 0U - 678575;  // before MJD 0: counted backwards from 2^32
+    const bool is_day = mjd <= 23257590 || mjd >= FIRST_DAY_OF_YEAR_1;
+    require(!is_day || _greg2mjd(year, month, day) == mjd);
     _greg2mjd(static_cast<std::uint16_t>(input.word()), static_cast<std::uint16_t>(input.word()),
               static_cast<std::uint16_t>(input.word()));
     double seconds = 0;

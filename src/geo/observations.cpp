@@ -46,7 +46,7 @@ void geo_calc_obs(const geo_nee& from, double fromHeight, const geo_nee& to, dou
     const double east = to.east - from.east;
     const double rise = to.elevation + toHeight - from.elevation - fromHeight;
     const double run = std::sqrt(east * east + north * north) * scaleFactor;
-    out.horizontal = geo_normalised_bearing(std::atan2(east, north));
+    out.horizontal = geo_grid_bearing(from, to);
     out.vertical = geo_normalised_bearing(HALF_PI - std::atan2(rise, run));
     out.distance = std::sqrt(run * run + rise * rise);
 }

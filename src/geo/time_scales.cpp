@@ -68,7 +68,7 @@ constexpr std::uint32_t FLIEGEL_OFFSET = 2468570;
 /// The last day four times which, so counted, 31 bits hold.
 constexpr std::uint32_t LAST_DAY = (std::uint32_t{1} << 29) - 1 - FLIEGEL_OFFSET;
 /// The first day of that count, -4900-03-01; it and the days up to 1858 are numbers below 2^32.
-constexpr std::uint32_t FIRST_DAY = 0U - FLIEGEL_OFFSET;
+constexpr std::uint32_t FIRST_COUNTED_DAY = 0U - FLIEGEL_OFFSET;
 
 struct Date {
     std::uint16_t year, month, day;
@@ -120,12 +120,12 @@ std::uint16_t day_of_week(const Date& date) {
 /// within a third.
 [[gnu::noinline]] void far_date(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month,
                                 std::uint16_t& day, std::uint16_t& weekday) {
-    constexpr std::uint32_t CYCLES = 13;  // of 400 years: past the year 0 from FIRST_DAY on
+    constexpr std::uint32_t CYCLES = 13;  // of 400 years: past the year 0 from FIRST_COUNTED_DAY on
     constexpr std::uint32_t DAYS_PER_CYCLE = 146097;
     Date date = {0, 0, 0};
     if (mjd <= LAST_DAY) {
         date = date_of(mjd);
-    } else if (mjd >= FIRST_DAY) {
+    } else if (mjd >= FIRST_COUNTED_DAY) {
         date = date_of(mjd + CYCLES * DAYS_PER_CYCLE);
         date.year = static_cast<std::uint16_t>(date.year - CYCLES * 400);
     }

@@ -33,12 +33,10 @@ TEST(CrossTrack, IsPositiveOnTheLeft) {
     EXPECT_NEAR(geo_vincenty_crosstrack(a, a, {0.3, 0.0001, 0}), -637.1 * std::cos(0.3), 0.05);  // runs north
     EXPECT_EQ(geo_vincenty_crosstrack(a, b, a), 0.0);
     EXPECT_EQ(geo_vincenty_crosstrack(a, b, {0, -0.02, 0}), 0.0);  // behind the start
-    const geo_llh north = {0.01, 0, 0};
-    for (const double off :
-         {0.0, 1e-9, 1e-16}) {  // on the line behind the pole, where the search begins opposite
-        EXPECT_NEAR(geo_vincenty_crosstrack(a, north, {off, PI, 0}), 0.0, 1e-6);
-        EXPECT_NEAR(geo_vincenty_crosstrack(a, north, {0, PI - off, 0}), 0.0, 0.01);
-    }
+    // On the line, with the first foot opposite; and at 6 mm from there, to the right.
+    EXPECT_NEAR(geo_vincenty_crosstrack(a, {0.01, 0, 0}, {0, PI, 0}), 0.0, 1e-6);
+    EXPECT_NEAR(geo_vincenty_crosstrack({0.1, 0.5, 0}, {0.11, 0.5, 0}, {-0.1, 0.5 - PI, 0}), 0.0, 1e-6);
+    EXPECT_NEAR(geo_vincenty_crosstrack(a, {0.01, 0, 0}, {0, PI - 1e-9, 0}), -0.00637, 1e-4);
 }
 
 TEST(CrossTrack, AgreesWithTheSearchByMetres) {

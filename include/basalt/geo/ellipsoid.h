@@ -15,7 +15,7 @@
 /// Geodetic point of a Cartesian one, by iteration on the latitude.
 /// @param xyz Cartesian point, metres
 /// @param[out] llh geodetic point: latitude in [-pi/2, pi/2], longitude in [-pi, pi], 0 on the
-/// axis (pi for an x of -0)
+/// axis (pi or -pi, as y is signed, for an x of -0)
 /// @param tolerance radians: the latitude has settled when two passes agree within it. 5e-10 is the
 /// library's own; with 0 they must agree exactly; from 10 on, or NaN, the first estimate is kept (right at
 /// height 0; up to 34 m off at 10 km).

@@ -47,8 +47,8 @@ BASALT_API double geo_vincenty_bearing(geo_llh from, geo_llh to);
 /// misses b, on oblique lines by 0.3 m at 100 m and 2 km at 1000 km.
 /// @param p the point
 /// @return metres, positive left of the direction of travel, negative right: the sphere's distance to the
-/// foot, where the bearing of p and the line are within 0.1 arc-second of square; 0 for a point closer than
-/// 1e-6 m. With b equal to a the line runs north.
+/// foot, the first place found where the bearing of p and the line are within 0.1 arc-second of square; 0 for
+/// a point closer than 1e-6 m. With b equal to a the line runs north.
 ///
 /// Bad input: NaN where a latitude or longitude is NaN or infinite. The search takes 3 or 4 passes where
 /// lines are surveyed, 11 at most in 300,000 draws over the globe; after 100 it ends with the best foot it

@@ -41,8 +41,7 @@ BASALT_API void geo_reduce_obs(const geo_hvd& obs, const geo_nee& station, doubl
 /// @param[out] out bearing in [0, 2 pi), zenith angle in [0, pi], slope distance in metres
 /// @param scaleFactor multiplies the grid distance. Negative, it mirrors the zenith angle into [pi, 2 pi).
 ///
-/// Points above one another give bearing 0 (pi where the differences have the sign of -0), and coincident
-/// ones a level observation of length 0.
+/// Points above one another give bearing 0, and coincident ones a level observation of length 0.
 ///
 /// Bad input: `out` is left as it was when a field of either point, or `fromHeight`, is #GEO_NULL;
 /// `toHeight` is not tested.

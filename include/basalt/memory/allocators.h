@@ -72,9 +72,9 @@ private:
 };
 
 /// The process-wide shared heap, without limit, from the library's load to its unload; blocks still taken
-/// then go with it. Objects of derived classes are placed on it: `new` gives null, and no constructor runs,
-/// when it is exhausted. Placement of such a class needs the global operator, named with its scope.
-/// Threads: thread-safe.
+/// then go with it, at the end of a process too: threads that use it have ended by then. Objects of derived
+/// classes are placed on it: `new` gives null, and no constructor runs, when it is exhausted. Placement of
+/// such a class needs the global operator, named with its scope. Threads: thread-safe.
 class BASALT_API vlSharedMemoryHeap {
 public:
     /// As Alloc().

@@ -2,7 +2,9 @@
 # Compiles each public header alone, as C++17 and C++20, with GCC and Clang, warnings as errors.
 # Usage: scripts/check_headers.sh BUILD_DIRECTORY    (for the generated version.h)
 set -euo pipefail
-cd "$(dirname "$0")/.."
+. "$(dirname "$0")/packages.sh"
+show_help "$@"
+[ -f "${1:-}/include/basalt/version.h" ] || { echo "check_headers.sh: no such build directory: ${1:-}" >&2; exit 2; }
 
 alone() {  # build directory, header
     local standard compiler

@@ -21,8 +21,10 @@ for subject in "${subjects[@]}"; do
 done
 
 machine() {
-    echo "$(lscpu | sed -n 's/^Model name: *//p'), $(nproc) processors," \
-        "$(lscpu | sed -n 's/^L2 cache: *//p') L2, $(g++ -dumpfullversion) at -O3, $(date -u +%F)," \
+    local level2
+    level2=$(LC_ALL=C lscpu | sed -n 's/^L2 cache: *\([^ ].*\)/ \1 L2,/p')  # a virtual machine may not tell it
+    echo "$(LC_ALL=C lscpu | sed -n 's/^Model name: *//p'), $(nproc) processors,$level2" \
+        "GCC $(g++ -dumpfullversion) at -O3, $(date -u +%F)," \
         "\`ROUNDS=${ROUNDS:-7} MIN_TIME=${MIN_TIME:-0.05} scripts/bench.sh\`"
 }
 

@@ -1,10 +1,11 @@
 #!/usr/bin/env bash
-# Builds the library and a host program and runs it on its sample.
+# Builds the library and a host program and runs it in the caller's folder, on its sample but for what is given.
 # Usage: scripts/demo.sh [workarea options]      e.g. --grade 620 --view -84.3,36.5,-84.2,36.6
 #        scripts/demo.sh fieldbook [options]     e.g. --wgs84 K1,47.5,8.5,450 --interval 10
 #        scripts/demo.sh scratch [options]       e.g. --points 1000000 --cells cells.csv
 #        scripts/demo.sh hostinfo [options]      e.g. --json
 #        scripts/demo.sh palette [options]       e.g. FF8800 --picture palette.bmp
+# A terrain or a field book that is given, or --synthetic, takes the place of the sample and of all that goes with it.
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
@@ -14,15 +15,52 @@ mkdir -p build
 cmake -S . -B build/demo -G Ninja -DCMAKE_BUILD_TYPE=Release -DBASALT_BUILD_TESTS=OFF >build/demo.log
 program=workarea
 case "${1:-}" in
-    fieldbook | scratch | hostinfo | palette)
+    workarea | fieldbook | scratch | hostinfo | palette)
         program=$1
         shift
         ;;
 esac
 cmake --build build/demo --target $program >>build/demo.log || { cat build/demo.log; exit 1; }
+
+given=' '  # names of options that are given, and `input` for an operand
+value_follows=false
+for argument in "$@"; do
+    if $value_follows; then
+        value_follows=false
+        continue
+    fi
+    case $argument in
+        --legend | --help | --version) given+="$argument " ;;
+        --*=*) given+="${argument%%=*} " ;;
+        --?*)
+            given+="$argument "
+            value_follows=true
+            ;;
+        --)
+            given+='input '
+            break
+            ;;
+        *) given+='input ' ;;
+    esac
+done
+is_given() { [[ $given == *" $1 "* ]]; }
+data=$(realpath --relative-to="$caller_folder" examples/data)
 sample=()
 case $program in
-    fieldbook) sample=(examples/data/fieldbook.csv --alignment examples/data/axis.csv) ;;
-    workarea) sample=(examples/data/jacksboro.asc --boundary examples/data/boundary.csv --grade 500) ;;
+    fieldbook)
+        if ! is_given input; then
+            sample=("$data/fieldbook.csv")
+            is_given --alignment || sample+=(--alignment "$data/axis.csv")
+        fi
+        ;;
+    workarea)
+        if ! is_given input && ! is_given --synthetic; then
+            sample=("$data/jacksboro.asc")
+            is_given --boundary || sample+=(--boundary "$data/boundary.csv")
+            is_given --grade || sample+=(--grade 500)
+        fi
+        ;;
 esac
-exec "build/demo/examples/$program/$program" "${sample[@]}" "$@"
+run=$PWD/build/demo/examples/$program/$program
+cd "$caller_folder"
+exec "$run" "${sample[@]}" "$@"

@@ -1,10 +1,12 @@
 # Sourced by the other scripts: moves to the project's root and installs Debian packages that are missing.
 
+caller_folder=$PWD
+calling_script=$(realpath "$0")
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 
 show_help() {  # prints the calling script's opening comment when the first argument asks for help
     if [ "${1:-}" = --help ] || [ "${1:-}" = -h ]; then
-        sed -n '2,/^[^#]/{/^#/s/^# \{0,1\}//p}' "$0"
+        sed -n '2,/^[^#]/{/^#/s/^# \{0,1\}//p}' "$calling_script"
         exit 0
     fi
 }

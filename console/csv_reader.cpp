@@ -11,7 +11,6 @@
 
 namespace {
 
-constexpr std::size_t LONGEST_LINE = 4096;
 constexpr std::string_view BLANKS = " \t\r\v\f";
 
 }  // namespace
@@ -34,7 +33,9 @@ bool CsvReader::read_line() {
             return !m_text.empty();
         }
         if (m_text.size() == LONGEST_LINE) {
-            throw InputError(m_path, m_line, 1, "expected a line of text, not " + quoted(m_text));
+            throw InputError(
+                m_path, m_line, 1,
+                "the line is longer than " + std::to_string(LONGEST_LINE) + " bytes: " + quoted(m_text));
         }
         m_text += static_cast<char>(c);
     }

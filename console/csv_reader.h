@@ -17,11 +17,14 @@ struct FilePlace {
 
 /// Reads records of fields between commas. Blanks around a field are no part of it, `#` begins a comment,
 /// lines without fields are passed over, LF and CRLF files read alike, and a UTF-8 byte order mark is
-/// skipped. There is no quoting: a field holds no comma and no `#`.
+/// skipped. There is no quoting: a field holds no comma and no `#`. A line, its comment included, has at most
+/// LONGEST_LINE bytes.
 ///
 /// Whatever does not fit is an InputError that names file, line, column and what was expected there.
 class CsvReader {
 public:
+    static constexpr std::size_t LONGEST_LINE = 4096;
+
     /// Opens the file. InputError when that fails.
     explicit CsvReader(std::string path);
 

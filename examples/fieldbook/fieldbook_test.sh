@@ -171,7 +171,11 @@ sed 's/K3/T1/g; s/^point,T1.*/point,T1,5048,2136,103/' book.csv >bad.csv
 refused "bad.csv:21:1: expected the traverse to end at control point 'T1', not 'station'" bad.csv
 : >bad.csv; refused "bad.csv:1:1: expected a station, but the file ends here" bad.csv
 head -c 5000 /dev/zero >bad.csv
-refused "bad.csv:1:1: expected a line of text, not '????????????????????????????????????????...'" bad.csv
+refused "bad.csv:1:1: the line is longer than 4096 bytes: '????????????????????????????????????????...'" bad.csv
+{ printf '# %04094d\n' 0; cat book.csv; } >long.csv # the longest
+succeeds long.csv
+{ cat book.csv; printf '# %04095d\n' 0; } >bad.csv
+refused "bad.csv:$(wc -l <bad.csv):1: the line is longer than 4096 bytes: '# 00000000000000000000000000000000000000...'" bad.csv
 refused "nowhere.csv: cannot be opened: No such file or directory" nowhere.csv
 refused ".: cannot be read: Is a directory" .
 

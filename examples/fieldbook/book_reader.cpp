@@ -107,11 +107,25 @@ private:
         }
     }
 
+    /// The traverse takes its first and its last bearing from control points, and there is none between equal
+    /// coordinates.
+    void require_bearing(const std::string& station, const std::string& target) const {
+        const NamedPoint* from = m_book.find_control(station);
+        const NamedPoint* to = m_book.find_control(target);
+        if (from != nullptr && to != nullptr && from->at.north == to->at.north &&
+            from->at.east == to->at.east) {
+            m_csv.fail(1, "a control point at another place than " + in_quotes(station));
+        }
+    }
+
     /// Whether the traverse permits this sight at the current setup.
     void check_target(SightKind kind, const std::string& target) const {
         const Setup& setup = m_book.setups.back();
         if (target == setup.name) {
             m_csv.fail(1, "a target other than the station itself");
+        }
+        if (kind != SightKind::SIDE) {
+            require_bearing(setup.name, target);
         }
         if (kind == SightKind::BACK) {
             const std::size_t count = m_book.setups.size();

@@ -38,7 +38,8 @@ struct Setup {
 
 /// Setups in the order of the traverse: the first stands on a control point and looks back to another, each
 /// further one stands on the fore sight of the one before and looks back to that. Only the last may stand on
-/// a control point again.
+/// a control point again. A back or fore sight between control points has a bearing: they differ in north or
+/// east.
 struct Book {
     std::vector<NamedPoint> control;
     std::vector<Setup> setups;

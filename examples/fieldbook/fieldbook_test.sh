@@ -148,6 +148,11 @@ edit '9s/$/\npoint,K9,1,2,3/'; refused "bad.csv:10:1: expected control points ah
 edit '9s/station/stop/'; refused "bad.csv:9:1: expected point, station, back, fore or side, not 'stop'" bad.csv
 edit '10s/K2/T1/'; refused "bad.csv:10:6: expected a control point as first back sight, not 'T1'" bad.csv
 edit '10s/K2/K1/'; refused "bad.csv:10:6: expected a target other than the station itself, not 'K1'" bad.csv
+edit '4s/.*/point,K2,5e3,+2000,130/'
+refused "bad.csv:10:6: expected a control point at another place than 'K1', not 'K2'" bad.csv
+fore=$(grep -n '^fore,K4' book.csv | head -n 1 | cut -d: -f1)
+edit "$(grep -n '^point,K4' book.csv | cut -d: -f1)s/.*/point,K4,5110,2560,96.4/"
+refused "bad.csv:$fore:6: expected a control point at another place than 'K3', not 'K4'" bad.csv
 edit '17s/K1/K2/'; refused "bad.csv:17:6: expected a back sight to 'K1', not 'K2'" bad.csv
 edit '11s/K2/K3/'; refused "bad.csv:11:6: expected no second back sight beside 'K2', not 'K3'" bad.csv
 edit '13s/T1/T2/'; refused "bad.csv:13:6: expected no second fore sight beside 'T1', not 'T2'" bad.csv

@@ -214,6 +214,11 @@ refused "--sagitta takes metres from 0.0001 to 10, not 'nan'" book.csv --sagitta
 refused "--scale takes a factor from 0.9 to 1.1, not '2'" book.csv --scale 2
 refused "--target-height takes metres from -100 to 100, not '1,5'" book.csv --target-height 1,5
 refused "--precision takes SECONDS,MM,PPM, not '3,2'" book.csv --precision 3,2
+refused "--interval goes with --alignment" book.csv --interval 10
+refused "--sagitta goes with --alignment" book.csv --sagitta=0.1 --wgs84 K1,47.5,8.5,450
+refused "--target-height goes with --alignment" book.csv --target-height 1.6
+refused "--precision goes with --wgs84" book.csv --alignment axis.csv --precision 3,2,2
+succeeds book.csv --precision 3,2,2 --wgs84 K1,47.5,8.5,450
 refused "--wgs84 takes NAME,LATITUDE,LONGITUDE,HEIGHT in degrees and metres, not 'K1,91,0,0'" book.csv --wgs84 K1,91,0,0
 refused "--wgs84: 'T1' is no control point of the field book" book.csv --wgs84 T1,47,8,0
 refused "--wgs84: latitude, longitude and height may not be 0 all three" book.csv --wgs84 K1,0,0,0

@@ -1,5 +1,6 @@
 #include "options.h"
 
+#include <algorithm>
 #include <string_view>
 
 #include "input_error.h"
@@ -26,6 +27,7 @@ const Syntax SYNTAX = {
     "  --help               print this and exit\n"
     "  --version            print the version and exit\n"
     "\n"
+    "--interval, --sagitta and --target-height go with --alignment, --precision with --wgs84.\n"
     "Exit status: 0 success, 1 the results could not be written or memory ran out, 2 bad arguments or "
     "input.\n",
     {"--alignment", "--csv", "--interval", "--sagitta", "--target-height", "--scale", "--wgs84",
@@ -119,6 +121,23 @@ void set_option(Options& options, std::string_view name, const std::string& valu
     }
 }
 
+/// An option without the one that it is about would change nothing.
+void require_companions(const CommandLine& line) {
+    const auto is_given = [&line](std::string_view name) {
+        return std::any_of(line.options.begin(), line.options.end(),
+                           [name](const auto& given) { return given.first == name; });
+    };
+    constexpr std::string_view PAIRS[][2] = {{"--interval", "--alignment"},
+                                             {"--sagitta", "--alignment"},
+                                             {"--target-height", "--alignment"},
+                                             {"--precision", "--wgs84"}};
+    for (const auto& [name, companion] : PAIRS) {
+        if (is_given(name) && !is_given(companion)) {
+            throw InputError(std::string(name) + " goes with " + std::string(companion));
+        }
+    }
+}
+
 }  // namespace
 
 Options parse_options(const CommandLine& line) {
@@ -126,6 +145,7 @@ Options parse_options(const CommandLine& line) {
     for (const auto& [name, value] : line.options) {
         set_option(options, name, value);
     }
+    require_companions(line);
     options.book = file_operand(line, "field book");
     if (options.book.empty()) {
         throw InputError("no field book given (--help shows how)");

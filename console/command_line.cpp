@@ -87,6 +87,13 @@ std::string file_operand(const CommandLine& line, const std::string& what) {
     return line.operands[0];
 }
 
+const std::string& file_value(const std::pair<std::string, std::string>& option) {
+    if (option.second.empty()) {
+        throw InputError(option.first + " takes a file name, not ''");
+    }
+    return option.second;
+}
+
 void refuse_operands(const CommandLine& line) {
     if (!line.operands.empty()) {
         throw InputError("unexpected argument " + quoted(line.operands[0]) + " (--help shows what is taken)");

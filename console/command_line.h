@@ -31,6 +31,9 @@ CommandLine parse_command_line(const std::vector<std::string>& arguments, const 
 /// one and for an empty name; `what` names the file in it.
 std::string file_operand(const CommandLine& line, const std::string& what);
 
+/// The value of an option that takes a file. InputError for an empty one.
+const std::string& file_value(const std::pair<std::string, std::string>& option);
+
 /// For a program that takes none: InputError if there is an operand.
 void refuse_operands(const CommandLine& line);
 

@@ -94,18 +94,12 @@ InstrumentPrecision parse_precision(std::string_view text) {
     return {(*values)[0] * RADIANS_PER_SECOND, (*values)[1] * 1e-3, (*values)[2] * 1e-6};
 }
 
-std::string parse_file(std::string_view name, const std::string& value) {
-    if (value.empty()) {
-        throw InputError(std::string(name) + " takes a file name, not ''");
-    }
-    return value;
-}
-
-void set_option(Options& options, std::string_view name, const std::string& value) {
+void set_option(Options& options, const std::pair<std::string, std::string>& option) {
+    const auto& [name, value] = option;
     if (name == "--alignment") {
-        options.alignment = parse_file(name, value);
+        options.alignment = file_value(option);
     } else if (name == "--csv") {
-        options.csv = parse_file(name, value);
+        options.csv = file_value(option);
     } else if (name == "--interval") {
         options.interval = parse_between(name, value, 0.1, 1e4, "metres from 0.1 to 10000");
     } else if (name == "--sagitta") {
@@ -142,8 +136,8 @@ void require_companions(const CommandLine& line) {
 
 Options parse_options(const CommandLine& line) {
     Options options;
-    for (const auto& [name, value] : line.options) {
-        set_option(options, name, value);
+    for (const auto& option : line.options) {
+        set_option(options, option);
     }
     require_companions(line);
     options.book = file_operand(line, "field book");

@@ -47,7 +47,7 @@ Options parse_options(const CommandLine& line) {
         options.colours.push_back(parse_colour(colour));
     }
     if (!line.options.empty()) {
-        options.picture = line.options[0].second;
+        options.picture = file_value(line.options[0]);
     }
     return options;
 }

@@ -52,6 +52,7 @@ refused "a colour is six hexadecimal digits RRGGBB, not 'red'" red
 refused "a colour is six hexadecimal digits RRGGBB, not '#FF00FF0'" '#FF00FF0'
 refused "a colour is six hexadecimal digits RRGGBB, not ''" ''
 refused "option --picture needs a value" --picture
+refused "--picture takes a file name, not ''" --picture ''
 refused "option --picture is given twice" --picture a --picture b
 fails "cannot write to no/chart.bmp: No such file or directory" --picture no/chart.bmp
 [ ! -c /dev/full ] || fails "cannot write all of /dev/full" --picture /dev/full

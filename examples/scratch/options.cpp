@@ -37,11 +37,11 @@ std::int64_t parse_points(const std::string& text) {
 Options parse_options(const CommandLine& line) {
     Options options;
     refuse_operands(line);
-    for (const auto& [name, value] : line.options) {
-        if (name == "--points") {
-            options.points = parse_points(value);
+    for (const auto& option : line.options) {
+        if (option.first == "--points") {
+            options.points = parse_points(option.second);
         } else {
-            options.cells = value;
+            options.cells = file_value(option);
         }
     }
     return options;

@@ -121,6 +121,7 @@ fi
 refused "unexpected argument 'file' (--help shows what is taken)" file
 refused "option --points needs a value" --points
 refused "option --points is given twice" --points 1 --points 2
+refused "--cells takes a file name, not ''" --cells ''
 refused "option --cells is given twice" --cells=a --cells=b
 refused "--points takes a whole number from 1 to 400000000, not '0'" --points 0
 refused "--points takes a whole number from 1 to 400000000, not '400000001'" --points 400000001

@@ -74,15 +74,16 @@ std::int64_t parse_cells(std::string_view text) {
     return *cells;
 }
 
-void set_option(Options& options, std::string_view name, const std::string& value) {
+void set_option(Options& options, const std::pair<std::string, std::string>& option) {
+    const auto& [name, value] = option;
     if (name == "--boundary") {
-        options.boundary = value;
+        options.boundary = file_value(option);
     } else if (name == "--view") {
         options.view = parse_view(value);
     } else if (name == "--grade") {
         options.grade = parse_grade(value);
     } else if (name == "--picture") {
-        options.picture = value;
+        options.picture = file_value(option);
     } else {
         options.synthetic = parse_cells(value);
     }
@@ -92,8 +93,8 @@ void set_option(Options& options, std::string_view name, const std::string& valu
 
 Options parse_options(const CommandLine& line) {
     Options options;
-    for (const auto& [name, value] : line.options) {
-        set_option(options, name, value);
+    for (const auto& option : line.options) {
+        set_option(options, option);
     }
     options.legend = !line.flags.empty();
     options.terrain = file_operand(line, "terrain file");

@@ -238,6 +238,7 @@ succeeds plain.asc --boundary border.csv --picture=picture.bmp --legend
 cp plain.asc input.asc
 refused "--legend goes with --picture" plain.asc --legend
 refused "option --picture is given twice" plain.asc --picture a --picture b
+refused "--picture takes a file name, not ''" plain.asc --picture ''
 refused "--picture would overwrite input.asc" input.asc --picture input.asc
 refused "--picture would overwrite border.csv" plain.asc --boundary border.csv --picture ./border.csv
 fails "cannot write to no/picture.bmp: No such file or directory" plain.asc --picture no/picture.bmp
@@ -289,6 +290,7 @@ fi
 refused "no terrain file given (--help shows how)"
 refused "option --view needs a value" plain.asc --view
 refused "option --boundary needs a value" plain.asc --boundary
+refused "--boundary takes a file name, not ''" plain.asc --boundary=
 refused "option --grade is given twice" plain.asc --grade 1 --grade 2
 refused "one terrain file only, but 'b.asc' is a second one" a.asc b.asc
 refused "--grade takes an elevation in metres, not '5m'" plain.asc --grade 5m

@@ -35,6 +35,12 @@ inline std::optional<std::int64_t> parse_integer(std::string_view text) {
     return parse_any_number<std::int64_t>(text);
 }
 
+/// Whether a word begins as numbers do, with a digit, a sign or a point, or is `nan` or `inf`. A name does
+/// not.
+inline bool begins_number(std::string_view word) {
+    return word.find_first_of("+-.0123456789") == 0 || parse_any_number<double>(word);
+}
+
 /// `text` in quotes for a message: shortened, and nothing in it that could disturb a terminal.
 inline std::string quoted(std::string_view text) {
     constexpr std::size_t LONGEST = 40;

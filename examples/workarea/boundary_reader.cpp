@@ -89,7 +89,8 @@ std::vector<Place> read_boundary(const std::string& path) {
         }
         const std::string_view first = trimmed(content.substr(0, comma));
         const std::string_view second = trimmed(content.substr(comma + 1));
-        const bool names = !first.empty() && !second.empty() && !parse_number(first) && !parse_number(second);
+        const bool names =
+            !first.empty() && !second.empty() && !begins_number(first) && !begins_number(second);
         if (!(may_be_header && names)) {
             vertices.push_back({coordinate(path, line, first, "longitude", 360.0),
                                 coordinate(path, line, second, "latitude", 90.0)});

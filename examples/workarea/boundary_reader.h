@@ -15,7 +15,8 @@ struct Place {
 /// line.
 ///
 /// The file has `longitude,latitude` on each line. `#` begins a comment, empty lines are passed over, and the
-/// first line may name the columns. Everything else is an InputError that names file and line.
+/// first line may name the columns, by names that do not begin as numbers do. Everything else is an
+/// InputError that names file and line.
 std::vector<Place> read_boundary(const std::string& path);
 
 #endif

@@ -28,12 +28,6 @@ std::string lower_case(std::string_view word) {
     return lower;
 }
 
-/// A word that begins like a number ends the header; no key does.
-bool begins_number(std::string_view word) {
-    return lower_case(word) == "nan" || word[0] == '-' || word[0] == '+' || word[0] == '.' ||
-           (word[0] >= '0' && word[0] <= '9');
-}
-
 double parse_header_value(const TextScanner& scanner, Key key) {
     const std::string_view word = scanner.word();
     const std::string name(KEYS[key]);
@@ -86,7 +80,7 @@ void EsriGridReader::read_header() {
             continue;
         }
         if (begins_number(m_scanner.word())) {
-            break;
+            break;  // no key does
         }
         const auto found = std::find(KEYS.begin(), KEYS.end(), lower_case(m_scanner.word()));
         if (found == KEYS.end()) {

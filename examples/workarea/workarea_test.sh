@@ -163,6 +163,7 @@ edit() { sed "$1" plain.asc >bad.asc; }
 edit 's/60/6O/'; refused "bad.asc:8:4: '6O' is not a number" bad.asc
 edit 's/60/60,5/'; refused "bad.asc:8:4: '60,5' is not a number" bad.asc
 edit 's/60/inf/'; refused "bad.asc:8:4: 'inf' is no elevation in metres, nor the header's NODATA_value" bad.asc
+edit 's/^10 /inf /'; refused "bad.asc:7:1: 'inf' is no elevation in metres, nor the header's NODATA_value" bad.asc
 edit 's/60/-32768/'; refused "bad.asc:8:4: '-32768' is no elevation in metres, nor the header's NODATA_value" bad.asc
 edit 's/60 //'; refused "bad.asc:8:9: the row ends after 3 of 4 values" bad.asc
 edit 's/60/60 65/'; refused "bad.asc:8:13: more values than ncols says (4)" bad.asc
@@ -222,6 +223,19 @@ border '10,0\n11,2,300\n12,2\n'
 refused "border.csv:2: expected longitude,latitude but found '11,2,300'" plain.asc --boundary border.csv
 border '10,0\n11,91\n12,2\n'
 refused "border.csv:2: latitude '91' is not in degrees" plain.asc --boundary border.csv
+for slip in 8O.5,3O.1 -1O,0 +1O,.5O .x,.y; do # no names of columns
+    border " $slip\n10,-1.5\n12,-1.5\n12,0.5\n"
+    refused "border.csv:1: longitude '${slip%,*}' is not a number" plain.asc --boundary border.csv
+done
+for slip in nan,nan NaN,inf Infinity,-nan; do
+    border " $slip\n10,-1.5\n12,-1.5\n12,0.5\n"
+    refused "border.csv:1: longitude '${slip%,*}' is not a number" plain.asc --boundary border.csv
+done
+border 'Lon,3O.1\n10,-1.5\n12,-1.5\n12,0.5\n'
+refused "border.csv:1: longitude 'Lon' is not a number" plain.asc --boundary border.csv
+border 'Nantes,Info\n10,-1.5\n12,-1.5\n12,0.5\n10,0.5\n'
+succeeds plain.asc --boundary border.csv
+is "Boundary vertices" 4
 border '50,0\n51,0\n51,1\n'
 refused "border.csv: no cell of the view lies inside the boundary" plain.asc --boundary border.csv
 refused "none.csv: cannot be opened: No such file or directory" plain.asc --boundary none.csv

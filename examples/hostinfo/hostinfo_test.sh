@@ -90,8 +90,32 @@ sed 's/$/\r/' out | cmp -s - "logs/été $(printf '\351').log" || fail "the log 
 fails "cannot write the log nowhere/host.log" --log nowhere/host.log
 [ ! -w /dev/full ] || fails "cannot write the log /dev/full" --log /dev/full
 
+succeeds --log /dev/null "$work/data.d"
+mkfifo pipe
+fails "cannot write the log pipe" --log pipe
+exec 3<>pipe 4<pipe 3>&- # a reader that waits for nobody
+succeeds --log pipe "$work/data.d"
+cat <&4 >piped
+exec 4<&-
+sed 's/$/\r/' out | cmp -s - piped || fail "the log did not go through the pipe"
+fails "cannot write the log data.d" --log data.d
+
+# The file that is asked about is no log, by whatever name, and stays.
+printf x >asked.txt
+mkdir -p folder
+ln -s ../asked.txt folder/link.txt
+refused "--log would overwrite asked.txt" --log asked.txt asked.txt
+refused "--log would overwrite folder\\link.txt" --log "$work/asked.txt" 'folder\link.txt'
+[ "$(cat asked.txt)" = x ] || fail "the file that is asked about was overwritten"
+
 refused "option --log needs a value" --log
 refused "option --log takes a path, not ''" --log=
+for option in --root --product; do # 259 characters, which are more bytes
+    long=$(printf '\303\251%0258d' 0)
+    succeeds $option "$long"
+    is "${option#--}" "$long"
+    refused "option $option takes a path of at most 259 characters, not '??$(printf '%038d' 0)...'" $option "${long}1"
+done
 refused "option --root is given twice" --root a --root b
 refused "option --json takes no value" --json=x
 refused "one path only, but 'b' is a second one" a b

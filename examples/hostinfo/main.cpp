@@ -1,17 +1,31 @@
 // What a host shows in its about box and writes into its diagnostics log.
 
+#include <filesystem>
 #include <string>
+#include <system_error>
 #include <vector>
 
 #include "facts.h"
+#include "input_error.h"
 #include "options.h"
 #include "program.h"
 #include "report.h"
 
 namespace {
 
+/// A slip of the fingers should not cost the file that is asked about.
+void spare_path(const std::string& log, const std::string& path) {
+    std::error_code no_such_file;
+    if (std::filesystem::equivalent(system_path(log), system_path(path), no_such_file)) {
+        throw InputError("--log would overwrite " + path);
+    }
+}
+
 std::string run(const CommandLine& line) {
     const Options options = parse_options(line);
+    if (options.log && options.path) {
+        spare_path(*options.log, *options.path);
+    }
     const std::vector<Section> facts = gather_facts(options);
     const CString text = text_report(facts);
     if (options.log) {

@@ -1,5 +1,7 @@
 #include "options.h"
 
+#include <basalt/platform.h>
+
 #include <string_view>
 
 #include "input_error.h"
@@ -25,6 +27,16 @@ const Syntax SYNTAX = {
 
 namespace {
 
+/// The library cuts what is longer.
+std::string parse_folder(std::string_view name, const std::string& value) {
+    constexpr int LONGEST = 259;
+    if (CString(value.c_str()).GetLength() > LONGEST) {
+        throw InputError("option " + std::string(name) + " takes a path of at most " +
+                         std::to_string(LONGEST) + " characters, not " + quoted(value));
+    }
+    return value;
+}
+
 void set_option(Options& options, std::string_view name, const std::string& value) {
     if (value.empty()) {
         throw InputError("option " + std::string(name) + " takes a path, not ''");
@@ -32,9 +44,9 @@ void set_option(Options& options, std::string_view name, const std::string& valu
     if (name == "--log") {
         options.log = value;
     } else if (name == "--root") {
-        options.root = value;
+        options.root = parse_folder(name, value);
     } else {
-        options.product = value;
+        options.product = parse_folder(name, value);
     }
 }
 

@@ -3,6 +3,9 @@
 #include <basalt/frame.h>
 #include <basalt/util.h>
 
+#include <fcntl.h>
+#include <unistd.h>
+
 #include <algorithm>
 #include <filesystem>
 #include <stdexcept>
@@ -76,19 +79,45 @@ struct AsJson {
     }
 };
 
-/// The name under which the library has a file of a path: in UTF-8, `/` for either separator.
-std::filesystem::path system_path(std::string path) {
-    const CString text(path.c_str());
-    if (text.Find(L'\xFFFD') >= 0) {
-        // Bytes that are no text stay as they are.
-        std::replace(path.begin(), path.end(), '\\', '/');
-        return path;
+/// A device or a pipe, open for writing for as long as a log writes to it: it holds nothing to look at
+/// afterwards, but can be asked whether it takes text.
+class Device {
+public:
+    explicit Device(const std::filesystem::path& path)
+        : m_file(open(path.c_str(), O_WRONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC)) {}
+    ~Device() {
+        if (m_file >= 0) {
+            close(m_file);
+        }
     }
-    std::u32string name;
-    for (int i = 0; i < text.GetLength(); ++i) {
-        name += text[i] == L'\\' ? U'/' : static_cast<char32_t>(text[i]);
+    Device(const Device&) = delete;
+    Device& operator=(const Device&) = delete;
+
+    /// A full one refuses even nothing; a pipe that nobody reads was not opened.
+    bool takes_text() const { return m_file >= 0 && write(m_file, "", 0) == 0; }
+
+private:
+    int m_file;
+};
+
+void log_text(const std::string& path, const CString& text) {
+    vex_util::FileLogger log(path.c_str());
+    log.Write(text);
+}
+
+/// Logs into a file or whatever has the name. False when the text is not there.
+bool has_logged(const std::string& path, const CString& text) {
+    const std::filesystem::path file = system_path(path);
+    std::error_code unknown;
+    if (std::filesystem::is_other(file, unknown)) {
+        const Device device(file);
+        log_text(path, text);
+        return device.takes_text();
     }
-    return name;
+    log_text(path, text);
+    const std::string bytes = narrow(text);
+    const auto carriage_returns = static_cast<std::uintmax_t>(std::count(bytes.begin(), bytes.end(), '\n'));
+    return std::filesystem::file_size(file, unknown) == bytes.size() + carriage_returns;
 }
 
 }  // namespace
@@ -143,15 +172,23 @@ std::string narrow(const CString& text) {
     return all;
 }
 
+std::filesystem::path system_path(std::string path) {
+    const CString text(path.c_str());
+    if (text.Find(L'\xFFFD') >= 0) {
+        // Bytes that are no text stay as they are.
+        std::replace(path.begin(), path.end(), '\\', '/');
+        return path;
+    }
+    std::u32string name;
+    for (int i = 0; i < text.GetLength(); ++i) {
+        name += text[i] == L'\\' ? U'/' : static_cast<char32_t>(text[i]);
+    }
+    return name;
+}
+
 void write_log(const std::string& path, const CString& text) {
-    vex_util::FileLogger log(path.c_str());
-    log.Write(text);
-    log.Close();
-    // The log itself keeps silent about what went wrong.
-    const std::string bytes = narrow(text);
-    const auto carriage_returns = static_cast<std::uintmax_t>(std::count(bytes.begin(), bytes.end(), '\n'));
-    std::error_code unknown;
-    if (std::filesystem::file_size(system_path(path), unknown) != bytes.size() + carriage_returns) {
+    // The log itself keeps silent about what goes wrong.
+    if (!has_logged(path, text)) {
         throw std::runtime_error("cannot write the log " + path);
     }
 }

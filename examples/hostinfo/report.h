@@ -2,6 +2,7 @@
 #ifndef HOSTINFO_REPORT_H
 #define HOSTINFO_REPORT_H
 
+#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -16,7 +17,11 @@ CString json_report(const std::vector<Section>& sections);
 /// A text in the encoding of the environment's locale.
 std::string narrow(const CString& text);
 
-/// Writes a text into a log file. std::runtime_error, naming it, when it does not arrive there.
+/// The name under which the library has a file of a path: in UTF-8, `/` for either separator.
+std::filesystem::path system_path(std::string path);
+
+/// Writes a text into a log file, device or pipe. std::runtime_error, naming it, when it does not arrive
+/// there.
 void write_log(const std::string& path, const CString& text);
 
 #endif

@@ -2,12 +2,16 @@
 
 #include <basalt/version.h>
 
+#include <unistd.h>
+
 #include <cerrno>
 #include <cstdio>
 #include <exception>
+#include <filesystem>
 #include <new>
 #include <stdexcept>
 #include <system_error>
+#include <utility>
 #include <vector>
 
 #include "input_error.h"
@@ -60,18 +64,47 @@ void print(const std::string& text) {
     write_all(stdout, text, "standard output");
 }
 
-void write_file(const std::string& path, const std::string& text) {
-    std::FILE* file = std::fopen(path.c_str(), "wb");
-    if (file == nullptr) {
-        throw std::runtime_error("cannot write to " + path + ": " + std::generic_category().message(errno));
+OutputFile::OutputFile(std::string path) : m_path(std::move(path)) {
+    std::error_code unknown;
+    m_is_new = !std::filesystem::exists(std::filesystem::symlink_status(m_path, unknown));
+    m_file = std::fopen(m_path.c_str(), "ab");
+    if (m_file == nullptr) {
+        fail();
     }
+}
+
+OutputFile::~OutputFile() {
+    if (m_file == nullptr) {
+        return;
+    }
+    std::fclose(m_file);
+    if (m_is_new) {
+        std::error_code refused;
+        std::filesystem::remove(m_path, refused);
+    }
+}
+
+void OutputFile::write(const std::string& text) {
+    std::FILE* const file = std::exchange(m_file, nullptr);
     try {
-        write_all(file, text, path);
+        // What has no length, as a device or a pipe, has nothing to be replaced.
+        if (ftruncate(fileno(file), 0) != 0 && errno != EINVAL) {
+            fail();
+        }
+        write_all(file, text, m_path);
     } catch (...) {
         std::fclose(file);
         throw;
     }
     if (std::fclose(file) != 0) {
-        throw std::runtime_error("cannot write to " + path + ": " + std::generic_category().message(errno));
+        fail();
     }
+}
+
+void OutputFile::fail() const {
+    throw std::runtime_error("cannot write to " + m_path + ": " + std::generic_category().message(errno));
+}
+
+void write_file(const std::string& path, const std::string& text) {
+    OutputFile(path).write(text);
 }

@@ -3,6 +3,7 @@
 #ifndef CONSOLE_PROGRAM_H
 #define CONSOLE_PROGRAM_H
 
+#include <cstdio>
 #include <functional>
 #include <string>
 
@@ -25,6 +26,28 @@ int exit_status_of(const std::string& name, const std::function<int()>& work);
 
 /// Prints a text whole. std::runtime_error, with the system's reason, when that fails.
 void print(const std::string& text);
+
+/// A file that is written whole when all work is done, and opened ahead of it: what cannot be written to is
+/// told at once. Failures are std::runtime_error, naming the file and the system's reason.
+class OutputFile {
+public:
+    /// What the file holds stays until write().
+    explicit OutputFile(std::string path);
+    /// Without write() a file that was not there before is gone again.
+    ~OutputFile();
+    OutputFile(const OutputFile&) = delete;
+    OutputFile& operator=(const OutputFile&) = delete;
+
+    /// Replaces what the file holds. Called once.
+    void write(const std::string& text);
+
+private:
+    [[noreturn]] void fail() const;
+
+    std::string m_path;
+    bool m_is_new;
+    std::FILE* m_file;  ///< null once it is written
+};
 
 /// Writes a file whole. std::runtime_error, naming it and the system's reason, when that fails.
 void write_file(const std::string& path, const std::string& text);

@@ -6,6 +6,7 @@
 #include <chrono>
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <stdexcept>
 #include <string>
 
@@ -105,6 +106,11 @@ std::string read_cells(const PointStore& store, bool wants_text, Outcome& outcom
 
 std::string sort_and_grid(const CommandLine& line) {
     const Options options = parse_options(line);
+    // Ahead of the job, which may take an hour.
+    std::optional<OutputFile> cells_file;
+    if (options.cells) {
+        cells_file.emplace(*options.cells);
+    }
     catch_interrupts();
     // What a run that was killed has left in the folder.
     vex_util::CMemoryMap::CleanUp();
@@ -128,10 +134,9 @@ std::string sort_and_grid(const CommandLine& line) {
     outcome.store_files = store.files();
     outcome.store_file_bytes = PointStore::MAP_BYTES;
     std::string cells;
-    outcome.read_seconds =
-        seconds_for([&] { cells = read_cells(store, options.cells.has_value(), outcome); });
-    if (options.cells) {
-        write_file(*options.cells, cells);
+    outcome.read_seconds = seconds_for([&] { cells = read_cells(store, cells_file.has_value(), outcome); });
+    if (cells_file) {
+        cells_file->write(cells);
     }
     return write_report(outcome);
 }

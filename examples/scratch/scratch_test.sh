@@ -82,10 +82,10 @@ fi
 failures=$?
 leaves_nothing "a job without room"
 
-# interrupt SIGNAL: sends it once the job's first file is there
+# interrupt SIGNAL DELAY ARGUMENT...: sends it once the job's first file is there
 interrupt() {
     # A shell starts what runs behind it deaf to SIGINT.
-    env --default-signal=INT "$program" --points 100000000 >out 2>err &
+    env --default-signal=INT "$program" --points 100000000 "${@:3}" >out 2>err &
     local job=$!
     for _ in $(seq 500); do
         [ -n "$(ls -A temporary)" ] && break
@@ -105,6 +105,19 @@ for delay in 0 0.3; do
 done
 interrupt TERM 0.1
 leaves_nothing "SIGTERM"
+
+# Cells are opened ahead of the job, and what is there already stays until they are written.
+interrupt INT 0.1 --cells new.csv
+[ ! -e new.csv ] || fail "an interrupted job left its cells"
+cp cells.csv old.csv
+interrupt INT 0.1 --cells old.csv
+cmp -s cells.csv old.csv || fail "an interrupted job took the cells of another"
+leaves_nothing "SIGINT with cells"
+TMPDIR=$work/nowhere fails "cannot write to nowhere/cells.csv: No such file or directory" --cells nowhere/cells.csv
+TMPDIR=$work/nowhere fails "cannot write to .: Is a directory" --cells .
+[ ! -w /dev/full ] || fails "cannot write to /dev/full: No space left on device" --points 10 --cells /dev/full
+succeeds --points 1 --cells old.csv # shorter than before
+model 1 | cmp -s - old.csv || fail "cells written over others: $(head -n 3 old.csv)"
 
 # What a killed job has left of mapped blocks goes with the next run, and nothing else does.
 touch "temporary/~0000123.mem" temporary/other

@@ -160,6 +160,10 @@ gives $'1\n\n  # 3 4\n1 two  words\n1' contains site.csv <line
 printf '1 , 2\n+3,4e0,a, b\n' >line
 gives $'1\n1,a, b' contains site.csv --csv <line
 gives $'1 , 2,1\n+3,4e0,a, b,1' contains site.csv --csv --keep <line
+printf '1,2,\n1,2, ,\n1,2, \n1,2,a,\n' >line
+gives $'1,\n1,,\n1,\n1,a,' contains site.csv --csv <line # the last field may be empty
+gives $'1,2,,1\n1,2, ,,1\n1,2, ,1\n1,2,a,,1' contains site.csv --csv --keep <line
+of "1 2 " 1 contains site.csv
 gives "" contains site.csv </dev/null
 { echo 5 5; printf '5 5 %01048573d\n' 0; printf '5 5 %02500000d\r\n' 0; echo 5 15; } >line
 run contains site.csv <line
@@ -226,6 +230,7 @@ misused "POLYGON.csv is missing (--help shows what is taken)" contains
 misused "B is missing (--help shows what is taken)" crosstrack 0,1
 misused "ORIGIN '-1,2': expected z in metres, but the line ends before it" neu -1,2
 misused "ORIGIN '0,0,0': the point is too near the earth's centre to have a latitude" neu 0,0,0
+misused "ORIGIN '1,2,3e6,': expected its end, not ''" neu 1,2,3e6,
 misused "B '1,2,3': expected its end, not '3'" crosstrack 0,1 1,2,3
 misused "expected nearest or colour, not 'all'" palette all
 refused "no command given (--help lists them)"

@@ -30,7 +30,7 @@ public:
     /// The line as a whole, of which nothing is left then.
     std::string_view whole_line();
     /// Whether there is no further field.
-    bool ended() const { return m_ended || m_at == m_line.size(); }
+    bool ended() const { return m_format.csv ? m_ended : rest().empty(); }
     /// What was not read, without blanks at its ends.
     std::string_view rest() const;
 

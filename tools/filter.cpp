@@ -62,9 +62,8 @@ private:
         Fields fields(line, m_format);
         Row row(text, m_format);
         m_filter(fields, row);
-        const std::string_view rest = fields.rest();
-        if (!rest.empty() && !m_format.keep) {
-            row.text(rest);
+        if (!fields.ended() && !m_format.keep) {
+            row.text(fields.rest());
         }
     }
 

@@ -133,6 +133,9 @@ printf '\n#a\r\n' >line
 gives $'\n2361' hex <line
 of 'C:\a b/c.d,"e".tgz' $'C:\t\\a b/\tc.d,"e"\t.tgz' path
 of 'C:\a b/c.d,"e".tgz' 'C:,\a b/,"c.d,""e""",.tgz' path --csv
+of '/a,b/c "d".e' '"/a,b/c ""d"".e",,"/a,b/","c ""d""",.e' path --csv --keep
+of '/a b/c.d' '/a b/c.d,,/a b/,c,.d' path --csv --keep
+of '/a,b/c.d' $'/a,b/c.d\t\t/a,b/\tc\t.d' path --keep
 of '#a' $'\t\t#a\t' path
 of $'/\xe9\xff.x' $'\t/\t\xe9\xff\t.x' path
 of "#fe0000 roof" "0 #FF0000 roof" palette nearest

@@ -37,8 +37,9 @@ struct Example {
 
 /// Which lines hold fields.
 enum class Lines {
-    MARKED,   ///< all but blank ones and those that begin with #, which are copied
-    UNMARKED  ///< all: anything may be a text
+    MARKED,    ///< all but blank ones and those that begin with #, which are copied
+    UNMARKED,  ///< all: anything may be a text
+    WHOLE      ///< all, each one text with whatever it holds
 };
 
 /// Reads a line's fields and writes its results. InputError, which may come after some were written, refuses

@@ -55,12 +55,13 @@ private:
                 return;
             }
         }
-        if (m_format.keep) {
-            text += line;
-            text += m_format.separator;
-        }
         Fields fields(line, m_format);
         Row row(text, m_format);
+        if (m_format.keep && m_command.lines == Lines::WHOLE) {
+            row.any_text(line);
+        } else if (m_format.keep) {
+            row.text(line);
+        }
         m_filter(fields, row);
         if (!fields.ended() && !m_format.keep) {
             row.text(fields.rest());

@@ -78,7 +78,7 @@ const Command HEX = {
     {},
     {{"echo 'P1 ok' | basalt hex", "5031206f6b"}},
     make_hex,
-    Lines::UNMARKED};
+    Lines::WHOLE};
 
 const Command UNHEX = {
     "unhex",
@@ -89,16 +89,17 @@ const Command UNHEX = {
     {},
     {{"echo '5031206F6B' | basalt unhex", "P1 ok"}},
     make_unhex,
-    Lines::UNMARKED};
+    Lines::WHOLE};
 
 const Command PATH = {
     "path",
     "",
     "a path taken apart",
     "Reads a path, split at / and \\ alike. Writes DRIVE DIRECTORY NAME EXTENSION with a tab between them,\n"
-    "or a comma with --csv: joined they are the path. The disk is not asked.",
+    "or a comma with --csv, which puts what holds one in quotes, the line of --keep too. Joined they are\n"
+    "the path. The disk is not asked.",
     {CSV, KEEP},
     {{"echo '/data/job.tar.gz' | basalt path --csv", ",/data/,job.tar,.gz"}},
     make_path,
-    Lines::UNMARKED,
+    Lines::WHOLE,
     '\t'};

@@ -209,6 +209,17 @@ for time in 2024-1-01 2024-01-01T24:00:00 2024-01-01T00:60:00 2016-12-31T23:59:6
     2024-01-01T00:00:1 2024-01-01T00:00:00. 2024-01-01T00:00:00ZZ 2024-01-01Z -024-01-01; do
     leaves_out $time "expected a time like 2024-02-29 or 2024-02-29T23:59:59.5, not '$time'" javatime
 done
+for command in mjd gps javatime; do # no midnight with the time behind it
+    leaves_out "2024-02-29 12:00:00" "expected nothing but a T between the date and '12:00:00'" $command
+    leaves_out $'2024-02-29\t 9:05 x' "expected nothing but a T between the date and '9:05 x'" $command
+    leaves_out "2024-02-29 T12:00:00.5Z" "expected nothing but a T between the date and 'T12:00:00.5Z'" $command
+    leaves_out "2024-02-29, 12:00:00,x" "expected nothing but a T between the date and '12:00:00,x'" $command --csv
+    leaves_out "2024-02-29 12:00" "expected nothing but a T between the date and '12:00'" $command --keep
+done
+for rest in 1:500 123:45 12: :30 12 T t:30 noon 12:3; do
+    of "2000-01-01 $rest" "51544 $rest" mjd
+done
+of "2000-01-01T12:00:00 12:00:00" "51544.50000 12:00:00" mjd --precision 0
 for day in -1 +1 23257591 1. 1.5e3 .5 1.-5; do
     leaves_out $day "expected an MJD from 0 to below 23257591, not '$day'" mjd --inverse
 done

@@ -1,6 +1,7 @@
 // Calendar time, Modified Julian Date, GPS time, milliseconds since 1970.
 #include <basalt/geo.h>
 
+#include <algorithm>
 #include <cmath>
 #include <optional>
 
@@ -18,8 +19,33 @@ constexpr std::uint32_t GPS_EPOCH = 44244;
 constexpr std::uint32_t LAST_GPS_DAY = GPS_EPOCH + 65535;
 constexpr int SECONDS_OF_WEEK = 7 * SECONDS_OF_DAY;
 
-void write_mjd(Fields& fields, Row& row, int digits) {
+/// Whether a text begins like 9:05 or T09:05:00.
+bool begins_time_of_day(std::string_view text) {
+    const auto skip_digits = [&text] {
+        const std::size_t count = std::min(text.find_first_not_of("0123456789"), text.size());
+        text.remove_prefix(count);
+        return count;
+    };
+    text.remove_prefix(!text.empty() && (text[0] == 'T' || text[0] == 't') ? 1 : 0);
+    const std::size_t hour = skip_digits();
+    if (hour < 1 || hour > 2 || text.empty() || text[0] != ':') {
+        return false;
+    }
+    text.remove_prefix(1);
+    return skip_digits() == 2;
+}
+
+/// A date alone is midnight to whoever goes on with the result, so none may have lost its time of day.
+Moment read_moment(Fields& fields) {
     const Moment moment = parse_moment(fields.text(A_TIME));
+    if (!moment.seconds && begins_time_of_day(fields.rest())) {
+        throw InputError("expected nothing but a T between the date and " + quoted(fields.rest()));
+    }
+    return moment;
+}
+
+void write_mjd(Fields& fields, Row& row, int digits) {
+    const Moment moment = read_moment(fields);
     if (!moment.seconds) {
         row.whole(moment.mjd);
         return;
@@ -59,7 +85,7 @@ Filter make_mjd(const CommandLine& line, const Format& format) {
 }
 
 void write_gps(Fields& fields, Row& row, int digits) {
-    const Moment moment = parse_moment(fields.text(A_TIME));
+    const Moment moment = read_moment(fields);
     if (moment.mjd < GPS_EPOCH || moment.mjd > LAST_GPS_DAY) {
         throw InputError("GPS time is known from 1980-01-06 to 2159-06-11");
     }
@@ -92,7 +118,7 @@ Filter make_gps(const CommandLine& line, const Format& format) {
 constexpr int LAST_JAVA_YEAR = 30827;
 
 void write_javatime(Fields& fields, Row& row) {
-    const Moment moment = parse_moment(fields.text(A_TIME));
+    const Moment moment = read_moment(fields);
     const Date date = date_of(moment.mjd);
     if (date.year < 1970 || date.year > LAST_JAVA_YEAR) {
         throw InputError("expected a time from 1970 to 30827");
@@ -132,8 +158,8 @@ const Command MJD = {
     "Modified Julian Date of a calendar date",
     "Reads TIME: 2024-02-29, 2024-02-29T23:59:59.5 or the same with a Z behind it; Gregorian, from\n"
     "1858-11-17 to 65535-12-31, without leap seconds. Writes MJD: whole days since 1858-11-17, with a\n"
-    "fraction where there is a time of day. With --inverse reads MJD, and writes a date, with the time\n"
-    "of day where there is a fraction.",
+    "fraction where there is a time of day. A time of day behind a date without the T is refused. With\n"
+    "--inverse reads MJD, and writes a date, with the time of day where there is a fraction.",
     {INVERSE, CSV, KEEP, PRECISION},
     {{"echo '2000-01-01T12:00:00' | basalt mjd --precision 0", "51544.50000"},
      {"echo '60369' | basalt mjd --inverse", "2024-02-29"}},

@@ -1,6 +1,7 @@
 // What CString does by the environment's character classes: case and white space.
 
 #include <algorithm>
+#include <functional>
 #include <string_view>
 
 #include "basalt/platform/cstring.h"
@@ -13,14 +14,15 @@ using basalt::platform::text_or_empty;
 
 namespace {
 
+// By reference: a copy could take memory, which may be gone when one end is trimmed already.
 template <class Matches>
-void trim_left(std::wstring& text, Matches matches) {
-    text.erase(text.begin(), std::find_if_not(text.begin(), text.end(), matches));
+void trim_left(std::wstring& text, const Matches& matches) {
+    text.erase(text.begin(), std::find_if_not(text.begin(), text.end(), std::cref(matches)));
 }
 
 template <class Matches>
-void trim_right(std::wstring& text, Matches matches) {
-    text.erase(std::find_if_not(text.rbegin(), text.rend(), matches).base(), text.end());
+void trim_right(std::wstring& text, const Matches& matches) {
+    text.erase(std::find_if_not(text.rbegin(), text.rend(), std::cref(matches)).base(), text.end());
 }
 
 auto is_white_space() {

@@ -4,6 +4,9 @@
 
 #include <algorithm>
 #include <climits>
+#include <optional>
+
+#include "tests/support/with_failing_allocations.h"
 
 namespace {
 
@@ -143,6 +146,16 @@ TEST(CString, trimming) {
     EXPECT_EQ(CString(L"xyaxy").TrimRight(L"yx"), L"xya");
     CString own = L"abcba";
     EXPECT_EQ(own.Trim(own), L"");
+}
+
+TEST(CString, lack_of_memory_trims_neither_end) {
+    std::optional<CString> text(L"-+*/ text */+-");
+    const long failed = with_failing_allocations([&] { text->Trim(L"+-*/"); },
+                                                 [&](bool fired) {
+                                                     EXPECT_EQ(*text, fired ? L"-+*/ text */+-" : L" text ");
+                                                     text.emplace(L"-+*/ text */+-");
+                                                 });
+    EXPECT_GT(failed, 0);
 }
 
 TEST(CString, buffer) {

@@ -111,6 +111,25 @@ TEST(CString, joining) {
     EXPECT_EQ(L'x' + (L"y" + CString(L"a")) + L"b" + CString(L"c") + L'd' + "e", L"xyabcde");
 }
 
+TEST(CString, narrow_character_is_one_of_the_code_page) {
+    const char byte = '\xC3';  // the first of two
+    const CString wide(byte);
+    CString text = L"a";
+    text += byte;
+    text += 'b';
+    EXPECT_EQ(text, L"a" + wide + L"b");
+    EXPECT_EQ('x' + wide + byte + 'y', L"x" + wide + wide + L"y");
+    EXPECT_EQ(byte + CString(), wide);
+    text = byte;
+    EXPECT_EQ(text, wide);
+    text = 'c';
+    EXPECT_EQ(text, L"c");
+    text += L'0' + 1;
+    EXPECT_EQ(text + (L'0' + 2), L"c12") << "numbers count as wide characters";
+    text = 0x416;
+    EXPECT_EQ((L'a' + 1) + text, L"b\x416");
+}
+
 TEST(CString, changing) {
     CString text = L"one two one";
     EXPECT_EQ(text.Replace(L"one", L"three"), 2);

@@ -5,6 +5,7 @@
 
 #include <cstddef>
 #include <string>
+#include <type_traits>
 #include <utility>
 
 #include "basalt/export.h"
@@ -15,13 +16,18 @@
 ///
 /// Wherever text is taken by pointer, null is the empty text. Positions count from 0; a position or count
 /// outside the text is brought to the nearest end, unless said otherwise, and is never an error. Narrow text
-/// is in the active code page: the encoding of the environment's locale, UTF-8 where that names none.
+/// is in the active code page: the encoding of the environment's locale, UTF-8 where that names none. A call
+/// that has no form for a narrow character takes its number for a wide one.
 ///
 /// Bad input: no call fails; std::bad_alloc and std::length_error (more than 2^31 - 1 characters) leave the
 /// text as it was.
 ///
 /// Threads: reentrant; one object is used by one thread at a time, or by many for reading.
 class BASALT_API CString {
+    // No plain overload for char: numbers, which become wide characters, would suit both alike.
+    template <class Character>
+    using IfNarrow = std::enable_if_t<std::is_same_v<Character, char>, int>;
+
 public:
     /// @name Construction
     /// A negative length or repeat count gives the empty text.
@@ -45,6 +51,11 @@ public:
     explicit CString(char character, int repeat = 1);
     /// Becomes the one character.
     CString& operator=(wchar_t character);
+    /// Becomes the one narrow character.
+    template <class Character, IfNarrow<Character> = 0>
+    CString& operator=(Character character) {
+        return *this = CString(character);
+    }
     /// @}
 
     /// @name Reading
@@ -118,6 +129,11 @@ public:
     CString& operator+=(const wchar_t* other);
     /// Appends a character.
     CString& operator+=(wchar_t character);
+    /// Appends a narrow character.
+    template <class Character, IfNarrow<Character> = 0>
+    CString& operator+=(Character character) {
+        return *this += CString(character);
+    }
     /// Puts a character in front of a position; gives the new length.
     int Insert(int position, wchar_t character);
     /// Puts a text in front of a position; gives the new length.
@@ -199,6 +215,16 @@ public:
     friend CString operator+(CString a, wchar_t b) { return std::move(a += b); }
     /// The two, joined.
     friend CString operator+(wchar_t a, const CString& b) { return CString(a) + b; }
+    /// The two, joined.
+    template <class Character, IfNarrow<Character> = 0>
+    friend CString operator+(CString a, Character b) {
+        return std::move(a += b);
+    }
+    /// The two, joined.
+    template <class Character, IfNarrow<Character> = 0>
+    friend CString operator+(Character a, const CString& b) {
+        return CString(a) + b;
+    }
 
     /// Whether the texts are the same.
     friend bool operator==(const CString& a, const CString& b) noexcept { return a.m_text == b.m_text; }

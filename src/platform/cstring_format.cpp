@@ -4,6 +4,7 @@
 #include <array>
 #include <cstdio>
 #include <cstdlib>
+#include <cwchar>
 #include <limits>
 #include <stdexcept>
 #include <string_view>
@@ -121,20 +122,21 @@ private:
         return static_cast<int>(number);
     }
 
+    // Steps over a text where it comes next. Looks no further: the rest of the format may be long.
+    bool skip(std::wstring_view text) {
+        const bool comes_next = std::wcsncmp(m_format, text.data(), text.size()) == 0;
+        m_format += comes_next ? text.size() : 0;
+        return comes_next;
+    }
+
     void read_size(Conversion& conversion) {
-        const std::wstring_view rest = m_format;
-        if (rest.starts_with(L"I32")) {
+        if (skip(L"I32")) {
             conversion.integer_bytes = 4;
-            m_format += 3;
-        } else if (rest.starts_with(L"I64")) {
-            m_format += 3;
-        } else if (rest.starts_with(L"hh")) {
+        } else if (skip(L"hh")) {
             conversion.integer_bytes = 1;
-            m_format += 2;
-        } else if (rest.starts_with(L"h")) {
+        } else if (skip(L"h")) {
             conversion.integer_bytes = 2;
-            m_format += 1;
-        } else {
+        } else if (!skip(L"I64")) {
             while (is_in(*m_format, L"lwI")) {
                 ++m_format;
             }

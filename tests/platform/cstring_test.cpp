@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <ctime>
 #include <optional>
 
 #include "tests/support/with_failing_allocations.h"
@@ -252,6 +253,21 @@ TEST(CStringFormat, whatever_does_not_fit_is_harmless) {
     EXPECT_EQ(formatted(L"%99999999999d", 1).size(), 1'000'000U);
     EXPECT_EQ(formatted(L"%*.*f|%-*s", INT_MIN, INT_MAX, 1.0, INT_MIN, L"").size(), 2'000'003U);
     EXPECT_EQ(formatted(L"%.99999999999s", L"abc"), L"abc");
+}
+
+TEST(CStringFormat, time_grows_no_faster_than_the_format) {
+    const auto time_of = [](int conversions, int times) {
+        std::wstring format;
+        for (int i = 0; i < conversions; ++i) {
+            format += L"%d";
+        }
+        const std::clock_t start = std::clock();
+        for (int i = 0; i < times; ++i) {
+            formatted(format.c_str(), 1);
+        }
+        return std::clock() - start;
+    };
+    EXPECT_LT(time_of(200'000, 1), 20 * time_of(1000, 200));
 }
 
 TEST(CStringFormat, arguments_may_come_from_the_text_itself) {

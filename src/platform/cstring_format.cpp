@@ -6,7 +6,7 @@
 #include <cstdlib>
 #include <cwchar>
 #include <limits>
-#include <stdexcept>
+#include <new>
 #include <string_view>
 
 #include "basalt/platform/cstring.h"
@@ -265,8 +265,9 @@ private:
         const int precision = std::min(conversion.precision, MAX_FIELD);
         const auto print = [&](char* text, std::size_t room) {
             const int length = std::snprintf(text, room, format.c_str(), conversion.width, precision, number);
+            // Lengths are limited, and no format is wrong: the C library found no memory.
             if (length < 0) {
-                throw std::length_error("CString::Format");
+                throw std::bad_alloc();
             }
             return static_cast<std::size_t>(length);
         };

@@ -4,10 +4,38 @@
 
 #include <algorithm>
 #include <climits>
+#include <cstdarg>
+#include <cstdio>
 #include <ctime>
+#include <new>
 #include <optional>
 
 #include "tests/support/with_failing_allocations.h"
+
+namespace {
+
+bool snprintf_fails = false;  // as where it finds no memory
+
+}  // namespace
+
+// The names the linker's --wrap makes of snprintf, and of what takes its place where sizes are checked.
+extern "C" {
+[[gnu::format(printf, 3, 4)]] int __wrap_snprintf(char* text, size_t room, const char* format, ...) {
+    std::va_list arguments;
+    va_start(arguments, format);
+    const int length = snprintf_fails ? -1 : std::vsnprintf(text, room, format, arguments);
+    va_end(arguments);
+    return length;
+}
+[[gnu::format(printf, 5, 6)]] int __wrap___snprintf_chk(char* text, size_t room, int, size_t,
+                                                        const char* format, ...) {
+    std::va_list arguments;
+    va_start(arguments, format);
+    const int length = snprintf_fails ? -1 : std::vsnprintf(text, room, format, arguments);
+    va_end(arguments);
+    return length;
+}
+}
 
 namespace {
 
@@ -268,6 +296,22 @@ TEST(CStringFormat, time_grows_no_faster_than_the_format) {
         return std::clock() - start;
     };
     EXPECT_LT(time_of(200'000, 1), 20 * time_of(1000, 200));
+}
+
+TEST(CStringFormat, lack_of_memory_in_the_c_library_is_bad_alloc) {
+    CString text = L"before";
+    bool is_bad_alloc = false;
+    snprintf_fails = true;
+    try {
+        text.Format(L"%.*f", 1'000'000, 1.5);
+    } catch (const std::bad_alloc&) {
+        is_bad_alloc = true;
+    } catch (const std::exception&) {
+        is_bad_alloc = false;
+    }
+    snprintf_fails = false;
+    EXPECT_TRUE(is_bad_alloc);
+    EXPECT_EQ(text, L"before");
 }
 
 TEST(CStringFormat, arguments_may_come_from_the_text_itself) {

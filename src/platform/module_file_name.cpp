@@ -9,6 +9,7 @@
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
 #include "src/platform/file_name.h"
+#include "src/platform/out_of_memory.h"
 
 DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
     if (module != nullptr) {
@@ -25,14 +26,16 @@ DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
         basalt::platform::set_last_error_from_errno();
         return 0;
     }
-    std::wstring wide;
-    basalt::platform::wide_from_system_name({link, static_cast<std::size_t>(length)}, wide);
-    const std::size_t copied = std::min<std::size_t>(wide.size(), size - 1);
-    std::copy_n(wide.data(), copied, name);
-    name[copied] = L'\0';
-    if (copied < wide.size()) {
-        SetLastError(ERROR_INSUFFICIENT_BUFFER);
-        return size;
-    }
-    return static_cast<DWORD>(copied);
+    return basalt::platform::or_out_of_memory(DWORD{0}, [&] {
+        std::wstring wide;
+        basalt::platform::wide_from_system_name({link, static_cast<std::size_t>(length)}, wide);
+        const std::size_t copied = std::min<std::size_t>(wide.size(), size - 1);
+        std::copy_n(wide.data(), copied, name);
+        name[copied] = L'\0';
+        if (copied < wide.size()) {
+            SetLastError(ERROR_INSUFFICIENT_BUFFER);
+            return size;
+        }
+        return static_cast<DWORD>(copied);
+    });
 }

@@ -9,7 +9,7 @@
 // is; `name` has room for `size` characters, the terminator included. Result: the characters written, without
 // the terminator. A longer name is cut at `size` - 1 with a terminator, and `size` is the result with
 // ERROR_INSUFFICIENT_BUFFER. Failure: 0, with ERROR_INVALID_HANDLE for another module,
-// ERROR_INVALID_PARAMETER for no room. Threads: thread-safe.
+// ERROR_INVALID_PARAMETER for no room, ERROR_NOT_ENOUGH_MEMORY. Threads: thread-safe.
 DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size);
 
 #endif

@@ -15,6 +15,10 @@
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
 #include "src/platform/file_name.h"
+#include "src/platform/out_of_memory.h"
+
+using basalt::platform::fail_with;
+using basalt::platform::or_out_of_memory;
 
 namespace {
 
@@ -151,26 +155,28 @@ DWORD GetFileVersionInfoSizeW(const wchar_t* file_name, DWORD* handle) {
     if (handle != nullptr) {
         *handle = 0;
     }
-    const BoundedFile file(system_name(file_name));
-    const std::optional<Range> block = open_block(file);
-    return block ? static_cast<DWORD>(block->size) : 0;
+    return or_out_of_memory(DWORD{0}, [&] {
+        const BoundedFile file(system_name(file_name));
+        const std::optional<Range> block = open_block(file);
+        return block ? static_cast<DWORD>(block->size) : 0;
+    });
 }
 
 BOOL GetFileVersionInfoW(const wchar_t* file_name, DWORD, DWORD length, void* data) {
-    const BoundedFile file(system_name(file_name));
-    const std::optional<Range> block = open_block(file);
-    if (!block) {
-        return 0;
-    }
-    if (block->size > length) {
-        SetLastError(ERROR_INSUFFICIENT_BUFFER);
-        return 0;
-    }
-    // Looked at again, since somebody may have written to the file in between.
-    if (!file.read(block->offset, data, static_cast<std::size_t>(block->size)) ||
-        block_length(static_cast<unsigned char*>(data)) > length) {
-        SetLastError(ERROR_RESOURCE_DATA_NOT_FOUND);
-        return 0;
-    }
-    return 1;
+    return or_out_of_memory(0, [&] {
+        const BoundedFile file(system_name(file_name));
+        const std::optional<Range> block = open_block(file);
+        if (!block) {
+            return 0;
+        }
+        if (block->size > length) {
+            return fail_with(ERROR_INSUFFICIENT_BUFFER, 0);
+        }
+        // Looked at again, since somebody may have written to the file in between.
+        if (!file.read(block->offset, data, static_cast<std::size_t>(block->size)) ||
+            block_length(static_cast<unsigned char*>(data)) > length) {
+            return fail_with(ERROR_RESOURCE_DATA_NOT_FOUND, 0);
+        }
+        return 1;
+    });
 }

@@ -37,8 +37,8 @@ static_assert(sizeof(VS_FIXEDFILEINFO) == 52);
 
 // Bytes of a file's version resource. `handle` is set to 0 when it is not null.
 // Failure: 0, with ERROR_RESOURCE_DATA_NOT_FOUND for a file that is no program of this system, has no such
-// section or is shorter than it claims, and for a block that claims to be longer than its section.
-// Threads: thread-safe.
+// section or is shorter than it claims, and for a block that claims to be longer than its section;
+// ERROR_NOT_ENOUGH_MEMORY. Threads: thread-safe.
 DWORD GetFileVersionInfoSizeW(const wchar_t* file, DWORD* handle);
 
 // Reads a file's version resource into `data`, which has room for `length` bytes. `handle` is ignored.

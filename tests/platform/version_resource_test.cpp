@@ -12,6 +12,7 @@
 #include "src/platform/module_file_name.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/version_block.h"
+#include "tests/support/with_failing_allocations.h"
 
 namespace {
 
@@ -235,6 +236,52 @@ TEST_F(VersionResourceFile, files_that_do_not_hold_one) {
     std::filesystem::remove(path);
     EXPECT_EQ(GetFileVersionInfoSizeW(path.wstring().c_str(), nullptr), 0U);
     EXPECT_EQ(GetLastError(), 2U);
+}
+
+TEST_F(VersionResourceFile, lack_of_memory_is_an_error) {
+    ProgramFile(block).write(path);
+    const std::wstring name = path.wstring();
+    Bytes data(block.size());
+    const auto room = static_cast<DWORD>(data.size());
+    DWORD size = 0;
+    const auto ask_size = [&] {
+        SetLastError(0);
+        size = GetFileVersionInfoSizeW(name.c_str(), nullptr);
+    };
+    EXPECT_GT(with_failing_allocations(ask_size,
+                                       [&](bool failed) {
+                                           EXPECT_EQ(size, failed ? 0U : room);
+                                           EXPECT_EQ(GetLastError(), failed ? 8U : 0U);
+                                           size = 1;
+                                       }),
+              0);
+    BOOL done = 0;
+    const auto read = [&] {
+        SetLastError(0);
+        done = GetFileVersionInfoW(name.c_str(), 0, room, data.data());
+    };
+    EXPECT_GT(with_failing_allocations(read,
+                                       [&](bool failed) {
+                                           EXPECT_EQ(done, failed ? 0 : 1);
+                                           EXPECT_EQ(GetLastError(), failed ? 8U : 0U);
+                                           done = -1;
+                                       }),
+              0);
+}
+
+TEST(ModuleFileName, lack_of_memory_is_an_error) {
+    wchar_t name[4096];
+    DWORD length = 0;
+    const auto ask = [&] {
+        SetLastError(0);
+        length = GetModuleFileNameW(nullptr, name, 4096);
+    };
+    const auto check = [&](bool failed) {
+        EXPECT_EQ(length == 0, failed);
+        EXPECT_EQ(GetLastError(), failed ? 8U : 0U);
+        length = 1;
+    };
+    EXPECT_GT(with_failing_allocations(ask, check), 0);
 }
 
 TEST(ModuleFileName, is_the_running_programs) {

@@ -1,6 +1,7 @@
 #include "src/platform/interface_table.h"
 
 #include <ifaddrs.h>
+#include <net/if.h>
 #include <net/if_arp.h>
 #include <netpacket/packet.h>
 #include <sys/socket.h>
@@ -9,9 +10,9 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstddef>
+#include <cstdio>
 #include <cstring>
 #include <memory>
-#include <string>
 
 #include "basalt/platform/error.h"
 #include "src/platform/error_from_errno.h"
@@ -20,12 +21,16 @@ namespace {
 
 constinit const std::span<const MIB_IFROW>* stand_in = nullptr;
 
-// Wireless interfaces report themselves as Ethernet; only this tells them apart. The folder is that of the
-// network which the file system was mounted in, so nothing else is asked of it.
+// The folder is that of the network which the file system was mounted in, so nothing else is asked of it.
+bool has_file(const char* name, const char* file) {
+    char path[sizeof "/sys/class/net//phy80211" + IF_NAMESIZE];
+    const int length = std::snprintf(path, sizeof path, "/sys/class/net/%s/%s", name, file);
+    return length >= 0 && static_cast<std::size_t>(length) < sizeof path && ::access(path, F_OK) == 0;
+}
+
+// Wireless interfaces report themselves as Ethernet; only this tells them apart.
 bool is_wireless(const char* name) {
-    const std::string folder = std::string("/sys/class/net/") + name;
-    return ::access((folder + "/wireless").c_str(), F_OK) == 0 ||
-           ::access((folder + "/phy80211").c_str(), F_OK) == 0;
+    return has_file(name, "wireless") || has_file(name, "phy80211");
 }
 
 DWORD type_of(const sockaddr_ll& link, const char* name) {

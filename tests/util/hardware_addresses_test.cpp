@@ -3,15 +3,19 @@
 #include <gtest/gtest.h>
 #include <ifaddrs.h>
 #include <net/if.h>
+#include <net/if_arp.h>
+#include <netpacket/packet.h>
 
 #include <algorithm>
 #include <cerrno>
 #include <filesystem>
 #include <fstream>
 #include <map>
+#include <new>
 #include <optional>
 
 #include "src/platform/interface_table.h"
+#include "tests/support/with_failing_allocations.h"
 
 namespace {
 
@@ -23,7 +27,8 @@ std::optional<DWORD> vanished_index;
 std::size_t grows_by = 0;  // rows that appear, one after each call for the table
 DWORD table_error = 0;
 std::span<const MIB_IFROW> rows;
-bool list_is_refused = false;
+int list_refusal = 0;            // errno
+ifaddrs* system_list = nullptr;  // null: the real one
 
 }  // namespace
 
@@ -31,11 +36,18 @@ bool list_is_refused = false;
 extern "C" {
 int __real_getifaddrs(ifaddrs** list);
 int __wrap_getifaddrs(ifaddrs** list) {
-    if (!list_is_refused) {
-        return __real_getifaddrs(list);
+    if (list_refusal != 0) {
+        errno = list_refusal;
+        return -1;
     }
-    errno = EMFILE;
-    return -1;
+    *list = system_list;
+    return system_list != nullptr ? 0 : __real_getifaddrs(list);
+}
+void __real_freeifaddrs(ifaddrs* list);
+void __wrap_freeifaddrs(ifaddrs* list) {
+    if (list != system_list) {
+        __real_freeifaddrs(list);
+    }
 }
 DWORD __real__Z10GetIfEntryP9MIB_IFROW(MIB_IFROW* row);
 DWORD __wrap__Z10GetIfEntryP9MIB_IFROW(MIB_IFROW* row) {
@@ -76,7 +88,8 @@ protected:
         basalt::platform::set_interface_table(nullptr);
         vanished_index.reset();
         grows_by = 0;
-        list_is_refused = false;
+        list_refusal = 0;
+        system_list = nullptr;
     }
 
     MACAddressFromMIBTable m_list;
@@ -116,11 +129,46 @@ TEST_F(HardwareAddresses, none_is_there_or_the_system_refuses_to_tell) {
 
     table_error = 0;
     basalt::platform::set_interface_table(nullptr);
-    list_is_refused = true;
+    list_refusal = EMFILE;
     DWORD size = 0;
     EXPECT_EQ(GetIfTable(nullptr, &size, 0), 4U);
     EXPECT_EQ(GetIfEntry(&only), 4U);
     EXPECT_FALSE(m_list.Create());
+    list_refusal = ENOMEM;
+    EXPECT_EQ(GetIfTable(nullptr, &size, 0), 8U);
+    EXPECT_EQ(GetIfEntry(&only), 8U);
+    EXPECT_THROW(m_list.Create(), std::bad_alloc);
+}
+
+TEST_F(HardwareAddresses, table_and_row_take_no_memory) {
+    basalt::platform::set_interface_table(nullptr);
+    char name[IF_NAMESIZE] = "fifteen-letters";
+    sockaddr_ll link{};
+    link.sll_family = AF_PACKET;
+    link.sll_ifindex = 7;
+    link.sll_hatype = ARPHRD_ETHER;
+    link.sll_halen = 6;
+    ifaddrs entry{};
+    entry.ifa_name = name;
+    entry.ifa_addr = reinterpret_cast<sockaddr*>(&link);
+    system_list = &entry;
+    MIB_IFTABLE table{};
+    DWORD size = sizeof table;
+    MIB_IFROW row{};
+    row.dwIndex = 7;
+    DWORD errors[2] = {1, 1};
+    const auto ask = [&] {
+        errors[0] = GetIfTable(&table, &size, 1);
+        errors[1] = GetIfEntry(&row);
+    };
+    const auto check = [&](bool) {
+        EXPECT_EQ(errors[0], 0U);
+        EXPECT_EQ(errors[1], 0U);
+    };
+    EXPECT_EQ(with_failing_allocations(ask, check), 0);
+    EXPECT_EQ(table.dwNumEntries, 1U);
+    EXPECT_EQ(row.dwType, 6U);
+    EXPECT_EQ(std::string(row.bDescr, row.bDescr + row.dwDescrLen), name);
 }
 
 TEST_F(HardwareAddresses, interfaces_that_come_and_go_meanwhile) {

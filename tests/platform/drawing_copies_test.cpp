@@ -230,6 +230,18 @@ TEST(TransparentCopy, LeavesOneColourOutAtEveryDepthAndSize) {
     }
 }
 
+TEST(TransparentCopy, LeavesOutTheStoredColourNearestToTheKey) {
+    for (const int depth : drawing::DEPTHS) {
+        Picture black_and_white(2, 1);
+        black_and_white.at(1, 0) = drawing::white(depth);
+        const Canvas source(black_and_white, depth);
+        const Canvas canvas(Picture(2, 1, 0x123456), 32);
+        EXPECT_NE(TransparentBlt(canvas, 0, 0, 2, 1, source, 0, 0, 2, 1, 0x020202), 0);
+        EXPECT_EQ(canvas.picture().at(0, 0), depth <= 16 ? 0x123456U : 0U) << depth << " bits";
+        EXPECT_EQ(canvas.picture().at(1, 0), 0xFFFFFFU);
+    }
+}
+
 TEST(TransformedCopy, OntoItsOwnSurfaceReadsThePictureBefore) {
     std::mt19937 random(22);
     SCOPED_TRACE("seed 22");
@@ -412,6 +424,15 @@ TEST(Transform, OfStepsAndPlacesFarBeyondAnySurfaceDrawsNothing) {
     EXPECT_EQ(GetLastError(), ERROR_ARITHMETIC_OVERFLOW);
     EXPECT_EQ(FillRect(canvas, &all, static_cast<HBRUSH>(GetStockObject(WHITE_BRUSH))), 0);
     EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, nullptr, 0, 0, WHITENESS), 0);
+    const XFORM too_small = {0x1p-30F, 0, 0, 0x1p-30F, 0, 0};
+    const XFORM small = {0x1p-29F, 0, 0, 0x1p-29F, 0, 0};
+    for (const XFORM* const each : {&too_small, &small}) {
+        EXPECT_NE(SetWorldTransform(canvas, each), 0);
+        EXPECT_EQ(BitBlt(canvas, 0, 0, 8, 8, source, 0, 0, SRCCOPY), each == &small ? 1 : 0);
+        EXPECT_EQ(FillRect(canvas, &all, static_cast<HBRUSH>(GetStockObject(WHITE_BRUSH))),
+                  each == &small ? 1 : 0);
+    }
+    EXPECT_NE(SetWorldTransform(canvas, &tiny), 0);
     EXPECT_EQ(DPtoLP(canvas, points, 2), 0);
     EXPECT_EQ(points[0].x, 1);
     EXPECT_NE(DPtoLP(canvas, points + 1, 1), 0);

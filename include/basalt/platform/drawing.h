@@ -6,7 +6,10 @@
 /// for any coordinates. A drawn colour becomes the nearest the surface's depth has; at 32 bits the high byte
 /// is written as 0. Under a transform, FillRect fills and BitBlt copies to a parallelogram: the pixels whose
 /// middles lie inside; GetPixel and SetPixel take the nearest pixel; the other calls fail
-/// (ERROR_NOT_SUPPORTED) unless the transform is a shift by whole pixels.
+/// (ERROR_NOT_SUPPORTED) unless the transform is a shift by whole pixels. FillRect and BitBlt fail
+/// (ERROR_ARITHMETIC_OVERFLOW) under a transform that reduces so strongly that the places two neighbouring
+/// pixels come from lie 2^30 or more apart, across or down: in units of the context, or in pixels of BitBlt's
+/// source.
 ///
 /// All give 0 for a wrong handle, unless said otherwise.
 #ifndef BASALT_PLATFORM_DRAWING_H
@@ -27,7 +30,7 @@ BASALT_API COLORREF GetPixel(HDC dc, int x, int y);
 BASALT_API COLORREF SetPixel(HDC dc, int x, int y, COLORREF colour);
 
 /// Fills a rectangle; an empty or reversed one is filled nowhere.
-/// @return nonzero; 0 for a null rectangle
+/// @return nonzero; 0 for a null rectangle and a transform that reduces too strongly
 BASALT_API int FillRect(HDC dc, const RECT* rectangle, HBRUSH brush);
 
 /// Fills a rectangle with rounded corners by the context's brush, and outlines it by its pen.
@@ -95,14 +98,18 @@ inline constexpr DWORD WHITENESS = 0x00FF0062;   ///< ones
 /// the code needs none
 /// @param rop a code as above, or any other: bits 16 to 23 are its truth table, bit brush * 4 + source * 2 +
 /// destination
-/// @return nonzero; 0 for a source turned or sheared by its transform
+/// @return nonzero; 0 for a source turned or sheared by its transform, for a transform that reduces too
+/// strongly, and where a surface copied onto itself through a transform finds no memory for the picture it is
+/// read from (ERROR_NOT_ENOUGH_MEMORY)
 ///
 /// Between depths the source is brought to the destination's first: from monochrome, 1 becomes the
 /// destination's background colour and 0 its text colour; to monochrome, a pixel of the source's background
-/// colour becomes 1 and any other 0; otherwise to the nearest colour.
+/// colour (from up to 16 bits, of the stored value whose colour is nearest to it) becomes 1 and any other 0;
+/// otherwise to the nearest colour.
 ///
 /// Through a transform, a destination pixel takes the source pixel in which its middle lies.
-/// Accuracy: of that place, 2^-32 pixels times the number of pixels across.
+/// Accuracy: of that place, 2^-32 pixels times the number of pixels across, and 2^-50 of the largest
+/// coordinate on the way, in pixels of the source.
 BASALT_API BOOL BitBlt(HDC dc, int x, int y, int width, int height, HDC source, int source_x, int source_y,
                        DWORD rop);
 
@@ -110,8 +117,10 @@ BASALT_API BOOL BitBlt(HDC dc, int x, int y, int width, int height, HDC source, 
 /// takes source column (2 i + 1) source_width / (2 width), rounded down, and rows likewise.
 /// @param dc,x,y,width,height destination
 /// @param source,source_x,source_y,source_width,source_height the rectangle copied from
-/// @param key the colour left out, 0x00BBGGRR; the unused byte of a pixel plays no part
-/// @return nonzero; 0 for a negative size. An empty destination or source draws nothing.
+/// @param key the colour left out, 0x00BBGGRR; the unused byte of a pixel plays no part. From up to 16 bits
+/// the stored value whose colour is nearest to it is left out.
+/// @return nonzero; 0 for a negative size, and where a surface copied onto itself finds no memory for the
+/// picture it is read from (ERROR_NOT_ENOUGH_MEMORY). An empty destination or source draws nothing.
 ///
 /// Between depths as BitBlt. Source pixels that do not exist leave the destination alone. Copying onto the
 /// same surface gives what copying from a picture of it taken before would.

@@ -57,7 +57,7 @@ std::span<const std::uint32_t> colour_table(int depth);
 std::uint32_t word_of_value(int depth, std::uint32_t value);
 
 // The value whose colour is nearest to a word: the least sum of squares over the channels, the first of
-// equals.
+// equals; at 16 bits either of two equals in a channel, always the same.
 std::uint32_t value_of_word(int depth, std::uint32_t word);
 inline std::uint32_t value_of_colour(int depth, COLORREF colour) {
     return value_of_word(depth, word_of_colour(colour));

@@ -67,7 +67,7 @@ TEST(AutomationDate, what_is_no_date_is_refused) {
     const double nan = std::numeric_limits<double>::quiet_NaN();
     const double infinity = std::numeric_limits<double>::infinity();
     for (const double date :
-         {-657435.0, 2958466.0, 2958465.9999999, 1e300, -1e300, nan, infinity, -infinity}) {
+         {-657435.0, -657435.99999999, 2958466.0, 2958465.9999999, 1e300, -1e300, nan, infinity, -infinity}) {
         SYSTEMTIME time = at(1, 2, 3);
         EXPECT_EQ(VariantTimeToSystemTime(date, &time), 0) << date;
         expect_same(time, at(1, 2, 3));

@@ -77,6 +77,11 @@ TEST(Selection, HoldsABitmapInOneContextAtATime) {
     EXPECT_EQ(a.SelectObject(stock)->GetSafeHandle(), second.GetSafeHandle());
     SetPixel(a, 0, 0, 0xFFFFFF);
     EXPECT_EQ(GetPixel(b, 0, 0), 0U);
+    // Its rows are nobody's to read.
+    BITMAPINFO info{};
+    info.bmiHeader.biSize = sizeof info.bmiHeader;
+    EXPECT_EQ(GetDIBits(a, *stock, 0, 0, nullptr, &info, DIB_RGB_COLORS), 0);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
     EXPECT_NE(DeleteObject(stock->GetSafeHandle()), 0);
     EXPECT_EQ(description(stock->GetSafeHandle()).bmWidth, 1);
     EXPECT_TRUE(first.DeleteObject());

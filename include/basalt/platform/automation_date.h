@@ -23,7 +23,7 @@ BASALT_API int SystemTimeToVariantTime(SYSTEMTIME* time, DATE* date);
 
 /// Converts an automation date to calendar time, to the nearest second; milliseconds are 0.
 /// @return 1, or 0 with ERROR_INVALID_PARAMETER and `time` as it was for a date that rounds to none of the
-/// years 100 to 9999, and NaN
+/// years 100 to 9999 or that lies before 1 January 100, and NaN
 BASALT_API int VariantTimeToSystemTime(DATE date, SYSTEMTIME* time);
 
 /// An automation date with its status.

@@ -81,7 +81,8 @@ BASALT_API HBITMAP CreateBitmap(int width, int height, UINT planes, UINT bits_pe
 /// Copies rows of a bitmap in the format of a header: in the bitmap's own depth as they are stored, in
 /// another with the colours brought to the nearest the depth has.
 /// @param dc any context
-/// @param bitmap the bitmap, selected or not
+/// @param bitmap the bitmap, selected or not; the stock bitmap that SelectObject hands back has no rows of
+/// its own, and gives 0 (ERROR_INVALID_HANDLE)
 /// @param first first row to copy, counted in the header's order of rows
 /// @param count number of rows; those beyond the last are left out
 /// @param[out] bits room for the rows, each padded to 32 bits: (width * bits + 31) / 32 * 4 bytes; null

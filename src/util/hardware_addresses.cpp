@@ -1,7 +1,6 @@
 #include "basalt/util/hardware_addresses.h"
 
 #include <algorithm>
-#include <new>
 
 #include "basalt/platform/error.h"
 #include "basalt/util/hex.h"
@@ -14,14 +13,6 @@ namespace {
 // How often the table is asked for again because interfaces were added since its size was told.
 constexpr int MAX_READINGS = 8;
 
-// A want of memory is no refusal.
-DWORD told(DWORD error) {
-    if (error == ERROR_NOT_ENOUGH_MEMORY) {
-        throw std::bad_alloc();
-    }
-    return error;
-}
-
 }  // namespace
 
 bool MACAddressFromMIBTable::Create() {
@@ -31,19 +22,19 @@ bool MACAddressFromMIBTable::Create() {
         return reinterpret_cast<MIB_IFTABLE*>(m_table.get());
     };
     MIB_IFTABLE* table = allocate();
-    if (told(GetIfTable(table, &size, 0)) == ERROR_INSUFFICIENT_BUFFER) {
+    if (GetIfTable(table, &size, 0) == ERROR_INSUFFICIENT_BUFFER) {
         table = allocate();
     }
-    DWORD error = told(GetIfTable(table, &size, 1));
+    DWORD error = GetIfTable(table, &size, 1);
     for (int reading = 1; error == ERROR_INSUFFICIENT_BUFFER && reading < MAX_READINGS; ++reading) {
         table = allocate();
-        error = told(GetIfTable(table, &size, 1));
+        error = GetIfTable(table, &size, 1);
     }
     if (error == ERROR_SUCCESS) {
         for (DWORD i = 0; i < table->dwNumEntries; ++i) {
             MIB_IFROW row{};
             row.dwIndex = table->table[i].dwIndex;
-            if (told(GetIfEntry(&row)) == ERROR_SUCCESS && row.dwType == IF_TYPE_ETHERNET_CSMACD) {
+            if (GetIfEntry(&row) == ERROR_SUCCESS && row.dwType == IF_TYPE_ETHERNET_CSMACD) {
                 const auto length = std::min<std::size_t>(row.dwPhysAddrLen, sizeof row.bPhysAddr);
                 m_addresses.emplace_back(row.bPhysAddr, row.bPhysAddr + length);
             }

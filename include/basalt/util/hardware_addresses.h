@@ -20,7 +20,8 @@ public:
     /// connected or not, enabled or not, virtual ones (bridges, veth, tap) too; not wireless ones, loopback
     /// or any other kind. A second call appends them again.
     /// @return whether the list holds an address afterwards. What the system refuses to tell is missing.
-    /// Out of memory: std::bad_alloc; the list may have grown by some of the addresses.
+    /// Out of memory for the table or the list: std::bad_alloc; the list may have grown by some of the
+    /// addresses.
     bool Create();
 
     /// The addresses in the order of the list, each as VectorToHexString() gives it: "001a2b3c4d5e". Empty

@@ -76,7 +76,7 @@ TEST_F(DumpBitmapTest, WritesTheStoredValuesAtEveryDepth) {
     std::mt19937 random(111);
     SCOPED_TRACE("seed 111");
     for (const int depth : drawing::DEPTHS) {
-        for (const int width : {700, 64, 33, 17, 8, 5, 3, 2, 1}) {
+        for (const int width : {6000, 700, 64, 33, 17, 8, 5, 3, 2, 1}) {
             SCOPED_TRACE(testing::Message() << depth << " bits, width " << width);
             Canvas canvas(drawing::random_picture(width, 6, depth, random), depth);
             // BMP whatever the name ends in, and in place of an older, longer file.

@@ -197,6 +197,17 @@ TEST(FileSearch, every_failing_call_is_told_and_leaves_nothing_open) {
             EXPECT_EQ(open_descriptors(), descriptors);
         }
     }
+    // Want of memory is told as such, of whatever the search had found.
+    std::filesystem::create_symlink("a", folder / "link");
+    bool is_short = true;
+    for (int n = 1; is_short; ++n) {
+        WIN32_FIND_DATAW found = {};
+        const SystemFailure failure(n, SystemFailure::Then::RECOVERS, ENOMEM);
+        const HANDLE begun = FindFirstFileW(folder.wide(L"lin*").c_str(), &found);
+        is_short = SystemFailure::struck();
+        EXPECT_EQ(begun == INVALID_HANDLE_VALUE && GetLastError() == ERROR_NOT_ENOUGH_MEMORY, is_short) << n;
+        FindClose(begun);
+    }
     // Folders alone, told as such even where the system says no more of them.
     std::filesystem::create_directory(folder / "within");
     WIN32_FIND_DATAW entry = {};

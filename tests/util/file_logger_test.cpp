@@ -238,7 +238,7 @@ TEST_F(FileLog, a_child_forked_while_threads_write_writes_too_and_sends_nothing_
             log.Close();
             other.Write(L"child\n");
             other.Close();
-            _exit(0);
+            std::_Exit(0);
         }
         int status = -1;
         waitpid(child, &status, 0);

@@ -26,6 +26,7 @@ constexpr DWORD KNOWN_FLAGS = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_NORMAL | FI
 // The process that last opened a delete-on-close file: in a forked child, whose copy of the table may be
 // locked for ever, not the child unless it has done so itself.
 constinit std::atomic<ProcessMark> s_owner = ProcessMark();
+static_assert(std::atomic<ProcessMark>::is_always_lock_free);
 // Since then nobody else deletes what is made.
 constinit std::atomic<bool> s_is_over = false;
 

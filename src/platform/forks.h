@@ -9,7 +9,7 @@ namespace basalt::platform {
 
 // Of two processes of which one descends from the other. A number of the system's alone would not do: a child
 // may have its parent's, in a namespace of its own or once the parent is gone.
-struct ProcessMark {
+struct alignas(8) ProcessMark {  // as one word, for atomics without a lock
     std::int32_t id = 0;
     std::uint32_t forks = 0;
     bool operator==(const ProcessMark&) const = default;

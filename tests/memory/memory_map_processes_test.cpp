@@ -66,6 +66,18 @@ private:
     pid_t m_process;
 };
 
+// Does what a child has asked for when the files that are left have been deleted: it was made before any of
+// them.
+void (*at_the_end)() = nullptr;
+const struct AtTheEnd {
+    AtTheEnd() {}
+    ~AtTheEnd() {
+        if (at_the_end != nullptr) {
+            at_the_end();
+        }
+    }
+} the_end;
+
 TEST(MemoryMapProcesses, many_processes_share_the_folder) {
     const ScratchFolder folder;
     {
@@ -108,10 +120,10 @@ TEST(MemoryMapProcesses, an_owner_that_exits_takes_its_files_along) {
 TEST(MemoryMapProcesses, a_block_made_while_the_process_ends_leaves_no_file) {
     const ScratchFolder folder;
     Child child([](int ready) {
-        std::atexit([] {  // runs when the files that are left have been deleted: those were first made later
+        at_the_end = [] {
             static CMemoryMap* const late = new CMemoryMap(SHARED_SIZE);
             bytes(*late)[SHARED_SIZE - 1] = 'x';
-        });
+        };
         const CMemoryMap first(SHARED_SIZE);
         Child::tell(ready);
     });

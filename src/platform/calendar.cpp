@@ -2,7 +2,6 @@
 
 #include <time.h>
 
-#include <algorithm>
 #include <chrono>
 #include <cstdint>
 

@@ -26,7 +26,7 @@
 #include "basalt/memory.h"
 #include "bench/limits.h"
 #include "src/platform/heap.h"
-#include "src/platform/lock.h"
+#include "src/platform/system/lock.h"
 
 namespace {
 

@@ -12,7 +12,7 @@
 #include <string>
 #include <string_view>
 
-#include "src/platform/utf8.h"
+#include "src/platform/text/utf8.h"
 
 namespace basalt::platform {
 

@@ -10,7 +10,7 @@
 #include <cstdint>
 #include <new>
 
-#include "src/platform/leaning_lock.h"
+#include "src/platform/system/leaning_lock.h"
 
 struct CRITICAL_SECTION {
     basalt::platform::LeaningLock lock;

@@ -7,7 +7,7 @@
 #include <memory>
 #include <string_view>
 
-#include "src/platform/lock.h"
+#include "src/platform/system/lock.h"
 
 namespace basalt::platform {
 

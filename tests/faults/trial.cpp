@@ -5,7 +5,7 @@
 #include <set>
 
 #include "basalt/memory.h"
-#include "src/platform/heap_inspection.h"
+#include "src/platform/heap/heap_inspection.h"
 #include "tests/faults/more_system_calls.h"
 #include "tests/faults/trial.h"
 #include "tests/support/open_descriptors.h"

@@ -6,7 +6,7 @@
 #include <string>
 
 #include "basalt/files.h"
-#include "src/platform/utf8.h"
+#include "src/platform/text/utf8.h"
 #include "tests/files/file_tree.h"
 #include "tests/files/path_model.h"
 

@@ -11,7 +11,7 @@
 
 #include "basalt/files.h"
 #include "src/platform/file_search.h"
-#include "src/platform/utf8.h"
+#include "src/platform/text/utf8.h"
 #include "tests/files/file_tree.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/with_failing_allocations.h"

@@ -9,7 +9,7 @@
 #include <string>
 
 #include "basalt/platform/cstring.h"
-#include "src/platform/utf8.h"
+#include "src/platform/text/utf8.h"
 #include "tests/support/scratch_folder.h"
 
 inline CString text(const std::wstring& characters) {

@@ -12,7 +12,7 @@
 #include "src/memory/heap_allocator.h"
 #include "src/memory/report_last_error.h"
 #include "src/platform/heap.h"
-#include "src/platform/heap_inspection.h"
+#include "src/platform/heap/heap_inspection.h"
 #include "tests/support/debug_output.h"
 #include "tests/support/system_failures.h"
 

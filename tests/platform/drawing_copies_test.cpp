@@ -6,7 +6,7 @@
 #include <cmath>
 #include <utility>
 
-#include "src/platform/row_kernels.h"
+#include "src/platform/pixels/row_kernels.h"
 #include "tests/support/drawing.h"
 
 namespace {

@@ -5,7 +5,7 @@
 #include <tuple>
 #include <vector>
 
-#include "src/platform/graphics_handles.h"
+#include "src/platform/drawing/graphics_handles.h"
 #include "tests/support/drawing.h"
 #include "tests/support/threads.h"
 

@@ -12,8 +12,8 @@
 #include <thread>
 #include <utility>
 
-#include "src/platform/error_from_errno.h"
 #include "src/platform/error_message.h"
+#include "src/platform/errors/error_from_errno.h"
 
 namespace {
 

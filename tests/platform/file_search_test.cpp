@@ -13,9 +13,9 @@
 #include <vector>
 
 #include "basalt/platform/error.h"
+#include "src/platform/disk/wildcard.h"
 #include "src/platform/file.h"
 #include "src/platform/ticks.h"
-#include "src/platform/wildcard.h"
 #include "tests/platform/error_of.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"

@@ -15,7 +15,7 @@
 #include <thread>
 
 #include "basalt/platform/error.h"
-#include "src/platform/file_name.h"
+#include "src/platform/text/file_name.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"

@@ -14,8 +14,8 @@
 #include <vector>
 
 #include "basalt/platform/error.h"
-#include "src/platform/heap_inspection.h"
-#include "src/platform/heap_sanitizer.h"
+#include "src/platform/heap/heap_inspection.h"
+#include "src/platform/heap/sanitizer.h"
 #include "tests/platform/error_of.h"
 #include "tests/support/system_failures.h"
 #include "tests/support/threads.h"

@@ -1,5 +1,5 @@
-#include "src/platform/lock.h"
-#include "src/platform/leaning_lock.h"
+#include "src/platform/system/lock.h"
+#include "src/platform/system/leaning_lock.h"
 
 #include <gtest/gtest.h>
 #include <linux/membarrier.h>

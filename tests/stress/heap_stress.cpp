@@ -3,7 +3,7 @@
 #include <cstring>
 
 #include "basalt/memory.h"
-#include "src/platform/heap_inspection.h"
+#include "src/platform/heap/heap_inspection.h"
 #include "tests/stress/stress.h"
 
 namespace basalt::stress {

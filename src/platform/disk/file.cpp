@@ -1,0 +1,95 @@
+#include "src/platform/file.h"
+
+#include <atomic>
+#include <memory>
+#include <string>
+
+#include "basalt/platform/error.h"
+#include "src/platform/disk/open_file.h"
+#include "src/platform/system/forks.h"
+#include "src/platform/system/handle_table.h"
+#include "src/platform/system/out_of_memory.h"
+#include "src/platform/text/file_name.h"
+
+using basalt::platform::fail_with;
+using basalt::platform::file_name_from_wide;
+using basalt::platform::OpenFile;
+using basalt::platform::or_out_of_memory;
+using basalt::platform::ProcessMark;
+using basalt::platform::this_process;
+
+namespace {
+
+constexpr DWORD KNOWN_FLAGS = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_NORMAL | FILE_ATTRIBUTE_TEMPORARY |
+                              FILE_FLAG_DELETE_ON_CLOSE | FILE_FLAG_SEQUENTIAL_SCAN;
+
+// The process that last opened a delete-on-close file: in a forked child, whose copy of the table may be
+// locked for ever, not the child unless it has done so itself.
+constinit std::atomic<ProcessMark> s_owner = ProcessMark();
+static_assert(std::atomic<ProcessMark>::is_always_lock_free);
+// Since then nobody else deletes what is made.
+constinit std::atomic<bool> s_is_over = false;
+
+// At the process's end or at unload.
+struct DeletesWhatIsLeft {
+    ~DeletesWhatIsLeft() {
+        if (s_owner.load() != this_process()) {
+            return;
+        }
+        s_is_over.store(true);
+        basalt::platform::for_each_object([](basalt::platform::HandleObject& object) {
+            if (object.kind() == OpenFile::KIND) {
+                static_cast<OpenFile&>(object).delete_at_exit();
+            }
+        });
+    }
+};
+
+void delete_at_exit() {
+    static const DeletesWhatIsLeft s_rest;
+    s_owner.store(this_process());
+}
+
+}  // namespace
+
+HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_ATTRIBUTES* security,
+                   DWORD disposition, DWORD flags, HANDLE pattern) {
+    if (access != (GENERIC_READ | GENERIC_WRITE) || sharing != 0 || security != nullptr ||
+        (disposition != CREATE_NEW && disposition != OPEN_EXISTING) || (flags & ~KNOWN_FLAGS) != 0 ||
+        pattern != nullptr) {
+        return fail_with(ERROR_INVALID_PARAMETER, INVALID_HANDLE_VALUE);
+    }
+    return or_out_of_memory(INVALID_HANDLE_VALUE, [&] {
+        std::string path;
+        if (!file_name_from_wide(name != nullptr ? name : L"", path)) {
+            return fail_with(ERROR_INVALID_NAME, INVALID_HANDLE_VALUE);
+        }
+        const bool deletes = (flags & FILE_FLAG_DELETE_ON_CLOSE) != 0;
+        const auto file = std::make_shared<OpenFile>();
+        basalt::platform::NewHandle handle(file);
+        if (deletes) {
+            delete_at_exit();
+        }
+        const DWORD error = file->open(
+            path, disposition == CREATE_NEW ? OpenFile::Mode::CREATE : OpenFile::Mode::EXISTING, deletes);
+        if (error != ERROR_SUCCESS) {
+            return fail_with(error, INVALID_HANDLE_VALUE);
+        }
+        const HANDLE given = handle.give();
+        if (deletes && s_is_over.load()) {
+            file->delete_at_exit();  // for a thread that goes on while the process ends
+        }
+        return given;
+    });
+}
+
+BOOL DeleteFileW(const wchar_t* name) {
+    return or_out_of_memory(0, [&] {
+        std::string path;
+        if (!file_name_from_wide(name != nullptr ? name : L"", path)) {
+            return fail_with(ERROR_INVALID_NAME, 0);
+        }
+        const DWORD error = basalt::platform::delete_file(path);
+        return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
+    });
+}

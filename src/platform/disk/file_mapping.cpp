@@ -1,0 +1,152 @@
+#include "src/platform/file_mapping.h"
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <utility>
+
+#include "basalt/platform/error.h"
+#include "src/platform/disk/open_file.h"
+#include "src/platform/pages.h"
+#include "src/platform/system/handle_table.h"
+#include "src/platform/system/lock.h"
+#include "src/platform/system/no_destructor.h"
+#include "src/platform/system/out_of_memory.h"
+
+namespace basalt::platform {
+namespace {
+
+class FileMapping final : public HandleObject {
+public:
+    static constexpr Kind KIND = Kind::MAPPING;
+
+    FileMapping(std::shared_ptr<OpenFile> file, std::size_t size) noexcept
+        : HandleObject(KIND), m_file(std::move(file)), m_size(size) {}
+
+    const std::shared_ptr<OpenFile>& file() const noexcept { return m_file; }  // null for anonymous pages
+    std::size_t size() const noexcept { return m_size; }
+
+    bool is_used = false;  // its one view has been made
+
+private:
+    const std::shared_ptr<OpenFile> m_file;
+    const std::size_t m_size;
+};
+
+struct View {
+    std::shared_ptr<OpenFile> file;
+    std::size_t size = 0;
+};
+
+using ViewMap = std::map<const void*, View>;
+
+struct Views {
+    Lock lock;
+    ViewMap by_address;
+};
+
+Views& views() noexcept {
+    static NoDestructor<Views> s_views;
+    return *s_views;
+}
+
+void add(ViewMap::node_type&& view) noexcept {
+    Views& all = views();
+    const std::lock_guard<Lock> guard(all.lock);
+    all.by_address.insert(std::move(view));
+}
+
+// Out of the table while it is unmapped: the moment it is, another thread may be given its address.
+ViewMap::node_type take(const void* address) noexcept {
+    Views& all = views();
+    const std::lock_guard<Lock> guard(all.lock);
+    return all.by_address.extract(address);
+}
+
+DWORD map(FileMapping& mapping, std::byte*& address) noexcept {
+    if (mapping.file() != nullptr) {
+        return mapping.file()->map(mapping.size(), address);
+    }
+    address = map_pages(whole_pages(mapping.size()), page_size());
+    return address != nullptr ? ERROR_SUCCESS : ERROR_NOT_ENOUGH_MEMORY;
+}
+
+}  // namespace
+}  // namespace basalt::platform
+
+using basalt::platform::fail_with;
+using basalt::platform::FileMapping;
+using basalt::platform::OpenFile;
+using basalt::platform::or_out_of_memory;
+
+HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD protection, DWORD size_high,
+                          DWORD size_low, const wchar_t* name) {
+    const std::uint64_t size = std::uint64_t{size_high} << 32 | size_low;
+    const bool is_anonymous = file == INVALID_HANDLE_VALUE;
+    if (security != nullptr || protection != PAGE_READWRITE || name != nullptr ||
+        (is_anonymous && size == 0)) {
+        return fail_with(ERROR_INVALID_PARAMETER, HANDLE{nullptr});
+    }
+    return or_out_of_memory(HANDLE{nullptr}, [&] {
+        std::shared_ptr<OpenFile> open;
+        if (!is_anonymous) {
+            open = basalt::platform::find_object_of<OpenFile>(file);
+            if (open == nullptr) {
+                return fail_with(ERROR_INVALID_HANDLE, HANDLE{nullptr});
+            }
+            if (size == 0) {
+                return fail_with(ERROR_FILE_INVALID, HANDLE{nullptr});
+            }
+        }
+        basalt::platform::NewHandle handle(std::make_shared<FileMapping>(open, size));
+        const DWORD error = is_anonymous ? ERROR_SUCCESS : open->reserve(size);
+        return error == ERROR_SUCCESS ? handle.give() : fail_with(error, HANDLE{nullptr});
+    });
+}
+
+void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offset_low, std::size_t size) {
+    using Address = void*;
+    const auto object = basalt::platform::find_object_of<FileMapping>(mapping);
+    if (object == nullptr) {
+        return fail_with(ERROR_INVALID_HANDLE, Address{});
+    }
+    if (access != FILE_MAP_ALL_ACCESS || offset_high != 0 || offset_low != 0 ||
+        (size != 0 && size != object->size())) {
+        return fail_with(ERROR_INVALID_PARAMETER, Address{});
+    }
+    if (object->is_used) {
+        return fail_with(ERROR_NOT_SUPPORTED, Address{});
+    }
+    return or_out_of_memory(Address{}, [&] {
+        basalt::platform::ViewMap single;
+        single.emplace(nullptr, basalt::platform::View{object->file(), object->size()});
+        auto view = single.extract(single.begin());
+        std::byte* address = nullptr;
+        const DWORD error = basalt::platform::map(*object, address);
+        if (error != ERROR_SUCCESS) {
+            return fail_with(error, Address{});
+        }
+        object->is_used = true;
+        view.key() = address;
+        basalt::platform::add(std::move(view));
+        return Address{address};
+    });
+}
+
+BOOL UnmapViewOfFile(const void* address) {
+    auto view = basalt::platform::take(address);
+    if (view.empty()) {
+        return fail_with(ERROR_INVALID_ADDRESS, 0);
+    }
+    auto* const pages = static_cast<std::byte*>(const_cast<void*>(address));
+    const auto& [file, size] = view.mapped();
+    const bool is_unmapped = file != nullptr
+                                 ? file->unmap(pages, size)
+                                 : basalt::platform::unmap_pages(pages, basalt::platform::whole_pages(size));
+    if (!is_unmapped) {
+        basalt::platform::add(std::move(view));
+        return fail_with(ERROR_NOT_ENOUGH_MEMORY, 0);
+    }
+    return 1;
+}

@@ -1,0 +1,77 @@
+#include "src/platform/temporary_file.h"
+
+#include <unistd.h>
+
+#include <atomic>
+#include <cwchar>
+#include <string>
+#include <string_view>
+
+#include "basalt/platform/error.h"
+#include "src/platform/clock.h"
+#include "src/platform/disk/open_file.h"
+#include "src/platform/system/out_of_memory.h"
+#include "src/platform/text/file_name.h"
+
+using basalt::platform::fail_with;
+using basalt::platform::or_out_of_memory;
+
+namespace {
+
+constexpr std::size_t PREFIX_LENGTH = 3;
+constexpr std::size_t LONGEST_FOLDER = MAX_PATH - 14;
+constexpr UINT NUMBERS = 0xFFFF;
+
+bool is_separator(wchar_t ch) {
+    return ch == L'\\' || ch == L'/';
+}
+
+// Where to begin looking for a free number, 1 to NUMBERS. Going on from the last one, after a start that
+// differs between processes, finds one at once as a rule.
+UINT next_start() {
+    static constinit std::atomic<UINT> s_last = 0;
+    UINT last = s_last.load();
+    UINT next;
+    do {
+        next = (last == 0 ? GetTickCount() ^ static_cast<UINT>(getpid()) << 4 : last) % NUMBERS + 1;
+    } while (!s_last.compare_exchange_weak(last, next));
+    return next;
+}
+
+}  // namespace
+
+UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique, wchar_t* name) {
+    if (folder == nullptr || prefix == nullptr || unique != 0 || name == nullptr) {
+        return fail_with(ERROR_INVALID_PARAMETER, UINT{0});
+    }
+    return or_out_of_memory(UINT{0}, [&] {
+        std::wstring stem = folder;
+        if (stem.size() > LONGEST_FOLDER) {
+            return fail_with(ERROR_FILENAME_EXCED_RANGE, UINT{0});
+        }
+        if (!stem.empty() && !is_separator(stem.back())) {
+            stem += L'/';
+        }
+        stem += std::wstring_view(prefix).substr(0, PREFIX_LENGTH);
+        UINT number = next_start();
+        for (UINT attempt = 0; attempt < NUMBERS; ++attempt, number = number % NUMBERS + 1) {
+            wchar_t digits[9];
+            std::swprintf(digits, 9, L"%X.tmp", number);
+            const std::wstring full = stem + digits;
+            std::string path;
+            if (!basalt::platform::file_name_from_wide(full, path)) {
+                return fail_with(ERROR_INVALID_NAME, UINT{0});
+            }
+            basalt::platform::OpenFile file;
+            const DWORD error = file.open(path, basalt::platform::OpenFile::Mode::CREATE, false);
+            if (error == ERROR_SUCCESS) {
+                std::wmemcpy(name, full.c_str(), full.size() + 1);
+                return number;
+            }
+            if (error != ERROR_FILE_EXISTS) {
+                return fail_with(error, UINT{0});
+            }
+        }
+        return fail_with(ERROR_FILE_EXISTS, UINT{0});
+    });
+}

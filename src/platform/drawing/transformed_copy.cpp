@@ -1,0 +1,125 @@
+// Copies through a transform: the middle of each destination pixel is taken back into the source.
+#include <algorithm>
+#include <optional>
+
+#include "basalt/platform/error.h"
+#include "src/platform/drawing/block_copy.h"
+#include "src/platform/pixels/pixel_rows.h"
+
+namespace basalt::platform {
+
+namespace {
+
+constexpr int PLACE_BITS = AffineRows::PLACE_BITS;
+
+void copy_words(const Surface& from, const AffineRows& rows, const AffineRows::Run& run, std::byte* row) {
+    auto* const to = reinterpret_cast<std::uint32_t*>(row);
+    const auto* const words = reinterpret_cast<const std::uint32_t*>(from.bits.get());
+    const std::size_t row_words = from.row_bytes / sizeof(std::uint32_t);
+    std::uint64_t x = run.x;
+    std::uint64_t y = run.y;
+    for (int i = run.begin; i < run.end; ++i) {
+        to[i] = words[(y >> PLACE_BITS) * row_words + (x >> PLACE_BITS)];
+        x += rows.step_x();
+        y += rows.step_y();
+    }
+}
+
+void copy_run(const Surface& from, const AffineRows& rows, const AffineRows::Run& run, std::byte* row,
+              const RowWriter& writer) {
+    std::uint64_t x = run.x;
+    std::uint64_t y = run.y;
+    in_pieces(run.end - run.begin, false, [&](int offset, int size) {
+        std::uint32_t values[PIECE];
+        const std::span<std::uint32_t> piece(values, static_cast<std::size_t>(size));
+        for (std::uint32_t& value : piece) {
+            value = read_pixel(from.depth, from.row(static_cast<int>(y >> PLACE_BITS)),
+                               static_cast<int>(x >> PLACE_BITS));
+            x += rows.step_x();
+            y += rows.step_y();
+        }
+        writer.write(row, run.begin + offset, piece);
+    });
+}
+
+void write_run(const AffineRows::Run& run, std::byte* row, const RowWriter& writer) {
+    in_pieces(run.end - run.begin, false, [&](int offset, int size) {
+        std::uint32_t values[PIECE] = {};
+        writer.write(row, run.begin + offset, std::span(values, static_cast<std::size_t>(size)));
+    });
+}
+
+std::optional<AffineRows> followed(std::optional<AffineRows> rows) {
+    if (!rows) {
+        SetLastError(ERROR_ARITHMETIC_OVERFLOW);
+    }
+    return rows;
+}
+
+bool write_transformed(Context& destination, const Box& target, const RowWriter& writer) {
+    const std::optional<AffineRows> rows = followed(AffineRows::create(
+        *destination.world.inverse(), static_cast<double>(target.left), static_cast<double>(target.top),
+        static_cast<double>(target.right), static_cast<double>(target.bottom)));
+    if (!rows) {
+        return false;
+    }
+    Surface& surface = destination.surface();
+    rows->on(surface, [&](int y, const AffineRows::Run& run) { write_run(run, surface.row(y), writer); });
+    return true;
+}
+
+}  // namespace
+
+bool copy_transformed(Context& destination, const Box& target, Context* source, std::int64_t source_x,
+                      std::int64_t source_y, const RowWriter& writer) {
+    if (source == nullptr) {
+        return write_transformed(destination, target, writer);
+    }
+    const Affine& world = source->world;
+    if (world.m12 != 0 || world.m21 != 0) {
+        SetLastError(ERROR_INVALID_PARAMETER);
+        return false;
+    }
+    const auto left = static_cast<double>(source_x);
+    const auto top = static_cast<double>(source_y);
+    const Affine map = destination.world.inverse()
+                           ->then(Affine::shift(left - static_cast<double>(target.left),
+                                                top - static_cast<double>(target.top)))
+                           .then(world);
+    // The rectangle's corners in the source's pixels; a negative scale exchanges them.
+    const auto [x_least, x_limit] = std::minmax(
+        {world.x_of(left, 0), world.x_of(left + static_cast<double>(target.right - target.left), 0)});
+    const auto [y_least, y_limit] = std::minmax(
+        {world.y_of(0, top), world.y_of(0, top + static_cast<double>(target.bottom - target.top))});
+    if (target.is_empty()) {
+        return true;
+    }
+    Surface& surface = destination.surface();
+    const Surface* from = &source->surface();
+    Surface picture;
+    if (from == &surface) {
+        // Rows are read in an order of their own, so what is read may not change meanwhile.
+        if (!picture.copy(surface)) {
+            return false;
+        }
+        from = &picture;
+    }
+    const std::optional<AffineRows> rows =
+        followed(AffineRows::create(map, std::max(x_least, 0.0), std::max(y_least, 0.0),
+                                    std::min(x_limit, static_cast<double>(from->width)),
+                                    std::min(y_limit, static_cast<double>(from->height))));
+    if (!rows) {
+        return false;
+    }
+    const bool words = writer.is_plain_copy() && surface.depth == 32;
+    rows->on(surface, [&](int y, const AffineRows::Run& run) {
+        if (words) {
+            copy_words(*from, *rows, run, surface.row(y));
+        } else {
+            copy_run(*from, *rows, run, surface.row(y), writer);
+        }
+    });
+    return true;
+}
+
+}  // namespace basalt::platform

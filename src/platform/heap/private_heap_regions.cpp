@@ -1,0 +1,171 @@
+// How a private heap takes regions from the system and gives them back.
+#include <algorithm>
+#include <bit>
+#include <cstdint>
+
+#include "src/platform/heap/private_heap.h"
+#include "src/platform/pages.h"
+
+namespace basalt::platform {
+namespace {
+
+constexpr std::size_t SMALLEST_REGION = std::size_t{64} << 10;
+constexpr std::size_t LARGEST_REGION = std::size_t{32} << 20;
+
+// Regions that fill large pages lie on their boundaries, or the system could not use any.
+std::byte* map_region(std::size_t size) {
+    return map_pages(size, size >= LARGE_PAGE ? LARGE_PAGE : page_size());
+}
+
+}  // namespace
+
+// A listed free block of at least this size in a new region, or null. Each region doubles the heap.
+Block* PrivateHeap::map_shared_region(std::size_t need) {
+    const std::size_t least = whole_pages(need + REGION_OVERHEAD);
+    if (!admits(least) && !(drop_idle_regions() && admits(least))) {
+        return nullptr;
+    }
+    if (!m_regions.reserve_one()) {
+        return nullptr;
+    }
+    std::size_t size = has_one_region()
+                           ? m_maximum
+                           : std::clamp(std::bit_ceil(m_mapped_shared), SMALLEST_REGION, LARGEST_REGION);
+    size = std::min(std::max(size, least), m_maximum - m_mapped);
+    std::byte* begin = map_region(size);
+    if (begin == nullptr && size > least) {
+        size = least;
+        begin = map_region(size);
+    }
+    if (begin == nullptr) {
+        return nullptr;
+    }
+    // The first region stays frugal at its start: a heap with a high maximum may hold next to nothing.
+    const std::size_t frugal = m_mapped_shared == 0 ? LARGE_PAGE : 0;
+    if (size >= LARGE_PAGE + frugal) {
+        prefer_large_pages(begin + frugal, size - frugal);
+    }
+    Block* block = add_region(begin, size, false);
+    m_mapped_shared += size;
+    m_idle += size;
+    set_head(block, (size - REGION_OVERHEAD) | LAST_OF_REGION);
+    m_free.insert(block, size - REGION_OVERHEAD);
+    return block;
+}
+
+// A live block in a region of its own, or null.
+Block* PrivateHeap::map_single_region(std::size_t need) {
+    const std::size_t size = whole_pages(need + REGION_OVERHEAD);
+    if (!admits(size) && !(drop_idle_regions() && admits(size))) {
+        return nullptr;
+    }
+    if (!m_regions.reserve_one()) {
+        return nullptr;
+    }
+    std::byte* begin = map_region(size);
+    if (begin == nullptr) {
+        return nullptr;
+    }
+    if (size >= LARGE_PAGE) {
+        // All of it: the system moves only pages that are alike.
+        prefer_large_pages(begin, size);
+    }
+    Block* block = add_region(begin, size, true);
+    set_head(block, m_tag | (size - REGION_OVERHEAD) | LAST_OF_REGION);
+    return block;
+}
+
+Block* PrivateHeap::add_region(std::byte* begin, std::size_t size, bool single) {
+    enter_region(begin, size);
+    m_regions.insert({begin, size, single});
+    m_mapped += size;
+    return block_at(begin + HEAD_BYTES);
+}
+
+// A large block keeps its region; the system moves its pages instead of copying them.
+bool PrivateHeap::resize_single(Block*& block, std::size_t need, const Region& region) {
+    const Region old = region;
+    const std::size_t size = whole_pages(need + REGION_OVERHEAD);
+    if (size == old.size) {
+        return true;
+    }
+    if (size > old.size && !admits(size - old.size) && !(drop_idle_regions() && admits(size - old.size))) {
+        return false;
+    }
+    leave_region(old.begin, old.size);
+    std::byte* begin = remap_pages(old.begin, old.size, size);
+    if (begin == nullptr) {
+        enter_region(old.begin, old.size);
+        permit_access(payload_of(block), old.size - REGION_OVERHEAD - HEAD_BYTES);
+        // A smaller block than it could be is none the worse.
+        return size < old.size;
+    }
+    m_regions.erase(old.begin);
+    m_mapped -= old.size;
+    block = add_region(begin, size, true);
+    set_head(block, m_tag | (size - REGION_OVERHEAD) | LAST_OF_REGION);
+    return true;
+}
+
+// Whether a free block is all there is in its region. Only a region's first block lies where it does in a
+// page.
+bool PrivateHeap::is_idle_region(const Block* block) const {
+    const std::uint64_t head = head_of(block);
+    if (!is_free(head) || !is_last(head) ||
+        (reinterpret_cast<std::uintptr_t>(block) & (SMALLEST_PAGE - 1)) != HEAD_BYTES) {
+        return false;
+    }
+    return size_of(head) == m_regions.find(block)->size - REGION_OVERHEAD;
+}
+
+void PrivateHeap::keep_idle_region(Block* block, std::size_t bytes) {
+    m_idle += bytes;
+    if (m_idle > MOST_IDLE) {
+        drop_free_region(block);
+    }
+}
+
+// False when there is none, or the system refuses them all.
+bool PrivateHeap::drop_idle_regions() {
+    settle(0);
+    const std::size_t idle_before = m_idle;
+    for (std::size_t i = m_regions.all().size(); i > 0 && m_idle > 0; --i) {
+        const Region& region = m_regions.all()[i - 1];
+        Block* first = block_at(region.begin + HEAD_BYTES);
+        if (!region.single && is_free(head_of(first))) {
+            drop_free_region(first);
+        }
+    }
+    return m_idle < idle_before;
+}
+
+// Unmaps the region of a listed free block if the block is all there is in it.
+bool PrivateHeap::drop_free_region(Block* block) {
+    if (!is_idle_region(block)) {
+        return false;
+    }
+    const std::size_t size = size_of(head_of(block));
+    m_free.remove(block, size);
+    const std::size_t bytes = size + REGION_OVERHEAD;
+    if (!unmap_region(*m_regions.find(block))) {
+        m_free.insert(block, size);
+        return false;
+    }
+    m_mapped_shared -= bytes;
+    m_idle -= bytes;
+    return true;
+}
+
+bool PrivateHeap::unmap_region(const Region& region) {
+    const Region old = region;
+    leave_region(old.begin, old.size);
+    if (!unmap_pages(old.begin, old.size)) {
+        enter_region(old.begin, old.size);
+        return false;
+    }
+    m_regions.erase(old.begin);
+    m_mapped -= old.size;
+    return true;
+}
+
+}  // namespace basalt::platform

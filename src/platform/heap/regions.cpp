@@ -1,0 +1,72 @@
+#include "src/platform/heap/regions.h"
+
+#include <algorithm>
+#include <memory>
+
+#include "src/platform/pages.h"
+
+namespace basalt::platform {
+
+RegionTable::~RegionTable() {
+    if (m_regions != m_inline.data()) {
+        unmap_pages(reinterpret_cast<std::byte*>(m_regions), m_capacity * sizeof(Region));
+    }
+}
+
+const Region* RegionTable::search(const std::byte* address) const {
+    if (m_count == 0) {
+        return nullptr;
+    }
+    // By halves without a branch: where blocks of many regions come in any order, none could be foretold.
+    const Region* last_before = m_regions;
+    for (std::size_t rest = m_count; rest > 1;) {
+        const std::size_t half = rest / 2;
+        last_before = last_before[half].begin <= address ? last_before + half : last_before;
+        rest -= half;
+    }
+    if (address < last_before->begin || address >= last_before->begin + last_before->size) {
+        return nullptr;
+    }
+    m_recent = static_cast<std::size_t>(last_before - m_regions);
+    return last_before;
+}
+
+bool RegionTable::reserve_one() {
+    if (m_count < m_capacity) {
+        return true;
+    }
+    // A capacity of whole pages: page_size() regions take sizeof(Region) pages.
+    const std::size_t capacity = std::max(2 * m_capacity, page_size());
+    std::byte* pages = map_pages(capacity * sizeof(Region), page_size());
+    if (pages == nullptr) {
+        return false;
+    }
+    auto* table = reinterpret_cast<Region*>(pages);
+    std::uninitialized_copy_n(m_regions, m_count, table);
+    if (m_regions != m_inline.data()) {
+        unmap_pages(reinterpret_cast<std::byte*>(m_regions), m_capacity * sizeof(Region));
+    }
+    m_regions = table;
+    m_capacity = capacity;
+    return true;
+}
+
+void RegionTable::insert(const Region& region) {
+    Region* end = m_regions + m_count;
+    Region* place = std::upper_bound(m_regions, end, region.begin,
+                                     [](const std::byte* a, const Region& other) { return a < other.begin; });
+    std::move_backward(place, end, end + 1);
+    *place = region;
+    ++m_count;
+    m_recent = static_cast<std::size_t>(place - m_regions);
+}
+
+void RegionTable::erase(const std::byte* begin) {
+    Region* end = m_regions + m_count;
+    Region* place = std::lower_bound(m_regions, end, begin,
+                                     [](const Region& other, const std::byte* a) { return other.begin < a; });
+    std::move(place + 1, end, place);
+    --m_count;
+}
+
+}  // namespace basalt::platform

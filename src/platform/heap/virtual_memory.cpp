@@ -1,0 +1,195 @@
+#include "src/platform/virtual_memory.h"
+
+#include <sys/mman.h>
+
+#include <cerrno>
+#include <cstdint>
+#include <map>
+#include <mutex>
+#include <utility>
+
+#include "basalt/platform/error.h"
+#include "src/platform/pages.h"
+#include "src/platform/system/lock.h"
+#include "src/platform/system/no_destructor.h"
+#include "src/platform/system/out_of_memory.h"
+
+namespace basalt::platform {
+namespace {
+
+constexpr std::uintptr_t GRANULARITY = std::uintptr_t{64} << 10;  // of the bases of reservations
+
+// Addresses from `base` up to `end`.
+struct Range {
+    std::uintptr_t base = 0;
+    std::uintptr_t end = 0;
+
+    std::size_t size() const noexcept { return end - base; }
+    bool is_within(const Range& outer) const noexcept { return base >= outer.base && end <= outer.end; }
+    std::byte* pages() const noexcept { return reinterpret_cast<std::byte*>(base); }
+};
+
+using ReservationMap = std::map<std::uintptr_t, std::uintptr_t>;  // end by base
+
+struct Reservations {
+    Lock lock;
+    ReservationMap by_base;
+};
+
+Reservations& reservations() noexcept {
+    static NoDestructor<Reservations> s_reservations;
+    return *s_reservations;
+}
+
+void add(ReservationMap::node_type&& reservation) noexcept {
+    Reservations& all = reservations();
+    const std::lock_guard<Lock> guard(all.lock);
+    all.by_base.insert(std::move(reservation));
+}
+
+// The whole pages, or multiples of the granularity at the front, that hold a range. False when it would pass
+// the end of all addresses.
+bool round_out(const void* address, std::size_t size, std::uintptr_t front, Range& range) noexcept {
+    const auto start = reinterpret_cast<std::uintptr_t>(address);
+    if (size > UINTPTR_MAX - start) {
+        return false;
+    }
+    range.base = start & ~(front - 1);
+    range.end = whole_pages(start + size);
+    return range.end > range.base;
+}
+
+// The reservation that holds an address; an empty range when none does.
+Range reservation_around(std::uintptr_t address) noexcept {
+    Reservations& all = reservations();
+    const std::lock_guard<Lock> guard(all.lock);
+    auto next = all.by_base.upper_bound(address);
+    if (next == all.by_base.begin()) {
+        return {};
+    }
+    --next;
+    return {next->first, next->second};
+}
+
+DWORD reserve(void* address, std::size_t size, Range& range) {
+    ReservationMap single;
+    single.emplace(0, 0);
+    ReservationMap::node_type reservation = single.extract(single.begin());
+    if (address == nullptr) {
+        if (size > SIZE_MAX / 2) {
+            return ERROR_NOT_ENOUGH_MEMORY;
+        }
+        std::byte* const pages = reserve_pages(whole_pages(size), GRANULARITY);
+        if (pages == nullptr) {
+            return ERROR_NOT_ENOUGH_MEMORY;
+        }
+        range.base = reinterpret_cast<std::uintptr_t>(pages);
+        range.end = range.base + whole_pages(size);
+    } else {
+        if (!round_out(address, size, GRANULARITY, range)) {
+            return ERROR_INVALID_ADDRESS;
+        }
+        void* const pages = mmap(range.pages(), range.size(), PROT_NONE,
+                                 MAP_PRIVATE | MAP_ANONYMOUS | MAP_FIXED_NOREPLACE, -1, 0);
+        if (pages == MAP_FAILED) {
+            return errno == ENOMEM ? ERROR_NOT_ENOUGH_MEMORY : ERROR_INVALID_ADDRESS;
+        }
+        if (pages != range.pages()) {  // to systems before 4.17 the address is a wish
+            munmap(pages, range.size());
+            return ERROR_INVALID_ADDRESS;
+        }
+    }
+    reservation.key() = range.base;
+    reservation.mapped() = range.end;
+    add(std::move(reservation));
+    return ERROR_SUCCESS;
+}
+
+// The pages of a range that is reserved. False for any other.
+bool find_reserved(const void* address, std::size_t size, Range& range) noexcept {
+    return round_out(address, size, page_size(), range) && range.is_within(reservation_around(range.base));
+}
+
+DWORD commit(const void* address, std::size_t size, Range& range) noexcept {
+    if (!find_reserved(address, size, range)) {
+        return ERROR_INVALID_ADDRESS;
+    }
+    return mprotect(range.pages(), range.size(), PROT_READ | PROT_WRITE) == 0 ? ERROR_SUCCESS
+                                                                              : ERROR_NOT_ENOUGH_MEMORY;
+}
+
+DWORD decommit(const void* address, std::size_t size) noexcept {
+    Range range;
+    if (size == 0) {
+        range = reservation_around(reinterpret_cast<std::uintptr_t>(address));
+        if (range.base != reinterpret_cast<std::uintptr_t>(address) || range.size() == 0) {
+            return ERROR_INVALID_ADDRESS;
+        }
+    } else if (!find_reserved(address, size, range)) {
+        return ERROR_INVALID_ADDRESS;
+    }
+    // Fresh pages in one step: advice to drop the old ones is refused where a process has locked its memory.
+    void* const pages =
+        mmap(range.pages(), range.size(), PROT_NONE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_FIXED, -1, 0);
+    return pages != MAP_FAILED ? ERROR_SUCCESS : ERROR_NOT_ENOUGH_MEMORY;
+}
+
+DWORD release(const void* base) noexcept {
+    ReservationMap::node_type reservation;
+    {
+        Reservations& all = reservations();
+        const std::lock_guard<Lock> guard(all.lock);
+        reservation = all.by_base.extract(reinterpret_cast<std::uintptr_t>(base));
+    }
+    // It is out of the table now: the moment it is unmapped another thread may be given its addresses.
+    if (reservation.empty()) {
+        return ERROR_INVALID_ADDRESS;
+    }
+    const Range range = {reservation.key(), reservation.mapped()};
+    if (!unmap_pages(range.pages(), range.size())) {
+        add(std::move(reservation));
+        return ERROR_NOT_ENOUGH_MEMORY;
+    }
+    return ERROR_SUCCESS;
+}
+
+}  // namespace
+}  // namespace basalt::platform
+
+using basalt::platform::fail_with;
+using basalt::platform::or_out_of_memory;
+using basalt::platform::Range;
+
+void* VirtualAlloc(void* address, std::size_t size, DWORD type, DWORD protection) {
+    using Address = void*;
+    const bool reserves = type == MEM_RESERVE && protection == PAGE_NOACCESS;
+    const bool commits = type == MEM_COMMIT && protection == PAGE_READWRITE;
+    if (size == 0 || (!reserves && !commits)) {
+        return fail_with(ERROR_INVALID_PARAMETER, Address{});
+    }
+    return or_out_of_memory(Address{}, [&] {
+        Range range;
+        DWORD error = ERROR_SUCCESS;
+        if (reserves || address == nullptr) {
+            error = basalt::platform::reserve(address, size, range);
+        }
+        const bool is_new = error == ERROR_SUCCESS && address == nullptr;
+        if (error == ERROR_SUCCESS && commits) {
+            error = basalt::platform::commit(is_new ? range.pages() : address, size, range);
+            if (error != ERROR_SUCCESS && is_new) {
+                basalt::platform::release(range.pages());
+            }
+        }
+        return error == ERROR_SUCCESS ? Address{range.pages()} : fail_with(error, Address{});
+    });
+}
+
+BOOL VirtualFree(void* address, std::size_t size, DWORD type) {
+    DWORD error = ERROR_INVALID_PARAMETER;
+    if (type == MEM_DECOMMIT) {
+        error = basalt::platform::decommit(address, size);
+    } else if (type == MEM_RELEASE && size == 0) {
+        error = basalt::platform::release(address);
+    }
+    return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
+}

@@ -1,0 +1,93 @@
+// Affine maps of the plane, and the rows of pixels that one takes into a rectangle.
+#ifndef BASALT_SRC_PLATFORM_PIXELS_AFFINE_H
+#define BASALT_SRC_PLATFORM_PIXELS_AFFINE_H
+
+#include <cstdint>
+#include <optional>
+
+#include "src/platform/pixels/surface.h"
+
+namespace basalt::platform {
+
+__extension__ using Int128 = __int128;
+
+// x' = x m11 + y m21 + dx, y' = x m12 + y m22 + dy.
+struct Affine {
+    double m11 = 1;
+    double m12 = 0;
+    double m21 = 0;
+    double m22 = 1;
+    double dx = 0;
+    double dy = 0;
+
+    friend bool operator==(const Affine&, const Affine&) = default;
+
+    double x_of(double x, double y) const { return x * m11 + y * m21 + dx; }
+    double y_of(double x, double y) const { return x * m12 + y * m22 + dy; }
+
+    // This map, then the next one.
+    Affine then(const Affine& next) const;
+    // What undoes it; nothing when that is not finite.
+    std::optional<Affine> inverse() const;
+
+    static Affine shift(double x, double y) { return {1, 0, 0, 1, x, y}; }
+};
+
+// The pixels whose middles a map takes into a rectangle of the source, row by row, with the places they are
+// taken to. Places are counted in 2^-32 source pixels, so that adding up steps is exact.
+class AffineRows {
+public:
+    static constexpr int PLACE_BITS = 32;
+
+    // map: from pixels to the source. The rectangle ends before its right and bottom and is cut to what 32
+    // bits hold. Nothing when a step of one pixel would cross 2^30 source pixels.
+    static std::optional<AffineRows> create(const Affine& map, double left, double top, double right,
+                                            double bottom);
+
+    struct Run {
+        int begin;        // columns; none when not below end
+        int end;          //
+        std::uint64_t x;  // place of the first column's middle; later ones wrap harmlessly past the last
+        std::uint64_t y;
+    };
+    // The run of a row within the columns from 0 to `columns`.
+    Run row(int y, int columns) const;
+
+    // Calls work(y, run) for each row of a surface that has a run.
+    template <typename Work>
+    void on(const Surface& surface, const Work& work) const {
+        for (int y = 0; y < surface.height; ++y) {
+            const Run run = row(y, surface.width);
+            if (run.begin < run.end) {
+                work(y, run);
+            }
+        }
+    }
+
+    // Steps of a place from one column to the next.
+    std::uint64_t step_x() const { return static_cast<std::uint64_t>(m_x.per_column); }
+    std::uint64_t step_y() const { return static_cast<std::uint64_t>(m_y.per_column); }
+
+private:
+    // One coordinate of the source as a function of column and row.
+    struct Coordinate {
+        std::int64_t per_column;
+        std::int64_t per_row;
+        Int128 start;        // at the middle of the first pixel
+        std::int64_t least;  // inside from here
+        std::int64_t limit;  // to before here
+
+        Int128 at_row(int y) const { return start + Int128{per_row} * y; }
+        void narrow(Int128 place, std::int64_t& begin, std::int64_t& end) const;
+    };
+
+    static std::optional<Coordinate> coordinate(double per_column, double per_row, double start, double least,
+                                                double limit);
+
+    Coordinate m_x;
+    Coordinate m_y;
+};
+
+}  // namespace basalt::platform
+
+#endif

@@ -1,0 +1,41 @@
+#include "src/platform/module_file_name.h"
+
+#include <limits.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <string>
+
+#include "basalt/platform/error.h"
+#include "src/platform/errors/error_from_errno.h"
+#include "src/platform/system/out_of_memory.h"
+#include "src/platform/text/file_name.h"
+
+DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
+    if (module != nullptr) {
+        SetLastError(ERROR_INVALID_HANDLE);
+        return 0;
+    }
+    if (name == nullptr || size == 0) {
+        SetLastError(ERROR_INVALID_PARAMETER);
+        return 0;
+    }
+    char link[PATH_MAX];
+    const ssize_t length = ::readlink("/proc/self/exe", link, sizeof link);
+    if (length < 0) {
+        basalt::platform::set_last_error_from_errno();
+        return 0;
+    }
+    return basalt::platform::or_out_of_memory(DWORD{0}, [&] {
+        std::wstring wide;
+        basalt::platform::wide_from_system_name({link, static_cast<std::size_t>(length)}, wide);
+        const std::size_t copied = std::min<std::size_t>(wide.size(), size - 1);
+        std::copy_n(wide.data(), copied, name);
+        name[copied] = L'\0';
+        if (copied < wide.size()) {
+            SetLastError(ERROR_INSUFFICIENT_BUFFER);
+            return size;
+        }
+        return static_cast<DWORD>(copied);
+    });
+}

@@ -1,0 +1,77 @@
+#include "src/platform/text/file_name.h"
+
+#include <algorithm>
+#include <iterator>
+
+#include "src/platform/text/utf8.h"
+
+namespace basalt::platform {
+namespace {
+
+// Low surrogates, which no UTF-8 holds: a byte's value is added to the first.
+constexpr wchar_t BYTES = 0xDC00;
+
+constexpr bool stands_for_byte(wchar_t ch) {
+    return ch == BYTES + L'\\' || (ch >= BYTES + 0x80 && ch <= BYTES + 0xFF);
+}
+
+}  // namespace
+
+bool file_name_from_wide(std::wstring_view name, std::string& result) {
+    result.clear();
+    result.reserve(name.size());
+    for (const wchar_t ch : name) {
+        if (ch == L'\\') {
+            result.push_back('/');
+        } else if (stands_for_byte(ch)) {
+            result.push_back(static_cast<char>(ch & 0xFF));
+        } else if (is_unicode_scalar(ch)) {
+            char bytes[MAX_UTF8_BYTES];
+            result.append(bytes, encode_utf8(ch, bytes));
+        } else {
+            return false;
+        }
+    }
+    return true;
+}
+
+bool FileName::set(std::wstring_view name) {
+    if (name.size() < std::size(m_short) && write_printing(name, m_short) == name.size()) {
+        // Stores every byte, unlike std::replace, so that the compiler makes lanes of it.
+        for (std::size_t i = 0; i < name.size(); ++i) {
+            m_short[i] = m_short[i] == '\\' ? '/' : m_short[i];
+        }
+        m_short[name.size()] = '\0';
+        m_name = m_short;
+        return true;
+    }
+    const bool is_name = file_name_from_wide(name, m_long);
+    m_name = m_long.c_str();
+    return is_name;
+}
+
+void wide_from_file_name(std::string_view name, std::wstring& result) {
+    result.resize(name.size());
+    result.resize(write_wide(name, result.data(), result.size()));
+    // The replacement character is a character too: only a name that does not come back was no UTF-8.
+    if (result.find(REPLACEMENT_CHARACTER) == std::wstring::npos || utf8_from_wide(result) == name) {
+        return;
+    }
+    result.clear();
+    for (const char byte : name) {
+        result.push_back(wide_from_byte(byte));
+    }
+}
+
+void wide_from_system_name(std::string_view name, std::wstring& result) {
+    wide_from_file_name(name, result);
+    std::replace(result.begin(), result.end(), L'\\', static_cast<wchar_t>(BYTES + L'\\'));
+}
+
+std::wstring wide_from_file_name(std::string_view name) {
+    std::wstring wide;
+    wide_from_file_name(name, wide);
+    return wide;
+}
+
+}  // namespace basalt::platform

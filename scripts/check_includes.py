@@ -1,8 +1,8 @@
 #!/usr/bin/env python3
-"""Holds the direction of inclusion: who may include whom, and who may see the operating system.
+"""Checks the direction of inclusion: which folder may include which, and which may include system headers.
 
-Usage: check_includes.py        prints each include that breaks a rule, and each source that (tests aside) is not
-plain ASCII
+Usage: check_includes.py        prints each include that breaks a rule, each folder of more than 30 files, and each
+source (tests aside) that is not plain ASCII
 """
 import pathlib
 import re
@@ -10,6 +10,11 @@ import sys
 
 FAMILIES = {"frame": set(), "geo": set(), "util": set(), "files": set(), "memory": {"frame"},
             "sparse": {"memory"}, "graphics": {"frame", "geo"}}
+# The rooms of src/platform. The contract headers in src/platform itself ("") are open to every family and room.
+ROOMS = {"": {"system", "text"}, "system": set(), "text": {"system"}, "errors": {"system", "text"},
+         "heap": {"system", "errors"}, "clock": {"system"}, "disk": {"system", "text", "errors", "clock"},
+         "program": {"system", "text", "errors"}, "pixels": set(), "drawing": {"pixels", "system", "text", "errors"}}
+MOST_FILES = 30
 STANDARD = re.compile(r"^[a-z_0-9]+$|^(stddef|stdint|string)\.h$")  # <vector>, and what C shares
 INTRINSICS = {"immintrin.h", "emmintrin.h"}
 OUTSIDE = {"bindings", "console", "examples", "tools"}
@@ -30,8 +35,12 @@ def may_include(path, room, quoted, name):
         return False
     if room is None:
         return path.name == "module.cpp"
-    other = rest.partition("/")[0]
-    return other in {room, "platform"} or other in FAMILIES.get(room, set())
+    other, _, inner = rest.partition("/")
+    if other == "platform":
+        theirs = inner.rpartition("/")[0]
+        ours = "/".join(path.parts[2:-1])
+        return theirs == "" or room == "platform" and (theirs == ours or theirs in ROOMS[ours])
+    return other == room or other in FAMILIES.get(room, set())
 
 
 def main():
@@ -52,6 +61,10 @@ def main():
             match = re.match(r'\s*#\s*include\s*([<"])([^>"]+)[>"]', line)
             if match and not may_include(path, room, match[1] == '"', match[2]):
                 errors.append(f"{path}:{number}: may not include {match[2]}")
+    for folder in sorted({file.parent for top in ("include", "src") for file in (root / top).glob("**/*.*")}):
+        files = sum(file.is_file() for file in folder.iterdir())
+        if files > MOST_FILES:
+            errors.append(f"{folder.relative_to(root)}: {files} files, at most {MOST_FILES}")
     sys.exit("\n".join(errors) if errors else 0)
 
 

@@ -23,7 +23,7 @@ bool next_line(TextScanner& scanner, std::string& text, std::size_t& line) {
     bool in_comment = false;
     for (;;) {
         const TextScanner::Token token = scanner.next();
-        if (token != TextScanner::Token::WORD) {
+        if (token != TextScanner::Token::FIELD) {
             line = scanner.line();
             return token == TextScanner::Token::LINE_END || !text.empty();
         }

@@ -90,11 +90,11 @@ void EsriGridReader::read_header() {
         if (header[key]) {
             m_scanner.fail("header key " + std::string(*found) + " is given twice");
         }
-        if (m_scanner.next() != Token::WORD) {
+        if (m_scanner.next() != Token::FIELD) {
             m_scanner.fail("header key " + std::string(*found) + " has no value");
         }
         header[key] = parse_header_value(m_scanner, key);
-        if (m_scanner.next() == Token::WORD) {
+        if (m_scanner.next() == Token::FIELD) {
             m_scanner.fail("header key " + std::string(*found) + " has more than one value");
         }
     }
@@ -145,7 +145,7 @@ bool EsriGridReader::next_row(std::vector<double>& elevations) {
         m_token = m_scanner.next();
     }
     if (m_rows_read == m_frame.rows) {
-        if (m_token == Token::WORD) {
+        if (m_token == Token::FIELD) {
             throw InputError(m_scanner.path(), m_scanner.line(),
                              "more rows than nrows says (" + std::to_string(m_frame.rows) + ")");
         }
@@ -159,7 +159,7 @@ bool EsriGridReader::next_row(std::vector<double>& elevations) {
     // The row grows with what is really there: a header that lies about ncols costs no memory.
     const auto columns = static_cast<std::size_t>(m_frame.columns);
     elevations.clear();
-    for (; m_token == Token::WORD; m_token = m_scanner.next()) {
+    for (; m_token == Token::FIELD; m_token = m_scanner.next()) {
         if (elevations.size() == columns) {
             m_scanner.fail("more values than ncols says (" + std::to_string(columns) + ")");
         }

@@ -92,7 +92,7 @@ TextScanner::Token TextScanner::next() {
     }
     m_word = std::string_view(m_buffer.data() + m_position, length);
     m_position += length;
-    return Token::WORD;
+    return Token::FIELD;
 }
 
 void TextScanner::fail(const std::string& message) const {

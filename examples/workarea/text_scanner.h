@@ -15,7 +15,7 @@
 /// Memory is one piece whatever the file's size, and a word is handed out as a view into it without a copy.
 class TextScanner {
 public:
-    enum class Token { WORD, LINE_END, FILE_END };
+    enum class Token { FIELD, LINE_END, FILE_END };
 
     /// Opens the file. InputError when that fails.
     explicit TextScanner(std::string path);

@@ -9,7 +9,7 @@
 #include "src/platform/heap/free_lists.h"
 #include "src/platform/heap/quick_lists.h"
 #include "src/platform/heap/regions.h"
-#include "src/platform/system/leaning_lock.h"
+#include "src/platform/system/lock.h"
 
 namespace basalt::platform {
 
@@ -75,7 +75,7 @@ private:
     // Leading members are what every allocation touches.
     std::uint64_t m_magic;
     std::uint64_t m_tag;  // marks the heads of this heap's live blocks
-    LeaningLock m_lock;
+    Lock m_lock;
     std::size_t m_live_shared = 0;    // bytes of the live blocks in shared regions
     std::size_t m_mapped_shared = 0;  // bytes of the regions that many blocks share
     QuickLists m_quick;

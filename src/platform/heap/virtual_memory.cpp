@@ -4,15 +4,12 @@
 
 #include <cerrno>
 #include <cstdint>
-#include <map>
-#include <mutex>
-#include <utility>
 
 #include "basalt/platform/error.h"
 #include "src/platform/pages.h"
-#include "src/platform/system/lock.h"
 #include "src/platform/system/no_destructor.h"
 #include "src/platform/system/out_of_memory.h"
+#include "src/platform/system/registry.h"
 
 namespace basalt::platform {
 namespace {
@@ -29,26 +26,14 @@ struct Range {
     std::byte* pages() const noexcept { return reinterpret_cast<std::byte*>(base); }
 };
 
-using ReservationMap = std::map<std::uintptr_t, std::uintptr_t>;  // end by base
-
-struct Reservations {
-    Lock lock;
-    ReservationMap by_base;
-};
+using Reservations = Registry<std::uintptr_t, Range>;  // by base
 
 Reservations& reservations() noexcept {
     static NoDestructor<Reservations> s_reservations;
     return *s_reservations;
 }
 
-void add(ReservationMap::node_type&& reservation) noexcept {
-    Reservations& all = reservations();
-    const std::lock_guard<Lock> guard(all.lock);
-    all.by_base.insert(std::move(reservation));
-}
-
-// The whole pages, or multiples of the granularity at the front, that hold a range. False when it would pass
-// the end of all addresses.
+// Rounds a range out to whole pages, its front to a multiple of `front`. False beyond the last address.
 bool round_out(const void* address, std::size_t size, std::uintptr_t front, Range& range) noexcept {
     const auto start = reinterpret_cast<std::uintptr_t>(address);
     if (size > UINTPTR_MAX - start) {
@@ -59,22 +44,8 @@ bool round_out(const void* address, std::size_t size, std::uintptr_t front, Rang
     return range.end > range.base;
 }
 
-// The reservation that holds an address; an empty range when none does.
-Range reservation_around(std::uintptr_t address) noexcept {
-    Reservations& all = reservations();
-    const std::lock_guard<Lock> guard(all.lock);
-    auto next = all.by_base.upper_bound(address);
-    if (next == all.by_base.begin()) {
-        return {};
-    }
-    --next;
-    return {next->first, next->second};
-}
-
 DWORD reserve(void* address, std::size_t size, Range& range) {
-    ReservationMap single;
-    single.emplace(0, 0);
-    ReservationMap::node_type reservation = single.extract(single.begin());
+    Reservations::Entry reservation = Reservations::make_entry({});
     if (address == nullptr) {
         if (size > SIZE_MAX / 2) {
             return ERROR_NOT_ENOUGH_MEMORY;
@@ -94,20 +65,20 @@ DWORD reserve(void* address, std::size_t size, Range& range) {
         if (pages == MAP_FAILED) {
             return errno == ENOMEM ? ERROR_NOT_ENOUGH_MEMORY : ERROR_INVALID_ADDRESS;
         }
-        if (pages != range.pages()) {  // to systems before 4.17 the address is a wish
+        if (pages != range.pages()) {  // systems before 4.17 may choose another
             munmap(pages, range.size());
             return ERROR_INVALID_ADDRESS;
         }
     }
-    reservation.key() = range.base;
-    reservation.mapped() = range.end;
-    add(std::move(reservation));
+    reservation.mapped() = range;
+    reservations().add(range.base, reservation);
     return ERROR_SUCCESS;
 }
 
-// The pages of a range that is reserved. False for any other.
+// The pages of a range within one reservation. False for any other.
 bool find_reserved(const void* address, std::size_t size, Range& range) noexcept {
-    return round_out(address, size, page_size(), range) && range.is_within(reservation_around(range.base));
+    return round_out(address, size, page_size(), range) &&
+           range.is_within(reservations().find_last_up_to(range.base));
 }
 
 DWORD commit(const void* address, std::size_t size, Range& range) noexcept {
@@ -121,33 +92,28 @@ DWORD commit(const void* address, std::size_t size, Range& range) noexcept {
 DWORD decommit(const void* address, std::size_t size) noexcept {
     Range range;
     if (size == 0) {
-        range = reservation_around(reinterpret_cast<std::uintptr_t>(address));
-        if (range.base != reinterpret_cast<std::uintptr_t>(address) || range.size() == 0) {
+        range = reservations().find(reinterpret_cast<std::uintptr_t>(address));
+        if (range.size() == 0) {
             return ERROR_INVALID_ADDRESS;
         }
     } else if (!find_reserved(address, size, range)) {
         return ERROR_INVALID_ADDRESS;
     }
-    // Fresh pages in one step: advice to drop the old ones is refused where a process has locked its memory.
+    // New pages in one step: madvise() refuses to drop locked pages.
     void* const pages =
         mmap(range.pages(), range.size(), PROT_NONE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_FIXED, -1, 0);
     return pages != MAP_FAILED ? ERROR_SUCCESS : ERROR_NOT_ENOUGH_MEMORY;
 }
 
 DWORD release(const void* base) noexcept {
-    ReservationMap::node_type reservation;
-    {
-        Reservations& all = reservations();
-        const std::lock_guard<Lock> guard(all.lock);
-        reservation = all.by_base.extract(reinterpret_cast<std::uintptr_t>(base));
-    }
-    // It is out of the table now: the moment it is unmapped another thread may be given its addresses.
+    Reservations::Entry reservation = reservations().take(reinterpret_cast<std::uintptr_t>(base));
     if (reservation.empty()) {
         return ERROR_INVALID_ADDRESS;
     }
-    const Range range = {reservation.key(), reservation.mapped()};
+    // Unregistered before it is unmapped: from then on another thread may be given its addresses.
+    const Range range = reservation.mapped();
     if (!unmap_pages(range.pages(), range.size())) {
-        add(std::move(reservation));
+        reservations().add(range.base, reservation);
         return ERROR_NOT_ENOUGH_MEMORY;
     }
     return ERROR_SUCCESS;

@@ -1,24 +1,22 @@
 #include "src/platform/system/forks.h"
 
 #include <pthread.h>
-#include <unistd.h>
 
 #include <mutex>
 
 #include "src/platform/system/lock.h"
 
 namespace basalt::platform {
-
 namespace {
 
 constinit Lock s_registering;
 constinit std::atomic<bool> s_counts = false;
-constinit std::atomic<std::uint32_t> s_forks = 0;
+constinit std::atomic<ProcessMark> s_forks = 0;
 
 }  // namespace
 
 bool register_fork_handlers(std::atomic<bool>& are_registered, const ForkHandlers& handlers) noexcept {
-    // Without the lock once it is done: in a forked child a thread that is not there may hold it.
+    // Checked without the lock first: in a forked child a thread that does not exist may hold it.
     if (!are_registered.load(std::memory_order_acquire)) {
         const std::lock_guard guard(s_registering);
         if (!are_registered.load(std::memory_order_relaxed)) {
@@ -34,7 +32,7 @@ bool count_forks() noexcept {
 }
 
 ProcessMark this_process() noexcept {
-    return {::getpid(), s_forks.load(std::memory_order_relaxed)};
+    return s_forks.load(std::memory_order_relaxed);
 }
 
 }  // namespace basalt::platform

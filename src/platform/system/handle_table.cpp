@@ -1,29 +1,24 @@
 #include "src/platform/system/handle_table.h"
 
-#include <mutex>
+#include <atomic>
 #include <utility>
 
-#include "src/platform/system/lock.h"
 #include "src/platform/system/no_destructor.h"
 #include "src/platform/system/out_of_memory.h"
 
 namespace basalt::platform {
 namespace {
 
-constexpr std::uint32_t STEP = 4;  // published: the two low bits of a handle are the user's
+constexpr std::uint32_t STEP = 4;  // Win32: the two low bits of a handle are the caller's
 
-struct HandleTable {
-    Lock lock;
-    HandleMap objects;
-    std::uint32_t last_key = 0;
-};
+constinit std::atomic<std::uint32_t> s_last_key = 0;
 
-HandleTable& table() noexcept {
-    static NoDestructor<HandleTable> s_table;
-    return *s_table;
+HandleRegistry& objects() noexcept {
+    static NoDestructor<HandleRegistry> s_objects;
+    return *s_objects;
 }
 
-// The key a handle stands for; 0, which none has, where it cannot stand for any.
+// The key of a handle; 0, which no handle has, for a value out of range.
 std::uint32_t key_of(HANDLE handle) noexcept {
     const auto value = reinterpret_cast<std::uintptr_t>(handle);
     return value <= UINT32_MAX ? static_cast<std::uint32_t>(value) : 0;
@@ -31,43 +26,28 @@ std::uint32_t key_of(HANDLE handle) noexcept {
 
 }  // namespace
 
-NewHandle::NewHandle(std::shared_ptr<HandleObject> object) {
-    HandleMap single;
-    single.emplace(0, std::move(object));
-    m_node = single.extract(single.begin());
-}
+NewHandle::NewHandle(std::shared_ptr<HandleObject> object)
+    : m_entry(HandleRegistry::make_entry(std::move(object))) {}
 
 HANDLE NewHandle::give() noexcept {
-    HandleTable& handles = table();
-    const std::lock_guard<Lock> guard(handles.lock);
+    std::uint32_t key = 0;
     do {  // ends: memory runs out long before 2^30 handles do
-        handles.last_key += STEP;
-    } while (handles.last_key == 0 || handles.objects.contains(handles.last_key));
-    m_node.key() = handles.last_key;
-    handles.objects.insert(std::move(m_node));
-    return reinterpret_cast<HANDLE>(std::uintptr_t{handles.last_key});
+        key = s_last_key.fetch_add(STEP, std::memory_order_relaxed) + STEP;
+    } while (key == 0 || !objects().add(key, m_entry));
+    return reinterpret_cast<HANDLE>(std::uintptr_t{key});
 }
 
 std::shared_ptr<HandleObject> find_object(HANDLE handle) noexcept {
-    HandleTable& handles = table();
-    const std::lock_guard<Lock> guard(handles.lock);
-    const auto found = handles.objects.find(key_of(handle));
-    return found != handles.objects.end() ? found->second : nullptr;
+    return objects().find(key_of(handle));
 }
 
 void drop_handle(HANDLE handle) noexcept {
-    HandleTable& handles = table();
-    HandleMap::node_type dropped;  // its object may end with it, outside the lock
-    const std::lock_guard<Lock> guard(handles.lock);
-    dropped = handles.objects.extract(key_of(handle));
+    // The object may be destroyed here, with the registry unlocked.
+    const HandleRegistry::Entry dropped = objects().take(key_of(handle));
 }
 
 void for_each_object(void (*visit)(HandleObject&)) noexcept {
-    HandleTable& handles = table();
-    const std::lock_guard<Lock> guard(handles.lock);
-    for (auto& [key, object] : handles.objects) {
-        visit(*object);
-    }
+    objects().for_each([visit](const std::shared_ptr<HandleObject>& object) { visit(*object); });
 }
 
 }  // namespace basalt::platform

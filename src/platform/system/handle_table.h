@@ -1,19 +1,19 @@
 // The objects behind handles.
 //
-// Threads: thread-safe. A closed object lives on while another thread still works with it.
+// Threads: thread-safe. A closed object lives on while another thread still uses it.
 #ifndef BASALT_SRC_PLATFORM_SYSTEM_HANDLE_TABLE_H
 #define BASALT_SRC_PLATFORM_SYSTEM_HANDLE_TABLE_H
 
 #include <cstdint>
-#include <map>
 #include <memory>
 
 #include "basalt/platform/types.h"
 #include "src/platform/handle.h"
+#include "src/platform/system/registry.h"
 
 namespace basalt::platform {
 
-// What a handle can stand for; each derived class names its kind in a member KIND.
+// What a handle refers to; each derived class names its kind in a member KIND.
 class HandleObject {
 public:
     enum class Kind : std::uint8_t { FILE, MAPPING, SEARCH };
@@ -25,29 +25,30 @@ public:
 
     Kind kind() const noexcept { return m_kind; }
 
-    // What the end of the handle means to the object, which others may still use.
+    // Called when the handle is closed; other threads may still use the object.
     virtual void close() noexcept {}
 
 private:
     const Kind m_kind;
 };
 
-using HandleMap = std::map<std::uint32_t, std::shared_ptr<HandleObject>>;
+using HandleRegistry = Registry<std::uint32_t, std::shared_ptr<HandleObject>>;
 
-// A handle in two steps: the first may throw, the second, after all that else can fail, may not.
+// A handle in two steps: the constructor may throw; give(), called after everything else that can fail,
+// cannot.
 class NewHandle {
 public:
     explicit NewHandle(std::shared_ptr<HandleObject> object);
     HANDLE give() noexcept;
 
 private:
-    HandleMap::node_type m_node;
+    HandleRegistry::Entry m_entry;
 };
 
 // The object of a handle, null when there is none. The last error stays as it is.
 std::shared_ptr<HandleObject> find_object(HANDLE handle) noexcept;
 
-// The same of one kind alone.
+// The same, of one kind only.
 template <class T>
 std::shared_ptr<T> find_object_of(HANDLE handle) noexcept {
     const std::shared_ptr<HandleObject> object = find_object(handle);

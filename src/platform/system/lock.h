@@ -1,4 +1,4 @@
-// Mutex of three words, for locks that are taken millions of times a second and seldom fought over.
+// Mutexes for locks that are taken millions of times a second and seldom contended.
 #ifndef BASALT_SRC_PLATFORM_SYSTEM_LOCK_H
 #define BASALT_SRC_PLATFORM_SYSTEM_LOCK_H
 
@@ -7,9 +7,8 @@
 
 namespace basalt::platform {
 
-// Not recursive. Usable before any constructor has run and never needs tearing down, so it may live in
-// static storage and in memory that is zero. Used through std::lock_guard and std::unique_lock.
-// Leaves errno alone.
+// Not recursive. Constant-initialised and trivially destructible, so it may live in static storage and in
+// zeroed memory. Used through std::lock_guard and std::unique_lock. Does not change errno.
 class Lock {
 public:
     constexpr Lock() noexcept = default;
@@ -26,8 +25,8 @@ public:
 
     void unlock() noexcept {
         // A plain store and a load instead of a second locked instruction: half the price of a pair. The
-        // processor may run the load before the store is seen; a thread about to sleep makes up for it with
-        // a barrier on every thread of the process.
+        // processor may run the load before the store is visible and so miss a new waiter; waiters
+        // therefore sleep for a limited time only.
         m_held.store(0, std::memory_order_release);
         std::atomic_signal_fence(std::memory_order_seq_cst);
         if (m_wanted.load(std::memory_order_relaxed) != 0) {
@@ -37,12 +36,63 @@ public:
 
 private:
     void lock_contended() noexcept;
-    bool spin_for_it() noexcept;
+    bool spin() noexcept;
     void wake_one() noexcept;
 
     std::atomic<std::uint32_t> m_held{0};      // 1 while held
-    std::atomic<std::uint32_t> m_wanted{0};    // 1 while who leaves has to wake one; the word to sleep on
+    std::atomic<std::uint32_t> m_wanted{0};    // 1 while unlock() has to wake a waiter; waiters sleep on it
     std::atomic<std::uint32_t> m_sleepers{0};  // threads asleep, about to be, or woken and not yet inside
+};
+
+// The same for a thread that may enter again; it leaves as often as it entered.
+class RecursiveLock {
+public:
+    void lock() noexcept {
+        if (!enter_again()) {
+            m_lock.lock();
+            own();
+        }
+    }
+
+    bool try_lock() noexcept {
+        if (enter_again()) {
+            return true;
+        }
+        if (!m_lock.try_lock()) {
+            return false;
+        }
+        own();
+        return true;
+    }
+
+    void unlock() noexcept {
+        if (--m_depth == 0) {
+            m_owner.store(nullptr, std::memory_order_relaxed);
+            m_lock.unlock();
+        }
+    }
+
+private:
+    // The address of the thread's control block identifies it and is read by one instruction.
+    static const void* this_thread() noexcept { return __builtin_thread_pointer(); }
+
+    bool enter_again() noexcept {
+        // Only this thread ever stores its own identity there, so a match needs no ordering.
+        if (m_owner.load(std::memory_order_relaxed) != this_thread()) {
+            return false;
+        }
+        ++m_depth;
+        return true;
+    }
+
+    void own() noexcept {
+        m_owner.store(this_thread(), std::memory_order_relaxed);
+        m_depth = 1;
+    }
+
+    Lock m_lock;
+    std::uint32_t m_depth = 0;  // entries of the owner; accessed by the owner only
+    std::atomic<const void*> m_owner{nullptr};
 };
 
 }  // namespace basalt::platform

@@ -16,25 +16,23 @@ namespace {
 constexpr int MOST_FOOT_PASSES = 100;
 /// Closer than this the point is on the line; metres.
 constexpr double ON_THE_LINE = 1e-6;
-/// What the coordinates of a foot resolve, metres.
+/// Resolution of a foot's coordinates, metres.
 constexpr double FINEST_STEP = 5e-9;
-/// Closer than this to the point's antipode every direction leads to the point and none is square to the
-/// line: from here on rounding alone would settle what is; metres.
+/// Closer than this to the point's antipode, metres, rounding alone decides what is square to the line.
 constexpr double AT_THE_ANTIPODE = FINEST_STEP / RAY_TOLERANCE;
-/// How far from where the search by steps would end the foot may be, metres: the distance changes by 0.4 % of
-/// it, what ellipsoid and sphere differ by.
+/// Tolerance of the foot along the line, metres. The result changes by 0.4 % of it.
 constexpr double FOOT_TOLERANCE = 5e-5;
 
 double length_of(double x, double y) {
     return std::sqrt(x * x + y * y);
 }
 
-/// The point as it is seen from a place on the line, on the sphere: all without an angle.
+/// Direction of the point from a place on the line, on the sphere.
 struct Sight {
-    double ahead;     ///< sine of the distance, times the cosine of the angle between line and sight
-    double right;     ///< the same, times the sine of that angle
-    double cosine;    ///< of the distance
-    double distance;  ///< its sine, which is the length of (ahead, right)
+    double ahead;     ///< sine of the distance times the cosine of the angle between line and sight
+    double right;     ///< sine of the distance times the sine of that angle
+    double cosine;    ///< cosine of the distance
+    double distance;  ///< sine of the distance, the length of (ahead, right)
 
     /// Cosine of the angle between line and sight: 0 at the foot, positive before it.
     double skew() const { return ahead / distance; }
@@ -68,10 +66,8 @@ private:
     double m_longitude;
 };
 
-/// The skews a search may end with: within `width` of `aim`. A search by small steps ends as soon as the skew
-/// is below the tolerance, on the side it came from. A long sight turns that into a foot some way short of
-/// square, so this is where to end; a short one leaves the whole tolerance, and below 1 cm what rounding
-/// resolves.
+/// Skews that end the search: within `width` of `aim`. A search by steps of a metre ends once the skew is
+/// below the tolerance, on the side it came from; for a long sight that is a foot some way short of square.
 struct Goal {
     double aim;
     double width;
@@ -94,7 +90,7 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
     Sight best = target.seen_from(best_foot, a.longitude);
     double best_miss = std::numeric_limits<double>::infinity();
     const double side = best.ahead;
-    // Places between which the foot lies: the point is ahead of the first, behind the second.
+    // Bounds of the foot: the point is ahead of the first and behind the second.
     double low = -std::numeric_limits<double>::infinity();
     double high = std::numeric_limits<double>::infinity();
     double step = std::numeric_limits<double>::infinity();
@@ -119,9 +115,8 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
             break;
         }
         (sight.skew() > goal.aim ? low : high) = along;
-        // Napier's rule for the legs of a right-angled triangle gives the foot on a great circle; a geodesic
-        // of the ellipsoid leaves the next pass a fraction of the way. From the second step on that fraction
-        // is known, and what all further steps would add up to is made in one: this saves the last pass.
+        // Napier's rule gives the foot on a great circle; on the ellipsoid each step leaves a fraction of the
+        // way. From the second step on that fraction is known, and the sum of all further steps is taken.
         const double leg = SPHERE_RADIUS * (std::atan2(sight.ahead, sight.cosine) -
                                             std::atan2(goal.aim * sight.distance, std::abs(sight.cosine)));
         const double fraction = leg / step;
@@ -130,7 +125,7 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
         if (!(along > low && along < high)) {
             along = low + (high - low) / 2.0;
         }
-        // Not finite: the step was lost in rounding before the foot was enclosed.
+        // Not finite when the step was lost to rounding before the foot had two bounds.
         if (!(high - low > FINEST_STEP) || !std::isfinite(along)) {
             break;
         }
@@ -144,3 +139,8 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
 }
 
 }  // namespace basalt::geo
+
+double geo_vincenty_crosstrack(geo_llh a, geo_llh b, geo_llh p) {
+    int passes = 0;
+    return basalt::geo::cross_track(a, b, p, passes);
+}

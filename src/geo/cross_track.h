@@ -1,5 +1,5 @@
 /// @file
-/// The search behind geo_vincenty_crosstrack().
+/// The search behind geo_vincenty_crosstrack(), with its number of passes.
 #ifndef BASALT_SRC_GEO_CROSS_TRACK_H
 #define BASALT_SRC_GEO_CROSS_TRACK_H
 
@@ -7,10 +7,8 @@
 
 namespace basalt::geo {
 
-/// Radius of the sphere distances are measured on, metres.
-inline constexpr double SPHERE_RADIUS = 6371000.0;
-
-/// geo_vincenty_crosstrack(), with the count of feet it tried.
+/// As geo_vincenty_crosstrack().
+/// @param[out] passes feet tried, at most 100
 double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& passes);
 
 }  // namespace basalt::geo

@@ -3,21 +3,22 @@
 #include "basalt/geo.h"
 #include "src/geo/constants.h"
 
+using basalt::is_null;
 using namespace basalt::geo;
 
 double geo_arc_angle_to_length(double angle, double radius) {
-    return angle == GEO_NULL || radius == GEO_NULL ? GEO_NULL : angle * radius;
+    return is_null(angle) || is_null(radius) ? GEO_NULL : angle * radius;
 }
 
 double geo_arc_length_to_angle(double length, double radius) {
-    if (length == GEO_NULL || radius == GEO_NULL || std::abs(radius) < EQUALITY_TOLERANCE) {
+    if (is_null(length) || is_null(radius) || std::abs(radius) < EQUALITY_TOLERANCE) {
         return GEO_NULL;
     }
     return length / radius;
 }
 
 double geo_arc_to_chord(double radius, double separation) {
-    if (radius == GEO_NULL || radius == GEO_INFINITY || separation == GEO_NULL) {
+    if (is_null(radius) || radius == GEO_INFINITY || is_null(separation)) {
         return GEO_NULL;
     }
     if (separation >= radius) {
@@ -33,15 +34,15 @@ double geo_spiral_deflection(double length, double spiralConstant) {
 
 namespace {
 
-/// A series whose terms are term / divisor, the terms following from each other by q over a factorial's next
-/// two factors. The x series runs over even factorials, the y series over odd ones.
+/// A series of term / divisor, where each term is the one before times q over the next two factors of a
+/// factorial: even factorials for x, odd ones for y.
 struct SpiralSeries {
     double sum;
     double term;
     double factorial;
     double divisor;
 
-    /// Adds terms until one is below the tolerance; false when none of nine is.
+    /// Adds terms until one is below the tolerance; false if none of the first nine is.
     bool settle(double q, double tolerance) {
         constexpr double DIVISOR_LIMIT = 41.0;
         for (double sign = -1.0; divisor < DIVISOR_LIMIT; sign = -sign) {

@@ -3,7 +3,7 @@
 #include <cmath>
 
 #include "basalt/geo/plane.h"
-#include "src/geo/cross_track.h"
+#include "src/geo/constants.h"
 #include "src/geo/geodesic_line.h"
 
 using namespace basalt::geo;
@@ -20,7 +20,7 @@ double geo_vincenty_distance(geo_llh a, geo_llh b) {
     const double north = std::sin((b.latitude - a.latitude) / 2.0);
     const double east = std::sin((b.longitude - a.longitude) / 2.0);
     double h = north * north + std::cos(a.latitude) * std::cos(b.latitude) * (east * east);
-    // Rounded above 1 at the antipode, where the other root would be NaN.
+    // At the antipode h may round above 1, and the other root would be NaN.
     if (h > 1.0) {
         h = 1.0;
     }
@@ -33,9 +33,4 @@ double geo_vincenty_bearing(geo_llh from, geo_llh to) {
     return geo_normalised_bearing(
         std::atan2(std::sin(change) * cosine, std::cos(from.latitude) * std::sin(to.latitude) -
                                                   std::sin(from.latitude) * cosine * std::cos(change)));
-}
-
-double geo_vincenty_crosstrack(geo_llh a, geo_llh b, geo_llh p) {
-    int passes = 0;
-    return cross_track(a, b, p, passes);
 }

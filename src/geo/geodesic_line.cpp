@@ -23,7 +23,7 @@ constexpr int MOST_ARC_PASSES = 100;
 
 GeodesicLine::GeodesicLine(double latitude, double azimuth)
     : m_sin_azimuth(std::sin(azimuth)), m_cos_azimuth(std::cos(azimuth)) {
-    // One sine and cosine cost less than a tangent.
+    // Cheaper than a tangent.
     m_tan_u = ONE_LESS_FLATTENING * (std::sin(latitude) / std::cos(latitude));
     m_cos_u = 1.0 / std::sqrt(m_tan_u * m_tan_u + 1.0);
     m_sin_u = m_tan_u * m_cos_u;
@@ -33,76 +33,49 @@ GeodesicLine::GeodesicLine(double latitude, double azimuth)
     const double a = 1.0 + u2 * 6.103515625e-05 * (4096.0 + u2 * (-768.0 + u2 * (320.0 - 175.0 * u2)));
     m_b = u2 * 0.0009765625 * (256.0 + u2 * (-128.0 + u2 * (74.0 - 47.0 * u2)));
     m_metres_per_radian = SEMI_MINOR_AXIS * a;
-    // sigma1 is the direction of (cos azimuth, tan u); the double angle needs no arctangent. The squares sum
-    // to more than 0: no double has a cosine of 0.
+    // sigma1 is the direction of (cos azimuth, tan u); its double angle needs no arctangent. The length is
+    // above 0: no double has a cosine of 0.
     const double length2 = m_tan_u * m_tan_u + m_cos_azimuth * m_cos_azimuth;
     m_sin_2sigma1 = 2.0 * m_tan_u * m_cos_azimuth / length2;
     m_cos_2sigma1 = (m_cos_azimuth - m_tan_u) * (m_cos_azimuth + m_tan_u) / length2;
 }
 
-/// Vincenty's iteration for the arc, from its first value. `directions` sets sine and cosines for an arc some
-/// way beyond the first; those left are what the last pass began with. False when a change comes within
-/// `closeness` of what decides.
-template <typename Directions>
-bool GeodesicLine::settle(double first, double closeness, const Directions& directions, Arc& arc) const {
+LineEnd GeodesicLine::at(double distance) const {
+    const double first = distance / m_metres_per_radian;
+    const double first_sine = std::sin(first);
+    const double first_cosine = std::cos(first);
+    double sigma = first;
     double beyond = 0.0;
-    arc.sigma = first;
-    directions(beyond, arc);
+    double sine = first_sine;
+    double cosine = first_cosine;
+    double c = m_cos_2sigma1 * cosine - m_sin_2sigma1 * sine;  // cosine of 2 sigma_m
     double change = std::abs(first - TWO_PI);
     for (int pass = 0; change > SETTLED && pass < MOST_ARC_PASSES; ++pass) {
         if (pass > 0) {
-            directions(beyond, arc);
+            // The passes move the arc by less than 0.002 rad, so a short series turns the first sine and
+            // cosine to the last place.
+            const double d2 = beyond * beyond;
+            const double turn = beyond - beyond * d2 * (1.0 / 6.0 - d2 / 120.0);
+            const double versine = d2 * (0.5 - d2 * (1.0 / 24.0 - d2 / 720.0));
+            sine = first_sine + (first_cosine * turn - first_sine * versine);
+            cosine = first_cosine - (first_sine * turn + first_cosine * versine);
+            c = m_cos_2sigma1 * cosine - m_sin_2sigma1 * sine;
         }
-        const double c = arc.cos_2m;
-        beyond = m_b * arc.sine *
+        beyond = m_b * sine *
                  (c + m_b / 4.0 *
-                          (arc.cosine * (2.0 * c * c - 1.0) -
-                           m_b / 6.0 * c * (4.0 * arc.sine * arc.sine - 3.0) * (4.0 * c * c - 3.0)));
-        const double previous = arc.sigma;
-        arc.sigma = first + beyond;
-        change = std::abs(arc.sigma - previous);
-        if (std::abs(change - SETTLED) <= closeness) {
-            return false;
-        }
+                          (cosine * (2.0 * c * c - 1.0) -
+                           m_b / 6.0 * c * (4.0 * sine * sine - 3.0) * (4.0 * c * c - 3.0)));
+        const double previous = sigma;
+        sigma = first + beyond;
+        change = std::abs(sigma - previous);
     }
-    return true;
-}
-
-LineEnd GeodesicLine::at(double distance) const {
-    const double first = distance / m_metres_per_radian;
-    Arc arc = {};
-    // The passes turn by less than 0.002: a few terms of the series turn the first sine and cosine to the
-    // last place, and the addition theorem gives the middle. This may move sigma by some units in the last
-    // place; where that could change the count of passes, the arc is settled again as the books have it.
-    const double rounding = 2e-15 * (1.0 + std::abs(first));
-    const double first_sine = std::sin(first);
-    const double first_cosine = std::cos(first);
-    const auto by_addition = [&](double d, Arc& at) {
-        const double d2 = d * d;
-        const double sine = d - d * d2 * (1.0 / 6.0 - d2 / 120.0);
-        const double versine = d2 * (0.5 - d2 * (1.0 / 24.0 - d2 / 720.0));
-        at.sine = first_sine + (first_cosine * sine - first_sine * versine);
-        at.cosine = first_cosine - (first_sine * sine + first_cosine * versine);
-        at.cos_2m = m_cos_2sigma1 * at.cosine - m_sin_2sigma1 * at.sine;
-    };
-    if (!settle(first, rounding, by_addition, arc)) {
-        const double sigma1 = std::atan2(m_tan_u, m_cos_azimuth);
-        const auto plainly = [&](double, Arc& at) {
-            at.sine = std::sin(at.sigma);
-            at.cosine = std::cos(at.sigma);
-            at.cos_2m = std::cos(2.0 * sigma1 + at.sigma);
-        };
-        settle(first, -1.0, plainly, arc);
-    }
-    const double t = m_sin_u * arc.sine - m_cos_u * arc.cosine * m_cos_azimuth;
-    const double lambda =
-        std::atan2(arc.sine * m_sin_azimuth, m_cos_u * arc.cosine - m_sin_u * arc.sine * m_cos_azimuth);
+    const double t = m_sin_u * sine - m_cos_u * cosine * m_cos_azimuth;
+    const double lambda = std::atan2(sine * m_sin_azimuth, m_cos_u * cosine - m_sin_u * sine * m_cos_azimuth);
     const double k = FLATTENING_16TH * m_cos2_alpha * (4.0 + FLATTENING * (4.0 - 3.0 * m_cos2_alpha));
-    const double c = arc.cos_2m;
-    return {m_sin_alpha, -t, m_sin_u * arc.cosine + m_cos_u * arc.sine * m_cos_azimuth,
+    return {m_sin_alpha, -t, m_sin_u * cosine + m_cos_u * sine * m_cos_azimuth,
             ONE_LESS_FLATTENING * std::sqrt(m_sin_alpha * m_sin_alpha + t * t),
             lambda - (1.0 - k) * FLATTENING * m_sin_alpha *
-                         (arc.sigma + k * arc.sine * (c + k * arc.cosine * (2.0 * c * c - 1.0)))};
+                         (sigma + k * sine * (c + k * cosine * (2.0 * c * c - 1.0)))};
 }
 
 }  // namespace basalt::geo

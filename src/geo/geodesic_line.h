@@ -5,7 +5,7 @@
 
 namespace basalt::geo {
 
-/// Where a line stands after a distance, as directions whose angles nobody has asked for yet.
+/// End of a line as sines and cosines, so that callers form only the angles they use.
 struct LineEnd {
     double azimuth_sine;  ///< with azimuth_cosine the direction of the forward azimuth, not of length 1
     double azimuth_cosine;
@@ -14,20 +14,15 @@ struct LineEnd {
     double longitude_change;  ///< radians
 };
 
-/// A geodesic by its start and azimuth: what Vincenty's direct series needs of them, formed once.
+/// A geodesic by its start and azimuth: the part of Vincenty's direct series that does not depend on the
+/// distance.
 class GeodesicLine {
 public:
     GeodesicLine(double latitude, double azimuth);
-    /// Place at a distance in metres.
+    /// The end after a distance in metres.
     LineEnd at(double distance) const;
 
 private:
-    struct Arc {
-        double sigma, sine, cosine, cos_2m;
-    };
-    template <typename Directions>
-    bool settle(double first, double closeness, const Directions& directions, Arc& arc) const;
-
     double m_sin_azimuth, m_cos_azimuth;
     double m_tan_u, m_sin_u, m_cos_u;
     double m_sin_alpha, m_cos2_alpha;

@@ -31,7 +31,7 @@ int geo_point_on_polyline(int n, const geo_nee* vertices, const geo_nee* point, 
             return 1;
         }
         const double squared_length = geo_horz_distSq(a, b);
-        // The ends go first: far from them the root and the division need not be formed.
+        // The ends first: far from them no root and division is needed.
         if (geo_horz_distSq(a, p) < squared_length + reach &&
             geo_horz_distSq(b, p) < squared_length + reach) {
             const double doubled_area =

@@ -9,17 +9,17 @@ namespace {
 
 template <typename... Values>
 bool any_null(Values... values) {
-    return ((values == GEO_NULL) || ...);
+    return (basalt::is_null(values) || ...);
 }
 
 }  // namespace
 
 geo_hvd& geo_normalise_obs(geo_hvd& obs) {
-    if (obs.vertical == GEO_NULL || obs.vertical <= PI) {
+    if (any_null(obs.vertical) || obs.vertical <= PI) {
         return obs;
     }
     obs.vertical = TWO_PI - obs.vertical;
-    if (obs.horizontal != GEO_NULL) {
+    if (!any_null(obs.horizontal)) {
         obs.horizontal = geo_normalised_bearing(obs.horizontal + PI);
     }
     return obs;

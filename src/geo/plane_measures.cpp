@@ -4,10 +4,11 @@
 #include "src/geo/constants.h"
 #include "src/geo/one_turn.h"
 
+using basalt::is_null;
 using namespace basalt::geo;
 
 double geo_normalised_bearing(double angle) {
-    if (angle == GEO_NULL || angle > REDUCTION_LIMIT || angle < -REDUCTION_LIMIT) {
+    if (is_null(angle) || angle > REDUCTION_LIMIT || angle < -REDUCTION_LIMIT) {
         return angle;
     }
     return to_one_turn(angle);
@@ -41,11 +42,11 @@ int nee_equal(const geo_nee& a, const geo_nee& b) {
 }
 
 bool geo_dist_equal(double a, double b) {
-    return (a == GEO_NULL && b == GEO_NULL) || std::abs(a - b) < EQUALITY_TOLERANCE;
+    return (is_null(a) && is_null(b)) || std::abs(a - b) < EQUALITY_TOLERANCE;
 }
 
 double geo_grid_bearing(const geo_nee& from, const geo_nee& to) {
-    // A difference of -0, from a coordinate of -0, would turn the bearing of coincident points round.
+    // + 0.0: a difference of -0 would reverse the bearing of coincident points.
     const double east = to.east - from.east + 0.0;
     const double north = to.north - from.north + 0.0;
     return geo_normalised_bearing(std::atan2(east, north));
@@ -70,7 +71,7 @@ double geo_gradient2(const geo_nee& from, const geo_nee& to) {
 }
 
 double geo_grid_divergence(double bearing1, double bearing2) {
-    if (bearing1 == GEO_NULL || bearing2 == GEO_NULL) {
+    if (is_null(bearing1) || is_null(bearing2)) {
         return GEO_NULL;
     }
     const double turn = geo_normalised_bearing(bearing1 - bearing2);
@@ -106,7 +107,7 @@ double geo_vector_direction(geo_vector& v) {
 
 namespace {
 
-/// Angle of slope over a run; a run that is too short, backwards or NaN is vertical.
+/// Angle of slope over a run; vertical for a run that is too short, negative or NaN.
 double slope_angle(double rise, double run) {
     if (run > VERTICAL_RUN) {
         return std::atan2(rise, run);
@@ -140,12 +141,12 @@ void geo_vector_add(geo_vector& a, geo_vector& b, geo_vector& sum) {
 }
 
 void geo_grid_centroid(const geo_nee& a, const geo_nee& b, geo_nee& out) {
-    // Formed apart from `out`, which may be a or b.
+    // `out` may be a or b.
     geo_nee middle = {GEO_NULL, GEO_NULL, GEO_NULL};
-    if (a.east != GEO_NULL && a.north != GEO_NULL && b.east != GEO_NULL && b.north != GEO_NULL) {
+    if (!is_null(a.east) && !is_null(a.north) && !is_null(b.east) && !is_null(b.north)) {
         middle.east = (a.east + b.east) * 0.5;
         middle.north = (a.north + b.north) * 0.5;
-        if (a.elevation != GEO_NULL && b.elevation != GEO_NULL) {
+        if (!is_null(a.elevation) && !is_null(b.elevation)) {
             middle.elevation = (a.elevation + b.elevation) * 0.5;
         }
     }

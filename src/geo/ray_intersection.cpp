@@ -7,14 +7,13 @@ using namespace basalt::geo;
 
 namespace {
 
-/// Whether a direction, counted anticlockwise from east, runs along the north axis, where its tangent is
-/// useless.
+/// Whether a direction, anticlockwise from east, runs along the north axis, where its tangent overflows.
 bool is_along_north_axis(double direction) {
     return std::abs(direction - HALF_PI) < RAY_TOLERANCE ||
            std::abs(direction - HALF_PI - PI) < RAY_TOLERANCE;
 }
 
-/// Where the lines through p1 and p2 meet that run in directions a1 and a2, which must not be parallel.
+/// Intersection of the lines through p1 and p2 in directions a1 and a2, not parallel.
 geo_nee meet_of_lines(const geo_nee& p1, const geo_nee& p2, double a1, double a2) {
     if (is_along_north_axis(a1)) {
         return {std::tan(a2) * (p1.east - p2.east) + p2.north, p1.east, GEO_NULL};

@@ -15,11 +15,11 @@ constexpr double RADIANS_PER_DEGREE = 0.017453292519943295;
 constexpr double METRES_PER_FOOT = 0.3048006096012192;
 constexpr double INCHES_PER_FOOT = 12.0;
 constexpr double SECONDS_ROUNDING = 5e-6;
-/// A bearing this large is 160,000 turns away, the most that are taken off one by one.
+/// Larger angles are first reduced by fmod; radians. 160,000 steps of 2 pi.
 constexpr double MOST_STEPPED = 1e6;
 constexpr std::uint32_t LARGEST_FINITE_FACTORIAL = 170;
 
-/// Whole part of a value above -1: the largest integer for one that is larger still, 0 for NaN.
+/// Whole part of a value above -1, clamped to the largest int; 0 for NaN.
 int whole_part(double value) {
     constexpr double FIRST_TOO_LARGE = 2147483648.0;
     if (value < FIRST_TOO_LARGE) {
@@ -28,8 +28,8 @@ int whole_part(double value) {
     return std::isnan(value) ? 0 : std::numeric_limits<int>::max();
 }
 
-/// Numerator of the fraction of an inch, rounded to the nearest 1 / denominator. The remainder of doubles is
-/// exact, so no integer has to hold all the parts of a length.
+/// Numerator of the fraction of an inch, rounded to the nearest 1 / denominator. By fmod, which is exact: an
+/// int would overflow.
 int fraction_numerator(double inches, int denominator) {
     const double rest = std::fmod(std::trunc(denominator * inches + 0.5), denominator);
     return std::isnan(rest) ? 0 : static_cast<int>(rest);
@@ -94,7 +94,7 @@ void _ftintom(int feet, double inches, int numerator, int denominator, double* m
 }
 
 double _normalisedbearing(double angle) {
-    if (angle == GEO_NULL || !std::isfinite(angle)) {
+    if (basalt::is_null(angle) || !std::isfinite(angle)) {
         return angle;
     }
     return to_one_turn(std::abs(angle) > MOST_STEPPED ? std::fmod(angle, TWO_PI) : angle);

@@ -34,14 +34,14 @@ Matrix north_east_up(const geo_llh& at) {
     return {frame.north, frame.east, frame.up};
 }
 
-/// By a metre north, east and up latitude and longitude change by 1 over the radii of their circles.
+/// Latitude and longitude change by 1 over the radii of their circles per metre.
 Matrix latitude_longitude_height(const geo_llh& at) {
     double meridian = 0.0;
     double prime_vertical = 0.0;
     _wgs84curvature(at.latitude, meridian, prime_vertical);
     const LocalFrame frame = frame_at(at);
     geo_vector longitude = over(frame.east, (prime_vertical + at.height) * std::cos(at.latitude));
-    longitude.z = 0.0;  // on the axis too, where nothing divided by nothing is no number
+    longitude.z = 0.0;  // on the axis too, where 0 / 0 gave NaN
     return {over(frame.north, meridian + at.height), longitude, frame.up};
 }
 

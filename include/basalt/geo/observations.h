@@ -1,6 +1,6 @@
 /// @file
-/// Observations, their reduction to grid points, and following a bearing. What holds for all of survey
-/// geometry is said in basalt/geo.h.
+/// Observations, their reduction to grid points, and following a bearing. Common rules (units, bad
+/// input, threads): basalt/geo.h.
 #ifndef BASALT_GEO_OBSERVATIONS_H
 #define BASALT_GEO_OBSERVATIONS_H
 
@@ -9,22 +9,22 @@
 
 /// @name Observations
 /// The scale factor multiplies the horizontal distance in both directions: from the ground to the grid in
-/// geo_reduce_obs(), and from the grid to the observation in geo_calc_obs(). To undo a reduction, hand its
+/// geo_reduce_obs(), and from the grid to the observation in geo_calc_obs(). To undo a reduction, pass its
 /// reciprocal to geo_calc_obs().
 /// @{
 
-/// Brings an observation of the second face to its equivalent on the first: the zenith angle is folded from
-/// beyond pi to 2 pi less itself, the horizontal angle turned by half a turn.
+/// Converts an observation of the second face to the first: a zenith angle v beyond pi becomes 2 pi - v, and
+/// the horizontal angle turns by pi.
 /// @param obs changed in place; radians and metres. A zenith angle up to and including pi leaves it as it is.
 /// @return the same record
 ///
 /// Bad input: with a zenith angle of #GEO_NULL nothing changes, and a horizontal angle of #GEO_NULL stays. A
-/// NaN zenith angle turns the horizontal angle. One beyond 2 pi is folded as well, to a negative angle.
+/// NaN zenith angle still turns the horizontal angle. One beyond 2 pi becomes negative.
 BASALT_API geo_hvd& geo_normalise_obs(geo_hvd& obs);
 
 /// Grid point that an observation measures.
 /// @param obs bearing and zenith angle in radians, slope distance in metres
-/// @param station where it was taken; may be `out`
+/// @param station point of the instrument; may be `out`
 /// @param heightOffset metres, added to the elevation: height of instrument less height of target
 /// @param[out] out the point; all #GEO_NULL when a field of `obs` is
 /// @param scaleFactor grid distance over horizontal distance, 1 for none

@@ -1,5 +1,5 @@
 /// @file
-/// Plane measures and predicates. What holds for all of survey geometry is said in basalt/geo.h.
+/// Plane measures and predicates. Common rules (units, bad input, threads): basalt/geo.h.
 #ifndef BASALT_GEO_PLANE_H
 #define BASALT_GEO_PLANE_H
 
@@ -14,11 +14,11 @@
 /// @return the normalised bearing. A negative angle so small that adding 2 pi rounds to 2 pi gives 0; -0
 /// stays -0.
 ///
-/// Bad input: #GEO_NULL, NaN and angles beyond +-100 come back unchanged.
+/// Bad input: #GEO_NULL, NaN and angles beyond +-100 are returned unchanged.
 BASALT_API double geo_normalised_bearing(double angle);
 
 /// Horizontal distance between two points: sqrt(de^2 + dn^2), metres, not negative.
-/// Squares under- and overflow: right for distances from 1e-150 to 1e150 m.
+/// Valid from 1e-150 to 1e150 m, where no square underflows or overflows.
 BASALT_API double geo_horz_dist(const geo_nee& a, const geo_nee& b);
 
 /// Square of the horizontal distance between two points: de^2 + dn^2, square metres.
@@ -37,7 +37,7 @@ BASALT_API double geo_slope_dist(const geo_nee& a, const geo_nee& b);
 BASALT_API int nee_equal(const geo_nee& a, const geo_nee& b);
 
 /// Whether two distances, in metres, are equal within 0.5 mm (strictly less), or both are #GEO_NULL.
-/// A single #GEO_NULL takes part as its value, which is next to 0.
+/// A single #GEO_NULL counts as its value, which is next to 0.
 ///
 /// Bad input: as for nee_equal().
 BASALT_API bool geo_dist_equal(double a, double b);
@@ -105,12 +105,50 @@ BASALT_API double geo_vector_x_component_gradient(geo_vector& v);
 /// Angle of slope of a local vector seen along y; as geo_vector_x_component_gradient() with y in place of x.
 BASALT_API double geo_vector_y_component_gradient(geo_vector& v);
 
-/// Turns a vector round in place: negates x, y and z.
+/// Reverses a vector in place: negates x, y and z.
 /// @return the same record
 BASALT_API geo_vector& geo_vector_reverse(geo_vector& v);
 
 /// Sum of two vectors, component by component, into `sum`.
 BASALT_API void geo_vector_add(geo_vector& a, geo_vector& b, geo_vector& sum);
+
+/// @}
+/// @name Vector measures of constants
+/// The functions above for vectors that may not be written.
+/// @{
+inline double geo_vector_length(const geo_vector& a, const geo_vector& b) {
+    geo_vector va = a;
+    geo_vector vb = b;
+    return geo_vector_length(va, vb);
+}
+inline double geo_vector_len(const geo_vector& v) {
+    geo_vector copy = v;
+    return geo_vector_len(copy);
+}
+inline double geo_vector_direction(const geo_vector& v) {
+    geo_vector copy = v;
+    return geo_vector_direction(copy);
+}
+inline double geo_vector_gradient(const geo_vector& v) {
+    geo_vector copy = v;
+    return geo_vector_gradient(copy);
+}
+inline double geo_vector_x_component_gradient(const geo_vector& v) {
+    geo_vector copy = v;
+    return geo_vector_x_component_gradient(copy);
+}
+inline double geo_vector_y_component_gradient(const geo_vector& v) {
+    geo_vector copy = v;
+    return geo_vector_y_component_gradient(copy);
+}
+inline void geo_vector_add(const geo_vector& a, const geo_vector& b, geo_vector& sum) {
+    geo_vector va = a;
+    geo_vector vb = b;
+    geo_vector_add(va, vb, sum);
+}
+/// @}
+/// @name More plane measures
+/// @{
 
 /// Midpoint of two points.
 /// @param a one point
@@ -131,9 +169,9 @@ BASALT_API double geo_triangle_area(const geo_nee& a, const geo_nee& b, const ge
 /// Whether a point lies in a polygon: even-odd rule, by a ray from the point towards increasing east.
 /// @param n count of vertices; 1 and 2 enclose nothing but their vertices, to within rounding
 /// @param polygon vertices in either order; the outline may cross or touch itself
-/// @param point the point asked about
-/// @return 1 inside or exactly on a vertex, else 0. A point on an edge gets what the rounded crossings give;
-/// use geo_point_in_poly_2() where the outline belongs to the polygon.
+/// @param point the point to test
+/// @return 1 inside or exactly on a vertex, else 0. On an edge the rounding decides; use
+/// geo_point_in_poly_2() where the outline belongs to the polygon.
 ///
 /// Bad input: an edge with NaN in it is not crossed; a point with NaN is outside.
 ///
@@ -143,20 +181,20 @@ BASALT_API int geo_point_in_poly(int n, const geo_nee* polygon, const geo_nee* p
 /// Whether a point lies in a polygon or within a tolerance of its outline.
 /// @param n count of vertices
 /// @param polygon vertices in either order
-/// @param point the point asked about
+/// @param point the point to test
 /// @param tolerance width of the band along every edge, metres; its ends are square, as in
 /// geo_point_on_line()
 /// @return 1 inside or in the band, else 0
 ///
-/// Bad input: a negative or NaN tolerance leaves the crossings alone (no exact vertex test here); otherwise
-/// as geo_point_in_poly() and geo_point_on_line().
+/// Bad input: with a negative or NaN tolerance only the crossings count (there is no exact vertex test here);
+/// otherwise as geo_point_in_poly() and geo_point_on_line().
 BASALT_API int geo_point_in_poly_2(int n, const geo_nee* polygon, const geo_nee* point, double tolerance);
 
 /// Whether a point lies within a tolerance of the segment a-b: in the rectangle that reaches `tolerance`
 /// beyond either end and to either side.
 /// @param a start; when it equals b, the rectangle is a square along the grid
 /// @param b end
-/// @param point the point asked about
+/// @param point the point to test
 /// @param tolerance metres; all bounds are inclusive. With 0, rounding misses most points on an oblique
 /// segment: give at least a few units in the last place of the coordinates, 1e-6 m on national grids.
 /// @return 1 or 0
@@ -168,7 +206,7 @@ BASALT_API int geo_point_on_line(const geo_nee& a, const geo_nee& b, const geo_n
 /// last vertex back to the first.
 /// @param n count of vertices, and of segments
 /// @param vertices the chain; of segments of length 0 only the ends count
-/// @param point the point asked about
+/// @param point the point to test
 /// @param tolerance metres, exclusive: distance to the line below it, and squared distance to both ends below
 /// squared length plus squared tolerance. A vertex always matches exactly, whatever the tolerance.
 /// @return 1 or 0
@@ -176,7 +214,7 @@ BASALT_API int geo_point_on_line(const geo_nee& a, const geo_nee& b, const geo_n
 /// Bad input: with a negative or NaN tolerance only exact vertices match.
 BASALT_API int geo_point_on_polyline(int n, const geo_nee* vertices, const geo_nee* point, double tolerance);
 
-/// Whether segment p1-p2 crosses segment q1-q2, by the sides their ends lie on.
+/// Whether segment p1-p2 crosses segment q1-q2, by the sides on which their ends lie.
 /// @return 1 or 0. An end exactly on the other line counts to one fixed side of it, so a touch is a crossing
 /// or not depending on the directions; collinear segments never cross.
 ///

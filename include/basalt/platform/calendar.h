@@ -6,18 +6,7 @@
 
 #include "basalt/export.h"
 #include "basalt/platform/types.h"
-
-/// A date and a time of day.
-struct SYSTEMTIME {
-    WORD wYear;          ///< 1601 to 30827, as an automation date 100 to 9999; 30828 may come out of a count
-    WORD wMonth;         ///< 1 to 12
-    WORD wDayOfWeek;     ///< 0 (Sunday) to 6; never read
-    WORD wDay;           ///< 1 to 31
-    WORD wHour;          ///< 0 to 23
-    WORD wMinute;        ///< 0 to 59
-    WORD wSecond;        ///< 0 to 59
-    WORD wMilliseconds;  ///< 0 to 999
-};
+#include "basalt/system_time.h"
 
 /// Ticks of 100 nanoseconds since the beginning of 1601, a 64-bit count in two halves.
 struct FILETIME {
@@ -25,7 +14,7 @@ struct FILETIME {
     DWORD dwHighDateTime;  ///< high 32 bits
 };
 
-static_assert(sizeof(SYSTEMTIME) == 16 && sizeof(FILETIME) == 8, "platform records keep their sizes");
+static_assert(sizeof(FILETIME) == 8, "platform records keep their sizes");
 
 /// Ticks of a date and time of day.
 /// @param time the time, not null; its day of the week is not read

@@ -208,9 +208,9 @@ void time_scales(Numbers& in, Input& input) {
     const std::uint64_t milliseconds = input.double_word();
     require(_javatime2systemtime(milliseconds, &time) == &time);
     _systime2javatime(&time);
-    for (WORD* const field :
+    for (std::uint16_t* const field :
          {&time.wYear, &time.wMonth, &time.wDay, &time.wHour, &time.wMinute, &time.wMilliseconds}) {
-        *field = static_cast<WORD>(input.word());
+        *field = static_cast<std::uint16_t>(input.word());
     }
     _systime2javatime(&time);
 }

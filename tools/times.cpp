@@ -129,10 +129,10 @@ void write_javatime(Fields& fields, Row& row) {
     time.wDay = date.day;
     // A time of three decimals is not to lose its last millisecond to its binary form.
     const auto milliseconds = static_cast<std::int64_t>(moment.seconds.value_or(0) * 1000 + 1e-4);
-    time.wHour = static_cast<WORD>(milliseconds / 3'600'000);
-    time.wMinute = static_cast<WORD>(milliseconds / 60'000 % 60);
-    time.wSecond = static_cast<WORD>(milliseconds / 1000 % 60);
-    time.wMilliseconds = static_cast<WORD>(milliseconds % 1000);
+    time.wHour = static_cast<std::uint16_t>(milliseconds / 3'600'000);
+    time.wMinute = static_cast<std::uint16_t>(milliseconds / 60'000 % 60);
+    time.wSecond = static_cast<std::uint16_t>(milliseconds / 1000 % 60);
+    time.wMilliseconds = static_cast<std::uint16_t>(milliseconds % 1000);
     row.whole(static_cast<std::int64_t>(_systime2javatime(&time)));
 }
 

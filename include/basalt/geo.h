@@ -5,12 +5,12 @@
 /// [0, 2 pi). Arguments may alias: a record written may be one of those read.
 ///
 /// Bad input: unless a function says otherwise, NaN gives NaN (a measure) or 0 (a predicate), infinities and
-/// overflow follow IEEE arithmetic, and a field equal to #GEO_NULL counts as the number it is. Every call ends
-/// after a bounded number of steps; none throws or allocates.
+/// overflow follow IEEE arithmetic, and a field equal to #GEO_NULL counts as the number it is. Every call
+/// ends after a bounded number of steps; none throws or allocates.
 ///
 /// Accuracy: results follow the stated formulas in double precision, operation by operation. On the ellipsoid
-/// (conversions, frames, geodesics, variances) shorter formulas may differ in the last digits. Results without
-/// trigonometry are the same bit for bit on every compiler and processor.
+/// (conversions, frames, geodesics, variances) shorter formulas may differ in the last digits. Results
+/// without trigonometry are the same bit for bit on every compiler and processor.
 ///
 /// Threads: every function is reentrant.
 #ifndef BASALT_GEO_H

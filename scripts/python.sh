@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # Builds the Python package into an environment of its own below build/python, and runs its tests.
 # Usage: scripts/python.sh [pytest options]
-#        scripts/python.sh bench                 measures batch calls beside plain C++ loops
+#        scripts/python.sh bench                 measures batch calls beside NumPy, pyproj and shapely
 #        scripts/python.sh plot [GRID [PICTURE]]  draws the sample terrain, or another, into build/python/terrain.png
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
@@ -14,7 +14,10 @@ work=build/python
 python=$PWD/$work/environment/bin/python
 $python -m pip install --quiet --no-build-isolation --no-index --no-deps --force-reinstall bindings/python
 case ${1:-} in
-    bench) "$python" bindings/python/bench/batch.py ;;
+    bench)
+        need_packages python3-pyproj python3-shapely proj-data
+        PROJ_DATA=/usr/share/proj "$python" bindings/python/bench/batch.py
+        ;;
     plot)
         need_packages python3-matplotlib
         shift

@@ -64,8 +64,46 @@ void plain_calculate(const geo_nee& from, double from_height, const geo_nee& to,
     out.distance = std::sqrt(hd * hd + dz * dz);
 }
 
-void plain_deltas(double length, double constant, double tolerance, double& x, double& y) {
-    plain::spiral_deltas(length, constant, tolerance, x, y);
+void plain_deltas(double l, double k, double tolerance, double& x, double& y) {
+    const double q = l * l * l * l / (k * k);
+    x = l;
+    double t = l;
+    double sign = -1.0;
+    double m = 2.0;
+    double divisor = 5.0;
+    while (true) {
+        t = t * q / ((m - 1.0) * m);
+        x = x + sign * t / divisor;
+        sign = -sign;
+        if (std::fabs(t / divisor) < tolerance) {
+            break;
+        }
+        divisor = divisor + 4.0;
+        m = m + 2.0;
+        if (divisor >= 41.0) {
+            x = y = 2e-308;
+            return;
+        }
+    }
+    double s = l * l * l / k;
+    y = s / 3.0;
+    sign = -1.0;
+    m = 3.0;
+    divisor = 7.0;
+    while (true) {
+        s = s * q / ((m - 1.0) * m);
+        y = y + sign * s / divisor;
+        sign = -sign;
+        if (std::fabs(s / divisor) < tolerance) {
+            return;
+        }
+        divisor = divisor + 4.0;
+        m = m + 2.0;
+        if (divisor >= 41.0) {
+            x = y = 2e-308;
+            return;
+        }
+    }
 }
 
 bool same_bits(double a, double b) {

@@ -1,5 +1,5 @@
-// The predicates and the spiral series written out as slow, obvious loops, and a generator that gives the
-// same numbers on every compiler. The library's forms are held against these.
+// The predicates as slow, obvious loops to compare the library with, and a generator that gives the same
+// numbers on every compiler.
 #ifndef BASALT_TESTS_GEO_PLAIN_FORMS_H
 #define BASALT_TESTS_GEO_PLAIN_FORMS_H
 
@@ -110,48 +110,6 @@ inline int lines_cross(const geo_nee& p1, const geo_nee& p2, const geo_nee& q1, 
     return (side_q(q1) > side_q(p1)) != (side_q(q1) > side_q(p2)) ? 1 : 0;
 }
 
-inline void spiral_deltas(double l, double k, double tolerance, double& x, double& y) {
-    const double q = l * l * l * l / (k * k);
-    x = l;
-    double t = l;
-    double sign = -1.0;
-    double m = 2.0;
-    double divisor = 5.0;
-    while (true) {
-        t = t * q / ((m - 1.0) * m);
-        x = x + sign * t / divisor;
-        sign = -sign;
-        if (std::fabs(t / divisor) < tolerance) {
-            break;
-        }
-        divisor = divisor + 4.0;
-        m = m + 2.0;
-        if (divisor >= 41.0) {
-            x = y = 2e-308;
-            return;
-        }
-    }
-    double s = l * l * l / k;
-    y = s / 3.0;
-    sign = -1.0;
-    m = 3.0;
-    divisor = 7.0;
-    while (true) {
-        s = s * q / ((m - 1.0) * m);
-        y = y + sign * s / divisor;
-        sign = -sign;
-        if (std::fabs(s / divisor) < tolerance) {
-            return;
-        }
-        divisor = divisor + 4.0;
-        m = m + 2.0;
-        if (divisor >= 41.0) {
-            x = y = 2e-308;
-            return;
-        }
-    }
-}
-
 /// Knuth's MMIX generator; the low bits are poor, so the high ones are used.
 class Random {
 public:
@@ -165,8 +123,7 @@ public:
     /// In [low, high); exact steps of 2^-32 of the range.
     double real(double low, double high) { return low + (high - low) * (bits() * 0x1p-32); }
 
-    /// A number that provokes: a grid value shared by many, one a unit in the last place beside it, one that
-    /// is no grid value, an extreme, or not a number.
+    /// A grid value shared by many, one a unit in the last place beside it, another number, or an extreme.
     double awkward() {
         static constexpr double EXTREMES[] = {
             0.0, -0.0, 5e-324,       GEO_NULL, 1e-200,  1e154, 1e160,     -1.7e308, 1.7e308,

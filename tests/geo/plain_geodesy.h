@@ -1,5 +1,5 @@
-// The conversions and geodesics written out step by step, one library call for each sine, root and power. The
-// fast forms are held against these.
+// The conversions and geodesics step by step, one library call for each sine, root and power, to compare the
+// fast forms with.
 #ifndef BASALT_TESTS_GEO_PLAIN_GEODESY_H
 #define BASALT_TESTS_GEO_PLAIN_GEODESY_H
 
@@ -55,7 +55,9 @@ inline int llh2xyz(const geo_llh& g, geo_vector& v) {
     return 1;
 }
 
-inline void direct(geo_llh start, double azimuth, double s, double& final_azimuth, geo_llh& end) {
+/// False when rounding decides how many passes it makes.
+inline bool direct(geo_llh start, double azimuth, double s, double& final_azimuth, geo_llh& end) {
+    bool is_clear = true;
     const double f = 0.0033528106647474805;
     const double sin_a1 = std::sin(azimuth);
     const double cos_a1 = std::cos(azimuth);
@@ -84,6 +86,8 @@ inline void direct(geo_llh start, double azimuth, double s, double& final_azimut
                            b / 6.0 * cos_2m * (4.0 * sin_s * sin_s - 3.0) * (4.0 * cos_2m * cos_2m - 3.0)));
         previous = sigma;
         sigma = s / (6356752.3142 * a) + change;
+        is_clear =
+            is_clear && std::fabs(std::fabs(sigma - previous) - 1e-12) > 1e-14 * (1.0 + std::fabs(sigma));
     }
     const double t = sin_u * sin_s - cos_u * cos_s * cos_a1;
     final_azimuth = std::atan2(sin_a, -t);
@@ -95,6 +99,7 @@ inline void direct(geo_llh start, double azimuth, double s, double& final_azimut
     end.longitude =
         start.longitude + lambda -
         (1.0 - k) * f * sin_a * (sigma + k * sin_s * (cos_2m + k * cos_s * (2.0 * cos_2m * cos_2m - 1.0)));
+    return is_clear;
 }
 
 /// Cross-track by steps of at most a metre. `passes` holds the most it may make and then those it made; a

@@ -1,0 +1,175 @@
+// Laws that hold for any input of a kind, on random ones.
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cmath>
+
+#include "basalt/geo.h"
+#include "src/geo/cross_track.h"
+#include "tests/geo/calls.h"
+#include "tests/geo/plain_forms.h"
+
+namespace {
+
+using namespace plain;
+using basalt::geo::cross_track;
+using geo_calls::results;
+
+geo_llh ahead(const geo_llh& from, double azimuth, double distance, double* at_end = nullptr) {
+    geo_llh end = {};
+    geo_vincenty_direct(from, azimuth, distance, at_end != nullptr ? *at_end : azimuth, end);
+    return end;
+}
+
+geo_vector cartesian(const geo_llh& llh) {
+    geo_vector xyz = {};
+    EXPECT_EQ(_llh2xyz(&llh, &xyz), 1);
+    return xyz;
+}
+
+TEST(GeometryLaws, ABearingLiesInOneTurn) {
+    Random random(11);
+    for (int i = 0; i < 20000; ++i) {
+        const double angle = random.real(-100.0, 100.0);
+        const double bearing = geo_normalised_bearing(angle);
+        ASSERT_TRUE(bearing >= 0.0 && bearing < 2 * PI) << angle;
+        ASSERT_NEAR(std::remainder(bearing - angle, 2 * PI), 0.0, 2e-13) << angle;
+        ASSERT_EQ(_normalisedbearing(angle), bearing);
+        const double far = random.real(-1e6, 1e6) * (i % 32 == 0 ? 1e290 : 0.001);
+        ASSERT_TRUE(_normalisedbearing(far) >= 0.0 && _normalisedbearing(far) < 2 * PI) << far;
+    }
+}
+
+TEST(GeometryLaws, SecondsNeverShowSixty) {
+    for (int minute = 0; minute < 360 * 60; ++minute) {
+        const auto dms = results<_radtodms>({_degtorad(minute / 60.0) - 1e-12});  // 2e-7 seconds short
+        ASSERT_EQ(dms[0] * 60 + dms[1], minute);
+        ASSERT_NEAR(dms[2], 0.0, 1e-6);
+    }
+}
+
+TEST(GeometryLaws, FeetAndInchesReturnWithinHalfAFraction) {
+    Random random(7);
+    constexpr double INCH = 0.3048006096012192 / 12.0;
+    for (int i = 0; i < 20000; ++i) {
+        const double metres = random.real(0.0, 1000.0);
+        const auto f = results<_mtoftin>({metres, 64});  // positive, feet, inches, numerator, denominator
+        const double back = results<_ftintom>({f[1], std::floor(f[2]), f[3], f[4]})[0];
+        // A fraction that rounds up to a whole inch is shown as none.
+        const double carry = f[4] == 0 && f[2] - std::floor(f[2]) > 0.5 ? INCH : 0.0;
+        ASSERT_NEAR(back + carry, metres, INCH / 128 + 1e-12) << metres;
+    }
+}
+
+TEST(GeometryLaws, RaysMeetAtTheTargetSightedFromTwoStations) {
+    Random random(7);
+    for (int i = 0; i < 5000; ++i) {
+        const auto point = [&] { return geo_nee{random.real(0, 1000), random.real(0, 1000), 0.0}; };
+        const geo_nee p1 = point(), p2 = point(), target = point();
+        const double angle = geo_grid_divergence(target, p1, target, p2);
+        if (angle < 0.05 || angle > PI - 0.05) {
+            continue;
+        }
+        const double bearing1 = geo_grid_bearing(p1, target);
+        const double bearing2 = geo_grid_bearing(p2, target);
+        geo_nee out = {};
+        ASSERT_EQ(geo_grid_bb_intersect(p1, p2, bearing1, bearing2, out), 1);
+        ASSERT_LT(geo_horz_dist(out, target), 2e-7);
+        ASSERT_EQ(geo_grid_bb_intersect(p1, p2, bearing1 + PI, bearing2, out), 0);
+    }
+}
+
+TEST(GeometryLaws, TheGreatCircleIsThatOfVectorsOnTheSphere) {
+    Random random(10);
+    for (int i = 0; i < 5000; ++i) {
+        const geo_llh a = {random.real(-1.5, 1.5), random.real(-PI, PI), 0};
+        const geo_llh b = {random.real(-1.5, 1.5), random.real(-PI, PI), 0};
+        const auto unit = [](const geo_llh& g) {
+            return geo_vector{std::cos(g.latitude) * std::cos(g.longitude),
+                              std::cos(g.latitude) * std::sin(g.longitude), std::sin(g.latitude)};
+        };
+        const geo_vector u = unit(a), v = unit(b);
+        const double angle = 2 * std::asin(geo_vector_length(u, v) / 2);
+        ASSERT_NEAR(geo_vincenty_distance(a, b), 6371000.0 * angle, 0.01);
+        const double east = -std::sin(a.longitude) * v.x + std::cos(a.longitude) * v.y;
+        const double north = (v.z - std::cos(angle) * u.z) / std::cos(a.latitude);
+        ASSERT_NEAR(std::sin(geo_vincenty_bearing(a, b)) * std::sin(angle), east, 1e-10);
+        ASSERT_NEAR(std::cos(geo_vincenty_bearing(a, b)) * std::sin(angle), north, 1e-10);
+        const geo_llh opposite = {-a.latitude, a.longitude + PI, 0};
+        ASSERT_NEAR(geo_vincenty_distance(a, opposite), 6371000.0 * PI, 0.3);  // never NaN
+    }
+}
+
+TEST(CrossTrack, SettlesWhereStepsOfAMetreNeverDo) {
+    Random random(32);
+    for (const double off : {2e-6, 1e-4, 3e-3, 0.02, 0.1, 0.3, 0.5}) {
+        for (int i = 0; i < 500; ++i) {
+            const geo_llh a = {random.real(-1.4, 1.4), random.real(-PI, PI), 0};
+            const geo_llh b = ahead(a, random.real(-PI, PI), 50000);
+            double azimuth = 0;
+            const geo_llh foot = ahead(a, geo_vincenty_bearing(a, b), random.real(-500, 5000), &azimuth);
+            const double right = i % 2 == 0 ? off : -off;
+            int passes = 0;
+            const double d = cross_track(a, b, ahead(foot, azimuth + PI / 2, right), passes);
+            // Sphere and ellipsoid differ by up to 0.7 %, coordinates resolve some nanometres.
+            ASSERT_NEAR(d, -right, 0.007 * off + 5e-9);
+            ASSERT_LE(passes, 8);
+        }
+    }
+}
+
+TEST(CrossTrack, TakesAFewPassesAnywhere) {
+    Random random(33);
+    int passes = 0;
+    for (int i = 0; i < 20000; ++i) {
+        const auto anywhere = [&] { return geo_llh{std::asin(random.real(-1, 1)), random.real(-PI, PI), 0}; };
+        const geo_llh start = anywhere(), towards = anywhere(), p = anywhere();
+        const double d = cross_track(start, towards, p, passes);
+        ASSERT_LE(passes, 20);
+        // On the sphere: sine of the distance over sine of the angle. The ellipsoid's line strays from it.
+        const double swing = geo_vincenty_bearing(start, p) - geo_vincenty_bearing(start, towards);
+        const double sine = std::sin(geo_vincenty_distance(start, p) / 6371000.0) * std::sin(swing);
+        ASSERT_NEAR(d, -6371000.0 * std::asin(sine), 90e3);
+    }
+}
+
+// The covariance d d^T of an error along one direction d becomes that of the error's own components, and
+// these are the moves along circles of the radii of curvature.
+TEST(GeometryLaws, VariancesFollowAnErrorAlongADirection) {
+    Random random(3);
+    using Six = std::array<double, 6>;
+    for (int round = 0; round < 200; ++round) {
+        const geo_llh llh = {random.real(-1.5, 1.5), random.real(-3.1, 3.1), random.real(-1e4, 2e7)};
+        const geo_vector at = cartesian(llh);
+        double m = 0.0, n = 0.0;
+        _wgs84curvature(llh.latitude, m, n);
+        const double east_radius = (n + llh.height) * std::cos(llh.latitude);
+        const geo_nee move = {random.real(-8, 8), random.real(-8, 8), random.real(-8, 8)};
+        const geo_vector moved =
+            cartesian({llh.latitude + move.north / (m + llh.height), llh.longitude + move.east / east_radius,
+                       llh.height + move.elevation});
+        geo_nee local = {};
+        _xyz2nez(&at, &moved, &local);
+        EXPECT_NEAR(local.north, move.north, 1.5e-4);
+        EXPECT_NEAR(local.east, move.east, 1.5e-4);
+        EXPECT_NEAR(local.elevation, move.elevation, 3e-5);
+        const geo_vector d = {moved.x - at.x, moved.y - at.y, moved.z - at.z};
+        const Six q = {d.x * d.x, d.y * d.y, d.z * d.z, d.x * d.y, d.x * d.z, d.y * d.z};
+        const auto expect = [&](int (*propagate)(const geo_vector*, const double*, double*), double a,
+                                double b, double c, double unit) {
+            Six out = {};
+            ASSERT_EQ(propagate(&at, q.data(), out.data()), 1);
+            const Six expected = {a * a, b * b, c * c, a * b, a * c, b * c};
+            const Six units = {unit * unit, unit * unit, 1.0,
+                               unit * unit, unit,        unit};  // of angles in metres
+            for (std::size_t i = 0; i < 6; ++i) {
+                EXPECT_NEAR(out[i], expected[i], 1e-6 * units[i]) << i;  // moves are rounded to 4e-9 m
+            }
+        };
+        expect(Varxyz2varneu, local.north, local.east, local.elevation, 1.0);
+        expect(Varxyz2varllh, local.north / (m + llh.height), local.east / east_radius, local.elevation,
+               1.0 / east_radius);
+    }
+}
+
+}  // namespace

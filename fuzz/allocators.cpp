@@ -10,7 +10,7 @@
 #include "basalt/memory.h"
 #include "basalt/platform/error.h"
 #include "fuzz/input.h"
-#include "src/platform/heap/heap_inspection.h"
+#include "tests/support/heap_inspection.h"
 
 namespace {
 

@@ -1,8 +1,7 @@
-// The roof over the families: every process-wide object with a constructor or destructor, in the one order
-// in which they come up when the library is loaded. At unload they go in the reverse order, after whatever
-// was created on first use.
+// Every process-wide object with a constructor or destructor, in the order of their construction at load.
+// They are destroyed in reverse order at unload, after the objects created at first use.
 //
-// All other process-wide state is constant-initialised where it belongs.
+// All other process-wide state is constant-initialised in its own file.
 
 #include "basalt/memory.h"
 #include "src/frame/codec_guard.h"
@@ -10,8 +9,8 @@
 
 namespace {
 
-// Ahead of everything without a priority: in a static link the host's own statics may use the shared heap
-// from their constructors, and until their destructors have run.
+// Before all objects without a priority: in a static link the host's own static objects may use the shared
+// heap in their constructors and destructors.
 constexpr int MODULE_PRIORITY = 101;
 
 constexpr basalt::frame::CodecCalls CODEC = {
@@ -25,14 +24,14 @@ constexpr basalt::frame::CodecCalls CODEC = {
 
 }  // namespace
 
-// 1. Module state of the host's application framework: there is no framework here, so nothing is kept.
+// 1. Module state of the application framework: none here.
 
 // 2. The image codec's start-up guard.
 [[gnu::init_priority(MODULE_PRIORITY)]] basalt::frame::CodecGuard basalt::frame::codec_guard(CODEC);
 
-// 3. The standard library's error categories: they come up with that library.
+// 3. The standard library's error categories: constructed with that library.
 
-// 4. The shared heap, growable. Its end releases every block still taken from it.
+// 4. The shared heap, growable. Its destruction releases every block.
 [[gnu::init_priority(MODULE_PRIORITY)]] vex_lib::vlWinHeapAllocator vex_lib::vlSharedMemoryHeap::m_heap(0);
 
-// 5. Attaching to the framework: nothing to do.
+// 5. Registration with the framework: none here.

@@ -16,10 +16,10 @@ namespace {
 
 constexpr int LONGEST_NAME = 259;  // characters
 constexpr int NUMBERS = 65'535;    // that can be drawn, from 0
-constexpr int DRAWS = 1000;        // then each in turn, so that the last free one is found
+constexpr int DRAWS = 1000;        // then all numbers in turn, so that the last free one is found
 
-// The full name of a number's file in the temporary folder as it is now; empty when there is no folder or the
-// name would not fit.
+// The full name of a number's file in the current temporary folder; empty without a folder or when it is too
+// long.
 CString file_name(std::uint16_t number) {
     const CString folder = _tempFilePath();
     CString name;
@@ -29,7 +29,7 @@ CString file_name(std::uint16_t number) {
     return name.GetLength() <= LONGEST_NAME ? name : CString();
 }
 
-// A new file, held alone and deleted when closed, and the number in its name; INVALID_HANDLE_VALUE on
+// A new file, opened exclusively and deleted when closed, and the number in its name; INVALID_HANDLE_VALUE on
 // failure.
 HANDLE create_file(std::uint16_t& number) {
     HANDLE file = INVALID_HANDLE_VALUE;
@@ -47,7 +47,7 @@ HANDLE create_file(std::uint16_t& number) {
     return file;
 }
 
-// Deletes a number's file in the temporary folder as it is now, unless somebody holds it.
+// Deletes a number's file in the current temporary folder unless it is open.
 void delete_by_number(std::uint16_t number) {
     try {
         const CString name = file_name(number);
@@ -55,11 +55,11 @@ void delete_by_number(std::uint16_t number) {
             DeleteFileW(name);
         }
     } catch (const std::exception&) {
-        // No memory for the name: clean-up finds the file, if there is one.
+        // Out of memory: CleanUp() deletes the file, if there is one.
     }
 }
 
-// Ends a search however its owner is left.
+// Closes a search at the end of its scope.
 struct SearchEnd {
     HANDLE search;
     explicit SearchEnd(HANDLE begun) : search(begun) {}
@@ -91,17 +91,17 @@ bool CMemoryMap::Create(unsigned long size) {
         return true;
     }
     Destroy();
-    // Zero like a fresh file, and like it untouched until it is used.
+    // Zeroed like a new file, and like it without touching the pages.
     m_data = std::calloc(std::max(m_size, std::uint32_t{1}), 1);
     return m_data != nullptr;
 }
 
-// Leaves what it has made so far to Destroy().
+// On failure Destroy() releases what has been made so far.
 bool CMemoryMap::create_on_file() {
     try {
         m_file = create_file(m_number);
     } catch (const std::exception&) {
-        return false;  // no memory for the name
+        return false;  // out of memory for the name
     }
     if (m_file == INVALID_HANDLE_VALUE) {
         return false;
@@ -128,8 +128,8 @@ bool CMemoryMap::Destroy() {
         m_mapping = nullptr;
     }
     if (m_file != INVALID_HANDLE_VALUE) {
-        // Closing deletes it, by the path it was made under. What has its name in today's folder and is held
-        // by nobody is stale.
+        // Closing deletes the file by its original path. A file of its name in the current folder that is not
+        // open is stale.
         CloseHandle(m_file);
         m_file = INVALID_HANDLE_VALUE;
         delete_by_number(m_number);
@@ -157,7 +157,7 @@ void CMemoryMap::CleanUp() {
             DeleteFileW(folder + L"\\" + entry.cFileName);
         } while (FindNextFileW(search, &entry) != 0);
     } catch (const std::exception&) {
-        // No memory for the names: the files stay for another time.
+        // Out of memory for the names: the files stay until the next call.
     }
 }
 

@@ -14,4 +14,13 @@
 // Threads: thread-safe; files made at the same time have different names.
 UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique, wchar_t* name);
 
+namespace basalt::platform {
+
+// Deletes the temporary files with this prefix that killed processes left in a folder: regular files of this
+// user, no links, not written for a minute and not open in any process. Reads at most 65,536 entries; errors
+// are ignored.
+void delete_abandoned_files(const wchar_t* folder, const wchar_t* prefix) noexcept;
+
+}  // namespace basalt::platform
+
 #endif

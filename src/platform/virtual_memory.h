@@ -1,9 +1,9 @@
-// Address space, and memory in it, by the platform's published names.
+// Address space, and memory in it, by the Win32 names.
 //
-// A range is reserved first, which costs address space alone, and its pages are committed and decommitted as
-// they are needed. Committed pages read as zero at first, also after a decommit; reserved ones may not be
-// touched. What is committed counts against the system's limit on memory at once, where it has one.
-// Threads: thread-safe; who works on one range from several threads keeps them apart.
+// A range is reserved first, which takes address space only; its pages are committed and decommitted as
+// needed. Committed pages read as zero at first, also after a decommit; reserved ones are not accessible.
+// Committed memory counts against the system's limit at once, where it has one. Threads: thread-safe; calls
+// on one range must not overlap in time.
 #ifndef BASALT_SRC_PLATFORM_VIRTUAL_MEMORY_H
 #define BASALT_SRC_PLATFORM_VIRTUAL_MEMORY_H
 
@@ -20,7 +20,7 @@ inline constexpr DWORD PAGE_NOACCESS = 0x01;
 inline constexpr DWORD PAGE_READWRITE = 0x04;
 
 // MEM_RESERVE with PAGE_NOACCESS: reserves at least `size` bytes, for a null address anywhere, else from the
-// address brought down to a multiple of 64 KiB; reservations start at such multiples. MEM_COMMIT with
+// address rounded down to a multiple of 64 KiB; reservations start at such multiples. MEM_COMMIT with
 // PAGE_READWRITE: commits every page that holds a byte of the range, which lies within one reservation; pages
 // already committed keep their contents. A null address reserves the range first.
 // The base of the pages, or null: ERROR_INVALID_PARAMETER for size 0 and any other combination,

@@ -5,9 +5,9 @@
 #include <set>
 
 #include "basalt/memory.h"
-#include "src/platform/heap/heap_inspection.h"
 #include "tests/faults/more_system_calls.h"
 #include "tests/faults/trial.h"
+#include "tests/support/heap_inspection.h"
 #include "tests/support/open_descriptors.h"
 
 namespace basalt::faults {

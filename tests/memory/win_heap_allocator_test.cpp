@@ -9,11 +9,10 @@
 
 #include "basalt/memory.h"
 #include "basalt/platform/error.h"
-#include "src/memory/heap_allocator.h"
-#include "src/memory/report_last_error.h"
+#include "src/memory/allocators.h"
 #include "src/platform/heap.h"
-#include "src/platform/heap/heap_inspection.h"
 #include "tests/support/debug_output.h"
+#include "tests/support/heap_inspection.h"
 #include "tests/support/system_failures.h"
 
 namespace {

@@ -14,9 +14,9 @@
 #include <vector>
 
 #include "basalt/platform/error.h"
-#include "src/platform/heap/heap_inspection.h"
 #include "src/platform/heap/sanitizer.h"
 #include "tests/platform/error_of.h"
+#include "tests/support/heap_inspection.h"
 #include "tests/support/system_failures.h"
 #include "tests/support/threads.h"
 

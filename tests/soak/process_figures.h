@@ -11,7 +11,7 @@
 #include <fstream>
 
 #include "basalt/memory.h"
-#include "src/platform/heap/heap_inspection.h"
+#include "tests/support/heap_inspection.h"
 
 namespace basalt::soak {
 

@@ -3,8 +3,8 @@
 #include <cstring>
 
 #include "basalt/memory.h"
-#include "src/platform/heap/heap_inspection.h"
 #include "tests/stress/stress.h"
+#include "tests/support/heap_inspection.h"
 
 namespace basalt::stress {
 

@@ -1,13 +1,12 @@
-// The block of a private heap: one word in front of what the caller gets.
+// The block of a private heap: a head of one word, then the payload.
 //
-//     head | payload ...                          a live block
-//     head | next | prev | unused ... | size      a free block
-//     head | next | unused ...                    a freed block in a quick list
+//     head | payload ...                          live
+//     head | next | prev | unused ... | size      free
+//     head | next | unused ...                    freed, in a quick list
 //
-// A head lies 8 bytes before a multiple of 16, so payloads are 16-byte aligned. Blocks follow each other
-// without gaps from the first to the last of a region, and no two neighbours are both free. The size at
-// the end of a free block lets its successor find it; the last block of a region has no successor and
-// keeps none, so that the far end of a fresh region is not touched.
+// A head lies 8 bytes before a multiple of 16, so payloads are 16-byte aligned. Blocks fill a region without
+// gaps, and no two neighbours are both free. The size at the end of a free block lets its successor find its
+// start; the last block of a region stores none, so that the far end of a new region is not touched.
 #ifndef BASALT_SRC_PLATFORM_HEAP_BLOCK_H
 #define BASALT_SRC_PLATFORM_HEAP_BLOCK_H
 
@@ -24,13 +23,13 @@ struct Block;
 inline constexpr std::size_t BLOCK_ALIGNMENT = 16;
 inline constexpr std::size_t HEAD_BYTES = 8;
 inline constexpr std::size_t MIN_BLOCK = 32;
-// What a region spends beside its blocks: 8 bytes before the first head, 8 after the last payload.
+// Of a region, besides its blocks: 8 bytes before the first head, 8 after the last payload.
 inline constexpr std::size_t REGION_OVERHEAD = 16;
 // Far beyond any address space, far below overflow.
 inline constexpr std::size_t MAX_REQUEST = std::size_t{1} << 46;
 
-// The parts of a head: flags in the low four bits, size of the whole block (a multiple of 16), and in the
-// top 16 bits the heap's tag while the block is live, zero while it is free, QUICK_TAG in a quick list.
+// A head: flags in the low four bits, the size of the whole block (a multiple of 16), and in the top 16 bits
+// the heap's tag while the block is live, 0 while it is free, QUICK_TAG in a quick list.
 inline constexpr std::uint64_t PREVIOUS_FREE = 1;
 inline constexpr std::uint64_t LAST_OF_REGION = 2;
 inline constexpr std::uint64_t SIZE_BITS = 0x0000'FFFF'FFFF'FFF0;
@@ -48,7 +47,7 @@ inline bool is_last(std::uint64_t head) {
     return (head & LAST_OF_REGION) != 0;
 }
 
-// Size of the block that serves a request, 0 when none can.
+// Size of the block for a request, 0 when it is too large.
 inline std::size_t block_size_for(std::size_t request) {
     if (request > MAX_REQUEST) {
         return 0;
@@ -74,7 +73,7 @@ inline Block* successor(Block* block, std::size_t size) {
     return block_at(bytes_of(block) + size);
 }
 
-// Reading and writing the words of a block: memory that the sanitizer forbids to everybody else.
+// Access to the words of a block, which are poisoned for all other code under the address sanitizer.
 [[gnu::no_sanitize_address]] inline std::uint64_t head_of(const Block* block) {
     return *reinterpret_cast<const std::uint64_t*>(block);
 }

@@ -1,8 +1,9 @@
 // The free blocks of a heap, in lists by size (two-level segregated fit: Masmano, Ripoll, Crespo and
-// Real, 2004): two bitmaps answer in constant time which list holds a block that is large enough.
+// Real, 2004): two bitmaps give a list with a large enough block in constant time.
 #ifndef BASALT_SRC_PLATFORM_HEAP_FREE_LISTS_H
 #define BASALT_SRC_PLATFORM_HEAP_FREE_LISTS_H
 
+#include <algorithm>
 #include <array>
 #include <bit>
 #include <cstddef>
@@ -68,8 +69,8 @@ public:
         }
     }
 
-    // Some block from the lists whose every block is large enough, or null. Constant time; may overlook
-    // a block in the list that the size itself belongs to.
+    // A block from the lists whose every block is large enough, or null. Constant time; does not search the
+    // list that the size itself belongs to.
     Block* find(std::size_t size) const {
         if (size >= FIRST_SPLIT) {
             const unsigned log = static_cast<unsigned>(std::bit_width(size)) - 1;
@@ -91,19 +92,38 @@ public:
         return m_first[higher][static_cast<unsigned>(std::countr_zero(unsigned{m_lists[higher]}))];
     }
 
-    // Searches the list that the size itself belongs to, giving up after so many blocks.
-    Block* find_among_equals(std::size_t size, std::size_t attempts) const;
+    // The first fit among the first blocks of the list that the size itself belongs to, or null.
+    Block* find_in_own_list(std::size_t size, std::size_t attempts) const {
+        const Place place = place_of(size);
+        Block* block = place.level < LEVELS ? first(place) : nullptr;
+        for (; block != nullptr && attempts != 0; block = next_of(block), --attempts) {
+            if (size_of(head_of(block)) >= size) {
+                return block;
+            }
+        }
+        return nullptr;
+    }
 
     // Size of the largest block, 0 without any.
-    std::size_t largest() const;
+    std::size_t largest() const {
+        if (m_levels == 0) {
+            return 0;
+        }
+        const unsigned level = static_cast<unsigned>(std::bit_width(m_levels)) - 1;
+        const unsigned list = static_cast<unsigned>(std::bit_width(unsigned{m_lists[level]})) - 1;
+        std::size_t size = 0;
+        for (Block* block = first({level, list}); block != nullptr; block = next_of(block)) {
+            size = std::max(size, size_of(head_of(block)));
+        }
+        return size;
+    }
 
-    // First block of a list; the others by next_of().
+    // First block of a list; next_of() gives the others.
     Block* first(Place place) const { return m_first[place.level][place.list]; }
 
-    // Whether the bitmaps agree with the lists.
-    bool bitmaps_agree() const;
-
 private:
+    friend class HeapInspection;
+
     static constexpr unsigned FIRST_SPLIT_LOG = std::bit_width(FIRST_SPLIT) - 1;
 
     std::uint32_t m_levels = 0;

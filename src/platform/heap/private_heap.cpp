@@ -12,27 +12,27 @@ namespace {
 
 constexpr std::uint64_t MAGIC = 0x6261'7361'6c74'4850;
 
-// Below, a block shares a region and a free costs no system call; above, its memory goes back at once.
+// Smaller blocks share regions, and freeing makes no system call; larger ones are unmapped at once.
 constexpr std::size_t SINGLE_FROM = std::size_t{1} << 20;
-// Heaps with a maximum up to this have one region, of that very size: nothing is lost between regions.
+// Heaps with a maximum up to this have one region of that size, so that none of it is lost between regions.
 constexpr std::size_t ONE_REGION_UP_TO = std::size_t{64} << 20;
 
-// The quick lists hold up to this: a bound on the time that one call spends on settling them.
+// The quick lists hold up to this: a bound on the time that one call spends on emptying them.
 constexpr std::size_t MOST_QUICK = std::size_t{256} << 10;
 
 constexpr std::size_t ATTEMPTS_BEFORE_GROWTH = 8;
 constexpr std::size_t ALL = ~std::size_t{0};
 
-// Blocks that may join up in one region must have a list.
+// Every block that can be formed in one region must have a list.
 static_assert(ONE_REGION_UP_TO < FreeLists::SIZE_LIMIT);
-static_assert(sizeof(PrivateHeap) <= SMALLEST_PAGE, "an unused heap is to cost one page");
+static_assert(sizeof(PrivateHeap) <= SMALLEST_PAGE, "an unused heap costs one page");
 
 std::size_t record_bytes() {
     const std::size_t page = page_size();
     return (sizeof(PrivateHeap) + page - 1) & ~(page - 1);
 }
 
-// Unlike the marks of blocks that are not live, and different for most heaps.
+// Different from the tags of blocks that are not live, and from most other heaps'.
 std::uint64_t tag_for(const void* heap) {
     const auto address = reinterpret_cast<std::uintptr_t>(heap);
     return (((address >> 12) * 0x9E37'79B9'7F4A'7C15) & TAG_BITS) | LIVE_BIT;
@@ -75,7 +75,7 @@ void* PrivateHeap::allocate(std::size_t size) {
         return nullptr;
     }
     const std::lock_guard guard(m_lock);
-    Block* block = need < m_single_from ? take_shared(need) : map_single_region(need);
+    Block* block = need < m_single_from ? allocate_shared(need) : allocate_single(need);
     if (block == nullptr) {
         return nullptr;
     }
@@ -94,7 +94,7 @@ DWORD PrivateHeap::release(void* payload) {
     }
     Block* block = block_of(payload);
     if (!region->single) {
-        set_aside(block);
+        free_shared(block);
         return ERROR_SUCCESS;
     }
     if (!unmap_region(*region)) {
@@ -127,7 +127,7 @@ void* PrivateHeap::resize(void* payload, std::size_t size, DWORD& error) {
             return payload_of(block);
         }
     }
-    // The caller owns the old block and nobody knows the new one: copying needs no lock.
+    // No other thread uses either block: copying needs no lock.
     void* moved = allocate(size);
     if (moved == nullptr) {
         return nullptr;
@@ -140,15 +140,15 @@ void* PrivateHeap::resize(void* payload, std::size_t size, DWORD& error) {
 
 std::size_t PrivateHeap::compact() {
     const std::lock_guard guard(m_lock);
-    settle(0);
-    // Blocks that hold no whole page between their links and their end have nothing to give.
+    empty_quick_lists(0);
+    // Smaller blocks hold no whole page between their links and their end.
     for (unsigned level = FreeLists::place_of(page_size()).level; level < FreeLists::LEVELS; ++level) {
         for (unsigned list = 0; list < FreeLists::LISTS; ++list) {
             Block* next = nullptr;
             for (Block* block = m_free.first({level, list}); block != nullptr; block = next) {
                 next = next_of(block);
                 const std::size_t size = size_of(head_of(block));
-                // A heap that was used keeps its last region, so that it has a free block to answer with.
+                // A heap that was used keeps its last region, so that it has a free block to report.
                 if (m_mapped_shared != size + REGION_OVERHEAD && drop_free_region(block)) {
                     continue;
                 }
@@ -160,7 +160,7 @@ std::size_t PrivateHeap::compact() {
     return largest == 0 ? 0 : largest - HEAD_BYTES - GUARD_BYTES;
 }
 
-// The region is looked up before the head is read, so a pointer from anywhere is answered, not followed.
+// The region is looked up before the head is read, so any pointer is safe.
 const Region* PrivateHeap::region_of_live(void* payload) const {
     const Region* region = m_regions.find(payload);
     if (region == nullptr || (reinterpret_cast<std::uintptr_t>(payload) & (BLOCK_ALIGNMENT - 1)) != 0) {
@@ -178,10 +178,10 @@ const Region* PrivateHeap::region_of_live(void* payload) const {
 
 Block* PrivateHeap::find_free(std::size_t need) {
     Block* block = m_free.find(need);
-    return block != nullptr ? block : m_free.find_among_equals(need, ATTEMPTS_BEFORE_GROWTH);
+    return block != nullptr ? block : m_free.find_in_own_list(need, ATTEMPTS_BEFORE_GROWTH);
 }
 
-Block* PrivateHeap::take_shared(std::size_t need) {
+Block* PrivateHeap::allocate_shared(std::size_t need) {
     if (need < QuickLists::SIZE_LIMIT) {
         if (Block* block = m_quick.take(need, m_tag)) {
             m_live_shared += need;
@@ -190,46 +190,46 @@ Block* PrivateHeap::take_shared(std::size_t need) {
     }
     Block* block = find_free(need);
     if (block == nullptr && m_quick.bytes() != 0) {
-        settle(0);
+        empty_quick_lists(0);
         block = find_free(need);
     }
     if (block == nullptr) {
-        block = map_shared_region(need);
+        block = add_shared_region(need);
     }
     if (block == nullptr) {
-        // Nothing is left to map: now a longer search is worth its time.
-        block = m_free.find_among_equals(need, ALL);
+        // No more can be mapped: now a longer search pays.
+        block = m_free.find_in_own_list(need, ALL);
     }
     if (block != nullptr) {
-        carve(block, need);
+        split(block, need);
     }
     return block;
 }
 
 // Frees a live block of a shared region.
-void PrivateHeap::set_aside(Block* block) {
+void PrivateHeap::free_shared(Block* block) {
     const std::size_t size = size_of(head_of(block));
     m_live_shared -= size;
     if (size >= QuickLists::SIZE_LIMIT) {
-        put_back(block);
+        coalesce(block);
         return;
     }
     forbid_access(block, size);
     if (size >= QuickLists::SMALL_LIMIT) {
         if (Block* before = m_quick.take_first(QuickLists::LARGE)) {
-            put_back(before);
+            coalesce(before);
         }
     }
     m_quick.insert(block, size);
-    // Wherever the blocks lie, they keep no more idle regions from being seen as such than may be kept.
+    // Blocks in quick lists hide idle regions: no more of them than may be kept.
     const std::size_t spare = m_mapped_shared - m_live_shared;
-    settle(spare <= MOST_IDLE ? MOST_QUICK : 0);
+    empty_quick_lists(spare <= MOST_IDLE ? MOST_QUICK : 0);
 }
 
-// Empties the quick lists down to so many bytes.
-void PrivateHeap::settle(std::size_t most) {
+// Coalesces blocks of the quick lists until they hold at most so many bytes.
+void PrivateHeap::empty_quick_lists(std::size_t most) {
     while (m_quick.bytes() > most) {
-        put_back(m_quick.take_any());
+        coalesce(m_quick.take_any());
     }
 }
 

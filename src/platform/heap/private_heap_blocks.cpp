@@ -1,10 +1,10 @@
-// How a private heap cuts and joins the blocks of its shared regions.
+// Splitting and coalescing the blocks of shared regions.
 #include "src/platform/heap/private_heap.h"
 
 namespace basalt::platform {
 
-// Turns a listed free block into a live one, giving back what is too much at its end.
-void PrivateHeap::carve(Block* block, std::size_t need) {
+// Makes a listed free block live; the excess at its end becomes a free block.
+void PrivateHeap::split(Block* block, std::size_t need) {
     const std::uint64_t head = head_of(block);
     std::size_t size = size_of(head);
     std::uint64_t last = head & LAST_OF_REGION;
@@ -29,13 +29,13 @@ void PrivateHeap::carve(Block* block, std::size_t need) {
     m_live_shared += size;
 }
 
-// Lists a block of a shared region that is not counted as live any more, joined with its free neighbours.
-void PrivateHeap::put_back(Block* block) {
+// Makes a block free, joined with its free neighbours. It is not counted as live any more.
+void PrivateHeap::coalesce(Block* block) {
     const std::uint64_t head = head_of(block);
     std::size_t size = size_of(head);
     std::uint64_t last = head & LAST_OF_REGION;
-    forbid_access(block, size);  // the head too: the end cut off a block had none
-    set_head(block, size);       // whatever becomes of it, it is no live block any more
+    forbid_access(block, size);  // the head too: the tail of a block that shrank had none
+    set_head(block, size);       // no longer live, even if it is joined to its predecessor
     if (last == 0) {
         Block* after = successor(block, size);
         const std::uint64_t head_after = head_of(after);
@@ -70,8 +70,8 @@ bool PrivateHeap::resize_in_place(Block* block, std::size_t need) {
         if (is_last(head) || !is_free(head_of(after)) || size_of(head) + size_of(head_of(after)) < need) {
             return false;
         }
-        // The neighbour is taken whole; the end goes back below.
-        carve(after, size_of(head_of(after)));
+        // The whole neighbour is taken; the excess is freed below.
+        split(after, size_of(head_of(after)));
         const std::uint64_t joined = head_of(after);
         set_head(after, 0);
         head = (head + size_of(joined)) | (joined & LAST_OF_REGION);
@@ -83,7 +83,7 @@ bool PrivateHeap::resize_in_place(Block* block, std::size_t need) {
         Block* tail = successor(block, need);
         set_head(tail, m_tag | rest | (head & LAST_OF_REGION));
         m_live_shared -= rest;
-        put_back(tail);
+        coalesce(tail);
     }
     return true;
 }

@@ -1,4 +1,4 @@
-// How a private heap takes regions from the system and gives them back.
+// Mapping and unmapping the regions of a private heap.
 #include <algorithm>
 #include <bit>
 #include <cstdint>
@@ -12,20 +12,23 @@ namespace {
 constexpr std::size_t SMALLEST_REGION = std::size_t{64} << 10;
 constexpr std::size_t LARGEST_REGION = std::size_t{32} << 20;
 
-// Regions that fill large pages lie on their boundaries, or the system could not use any.
+// Aligned to large pages where it holds any, so that the system can use them.
 std::byte* map_region(std::size_t size) {
     return map_pages(size, size >= LARGE_PAGE ? LARGE_PAGE : page_size());
 }
 
 }  // namespace
 
+// Whether so many bytes may be mapped under the maximum, perhaps after unmapping idle regions.
+bool PrivateHeap::make_room(std::size_t bytes) {
+    const auto fits = [&] { return bytes <= m_maximum - m_mapped; };
+    return fits() || (drop_idle_regions() && fits());
+}
+
 // A listed free block of at least this size in a new region, or null. Each region doubles the heap.
-Block* PrivateHeap::map_shared_region(std::size_t need) {
+Block* PrivateHeap::add_shared_region(std::size_t need) {
     const std::size_t least = whole_pages(need + REGION_OVERHEAD);
-    if (!admits(least) && !(drop_idle_regions() && admits(least))) {
-        return nullptr;
-    }
-    if (!m_regions.reserve_one()) {
+    if (!make_room(least) || !m_regions.reserve_one()) {
         return nullptr;
     }
     std::size_t size = has_one_region()
@@ -40,7 +43,7 @@ Block* PrivateHeap::map_shared_region(std::size_t need) {
     if (begin == nullptr) {
         return nullptr;
     }
-    // The first region stays frugal at its start: a heap with a high maximum may hold next to nothing.
+    // No large page at the start of the first region: a heap with a high maximum may hold very little.
     const std::size_t frugal = m_mapped_shared == 0 ? LARGE_PAGE : 0;
     if (size >= LARGE_PAGE + frugal) {
         prefer_large_pages(begin + frugal, size - frugal);
@@ -54,12 +57,9 @@ Block* PrivateHeap::map_shared_region(std::size_t need) {
 }
 
 // A live block in a region of its own, or null.
-Block* PrivateHeap::map_single_region(std::size_t need) {
+Block* PrivateHeap::allocate_single(std::size_t need) {
     const std::size_t size = whole_pages(need + REGION_OVERHEAD);
-    if (!admits(size) && !(drop_idle_regions() && admits(size))) {
-        return nullptr;
-    }
-    if (!m_regions.reserve_one()) {
+    if (!make_room(size) || !m_regions.reserve_one()) {
         return nullptr;
     }
     std::byte* begin = map_region(size);
@@ -67,7 +67,7 @@ Block* PrivateHeap::map_single_region(std::size_t need) {
         return nullptr;
     }
     if (size >= LARGE_PAGE) {
-        // All of it: the system moves only pages that are alike.
+        // All of it: mremap() refuses a range with different settings.
         prefer_large_pages(begin, size);
     }
     Block* block = add_region(begin, size, true);
@@ -82,14 +82,14 @@ Block* PrivateHeap::add_region(std::byte* begin, std::size_t size, bool single) 
     return block_at(begin + HEAD_BYTES);
 }
 
-// A large block keeps its region; the system moves its pages instead of copying them.
+// Resizes the region of a large block; the system moves its pages instead of copying them.
 bool PrivateHeap::resize_single(Block*& block, std::size_t need, const Region& region) {
     const Region old = region;
     const std::size_t size = whole_pages(need + REGION_OVERHEAD);
     if (size == old.size) {
         return true;
     }
-    if (size > old.size && !admits(size - old.size) && !(drop_idle_regions() && admits(size - old.size))) {
+    if (size > old.size && !make_room(size - old.size)) {
         return false;
     }
     leave_region(old.begin, old.size);
@@ -97,7 +97,7 @@ bool PrivateHeap::resize_single(Block*& block, std::size_t need, const Region& r
     if (begin == nullptr) {
         enter_region(old.begin, old.size);
         permit_access(payload_of(block), old.size - REGION_OVERHEAD - HEAD_BYTES);
-        // A smaller block than it could be is none the worse.
+        // To shrink is always possible: the block stays as large as it was.
         return size < old.size;
     }
     m_regions.erase(old.begin);
@@ -107,8 +107,7 @@ bool PrivateHeap::resize_single(Block*& block, std::size_t need, const Region& r
     return true;
 }
 
-// Whether a free block is all there is in its region. Only a region's first block lies where it does in a
-// page.
+// Whether a free block fills its region. Only the first block of a region lies at this offset in a page.
 bool PrivateHeap::is_idle_region(const Block* block) const {
     const std::uint64_t head = head_of(block);
     if (!is_free(head) || !is_last(head) ||
@@ -125,9 +124,9 @@ void PrivateHeap::keep_idle_region(Block* block, std::size_t bytes) {
     }
 }
 
-// False when there is none, or the system refuses them all.
+// False when there is none, or the system refuses to unmap any.
 bool PrivateHeap::drop_idle_regions() {
-    settle(0);
+    empty_quick_lists(0);
     const std::size_t idle_before = m_idle;
     for (std::size_t i = m_regions.all().size(); i > 0 && m_idle > 0; --i) {
         const Region& region = m_regions.all()[i - 1];
@@ -139,7 +138,7 @@ bool PrivateHeap::drop_idle_regions() {
     return m_idle < idle_before;
 }
 
-// Unmaps the region of a listed free block if the block is all there is in it.
+// Unmaps the region of a listed free block if the block fills it.
 bool PrivateHeap::drop_free_region(Block* block) {
     if (!is_idle_region(block)) {
         return false;

@@ -1,6 +1,6 @@
-// Blocks that were freed and not yet joined with their neighbours: most are asked for again soon, and are
-// then handed out as they are. Small ones are in a list for each size; of larger ones only the last is here,
-// for callers that give one back and take one in turn.
+// Freed blocks that are not yet coalesced with their neighbours: most are allocated again soon, without a
+// split. Small ones are in a list for each size; of larger ones only the last is kept, for callers that free
+// and allocate in turn.
 #ifndef BASALT_SRC_PLATFORM_HEAP_QUICK_LISTS_H
 #define BASALT_SRC_PLATFORM_HEAP_QUICK_LISTS_H
 
@@ -11,7 +11,7 @@
 
 namespace basalt::platform {
 
-// Their heads carry QUICK_TAG, so that they are neither live nor free to their neighbours.
+// Their heads have QUICK_TAG: neither live nor, to their neighbours, free.
 class QuickLists {
 public:
     static constexpr std::size_t LISTS = 34;
@@ -23,7 +23,7 @@ public:
         return size < SMALL_LIMIT ? size / BLOCK_ALIGNMENT : LARGE;
     }
 
-    // A larger one only where there is none.
+    // The list of larger ones must be empty before one is inserted.
     void insert(Block* block, std::size_t size) {
         Block*& first = m_first[list_of(size)];
         set_head(block, (head_of(block) & ~TAG_BITS) | QUICK_TAG);
@@ -32,7 +32,7 @@ public:
         m_bytes += size;
     }
 
-    // The block of this very size that came last, live with the tag; null without any.
+    // The block of exactly this size that was freed last, made live with the tag; null without any.
     Block* take(std::size_t size, std::uint64_t tag) {
         const std::size_t list = list_of(size);
         Block* block = m_first[list];
@@ -45,7 +45,7 @@ public:
         return nullptr;
     }
 
-    // Some block, the sizes taking turns; there must be one. Its head is left as it is.
+    // Some block, the lists in turn; there must be one. Its head is left as it is.
     Block* take_any() {
         while (m_first[m_turn] == nullptr) {
             m_turn = (m_turn + 1) % LISTS;
@@ -55,7 +55,7 @@ public:
         return block;
     }
 
-    // The first of a list, or null, in the same way.
+    // The first of a list, or null. Its head is left as it is.
     Block* take_first(std::size_t list) {
         Block* block = m_first[list];
         if (block != nullptr) {
@@ -67,7 +67,7 @@ public:
 
     std::size_t bytes() const { return m_bytes; }
 
-    // First block of a size; the others by next_of().
+    // First block of a list; next_of() gives the others.
     Block* first(std::size_t list) const { return m_first[list]; }
 
 private:

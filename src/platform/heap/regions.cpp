@@ -17,7 +17,7 @@ const Region* RegionTable::search(const std::byte* address) const {
     if (m_count == 0) {
         return nullptr;
     }
-    // By halves without a branch: where blocks of many regions come in any order, none could be foretold.
+    // Branchless binary search: the branches would be unpredictable.
     const Region* last_before = m_regions;
     for (std::size_t rest = m_count; rest > 1;) {
         const std::size_t half = rest / 2;
@@ -35,7 +35,7 @@ bool RegionTable::reserve_one() {
     if (m_count < m_capacity) {
         return true;
     }
-    // A capacity of whole pages: page_size() regions take sizeof(Region) pages.
+    // Whole pages: page_size() entries take sizeof(Region) pages.
     const std::size_t capacity = std::max(2 * m_capacity, page_size());
     std::byte* pages = map_pages(capacity * sizeof(Region), page_size());
     if (pages == nullptr) {

@@ -1,4 +1,4 @@
-// The table of a heap's regions, ordered by address: which region holds a pointer, if any.
+// The regions of a heap in a table ordered by address.
 #ifndef BASALT_SRC_PLATFORM_HEAP_REGIONS_H
 #define BASALT_SRC_PLATFORM_HEAP_REGIONS_H
 
@@ -23,7 +23,7 @@ public:
 
     std::span<const Region> all() const { return {m_regions, m_count}; }
 
-    // The region a pointer lies in, or null. Neighbouring calls mostly ask for the same region.
+    // The region that holds a pointer, or null. Consecutive calls mostly look for the same region.
     const Region* find(const void* pointer) const {
         const auto* address = static_cast<const std::byte*>(pointer);
         const Region& recent = m_regions[m_recent];
@@ -33,7 +33,7 @@ public:
         return search(address);
     }
 
-    // Makes sure the next insert() finds room; false when the system has no memory.
+    // Makes space for the next insert(); false when out of memory.
     bool reserve_one();
     void insert(const Region& region);
     void erase(const std::byte* begin);
@@ -41,7 +41,7 @@ public:
 private:
     const Region* search(const std::byte* address) const;
 
-    static constexpr std::size_t INLINE_REGIONS = 40;  // heaps up to about 1 GiB need no table of their own
+    static constexpr std::size_t INLINE_REGIONS = 40;  // heaps up to about 1 GiB need no further pages
 
     std::array<Region, INLINE_REGIONS> m_inline{};
     Region* m_regions = m_inline.data();

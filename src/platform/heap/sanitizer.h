@@ -1,5 +1,5 @@
-// Tells AddressSanitizer what in a heap's regions is in use, so that overruns and uses after free of heap
-// blocks are caught as they are for malloc; without the sanitizer all of it is nothing.
+// Reports the use of a heap's regions to AddressSanitizer, so that overruns and uses after free are found as
+// they are for malloc. Empty functions without the sanitizer.
 #ifndef BASALT_SRC_PLATFORM_HEAP_SANITIZER_H
 #define BASALT_SRC_PLATFORM_HEAP_SANITIZER_H
 
@@ -22,7 +22,7 @@ namespace basalt::platform {
 
 #ifdef BASALT_ADDRESS_SANITIZER
 
-// Bytes nobody may touch behind every block.
+// Poisoned bytes behind every block.
 inline constexpr std::size_t GUARD_BYTES = 16;
 
 inline void forbid_access(const void* begin, std::size_t size) {
@@ -32,7 +32,7 @@ inline void permit_access(const void* begin, std::size_t size) {
     __asan_unpoison_memory_region(begin, size);
 }
 
-// Regions are roots of the leak search: what heap blocks point to is reachable.
+// Regions are roots of the leak check: what heap blocks point to is reachable.
 inline void enter_region(const void* begin, std::size_t size) {
     __lsan_register_root_region(begin, size);
     forbid_access(begin, size);

@@ -1,6 +1,6 @@
-// One file of the block allocator, its blocks and the index of all files by address.
-#ifndef BASALT_SRC_MEMORY_VM_SEGMENT_H
-#define BASALT_SRC_MEMORY_VM_SEGMENT_H
+// A segment of the block allocator (one file and its blocks) and the index of all segments by address.
+#ifndef BASALT_SRC_MEMORY_BLOCK_ALLOCATOR_SEGMENT_H
+#define BASALT_SRC_MEMORY_BLOCK_ALLOCATOR_SEGMENT_H
 
 #include <algorithm>
 #include <cstddef>
@@ -17,19 +17,18 @@ struct vlVmAllocator::MemoryMappedFile {
     void* view = nullptr;
 };
 
-// Blocks are numbered by their place in the view. Those numbered below `carved` have been handed out at least
-// once; of these, `free_count` were given back and wait on a stack. Nothing of a block's state is touched
-// before the block is carved.
+// Blocks are numbered by their position in the view. Those below `carved` have been allocated at least once;
+// of these, `free_count` are free, on a stack.
 //
-// State is kept in chunks, taken as carving gets there: first a word of bits for each 32 blocks, set for a
-// block in use, then as many places of the stack as there are blocks.
+// State is kept in chunks, allocated as carving proceeds: a bit for each block, set while it is in use, in
+// words of 32, then as many places of the stack as there are blocks.
 struct vlVmAllocator::Segment {
     static constexpr std::uint32_t CHUNK_BLOCKS = 1U << 14;
 
-    Segment* next = nullptr;  // both in the list that holds it
+    Segment* next = nullptr;  // links of the list that holds it
     Segment* previous = nullptr;
     char* base;
-    std::uint32_t block_count;  // how many the view holds
+    std::uint32_t block_count;  // of the view
     std::uint32_t carved = 0;
     std::uint32_t free_count = 0;
     std::uint32_t chunk_count = 0;
@@ -53,7 +52,7 @@ struct vlVmAllocator::Segment {
         }
     }
 
-    // The record has room behind it for a pointer to each chunk.
+    // The record is followed by a pointer to each chunk.
     static std::size_t record_bytes(std::uint32_t block_count) {
         const std::size_t chunks = (std::size_t{block_count} + CHUNK_BLOCKS - 1) / CHUNK_BLOCKS;
         return sizeof(Segment) + chunks * sizeof(std::uint32_t*);
@@ -78,7 +77,7 @@ struct vlVmAllocator::Segment {
         return chunks()[depth / CHUNK_BLOCKS][bit_words() + depth % CHUNK_BLOCKS];
     }
 
-    // The next block to hand out, of a segment that is not full and needs no chunk.
+    // Allocates a block; the segment is not full and needs no chunk.
     std::uint32_t take() {
         if (free_count != 0) {
             const std::uint32_t block = stack_place(--free_count);
@@ -86,12 +85,12 @@ struct vlVmAllocator::Segment {
             return block;
         }
         const std::uint32_t block = carved++;
-        // The first block of a word also clears the bits of those to come.
+        // The first block of a word also clears the bits of the following ones.
         bits_of(block) = (block % 32 == 0 ? 0 : bits_of(block)) | 1U << block % 32;
         return block;
     }
 
-    // Takes a block back; false when it is not in use.
+    // Frees a block; false when it is not in use.
     bool give_back(std::uint32_t block) {
         const std::uint32_t bit = 1U << block % 32;
         if (block >= carved || (bits_of(block) & bit) == 0) {
@@ -103,7 +102,7 @@ struct vlVmAllocator::Segment {
     }
 };
 
-// All segments in the order of their addresses; the record has room behind it for `capacity` entries.
+// All segments in the order of their addresses; the record is followed by `capacity` entries.
 struct vlVmAllocator::SegmentIndex {
     struct Entry {
         std::uintptr_t base;
@@ -112,7 +111,7 @@ struct vlVmAllocator::SegmentIndex {
     std::size_t count = 0;
     std::size_t capacity;
 
-    explicit SegmentIndex(std::size_t room) : capacity(room) {}
+    explicit SegmentIndex(std::size_t most) : capacity(most) {}
 
     static std::size_t record_bytes(std::size_t capacity) {
         return sizeof(SegmentIndex) + capacity * sizeof(Entry);

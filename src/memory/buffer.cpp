@@ -1,9 +1,9 @@
+#include "basalt/memory/buffer.h"
+
 #include <cstdlib>
 #include <exception>
 #include <limits>
 #include <vector>
-
-#include "basalt/memory.h"
 
 namespace vex_lib {
 namespace {
@@ -23,7 +23,7 @@ vlVmBuffer::~vlVmBuffer() {
     Free(m_data);
 }
 
-// The room that growing to `size` takes; false when it cannot be had.
+// Rounds a size to grow to up by the step; false when the result exceeds 32 bits.
 bool vlVmBuffer::round_up(std::uint64_t& size) const {
     if (!m_step_fits || size > LARGEST_BUFFER) {
         return false;
@@ -35,7 +35,7 @@ bool vlVmBuffer::round_up(std::uint64_t& size) const {
 }
 
 void* vlVmBuffer::Alloc(std::uint64_t, std::uint64_t size) {
-    // malloc(0) may give a block, which would make the buffer neither empty nor of any size.
+    // malloc(0) may return a block; an empty buffer has none.
     if (!round_up(size) || size == 0) {
         return nullptr;
     }
@@ -84,13 +84,13 @@ void vlVmBuffer::Test() {
         for (int pass = 0; pass < 5; ++pass) {
             std::vector<Record> grown;
             for (int i = 0; i < 10'000; ++i) {
-                // NOLINTNEXTLINE(performance-inefficient-vector-operation): growing is what it is about
+                // NOLINTNEXTLINE(performance-inefficient-vector-operation): growth is the subject
                 grown.push_back({1.0, 2.0, 3.0, 1.1, 2.1, 3.1});
             }
             kept = grown;
         }
     } catch (const std::exception&) {
-        // No memory: there is nobody to tell.
+        // Out of memory: the exercise ends early.
     }
 }
 

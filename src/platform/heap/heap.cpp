@@ -8,7 +8,7 @@ using basalt::platform::whole_pages;
 
 namespace {
 
-// The heap of a valid call; otherwise null with the last error set.
+// The heap, or null with the last error set for an invalid handle or flags.
 PrivateHeap* checked(HANDLE handle, DWORD flags) {
     PrivateHeap* heap = PrivateHeap::from_handle(handle);
     if (heap == nullptr) {
@@ -29,7 +29,7 @@ HANDLE HeapCreate(DWORD options, std::size_t initialSize, std::size_t maximumSiz
         SetLastError(ERROR_INVALID_PARAMETER);
         return nullptr;
     }
-    // Within a page of 2^64 this comes to 0: no limit, as good as that one.
+    // Within a page of 2^64 this is 0: no limit, which is as good.
     PrivateHeap* heap = PrivateHeap::create(whole_pages(maximumSize));
     if (heap == nullptr) {
         SetLastError(ERROR_NOT_ENOUGH_MEMORY);

@@ -1,0 +1,140 @@
+// Walks a private heap and checks its invariants.
+#ifndef BASALT_TESTS_SUPPORT_HEAP_INSPECTION_H
+#define BASALT_TESTS_SUPPORT_HEAP_INSPECTION_H
+
+#include <algorithm>
+#include <cstddef>
+#include <mutex>
+
+#include "src/platform/heap/private_heap.h"
+
+namespace basalt::platform {
+
+struct HeapReport {
+    const char* fault = nullptr;  // the first violated invariant; null when all hold
+    std::size_t regions = 0;
+    std::size_t mapped = 0;  // bytes
+    std::size_t live_blocks = 0;
+    std::size_t free_blocks = 0;
+    std::size_t quick_blocks = 0;
+    std::size_t largest_free = 0;  // bytes of the largest request it can serve
+};
+
+// The friend of the heap's classes.
+class HeapInspection {
+public:
+    explicit HeapInspection(PrivateHeap& heap) : m_heap(heap) {
+        const std::lock_guard guard(heap.m_lock);
+        const std::byte* end_before = nullptr;
+        for (const Region& region : heap.m_regions.all()) {
+            expect(region.begin >= end_before, "regions are in order and apart");
+            end_before = region.begin + region.size;
+            check_region(region);
+        }
+        if (m_report.fault == nullptr) {
+            check_free_lists();
+            check_quick_lists();
+        }
+        expect(m_report.mapped == heap.m_mapped && m_shared == heap.m_mapped_shared,
+               "mapped bytes are counted");
+        expect(heap.m_mapped <= heap.m_maximum, "the maximum holds");
+        expect(m_live_shared == heap.m_live_shared, "live bytes are counted");
+        expect(m_idle == heap.m_idle, "bytes of idle regions are counted");
+    }
+    const HeapReport& report() const { return m_report; }
+
+private:
+    void expect(bool holds, const char* invariant) {
+        m_report.fault = holds || m_report.fault != nullptr ? m_report.fault : invariant;
+    }
+
+    void check_region(const Region& region) {
+        std::byte* const end = region.begin + region.size - HEAD_BYTES;
+        bool after_free = false;
+        std::size_t blocks = 0, live = 0;
+        for (std::byte* at = region.begin + HEAD_BYTES; at != end; ++blocks) {
+            const std::uint64_t head = head_of(block_at(at)), tag = head & TAG_BITS;
+            const std::size_t size = size_of(head);
+            if (size < MIN_BLOCK || size > static_cast<std::size_t>(end - at)) {
+                return expect(false, "a block lies within its region");
+            }
+            at += size;
+            expect(is_last(head) == (at == end), "the last block of a region is marked");
+            expect(((head & PREVIOUS_FREE) != 0) == after_free, "the successor of a free block is marked");
+            expect(!is_free(head) || !after_free, "no two neighbours are free");
+            expect(!is_free(head) || at == end || size_before(block_at(at)) == size,
+                   "a free block ends in its size");
+            expect(is_free(head) || tag == QUICK_TAG || tag == m_heap.m_tag, "a block has its heap's tag");
+            ++(is_free(head)      ? m_report.free_blocks
+               : tag == QUICK_TAG ? m_report.quick_blocks
+                                  : m_report.live_blocks);
+            if (is_free(head)) {
+                m_report.largest_free = std::max(m_report.largest_free, size - HEAD_BYTES - GUARD_BYTES);
+            } else if (tag != QUICK_TAG) {
+                live += size;
+            }
+            after_free = is_free(head);
+        }
+        expect(!region.single || (blocks == 1 && live != 0), "a large block is alone in its region");
+        ++m_report.regions;
+        m_report.mapped += region.size;
+        m_shared += region.single ? 0 : region.size;
+        m_live_shared += region.single ? 0 : live;
+        m_idle += m_heap.is_idle_region(block_at(region.begin + HEAD_BYTES)) ? region.size : 0;
+    }
+
+    void check_free_lists() {
+        const FreeLists& lists = m_heap.m_free;
+        std::size_t listed = 0;
+        for (unsigned level = 0; level < FreeLists::LEVELS; ++level) {
+            expect((lists.m_levels >> level & 1U) == (lists.m_lists[level] != 0 ? 1U : 0U),
+                   "levels agree with lists");
+            for (unsigned list = 0; list < FreeLists::LISTS; ++list) {
+                Block* const first = lists.first({level, list});
+                expect((lists.m_lists[level] >> list & 1U) == (first != nullptr ? 1U : 0U),
+                       "bits agree with lists");
+                Block* previous = nullptr;
+                for (Block* block = first; block != nullptr; previous = block, block = next_of(block)) {
+                    if (++listed > m_report.free_blocks || m_heap.m_regions.find(block) == nullptr) {
+                        return expect(false, "a free list stays within the regions");
+                    }
+                    const auto place = FreeLists::place_of(size_of(head_of(block)));
+                    expect(is_free(head_of(block)) && place.level == level && place.list == list,
+                           "a block's list");
+                    expect(prev_of(block) == previous, "a free list's backward links");
+                }
+            }
+        }
+        expect(listed == m_report.free_blocks, "every free block is in a list");
+    }
+
+    void check_quick_lists() {
+        const QuickLists& lists = m_heap.m_quick;
+        std::size_t listed = 0, bytes = 0;
+        for (std::size_t list = 0; list < QuickLists::LISTS; ++list) {
+            for (Block* block = lists.first(list); block != nullptr; block = next_of(block)) {
+                if (++listed > m_report.quick_blocks || m_heap.m_regions.find(block) == nullptr) {
+                    return expect(false, "a quick list stays within the regions");
+                }
+                const std::uint64_t head = head_of(block);
+                expect((head & TAG_BITS) == QUICK_TAG && QuickLists::list_of(size_of(head)) == list,
+                       "a quick list");
+                bytes += size_of(head);
+            }
+        }
+        expect(bytes == lists.bytes() && listed == m_report.quick_blocks, "quick lists are counted");
+    }
+
+    PrivateHeap& m_heap;
+    HeapReport m_report;
+    std::size_t m_shared = 0, m_live_shared = 0, m_idle = 0;  // bytes
+};
+
+// Takes the heap's lock; time grows with the number of blocks. The handle must be valid.
+inline HeapReport inspect_heap(void* handle) {
+    return HeapInspection(*static_cast<PrivateHeap*>(handle)).report();
+}
+
+}  // namespace basalt::platform
+
+#endif

@@ -1,10 +1,12 @@
 # Sourced by the programs' tests: a scratch folder, and what every program has to do.
-# Sets program, data (absolute, empty for a test without), work (the current folder) and failures.
+# Sets program, data (absolute, empty for a test without), here (the test's folder), work (the current folder) and
+# failures.
 
 awk() { LC_ALL=C command awk "$@"; }  # numbers as the files write them, whatever the locale
 set -u
 program=$(realpath "$1")
 data=${2:+$(realpath "$2")}
+here=$(realpath "$(dirname "$0")")
 work=$(realpath "$(mktemp -d)")
 trap 'rm -rf "$work"' EXIT
 cd "$work" || exit 1
@@ -41,6 +43,40 @@ refused() { ends_with 2 "$@"; }
 
 # fails MESSAGE ARGUMENT...: for what the system did
 fails() { ends_with 1 "$@"; }
+
+# facts FILE: checks each line of a facts file, which says what its lines are: the program's output for an input line
+# (=>), its error for that line (=> error:), or its error for the arguments alone
+facts() {
+    local fact left want arguments line
+    while IFS= read -r fact; do
+        [[ $fact = *' => '* && $fact != '#'* ]] || continue
+        left=${fact%% => *} want=${fact#* => } line=/dev/null
+        [[ $left != *' < '* ]] || { printf '%b\n' "${left#* < }" >line && line=line; }
+        eval "arguments=(${left%% < *})"
+        run "${arguments[@]}" <$line
+        case $line,$want in
+            line,error:*) want="1,$(basename "$program") ${arguments[0]}: line 1: ${want#error: }," ;;
+            line,*) want=0,,$(printf '%b' "$want") ;;
+            *) want="2,$(basename "$program") ${arguments[0]}: ${want#error: }," ;;
+        esac
+        [ "$code,$(cat err),$(cat out)" = "$want" ] || fail "$fact: $code,$(head -c 300 err),$(head -c 300 out)"
+    done <"$1"
+}
+
+# refuses_each FACTS CALL...: each line of a facts file is arguments => message, or with a call, that function's
+# argument => message
+refuses_each() {
+    local fact arguments
+    while IFS= read -r fact; do
+        [[ $fact = *' => '* && $fact != '#'* ]] || continue
+        if [ $# -gt 1 ]; then
+            "${@:2}" "${fact%% => *}" "${fact#* => }"
+        else
+            eval "arguments=(${fact%% => *})"
+            refused "${fact#* => }" "${arguments[@]}"
+        fi
+    done <"$1"
+}
 
 # close_to WHAT ACTUAL EXPECTED TOLERANCE
 close_to() {

@@ -63,19 +63,18 @@ facts() {
     done <"$1"
 }
 
-# refuses_each FACTS CALL...: each line of a facts file is arguments => message, or with a call, that function's
-# argument => message
+# refuses_each FACTS: each line of the file is KIND: INPUT => MESSAGE, for a function refuse_KIND INPUT MESSAGE
 refuses_each() {
-    local fact arguments
+    local fact input
     while IFS= read -r fact; do
-        [[ $fact = *' => '* && $fact != '#'* ]] || continue
-        if [ $# -gt 1 ]; then
-            "${@:2}" "${fact%% => *}" "${fact#* => }"
-        else
-            eval "arguments=(${fact%% => *})"
-            refused "${fact#* => }" "${arguments[@]}"
-        fi
+        input=${fact#*: } input=${input%% => *}
+        [[ $fact != *' => '* || $fact = '#'* ]] || "refuse_${fact%%: *}" "$input" "${fact#* => }"
     done <"$1"
+}
+refuse_options() {
+    local arguments
+    eval "arguments=($1)"
+    refused "$2" "${arguments[@]}"
 }
 
 # close_to WHAT ACTUAL EXPECTED TOLERANCE

@@ -42,19 +42,14 @@ if convert -version >/dev/null 2>&1; then
     used=$(wc -l <matched)
     grep -q "colours used *$used$" out || fail "$used colours are in the picture: $(cat out)"
 else
-    echo "SKIPPED: the picture's colours, for want of ImageMagick"
+    echo "SKIPPED: the picture's colours: no ImageMagick"
 fi
 cp chart.bmp again.bmp
 succeeds --picture=chart.bmp
 cmp -s chart.bmp again.bmp || fail "a second run draws otherwise"
 
-refused "a colour is six hexadecimal digits RRGGBB, not 'red'" red
-refused "a colour is six hexadecimal digits RRGGBB, not '#FF00FF0'" '#FF00FF0'
-refused "a colour is six hexadecimal digits RRGGBB, not ''" ''
-refused "option --picture needs a value" --picture
-refused "--picture takes a file name, not ''" --picture ''
-refused "option --picture is given twice" --picture a --picture b
 fails "cannot write to no/chart.bmp: No such file or directory" --picture no/chart.bmp
 [ ! -c /dev/full ] || fails "cannot write all of /dev/full" --picture /dev/full
+refuses_each "$here/palette.facts"
 answers_to_everyone FF0000
 finish

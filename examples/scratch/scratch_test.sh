@@ -131,16 +131,9 @@ if command -v script >/dev/null; then
     grep -q '\[#*\.*\] [0-9]* %' typescript || fail "no progress bar on a terminal"
 fi
 
-refused "unexpected argument 'file' (--help shows what is taken)" file
-refused "option --points needs a value" --points
-refused "option --points is given twice" --points 1 --points 2
-refused "--cells takes a file name, not ''" --cells ''
-refused "option --cells is given twice" --cells=a --cells=b
-refused "--points takes a whole number from 1 to 400000000, not '0'" --points 0
-refused "--points takes a whole number from 1 to 400000000, not '400000001'" --points 400000001
-refused "--points takes a whole number from 1 to 400000000, not '1e6'" --points 1e6
 fails "cannot write to nowhere/cells.csv: No such file or directory" --points 10 --cells nowhere/cells.csv
 
+refuses_each "$here/scratch.facts"
 answers_to_everyone --points 10
 leaves_nothing "the last of them"
 finish

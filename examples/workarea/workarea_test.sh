@@ -158,48 +158,6 @@ sed 's/cellsize 1/cellsize 1e-9/' plain.asc >tiny.asc
 succeeds tiny.asc --grade 100
 is "Cut less fill" 0 # not -0
 
-# Bad terrains. edit SCRIPT: plain.asc changed by sed into bad.asc
-edit() { sed "$1" plain.asc >bad.asc; }
-edit 's/60/6O/'; refused "bad.asc:8:4: '6O' is not a number" bad.asc
-edit 's/60/60,5/'; refused "bad.asc:8:4: '60,5' is not a number" bad.asc
-edit 's/60/inf/'; refused "bad.asc:8:4: 'inf' is no elevation in metres, nor the header's NODATA_value" bad.asc
-edit 's/^10 /inf /'; refused "bad.asc:7:1: 'inf' is no elevation in metres, nor the header's NODATA_value" bad.asc
-edit 's/60/-32768/'; refused "bad.asc:8:4: '-32768' is no elevation in metres, nor the header's NODATA_value" bad.asc
-edit 's/60 //'; refused "bad.asc:8:9: the row ends after 3 of 4 values" bad.asc
-edit 's/60/60 65/'; refused "bad.asc:8:13: more values than ncols says (4)" bad.asc
-edit '$d'; refused "bad.asc:9: the file ends after 2 of 3 rows" bad.asc
-edit '$s/$/\n1 2 3 4/'; refused "bad.asc:10: more rows than nrows says (3)" bad.asc
-edit '7,$d'; refused "bad.asc:7: the file ends after 0 of 3 rows" bad.asc
-edit 's/ncols 4/ncols 2000000000/; s/cellsize 1/cellsize 1e-9/'
-refused "bad.asc:7:12: the row ends after 4 of 2000000000 values" bad.asc
-edit 's/ncols 4/ncols 4.5/'; refused "bad.asc:1:7: ncols must be a whole number from 1 to 2147483647, not '4.5'" bad.asc
-edit 's/nrows 3/nrows 0/'; refused "bad.asc:2:7: nrows must be a whole number from 1 to 2147483647, not '0'" bad.asc
-edit 's/size 1/size -1/'; refused "bad.asc:5:10: cellsize must be 1e-9 degrees or more, not '-1'" bad.asc
-edit 's/corner 10/corner ten/'; refused "bad.asc:3:11: xllcorner must be a number, not 'ten'" bad.asc
-edit 's/corner 10/corner/'; refused "bad.asc:3:10: header key xllcorner has no value" bad.asc
-edit 's/corner 10/corner 10 11/'; refused "bad.asc:3:14: header key xllcorner has more than one value" bad.asc
-edit '2s/$/\nncols 4/'; refused "bad.asc:3:1: header key ncols is given twice" bad.asc
-edit '2s/$/\ncolour red/'; refused "bad.asc:3:1: unknown header key 'colour'" bad.asc
-edit '/cellsize/d'; refused "bad.asc:6: the header lacks cellsize" bad.asc
-edit '/xll/d'; refused "bad.asc:6: the header lacks xllcorner or xllcenter" bad.asc
-edit '2s/$/\nyllcenter 1/'; refused "bad.asc:8: the header gives both yllcorner and yllcenter" bad.asc
-edit 's/-1.5/4071000/'; refused "bad.asc: the grid's corner and cell size are not geographic degrees" bad.asc
-edit 's/-1.5/86.99/; s/cellsize 1/cellsize 2/'; refused "bad.asc: the grid's corner and cell size are not geographic degrees" bad.asc
-edit 's/-1.5/-37.5/; s/cellsize 1/cellsize 25/'
-refused "bad.asc: the grid is more than 90 degrees wide or high, too much for one plane" bad.asc
-edit '7,$s/[0-9-]\+/-1/g'; refused "bad.asc: no cell has an elevation" bad.asc
-: >bad.asc; refused "bad.asc:1: the header lacks ncols" bad.asc
-head -c 5000 /dev/zero >bad.asc
-refused "bad.asc:1:1: not text: '????????????????????????????????????????...' has no end" bad.asc
-refused "nowhere.asc: cannot be opened: No such file or directory" nowhere.asc
-refused ".: cannot be read: Is a directory" .
-
-{ printf '\xef\xbb\xbf'; sed 's/ncols/mcols/' plain.asc; } >bad.asc
-refused "bad.asc:1:1: unknown header key 'mcols'" bad.asc
-{ sed 's/ncols 4/ncols 200000/; s/nrows 3/nrows 1/; s/cellsize 1/cellsize 1e-6/; 7,$d' plain.asc
-    awk 'BEGIN { for (i = 1; i < 200000; i++) printf "1000 "; print "?" }'; } >bad.asc # a row longer than a piece
-refused "bad.asc:7:999996: '?' is not a number" bad.asc
-
 # Boundaries. 10,-1.5 to 12,0.5 holds the two western columns of the two southern rows.
 border() { printf "$1" >border.csv; }
 border 'x,y\r\n# corner posts\r\n 10 , -1.5 # first\r\n\r\n12,-1.5\r\n+12,0.5\r\n10,0.5\r\n10,-1.5\r\n'
@@ -207,38 +165,9 @@ succeeds plain.asc --boundary border.csv
 is "Cells counted" 4
 is "Boundary vertices" 4
 is "Mean elevation" 74.997 # (190 w + 110) / (2 w + 2)
-border '10,-1.5\n12,-1.5\n'
-refused "border.csv:3: a boundary needs three points or more, not 2" plain.asc --boundary border.csv
-border '10,-1.5\n12,-1.5\n10,-1.5'
-refused "border.csv:3: a boundary needs three points or more, not 2" plain.asc --boundary border.csv
-border '10,0\n11,1\n12,2\n'
-refused "border.csv:4: the boundary's points lie in one line and enclose nothing" plain.asc --boundary border.csv
-border '10,0\n11,east\n12,2\n'
-refused "border.csv:2: latitude 'east' is not a number" plain.asc --boundary border.csv
-border '10,0\n,1\n12,2\n'
-refused "border.csv:2: longitude '' is not a number" plain.asc --boundary border.csv
-border '10,0\n11\n12,2\n'
-refused "border.csv:2: expected longitude,latitude but found '11'" plain.asc --boundary border.csv
-border '10,0\n11,2,300\n12,2\n'
-refused "border.csv:2: expected longitude,latitude but found '11,2,300'" plain.asc --boundary border.csv
-border '10,0\n11,91\n12,2\n'
-refused "border.csv:2: latitude '91' is not in degrees" plain.asc --boundary border.csv
-for slip in 8O.5,3O.1 -1O,0 +1O,.5O .x,.y; do # no names of columns
-    border " $slip\n10,-1.5\n12,-1.5\n12,0.5\n"
-    refused "border.csv:1: longitude '${slip%,*}' is not a number" plain.asc --boundary border.csv
-done
-for slip in nan,nan NaN,inf Infinity,-nan; do
-    border " $slip\n10,-1.5\n12,-1.5\n12,0.5\n"
-    refused "border.csv:1: longitude '${slip%,*}' is not a number" plain.asc --boundary border.csv
-done
-border 'Lon,3O.1\n10,-1.5\n12,-1.5\n12,0.5\n'
-refused "border.csv:1: longitude 'Lon' is not a number" plain.asc --boundary border.csv
 border 'Nantes,Info\n10,-1.5\n12,-1.5\n12,0.5\n10,0.5\n'
 succeeds plain.asc --boundary border.csv
 is "Boundary vertices" 4
-border '50,0\n51,0\n51,1\n'
-refused "border.csv: no cell of the view lies inside the boundary" plain.asc --boundary border.csv
-refused "none.csv: cannot be opened: No such file or directory" plain.asc --boundary none.csv
 
 # Pictures, as another program reads them
 succeeds plain.asc --picture picture.bmp
@@ -248,13 +177,8 @@ rm picture.bmp
 # a boundary around the two western columns of the two southern rows
 border '10,-1.5\n12,-1.5\n12,0.5\n10,0.5\n'
 succeeds plain.asc --boundary border.csv --picture=picture.bmp --legend
-[ "$(figure "Width")" -gt 680 ] || fail "there is no room for a legend: $(figure "Width")"
+[ "$(figure "Width")" -gt 680 ] || fail "the picture is too narrow for a legend: $(figure "Width")"
 cp plain.asc input.asc
-refused "--legend goes with --picture" plain.asc --legend
-refused "option --picture is given twice" plain.asc --picture a --picture b
-refused "--picture takes a file name, not ''" plain.asc --picture ''
-refused "--picture would overwrite input.asc" input.asc --picture input.asc
-refused "--picture would overwrite border.csv" plain.asc --boundary border.csv --picture ./border.csv
 fails "cannot write to no/picture.bmp: No such file or directory" plain.asc --picture no/picture.bmp
 if convert -version >/dev/null 2>&1; then
     # pixel X Y: colour as RRGGBB; strongest X Y: its largest channel
@@ -297,28 +221,19 @@ if convert -version >/dev/null 2>&1; then
     slope "0 0 0" "50 50 50" "100 100 100"; [ "$(light)" = 1 ] || fail "a slope that faces north is dark"
     slope "100 100 100" "50 50 50" "0 0 0"; [ "$(light)" = 0 ] || fail "a slope that faces south is bright"
 else
-    echo "SKIPPED: the pictures' colours, for want of ImageMagick"
+    echo "SKIPPED: the pictures' colours: no ImageMagick"
 fi
 
-# The command line
+# Bad terrains and boundaries, and the command line
 refused "no terrain file given (--help shows how)"
-refused "option --view needs a value" plain.asc --view
-refused "option --boundary needs a value" plain.asc --boundary
-refused "--boundary takes a file name, not ''" plain.asc --boundary=
-refused "option --grade is given twice" plain.asc --grade 1 --grade 2
-refused "one terrain file only, but 'b.asc' is a second one" a.asc b.asc
-refused "--grade takes an elevation in metres, not '5m'" plain.asc --grade 5m
-refused "--view takes four numbers W,S,E,N, not '1,2,3'" plain.asc --view 1,2,3
-refused "--view takes four numbers W,S,E,N, not '1,2,3,4,5'" plain.asc --view 1,2,3,4,5
-refused "--view takes four numbers W,S,E,N, not '1,2,3,nan'" plain.asc --view 1,2,3,nan
-refused "--view '11,-1,11,1': W must be less than E" plain.asc --view 11,-1,11,1
-refused "--view '10,1,11,-1': S must be less than N" plain.asc --view 10,1,11,-1
-refused "--view lies outside the grid, which is 10.000000,-1.500000,14.000000,1.500000" plain.asc --view 20,0,21,1
-refused "--view is too small: no cell centre lies in it" plain.asc --view 10.6,0,10.7,1
-refused "plain.asc: no cell of the view has an elevation" plain.asc --view 13,-1.5,14,-0.5
-refused "--synthetic takes a whole number from 1 to 100000000, not '0'" --synthetic 0
-refused "--synthetic takes a whole number from 1 to 100000000, not '1e3'" --synthetic 1e3
-refused "--synthetic replaces the terrain file; both are given" plain.asc --synthetic 10
+refuse_terrain() { sed "$1" plain.asc >bad.asc; refused "bad.asc$2" bad.asc; }
+refuse_border() { printf "$1" >bad.csv; refused "bad.csv$2" plain.asc --boundary bad.csv; }
+refuses_each "$here/workarea.facts"
+head -c 5000 /dev/zero >bad.asc
+refused "bad.asc:1:1: not text: '????????????????????????????????????????...' has no end" bad.asc
+{ sed 's/ncols 4/ncols 200000/; s/nrows 3/nrows 1/; s/cellsize 1/cellsize 1e-6/; 7,$d' plain.asc
+    awk 'BEGIN { for (i = 1; i < 200000; i++) printf "1000 "; print "?" }'; } >bad.asc # a row longer than a piece
+refused "bad.asc:7:999996: '?' is not a number" bad.asc
 cp plain.asc -- -odd.asc
 succeeds -- -odd.asc
 

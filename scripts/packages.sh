@@ -1,8 +1,9 @@
-# Sourced by the other scripts: moves to the project's root and installs Debian packages that are missing.
+# Sourced by the other scripts: moves to the project's root, and installs Debian packages that are missing.
 
 caller_folder=$PWD
 calling_script=$(realpath "$0")
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
+mkdir -p build
 
 show_help() {  # prints the calling script's opening comment when the first argument asks for help
     if [ "${1:-}" = --help ] || [ "${1:-}" = -h ]; then
@@ -11,22 +12,38 @@ show_help() {  # prints the calling script's opening comment when the first argu
     fi
 }
 
-need_packages() {  # package names; nothing is asked of the network when all are there
-    local missing=()
+need_packages() {  # package names; needs no network when all are installed
+    local missing=() apt='apt-get -q -o DPkg::Lock::Timeout=600' as_root=
     for package in "$@"; do
         [[ $(dpkg-query -W -f '${db:Status-Status}' "$package" 2>/dev/null || true) == installed* ]] || missing+=("$package")
     done
-    [ ${#missing[@]} -eq 0 ] && return
-    local run=()
-    [ "$(id -u)" = 0 ] || run=(sudo)
+    [ ${#missing[@]} -gt 0 ] || return 0
+    if [ "$(id -u)" != 0 ]; then
+        command -v sudo >/dev/null || {
+            echo "Packages are missing. As root, run: apt-get install --no-install-recommends ${missing[*]}" >&2
+            exit 1
+        }
+        as_root=sudo
+    fi
     echo "Installing: ${missing[*]}"
-    "${run[@]}" apt-get update -q >/dev/null
-    DEBIAN_FRONTEND=noninteractive "${run[@]}" apt-get install -q -y --no-install-recommends "${missing[@]}" >/dev/null
+    # shellcheck disable=SC2086  # the command is words
+    { $as_root $apt update && $as_root env DEBIAN_FRONTEND=noninteractive $apt install -y --no-install-recommends \
+        "${missing[@]}"; } >build/packages.log 2>&1 || { tail -n 20 build/packages.log >&2; exit 1; }
+}
+
+build_with_progress() {  # what is built, arguments of cmake --build; one line of progress, or the errors
+    local what=$1 log
+    log=build/${what// /-}.log
+    shift
+    printf 'Building %s (output in %s):' "$what" "$log"
+    cmake --build "$@" 2>&1 | tee "$log" | awk 'match($0, /^\[[0-9]+\/[0-9]+\]/) {
+        split(substr($0, 2, RLENGTH - 2), done, "/")
+        for (; next_mark <= 100 * done[1] / done[2]; next_mark += 10) { printf " %d%%", next_mark; fflush() }
+    }' || { echo; grep -A 8 -E 'error|FAILED' "$log" | head -n 60; exit 1; }
+    echo " done"
 }
 
 BUILD_PACKAGES=(g++ cmake ninja-build pkg-config libpixman-1-dev)
-TEST_PACKAGES=(libgtest-dev)
+TEST_PACKAGES=(libgtest-dev locales)
 PEER_PACKAGES=(libbenchmark-dev libabsl-dev libopenvdb-dev libtbb-dev libboost1.81-dev libgeos-dev
     libspatialindex-dev libgeographiclib-dev libproj-dev libspdlog-dev libcairo2-dev)
-CHECK_PACKAGES=(abigail-tools binutils clang clang-format clang-tidy doxygen git libclang-rt-14-dev llvm locales
-    python3)

@@ -1,0 +1,152 @@
+# Sourced by check.sh: the steps that need a build of their own or many minutes.
+
+# Each public header compiles alone, as C++17 and C++20, under GCC and Clang, without a warning.
+header_alone() {  # header
+    local standard compiler
+    for standard in c++17 c++20; do
+        for compiler in g++ clang++; do
+            $compiler -std=$standard -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror -fsyntax-only \
+                -Iinclude -Ibuild/dev/include -x c++ - <<<"#include \"${1#include/}\"" ||
+                { echo "$1: $compiler $standard"; return 255; }
+        done
+    done
+}
+export -f header_alone
+step_headers() {
+    need_packages clang
+    cmake --preset dev >/dev/null  # generates version.h
+    printf '%s\n' include/basalt/*.h include/basalt/*/*.h | xargs -P "$(nproc)" -I {} bash -c 'header_alone {}'
+}
+
+step_tidy() {
+    need_packages clang clang-tidy
+    cmake --preset asan -B build/tidy -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_FUZZERS=OFF -DBASALT_BUILD_TOOLS=ON \
+        -DCMAKE_EXPORT_COMPILE_COMMANDS=ON >/dev/null
+    git ls-files 'src/*.cpp' 'tools/*.cpp' 'console/*.cpp' | xargs -P "$(nproc)" -n 2 clang-tidy -p build/tidy --quiet
+}
+
+# The programs' tests under the address sanitizer.
+step_programs() {
+    need_packages clang libclang-rt-14-dev llvm
+    cmake --preset asan -B build/asan-programs -DBASALT_BUILD_TESTS=ON -DBASALT_BUILD_FUZZERS=OFF \
+        -DBASALT_BUILD_EXAMPLES=ON -DBASALT_BUILD_TOOLS=ON
+    for folder in examples tools; do cmake --build build/asan-programs --target $folder/all; done
+    ctest --test-dir build/asan-programs --output-on-failure -R command_line
+}
+
+# A time zone off the full hour, on both sides of its changes, and a locale with a decimal comma. Without the test of
+# loading and unloading: glibc keeps a copy of LOCPATH for each newlocale(), which that test would count as ours.
+step_elsewhere() {
+    localedef -i de_DE -f UTF-8 build/de_DE.UTF-8 || [ -d build/de_DE.UTF-8 ]
+    build_preset dev
+    TZ='<+1245>-12:45<+1345>,M9.5.0/2:45,M4.1.0/3:45' LOCPATH=$PWD/build LC_ALL=de_DE.UTF-8 \
+        ctest --preset dev -j "$(nproc)" -E '^(faults|stress.*|fuzz_.*|scratch_command_line|ModuleLoad\..*)$'
+}
+
+# The memory family with little file size, address space, descriptors or disk: no signal, nothing left behind.
+step_limits() {
+    local folder own_mounts=(unshare --mount) probe=$PWD/build/dev/tests/limits_probe shortage
+    build_preset dev --target limits_probe
+    folder=$(mktemp -d)
+    [ "$(id -u)" = 0 ] || own_mounts=(unshare --map-root-user --mount)
+    "${own_mounts[@]}" true || own_mounts=()  # then full_disk is left out
+    for shortage in 'file_size ulimit -f 1024' 'address_space ulimit -v 300000' 'no_descriptors ulimit -n 40' \
+        'few_descriptors ulimit -n 40' ${own_mounts[0]:+"full_disk mount -t tmpfs -o size=8m tmpfs $folder"}; do
+        TMPDIR=$folder "${own_mounts[@]}" bash -c \
+            "${shortage#* } && '$probe' ${shortage%% *} && [ -z \"\$(ls -A '$folder')\" ]" ||
+            { echo "$shortage: failed, or left files behind"; return 1; }
+        echo "${shortage%% *}: passed"
+    done
+    rmdir "$folder"
+}
+
+# Guarded, and the same bytes when built in another folder.
+step_hardening() {
+    local again=build/again
+    [ -d $installed ] || step_package
+    rm -rf $again
+    mkdir -p $again/basalt
+    git ls-files -z | xargs -0 cp --parents -t $again/basalt
+    cmake -S $again/basalt -B $again/build -G Ninja -DCMAKE_BUILD_TYPE=Release -DBASALT_BUILD_TESTS=OFF \
+        -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_TOOLS=OFF
+    cmake --build $again/build --target basalt
+    scripts/check_library.sh hardening $installed/libbasalt.so $again/build/src/libbasalt.so
+}
+
+# Results to the bit: both compilers at three levels, then the installed library. Time scales are integers, and need
+# the platform's clock.
+exact_test=tests/geo/exact_results_test.cpp
+exact_sources() { find src/geo -name '*.cpp' ! -name 'time_scales*'; }
+step_exact() {
+    local program=build/exact_results
+    for level in -O0 -O2 -O3; do
+        for compiler in g++ clang++; do
+            # shellcheck disable=SC2046  # one file a word
+            $compiler -std=c++20 $level -ffp-contract=off -I. -Iinclude $(exact_sources) $exact_test -o $program \
+                -lgtest -lgtest_main
+            $program --gtest_brief=1
+        done
+    done
+    [ -d $installed ] || step_package
+    g++ -std=c++20 -ffp-contract=off -I. -Iinclude $exact_test -o $program -lgtest -lgtest_main -L$installed -lbasalt
+    LD_LIBRARY_PATH=$installed $program --gtest_brief=1
+}
+step_aarch64() {
+    need_packages g++-aarch64-linux-gnu qemu-user googletest
+    # shellcheck disable=SC2046
+    aarch64-linux-gnu-g++ -std=c++20 -O2 -ffp-contract=off -static -I. -Iinclude -I/usr/src/googletest/googletest \
+        $(exact_sources) $exact_test /usr/src/googletest/googletest/src/gtest{-all,_main}.cc -o build/exact_results_aarch64
+    qemu-aarch64 build/exact_results_aarch64 --gtest_brief=1
+}
+
+# The binary interface is that of the last release: RELEASED names its library or description, else its tag is built.
+step_abi() {
+    local released=${RELEASED:-} tag
+    build_preset dev --target basalt
+    if [ -z "$released" ]; then
+        tag=$(git describe --tags --abbrev=0 --match 'v*' 2>/dev/null) || { echo "no release to compare with"; return; }
+        rm -rf build/released
+        mkdir build/released
+        git archive "$tag" | tar -x -C build/released
+        (cd build/released && build_preset dev --target basalt)
+        released=build/released/build/dev/src/libbasalt.so
+    fi
+    scripts/check_library.sh abi build/dev/src/libbasalt.so "$released"
+}
+
+step_compilers() {
+    need_packages clang
+    for compiler in g++ clang++; do
+        for level in -O0 -O2 -O3; do
+            folder=build/compilers/$compiler$level
+            cmake -S . -B "$folder" -G Ninja -DCMAKE_CXX_COMPILER=$compiler -DCMAKE_BUILD_TYPE=Debug \
+                -DCMAKE_CXX_FLAGS_DEBUG=$level -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_TOOLS=OFF
+            cmake --build "$folder"
+            ctest --test-dir "$folder" -j "$(nproc)" --output-on-failure
+        done
+    done
+}
+
+# Reads of uninitialised memory, and leaks. Left out are three tests that valgrind itself disturbs: it loads without
+# unmapping all, and puts memory elsewhere than at a requested address.
+step_valgrind() {
+    local skipped=ModuleLoad.*:VirtualMemory.an_address_of_ones_own
+    skipped+=:SharedMemoryAllocator.a_failing_piece_ends_it_and_is_reported
+    need_packages valgrind
+    build_preset dev
+    for program in build/dev/tests/*_tests; do
+        valgrind -q --error-exitcode=9 --leak-check=full --show-leak-kinds=definite --errors-for-leak-kinds=definite \
+            --soname-synonyms=somalloc=nouserintercepts --suppressions=tests/support/valgrind.supp \
+            "$program" --gtest_brief=1 --gtest_filter="-$skipped"
+    done
+}
+
+step_coverage() { scripts/coverage.sh; }
+
+# Hours of use in minutes: memory and descriptors stay flat. SOAK_SECONDS for each subject (300).
+step_soak() {
+    build_preset dev --target stress
+    build/dev/tests/stress "${SOAK_SECONDS:-300}"
+}
+
+step_debian() { scripts/check_debian.sh; }

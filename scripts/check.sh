@@ -79,7 +79,7 @@ step_symbols() {
     scripts/check_library.sh symbols $installed/libbasalt.so
 }
 step_python() {
-    local static=$PWD/build/package/library-OFF
+    local static=$PWD/build/package/sub/basalt
     [ -f "$static/src/libbasalt.a" ] || step_package
     BASALT_LIBRARY=$static scripts/python.sh
 }
@@ -102,7 +102,7 @@ for step in "${steps[@]}"; do
     started=$SECONDS
     bash scripts/check.sh --step "$step" >"build/check-$step.log" 2>&1 || {
         tail -n 60 "build/check-$step.log"
-        grep -nE 'error|FAILED|warning' "build/check-$step.log" | head -n 40 || true
+        grep -nE '(error|warning): |FAILED' "build/check-$step.log" | head -n 40 || true
         echo "check.sh: $step failed; its whole output is in build/check-$step.log" >&2
         exit 1
     }

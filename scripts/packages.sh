@@ -39,7 +39,7 @@ build_with_progress() {  # what is built, arguments of cmake --build; one line o
     cmake --build "$@" 2>&1 | tee "$log" | awk 'match($0, /^\[[0-9]+\/[0-9]+\]/) {
         split(substr($0, 2, RLENGTH - 2), done, "/")
         for (; next_mark <= 100 * done[1] / done[2]; next_mark += 10) { printf " %d%%", next_mark; fflush() }
-    }' || { echo; grep -A 8 -E 'error|FAILED' "$log" | head -n 60; exit 1; }
+    }' || { echo; grep -A 8 -E 'error: |FAILED' "$log" | head -n 60; exit 1; }
     echo " done"
 }
 

@@ -1,0 +1,150 @@
+/// @file
+/// The elementary functions where nothing is special, for one lane or four. Comments give each step's error
+/// in units of u = 2^-53, half a unit in the last place of 1.
+#ifndef BASALT_SRC_GEO_ELEMENTARY_KERNELS_H
+#define BASALT_SRC_GEO_ELEMENTARY_KERNELS_H
+
+#include "src/geo/elementary/coefficients.h"
+#include "src/geo/elementary/lane.h"
+
+namespace basalt::geo::elementary {
+
+/// Angles up to this size are reduced by reduce(): 2^16 quarter turns.
+inline constexpr double REDUCED_LIMIT = 102943.0;
+/// Below this size sine and tangent are the angle, to 0.2 units in the last place.
+inline constexpr double TINY = 0x1p-27;
+
+/// An angle less quarter turns: high + low in [-pi/4, pi/4], with low at most u high but for a few angles.
+template <typename Lane>
+struct Reduced {
+    Lane high, low;
+    Integers<Lane> quarters;  ///< their number, of which the two lowest bits count
+};
+
+/// Cody and Waite's reduction, |x| <= REDUCED_LIMIT; relative error 0.001 u at the double nearest to each of
+/// the 65,536 multiples of pi/2, which fit.py enumerates, and less elsewhere.
+template <typename Lane>
+BASALT_INLINE Reduced<Lane> reduce(const Lane& x) {
+    constexpr double ROUNDING = 0x1.8p52;  // added to it, a number becomes an integer
+    const Lane shifted = x * TWO_OVER_PI + ROUNDING;
+    const Lane quarters = shifted - ROUNDING;
+    const Lane rest =
+        x - quarters * HALF_PI_PARTS[0];  // exact: both within a factor of 2, the product has 53 bits
+    const Lane second = quarters * HALF_PI_PARTS[1];  // exact
+    const Lane high = rest - second;
+    const Lane low = (rest - high - second) - quarters * HALF_PI_PARTS[2];
+    return {high, low, bits_of(shifted)};
+}
+
+/// A sine and a cosine, each as a sum whose second part is at most 2 u of the first.
+template <typename Lane>
+struct SineCosinePairs {
+    Lane sine, sine_low, cosine, cosine_low;
+};
+
+/// Of high + low in [-pi/4, pi/4].
+template <typename Lane>
+BASALT_INLINE SineCosinePairs<Lane> sine_cosine_pairs(const Lane& high, const Lane& low) {
+    constexpr double ROUNDING = 0x1.8p40;  // to multiples of 2^-12
+    // -1/6 in two parts; products of the first with cubes of 12 bits are exact.
+    constexpr double SIXTH = -0x1.5555p-3;
+    constexpr double SIXTH_LOW = SINE[0] - SIXTH;
+    const Lane head = (high + ROUNDING) - ROUNDING;  // 12 bits
+    const Lane tail = high - head;                   // exact, below 2^-12
+    const Lane both = high + head;
+    const Lane head2 = head * head;  // exact
+    const Lane cube = head2 * head;  // exact
+    const Lane x2 = high * high;
+    const Lane x4 = x2 * x2;
+
+    const Lane cosine_main = 1.0 - 0.5 * head2;  // exact
+    const Lane sixth = SIXTH * cube;             // exact
+    const Lane sine_main = high + sixth;
+
+    // sin = high - head^3 / 6 + ...: the first two terms are summed without error (high is the larger), the
+    // others are at most 0.0026 with an error of 4 u of it. 0.03 u of the result in all.
+    const Lane s = (SINE[1] + x2 * SINE[2]) + x4 * ((SINE[3] + x2 * SINE[4]) + x4 * SINE[5]);
+    const Lane small =
+        (SINE[0] * (tail * (head2 + high * both)) + (low * cosine_main + SIXTH_LOW * cube)) + high * (x4 * s);
+    const Lane sine_rest = ((high - sine_main) + sixth) + small;
+
+    // cos = 1 - head^2 / 2 + head^4 / 24 + ...: the first two terms are exact and at least 0.69, the third is
+    // at most 0.016 with an error of 1 u of it, the others 0.0004 with 6 u. 0.04 u in all.
+    const Lane c = (COSINE[1] + x2 * COSINE[2]) + x4 * ((COSINE[3] + x2 * COSINE[4]) + x4 * COSINE[5]);
+    const Lane cosine_rest =
+        COSINE[0] * (head2 * head2) +
+        (((tail * both) * (COSINE[0] * (x2 + head2) - 0.5) - low * sine_main) + (x4 * x2) * c);
+
+    const Lane sine = sine_main + sine_rest;
+    const Lane cosine = cosine_main + cosine_rest;
+    return {sine, (sine_main - sine) + sine_rest, cosine, (cosine_main - cosine) + cosine_rest};
+}
+
+/// Sine and cosine of a reduced angle with its quarter turns; one more rounding, 1 u.
+template <typename Lane>
+BASALT_INLINE void sine_and_cosine(const Reduced<Lane>& angle, Lane& sine, Lane& cosine) {
+    const SineCosinePairs<Lane> of = sine_cosine_pairs(angle.high, angle.low);
+    const Integers<Lane> s = bits_of(of.sine);
+    const Integers<Lane> c = bits_of(of.cosine);
+    const Integers<Lane> swap = (s ^ c) & -(angle.quarters & 1);  // odd quarters exchange the two
+    sine = from_bits<Lane>((s ^ swap) ^ ((angle.quarters << 62) & SIGN));
+    cosine = from_bits<Lane>((c ^ swap) ^ (((angle.quarters + 1) << 62) & SIGN));
+}
+
+/// Components of a direction are between these for arctangent(): no product overflows or loses digits.
+inline constexpr double SMALLEST_COMPONENT = 0x1p-400;
+inline constexpr double LARGEST_COMPONENT = 0x1p400;
+
+/// Angle of the direction (x, y). Signs and the diagonal leave small / large in [0, 1]; of it the nearest
+/// centre of slope 0, 1/2 or 1 leaves a slope of at most 1/4, whose arctangent is a polynomial.
+template <typename Lane>
+BASALT_INLINE Lane arctangent(const Lane& y, const Lane& x) {
+    constexpr double CENTRES[3] = {0.0, 0.5, 1.0};
+    const Lane x_size = size_of(x);
+    const Lane y_size = size_of(y);
+    const Lane large = larger(x_size, y_size);
+    const Lane small = smaller(x_size, y_size);
+    const Integers<Lane> beyond_diagonal = is_less(x_size, y_size);
+    const Integers<Lane> backwards = (bits_of(x) >> 63) & 1;
+    const Integers<Lane> segment = is_less<Lane>(large * 0.25, small) + is_less<Lane>(large * 0.7675, small);
+
+    // Slope from the centre: n / (d + d_low), all three exact (n, as its terms are within a factor of 2).
+    const Lane centre = lookup<Lane>(CENTRES, segment);
+    const Lane n = small - centre * large;
+    const Lane turned = centre * small;
+    const Lane d = large + turned;
+    const Lane d_low = (large - d) + turned;
+    // Its quotient in two parts, from one division: the first has 26 bits, so that the remainder is exact up
+    // to d_low's term; the second has an error of 4 u of it, 2^-24 u of the slope.
+    const Lane inverse = 1.0 / d;
+    const Lane first = head_of(n * inverse);
+    const Lane d_head = head_of(d);
+    const Lane remainder = ((n - first * d_head) - first * (d - d_head)) - first * d_low;
+    const Lane second = remainder * inverse;
+    const Lane slope = first + second;
+    const Lane slope_low = (first - slope) + second;
+
+    // atan = slope + slope^3 A(slope^2): the second term is at most 0.0053, with an error of 4 u of it.
+    const Lane t2 = slope * slope;
+    const Lane t4 = t2 * t2;
+    const Lane a = ((ARCTANGENT[0] + t2 * ARCTANGENT[1]) + t4 * (ARCTANGENT[2] + t2 * ARCTANGENT[3])) +
+                   (t4 * t4) * ((ARCTANGENT[4] + t2 * ARCTANGENT[5]) +
+                                t4 * ((ARCTANGENT[6] + t2 * ARCTANGENT[7]) + t4 * ARCTANGENT[8]));
+    const Lane low = (slope_low - slope_low * t2) + (slope * t2) * a;
+
+    // Centre's angle plus or minus that: summed without error but for the last rounding (the angle is 0 or
+    // the larger).
+    const Integers<Lane> at = (segment + 3 * beyond_diagonal + 6 * backwards) * 2;
+    const Integers<Lane> minus = (beyond_diagonal ^ backwards) << 63;
+    const Lane angle = lookup<Lane>(CENTRE_ANGLES, at);
+    const Lane angle_low = lookup<Lane>(CENTRE_ANGLES + 1, at);
+    const Lane part = from_bits<Lane>(bits_of(slope) ^ minus);
+    const Lane part_low = from_bits<Lane>(bits_of(low) ^ minus);
+    const Lane sum = angle + part;
+    const Lane result = sum + (((angle - sum) + part) + (part_low + angle_low));
+    return from_bits<Lane>(bits_of(result) | (bits_of(y) & SIGN));
+}
+
+}  // namespace basalt::geo::elementary
+
+#endif

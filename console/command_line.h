@@ -23,8 +23,8 @@ struct Syntax {
 };
 
 /// Reads `--name VALUE`, `--name=VALUE`, `--flag`, `--help`, `--version` and operands. A minus before a digit
-/// or a point begins a number, which is an operand; behind `--` everything is one. Nothing behind --help or
-/// --version is looked at. InputError for all else.
+/// or a point begins a number, which is an operand; after `--` everything is. Arguments after --help or
+/// --version are ignored. InputError for all else.
 CommandLine parse_command_line(const std::vector<std::string>& arguments, const Syntax& syntax);
 
 /// The one operand of a program that takes a file at most, empty when there is none. InputError for a second

@@ -21,7 +21,7 @@ CsvReader::CsvReader(std::string path) : m_path(std::move(path)), m_file(std::fo
     }
 }
 
-/// False when the file has ended and nothing was left of it.
+/// False at the end of the file.
 bool CsvReader::read_line() {
     m_text.clear();
     ++m_line;

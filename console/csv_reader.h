@@ -9,7 +9,7 @@
 #include <string_view>
 #include <vector>
 
-/// Where something stands in a file; both count from 1, columns in bytes.
+/// A position in a file; both count from 1, columns in bytes.
 struct FilePlace {
     std::size_t line;
     std::size_t column;
@@ -20,7 +20,7 @@ struct FilePlace {
 /// skipped. There is no quoting: a field holds no comma and no `#`. A line, its comment included, has at most
 /// LONGEST_LINE bytes.
 ///
-/// Whatever does not fit is an InputError that names file, line, column and what was expected there.
+/// A mismatch is an InputError with file, line, column and what was expected.
 class CsvReader {
 public:
     static constexpr std::size_t LONGEST_LINE = 4096;
@@ -31,9 +31,9 @@ public:
     /// Goes to the next record; false at the end of the file.
     bool next();
 
-    /// Place of a field; behind the last one, of the line's end.
+    /// Position of a field, or of the line's end after the last field.
     FilePlace place(std::size_t index) const;
-    /// A field that must be there; `expected` says what it is.
+    /// A required field; `expected` describes it for the error.
     std::string_view text(std::size_t index, const char* expected) const;
     /// A finite number from `low` to `high`.
     double number(std::size_t index, const char* expected, double low, double high) const;

@@ -1,4 +1,4 @@
-// Bad input, said in one line that names where it stands.
+// Bad input, reported in one line with its position.
 #ifndef CONSOLE_INPUT_ERROR_H
 #define CONSOLE_INPUT_ERROR_H
 
@@ -6,7 +6,7 @@
 #include <stdexcept>
 #include <string>
 
-/// Something the user gave cannot be used. The text is one line without the program's name.
+/// Unusable user input. The text is one line without the program's name.
 class InputError : public std::runtime_error {
 public:
     explicit InputError(const std::string& message) : std::runtime_error(message) {}

@@ -41,7 +41,7 @@ inline bool begins_number(std::string_view word) {
     return word.find_first_of("+-.0123456789") == 0 || parse_any_number<double>(word);
 }
 
-/// `text` in quotes for a message: shortened, and nothing in it that could disturb a terminal.
+/// `text` quoted for a message: shortened, with control characters replaced.
 inline std::string quoted(std::string_view text) {
     constexpr std::size_t LONGEST = 40;
     std::string shown = "'";

@@ -87,7 +87,7 @@ OutputFile::~OutputFile() {
 void OutputFile::write(const std::string& text) {
     std::FILE* const file = std::exchange(m_file, nullptr);
     try {
-        // What has no length, as a device or a pipe, has nothing to be replaced.
+        // Devices and pipes have no length to truncate.
         if (ftruncate(fileno(file), 0) != 0 && errno != EINVAL) {
             fail();
         }

@@ -1,5 +1,5 @@
-// What every command-line program here does at its two ends: one line for an error, an exit status, and a
-// report that is not lost on a full disk.
+// Start and end of every command-line program here: one line for an error, an exit status, and a
+// check that the output was written.
 #ifndef CONSOLE_PROGRAM_H
 #define CONSOLE_PROGRAM_H
 
@@ -20,20 +20,20 @@ struct Program {
 /// standard error.
 int run_program(const Program& program, int count, char** arguments);
 
-/// Does the work of a program that writes its output itself, and answers for what it throws as run_program()
+/// Runs a program that writes its output itself, and handles its exceptions as run_program()
 /// does.
 int exit_status_of(const std::string& name, const std::function<int()>& work);
 
 /// Prints a text whole. std::runtime_error, with the system's reason, when that fails.
 void print(const std::string& text);
 
-/// A file that is written whole when all work is done, and opened ahead of it: what cannot be written to is
-/// told at once. Failures are std::runtime_error, naming the file and the system's reason.
+/// A file that is opened before the work and written when it is done, so that a file that cannot be written
+/// is reported at once. Failures are std::runtime_error with the file and the system's reason.
 class OutputFile {
 public:
-    /// What the file holds stays until write().
+    /// The file's contents stay until write().
     explicit OutputFile(std::string path);
-    /// Without write() a file that was not there before is gone again.
+    /// Removes a file created here if write() was not called.
     ~OutputFile();
     OutputFile(const OutputFile&) = delete;
     OutputFile& operator=(const OutputFile&) = delete;

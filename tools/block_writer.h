@@ -4,16 +4,16 @@
 
 #include <string>
 
-/// Collects text and writes it when there is enough. std::runtime_error, with the system's reason, when
+/// Collects text and writes it in blocks. std::runtime_error, with the system's reason, when
 /// something cannot be written: a full disk or a closed pipe loses nothing silently.
 class BlockWriter {
 public:
-    /// What is to be written: append to it, then call end_of_line().
+    /// The output buffer: append to it, then call end_of_line().
     std::string& text() { return m_text; }
     void end_of_line();
-    /// Writes all that is there.
+    /// Flushes the buffer.
     void flush();
-    /// Writes the rest and closes the output, at which some file systems first say that they are full.
+    /// Flushes and closes the output; some file systems report a full disk only here.
     void finish();
 
 private:

@@ -1,4 +1,4 @@
-// What a command is: its texts, its options, and what it does with a line.
+// A command: its help texts, its options, and its filter for a line.
 #ifndef TOOLS_COMMAND_H
 #define TOOLS_COMMAND_H
 
@@ -29,17 +29,17 @@ inline constexpr Option PRECISION = {"--precision", "N",
                                      "digits of metres and seconds behind the point, 0 to 9 (default: 4)"};
 /// @}
 
-/// A shell line that works as it stands, and all that it prints.
+/// A shell line and its complete output.
 struct Example {
     const char* shell;
     const char* output;
 };
 
-/// Which lines hold fields.
+/// Which lines are parsed.
 enum class Lines {
-    MARKED,    ///< all but blank ones and those that begin with #, which are copied
-    UNMARKED,  ///< all: anything may be a text
-    WHOLE      ///< all, each one text with whatever it holds
+    MARKED,    ///< all but blank lines and comments (#), which are copied
+    UNMARKED,  ///< all lines
+    WHOLE      ///< all lines, each as one field
 };
 
 /// Reads a line's fields and writes its results. InputError, which may come after some were written, refuses
@@ -69,7 +69,7 @@ const std::string* value_of(const CommandLine& line, const Option& option);
 /// InputError unless there are as many operands as the command has words for them.
 void check_operands(const Command& command, const CommandLine& line);
 
-/// What the options of many commands say.
+/// The format chosen by the common options.
 Format format_of(const Command& command, const CommandLine& line);
 
 #endif

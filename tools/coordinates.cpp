@@ -7,7 +7,7 @@
 
 namespace {
 
-/// Two passes of the latitude agree within this, radians: what is left is rounding.
+/// Convergence limit of the latitude, radians: the remaining difference is rounding.
 constexpr double TOLERANCE = 1e-12;
 
 constexpr Option GEODETIC = {"--geodetic", "", "ORIGIN and the lines are LATITUDE LONGITUDE HEIGHT"};
@@ -24,7 +24,7 @@ geo_vector read_llh(Fields& fields) {
     geo_llh llh = read_place(fields);
     llh.height = fields.number("a height in metres");
     if (llh.latitude == 0 && llh.longitude == 0 && llh.height == 0) {
-        // The library takes the all-zero record for one never set. This height does not show in x.
+        // The library refuses the all-zero record. This height vanishes in the rounding of x.
         llh.height = 1e-10;
     }
     geo_vector xyz = {};

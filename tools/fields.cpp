@@ -93,7 +93,7 @@ double Fields::angle(const char* what) {
 
 double Fields::latitude() {
     constexpr double POLE = std::numbers::pi / 2;
-    // Written with few digits a pole may lie beyond itself.
+    // Rounding to few digits may carry a pole beyond 90 degrees.
     constexpr double SLACK = 1e-7;
     const std::string_view field = text("a latitude");
     const std::optional<double> value = parse_number(field);

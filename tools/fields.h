@@ -8,7 +8,7 @@
 
 #include "format.h"
 
-/// Fields between blanks, or between commas with blanks around them. What does not fit is an InputError that
+/// Fields between blanks, or between commas with optional blanks. A mismatch is an InputError that
 /// says what was expected: `what`, a few words with the unit.
 class Fields {
 public:
@@ -27,7 +27,7 @@ public:
     double longitude() { return angle("a longitude"); }
     /// @}
 
-    /// The line as a whole, of which nothing is left then.
+    /// The rest of the line as one field.
     std::string_view whole_line();
     /// Whether there is no further field.
     bool ended() const { return m_format.csv ? m_ended : rest().empty(); }

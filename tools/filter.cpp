@@ -70,7 +70,7 @@ private:
 
     void refuse(const char* why) {
         m_refused = true;
-        // As one text, so that lines of several programs do not mix.
+        // One write, so that lines of several programs do not mix.
         std::string message = "basalt ";
         message.append(m_command.name).append(": line ").append(std::to_string(m_reader.number()));
         message.append(": ").append(why).append("\n");

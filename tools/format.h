@@ -9,9 +9,9 @@ struct Format {
     char separator = ' ';  ///< between fields that are written
     bool degrees = false;  ///< angles are degrees, else radians
     bool keep = false;     ///< the line as it was comes before its results
-    int precision = 4;     ///< digits behind the point of metres and seconds
+    int precision = 4;     ///< decimals of metres and seconds
 
-    /// @name Digits behind the point of what else there is: none resolves less than a metre or a second does
+    /// @name Decimals of other quantities, none coarser than those of metres and seconds
     /// @{
     int angle_digits() const { return precision + (degrees ? 5 : 7); }
     int arc_second_digits() const { return precision + 2; }

@@ -20,8 +20,9 @@ constexpr const char* NUMBERS =
     "point, degrees five more, radians seven more, seconds of arc two more, days five more.";
 
 constexpr const char* STATUS =
-    "A line that cannot be used is told on standard error with its number and why, and left out, as is a\n"
-    "line of more than 1048576 bytes. Exit status: 0 success, 1 a line was left out, or input or output\n"
+    "A line that cannot be used is reported on standard error with its number and reason, and skipped, as is "
+    "a\n"
+    "line of more than 1048576 bytes. Exit status: 0 success, 1 a line was skipped, or input or output\n"
     "failed, 2 bad arguments.";
 
 constexpr Option PROGRAM_OPTIONS[] = {
@@ -41,7 +42,7 @@ std::string with_value(const Option& option) {
     return text;
 }
 
-/// Lines of a name and a text, the texts below one another.
+/// Two columns: names, and their texts aligned.
 class List {
 public:
     void add(std::string name, const char* text) { m_lines.emplace_back(std::move(name), text); }
@@ -69,7 +70,7 @@ std::string invocation(const Command& command) {
     return text;
 }
 
-/// A text for roff, which reads signs of its own in it.
+/// Escapes a text for roff.
 std::string roff(std::string_view text) {
     std::string all;
     bool line_begins = true;

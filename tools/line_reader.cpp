@@ -13,7 +13,7 @@
 LineReader::LineReader(std::function<void()> before_waiting)
     : m_before_waiting(std::move(before_waiting)), m_block(std::size_t{1} << 16) {}
 
-/// Reads behind what is there; false at the end of the input.
+/// Appends input to the buffer; false at the end of the input.
 bool LineReader::fill() {
     m_before_waiting();
     for (;;) {
@@ -38,7 +38,7 @@ bool LineReader::take(std::size_t length, std::size_t end_length) {
     return true;
 }
 
-/// Reads on to the end of a line without keeping it.
+/// Skips the rest of a line.
 void LineReader::skip_rest() {
     m_too_long = true;
     m_line = {};

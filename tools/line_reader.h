@@ -10,15 +10,15 @@
 /// Reads by blocks. A line ends with LF, CRLF or the input; it may hold any byte.
 class LineReader {
 public:
-    /// Bytes of the longest line. A longer one is passed over without being held.
+    /// Bytes of the longest line. A longer one is skipped without being stored.
     static constexpr std::size_t LONGEST = std::size_t{1} << 20;
 
-    /// @param before_waiting called before more input is asked for, which may not come for a while
+    /// @param before_waiting called before each read, which may block
     explicit LineReader(std::function<void()> before_waiting);
 
     /// Goes to the next line; false at the end. std::runtime_error when the input cannot be read.
     bool next();
-    /// The line without its end. Nothing of use when it is too long.
+    /// The line without its end. Unspecified when it is too long.
     std::string_view line() const { return m_line; }
     bool too_long() const { return m_too_long; }
     /// Counts from 1.
@@ -31,7 +31,7 @@ private:
 
     std::function<void()> m_before_waiting;
     std::vector<char> m_block;
-    std::size_t m_begin = 0;  ///< of what was not yet given
+    std::size_t m_begin = 0;  ///< start of the unread bytes
     std::size_t m_end = 0;
     std::string_view m_line;
     std::size_t m_number = 0;

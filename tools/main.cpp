@@ -48,7 +48,7 @@ int run_command(const Command& command, const std::vector<std::string>& argument
 }  // namespace
 
 int main(int count, char** arguments) {
-    // A reader that has gone away is an error of writing like any other.
+    // A closed pipe is a write error like any other.
     std::signal(SIGPIPE, SIG_IGN);
     std::vector<std::string> words(arguments + (count > 0 ? 1 : 0), arguments + count);
     std::string name = "basalt";

@@ -17,7 +17,7 @@ inline geo_llh read_place(Fields& fields) {
     return {latitude, fields.longitude(), 0.0};
 }
 
-/// An operand whose fields stand between commas, whatever the lines have; `name` is said in the InputError.
+/// An operand with fields between commas, in both formats; `name` appears in the InputError.
 template <typename Read>
 auto read_operand(const std::string& operand, const std::string& name, const Format& format, Read read) {
     Format with_commas = format;

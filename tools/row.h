@@ -1,4 +1,4 @@
-// The line that is written.
+// The output line.
 #ifndef TOOLS_ROW_H
 #define TOOLS_ROW_H
 
@@ -27,7 +27,7 @@ public:
     /// @}
     void whole(std::int64_t value);
     void text(std::string_view value);
-    /// A text that may hold anything: with --csv in quotes where it has to be.
+    /// Any text: quoted with --csv where it contains a comma, quote or blank at its ends.
     void any_text(std::string_view value);
 
 private:

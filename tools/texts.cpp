@@ -1,4 +1,4 @@
-// Hexadecimal text, and paths. Every line is a text here, whatever it begins with.
+// Hexadecimal text, and paths. Every line is text here, comments included.
 #include <basalt/files.h>
 #include <basalt/util.h>
 
@@ -32,8 +32,8 @@ Filter make_unhex(const CommandLine&, const Format&) {
     };
 }
 
-/// A path of bytes, each as the character of its number: what separates is ASCII, so no encoding need be
-/// known.
+/// A path of bytes, each widened to the character of that number: the separators are ASCII, so the encoding
+/// does not matter.
 CString widened(std::string_view path) {
     std::wstring text;
     for (const char c : path) {
@@ -97,7 +97,7 @@ const Command PATH = {
     "a path taken apart",
     "Reads a path, split at / and \\ alike. Writes DRIVE DIRECTORY NAME EXTENSION with a tab between them,\n"
     "or a comma with --csv, which puts what holds one in quotes, the line of --keep too. Joined they are\n"
-    "the path. The disk is not asked.",
+    "the path. The disk is not read.",
     {CSV, KEEP},
     {{"echo '/data/job.tar.gz' | basalt path --csv", ",/data/,job.tar,.gz"}},
     make_path,

@@ -90,7 +90,8 @@ Moment parse_moment(std::string_view text) {
     }
     moment.mjd = _greg2mjd(static_cast<std::uint16_t>(year), static_cast<std::uint16_t>(month),
                            static_cast<std::uint16_t>(day));
-    // A day past the month's end comes back as another, and days before the first MJD are beyond the last.
+    // A day past the month's end converts back to another day; days before the first MJD wrap beyond the
+    // last.
     const Date date = date_of(moment.mjd);
     if (moment.mjd > LAST_MJD || date.year != year || date.month != month || date.day != day) {
         fail("a date from 1858-11-17 to 65535-12-31");
@@ -103,7 +104,7 @@ std::string date_text(const Date& date) {
 }
 
 std::string moment_text(std::uint32_t mjd, double seconds, int digits) {
-    // In whole units of the last digit, so that nothing rounds up to a sixtieth second.
+    // In integer units of the last digit, so that no second rounds up to 60.
     const auto unit = static_cast<std::int64_t>(std::llround(std::pow(10, digits)));
     std::int64_t count = std::llround(seconds * static_cast<double>(unit));
     if (count >= SECONDS_OF_DAY * unit) {

@@ -35,7 +35,7 @@ bool begins_time_of_day(std::string_view text) {
     return skip_digits() == 2;
 }
 
-/// A date alone is midnight to whoever goes on with the result, so none may have lost its time of day.
+/// A date alone means midnight: refuse a line whose time of day was split off by a blank.
 Moment read_moment(Fields& fields) {
     const Moment moment = parse_moment(fields.text(A_TIME));
     if (!moment.seconds && begins_time_of_day(fields.rest())) {
@@ -50,7 +50,7 @@ void write_mjd(Fields& fields, Row& row, int digits) {
         row.whole(moment.mjd);
         return;
     }
-    // Apart from the days, which would take digits from the fraction.
+    // Separately from the days, which would cost digits of the fraction.
     const double unit = std::pow(10, digits);
     const double fraction = std::round(*moment.seconds / SECONDS_OF_DAY * unit);
     const std::int64_t days = std::int64_t{moment.mjd} + (fraction >= unit ? 1 : 0);
@@ -127,7 +127,7 @@ void write_javatime(Fields& fields, Row& row) {
     time.wYear = date.year;
     time.wMonth = date.month;
     time.wDay = date.day;
-    // A time of three decimals is not to lose its last millisecond to its binary form.
+    // Rounded: three decimals are not exact in binary.
     const auto milliseconds = static_cast<std::int64_t>(moment.seconds.value_or(0) * 1000 + 1e-4);
     time.wHour = static_cast<std::uint16_t>(milliseconds / 3'600'000);
     time.wMinute = static_cast<std::uint16_t>(milliseconds / 60'000 % 60);

@@ -29,7 +29,7 @@ Signed read_signed(Fields& fields, const char* what) {
     return {static_cast<int>(std::abs(*value)), field[0] == '-'};
 }
 
-/// `negative` counts unless all that is written rounds to 0.
+/// Writes the sign unless all fields round to 0.
 void write_signed(Row& row, int size, bool negative, bool all_zero) {
     const std::string digits = std::to_string(size);
     row.text(negative && !all_zero ? std::string(1, '-').append(digits) : digits);
@@ -39,7 +39,7 @@ bool rounds_to_zero(double value, int digits) {
     return std::round(value * std::pow(10, digits)) == 0;
 }
 
-/// Minutes and seconds rounded to so many digits, with what rounds up to 60 carried.
+/// Rounds minutes and seconds to a number of decimals and carries 60.
 struct Sexagesimal {
     int degrees;
     int minutes;
@@ -57,7 +57,7 @@ Sexagesimal rounded(double radians, int digits) {
         angle.seconds = 0;
         ++angle.minutes;
     } else if (std::round(angle.seconds * unit) < 0) {
-        // The library counts an angle just below a whole minute as that minute.
+        // The library rounds an angle just below a whole minute up to it.
         angle.seconds += 60;
         --angle.minutes;
     }
@@ -128,7 +128,7 @@ void write_feet(double metres, int denominator, const Format& format, Row& row) 
         throw InputError("the length is too large for feet and inches");
     }
     const double unit = std::pow(10, format.precision);
-    // A fraction that rounds up to a whole inch comes as none, and the inches as they are.
+    // The library drops a fraction that rounds up to a whole inch and leaves the inches.
     const bool carried = over == 0 && inches - std::floor(inches) >= 0.5;
     inches = denominator == 0 ? std::round(inches * unit) / unit : std::floor(inches) + (carried ? 1 : 0);
     if (inches >= 12) {

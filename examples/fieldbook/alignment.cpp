@@ -70,12 +70,12 @@ double smallest_radius(const Element& element, double from, double to) {
     return element.radius;
 }
 
-/// Into how many pieces a length has to be cut so that their chords stay within the sagitta.
+/// Number of chords that keep the sagitta.
 double pieces_within(double sagitta, double radius, double length) {
     if (radius == GEO_INFINITY) {
         return 1.0;
     }
-    // From the radius on a half turn would do; half the chord is then the radius itself.
+    // At a sagitta of the radius or more, half the chord is the radius.
     const double half = sagitta < radius ? geo_arc_to_chord(radius, sagitta) : radius;
     const double piece = geo_arc_angle_to_length(2.0 * std::asin(half / radius), radius);
     constexpr double ROUNDING = 1e-9;

@@ -1,4 +1,4 @@
-// The grid's place on the earth.
+// The grid's position on the earth.
 #ifndef FIELDBOOK_EARTH_H
 #define FIELDBOOK_EARTH_H
 

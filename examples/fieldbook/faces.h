@@ -1,4 +1,4 @@
-// The two faces of an instrument brought together.
+// Mean of the two faces of an instrument.
 #ifndef FIELDBOOK_FACES_H
 #define FIELDBOOK_FACES_H
 
@@ -10,7 +10,7 @@
 /// face has it.
 geo_hvd mean_of_faces(const Sight& sight);
 
-/// What the two faces of one sight tell about the instrument and the reading.
+/// Instrument errors and reading spread from the two faces of one sight.
 struct FaceDifference {
     double collimation;  ///< half the difference of the horizontal readings, face 1 less face 2, radians
     double index;        ///< half of what the zenith readings lack to or exceed 360 degrees, radians

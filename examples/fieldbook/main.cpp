@@ -12,7 +12,7 @@
 
 namespace {
 
-/// A slip of the fingers should not cost a field book.
+/// Refuses to overwrite an input file.
 void spare_inputs(const Options& options) {
     for (const std::string& input : {options.book, options.alignment.value_or(options.book)}) {
         std::error_code no_such_file;

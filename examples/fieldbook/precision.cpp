@@ -20,7 +20,7 @@ void add(Covariance& sum, double sigma, const geo_nee& g) {
 Precision::Precision(const Traverse& traverse, const InstrumentPrecision& instrument)
     : m_traverse(traverse), m_instrument(instrument) {}
 
-/// The errors of a slope distance and a zenith angle.
+/// Contribution of a slope distance and a zenith angle.
 void Precision::add_sight(Covariance& sum, const geo_hvd& observation) const {
     const double sine = std::sin(observation.vertical);
     const double cosine = std::cos(observation.vertical);
@@ -31,7 +31,7 @@ void Precision::add_sight(Covariance& sum, const geo_hvd& observation) const {
     add(sum, m_instrument.angle * observation.distance, {cosine * north, cosine * east, -sine});
 }
 
-/// The error of a horizontal angle, which turns everything beyond it about its station.
+/// Contribution of a horizontal angle, which rotates all later points about its station.
 void Precision::add_angle(Covariance& sum, const geo_nee& pivot, const geo_nee& point) const {
     add(sum, m_instrument.angle, {pivot.east - point.east, point.north - pivot.north, 0.0});
 }
@@ -49,7 +49,7 @@ Covariance Precision::station(std::size_t setup) const {
 }
 
 Covariance Precision::seen_from(std::size_t setup, const geo_hvd& observation, const geo_nee& point) const {
-    // The bearing of the back sight carries what the angles before have gathered.
+    // The back sight's bearing carries the errors of all earlier angles.
     Covariance sum = {};
     const bool at_end = m_traverse.closure && setup + 1 == m_traverse.stations.size();
     for (std::size_t i = at_end ? setup : 0; i <= setup; ++i) {

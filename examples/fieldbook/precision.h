@@ -1,4 +1,4 @@
-// How well a point is known, from how well its angles and distances are read.
+// Precision of points, from the precision of angles and distances.
 #ifndef FIELDBOOK_PRECISION_H
 #define FIELDBOOK_PRECISION_H
 

@@ -1,4 +1,4 @@
-// What to turn and measure to put a point into the ground.
+// Setting-out values: the angle to turn and the distance to measure.
 #ifndef FIELDBOOK_SETTING_OUT_H
 #define FIELDBOOK_SETTING_OUT_H
 

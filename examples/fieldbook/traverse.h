@@ -21,7 +21,7 @@ struct Leg {
     double rise_sum;    ///< rise of the fore sight and of the back sight together, metres
 };
 
-/// What the sums lack to the control points; measured less known.
+/// Misclosures: measured minus known.
 struct Closure {
     double north;
     double east;

@@ -1,4 +1,4 @@
-// What the library answers, by name.
+// The library's results, by name.
 #ifndef HOSTINFO_FACTS_H
 #define HOSTINFO_FACTS_H
 
@@ -20,7 +20,7 @@ struct Section {
     std::vector<Fact> facts;
 };
 
-/// Sets the library up from the options, as a host does at its start, and asks it everything.
+/// Configures the library from the options, as a host does at its start, and collects all results.
 std::vector<Section> gather_facts(const Options& options);
 
 #endif

@@ -1,4 +1,4 @@
-// What a host shows in its about box and writes into its diagnostics log.
+// Facts for a host's about box and diagnostics log.
 
 #include <filesystem>
 #include <string>
@@ -13,7 +13,7 @@
 
 namespace {
 
-/// A slip of the fingers should not cost the file that is asked about.
+/// Refuses to overwrite the file in question.
 void spare_path(const std::string& log, const std::string& path) {
     std::error_code no_such_file;
     if (std::filesystem::equivalent(system_path(log), system_path(path), no_such_file)) {

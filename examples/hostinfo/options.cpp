@@ -27,7 +27,7 @@ const Syntax SYNTAX = {
 
 namespace {
 
-/// The library cuts what is longer.
+/// The library truncates longer paths.
 std::string parse_folder(std::string_view name, const std::string& value) {
     constexpr int LONGEST = 259;
     if (CString(value.c_str()).GetLength() > LONGEST) {

@@ -12,7 +12,7 @@
 
 namespace {
 
-/// A text without what would break its line.
+/// Replaces control characters, which would break the line.
 CString one_line(CString text) {
     for (int i = 0; i < text.GetLength(); ++i) {
         if (text[i] < L' ' || text[i] == L'\x7F') {
@@ -80,7 +80,7 @@ struct AsJson {
 };
 
 /// A device or a pipe, open for writing for as long as a log writes to it: it holds nothing to look at
-/// afterwards, but can be asked whether it takes text.
+/// afterwards, but poll() and write() report whether it takes text.
 class Device {
 public:
     explicit Device(const std::filesystem::path& path)
@@ -93,7 +93,7 @@ public:
     Device(const Device&) = delete;
     Device& operator=(const Device&) = delete;
 
-    /// A full one refuses even nothing; a pipe that nobody reads was not opened.
+    /// A full device refuses even an empty write; a pipe without a reader was not opened.
     bool takes_text() const { return m_file >= 0 && write(m_file, "", 0) == 0; }
 
 private:
@@ -105,7 +105,7 @@ void log_text(const std::string& path, const CString& text) {
     log.Write(text);
 }
 
-/// Logs into a file or whatever has the name. False when the text is not there.
+/// Logs into a file, device or pipe. False when the text did not arrive.
 bool has_logged(const std::string& path, const CString& text) {
     const std::filesystem::path file = system_path(path);
     std::error_code unknown;
@@ -154,7 +154,7 @@ CString json_report(const std::vector<Section>& sections) {
 }
 
 std::string narrow(const CString& text) {
-    // By pieces, since the conversion is for short texts; they end with a line, for a mark of its own may
+    // In pieces, since the conversion is for short texts; they end with a line, since a combining mark may
     // belong to the letter before it.
     constexpr int PIECE = 1000;
     constexpr int LONGEST_CHARACTER = 16;
@@ -175,7 +175,7 @@ std::string narrow(const CString& text) {
 std::filesystem::path system_path(std::string path) {
     const CString text(path.c_str());
     if (text.Find(L'\xFFFD') >= 0) {
-        // Bytes that are no text stay as they are.
+        // Bytes that are not UTF-8 pass through unchanged.
         std::replace(path.begin(), path.end(), '\\', '/');
         return path;
     }
@@ -187,7 +187,7 @@ std::filesystem::path system_path(std::string path) {
 }
 
 void write_log(const std::string& path, const CString& text) {
-    // The log itself keeps silent about what goes wrong.
+    // The log itself reports no errors.
     if (!has_logged(path, text)) {
         throw std::runtime_error("cannot write the log " + path);
     }

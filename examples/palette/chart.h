@@ -1,4 +1,4 @@
-// All colours of the palette, and what becomes of a picture in them.
+// A chart of the palette's colours, and a picture reduced to them.
 #ifndef PALETTE_CHART_H
 #define PALETTE_CHART_H
 

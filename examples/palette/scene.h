@@ -1,4 +1,4 @@
-// A scene with the smooth passages of a photograph, made from nothing.
+// A generated scene with the smooth gradients of a photograph.
 #ifndef PALETTE_SCENE_H
 #define PALETTE_SCENE_H
 

@@ -1,4 +1,4 @@
-// A job that needs more memory than it may take: sorts a laser scan on temporary files and grids it.
+// An external-memory job: sorts a laser scan on temporary files and grids it.
 
 #include <basalt/memory.h>
 
@@ -79,7 +79,7 @@ std::string line_of(const Cell& cell) {
            metres(cell.lowest) + metres(cell.median) + metres(cell.highest) + "\n";
 }
 
-/// Adds the cells up, and gives them as text if so asked.
+/// Sums up the cells, and formats them if requested.
 std::string read_cells(const PointStore& store, bool wants_text, Outcome& outcome) {
     Progress progress("Reading cells", store.points());
     std::string text = wants_text ? "row,column,points,lowest,median,highest\n" : "";
@@ -112,7 +112,7 @@ std::string sort_and_grid(const CommandLine& line) {
         cells_file.emplace(*options.cells);
     }
     catch_interrupts();
-    // What a run that was killed has left in the folder.
+    // Files left in the folder by a killed run.
     vex_util::CMemoryMap::CleanUp();
 
     const Scan scan(options.points.value_or(DEFAULT_POINTS));

@@ -5,7 +5,7 @@
 #include <compare>
 #include <cstdint>
 
-/// A point of the scan, in whole millimetres and already told apart by cell: points sort by row, then column,
+/// A point of the scan, in whole millimetres and assigned to its cell: points sort by row, then column,
 /// then height, so that a cell's points come together with their median in the middle.
 struct Point {
     std::int32_t row;
@@ -17,7 +17,7 @@ struct Point {
 };
 static_assert(sizeof(Point) == 16);
 
-/// Adds up to the same for the same points in any order, and hardly ever for others.
+/// An order-independent checksum of points.
 inline std::uint64_t fingerprint(const Point& point) {
     std::uint64_t mixed =
         (static_cast<std::uint64_t>(point.row) << 32 | static_cast<std::uint32_t>(point.column));

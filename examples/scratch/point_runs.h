@@ -10,7 +10,7 @@
 
 #include "point.h"
 
-/// Takes points in any order and gives them back in order: each block of the allocator is filled and sorted
+/// External sort: each block of the allocator is filled and sorted
 /// alone, then all blocks are merged. What has been given back goes to the allocator block by block.
 class PointRuns {
 public:

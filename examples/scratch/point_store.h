@@ -16,7 +16,7 @@ public:
     static constexpr std::uint32_t MAP_BYTES = 64 << 20;
     static constexpr std::int64_t POINTS_IN_MAP = MAP_BYTES / sizeof(Point);
 
-    /// std::runtime_error when there is room neither on the disk nor in memory.
+    /// std::runtime_error when neither the disk nor memory has space.
     void add(const Point& point);
 
     const Point& at(std::int64_t index) const {

@@ -1,4 +1,4 @@
-// What the job found and what it took, as text.
+// The job's results and resources, as text.
 #ifndef SCRATCH_REPORT_H
 #define SCRATCH_REPORT_H
 

@@ -27,7 +27,7 @@ private:
     HBRUSH m_brush;
 };
 
-/// DumpBitmap says nothing of a file that it could not write: this asks the system first.
+/// DumpBitmap reports no failure to write the file: check first.
 void expect_writable(const std::string& path) {
     std::FILE* file = std::fopen(path.c_str(), "ab");
     if (file == nullptr) {

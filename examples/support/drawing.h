@@ -10,7 +10,7 @@
 
 enum class Align { LEFT, CENTRE, RIGHT };
 
-/// std::runtime_error when the platform has no room for the bitmap.
+/// std::runtime_error when the bitmap cannot be allocated.
 class Drawing {
 public:
     explicit Drawing(const Canvas& canvas);

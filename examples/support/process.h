@@ -1,4 +1,4 @@
-// What the program asks the system about itself.
+// Memory figures of this process.
 #ifndef EXAMPLES_PROCESS_H
 #define EXAMPLES_PROCESS_H
 

@@ -45,7 +45,7 @@ int decimals_for(double step) {
 /// Round values along a line of pixels that runs from one value to another.
 class Ticks {
 public:
-    /// Texts lie along the line, and need room for themselves, or across it.
+    /// Labels along the line need their own length, across it their height.
     Ticks(double from, double to, int pixels, bool along) : m_from(from), m_to(to), m_pixels(pixels) {
         constexpr int CLOSEST = 50;
         constexpr int BETWEEN = 20;
@@ -187,7 +187,7 @@ int draw_earthwork(const Map& map, Drawing& page, int left, int top) {
         top = draw_depths(page, left, top, "FILL", FILL, map.largest_fill, scale_end);
     }
     const auto figure = [&](const std::string& name, double value, double metres, const char* power) {
-        constexpr double MOST = 1e11;  // what there is room for
+        constexpr double MOST = 1e11;  // widest number that fits
         const bool in_km = value >= MOST;
         page.text(left, top, name + (in_km ? " KM" : " M") + power, INK);
         page.text(left + LEGEND_WIDTH, top, number_text(in_km ? value / metres : value, in_km ? 3 : 0), INK,

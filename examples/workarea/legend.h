@@ -10,7 +10,7 @@
 inline constexpr int MAP_TOP = 16;
 int map_left(const Map& map);
 
-/// An empty page with room for the map and its legend.
+/// An empty page for the map and its legend.
 Canvas page_for(const Map& map);
 
 /// Draws frame and legend on the page.

@@ -66,7 +66,7 @@ void spare_inputs(const Options& options) {
 
 std::string measure(const CommandLine& line) {
     const Options options = parse_options(line);
-    // Small inputs first: a mistake in them is told before a large terrain is read.
+    // Small inputs first: report a mistake in them before reading a large terrain.
     if (options.picture) {
         spare_inputs(options);
     }

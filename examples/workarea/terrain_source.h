@@ -23,8 +23,8 @@ struct GridFrame {
     double centre_latitude(int y) const { return south + (y + 0.5) * cell_size; }
 };
 
-/// No place on Earth is higher or lower, metres. What exceeds it is a marker such as -32768 that nobody
-/// declared.
+/// No place on Earth is higher or lower, metres. A larger value is a marker such as -32768 that the header
+/// does not declare.
 inline constexpr double LARGEST_ELEVATION = 20'000.0;
 
 /// Stands in a row for a cell without elevation.

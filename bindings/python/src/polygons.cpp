@@ -13,7 +13,7 @@ double number_at(const char* place) {
 }
 
 // Arguments: point's north and east, the outline's norths and easts, and a tolerance where there is one.
-// Mostly one outline meets many points: it is gathered anew only where it is another one.
+// Usually one outline meets many points: it is copied only when it changes.
 template <bool HAS_TOLERANCE, class Test>
 void each_point(char** arguments, const npy_intp* sizes, const npy_intp* steps, void*) {
     as_python_error([&] {

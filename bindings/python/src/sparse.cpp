@@ -27,7 +27,7 @@ using Cells = py::array_t<std::int32_t, py::array::c_style>;
 using Bytes = py::array_t<std::uint8_t, py::array::c_style>;
 using Flags = py::array_t<bool, py::array::c_style>;
 
-// An array over memory that it takes over, without a copy.
+// An array that takes ownership of memory, without a copy.
 template <class T>
 py::array_t<T> array_of(std::vector<T> values) {
     auto owner = std::make_unique<std::vector<T>>(std::move(values));
@@ -170,7 +170,7 @@ private:
     }
 
     // A batch is one step for other threads of Python, whose interpreter goes on meanwhile. The interpreter's
-    // lock is given up before this one is waited for, so that no two threads wait for each other.
+    // lock is released before this one is taken, which avoids a deadlock.
     template <class Work>
     void alone(Work work) {
         const py::gil_scoped_release others_run;

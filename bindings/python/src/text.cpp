@@ -51,7 +51,7 @@ py::str plain(const CString& text) {
     return py::reinterpret_steal<py::str>(made);
 }
 
-// Asks the disk, which may be a slow one, while other threads run.
+// Accesses the disk with the interpreter's lock released.
 template <class Work>
 auto meanwhile(Work work) {
     const py::gil_scoped_release others_run;

@@ -10,7 +10,7 @@ namespace basalt_python {
 
 namespace {
 
-// Whole numbers come as 64 bits; one that the library's type does not hold is refused, not cut.
+// Whole numbers arrive as 64 bits; one out of the range of the library's type is refused.
 template <class T>
 T narrow(std::int64_t value) {
     if (value < std::numeric_limits<T>::min() || value > std::numeric_limits<T>::max()) {

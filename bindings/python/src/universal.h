@@ -48,13 +48,13 @@ struct Results<std::tuple<T...>> {
     using Tuple = std::tuple<T...>;
 };
 
-// Numbers that are not what the caller expected are answers here, as documented, and no reason for NumPy to
-// warn of the flags that their computation left.
+// Markers and NaN are documented results, so clear the floating-point flags: NumPy would
+// warn of them.
 inline void forget_float_flags() {
     std::feclearexcept(FE_ALL_EXCEPT);
 }
 
-// An exception may not pass through NumPy, which holds no lock of the interpreter meanwhile.
+// An exception may not pass through NumPy, which runs without the interpreter's lock.
 template <class Loop>
 void as_python_error(Loop loop) noexcept {
     const auto raise = [](PyObject* type, const char* text) {

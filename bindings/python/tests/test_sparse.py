@@ -88,7 +88,7 @@ def test_nothing_is_cut_on_the_way_in():
         with pytest.raises(TypeError):
             whole.insert(0, 0, bad)
     single = Sparse2DArray("f4")
-    single.insert([0, 1, 2], 0, np.array([0.5, -1.0, 3.0]))  # narrower numbers of the same kind are asked for
+    single.insert([0, 1, 2], 0, np.array([0.5, -1.0, 3.0]))  # a narrower type of the same kind, explicitly
     assert single.find([0, 1, 2], 0)[0].tolist() == [0.5, -1.0, 3.0]
     with pytest.raises(TypeError):
         single.insert(0, 0, np.array([1j]))

@@ -1,7 +1,7 @@
 """Paths taken apart and put together, and what lies in a folder, as the library's hosts see them.
 
 What is put together has backslashes between its parts, which the library takes wherever it takes a path; other programs
-want them replaced by slashes.
+need them replaced by slashes.
 """
 import os
 import typing

@@ -81,7 +81,7 @@ class Sparse2DArray:
         return elements.view(self._dtype).reshape(shape), found.reshape(shape)
 
     def remove(self, x: npt.ArrayLike, y: npt.ArrayLike) -> np.ndarray:
-        """Empties cells, and tells which of them held an element."""
+        """Empties cells, and returns which of them held an element."""
         x, y, shape = _cells(x, y)
         return self._array.remove(x, y).reshape(shape)
 

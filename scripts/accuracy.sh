@@ -1,8 +1,8 @@
 #!/usr/bin/env bash
-# Measures the library's geodesy against independent programs and writes the tables of docs/accuracy.md.
+# Measures the geodesy against independent programs and writes the tables of docs/accuracy.md.
 # Usage: scripts/accuracy.sh            the tables, from 40,000 points and 40,000 lines
-#        scripts/accuracy.sh --data     the few hundred rows under tests/data/ that the tests hold us to
-# COUNT may be set to another number of points and lines. BUILD names the build directory (build/accuracy).
+#        scripts/accuracy.sh --data     the few hundred rows of tests/data/ that the tests compare with
+# COUNT is the number of points and lines, BUILD the build folder (build/accuracy).
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
@@ -18,7 +18,7 @@ geographiclib=$(GeodSolve --version | sed 's/.*GeographicLib version/GeographicL
 proj=$(cct --version 2>&1 | sed -n 's/.*Rel\. \([0-9.]*\).*/PROJ \1/p')
 columns() { tr -s ' \t' ',' ; }
 
-# Points, where they are earth-centred.
+# Points, with their Cartesian coordinates.
 write_points() {  # count, file
     "$accuracy" points "$1" >"$build/points.txt"
     {
@@ -28,7 +28,7 @@ write_points() {  # count, file
     } >"$2"
 }
 
-# Lines, where they end by the exact solver, and the shortest line to that end.
+# Lines, their ends by the exact solver, and the shortest line to each end.
 write_lines() {  # count, file
     "$accuracy" lines "$1" >"$build/lines.txt"
     GeodSolve -E -p 10 <"$build/lines.txt" >"$build/ends.txt"
@@ -49,7 +49,7 @@ fi
 
 write_points "${COUNT:-40000}" "$build/points.csv"
 write_lines "${COUNT:-40000}" "$build/lines.csv"
-# A second program, so that a fault of the first would show.
+# A second program, in case the first is wrong.
 apart=$(awk '{ print $2, $1, $3, 0 }' "$build/points.txt" | cct -d 12 +proj=cart +ellps=WGS84 |
     paste -d' ' - <(grep -v '^#' "$build/points.csv" | tr , ' ') |
     awk '{ d = sqrt(($1-$8)^2 + ($2-$9)^2 + ($3-$10)^2); if (d > most) most = d } END { printf "%.1e", most }')

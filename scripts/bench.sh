@@ -1,8 +1,8 @@
 #!/usr/bin/env bash
-# Measures the library beside its peers and prints a table of medians and ratios (peer / ours).
-# Usage: scripts/bench.sh [subject ...]          subjects are the files of bench/: plane rtree sparse memory ...
-# Without a subject: all of them, and the tables of docs/performance.md are written anew.
-# ROUNDS (7) and MIN_TIME (0.05 seconds a measurement in a round) may be set; a longer run is a quieter one.
+# Measures the library beside other libraries and prints tables of medians and ratios (peer / ours).
+# Usage: scripts/bench.sh [SUBJECT ...]          subjects are the files of bench/: plane rtree sparse memory ...
+# Without a subject: all, and the tables and the chart of docs/performance.md are rewritten.
+# ROUNDS (7) and MIN_TIME (0.05 seconds a measurement in a round) may be set; longer runs are steadier.
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
@@ -22,7 +22,7 @@ done
 
 machine() {
     local level2
-    level2=$(LC_ALL=C lscpu | sed -n 's/^L2 cache: *\([^ ].*\)/ \1 L2,/p')  # a virtual machine may not tell it
+    level2=$(LC_ALL=C lscpu | sed -n 's/^L2 cache: *\([^ ].*\)/ \1 L2,/p')  # not known on every virtual machine
     echo "$(LC_ALL=C lscpu | sed -n 's/^Model name: *//p'), $(nproc) processors,$level2" \
         "GCC $(g++ -dumpfullversion) at -O3, $(date -u +%F)," \
         "\`ROUNDS=${ROUNDS:-7} MIN_TIME=${MIN_TIME:-0.05} scripts/bench.sh\`"
@@ -31,7 +31,7 @@ machine() {
 [ ${#page[@]} -eq 0 ] || python3 scripts/bench_table.py "${page[@]}" machine --text "$(machine)"
 for subject in "${subjects[@]}"; do
     rounds=${ROUNDS:-7}
-    [ "$subject" != scale ] || rounds=1  # minutes each; it has no peer
+    [ "$subject" != scale ] || rounds=1  # takes minutes and has no peer
     rm -f "build/bench/$subject".*.json
     for round in $(seq "$rounds"); do
         "build/bench/bench/bench_$subject" --benchmark_min_time="${MIN_TIME:-0.05}" \
@@ -42,5 +42,8 @@ for subject in "${subjects[@]}"; do
     python3 scripts/bench_table.py "build/bench/$subject".*.json
     [ ${#page[@]} -eq 0 ] || python3 scripts/bench_table.py "${page[@]}" "$subject" "build/bench/$subject".*.json
 done
-[ ${#page[@]} -eq 0 ] || scripts/sizes.sh "${page[@]}"
-[ ${#page[@]} -eq 0 ] || scripts/header_cost.sh "${page[@]}"
+if [ ${#page[@]} -gt 0 ]; then
+    scripts/sizes.sh "${page[@]}"
+    scripts/header_cost.sh "${page[@]}"
+    python3 scripts/bench_chart.py
+fi

@@ -1,16 +1,16 @@
 #!/usr/bin/env python3
 """Turns rounds of benchmark results into a table: our median, and for each peer its median and the ratio peer / ours.
 
-A round is one run of a subject's program, in which everything is measured in random turns; a ratio is taken
-inside each round, and its median and its range over the rounds are told.
+A round is one run of a subject's program, which measures everything in random order. A ratio is formed within each
+round; the table has its median and range over the rounds.
 Benchmarks are named "<row>/<who>[/<argument>...]", with who = basalt for ours; arguments become part of the row.
-Who = limit_<what> is no peer but what the machine allows at best, and is told as times that limit.
-Fails when a name is no such name, a row has no figure of ours, or a benchmark reported an error, such as
-answers that differ from a peer's.
+Who = limit_<what> is the least that the machine allows; the table has our time as a multiple of it.
+Fails for any other name, for a row without a figure of ours, and when a benchmark reported an error, such as
+results that differ from a peer's.
 
 Usage: bench_table.py ROUND.json ...                    prints the table
-       bench_table.py --page PAGE SUBJECT ROUND.json ...    puts it between the page's marks of that subject
-       bench_table.py --page PAGE MARK --text TEXT          puts a text there
+       bench_table.py --page PAGE SUBJECT ROUND.json ...    writes it between the page's marks of that subject
+       bench_table.py --page PAGE MARK --text TEXT          writes a text there
 """
 import json
 import pathlib
@@ -79,12 +79,12 @@ def table(rounds):
             times = statistics.median(1 / r for r in ratios(rounds, row, limits[0]))
             limit = [f"{limits[0].removeprefix(LIMIT)} {number(median_of(rounds, row, limits[0]))}", f"{times:.2f}"]
         for who in peers or [None]:
-            told = ["", "", "", ""]
+            cells = ["", "", "", ""]
             if who:
                 seen = ratios(rounds, row, who)
-                told = [who, number(median_of(rounds, row, who)), f"{statistics.median(seen):.2f}",
+                cells = [who, number(median_of(rounds, row, who)), f"{statistics.median(seen):.2f}",
                         f"{min(seen):.2f} to {max(seen):.2f}"]
-            lines.append("| " + " | ".join(own + (told + limit if has_peers else [])) + " |")
+            lines.append("| " + " | ".join(own + (cells + limit if has_peers else [])) + " |")
             limit = ["", ""]
     return "\n".join(lines)
 

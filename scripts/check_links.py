@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
-"""Follows the links inside the project: from each page of Markdown, and within the reference.
+"""Checks the links inside the project: of each Markdown page, and within the reference.
 
-Usage: check_links.py HTML_FOLDER       prints each link that leads nowhere
+Usage: check_links.py HTML_FOLDER       prints each dead link
 """
 import pathlib
 import re
@@ -12,7 +12,7 @@ ELSEWHERE = re.compile(r"^(https?:|mailto:|javascript:|#|@ref )")
 
 
 def targets_of_markdown(text):
-    """What a page links to, outside blocks of code."""
+    """The targets of a page's links, outside code blocks."""
     text = re.sub(r"^```.*?^```", "", text, flags=re.S | re.M)
     text = re.sub(r"`[^`\n]*`", "", text)
     return re.findall(r"\]\(([^)\s]+)\)", text)
@@ -22,12 +22,12 @@ def targets_of_html(text):
     return re.findall(r'(?:href|src)="([^"]+)"', text)
 
 
-def lost(pages, targets_of):
+def dead_links(pages, targets_of):
     for page in pages:
         for target in targets_of(page.read_text("utf-8", "replace")):
             path = urllib.parse.unquote(target.partition("#")[0].replace("&amp;", "&"))
             if not ELSEWHERE.match(target) and not (page.parent / path).exists():
-                yield f"{page}: leads nowhere: {target}"
+                yield f"{page}: dead link: {target}"
 
 
 def main():
@@ -37,7 +37,7 @@ def main():
     pages = [page for pattern in ("*.md", "*/*.md", "*/*/*.md") for page in sorted(root.glob(pattern))
              if page.relative_to(root).parts[0] != "build"]
     html = sorted(pathlib.Path(sys.argv[1]).glob("**/*.html"))
-    errors = [*lost(pages, targets_of_markdown), *lost(html, targets_of_html)]
+    errors = [*dead_links(pages, targets_of_markdown), *dead_links(html, targets_of_html)]
     if not html:
         errors.append(f"{sys.argv[1]}: no reference there")
     sys.exit("\n".join(errors) if errors else 0)

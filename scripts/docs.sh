@@ -1,13 +1,12 @@
 #!/usr/bin/env bash
-# Makes the reference of the pages of docs/ and the docstrings of the public headers, and prints its front page's path.
-# A warning of Doxygen is an error, and so is a link to a page or picture that is not there.
+# Makes the reference from docs/ and the docstrings of the public headers, and prints the path of its first page.
+# A warning of Doxygen is an error, and so is a dead link.
 # Usage: scripts/docs.sh
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
 
 need_packages "${BUILD_PACKAGES[@]}" doxygen python3
-mkdir -p build
 make_reference() {
     cmake -S . -B build/docs -G Ninja -DBASALT_BUILD_TESTS=OFF -DBASALT_BUILD_EXAMPLES=OFF -DBASALT_BUILD_TOOLS=OFF \
         -DBASALT_BUILD_DOCS=ON &&

@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Builds the Python package into an environment of its own below build/python, and runs its tests.
+# Builds the Python package into an environment below build/python, and runs its tests.
 # Usage: scripts/python.sh [pytest options]
 #        scripts/python.sh bench                 measures batch calls beside NumPy, pyproj and shapely
 #        scripts/python.sh plot [GRID [PICTURE]]  draws the sample terrain, or another, into build/python/terrain.png

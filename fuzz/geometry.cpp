@@ -60,6 +60,10 @@ void compare_polygons(const std::vector<geo_nee>& v, const geo_nee& p, double to
                                            plain::point_on_line(v[0], v.back(), p, tolerance) == 1);
     require((band || crossing_parity_portable<VertexTest::NO>(n, v.data(), p) == 1) ==
             (plain::point_in_poly_2(n, v.data(), p, tolerance) == 1));
+    const basalt::PreparedPolygon prepared(v);
+    const basalt::PreparedPolygon copy = prepared;
+    require(prepared.contains(p) == (inside == 1));
+    require(copy.contains(p, tolerance) == (plain::point_in_poly_2(n, v.data(), p, tolerance) == 1));
     require(geo_point_on_polyline(n, v.data(), &p, tolerance) ==
             plain::point_on_polyline(n, v.data(), p, tolerance));
     require(geo_point_on_line(v[0], v.back(), p, tolerance) ==

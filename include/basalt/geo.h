@@ -21,6 +21,7 @@
 #include "basalt/geo/geodesic.h"
 #include "basalt/geo/observations.h"
 #include "basalt/geo/plane.h"
+#include "basalt/geo/prepared_polygon.h"
 #include "basalt/geo/records.h"
 #include "basalt/geo/time_scales.h"
 #include "basalt/geo/units.h"

@@ -2,7 +2,7 @@
 #ifndef BASALT_SRC_SPARSE_RTREE_VOLUME_H
 #define BASALT_SRC_SPARSE_RTREE_VOLUME_H
 
-#include "src/sparse/rtree_lanes.h"
+#include "src/sparse/rtree_simd.h"
 #include "src/sparse/rtree_node.h"
 
 namespace vex_util::rtree {

@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "basalt/sparse.h"
-#include "src/sparse/lock.h"
+#include "src/sparse/critical_section_wrapper.h"
 #include "src/sparse/sparse_contents.h"
 
 namespace vex_util {

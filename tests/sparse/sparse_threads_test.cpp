@@ -6,7 +6,7 @@
 #include <atomic>
 #include <thread>
 
-#include "src/sparse/lock.h"
+#include "src/sparse/critical_section_wrapper.h"
 #include "tests/sparse/array_inspection.h"
 #include "tests/sparse/visit_recorder.h"
 #include "tests/support/threads.h"

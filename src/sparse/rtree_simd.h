@@ -1,6 +1,6 @@
 // Four numbers at a time, in the compiler's vector types: the same bits as one at a time on every machine.
-#ifndef BASALT_SRC_SPARSE_RTREE_LANES_H
-#define BASALT_SRC_SPARSE_RTREE_LANES_H
+#ifndef BASALT_SRC_SPARSE_RTREE_SIMD_H
+#define BASALT_SRC_SPARSE_RTREE_SIMD_H
 
 #include <cmath>
 #include <cstring>

@@ -1,6 +1,6 @@
 // The recursive lock of a sparse array and its scope.
-#ifndef BASALT_SRC_SPARSE_LOCK_H
-#define BASALT_SRC_SPARSE_LOCK_H
+#ifndef BASALT_SRC_SPARSE_CRITICAL_SECTION_WRAPPER_H
+#define BASALT_SRC_SPARSE_CRITICAL_SECTION_WRAPPER_H
 
 #include <utility>
 

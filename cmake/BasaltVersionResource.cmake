@@ -2,9 +2,9 @@
 #                             [PRODUCT_NAME <text>] [INTERNAL_NAME <text>] [LEGAL_COPYRIGHT <text>]
 #                             [FILE_DESCRIPTION <text>] [COMMENT <text>] [FILE_VERSION <a[.b[.c[.d]]]>])
 #
-# Puts a version resource into a program, from which VersionInfo reads. Each number is at most 65535, missing ones
-# are 0; the file version is the product version unless given. The text "ProductVersion" is the product version as
-# written, the other texts are any UTF-8; one that is not given has no entry in the resource.
+# Adds a version resource, which VersionInfo reads, to a program. Each number is at most 65535, missing ones are 0;
+# FILE_VERSION defaults to PRODUCT_VERSION. The text "ProductVersion" is the product version as written, the other
+# texts are any UTF-8; a text that is not given has no entry in the resource.
 
 function(basalt_add_version_resource target)
   set(texts PRODUCT_NAME INTERNAL_NAME LEGAL_COPYRIGHT PRODUCT_VERSION FILE_DESCRIPTION COMMENT)
@@ -35,7 +35,7 @@ function(basalt_add_version_resource target)
     list(JOIN BASALT_${version} ", " BASALT_${version})
   endforeach()
 
-  # By way of a file: as words of a command line some texts would be taken for something else.
+  # Through a generated file: on a command line some texts would be taken for keywords.
   set(keys ProductName InternalName LegalCopyright ProductVersion FileDescription Comment)
   set(BASALT_TEXTS "")
   foreach(text key IN ZIP_LISTS texts keys)
@@ -47,7 +47,7 @@ function(basalt_add_version_resource target)
   get_target_property(binary_dir ${target} BINARY_DIR)
   set(source "${binary_dir}/${target}_version_resource.cpp")
   configure_file("${CMAKE_CURRENT_FUNCTION_LIST_DIR}/version_resource.cpp.in" "${source}" @ONLY)
-  # its names are its own where a host joins sources
+  # not joined with other sources, whose names could clash
   set_source_files_properties("${source}" PROPERTIES SKIP_UNITY_BUILD_INCLUSION ON)
   target_sources(${target} PRIVATE "${source}")
 endfunction()

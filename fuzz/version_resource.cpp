@@ -1,5 +1,5 @@
 // Version resources: any bytes as a block, and any bytes as a program's file.
-#include "src/platform/version_resource.h"
+#include "src/platform/system_info.h"
 
 #include <sys/mman.h>
 #include <unistd.h>

@@ -1,10 +1,9 @@
-// A file or standard input, line by line.
+// Standard input, line by line.
 #ifndef TOOLS_LINE_READER_H
 #define TOOLS_LINE_READER_H
 
 #include <cstddef>
 #include <functional>
-#include <string>
 #include <string_view>
 #include <vector>
 
@@ -14,12 +13,8 @@ public:
     /// Bytes of the longest line. A longer one is skipped without being stored.
     static constexpr std::size_t LONGEST = std::size_t{1} << 20;
 
-    /// @param path of a file, or `-` for standard input; InputError when it cannot be opened
     /// @param before_waiting called before each read, which may block
-    LineReader(std::string path, std::function<void()> before_waiting);
-    ~LineReader();
-    LineReader(const LineReader&) = delete;
-    LineReader& operator=(const LineReader&) = delete;
+    explicit LineReader(std::function<void()> before_waiting);
 
     /// Goes to the next line; false at the end. std::runtime_error when the input cannot be read.
     bool next();
@@ -34,8 +29,6 @@ private:
     void skip_rest();
     bool take(std::size_t length, std::size_t end_length);
 
-    std::string m_path;
-    int m_file;
     std::function<void()> m_before_waiting;
     std::vector<char> m_block;
     std::size_t m_begin = 0;  ///< start of the unread bytes

@@ -1,5 +1,5 @@
 /// @file
-/// The platform's types and calls that a host handles.
+/// The platform's types and calls that a host uses.
 #ifndef BASALT_PLATFORM_H
 #define BASALT_PLATFORM_H
 
@@ -13,6 +13,7 @@
 #include "basalt/platform/graphics_objects.h"
 #include "basalt/platform/graphics_types.h"
 #include "basalt/platform/region.h"
+#include "basalt/platform/text_types.h"
 #include "basalt/platform/types.h"
 
 #endif

@@ -10,9 +10,10 @@
 namespace {
 
 using basalt::platform::first_match_attributes;
+using basalt::platform::is_separator;
 using SearchScoper = HANDLEScoperBase<FindFileHandleCloser>;
 
-// For a search that failed: an answer that there is nothing would be made up if it was for want of memory.
+// After a failed search: out of memory must not pass for "no entry".
 void require_memory() {
     if (GetLastError() == ERROR_NOT_ENOUGH_MEMORY) {
         throw std::bad_alloc();
@@ -37,7 +38,7 @@ HANDLE find_first(const CString& path, WIN32_FIND_DATAW& entry) {
     return search;
 }
 
-// A time of the second entry, or of the first where that is the only one. False when there is none.
+// A time of the second match, or of the only one. False when there is none.
 bool find_time(const CString& path, FILETIME WIN32_FIND_DATAW::*which, FILETIME& time) {
     WIN32_FIND_DATAW entry;
     const SearchScoper search(find_first(path, entry));
@@ -55,10 +56,6 @@ CString joined(const CString& first, const CString& second) {
     return first + L'\\' + second;
 }
 
-bool is_separator(wchar_t ch) {
-    return ch == L'\\' || ch == L'/';
-}
-
 // Without its first and last separator.
 std::wstring_view trimmed(std::wstring_view directory) {
     if (!directory.empty() && is_separator(directory.back())) {
@@ -70,7 +67,7 @@ std::wstring_view trimmed(std::wstring_view directory) {
     return directory;
 }
 
-// In the storage that the text has, so that a path that is set again and again takes no memory.
+// Reuses the text's storage, so setting a path again does not allocate.
 void assign(CString& text, std::wstring_view characters) {
     const auto length = static_cast<int>(characters.size());
     characters.copy(text.GetBuffer(length), characters.size());
@@ -83,7 +80,7 @@ namespace vex_util {
 
 CFilePath::CFilePath() = default;
 
-// NOLINTNEXTLINE(modernize-pass-by-value): the published signature
+// NOLINTNEXTLINE(modernize-pass-by-value): the interface's signature
 CFilePath::CFilePath(const CString& path) : m_full_path(path) {
     split();
 }
@@ -105,14 +102,14 @@ void CFilePath::split() {
     assign(m_file_name_only, parts.name);
     assign(m_extension, parts.extension.substr(parts.extension.empty() ? 0 : 1));
     if (is_split && IsDirectory(m_full_path)) {
+        assign(m_file_name_only, {parts.name.data(), parts.name.size() + parts.extension.size()});
         m_directory_only = joined(m_directory_only, m_file_name_only);
         m_file_name_only.Empty();
     }
 }
 
 void CFilePath::Combine(const CString& first, const CString& second) {
-    // Built apart from the members, which the arguments may be; each up to its first zero, as text is
-    // formatted.
+    // The arguments may be members. Each up to its first zero, as "%s" takes it.
     m_full_path = CString(first.GetString()) + L'\\' + second.GetString();
     split();
 }
@@ -188,7 +185,7 @@ bool CFilePath::GetLastAccessTime(const CString& path, FILETIME& time) {
     return find_time(path, &WIN32_FIND_DATAW::ftLastAccessTime, time);
 }
 
-// NOLINTNEXTLINE(readability-make-member-function-const): the published signature
+// NOLINTNEXTLINE(readability-make-member-function-const): the interface's signature
 std::vector<CString> CFilePath::GetFilesInDirectory(const CString& pattern) {
     std::vector<CString> files;
     const CString prefix = Directory() + L'\\';

@@ -4,7 +4,7 @@
 
 #include "src/platform/file_search.h"
 
-// Holds a handle, null for none, and closes it in the closer's way.
+// Owns a handle, null for none, and closes it with Closer.
 template <class Closer>
 class HANDLEScoperBase {
 public:

@@ -29,7 +29,7 @@ const CString& Path::GetPath(unsigned char selector) const {
     const wchar_t* const path = m_path.GetString();
     wchar_t* end = m_result.GetBuffer(length);
     for (int part = 0; part < PARTS;) {
-        // Neighbours are copied at once.
+        // Adjacent parts are copied together.
         int next = part;
         while (next < PARTS && is_selected(next)) {
             ++next;

@@ -3,7 +3,7 @@
 #include <iterator>
 
 #include "basalt/frame.h"
-#include "src/platform/temporary_folder.h"
+#include "src/platform/file.h"
 
 namespace {
 

@@ -3,7 +3,7 @@
 #define BASALT_SRC_FRAME_OS_DETECTION_H
 
 #include "basalt/frame.h"
-#include "src/platform/version_query.h"
+#include "src/platform/system_info.h"
 
 namespace basalt::frame {
 

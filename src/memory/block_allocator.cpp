@@ -9,8 +9,6 @@
 #include "src/memory/block_allocator_segment.h"
 #include "src/platform/file.h"
 #include "src/platform/file_mapping.h"
-#include "src/platform/temporary_file.h"
-#include "src/platform/temporary_folder.h"
 
 namespace vex_lib {
 namespace {

@@ -7,7 +7,7 @@
 #include <cstdint>
 
 #include "basalt/memory/block_allocator.h"
-#include "src/platform/handle.h"
+#include "src/platform/file.h"
 
 namespace vex_lib {
 

@@ -1,34 +1,33 @@
 // Mapping a file, or anonymous pages, into memory.
 //
-// Space on the disk is reserved when the mapping is made, so that a full disk, a quota or a limit on the size
-// of files is a failed call, never a signal later.
-// A mapping has one view in its life: made with MapViewOfFile, which takes the file's descriptor back from
-// the system. Files that are mapped cost no descriptor.
-// Threads: thread-safe, each handle and view used by one thread at a time.
+// Disk space is reserved when the mapping is made, so a full disk, a quota or a limit on file sizes is a
+// failed call, never a signal later. A mapping has one view in its life: MapViewOfFile closes the file's
+// descriptor, so mapped files use none. Threads: thread-safe; each handle and view is used by one thread at a
+// time.
 #ifndef BASALT_SRC_PLATFORM_FILE_MAPPING_H
 #define BASALT_SRC_PLATFORM_FILE_MAPPING_H
 
 #include <cstddef>
 
 #include "basalt/platform/types.h"
-#include "src/platform/handle.h"
+#include "src/platform/file.h"
 #include "src/platform/virtual_memory.h"
 
 inline constexpr DWORD FILE_MAP_ALL_ACCESS = 0xF001F;
 
-// A mapping of the first size_high * 2^32 + size_low bytes of a file, which becomes at least that long (new
-// bytes are zero), or for INVALID_HANDLE_VALUE of so many zero bytes of memory. `security` and `name` are
-// null and `protection` is PAGE_READWRITE, or it is ERROR_INVALID_PARAMETER. Null on failure:
+// A mapping of the first size_high * 2^32 + size_low bytes of a file, which grows to that length if it is
+// shorter (new bytes are zero), or of that many zero bytes of memory for INVALID_HANDLE_VALUE. `security` and
+// `name` are null and `protection` is PAGE_READWRITE, else ERROR_INVALID_PARAMETER. Null on failure:
 // ERROR_INVALID_PARAMETER for anonymous pages of size 0, ERROR_FILE_INVALID for a file and size 0 or a file
 // that has been mapped before, ERROR_INVALID_HANDLE, ERROR_DISK_FULL, ERROR_FILE_TOO_LARGE,
-// ERROR_NOT_ENOUGH_MEMORY. The file may have grown then.
+// ERROR_NOT_ENOUGH_MEMORY. The file may have grown.
 HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD protection, DWORD size_high,
                           DWORD size_low, const wchar_t* name);
 
-// Maps the whole of a mapping: `access` is FILE_MAP_ALL_ACCESS, the offset 0, `size` the mapping's or 0, or
-// it is ERROR_INVALID_PARAMETER. The address, at the start of a page; the rest of the last page reads as zero
-// and is not kept. Null on failure: ERROR_INVALID_HANDLE, ERROR_NOT_ENOUGH_MEMORY, ERROR_NOT_SUPPORTED for a
-// second view.
+// Maps the whole of a mapping: `access` is FILE_MAP_ALL_ACCESS, the offset 0, `size` the mapping's or 0, else
+// ERROR_INVALID_PARAMETER. Returns a page-aligned address; the rest of the last page reads as zero and is not
+// written to the file. Null on failure: ERROR_INVALID_HANDLE, ERROR_NOT_ENOUGH_MEMORY, ERROR_NOT_SUPPORTED
+// for a second view.
 void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offset_low, std::size_t size);
 
 // Unmaps a view by its address, even when its mapping and file are closed. 1, or 0: ERROR_INVALID_ADDRESS

@@ -6,6 +6,10 @@
 
 namespace basalt::platform {
 
+constexpr bool is_separator(wchar_t ch) {
+    return ch == L'\\' || ch == L'/';
+}
+
 // The four parts of a path, in the place that it has: joined they are the path.
 struct PathParts {
     std::wstring_view drive, directory, name, extension;

@@ -4,13 +4,13 @@
 
 #include "basalt/platform/error.h"
 #include "basalt/util/hex.h"
-#include "src/platform/interface_table.h"
+#include "src/platform/system_info.h"
 
 namespace basalt {
 
 namespace {
 
-// How often the table is asked for again because interfaces were added since its size was told.
+// Interfaces may be added between the call for the size and the one for the table.
 constexpr int MAX_READINGS = 8;
 
 }  // namespace

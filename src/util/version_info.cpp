@@ -6,8 +6,7 @@
 #include <optional>
 #include <utility>
 
-#include "src/platform/module_file_name.h"
-#include "src/platform/version_resource.h"
+#include "src/platform/system_info.h"
 
 namespace {
 
@@ -22,7 +21,7 @@ constexpr int low_word(DWORD value) {
 std::vector<BYTE> read_resource() {
     wchar_t file[256];
     const DWORD length = GetModuleFileNameW(nullptr, file, std::size(file));
-    // A name that was cut could be that of another file.
+    // A truncated name could be that of another file.
     if (length == 0 || length == std::size(file)) {
         return {};
     }
@@ -35,7 +34,7 @@ std::vector<BYTE> read_resource() {
     return resource;
 }
 
-// A value of at least the record's size, copied from wherever it stands.
+// A value of at least the record's size, copied since it may be unaligned.
 template <class Record>
 std::optional<Record> record_at(const std::vector<BYTE>& resource, const wchar_t* path) {
     void* value = nullptr;
@@ -71,7 +70,7 @@ VersionInfo::VersionInfo() = default;
 
 bool VersionInfo::InitVersionInfo(HINSTANCE) {
     try {
-        // On a copy, so that a failure half-way leaves everything as it was.
+        // On a copy, so that a failure leaves everything as it was.
         VersionInfo found = *this;
         found.m_version_data = read_resource();
         if (found.m_version_data.empty()) {
@@ -102,7 +101,7 @@ bool VersionInfo::InitVersionInfo(HINSTANCE) {
     }
 }
 
-// The published signatures are not const.
+// The interface's signatures are not const.
 // NOLINTBEGIN(readability-make-member-function-const)
 
 int VersionInfo::GetMajorVersion() {

@@ -2,7 +2,6 @@
 #include "basalt/files.h"
 #include "basalt/platform/error.h"
 #include "src/platform/file.h"
-#include "src/platform/temporary_file.h"
 #include "tests/faults/trial.h"
 
 namespace basalt::faults {

@@ -65,7 +65,7 @@ struct FilePath {
         }
         extension = parts.extension.empty() ? L"" : parts.extension.substr(1);
         if (parts.valid && is_directory) {
-            directory += L"\\" + name;
+            directory += L"\\" + name + parts.extension;
             name.clear();
         }
     }

@@ -9,7 +9,7 @@
 #include <utility>
 
 #include "src/frame/environment_state.h"
-#include "src/platform/version_query.h"
+#include "src/platform/system_info.h"
 
 namespace {
 

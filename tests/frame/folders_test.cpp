@@ -7,7 +7,7 @@
 
 #include "basalt/frame.h"
 #include "src/frame/environment_state.h"
-#include "src/platform/temporary_folder.h"
+#include "src/platform/file.h"
 #include "tests/support/scratch_folder.h"
 
 namespace {

@@ -6,7 +6,7 @@
 #include <thread>
 
 #include "basalt/platform/error.h"
-#include "src/platform/version_query.h"
+#include "src/platform/system_info.h"
 
 namespace {
 

@@ -2,270 +2,254 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
-#include <atomic>
 #include <cerrno>
 #include <csignal>
-#include <cstdlib>
 #include <filesystem>
 #include <string>
-#include <thread>
 
 #include "basalt/platform/error.h"
+#include "basalt/util/file_logger.h"
+#include "src/platform/file_search.h"
 #include "src/platform/text/file_name.h"
+#include "tests/support/child.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
-#include "tests/support/threads.h"
-#include "tests/support/with_failing_allocations.h"
-#include "tests/support/with_failing_calls.h"
 
 namespace {
 
-using basalt::test::open_descriptors;
-using basalt::test::ScratchFolder;
+using basalt::test::in_child;
 using basalt::test::SystemFailure;
+using Names = std::set<std::string>;
+namespace fs = std::filesystem;
 
 constexpr DWORD BOTH = GENERIC_READ | GENERIC_WRITE;
-using Names = std::set<std::string>;
+const HANDLE NONE = INVALID_HANDLE_VALUE;
+
+struct File : testing::Test {
+    const basalt::test::ScratchFolder folder;
+};
 
 HANDLE open(const std::wstring& name, DWORD disposition, DWORD flags = FILE_FLAG_DELETE_ON_CLOSE) {
     SetLastError(0);
     return CreateFileW(name.c_str(), BOTH, 0, nullptr, disposition, flags, nullptr);
 }
-
 DWORD open_error(const std::wstring& name, DWORD disposition) {
-    EXPECT_EQ(open(name, disposition), INVALID_HANDLE_VALUE);
-    return GetLastError();
+    return open(name, disposition) == NONE ? GetLastError() : 0;
 }
-
 DWORD delete_error(const std::wstring& name) {
-    SetLastError(0);
-    EXPECT_EQ(DeleteFileW(name.c_str()), 0);
-    return GetLastError();
+    return DeleteFileW(name.c_str()) == 0 ? GetLastError() : 0;
 }
 
-TEST(File, is_held_alone_and_deleted_on_close) {
-    const ScratchFolder folder;
+TEST_F(File, is_held_alone_and_deleted_on_close) {
     const std::wstring name = folder.wide(L"~\x00E9\x4E2D\x1F600.mem");
-    const long descriptors = open_descriptors();
-    const HANDLE file = open(name, CREATE_NEW, FILE_ATTRIBUTE_HIDDEN | FILE_FLAG_DELETE_ON_CLOSE);
-    ASSERT_NE(file, INVALID_HANDLE_VALUE);
-    EXPECT_EQ(GetLastError(), 0U) << "success leaves it alone";
     const std::string on_disk = "~\xC3\xA9\xE4\xB8\xAD\xF0\x9F\x98\x80.mem";
-    EXPECT_EQ(folder.names(), Names{on_disk});
+    const long descriptors = basalt::test::open_descriptors();
+    const SystemFailure interrupted(1, SystemFailure::Then::RECOVERS, EINTR);
+    const HANDLE file = open(name, CREATE_NEW, FILE_ATTRIBUTE_HIDDEN | FILE_FLAG_DELETE_ON_CLOSE);
+    EXPECT_EQ(GetLastError(), 0U) << "success leaves it alone";
     struct stat status = {};
     ASSERT_EQ(stat((folder / on_disk).c_str(), &status), 0);
     EXPECT_EQ(status.st_mode & 0777U, 0600U);
-
     EXPECT_EQ(open_error(name, CREATE_NEW), ERROR_FILE_EXISTS);
     EXPECT_EQ(open_error(name, OPEN_EXISTING), ERROR_SHARING_VIOLATION) << "not even in this process";
     EXPECT_EQ(delete_error(name), ERROR_SHARING_VIOLATION);
-    const pid_t child = fork();
-    if (child == 0) {
-        const bool refused = delete_error(name) == ERROR_SHARING_VIOLATION;
-        std::exit(refused ? 0 : 1);  // by exit: a child's end must leave its parent's files
-    }
-    int result = -1;
-    waitpid(child, &result, 0);
-    EXPECT_EQ(result, 0);
-    EXPECT_EQ(folder.names(), Names{on_disk});
-
+    EXPECT_EQ(in_child([&] { std::exit(delete_error(name) == ERROR_SHARING_VIOLATION ? 0 : 1); }), 0);
+    EXPECT_EQ(folder.names(), Names{on_disk}) << "a child's end leaves its parent's files";
     EXPECT_EQ(CloseHandle(file), 1);
     EXPECT_EQ(folder.names(), Names{});
-    EXPECT_EQ(open_descriptors(), descriptors);
+    EXPECT_EQ(basalt::test::open_descriptors(), descriptors);
     EXPECT_EQ(CloseHandle(file), 0);
     EXPECT_EQ(GetLastError(), ERROR_INVALID_HANDLE);
 }
 
-// A host that runs without a console may have no standard input.
-TEST(File, may_get_descriptor_0) {
-    const ScratchFolder folder;
-    const int input = dup(STDIN_FILENO);
-    close(STDIN_FILENO);
-    const HANDLE file = open(folder.wide(L"first"), CREATE_NEW, FILE_FLAG_DELETE_ON_CLOSE);
-    EXPECT_NE(file, INVALID_HANDLE_VALUE);
-    EXPECT_NE(fcntl(STDIN_FILENO, F_GETFD), -1) << "the lowest free number is the file's";
-    CloseHandle(file);
-    EXPECT_EQ(folder.names(), Names{});
-    if (input >= 0) {
-        dup2(input, STDIN_FILENO);
-        close(input);
-    }
-}
-
-TEST(File, without_delete_on_close_it_stays) {
-    const ScratchFolder folder;
-    std::filesystem::create_directories(folder / "a/b");
+TEST_F(File, without_delete_on_close_it_stays) {
+    fs::create_directories(folder / "a/b");
     const HANDLE file = open(folder.wide(L"\\a\\/b\\x"), CREATE_NEW, FILE_ATTRIBUTE_NORMAL);
     EXPECT_EQ(CloseHandle(file), 1);
-    EXPECT_TRUE(std::filesystem::exists(folder / "a/b/x")) << "both separators lead to folders";
+    EXPECT_TRUE(fs::exists(folder / "a/b/x")) << "both separators work";
     const HANDLE again = open(folder.wide(L"a\\b\\x"), OPEN_EXISTING, 0x0C000102);
-    ASSERT_NE(again, INVALID_HANDLE_VALUE);
-    EXPECT_NE(again, file) << "a handle is not given out again";
+    EXPECT_NE(again, file) << "a handle is not reused";
     EXPECT_EQ(CloseHandle(again), 1);
-    EXPECT_FALSE(std::filesystem::exists(folder / "a/b/x"));
+    EXPECT_FALSE(fs::exists(folder / "a/b/x"));
 }
 
-TEST(File, failures_have_their_published_codes) {
-    const ScratchFolder folder;
+TEST_F(File, failures_have_their_win32_codes) {
     folder.write("file");
-    std::filesystem::create_directory(folder / "folder");
+    fs::create_directory(folder / "folder");
+    fs::create_symlink("nowhere", folder / "link");
     ASSERT_EQ(mkfifo((folder / "pipe").c_str(), 0600), 0);
-    const std::wstring no_character = folder.wide(L"\xD800");
     struct Row {
         std::wstring name;
         DWORD create, open, remove;
     };
+    const std::wstring here = folder.wide(L"");
     for (const Row& row :
-         {Row{L"", 3, 3, 3}, Row{folder.wide(L"missing/x"), 3, 3, 3}, Row{folder.wide(L"file/x"), 3, 3, 3},
-          Row{folder.wide(L"folder"), 80, 5, 5}, Row{folder.wide(L"pipe"), 80, 5, 0},
-          Row{no_character, 123, 123, 123}, Row{folder.wide(std::wstring(300, L'x')), 206, 206, 206}}) {
-        SCOPED_TRACE(::testing::PrintToString(row.name));
+         {Row{L"", 3, 3, 3}, Row{here + L"missing/x", 3, 3, 3}, Row{here + L"file/x", 3, 3, 3},
+          Row{here + L"folder", 80, 5, 5}, Row{here + L"pipe", 80, 5, 0},
+          Row{here + L"\xD800", 123, 123, 123}, Row{here + L"link", 80, 2, 0},
+          Row{here + std::wstring(300, L'x'), 206, 206, 206}}) {
+        SCOPED_TRACE(testing::PrintToString(row.name));
         EXPECT_EQ(open_error(row.name, CREATE_NEW), row.create);
         EXPECT_EQ(open_error(row.name, OPEN_EXISTING), row.open);
-        if (row.remove != 0) {
-            EXPECT_EQ(delete_error(row.name), row.remove);
-        }
+        EXPECT_EQ(delete_error(row.name), row.remove);
     }
-    EXPECT_EQ(DeleteFileW(folder.wide(L"\\pipe").c_str()), 1) << "deleted, never opened";
-    EXPECT_EQ(open_error(folder.wide(L"none"), OPEN_EXISTING), ERROR_FILE_NOT_FOUND);
-    EXPECT_EQ(delete_error(folder.wide(L"none")), ERROR_FILE_NOT_FOUND);
-    std::filesystem::create_symlink("nowhere", folder / "link");
-    EXPECT_EQ(DeleteFileW(folder.wide(L"link").c_str()), 1);
-    EXPECT_EQ(CreateFileW(nullptr, BOTH, 0, nullptr, CREATE_NEW, 0, nullptr), INVALID_HANDLE_VALUE);
-    EXPECT_EQ(DeleteFileW(nullptr), 0);
-
-    const std::wstring name = folder.wide(L"new");
-    EXPECT_EQ(CreateFileW(name.c_str(), GENERIC_READ, 0, nullptr, CREATE_NEW, 0, nullptr),
-              INVALID_HANDLE_VALUE);
-    EXPECT_EQ(CreateFileW(name.c_str(), BOTH, 1, nullptr, CREATE_NEW, 0, nullptr), INVALID_HANDLE_VALUE);
-    EXPECT_EQ(CreateFileW(name.c_str(), BOTH, 0, nullptr, 2, 0, nullptr), INVALID_HANDLE_VALUE);
-    EXPECT_EQ(CreateFileW(name.c_str(), BOTH, 0, nullptr, CREATE_NEW, 1, nullptr), INVALID_HANDLE_VALUE);
+    EXPECT_EQ(open_error(here + L"none", OPEN_EXISTING), 2U);
+    EXPECT_EQ(delete_error(here + L"none"), 2U);
+    const auto refuses = [&](const wchar_t* name, DWORD access, DWORD sharing, DWORD disposition,
+                             DWORD flags) {
+        return CreateFileW(name, access, sharing, nullptr, disposition, flags, nullptr) == NONE;
+    };
+    const wchar_t* const name = L"/tmp/new";
+    EXPECT_TRUE(refuses(nullptr, BOTH, 0, 1, 0) && DeleteFileW(nullptr) == 0);
+    EXPECT_TRUE(refuses(name, GENERIC_READ, 0, 1, 0) && refuses(name, BOTH, 1, 1, 0) &&
+                refuses(name, BOTH, 0, 2, 0) && refuses(name, BOTH, 0, 1, 1));
     EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
     EXPECT_EQ(folder.names(), (Names{"file", "folder"}));
 }
 
-TEST(File, names_that_are_no_utf8_come_back) {
-    using basalt::platform::file_name_from_wide;
-    using basalt::platform::wide_from_file_name;
+TEST_F(File, names_that_are_not_utf8_come_back) {
+    using namespace basalt::platform;
     std::string name;
     for (const char* bytes :
          {"plain", "\xC3\xA9", "\xEF\xBF\xBD", "a\xFFz", "\xC3\xA9\x80", "\xED\xA0\x80"}) {
-        ASSERT_TRUE(file_name_from_wide(wide_from_file_name(bytes), name)) << bytes;
-        EXPECT_EQ(name, bytes);
+        EXPECT_TRUE(file_name_from_wide(wide_from_file_name(bytes), name) && name == bytes) << bytes;
     }
     EXPECT_EQ(wide_from_file_name("a\xFFz"), L"a\xDCFFz");
 }
 
-TEST(File, deletes_what_it_opened_and_nothing_else) {
-    const ScratchFolder folder;
-    const auto before = std::filesystem::current_path();
-    std::filesystem::current_path(folder.path());
+TEST_F(File, deletes_what_it_opened_and_nothing_else) {
+    const fs::path before = fs::current_path();
+    fs::create_directory(folder / "gone");
+    fs::current_path(folder / "gone");
     const HANDLE relative = open(L"relative", CREATE_NEW);
-    std::filesystem::current_path(before);
+    fs::current_path(before);
     EXPECT_EQ(CloseHandle(relative), 1);
-    EXPECT_EQ(folder.names(), Names{});
-
-    const auto gone = folder / "gone";
-    std::filesystem::create_directory(gone);
-    std::filesystem::current_path(gone);
-    std::filesystem::remove(gone);
-    const DWORD error = open_error(L"relative", CREATE_NEW);
-    std::filesystem::current_path(before);
-    EXPECT_EQ(error, ERROR_PATH_NOT_FOUND) << "its folder is no more";
-
+    fs::current_path(folder / "gone");
+    fs::remove(folder / "gone");
+    EXPECT_EQ(open_error(L"relative", CREATE_NEW), ERROR_PATH_NOT_FOUND);
+    fs::current_path(before);
     const HANDLE replaced = open(folder.wide(L"replaced"), CREATE_NEW);
-    std::filesystem::remove(folder / "replaced");
-    folder.write("replaced", "somebody else's");
+    fs::remove(folder / "replaced");
+    folder.write("replaced", "another's");
     EXPECT_EQ(CloseHandle(replaced), 1);
     EXPECT_EQ(folder.names(), Names{"replaced"});
 }
 
-TEST(File, what_is_left_open_is_deleted_at_exit_but_not_when_killed) {
-    const ScratchFolder folder;
+TEST_F(File, left_open_it_is_deleted_at_exit_but_not_by_a_kill) {
     for (const bool is_killed : {false, true}) {
-        const pid_t child = fork();
-        if (child == 0) {
+        in_child([&] {
             open(folder.wide(L"left"), CREATE_NEW);
             is_killed ? static_cast<void>(raise(SIGKILL)) : std::exit(0);
-        }
-        waitpid(child, nullptr, 0);
+        });
         EXPECT_EQ(folder.names(), is_killed ? Names{"left"} : Names{});
     }
-    EXPECT_EQ(DeleteFileW(folder.wide(L"left").c_str()), 1);
+    EXPECT_EQ(delete_error(folder.wide(L"left")), 0U);
 }
 
-// Whoever deletes must never hit a file that has just been made under the name, nor the maker lose it.
-TEST(File, making_and_deleting_at_once_keep_out_of_each_others_way) {
-    const ScratchFolder folder;
-    std::atomic<bool> stops = false;
-    std::thread deleter([&] {
-        for (int i = 0; !stops; ++i) {
-            DeleteFileW(folder.wide(std::to_wstring(i % 2)).c_str());
+TEST_F(File, temporary_files_are_new_and_named_as_in_win32) {
+    const std::wstring plain = folder.wide(L"").substr(0, folder.path().size());
+    const std::wstring longest = std::wstring(MAX_PATH - 14 - plain.size(), L'/') + plain;
+    wchar_t name[MAX_PATH] = {};
+    for (const wchar_t* const prefix : {L"vma", L"vmax", L"v", L""}) {
+        for (const std::wstring& place : {plain, plain + L"\\", longest}) {
+            const UINT number = GetTempFileNameW(place.c_str(), prefix, 0, name);
+            wchar_t text[40];
+            std::swprintf(text, 40, L"%.3ls%X.tmp", prefix, number);
+            EXPECT_EQ(name, place + (place.back() == L'\\' ? L"" : L"/") + text);
+            EXPECT_TRUE(number >= 1 && number <= 0xFFFF && delete_error(folder.wide(text)) == 0);
         }
-    });
-    std::atomic<int> lost = 0;
-    basalt::test::run_threads(2, [&](int thread) {
-        for (int i = 0; i < 2000; ++i) {
-            const std::wstring name = folder.wide(std::to_wstring((i + thread) % 2));
-            const HANDLE file = open(name, CREATE_NEW);
-            if (file != INVALID_HANDLE_VALUE) {
-                std::this_thread::yield();
-                lost += std::filesystem::exists(name) ? 0 : 1;
-                CloseHandle(file);
-            } else if (GetLastError() != ERROR_FILE_EXISTS) {
-                ++lost;
-            }
-        }
-    });
-    stops = true;
-    deleter.join();
-    EXPECT_EQ(lost, 0);
+    }
+    const std::wstring last = name;
+    const auto error = [&](const std::wstring& place, const wchar_t* prefix, UINT unique) {
+        return GetTempFileNameW(place.c_str(), prefix, unique, name) == 0 ? GetLastError() : 0;
+    };
+    EXPECT_EQ(error(folder.wide(L"missing"), L"vma", 0), ERROR_PATH_NOT_FOUND);
+    EXPECT_EQ(error(L"/" + longest, L"vma", 0), ERROR_FILENAME_EXCED_RANGE);
+    EXPECT_EQ(error(plain, L"\xD800", 0), ERROR_INVALID_NAME);
+    EXPECT_EQ(error(plain, L"vma", 7), ERROR_INVALID_PARAMETER);
+    const SystemFailure taken(1, SystemFailure::Then::STAYS, EEXIST);
+    EXPECT_EQ(error(plain, L"vma", 0), ERROR_FILE_EXISTS);
+    EXPECT_EQ(name, last) << "unchanged";
     EXPECT_EQ(folder.names(), Names{});
 }
 
-TEST(File, every_failing_call_leaves_nothing_behind) {
-    const ScratchFolder folder;
-    folder.write("existing");
-    const std::wstring existing = folder.wide(L"existing");
-    const long descriptors = open_descriptors();
-    HANDLE file = nullptr;
-    for (const DWORD disposition : {CREATE_NEW, OPEN_EXISTING}) {
-        const std::wstring name = disposition == CREATE_NEW ? folder.wide(L"new") : existing;
-        basalt::test::with_failing_calls([&] { file = open(name, disposition, 0); },
-                                         [&](bool fails) {
-                                             EXPECT_EQ(file == INVALID_HANDLE_VALUE, fails);
-                                             EXPECT_EQ(GetLastError() != 0, fails);
-                                             EXPECT_EQ(folder.names().contains("new"),
-                                                       disposition == CREATE_NEW && !fails);
-                                             CloseHandle(file);
-                                             EXPECT_EQ(open_descriptors(), descriptors);
-                                             DeleteFileW(folder.wide(L"new").c_str());
-                                         });
+// Another user of the folder may put a link or a file of their own in the place of a new temporary file.
+TEST_F(File, a_new_temporary_file_is_reopened_or_nothing) {
+    folder.write("victim", "kept");
+    for (const int kind : {0, 1, 2}) {
+        wchar_t name[MAX_PATH] = {};
+        ASSERT_NE(GetTempFileNameW(folder.wide(L"").c_str(), L"vma", 0, name), 0U);
+        const fs::path made = std::wstring(name);
+        if (kind > 0) {
+            fs::remove(made);
+            kind == 1 ? fs::create_symlink("victim", made) : fs::create_hard_link(folder / "victim", made);
+        }
+        EXPECT_EQ(open_error(name, OPEN_EXISTING), kind == 0 ? 0U : kind == 1 ? 1921U : 5U);
+        EXPECT_EQ(open_error(folder.wide(L"none"), OPEN_EXISTING), 2U);
+        EXPECT_EQ(delete_error(name), kind == 0 ? 32U : 0U);
+        EXPECT_EQ(folder.read("victim"), "kept");
     }
-    basalt::test::with_failing_calls([&] { DeleteFileW(existing.c_str()); },
-                                     [&](bool fails) {
-                                         EXPECT_EQ(folder.names().size(), fails ? 1U : 0U);
-                                         EXPECT_EQ(open_descriptors(), descriptors);
-                                         folder.write("existing");
-                                     });
-    std::filesystem::remove(folder / "existing");
-    {
-        const SystemFailure interrupted(1, SystemFailure::Then::RECOVERS, EINTR);
-        file = open(existing, CREATE_NEW);
-        EXPECT_NE(file, INVALID_HANDLE_VALUE) << "a signal only makes the call begin anew";
-        EXPECT_EQ(CloseHandle(file), 1);
-    }
-    with_failing_allocations([&] { file = open(existing, CREATE_NEW); },
-                             [&](bool fails) {
-                                 EXPECT_EQ(file == INVALID_HANDLE_VALUE, fails);
-                                 EXPECT_EQ(CloseHandle(file), fails ? 0 : 1);
-                                 EXPECT_EQ(folder.names(), Names{});
-                             });
+}
+
+// Whatever the library opens stays away from the numbers of standard input, output and error.
+TEST_F(File, descriptors_are_above_standard_error) {
+    EXPECT_EQ(in_child([&] {
+                  for (const int standard : {0, 1, 2}) {
+                      close(standard);
+                  }
+                  const HANDLE file = open(folder.wide(L"file"), CREATE_NEW);
+                  WIN32_FIND_DATAW entry;
+                  const HANDLE search = FindFirstFileW(folder.wide(L"*").c_str(), &entry);
+                  const vex_util::FileLogger log((folder / "log").c_str());
+                  OutputDebugStringW(L"lost");
+                  EXPECT_TRUE(file != NONE && search != NONE && folder.names().size() == 2);
+                  for (const int standard : {0, 1, 2}) {
+                      EXPECT_EQ(fcntl(standard, F_GETFD), -1);
+                  }
+                  FindClose(search);
+                  CloseHandle(file);
+              }),
+              0);
+}
+
+// Standard error may be a full pipe, one without a reader, or a file at the limit on sizes.
+TEST_F(File, reports_raise_no_signal_and_do_not_block) {
+    const auto report = [](int error) {
+        dup2(error, STDERR_FILENO);
+        SetLastError(7);
+        for (int i = 0; i < 2000; ++i) {
+            OutputDebugStringW(std::wstring(100, L'x').c_str());
+        }
+        EXPECT_EQ(GetLastError(), 7U);
+    };
+    EXPECT_EQ(in_child([&] {
+                  int ends[2];
+                  ASSERT_EQ(pipe(ends), 0);
+                  report(ends[1]);
+                  close(ends[0]);
+                  sigset_t blocked, pending;
+                  sigemptyset(&blocked);
+                  sigaddset(&blocked, SIGPIPE);
+                  for (const bool was_pending : {false, true}) {
+                      if (was_pending) {
+                          sigprocmask(SIG_BLOCK, &blocked, nullptr);
+                          raise(SIGPIPE);
+                      }
+                      report(ends[1]);
+                      sigpending(&pending);
+                      EXPECT_EQ(sigismember(&pending, SIGPIPE), was_pending ? 1 : 0);
+                  }
+                  const rlimit limit = {1000, RLIM_INFINITY};
+                  setrlimit(RLIMIT_FSIZE, &limit);
+                  report(::open((folder / "errors").c_str(), O_CREAT | O_WRONLY, 0600));
+              }),
+              0);
+    EXPECT_EQ(folder.read("errors"), std::string(1000, 'x'));
 }
 
 }  // namespace

@@ -1,4 +1,4 @@
-#include "src/platform/version_resource.h"
+#include "src/platform/system_info.h"
 
 #include <gtest/gtest.h>
 
@@ -9,7 +9,6 @@
 #include <random>
 
 #include "basalt/platform/error.h"
-#include "src/platform/module_file_name.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/version_block.h"
 #include "tests/support/with_failing_allocations.h"

@@ -1,4 +1,4 @@
-// A folder of a test's own, which TMPDIR names while it lives; gone at the end with all that is in it.
+// A folder for one test, TMPDIR while it lives, deleted at the end with its contents.
 #ifndef BASALT_TESTS_SUPPORT_SCRATCH_FOLDER_H
 #define BASALT_TESTS_SUPPORT_SCRATCH_FOLDER_H
 
@@ -43,6 +43,10 @@ public:
         return found;
     }
 
+    std::string read(const std::string& name) const {
+        std::ifstream stream(*this / name, std::ios::binary);
+        return std::string(std::istreambuf_iterator<char>(stream), {});
+    }
     void write(const std::string& name, const std::string& text = "") const {
         std::ofstream(*this / name) << text;
     }

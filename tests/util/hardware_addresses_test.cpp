@@ -2,239 +2,123 @@
 
 #include <gtest/gtest.h>
 #include <ifaddrs.h>
-#include <net/if.h>
 #include <net/if_arp.h>
 #include <netpacket/packet.h>
 
 #include <algorithm>
 #include <cerrno>
-#include <filesystem>
-#include <fstream>
-#include <map>
-#include <optional>
+#include <span>
+#include <string>
 
-#include "src/platform/interface_table.h"
-#include "tests/support/with_failing_allocations.h"
+#include "src/platform/system_info.h"
+
+namespace {
+
+struct Interface {
+    int index;
+    unsigned short type;
+    std::string address;
+};
+std::vector<Interface> s_interfaces;        // of the machine, named by their indexes
+std::size_t s_shown = 0, s_shown_more = 0;  // how many getifaddrs() reports, and how many more each time
+int s_refusal = 0;                          // its errno
+
+}  // namespace
+
+// Linked in place of the system's calls (--wrap).
+extern "C" int __wrap_getifaddrs(ifaddrs** list) {
+    errno = s_refusal;
+    static std::vector<ifaddrs> entries;
+    static std::vector<sockaddr_ll> links;
+    static std::vector<std::string> names;
+    const std::size_t count = std::min(s_shown, s_interfaces.size());
+    entries.assign(count + 1, {});  // the first without an address
+    links.assign(count, {});
+    names.assign(count, {});
+    for (std::size_t i = 0; i < count; ++i) {
+        const auto& [index, type, address] = s_interfaces[i];
+        const auto length = static_cast<unsigned char>(address.size());
+        links[i] = {AF_PACKET, 0, index, type, 0, length, {}};
+        std::copy_n(address.begin(), std::min<std::size_t>(length, 8), links[i].sll_addr);
+        names[i] = "interface" + std::to_string(index);
+        entries[i].ifa_next = &entries[i + 1];
+        entries[i + 1].ifa_name = names[i].data();
+        entries[i + 1].ifa_addr = reinterpret_cast<sockaddr*>(&links[i]);
+    }
+    s_shown += s_shown_more;
+    *list = entries.data();
+    return s_refusal == 0 ? 0 : -1;
+}
+extern "C" void __wrap_freeifaddrs(ifaddrs*) {}
+extern "C" int __wrap_access(const char* path, int) {
+    const std::string file = path;
+    const char* const wireless[] = {"/sys/class/net/interface5/phy80211",
+                                    "/sys/class/net/interface6/wireless"};
+    return file == wireless[0] || file == wireless[1] ? 0 : -1;
+}
 
 namespace {
 
 using basalt::MACAddressFromMIBTable;
 using Texts = std::vector<std::string>;
 
-// What happens between the calls that the list is made by.
-std::optional<DWORD> vanished_index;
-std::size_t grows_by = 0;  // rows that appear, one after each call for the table
-DWORD table_error = 0;
-std::span<const MIB_IFROW> rows;
-int list_refusal = 0;            // errno
-ifaddrs* system_list = nullptr;  // null: the real one
-
-}  // namespace
-
-// The names the linker's --wrap makes of the platform's calls.
-extern "C" {
-int __real_getifaddrs(ifaddrs** list);
-int __wrap_getifaddrs(ifaddrs** list) {
-    if (list_refusal != 0) {
-        errno = list_refusal;
-        return -1;
+TEST(HardwareAddresses, are_those_of_ethernet_interfaces_by_ascending_index) {
+    s_interfaces = {{7, ARPHRD_ETHER, {"\0\x1A\x2B\x3C\x4D\x5E", 6}},
+                    {1, ARPHRD_LOOPBACK, "loop"},
+                    {5, ARPHRD_ETHER, "phy"},
+                    {6, ARPHRD_ETHER, "air"},
+                    {12, ARPHRD_ETHER, ""},
+                    {9, ARPHRD_TUNNEL, "t"},
+                    {3, ARPHRD_ETHER, "more than a row has"}};
+    const std::pair<std::size_t, Texts> rows[] = {
+        {0, {}}, {7, {"6d6f726520746861", "001a2b3c4d5e", ""}}, {1, {"001a2b3c4d5e"}}, {0, {}}};
+    MACAddressFromMIBTable list;
+    Texts all;
+    for (const auto& [shown, added] : rows) {
+        s_shown = shown;
+        all.insert(all.end(), added.begin(), added.end());
+        EXPECT_EQ(list.Create(), !all.empty()) << "the list keeps its addresses";
+        EXPECT_EQ(list.GetMACAddressesAsHexString(), all);
     }
-    *list = system_list;
-    return system_list != nullptr ? 0 : __real_getifaddrs(list);
-}
-void __real_freeifaddrs(ifaddrs* list);
-void __wrap_freeifaddrs(ifaddrs* list) {
-    if (list != system_list) {
-        __real_freeifaddrs(list);
-    }
-}
-DWORD __real__Z10GetIfEntryP9MIB_IFROW(MIB_IFROW* row);
-DWORD __wrap__Z10GetIfEntryP9MIB_IFROW(MIB_IFROW* row) {
-    return row->dwIndex == vanished_index ? 2 : __real__Z10GetIfEntryP9MIB_IFROW(row);
-}
-DWORD __real__Z10GetIfTableP11MIB_IFTABLEPji(MIB_IFTABLE* table, DWORD* size, BOOL sorted);
-DWORD __wrap__Z10GetIfTableP11MIB_IFTABLEPji(MIB_IFTABLE* table, DWORD* size, BOOL sorted) {
-    if (table_error != 0) {
-        return table_error;
-    }
-    const DWORD result = __real__Z10GetIfTableP11MIB_IFTABLEPji(table, size, sorted);
-    if (grows_by > 0) {
-        --grows_by;
-        rows = {rows.data(), rows.size() + 1};
-    }
-    return result;
-}
-}
-
-namespace {
-
-MIB_IFROW row(DWORD index, DWORD type, const std::vector<unsigned char>& address) {
-    MIB_IFROW row{};
-    row.dwIndex = index;
-    row.dwType = type;
-    row.dwPhysAddrLen = static_cast<DWORD>(address.size());
-    std::copy_n(address.begin(), std::min<std::size_t>(address.size(), 8), row.bPhysAddr);
-    return row;
-}
-
-class HardwareAddresses : public testing::Test {
-protected:
-    HardwareAddresses() {
-        basalt::platform::set_interface_table(&rows);
-        rows = {};
-    }
-    ~HardwareAddresses() override {
-        basalt::platform::set_interface_table(nullptr);
-        vanished_index.reset();
-        grows_by = 0;
-        list_refusal = 0;
-        system_list = nullptr;
-    }
-
-    MACAddressFromMIBTable m_list;
-};
-
-TEST_F(HardwareAddresses, ethernet_interfaces_by_ascending_index) {
-    MIB_IFROW all[] = {row(7, 6, {0x00, 0x1A, 0x2B, 0x3C, 0x4D, 0x5E}),
-                       row(1, 24, {0, 0, 0, 0, 0, 0}),
-                       row(12, 6, {}),
-                       row(5, 71, {1, 2, 3, 4, 5, 6}),
-                       row(9, 1, {1}),
-                       row(3, 6, {0xFF, 0xFE, 0xFD, 0, 1, 2, 3, 4})};
-    all[5].dwPhysAddrLen = 0xFFFFFFFF;  // beyond the record, so not believed
-    rows = all;
-    EXPECT_TRUE(m_list.GetMACAddressesAsHexString().empty());
-    EXPECT_TRUE(m_list.Create());
-    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), (Texts{"fffefd0001020304", "001a2b3c4d5e", ""}));
-    rows = {all, 1};
-    EXPECT_TRUE(m_list.Create());
-    const Texts more = {"fffefd0001020304", "001a2b3c4d5e", "", "001a2b3c4d5e"};
-    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), more);
-    const MACAddressFromMIBTable copy = m_list;
-    rows = {};
-    EXPECT_TRUE(m_list.Create()) << "what was gathered stays";
-    EXPECT_EQ(MACAddressFromMIBTable(copy).GetMACAddressesAsHexString(), more);
-}
-
-TEST_F(HardwareAddresses, none_is_there_or_the_system_refuses_to_tell) {
-    EXPECT_FALSE(m_list.Create());
-    MIB_IFROW only = row(2, 71, {1, 2, 3, 4, 5, 6});
-    rows = {&only, 1};
-    EXPECT_FALSE(m_list.Create()) << "a wireless one";
-    only.dwType = 6;
-    table_error = 50;
-    EXPECT_FALSE(m_list.Create());
-    EXPECT_TRUE(m_list.GetMACAddressesAsHexString().empty());
-
-    table_error = 0;
-    basalt::platform::set_interface_table(nullptr);
-    list_refusal = EMFILE;
-    DWORD size = 0;
-    EXPECT_EQ(GetIfTable(nullptr, &size, 0), 4U);
-    EXPECT_EQ(GetIfEntry(&only), 4U);
-    EXPECT_FALSE(m_list.Create());
-    list_refusal = ENOMEM;
-    EXPECT_EQ(GetIfTable(nullptr, &size, 0), 8U);
-    EXPECT_EQ(GetIfEntry(&only), 8U);
-    EXPECT_FALSE(m_list.Create());
-}
-
-TEST_F(HardwareAddresses, table_and_row_take_no_memory) {
-    basalt::platform::set_interface_table(nullptr);
-    char name[IF_NAMESIZE] = "fifteen-letters";
-    sockaddr_ll link{};
-    link.sll_family = AF_PACKET;
-    link.sll_ifindex = 7;
-    link.sll_hatype = ARPHRD_ETHER;
-    link.sll_halen = 6;
-    ifaddrs entry{};
-    entry.ifa_name = name;
-    entry.ifa_addr = reinterpret_cast<sockaddr*>(&link);
-    system_list = &entry;
-    MIB_IFTABLE table{};
-    DWORD size = sizeof table;
-    MIB_IFROW row{};
-    row.dwIndex = 7;
-    DWORD errors[2] = {1, 1};
-    const auto ask = [&] {
-        errors[0] = GetIfTable(&table, &size, 1);
-        errors[1] = GetIfEntry(&row);
-    };
-    const auto check = [&](bool) {
-        EXPECT_EQ(errors[0], 0U);
-        EXPECT_EQ(errors[1], 0U);
-    };
-    EXPECT_EQ(with_failing_allocations(ask, check), 0);
-    EXPECT_EQ(table.dwNumEntries, 1U);
-    EXPECT_EQ(row.dwType, 6U);
-    EXPECT_EQ(std::string(row.bDescr, row.bDescr + row.dwDescrLen), name);
-}
-
-TEST_F(HardwareAddresses, interfaces_that_come_and_go_meanwhile) {
-    std::vector<MIB_IFROW> all;
-    for (DWORD index = 1; index <= 20; ++index) {
-        all.push_back(row(index, 6, {static_cast<unsigned char>(index)}));
-    }
-    rows = {all.data(), 1};
-    grows_by = 4;
-    vanished_index = 2;
-    EXPECT_TRUE(m_list.Create());
-    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), (Texts{"01", "03", "04", "05"}));
-    MACAddressFromMIBTable never_ready;
-    grows_by = 15;
-    EXPECT_FALSE(never_ready.Create()) << "ends although the table grows at every reading";
-}
-
-std::string first_line(const std::filesystem::path& file) {
-    std::ifstream stream(file);
-    std::string line;
-    std::getline(stream, line);
-    return line;
-}
-
-// The machine's own interfaces, as its files tell them.
-TEST_F(HardwareAddresses, real_interfaces) {
-    namespace fs = std::filesystem;
-    basalt::platform::set_interface_table(nullptr);
-    std::map<int, std::string> by_index;
-    std::size_t seen = 0;
-    std::error_code error;
-    for (const fs::directory_entry& entry : fs::directory_iterator("/sys/class/net", error)) {
-        const fs::path& folder = entry.path();
-        if (!fs::exists(folder / "ifindex")) {
-            continue;
-        }
-        const int index = std::stoi(first_line(folder / "ifindex"));
-        if (if_nametoindex(folder.filename().c_str()) != static_cast<unsigned>(index)) {
-            GTEST_SKIP() << "/sys shows another network's interfaces";
-        }
-        ++seen;
-        if (first_line(folder / "type") == "1" && !fs::exists(folder / "phy80211") &&
-            !fs::exists(folder / "wireless")) {
-            by_index[index] = first_line(folder / "address");
-            std::erase(by_index[index], ':');
-        }
-    }
-    if (seen == 0) {
-        GTEST_SKIP() << "/sys is not mounted";
-    }
-    Texts expected;
-    for (const auto& [index, address] : by_index) {
-        expected.push_back(address);
-    }
-    EXPECT_EQ(m_list.Create(), !expected.empty());
-    EXPECT_EQ(m_list.GetMACAddressesAsHexString(), expected);
-
-    std::vector<unsigned char> bytes(4 + 860 * seen);
-    auto size = static_cast<DWORD>(bytes.size() - 1);
-    auto* const table = reinterpret_cast<MIB_IFTABLE*>(bytes.data());
+    s_shown = 7;
+    MIB_IFROW space[8];
+    auto* const table = reinterpret_cast<MIB_IFTABLE*>(space);
+    DWORD size = 4 + 7 * 860 - 1;
     EXPECT_EQ(GetIfTable(table, &size, 1), 122U);
-    EXPECT_EQ(size, bytes.size());
-    EXPECT_EQ(GetIfTable(table, &size, 1), 0U);
-    EXPECT_EQ(table->dwNumEntries, seen);
-    MIB_IFROW none{};
-    none.dwIndex = 0x7FFFFFFF;
-    EXPECT_EQ(GetIfEntry(&none), 2U);
+    EXPECT_EQ(size, 4U + 7 * 860);
+    EXPECT_EQ(GetIfTable(table, &size, 0), 0U);
+    std::string found;
+    for (const MIB_IFROW& row : std::span(table->table, table->dwNumEntries)) {
+        found +=
+            std::string(row.bDescr, row.bDescr + row.dwDescrLen) + "=" + std::to_string(row.dwType) + " ";
+    }
+    EXPECT_EQ(
+        found,
+        "interface7=6 interface1=24 interface5=71 interface6=71 interface12=6 interface9=1 interface3=6 ");
+}
+
+TEST(HardwareAddresses, end_when_interfaces_come_and_go_or_the_system_refuses) {
+    s_interfaces.clear();
+    for (int i = 1; i <= 20; ++i) {
+        s_interfaces.push_back({i, ARPHRD_ETHER, std::string(1, static_cast<char>(i))});
+    }
+    MACAddressFromMIBTable list;
+    s_shown = s_shown_more = 1;
+    EXPECT_FALSE(list.Create()) << "the table grows each time";
+    s_shown = 4;
+    s_shown_more = std::size_t{0} - 1;
+    EXPECT_TRUE(list.Create());
+    EXPECT_EQ(list.GetMACAddressesAsHexString(), Texts{"01"}) << "gone before their rows were read";
+    s_shown_more = 0;
+    const std::pair<int, DWORD> errors[] = {{EMFILE, 4}, {ENOMEM, 8}, {0, 2}};
+    for (const auto& [refusal, error] : errors) {
+        s_refusal = refusal;
+        DWORD size = 0;
+        MIB_IFROW row{};
+        EXPECT_EQ(GetIfEntry(&row), error);
+        EXPECT_EQ(GetIfTable(nullptr, &size, 0), refusal != 0 ? error : 122U);
+        EXPECT_EQ(MACAddressFromMIBTable().Create(), refusal == 0);
+    }
 }
 
 }  // namespace

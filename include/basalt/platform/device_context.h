@@ -25,11 +25,11 @@ BASALT_API BOOL DeleteDC(HDC dc);
 /// A context of the screen: 32 bits, and without a pixel that could be drawn or read.
 /// @param window null
 /// @return null for a window (ERROR_INVALID_HANDLE), or when there is no room
-BASALT_API HDC GetDC(HWND window);
+BASALT_API HDC GetDC(HWND__* window);
 
 /// Gives a context of GetDC back.
 /// @return 1; 0 for any other
-BASALT_API int ReleaseDC(HWND window, HDC dc);
+BASALT_API int ReleaseDC(HWND__* window, HDC dc);
 
 /// Makes a bitmap, brush or pen the one a context uses.
 /// @return the object of the same kind used before; null for a wrong handle, for a region, and for a bitmap

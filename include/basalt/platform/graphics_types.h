@@ -17,8 +17,11 @@ using HBRUSH = struct HBRUSH__*;
 using HPEN = struct HPEN__*;
 /// A region: a set of pixels.
 using HRGN = struct HRGN__*;
+struct HWND__;
+#ifndef __SQLTYPES_H  // unixODBC declares another HWND
 /// A window. There are none here, so the one valid value is null, which stands for the screen.
-using HWND = struct HWND__*;
+using HWND = HWND__*;
+#endif
 
 /// A colour, 0x00BBGGRR: red in the low byte. Drawing ignores the high byte.
 using COLORREF = DWORD;

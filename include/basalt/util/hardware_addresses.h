@@ -16,15 +16,14 @@ namespace basalt {
 /// Threads: one object is used by one thread at a time.
 class BASALT_API MACAddressFromMIBTable {
 public:
-    /// Appends the addresses of the Ethernet interfaces as they are now, in ascending order of their indexes:
+    /// Appends the addresses of the current Ethernet interfaces in ascending order of their indexes:
     /// connected or not, enabled or not, virtual ones (bridges, veth, tap) too; not wireless ones, loopback
-    /// or any other kind. A second call appends them again.
-    /// @return whether the list holds an address afterwards. What the system refuses to tell is missing.
-    /// Out of memory for the table or the list: std::bad_alloc; the list may have grown by some of the
-    /// addresses.
+    /// or any other type. A second call appends them again.
+    /// @return whether the list is not empty afterwards. What the system refuses to report is missing.
+    /// Out of memory: std::bad_alloc; some of the addresses may have been appended.
     bool Create();
 
-    /// The addresses in the order of the list, each as VectorToHexString() gives it: "001a2b3c4d5e". Empty
+    /// The addresses in the order of the list, each as VectorToHexString() gives it: "001a2b3c4d5e". An empty
     /// text for an interface without an address.
     std::vector<std::string> GetMACAddressesAsHexString();
 

@@ -9,24 +9,24 @@
 #include "basalt/platform/cstring.h"
 #include "basalt/platform/types.h"
 
-/// What the version resource of the running program's file says. The CMake function
-/// basalt_add_version_resource() of the installed package puts such a resource into a program.
+/// The version resource of the running program's file. The CMake function basalt_add_version_resource() of
+/// the installed package puts one into a program.
 ///
-/// A fresh object is version 1.0.0.1 with empty texts.
-/// Bad input: a resource is taken for what is sound in it; no length or offset in it is believed unchecked.
+/// A new object is version 1.0.0.1 with empty texts.
+/// Bad input: every length and offset in a resource is checked before it is used; what is valid is read.
 /// Threads: one object is used by one thread at a time, or by many for reading.
 class BASALT_API VersionInfo {
 public:
     /// Version 1.0.0.1, empty texts.
     VersionInfo();
 
-    /// Reads the resource of the program's file, whoever calls: four numbers from the product version of its
-    /// fixed information (not from the file version or a text), and six texts in the language that its
-    /// translation table lists first. Without fixed information the numbers stay as they were, without a
-    /// translation the texts; with one, a text that is missing becomes empty.
-    /// @param instance not used
-    /// @return false, and everything as it was, when the file cannot be read or holds no resource, when its
-    /// name has more than 255 characters, and when memory runs out
+    /// Reads the resource of the process's executable: four numbers from the product version of its fixed
+    /// information (not from the file version or a text), and six texts in the language that its translation
+    /// table lists first. Without fixed information the numbers are unchanged, without a translation the
+    /// texts; with one, a text that is missing becomes empty.
+    /// @param instance ignored
+    /// @return false, and everything unchanged, if the file cannot be read or has no resource, if its name
+    /// has more than 255 characters, or when out of memory
     bool InitVersionInfo(HINSTANCE instance);
 
     /// First part of the product version.

@@ -10,7 +10,7 @@
 #include <string_view>
 
 #include "src/platform/disk/open_file.h"
-#include "src/platform/temporary_file.h"
+#include "src/platform/file.h"
 #include "src/platform/text/file_name.h"
 
 namespace basalt::platform {
@@ -38,7 +38,7 @@ void delete_abandoned_files(const wchar_t* folder, const wchar_t* prefix) noexce
         if (!file_name_from_wide(folder, path) || !file_name_from_wide(prefix, start)) {
             return;
         }
-        const std::unique_ptr<DIR, CloseFolder> entries(::opendir(path.c_str()));
+        const std::unique_ptr<DIR, CloseFolder> entries(open_folder(path.c_str()));
         for (int i = 0; entries != nullptr && i < MOST_ENTRIES; ++i) {
             const dirent* const entry = ::readdir(entries.get());
             if (entry == nullptr) {

@@ -23,16 +23,14 @@ namespace {
 constexpr DWORD KNOWN_FLAGS = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_NORMAL | FILE_ATTRIBUTE_TEMPORARY |
                               FILE_FLAG_DELETE_ON_CLOSE | FILE_FLAG_SEQUENTIAL_SCAN;
 
-// The process that last opened a delete-on-close file: in a forked child, whose copy of the table may be
-// locked for ever, not the child unless it has done so itself.
-constinit std::atomic<ProcessMark> s_owner = ProcessMark();
-static_assert(std::atomic<ProcessMark>::is_always_lock_free);
-// Since then nobody else deletes what is made.
+// The process that last opened a delete-on-close file. A forked child that has opened none leaves the handle
+// table alone: its copy may be locked by a thread that does not exist.
+constinit std::atomic<ProcessMark> s_owner = 0;
+// The files have been deleted; one opened later is deleted by its opener.
 constinit std::atomic<bool> s_is_over = false;
 
-// At the process's end or at unload.
-struct DeletesWhatIsLeft {
-    ~DeletesWhatIsLeft() {
+struct DeleteAtExit {
+    ~DeleteAtExit() {
         if (s_owner.load() != this_process()) {
             return;
         }
@@ -46,7 +44,7 @@ struct DeletesWhatIsLeft {
 };
 
 void delete_at_exit() {
-    static const DeletesWhatIsLeft s_rest;
+    static const DeleteAtExit s_rest;
     s_owner.store(this_process());
 }
 
@@ -75,11 +73,11 @@ HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_AT
         if (error != ERROR_SUCCESS) {
             return fail_with(error, INVALID_HANDLE_VALUE);
         }
-        const HANDLE given = handle.give();
+        const HANDLE result = handle.give();
         if (deletes && s_is_over.load()) {
-            file->delete_at_exit();  // for a thread that goes on while the process ends
+            file->delete_at_exit();
         }
-        return given;
+        return result;
     });
 }
 

@@ -1,18 +1,16 @@
 #include "src/platform/file_mapping.h"
 
 #include <cstdint>
-#include <map>
 #include <memory>
-#include <mutex>
 #include <utility>
 
 #include "basalt/platform/error.h"
 #include "src/platform/disk/open_file.h"
 #include "src/platform/pages.h"
 #include "src/platform/system/handle_table.h"
-#include "src/platform/system/lock.h"
 #include "src/platform/system/no_destructor.h"
 #include "src/platform/system/out_of_memory.h"
+#include "src/platform/system/registry.h"
 
 namespace basalt::platform {
 namespace {
@@ -39,29 +37,11 @@ struct View {
     std::size_t size = 0;
 };
 
-using ViewMap = std::map<const void*, View>;
+using ViewRegistry = Registry<const void*, View>;
 
-struct Views {
-    Lock lock;
-    ViewMap by_address;
-};
-
-Views& views() noexcept {
-    static NoDestructor<Views> s_views;
+ViewRegistry& views() noexcept {
+    static NoDestructor<ViewRegistry> s_views;
     return *s_views;
-}
-
-void add(ViewMap::node_type&& view) noexcept {
-    Views& all = views();
-    const std::lock_guard<Lock> guard(all.lock);
-    all.by_address.insert(std::move(view));
-}
-
-// Out of the table while it is unmapped: the moment it is, another thread may be given its address.
-ViewMap::node_type take(const void* address) noexcept {
-    Views& all = views();
-    const std::lock_guard<Lock> guard(all.lock);
-    return all.by_address.extract(address);
 }
 
 DWORD map(FileMapping& mapping, std::byte*& address) noexcept {
@@ -79,6 +59,8 @@ using basalt::platform::fail_with;
 using basalt::platform::FileMapping;
 using basalt::platform::OpenFile;
 using basalt::platform::or_out_of_memory;
+using basalt::platform::ViewRegistry;
+using basalt::platform::views;
 
 HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD protection, DWORD size_high,
                           DWORD size_low, const wchar_t* name) {
@@ -119,23 +101,21 @@ void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offse
         return fail_with(ERROR_NOT_SUPPORTED, Address{});
     }
     return or_out_of_memory(Address{}, [&] {
-        basalt::platform::ViewMap single;
-        single.emplace(nullptr, basalt::platform::View{object->file(), object->size()});
-        auto view = single.extract(single.begin());
+        auto view = ViewRegistry::make_entry({object->file(), object->size()});
         std::byte* address = nullptr;
         const DWORD error = basalt::platform::map(*object, address);
         if (error != ERROR_SUCCESS) {
             return fail_with(error, Address{});
         }
         object->is_used = true;
-        view.key() = address;
-        basalt::platform::add(std::move(view));
+        views().add(address, view);
         return Address{address};
     });
 }
 
 BOOL UnmapViewOfFile(const void* address) {
-    auto view = basalt::platform::take(address);
+    // Taken out first: once it is unmapped, another thread may be given its address.
+    auto view = views().take(address);
     if (view.empty()) {
         return fail_with(ERROR_INVALID_ADDRESS, 0);
     }
@@ -145,7 +125,7 @@ BOOL UnmapViewOfFile(const void* address) {
                                  ? file->unmap(pages, size)
                                  : basalt::platform::unmap_pages(pages, basalt::platform::whole_pages(size));
     if (!is_unmapped) {
-        basalt::platform::add(std::move(view));
+        views().add(address, view);
         return fail_with(ERROR_NOT_ENOUGH_MEMORY, 0);
     }
     return 1;

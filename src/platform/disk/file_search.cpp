@@ -4,7 +4,6 @@
 #include <fcntl.h>
 #include <sys/stat.h>
 
-#include <algorithm>
 #include <cerrno>
 #include <iterator>
 #include <memory>
@@ -13,9 +12,10 @@
 #include <string_view>
 
 #include "basalt/platform/error.h"
+#include "src/platform/disk/open_file.h"
 #include "src/platform/disk/wildcard.h"
 #include "src/platform/errors/error_from_errno.h"
-#include "src/platform/file.h"
+#include "src/platform/path_split.h"
 #include "src/platform/system/handle_table.h"
 #include "src/platform/system/out_of_memory.h"
 #include "src/platform/text/file_name.h"
@@ -30,7 +30,7 @@ using basalt::platform::or_out_of_memory;
 
 namespace {
 
-// An open search. Its end is reached at once where it was for a path's own entry.
+// An open search; already at its end for the entry of a path without wildcards.
 class FileSearch final : public HandleObject {
 public:
     static constexpr Kind KIND = Kind::SEARCH;
@@ -44,17 +44,17 @@ public:
     FileSearch(const FileSearch&) = delete;
     FileSearch& operator=(const FileSearch&) = delete;
 
-    // Begins a search of a folder. ERROR_SUCCESS or what went wrong.
+    // Begins a search of a folder. ERROR_SUCCESS or an error.
     DWORD open(const char* folder, std::wstring_view pattern) {
         m_pattern = pattern;
-        m_folder = opendir(folder);
+        m_folder = basalt::platform::open_folder(folder);
         if (m_folder != nullptr) {
             return ERROR_SUCCESS;
         }
         return errno == ENOENT ? ERROR_PATH_NOT_FOUND : error_from_errno(errno);
     }
 
-    // Goes on to the next match. ERROR_SUCCESS, ERROR_NO_MORE_FILES or what went wrong.
+    // Moves to the next match. ERROR_SUCCESS, ERROR_NO_MORE_FILES or another error.
     DWORD advance();
     // The name of the match.
     const wchar_t* name() const { return m_name.c_str(); }
@@ -92,8 +92,8 @@ void describe(std::wstring_view name, const struct statx& status, WIN32_FIND_DAT
     entry.nFileSizeLow = static_cast<DWORD>(status.stx_size & 0xFFFFFFFF);
 }
 
-// What a link leads to, or the link itself where that is nothing. A link is rare, so it is not followed at
-// first: one call then answers for everything else, also for what is missing.
+// The status of a link's target, or of the link itself if that is missing. Links are rare, so they are not
+// followed at first: one call does for everything else, missing files included.
 bool query(int folder, const char* name, struct statx& status) {
     constexpr unsigned WANTED = STATX_BASIC_STATS | STATX_BTIME;
     if (statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) != 0) {
@@ -110,7 +110,7 @@ bool query(int folder, const char* name, struct statx& status) {
     return true;
 }
 
-// The same for the mode alone, of which the system has the least to tell by this call.
+// The same for the mode alone, by the cheapest call.
 bool query_mode(const char* name, mode_t& mode) {
     struct stat status;
     if (fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW) != 0) {
@@ -152,25 +152,25 @@ DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
         if (query(dirfd(m_folder), m_found->d_name, status)) {
             describe(m_name, status, entry);
         } else if (errno == ENOENT) {
-            continue;  // deleted meanwhile
+            continue;  // deleted in the meantime
         } else if (errno == ENOMEM) {
             return ERROR_NOT_ENOUGH_MEMORY;
         } else {
-            // A folder that may be read but not entered tells names and kinds alone.
+            // A folder that may be read but not entered gives only names and kinds.
             describe(m_name, m_found->d_type == DT_DIR ? S_IFDIR : S_IFREG, entry);
         }
         return ERROR_SUCCESS;
     }
 }
 
-// What a search is for.
+// The parts of a search path.
 struct Sought {
     std::wstring_view folder, last;  // the last element is empty behind a separator
     bool has_wildcards = false;      // in the last element
 
     explicit Sought(std::wstring_view path) {
         std::size_t start = path.size();
-        for (; start > 0 && path[start - 1] != L'\\' && path[start - 1] != L'/'; --start) {
+        for (; start > 0 && !basalt::platform::is_separator(path[start - 1]); --start) {
             has_wildcards |= path[start - 1] == L'*' || path[start - 1] == L'?';
         }
         folder = path.substr(0, start);
@@ -178,21 +178,21 @@ struct Sought {
     }
 };
 
-// Asks about a path's own entry. ERROR_SUCCESS or what went wrong.
-template <class Question>
-DWORD query_path(std::wstring_view path, Question question) {
+// Calls query_name for the path. ERROR_SUCCESS or an error.
+template <class Query>
+DWORD query_path(std::wstring_view path, Query query_name) {
     basalt::platform::FileName name;
     if (!name.set(path)) {
         return ERROR_INVALID_NAME;
     }
-    return question(name.c_str()) ? ERROR_SUCCESS : basalt::platform::error_of_path(name.c_str(), errno);
+    return query_name(name.c_str()) ? ERROR_SUCCESS : basalt::platform::error_of_path(name.c_str(), errno);
 }
 
 DWORD query_mode_of_path(std::wstring_view path, mode_t& mode) {
     return query_path(path, [&](const char* name) { return query_mode(name, mode); });
 }
 
-// Opens the folder of a search with wildcards. ERROR_SUCCESS or what went wrong.
+// Opens the folder of a search with wildcards. ERROR_SUCCESS or an error.
 DWORD open_folder(const Sought& sought, FileSearch& search) {
     basalt::platform::FileName name;
     return name.set(sought.folder.empty() ? L"." : sought.folder) ? search.open(name.c_str(), sought.last)
@@ -255,7 +255,7 @@ void basalt::platform::for_each_match(const wchar_t* path, const std::function<v
             visit(sought.last.data());
         }
     }
-    // An incomplete list is no answer.
+    // An incomplete list must not pass for the whole.
     if (error == ERROR_NOT_ENOUGH_MEMORY) {
         throw std::bad_alloc();
     }

@@ -8,13 +8,15 @@
 #include <algorithm>
 #include <cerrno>
 #include <filesystem>
+#include <functional>
 #include <mutex>
 #include <system_error>
+#include <utility>
 
 #include "basalt/platform/error.h"
 #include "src/platform/errors/error_from_errno.h"
 #include "src/platform/pages.h"
-#include "src/platform/system/file_size_signal.h"
+#include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"
 
 namespace basalt::platform {
@@ -22,9 +24,17 @@ namespace {
 
 constexpr mode_t ONLY_THIS_USER = 0600;
 
-// Between opening a file and locking it another process may have deleted it. It is tried again, but not for
-// ever.
+// Another process may delete a file between its opening and its locking; then it is tried again.
 constexpr int MAX_ATTEMPTS = 100;
+
+// The file a path has to lead to when this thread opens it next: others may write to the folder, too. Plain
+// data in the thread's initial memory, like the last error.
+struct ExpectedFile {
+    std::size_t path_hash = 0;
+    std::uint64_t device = 0;
+    std::uint64_t inode = 0;  // 0: none
+};
+[[gnu::tls_model("initial-exec")]] constinit thread_local ExpectedFile s_expected;
 
 template <class Call>
 int retried(Call call) noexcept {
@@ -36,13 +46,20 @@ int retried(Call call) noexcept {
 }
 
 int open_descriptor(const std::string& path, int flags) noexcept {
-    // A pipe must not make the call wait, nor a terminal become the process's own.
+    // A pipe must not block the call, nor a terminal become the controlling one.
     constexpr int ALWAYS = O_CLOEXEC | O_NONBLOCK | O_NOCTTY;
-    return retried([&] { return ::open(path.c_str(), flags | ALWAYS, ONLY_THIS_USER); });
+    const int opened = retried([&] { return ::open(path.c_str(), flags | ALWAYS, ONLY_THIS_USER); });
+    const int moved = above_standard(opened);
+    if (opened >= 0 && moved < 0 && (flags & O_CREAT) != 0) {
+        const int error = errno;
+        unlink(path.c_str());
+        errno = error;
+    }
+    return moved;
 }
 
-// Locks an open file that is still on the disk. These locks belong to the open file, not to the process, and
-// so keep out other openers within it too.
+// Locks an open file that is still on the disk. These locks belong to the open file, not to the process, so
+// they also keep out other openers within it.
 DWORD lock_alone(int descriptor, struct stat& status) noexcept {
     if (fstat(descriptor, &status) != 0) {
         return error_from_errno(errno);
@@ -56,7 +73,7 @@ DWORD lock_alone(int descriptor, struct stat& status) noexcept {
     if (retried([&] { return fcntl(descriptor, F_OFD_SETLK, &whole); }) != 0) {
         return errno == EAGAIN || errno == EACCES ? ERROR_SHARING_VIOLATION : error_from_errno(errno);
     }
-    // Only whoever holds the lock deletes, so from here on the answer stays.
+    // Only the holder of the lock deletes, so from here on the file stays.
     if (fstat(descriptor, &status) != 0) {
         return error_from_errno(errno);
     }
@@ -76,13 +93,21 @@ DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
         return ERROR_NOT_ENOUGH_MEMORY;
     }
     const bool creates = mode == Mode::CREATE;
+    const bool is_expected =
+        !creates && s_expected.inode != 0 && s_expected.path_hash == std::hash<std::string>{}(path);
+    const ExpectedFile expected = is_expected ? std::exchange(s_expected, {}) : ExpectedFile{};
+    const int flags = creates ? O_RDWR | O_CREAT | O_EXCL : is_expected ? O_RDWR | O_NOFOLLOW : O_RDWR;
     for (int attempt = 0; attempt < MAX_ATTEMPTS; ++attempt) {
-        const int descriptor = open_descriptor(path, creates ? O_RDWR | O_CREAT | O_EXCL : O_RDWR);
+        const int descriptor = open_descriptor(path, flags);
         if (descriptor < 0) {
             return error_of_path(path, errno);
         }
         struct stat status = {};
-        const DWORD error = lock_alone(descriptor, status);
+        DWORD error = lock_alone(descriptor, status);
+        if (error == ERROR_SUCCESS && is_expected &&
+            (status.st_dev != expected.device || status.st_ino != expected.inode)) {
+            error = ERROR_ACCESS_DENIED;
+        }
         if (error == ERROR_SUCCESS) {
             m_descriptor = descriptor;
             m_delete_path = delete_on_close ? std::move(absolute) : std::string();
@@ -92,7 +117,7 @@ DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
             m_is_open = true;
             return ERROR_SUCCESS;
         }
-        // A new file that somebody else has locked is about to be deleted: clean-up found it a moment ago.
+        // A new file that is already locked is about to be deleted by a clean-up.
         const bool was_deleted =
             error == ERROR_FILE_NOT_FOUND || (creates && error == ERROR_SHARING_VIOLATION);
         if (creates && !was_deleted) {
@@ -106,6 +131,10 @@ DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
     return ERROR_SHARING_VIOLATION;
 }
 
+void OpenFile::expect_at(const std::string& path) const noexcept {
+    s_expected = {std::hash<std::string>{}(path), m_device, m_inode};
+}
+
 DWORD OpenFile::reserve(std::uint64_t size) noexcept {
     const std::lock_guard<Lock> guard(m_guard);
     if (m_descriptor < 0) {
@@ -114,9 +143,9 @@ DWORD OpenFile::reserve(std::uint64_t size) noexcept {
     if (size > static_cast<std::uint64_t>(INT64_MAX)) {
         return ERROR_FILE_TOO_LARGE;
     }
-    const SigxfszBlocker held;
-    // In pieces: a file system in memory gives up a call that a signal interrupts, with all that it had
-    // reserved, and a host's timer may come sooner than a large file is done.
+    const OutputSignalBlocker blocker;
+    // In pieces: tmpfs undoes an interrupted fallocate, so a periodic signal would keep a large one from
+    // finishing.
     constexpr off_t PIECE = off_t{8} << 20;
     const auto end = static_cast<off_t>(size);
     int number = 0;
@@ -154,14 +183,14 @@ bool OpenFile::unmap(std::byte* view, std::size_t size) noexcept {
     if (mapped > page && !unmap_pages(view + page, mapped - page)) {
         return false;
     }
-    // Nobody is to use the page that keeps the lock; that it could be used would do no harm.
+    // The page that keeps the lock is not to be used; if this fails, no harm is done.
     (void)mprotect(view, page, PROT_NONE);
     m_lock_page = view;
     return true;
 }
 
-void OpenFile::delete_if_asked() noexcept {
-    // A forked child has copies of its parent's files, and somebody may have replaced the file by force.
+void OpenFile::delete_if_requested() noexcept {
+    // Not by a forked child, which has copies of its parent's files, and not a file that replaced this one.
     struct stat status = {};
     if (!m_delete_path.empty() && m_process == this_process() && stat(m_delete_path.c_str(), &status) == 0 &&
         status.st_dev == m_device && status.st_ino == m_inode) {
@@ -175,7 +204,7 @@ void OpenFile::close() noexcept {
         return;
     }
     m_is_open = false;
-    delete_if_asked();
+    delete_if_requested();
     if (m_descriptor >= 0) {
         ::close(m_descriptor);
         m_descriptor = -1;
@@ -187,10 +216,10 @@ void OpenFile::close() noexcept {
 }
 
 void OpenFile::delete_at_exit() noexcept {
-    // In a forked child the lock of a parent's file may be held by a thread that does not exist there.
+    // In a forked child a thread that does not exist may hold the lock of a parent's file.
     if (m_process == this_process()) {
         const std::lock_guard<Lock> guard(m_guard);
-        delete_if_asked();
+        delete_if_requested();
     }
 }
 
@@ -215,6 +244,16 @@ DWORD delete_file(const std::string& path) {
     }
     ::close(descriptor);
     return error;
+}
+
+DIR* open_folder(const char* path) noexcept {
+    const int descriptor = above_standard(::open(path, O_RDONLY | O_DIRECTORY | O_CLOEXEC | O_NONBLOCK));
+    DIR* const folder = descriptor >= 0 ? fdopendir(descriptor) : nullptr;
+    if (folder == nullptr && descriptor >= 0) {
+        ::close(descriptor);
+        errno = ENOMEM;
+    }
+    return folder;
 }
 
 }  // namespace basalt::platform

@@ -1,8 +1,7 @@
-#include "src/platform/temporary_file.h"
-
 #include <unistd.h>
 
 #include <atomic>
+#include <cstdlib>
 #include <cwchar>
 #include <string>
 #include <string_view>
@@ -10,10 +9,13 @@
 #include "basalt/platform/error.h"
 #include "src/platform/clock.h"
 #include "src/platform/disk/open_file.h"
+#include "src/platform/file.h"
+#include "src/platform/path_split.h"
 #include "src/platform/system/out_of_memory.h"
 #include "src/platform/text/file_name.h"
 
 using basalt::platform::fail_with;
+using basalt::platform::is_separator;
 using basalt::platform::or_out_of_memory;
 
 namespace {
@@ -22,12 +24,8 @@ constexpr std::size_t PREFIX_LENGTH = 3;
 constexpr std::size_t LONGEST_FOLDER = MAX_PATH - 14;
 constexpr UINT NUMBERS = 0xFFFF;
 
-bool is_separator(wchar_t ch) {
-    return ch == L'\\' || ch == L'/';
-}
-
-// Where to begin looking for a free number, 1 to NUMBERS. Going on from the last one, after a start that
-// differs between processes, finds one at once as a rule.
+// Where to look for a free number, 1 to NUMBERS: behind the last one, after a start that differs between
+// processes, so the first is usually free.
 UINT next_start() {
     static constinit std::atomic<UINT> s_last = 0;
     UINT last = s_last.load();
@@ -39,6 +37,23 @@ UINT next_start() {
 }
 
 }  // namespace
+
+DWORD GetTempPathW(DWORD length, wchar_t* buffer) {
+    return or_out_of_memory(DWORD{0}, [&] {
+        const char* const configured = std::getenv("TMPDIR");
+        const bool is_set = configured != nullptr && *configured != '\0';
+        std::wstring folder = basalt::platform::wide_from_file_name(is_set ? configured : "/tmp");
+        if (!is_separator(folder.back())) {
+            folder += L'/';
+        }
+        const auto needed = static_cast<DWORD>(folder.size());
+        if (needed >= length) {
+            return needed + 1;
+        }
+        std::wmemcpy(buffer, folder.c_str(), folder.size() + 1);
+        return needed;
+    });
+}
 
 UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique, wchar_t* name) {
     if (folder == nullptr || prefix == nullptr || unique != 0 || name == nullptr) {
@@ -65,6 +80,7 @@ UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique,
             basalt::platform::OpenFile file;
             const DWORD error = file.open(path, basalt::platform::OpenFile::Mode::CREATE, false);
             if (error == ERROR_SUCCESS) {
+                file.expect_at(path);
                 std::wmemcpy(name, full.c_str(), full.size() + 1);
                 return number;
             }

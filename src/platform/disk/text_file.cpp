@@ -1,7 +1,6 @@
 #include "src/platform/text_file.h"
 
 #include <fcntl.h>
-#include <sys/resource.h>
 #include <sys/single_threaded.h>
 #include <unistd.h>
 
@@ -9,50 +8,46 @@
 #include <cstring>
 #include <mutex>
 #include <new>
-#include <optional>
 #include <string>
 
 #include "src/platform/code_page.h"
-#include "src/platform/system/file_size_signal.h"
 #include "src/platform/system/forks.h"
-#include "src/platform/system/open_for_writing.h"
 #include "src/platform/system/out_of_memory.h"
-#include "src/platform/system/write_whole.h"
+#include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"
 
 namespace basalt::platform {
 
 namespace {
 
-// Bytes that are no text cannot be told in another encoding, so they are left as they are.
 std::string system_name(const char* path) {
     std::string name;
     file_name_from_wide(active_code_page().widen_name(path), name);
     return name;
 }
 
-// Those that are open; the newest first.
+// The open files, newest first.
 constinit Lock s_files_lock;
 constinit TextFile* s_files = nullptr;
 
 constinit std::atomic<bool> s_handles_forks = false;
 
-[[gnu::destructor]] void send_what_is_left() {
-    TextFile::send_all();
+[[gnu::destructor]] void flush_at_exit() {
+    TextFile::flush_all();
 }
 
 }  // namespace
 
 std::unique_ptr<TextFile> TextFile::open(const char* path) noexcept {
     return or_out_of_memory(std::unique_ptr<TextFile>(), [&] {
-        // The constructor is private, and want of memory caught.
+        // make_unique cannot reach the constructor.
         // NOLINTNEXTLINE(bugprone-unhandled-exception-at-new)
         std::unique_ptr<TextFile> file(new TextFile);
         if (!register_fork_handlers(s_handles_forks,
                                     {before_fork, after_fork_in_parent, after_fork_in_child})) {
             return std::unique_ptr<TextFile>();
         }
-        file->m_file = open_for_writing(system_name(path).c_str(), O_APPEND);
+        file->m_file = open_output(system_name(path).c_str(), O_APPEND);
         if (file->m_file < 0) {
             return std::unique_ptr<TextFile>();
         }
@@ -77,11 +72,11 @@ TextFile::~TextFile() {
             m_next->m_previous = m_previous;
         }
     }
-    send_own();
+    flush_own();
     ::close(m_file);
 }
 
-void TextFile::send_all() noexcept {
+void TextFile::flush_all() noexcept {
     const std::unique_lock files(s_files_lock, std::try_to_lock);
     if (!files) {
         return;
@@ -89,14 +84,14 @@ void TextFile::send_all() noexcept {
     for (TextFile* file = s_files; file != nullptr; file = file->m_next) {
         const std::unique_lock guard(file->m_lock, std::try_to_lock);
         if (guard) {
-            file->send_own();
+            file->flush_own();
         }
     }
 }
 
 void TextFile::write(std::wstring_view text) noexcept {
     const CodePage& code_page = active_code_page();
-    // As the C library's streams do: locking takes as long as converting a line, here for nobody to wait.
+    // As the C library's streams do: the lock costs as much as converting a line.
     std::unique_lock guard(m_lock, std::defer_lock);
     if (__libc_single_threaded == 0) {
         guard.lock();
@@ -108,20 +103,20 @@ void TextFile::write(std::wstring_view text) noexcept {
         char* const end = code_page.narrow_line_piece(text, PIECE, m_bytes + m_size, state);
         m_size = static_cast<std::size_t>(end - m_bytes);
         while (m_size > BUFFER) {
-            send(before > 0 ? before : m_size);
+            flush(before > 0 ? before : m_size);
             before = 0;
         }
     }
 }
 
-// What a forked child has not added to is its parent's to send.
-void TextFile::send_own() noexcept {
+// What a forked child has not added to is left to its parent.
+void TextFile::flush_own() noexcept {
     if (m_is_own) {
-        send(m_size);
+        flush(m_size);
     }
 }
 
-// So that the list is whole in the child, and its lock is free there.
+// The child gets a consistent list.
 void TextFile::before_fork() noexcept {
     s_files_lock.lock();
 }
@@ -130,8 +125,8 @@ void TextFile::after_fork_in_parent() noexcept {
     s_files_lock.unlock();
 }
 
-// A thread that was writing to a file is not here to finish: its lock is made anew. What the file held then
-// may be cut anywhere, and is the parent's in any case.
+// A lock held by a thread that does not exist here is replaced. Its buffer may be half written, and is the
+// parent's anyway.
 void TextFile::after_fork_in_child() noexcept {
     for (TextFile* file = s_files; file != nullptr; file = file->m_next) {
         if (!file->m_lock.try_lock()) {
@@ -143,15 +138,10 @@ void TextFile::after_fork_in_child() noexcept {
     s_files_lock.unlock();
 }
 
-// Takes bytes off the front of the buffer and gives them to the system.
-void TextFile::send(std::size_t count) noexcept {
-    // Asking whether there is a limit takes a quarter of the calls that holding its signal back takes.
-    std::optional<SigxfszBlocker> held;
-    rlimit limit{};
-    if (::getrlimit(RLIMIT_FSIZE, &limit) != 0 || limit.rlim_cur != RLIM_INFINITY) {
-        held.emplace();
-    }
-    write_whole(m_file, m_bytes, count);
+// Writes the first bytes of the buffer to the file.
+void TextFile::flush(std::size_t count) noexcept {
+    const OutputSignalBlocker blocker;
+    write_output(m_file, m_bytes, count);
     m_size -= count;
     std::memmove(m_bytes, m_bytes + count, m_size);
 }

@@ -1,4 +1,4 @@
-// Names and wildcards.
+// Wildcards.
 #ifndef BASALT_SRC_PLATFORM_DISK_WILDCARD_H
 #define BASALT_SRC_PLATFORM_DISK_WILDCARD_H
 
@@ -6,14 +6,14 @@
 
 namespace basalt::platform {
 
-// Whether a name matches a pattern: `*` is any characters, `?` one, everything else itself; "*.*" matches
-// every name. Takes at most the product of the two lengths in steps.
+// Whether a name matches a pattern: `*` matches any characters, `?` one, any other character itself; "*.*"
+// matches every name. Takes at most the product of the two lengths in steps.
 constexpr bool matches_wildcards(std::wstring_view name, std::wstring_view pattern) noexcept {
     if (pattern == L"*.*") {
         return true;
     }
-    // After a mismatch only the last star need take one character more: what the ones before it took is the
-    // shortest that leads there.
+    // After a mismatch only the last star has to match one character more: the earlier ones matched the
+    // shortest text that leads there.
     std::size_t n = 0;
     std::size_t p = 0;
     std::size_t star = std::wstring_view::npos;

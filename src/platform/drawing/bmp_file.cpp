@@ -1,5 +1,6 @@
 #include "src/platform/drawing/bmp_file.h"
 
+#include <fcntl.h>
 #include <stdlib.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -12,9 +13,7 @@
 #include "src/platform/errors/error_from_errno.h"
 #include "src/platform/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
-#include "src/platform/system/file_size_signal.h"
-#include "src/platform/system/open_for_writing.h"
-#include "src/platform/system/write_whole.h"
+#include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"
 
 namespace basalt::platform {
@@ -60,7 +59,7 @@ public:
 
 private:
     void write(const char* from, std::size_t count) {
-        if (m_error == 0 && !write_whole(m_file, from, count)) {
+        if (m_error == 0 && !write_output(m_file, from, count)) {
             m_error = errno;
         }
     }
@@ -142,14 +141,14 @@ bool write_bmp_file(const Surface& surface, const wchar_t* name) {
         SetLastError(ERROR_INVALID_NAME);
         return false;
     }
-    const int file = open_for_writing(file_name.c_str(), 0);
+    const int file = open_output(file_name.c_str(), 0);
     if (file < 0) {
         set_last_error_from_errno();
         return false;
     }
     struct stat begun = {};
     (void)::fstat(file, &begun);  // if it cannot be told, the file stays, empty
-    const SigxfszBlocker held;
+    const OutputSignalBlocker blocker;
     Writer writer(file);
     write_headers(surface, writer);
     for (int y = surface.height - 1; y >= 0 && writer.error() == 0; --y) {
@@ -158,7 +157,7 @@ bool write_bmp_file(const Surface& surface, const wchar_t* name) {
     writer.flush();
     int error = writer.error();
     // As long as one descriptor is open the file is told from any other; closing one may be what fails.
-    const int last = ::fcntl(file, F_DUPFD_CLOEXEC, 0);
+    const int last = ::fcntl(file, F_DUPFD_CLOEXEC, STDERR_FILENO + 1);
     if (last >= 0 && ::close(file) != 0 && error == 0) {
         error = errno;
     }

@@ -1,13 +1,11 @@
 #include "basalt/platform/error.h"
 
-#include <unistd.h>
-
 #include <array>
 #include <atomic>
 #include <cerrno>
 #include <cstddef>
 
-#include "src/platform/system/write_whole.h"
+#include "src/platform/system/output.h"
 #include "src/platform/text/utf8.h"
 
 using basalt::platform::DebugOutputHandler;
@@ -28,12 +26,12 @@ void write_as_utf8(const wchar_t* text) {
     std::size_t used = 0;
     for (; *text != L'\0'; ++text) {
         if (buffer.size() - used < basalt::platform::MAX_UTF8_BYTES) {
-            basalt::platform::write_whole(STDERR_FILENO, buffer.data(), used);
+            basalt::platform::write_report(buffer.data(), used);
             used = 0;
         }
         used += basalt::platform::encode_utf8(*text, buffer.data() + used);
     }
-    basalt::platform::write_whole(STDERR_FILENO, buffer.data(), used);
+    basalt::platform::write_report(buffer.data(), used);
 }
 
 }  // namespace

@@ -1,4 +1,4 @@
-#include "src/platform/interface_table.h"
+#include "src/platform/system_info.h"
 
 #include <ifaddrs.h>
 #include <net/if.h>
@@ -19,16 +19,14 @@
 
 namespace {
 
-constinit const std::span<const MIB_IFROW>* stand_in = nullptr;
-
-// The folder is that of the network which the file system was mounted in, so nothing else is asked of it.
+// Used for nothing else: /sys shows the network namespace it was mounted in.
 bool has_file(const char* name, const char* file) {
     char path[sizeof "/sys/class/net//phy80211" + IF_NAMESIZE];
     const int length = std::snprintf(path, sizeof path, "/sys/class/net/%s/%s", name, file);
     return length >= 0 && static_cast<std::size_t>(length) < sizeof path && ::access(path, F_OK) == 0;
 }
 
-// Wireless interfaces report themselves as Ethernet; only this tells them apart.
+// Wireless interfaces report themselves as Ethernet; this is the only difference.
 bool is_wireless(const char* name) {
     return has_file(name, "wireless") || has_file(name, "phy80211");
 }
@@ -55,25 +53,17 @@ MIB_IFROW row_of(const sockaddr_ll& link, const char* name) {
     return row;
 }
 
-// Calls `visit` with the row of each interface whose index is wanted, in the system's order; the result is 0
-// or what the system refused.
+// Calls `visit` with the row of each interface whose index is wanted, in the system's order. 0 or the
+// system's error.
 template <class Wanted, class Visit>
 DWORD visit_interfaces(const Wanted& wanted, const Visit& visit) {
-    if (stand_in != nullptr) {
-        for (const MIB_IFROW& row : *stand_in) {
-            if (wanted(row.dwIndex)) {
-                visit(row);
-            }
-        }
-        return ERROR_SUCCESS;
-    }
     ifaddrs* first = nullptr;
     if (::getifaddrs(&first) != 0) {
         return basalt::platform::error_from_errno(errno);
     }
     const std::unique_ptr<ifaddrs, decltype(&::freeifaddrs)> list(first, ::freeifaddrs);
     for (const ifaddrs* entry = first; entry != nullptr; entry = entry->ifa_next) {
-        // One of these for every interface, whatever its state.
+        // One for each interface, whatever its state.
         if (entry->ifa_addr != nullptr && entry->ifa_addr->sa_family == AF_PACKET) {
             sockaddr_ll link;
             std::memcpy(&link, entry->ifa_addr, sizeof link);
@@ -122,11 +112,3 @@ DWORD GetIfEntry(MIB_IFROW* row) {
     });
     return error != ERROR_SUCCESS || found ? error : ERROR_FILE_NOT_FOUND;
 }
-
-namespace basalt::platform {
-
-void set_interface_table(const std::span<const MIB_IFROW>* rows) {
-    stand_in = rows;
-}
-
-}  // namespace basalt::platform

@@ -1,4 +1,4 @@
-#include "src/platform/version_resource.h"
+#include "src/platform/system_info.h"
 
 #include <elf.h>
 #include <fcntl.h>
@@ -15,6 +15,7 @@
 #include "basalt/platform/error.h"
 #include "src/platform/errors/error_from_errno.h"
 #include "src/platform/system/out_of_memory.h"
+#include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"
 
 using basalt::platform::fail_with;
@@ -22,19 +23,20 @@ using basalt::platform::or_out_of_memory;
 
 namespace {
 
-constexpr DWORD SMALLEST_BLOCK = 6;  // its three words
+constexpr DWORD SMALLEST_BLOCK = 6;  // three words
 
 struct Range {
     std::uint64_t offset;
     std::uint64_t size;
 };
 
-// A file whose every read is known to lie within it.
+// A file in which no read goes beyond its size.
 class BoundedFile {
 public:
     explicit BoundedFile(const std::string& name)
-        // Without waiting for the other end of a pipe.
-        : m_descriptor(::open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK)) {
+        // Non-blocking: the name may be a pipe's.
+        : m_descriptor(
+              basalt::platform::above_standard(::open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK))) {
         struct stat status {};
         if (m_descriptor >= 0 && ::fstat(m_descriptor, &status) == 0 && S_ISREG(status.st_mode)) {
             m_size = static_cast<std::uint64_t>(status.st_size);
@@ -92,7 +94,7 @@ bool read_section_header(const BoundedFile& file, const FileHeader& header, unsi
            file.read(table.offset + index * sizeof section, &section, sizeof section);
 }
 
-// Looked for by name: the block's own keys occur in other sections of this library's programs too.
+// By name: the block's keys also occur in other sections of programs with this library.
 std::optional<Range> find_section(const BoundedFile& file) {
     FileHeader header;
     SectionHeader names;
@@ -143,7 +145,7 @@ std::optional<Range> open_block(const BoundedFile& file) {
     return block;
 }
 
-// Empty, which opens nothing, for a name that no file has.
+// Empty, which opens nothing, for a name that is not a valid one.
 std::string system_name(const wchar_t* file_name) {
     std::string name;
     return basalt::platform::file_name_from_wide(file_name, name) ? name : std::string();
@@ -172,7 +174,7 @@ BOOL GetFileVersionInfoW(const wchar_t* file_name, DWORD, DWORD length, void* da
         if (block->size > length) {
             return fail_with(ERROR_INSUFFICIENT_BUFFER, 0);
         }
-        // Looked at again, since somebody may have written to the file in between.
+        // Checked again: the file may have been written to in the meantime.
         if (!file.read(block->offset, data, static_cast<std::size_t>(block->size)) ||
             block_length(static_cast<unsigned char*>(data)) > length) {
             return fail_with(ERROR_RESOURCE_DATA_NOT_FOUND, 0);

@@ -4,13 +4,13 @@
 #include <string_view>
 
 #include "basalt/platform/error.h"
+#include "src/platform/system_info.h"
 #include "src/platform/text/utf8.h"
-#include "src/platform/version_resource.h"
 
 namespace {
 
 constexpr DWORD FIXED_INFORMATION_SIGNATURE = 0xFEEF04BD;
-constexpr std::size_t HEADER = 6;  // bytes of a node's three words
+constexpr std::size_t HEADER = 6;  // bytes: three words
 
 constexpr std::size_t align_4(std::size_t offset) {
     return (offset + 3) & ~std::size_t{3};
@@ -46,7 +46,7 @@ public:
         return static_cast<std::size_t>(m_bytes[offset] | m_bytes[offset + 1] << 8);
     }
 
-    // The node at an offset, if it lies before `limit` with its key and value.
+    // The node at an offset, if it ends by `limit` with its key and value.
     std::optional<Node> node(std::size_t offset, std::size_t limit) const {
         if (offset > limit || limit - offset < HEADER) {
             return std::nullopt;
@@ -71,7 +71,7 @@ public:
         node.value_size = word(offset + 2) * (is_text ? 2 : 1);
         const std::size_t room = node.end - node.value;
         if (node.value_size > room) {
-            // Some tools count a text's bytes; it still ends at its terminator.
+            // Some tools count a text in bytes; it still ends at its terminator.
             if (!is_text) {
                 return std::nullopt;
             }
@@ -138,7 +138,7 @@ BOOL VerQueryValueW(const void* block, const wchar_t* path, void** value, UINT* 
         return 0;
     }
     *value = const_cast<unsigned char*>(nodes.at(node->value));
-    // Where it stands says what it is. The node may say something else, and the caller would read too far.
+    // Its place decides whether it is a text: the caller would read too far if the node's own word did.
     const std::size_t unit = is_same_key(keys.substr(0, STRINGS.size()), STRINGS) ? 2 : 1;
     *length = static_cast<UINT>(node->value_size / unit);
     return 1;

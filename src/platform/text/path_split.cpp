@@ -11,7 +11,7 @@ bool split_path(std::wstring_view path, PathParts& parts) {
     std::size_t name_start = path.size();
     for (; name_start > drive_end; --name_start) {
         const wchar_t ch = path[name_start - 1];
-        if (ch == L'\\' || ch == L'/') {
+        if (is_separator(ch)) {
             break;
         }
         if (ch == L'.' && dot == path.size()) {

@@ -1,4 +1,4 @@
-#include "src/platform/module_file_name.h"
+#include "src/platform/system_info.h"
 
 #include <limits.h>
 #include <unistd.h>
@@ -11,14 +11,27 @@
 #include "src/platform/system/out_of_memory.h"
 #include "src/platform/text/file_name.h"
 
+using basalt::platform::fail_with;
+
+BOOL GetVersionExW(OSVERSIONINFOW* information) {
+    if (information == nullptr || information->dwOSVersionInfoSize != sizeof(OSVERSIONINFOW)) {
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
+    }
+    *information = {.dwOSVersionInfoSize = sizeof(OSVERSIONINFOW),
+                    .dwMajorVersion = 6,
+                    .dwMinorVersion = 2,
+                    .dwBuildNumber = 9200,
+                    .dwPlatformId = VER_PLATFORM_WIN32_NT,
+                    .szCSDVersion = {}};
+    return 1;
+}
+
 DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
     if (module != nullptr) {
-        SetLastError(ERROR_INVALID_HANDLE);
-        return 0;
+        return fail_with(ERROR_INVALID_HANDLE, DWORD{0});
     }
     if (name == nullptr || size == 0) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, DWORD{0});
     }
     char link[PATH_MAX];
     const ssize_t length = ::readlink("/proc/self/exe", link, sizeof link);
@@ -32,10 +45,6 @@ DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
         const std::size_t copied = std::min<std::size_t>(wide.size(), size - 1);
         std::copy_n(wide.data(), copied, name);
         name[copied] = L'\0';
-        if (copied < wide.size()) {
-            SetLastError(ERROR_INSUFFICIENT_BUFFER);
-            return size;
-        }
-        return static_cast<DWORD>(copied);
+        return copied < wide.size() ? fail_with(ERROR_INSUFFICIENT_BUFFER, size) : static_cast<DWORD>(copied);
     });
 }

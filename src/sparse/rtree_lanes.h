@@ -1,7 +1,6 @@
-// Four numbers at a time in the compiler's vector types, with the same bits as one at a time on every
-// machine.
-#ifndef BASALT_SRC_SPARSE_RTREE_SIMD_H
-#define BASALT_SRC_SPARSE_RTREE_SIMD_H
+// Four numbers at a time, in the compiler's vector types: the same bits as one at a time on every machine.
+#ifndef BASALT_SRC_SPARSE_RTREE_LANES_H
+#define BASALT_SRC_SPARSE_RTREE_LANES_H
 
 #include <cmath>
 #include <cstring>
@@ -57,7 +56,7 @@ inline Float4 sqrt4(Float4 v) {
 #endif
 }
 
-// Bit i is element i of a comparison's result.
+// Bit i is lane i of a comparison's result.
 inline unsigned bits4(Int4 truth) {
 #if defined(__SSE2__)
     return static_cast<unsigned>(_mm_movemask_ps(reinterpret_cast<__m128>(truth)));
@@ -66,7 +65,7 @@ inline unsigned bits4(Int4 truth) {
 #endif
 }
 
-// The least and the greatest of four, in every element.
+// The least and the greatest of four, in every lane.
 inline Float4 least4(Float4 v) {
     v = min4(v, __builtin_shufflevector(v, v, 2, 3, 0, 1));
     return min4(v, __builtin_shufflevector(v, v, 1, 0, 3, 2));

@@ -21,7 +21,7 @@
 #include "bench/limits.h"
 #include "bench/resident_memory.h"
 #include "bench/sparse_stores.h"
-#include "src/sparse/lock.h"
+#include "src/sparse/critical_section_wrapper.h"
 
 namespace {
 

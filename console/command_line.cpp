@@ -20,7 +20,7 @@ public:
                 m_line.operands.push_back(argument);
             } else if (argument == "--") {
                 only_operands = true;
-            } else if (argument == "--help") {
+            } else if (argument == "--help" || argument == "-h") {
                 m_line.help = true;
             } else if (argument == "--version") {
                 m_line.version = true;

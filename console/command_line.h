@@ -22,8 +22,8 @@ struct Syntax {
     std::vector<std::string_view> flags;  ///< options without one, besides --help and --version
 };
 
-/// Reads `--name VALUE`, `--name=VALUE`, `--flag`, `--help`, `--version` and operands. A minus before a digit
-/// or a point begins a number, which is an operand; after `--` everything is. Arguments after --help or
+/// Reads `--name VALUE`, `--name=VALUE`, `--flag`, `--help`, `-h`, `--version` and operands. A minus before a
+/// digit or a point begins a number, which is an operand; after `--` everything is. Arguments after --help or
 /// --version are ignored. InputError for all else.
 CommandLine parse_command_line(const std::vector<std::string>& arguments, const Syntax& syntax);
 

@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
-"""Draws the summary of docs/performance.md from the tables on that page: a short table and a chart of ratios.
+"""Summarises the tables of docs/performance.md: its first table, that of README.md, and a chart of ratios.
 
-Usage: bench_chart.py       rewrites the page's results and docs/pictures/speed.svg; scripts/bench.sh calls it
+Usage: bench_chart.py       rewrites both tables and docs/pictures/speed.svg; scripts/bench.sh calls it
 
 A row's peer is the fastest one. Where some peers are locked for use by several threads, as ours is, only those count.
 """
@@ -14,6 +14,9 @@ from bench_table import put_into
 
 PAGE = pathlib.Path(__file__).resolve().parent.parent / "docs/performance.md"
 CHART = PAGE.parent / "pictures/speed.svg"
+README = PAGE.parent.parent / "README.md"
+SHORT = ("point in a prepared polygon, 100,000 vertices", "Cartesian to geodetic", "grid: find at random",
+         "R-tree: window query")  # the rows that the README has
 ROWS = [  # subject, row of its table, what a reader calls it
     ("plane", "in polygon, 100", "point in a polygon of 100 vertices"),
     ("plane", "in band, 1000", "the same with a tolerance, 1,000 vertices"),
@@ -63,6 +66,13 @@ def best_peer(page, subject, wanted):
     return min(rows, key=lambda cells: float(cells[4]))[1:5] if rows else None
 
 
+def table(results):
+    lines = ["| | basalt | fastest peer | its time | ratio |", "|---|---:|---|---:|---:|"]
+    for name, (own, peer, other, ratio) in results:
+        lines.append(f"| {name} | {nanoseconds(own)} | {peer} | {nanoseconds(other)} | {ratio} |")
+    return "\n".join(lines)
+
+
 def chart(results):
     height = LINE * (len(results) + 1) + 8
     lines = [f'<svg xmlns="http://www.w3.org/2000/svg" viewBox="0 0 {LEFT + WIDTH + 60} {height}" role="img">',
@@ -90,10 +100,8 @@ def main():
     results = [(name, result) for name, result in results if result]
     if not results:
         sys.exit(f"{PAGE}: no tables")
-    table = ["| | basalt | fastest peer | its time | ratio |", "|---|---:|---|---:|---:|"]
-    for name, (own, peer, other, ratio) in results:
-        table.append(f"| {name} | {nanoseconds(own)} | {peer} | {nanoseconds(other)} | {ratio} |")
-    put_into(PAGE, "results", "\n".join(table))
+    put_into(PAGE, "results", table(results))
+    put_into(README, "speed", table([result for result in results if result[0] in SHORT]))
     CHART.write_text(chart(results), encoding="utf-8")
 
 

@@ -1,7 +1,9 @@
 #include "command.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
+#include <cstdlib>
 #include <optional>
 
 #include "input_error.h"
@@ -17,7 +19,7 @@ const std::string* value_of(const CommandLine& line, const Option& option) {
     return given != line.options.end() ? &given->second : nullptr;
 }
 
-void check_operands(const Command& command, const CommandLine& line) {
+std::vector<std::string> take_files(const Command& command, CommandLine& line) {
     std::size_t count = 0;
     std::string_view words = command.operands;
     while (!words.empty()) {
@@ -28,17 +30,42 @@ void check_operands(const Command& command, const CommandLine& line) {
         ++count;
         words.remove_prefix(std::min(end + 1, words.size()));
     }
-    if (line.operands.size() > count) {
-        throw InputError("unexpected argument " + quoted(line.operands[count]) +
-                         " (--help shows what is taken)");
-    }
+    const auto files = line.operands.begin() + static_cast<std::ptrdiff_t>(count);
+    std::vector<std::string> taken(files, line.operands.end());
+    line.operands.erase(files, line.operands.end());
+    return taken;
 }
+
+namespace {
+
+bool takes(const Command& command, const Option& option) {
+    return std::any_of(command.options.begin(), command.options.end(),
+                       [&](const Option& known) { return std::string_view(known.name) == option.name; });
+}
+
+/// The unit of angles: an option, or the environment's choice where the command has angles.
+bool degrees_of(const Command& command, const CommandLine& line) {
+    if (has_flag(line, DEGREES) && has_flag(line, RADIANS)) {
+        throw InputError("--degrees and --radians exclude each other");
+    }
+    if (!takes(command, DEGREES) || has_flag(line, DEGREES) || has_flag(line, RADIANS)) {
+        return has_flag(line, DEGREES);
+    }
+    const char* text = std::getenv("BASALT_ANGLES");
+    const std::string_view unit = text != nullptr ? text : "";
+    if (!unit.empty() && unit != "degrees" && unit != "radians") {
+        throw InputError("BASALT_ANGLES is degrees or radians, not " + quoted(unit));
+    }
+    return unit == "degrees";
+}
+
+}  // namespace
 
 Format format_of(const Command& command, const CommandLine& line) {
     Format format;
     format.csv = has_flag(line, CSV);
     format.separator = format.csv ? ',' : command.separator;
-    format.degrees = has_flag(line, DEGREES);
+    format.degrees = degrees_of(command, line);
     format.keep = has_flag(line, KEEP);
     if (const std::string* text = value_of(line, PRECISION)) {
         const std::optional<std::int64_t> digits = parse_integer(*text);

@@ -21,8 +21,9 @@ struct Option {
 /// @name Options of many commands
 /// @{
 inline constexpr Option CSV = {"--csv", "", "fields are separated by commas, read and written"};
-inline constexpr Option DEGREES = {"--degrees", "",
-                                   "angles are degrees instead of radians, read and written"};
+inline constexpr Option DEGREES = {
+    "--degrees", "", "angles are degrees, read and written; the default with BASALT_ANGLES=degrees"};
+inline constexpr Option RADIANS = {"--radians", "", "angles are radians, read and written (default)"};
 inline constexpr Option INVERSE = {"--inverse", "", "the other way: read what is written otherwise"};
 inline constexpr Option KEEP = {"--keep", "", "write the line as it was, then the results"};
 inline constexpr Option PRECISION = {"--precision", "N",
@@ -66,8 +67,9 @@ bool has_flag(const CommandLine& line, const Option& option);
 /// The value given with an option, or null.
 const std::string* value_of(const CommandLine& line, const Option& option);
 
-/// InputError unless there are as many operands as the command has words for them.
-void check_operands(const Command& command, const CommandLine& line);
+/// Removes the operands behind those that the command has words for: files to read. InputError when one of
+/// the command's own is missing.
+std::vector<std::string> take_files(const Command& command, CommandLine& line);
 
 /// The format chosen by the common options.
 Format format_of(const Command& command, const CommandLine& line);

@@ -20,6 +20,11 @@ extern const Command DISTANCE;
 extern const Command BEARING;
 extern const Command CROSSTRACK;
 /// @}
+/// @name observations.cpp
+/// @{
+extern const Command REDUCE;
+extern const Command OBSERVE;
+/// @}
 /// @name units.cpp
 /// @{
 extern const Command DMS;

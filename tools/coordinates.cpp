@@ -85,7 +85,7 @@ const Command XYZ2LLH = {
     "Reads X Y Z: metres, earth-centred and earth-fixed (WGS84); x towards latitude 0, longitude 0, z\n"
     "towards the north pole. Writes LATITUDE LONGITUDE HEIGHT: north and east positive, longitude from\n"
     "minus to plus half a turn, ellipsoidal height in metres.",
-    {DEGREES, CSV, KEEP, PRECISION},
+    {DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '3785061.66 901728.88 5036891.56 P1' | basalt xyz2llh --degrees --precision 2",
       "52.5000000 13.4000000 34.00 P1"}},
     make_xyz2llh};
@@ -97,7 +97,7 @@ const Command LLH2XYZ = {
     "Reads LATITUDE LONGITUDE HEIGHT: north and east positive, ellipsoidal height in metres (WGS84).\n"
     "Writes X Y Z: metres, earth-centred and earth-fixed; x towards latitude 0, longitude 0, z towards\n"
     "the north pole.",
-    {DEGREES, CSV, KEEP, PRECISION},
+    {DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '52.5 13.4 34' | basalt llh2xyz --degrees", "3785061.6606 901728.8813 5036891.5588"}},
     make_llh2xyz};
 
@@ -108,7 +108,7 @@ const Command NEU = {
     "Reads X Y Z; ORIGIN is X,Y,Z: metres, earth-centred and earth-fixed (WGS84). Writes NORTH EAST UP:\n"
     "metres from the origin, in the plane that touches the ellipsoid below it and along its normal. Up\n"
     "is no height: it falls away with the earth's curvature, 0.08 m at 1 km.",
-    {GEODETIC, DEGREES, CSV, KEEP, PRECISION},
+    {GEODETIC, DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '52.51,13.41,50,P2' | basalt neu 52.5,13.4,34 --geodetic --degrees --csv",
       "1112.8250,678.9536,15.8668,P2"}},
     make_neu};

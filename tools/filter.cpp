@@ -1,5 +1,6 @@
 #include "filter.h"
 
+#include <cstddef>
 #include <cstdio>
 #include <string>
 #include <string_view>
@@ -16,38 +17,45 @@ bool is_copied(std::string_view line) {
     return first == std::string_view::npos || line[first] == '#';
 }
 
+/// Of many bad lines, as where a whole file has another format, these are reported one by one.
+constexpr std::size_t MOST_REPORTED = 20;
+
 class Run {
 public:
     Run(const Command& command, const CommandLine& line)
-        : m_command(command),
-          m_format(format_of(command, line)),
-          m_filter(command.make(line, m_format)),
-          m_reader([this] { m_writer.flush(); }) {}
+        : m_command(command), m_format(format_of(command, line)), m_filter(command.make(line, m_format)) {}
 
-    int all() {
-        while (m_reader.next()) {
-            const std::size_t kept = m_writer.text().size();
-            try {
-                one();
-                m_writer.end_of_line();
-            } catch (const InputError& error) {
-                m_writer.text().resize(kept);
-                refuse(error.what());
+    int all(const std::vector<std::string>& files) {
+        for (const std::string& path : files) {
+            LineReader reader(path, [this] { m_writer.flush(); });
+            while (reader.next()) {
+                const std::size_t kept = m_writer.text().size();
+                try {
+                    one(reader);
+                    m_writer.end_of_line();
+                } catch (const InputError& error) {
+                    m_writer.text().resize(kept);
+                    refuse(path, reader.number(), error.what());
+                }
             }
         }
         m_writer.finish();
-        return m_refused ? 1 : 0;
+        if (m_refused > MOST_REPORTED) {
+            report(std::to_string(m_refused) + " lines were skipped, of which the first " +
+                   std::to_string(MOST_REPORTED) + " are listed");
+        }
+        return m_refused > 0 ? 1 : 0;
     }
 
 private:
-    void one() {
-        if (m_reader.too_long()) {
+    void one(const LineReader& reader) {
+        if (reader.too_long()) {
             throw InputError("the line is longer than " + std::to_string(LineReader::LONGEST) + " bytes");
         }
-        std::string_view line = m_reader.line();
+        std::string_view line = reader.line();
         std::string& text = m_writer.text();
         if (m_command.lines == Lines::MARKED) {
-            if (m_reader.number() == 1 && line.substr(0, 3) == "\xEF\xBB\xBF") {
+            if (reader.number() == 1 && line.substr(0, 3) == "\xEF\xBB\xBF") {
                 line.remove_prefix(3);
             }
             if (is_copied(line)) {
@@ -68,25 +76,26 @@ private:
         }
     }
 
-    void refuse(const char* why) {
-        m_refused = true;
-        // One write, so that lines of several programs do not mix.
-        std::string message = "basalt ";
-        message.append(m_command.name).append(": line ").append(std::to_string(m_reader.number()));
-        message.append(": ").append(why).append("\n");
-        std::fputs(message.c_str(), stderr);
+    void refuse(const std::string& path, std::size_t number, const std::string& why) {
+        if (++m_refused <= MOST_REPORTED) {
+            report((path == "-" ? "" : path + ": ") + "line " + std::to_string(number) + ": " + why);
+        }
+    }
+
+    /// One write, so that lines of several programs do not mix.
+    void report(const std::string& message) const {
+        std::fputs(("basalt " + std::string(m_command.name) + ": " + message + "\n").c_str(), stderr);
     }
 
     const Command& m_command;
     Format m_format;
     Filter m_filter;
     BlockWriter m_writer;
-    LineReader m_reader;
-    bool m_refused = false;
+    std::size_t m_refused = 0;
 };
 
 }  // namespace
 
-int run_filter(const Command& command, const CommandLine& line) {
-    return Run(command, line).all();
+int run_filter(const Command& command, const CommandLine& line, const std::vector<std::string>& files) {
+    return Run(command, line).all(files.empty() ? std::vector<std::string>{"-"} : files);
 }

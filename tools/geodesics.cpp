@@ -50,7 +50,7 @@ const Command DIRECT = {
     "Reads LATITUDE LONGITUDE AZIMUTH DISTANCE: azimuth clockwise from north, metres along the WGS84\n"
     "ellipsoid, negative backwards. Writes LATITUDE LONGITUDE AZIMUTH of the end: longitude from minus to\n"
     "plus half a turn, azimuth of going on, from 0 to a turn.",
-    {DEGREES, CSV, KEEP, PRECISION},
+    {DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '-37.951033417 144.424867889 306.868158278 54972.271' | basalt direct --degrees",
       "-37.652821146 143.926495523 307.173629707"}},
     make_direct};
@@ -61,7 +61,7 @@ const Command DISTANCE = {
     "great-circle distance between two places",
     "Reads LATITUDE LONGITUDE LATITUDE LONGITUDE. Writes the distance in metres on a sphere of radius\n"
     "6371000 m, which is up to 0.6 % off the ellipsoid's.",
-    {DEGREES, CSV, KEEP, PRECISION},
+    {DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '36.12 -86.67 33.94 -118.40' | basalt distance --degrees --precision 1", "2886444.4"}},
     make_distance};
 
@@ -71,7 +71,7 @@ const Command BEARING = {
     "initial bearing of the great circle between two places",
     "Reads LATITUDE LONGITUDE LATITUDE LONGITUDE. Writes the bearing from the first place to the second,\n"
     "clockwise from north, from 0 to a turn, on a sphere; 0 for equal places.",
-    {DEGREES, CSV, KEEP, PRECISION},
+    {DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '36.12 -86.67 33.94 -118.40' | basalt bearing --degrees --precision 0", "274.59357"}},
     make_bearing};
 
@@ -82,6 +82,6 @@ const Command CROSSTRACK = {
     "Reads LATITUDE LONGITUDE; A and B are LATITUDE,LONGITUDE. Writes metres, positive left of the\n"
     "direction from A to B, negative right. The line is the ellipsoid's geodesic that leaves A with the\n"
     "sphere's bearing of B, and misses B, on oblique lines by 0.3 m at 100 m.",
-    {DEGREES, CSV, KEEP, PRECISION},
+    {DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '0.001 0.5' | basalt crosstrack 0,0 0,1 --degrees --precision 2", "111.19"}},
     make_crosstrack};

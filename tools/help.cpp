@@ -9,24 +9,27 @@
 namespace {
 
 constexpr const char* LINES =
-    "Each command is a filter: it reads lines from standard input and writes a line for each to standard\n"
-    "output. Fields are separated by blanks, with --csv by commas; what follows the fields that a command\n"
+    "Each command is a filter: it reads lines from files or standard input (-) and writes a line for each\n"
+    "to standard output. Fields are separated by blanks, with --csv by commas; what follows the fields that "
+    "a command\n"
     "needs is copied behind its results. Blank lines and lines that begin with # are copied, except where\n"
     "every line is a text (hex, unhex, path, palette). Lines end with LF or CRLF, the last one with or\n"
     "without, and are written with LF. Numbers have a point in every locale.";
 
 constexpr const char* NUMBERS =
-    "Angles are radians, with --degrees degrees. Metres and seconds have --precision digits behind the\n"
-    "point, degrees five more, radians seven more, seconds of arc two more, days five more.";
+    "Angles are radians, with --degrees degrees; BASALT_ANGLES=degrees in the environment makes degrees the\n"
+    "default. Metres and seconds have --precision decimals, degrees five more, radians seven more, seconds "
+    "of arc two more, days five more.";
 
 constexpr const char* STATUS =
-    "A line that cannot be used is reported on standard error with its number and reason, and skipped, as is "
-    "a\n"
-    "line of more than 1048576 bytes. Exit status: 0 success, 1 a line was skipped, or input or output\n"
+    "A line that cannot be used is reported on standard error with its number and reason, and skipped, as "
+    "is\n"
+    "a line of more than 1048576 bytes; after 20 of them only their count is reported. Exit status: 0 "
+    "success, 1 a line was skipped, or input or output\n"
     "failed, 2 bad arguments.";
 
 constexpr Option PROGRAM_OPTIONS[] = {
-    {"--help", "", "print this and exit; behind a command, what it takes"},
+    {"--help", "", "or -h: print this and exit; after a command, what it takes"},
     {"--version", "", "print the version and exit"},
     {"--man", "", "print the manual page, as roff, and exit"},
     {"--completion", "", "print the completion for bash, and exit"},
@@ -115,7 +118,7 @@ std::string help_text() {
     for (const Option& option : PROGRAM_OPTIONS) {
         options.add(option.name, option.help);
     }
-    std::string text = "Usage: basalt COMMAND [OPTION]... <LINES\n       basalt COMMAND --help\n\n";
+    std::string text = "Usage: basalt COMMAND [OPTION]... [FILE]...\n       basalt help COMMAND\n\n";
     return text.append(LINES)
         .append("\n\n")
         .append(NUMBERS)
@@ -129,7 +132,7 @@ std::string help_text() {
 }
 
 std::string help_text(const Command& command) {
-    std::string text = "Usage: basalt " + invocation(command) + " [OPTION]... <LINES\n\n";
+    std::string text = "Usage: basalt " + invocation(command) + " [OPTION]... [FILE]...\n\n";
     text.append("Gives ").append(command.summary).append(".\n\n").append(command.fields).append("\n\n");
     List options;
     for (const Option& option : command.options) {
@@ -147,7 +150,7 @@ std::string help_text(const Command& command) {
 std::string man_page() {
     std::string page = ".TH basalt 1 \"\" \"basalt " BASALT_VERSION "\" \"User Commands\"\n";
     page += ".SH NAME\nbasalt \\- conversions of surveying, line by line\n";
-    page += ".SH SYNOPSIS\n.B basalt\n.I COMMAND\n[\\fIOPTION\\fR]... <\\fILINES\\fR\n";
+    page += ".SH SYNOPSIS\n.B basalt\n.I COMMAND\n[\\fIOPTION\\fR]... [\\fIFILE\\fR]...\n";
     page += ".SH DESCRIPTION\n" + roff(LINES) + "\n.PP\n" + roff(NUMBERS) + "\n.SH OPTIONS\n";
     for (const Option& option : PROGRAM_OPTIONS) {
         page += roff_entry(option.name, option.help);

@@ -1,5 +1,6 @@
 #include "line_reader.h"
 
+#include <fcntl.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -10,20 +11,36 @@
 #include <system_error>
 #include <utility>
 
-LineReader::LineReader(std::function<void()> before_waiting)
-    : m_before_waiting(std::move(before_waiting)), m_block(std::size_t{1} << 16) {}
+#include "input_error.h"
+
+LineReader::LineReader(std::string path, std::function<void()> before_waiting)
+    : m_path(std::move(path)),
+      m_file(m_path == "-" ? STDIN_FILENO : ::open(m_path.c_str(), O_RDONLY | O_CLOEXEC)),
+      m_before_waiting(std::move(before_waiting)),
+      m_block(std::size_t{1} << 16) {
+    if (m_file < 0) {
+        throw InputError(m_path, "cannot be opened: " + std::generic_category().message(errno));
+    }
+}
+
+LineReader::~LineReader() {
+    if (m_file != STDIN_FILENO) {
+        ::close(m_file);
+    }
+}
 
 /// Appends input to the buffer; false at the end of the input.
 bool LineReader::fill() {
     m_before_waiting();
     for (;;) {
-        const ssize_t count = ::read(STDIN_FILENO, m_block.data() + m_end, m_block.size() - m_end);
+        const ssize_t count = ::read(m_file, m_block.data() + m_end, m_block.size() - m_end);
         if (count >= 0) {
             m_end += static_cast<std::size_t>(count);
             return count > 0;
         }
         if (errno != EINTR) {
-            throw std::runtime_error("cannot read standard input: " + std::generic_category().message(errno));
+            throw std::runtime_error("cannot read " + (m_path == "-" ? "standard input" : m_path) + ": " +
+                                     std::generic_category().message(errno));
         }
     }
 }

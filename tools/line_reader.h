@@ -1,9 +1,10 @@
-// Standard input, line by line.
+// A file or standard input, line by line.
 #ifndef TOOLS_LINE_READER_H
 #define TOOLS_LINE_READER_H
 
 #include <cstddef>
 #include <functional>
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -13,8 +14,12 @@ public:
     /// Bytes of the longest line. A longer one is skipped without being stored.
     static constexpr std::size_t LONGEST = std::size_t{1} << 20;
 
+    /// @param path of a file, or `-` for standard input; InputError when it cannot be opened
     /// @param before_waiting called before each read, which may block
-    explicit LineReader(std::function<void()> before_waiting);
+    LineReader(std::string path, std::function<void()> before_waiting);
+    ~LineReader();
+    LineReader(const LineReader&) = delete;
+    LineReader& operator=(const LineReader&) = delete;
 
     /// Goes to the next line; false at the end. std::runtime_error when the input cannot be read.
     bool next();
@@ -29,6 +34,8 @@ private:
     void skip_rest();
     bool take(std::size_t length, std::size_t end_length);
 
+    std::string m_path;
+    int m_file;
     std::function<void()> m_before_waiting;
     std::vector<char> m_block;
     std::size_t m_begin = 0;  ///< start of the unread bytes

@@ -1,7 +1,6 @@
 // The command-line tool: finds the command and runs it.
 #include <basalt/version.h>
 
-#include <csignal>
 #include <string>
 #include <vector>
 
@@ -33,7 +32,7 @@ int run_command(const Command& command, const std::vector<std::string>& argument
     for (const Option& option : command.options) {
         (*option.value != '\0' ? syntax.names : syntax.flags).emplace_back(option.name);
     }
-    const CommandLine line = parse_command_line(arguments, syntax);
+    CommandLine line = parse_command_line(arguments, syntax);
     if (line.help) {
         print(help_text(command));
         return 0;
@@ -41,20 +40,22 @@ int run_command(const Command& command, const std::vector<std::string>& argument
     if (line.version) {
         return run_itself({"--version"});
     }
-    check_operands(command, line);
-    return run_filter(command, line);
+    const std::vector<std::string> files = take_files(command, line);
+    return run_filter(command, line, files);
 }
 
 }  // namespace
 
 int main(int count, char** arguments) {
-    // A closed pipe is a write error like any other.
-    std::signal(SIGPIPE, SIG_IGN);
     std::vector<std::string> words(arguments + (count > 0 ? 1 : 0), arguments + count);
     std::string name = "basalt";
     return exit_status_of(name, [&] {
         if (words.empty() || words[0].empty() || words[0][0] == '-') {
             return run_itself(words);
+        }
+        if (words[0] == "help") {
+            print(words.size() > 1 ? help_text(command_named(words[1])) : help_text());
+            return 0;
         }
         const Command& command = command_named(words[0]);
         words.erase(words.begin());

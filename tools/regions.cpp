@@ -34,7 +34,7 @@ std::vector<geo_nee> read_polygon(const std::string& path) {
 }
 
 Filter make_contains(const CommandLine& line, const Format&) {
-    const std::vector<geo_nee> polygon = read_polygon(line.operands[0]);
+    const basalt::PreparedPolygon polygon(read_polygon(line.operands[0]));
     std::optional<double> tolerance;
     if (const std::string* text = value_of(line, TOLERANCE)) {
         tolerance = parse_number(*text);
@@ -42,11 +42,10 @@ Filter make_contains(const CommandLine& line, const Format&) {
             throw InputError("--tolerance takes metres from 0 on, not " + quoted(*text));
         }
     }
-    return [polygon, tolerance, count = static_cast<int>(polygon.size())](Fields& fields, Row& row) {
+    return [polygon, tolerance](Fields& fields, Row& row) {
         const double north = fields.number("a northing in metres");
         const geo_nee point = {north, fields.number("an easting in metres"), 0};
-        row.whole(tolerance ? geo_point_in_poly_2(count, polygon.data(), &point, *tolerance)
-                            : geo_point_in_poly(count, polygon.data(), &point));
+        row.whole(tolerance ? polygon.contains(point, *tolerance) : polygon.contains(point));
     };
 }
 

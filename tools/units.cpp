@@ -169,7 +169,7 @@ const Command DMS = {
     "an angle in degrees, minutes and seconds",
     "Reads ANGLE. Writes DEGREES MINUTES SECONDS; the sign stands before the degrees, -0 too. With\n"
     "--inverse reads those, minutes and seconds below 60, and writes ANGLE.",
-    {INVERSE, DEGREES, CSV, KEEP, PRECISION},
+    {INVERSE, DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '-0.5125 P1' | basalt dms --degrees --precision 0", "-0 30 45.00 P1"},
      {"echo '-0 30 45' | basalt dms --degrees --inverse --precision 0", "-0.51250"}},
     make_dms};

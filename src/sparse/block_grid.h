@@ -1,4 +1,4 @@
-// How cells fall into square blocks.
+// Which block a cell lies in, and where.
 #ifndef BASALT_SRC_SPARSE_BLOCK_GRID_H
 #define BASALT_SRC_SPARSE_BLOCK_GRID_H
 
@@ -9,10 +9,10 @@
 
 namespace vex_util {
 
-// The plane cut into blocks whose side is a power of two, so that a shift and a mask address every cell.
+// The plane divided into blocks whose side is a power of two: a shift and a mask address every cell.
 class BlockGrid {
 public:
-    // The side is rounded up to a power of two, at least 1. Sides beyond 2^31 count as 2^31: either way four
+    // The side is rounded up to a power of two, at least 1. Sides above 2^31 count as 2^31: either way four
     // blocks cover the plane, and a block of that size can never be allocated.
     explicit BlockGrid(std::size_t side) noexcept {
         while (m_shift < 31 && Side() < side) {
@@ -25,7 +25,7 @@ public:
 
     BlockKey KeyOf(int x, int y) const noexcept { return {x >> m_shift, y >> m_shift}; }
 
-    // The cell's place in its block, row by row.
+    // The index of the cell in its block, row by row.
     std::size_t CellOf(int x, int y) const noexcept { return (Offset(y) << m_shift) + Offset(x); }
     int X(BlockKey key, std::size_t cell) const noexcept { return Coordinate(key.bx, cell & (Side() - 1)); }
     int Y(BlockKey key, std::size_t cell) const noexcept { return Coordinate(key.by, cell >> m_shift); }

@@ -7,12 +7,15 @@ constexpr std::size_t FIRST_SIZE = 16;
 
 }  // namespace
 
-void BlockIndex::Reserve() {
-    if (2 * (m_count + 1) <= m_entries.size()) {
+void BlockIndex::Reserve(std::size_t count) {
+    if (2 * (m_count + count) <= m_entries.size()) {
         return;
     }
+    std::size_t size = m_entries.empty() ? FIRST_SIZE : 2 * m_entries.size();
+    while (size < 2 * (m_count + count)) {
+        size *= 2;
+    }
     BlockIndex larger;
-    const std::size_t size = m_entries.empty() ? FIRST_SIZE : 2 * m_entries.size();
     larger.m_entries.resize(size);
     larger.m_shift = 64U - static_cast<unsigned>(__builtin_ctzll(size));
     for (const Entry& entry : m_entries) {
@@ -23,7 +26,7 @@ void BlockIndex::Reserve() {
     Swap(larger);
 }
 
-void BlockIndex::Add(BlockKey key, Block block) noexcept {
+void BlockIndex::Add(BlockKey key, CellBlock block) noexcept {
     Place({packed(key), block});
 }
 

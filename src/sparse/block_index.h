@@ -20,12 +20,12 @@ inline std::uint64_t packed(BlockKey key) noexcept {
     return std::uint64_t{static_cast<std::uint32_t>(key.bx)} << 32 | static_cast<std::uint32_t>(key.by);
 }
 
-// Open addressing with linear steps over a power-of-two table, at most half full; nothing is ever removed
-// singly. An entry is 16 bytes, so four tries share a cache line.
+// Hash table with open addressing and linear probing, a power of two large and at most half full. Blocks are
+// never removed one by one.
 class BlockIndex {
 public:
     // The block, or null.
-    Block Find(BlockKey key) const noexcept {
+    CellBlock Find(BlockKey key) const noexcept {
         if (m_entries.empty()) {
             return {};
         }
@@ -41,10 +41,16 @@ public:
         }
     }
 
-    // Makes room for one more entry. Throws std::bad_alloc, with the index as it was.
-    void Reserve();
-    // Enters a block that is not there yet; room must have been made. Cannot fail.
-    void Add(BlockKey key, Block block) noexcept;
+    void Prefetch(BlockKey key) const noexcept {
+        if (!m_entries.empty()) {
+            __builtin_prefetch(&m_entries[Home(packed(key))]);
+        }
+    }
+
+    // Grows the table for `count` more blocks. Throws std::bad_alloc, with the index unchanged.
+    void Reserve(std::size_t count);
+    // Adds a block that is not in the index; space must be reserved.
+    void Add(BlockKey key, CellBlock block) noexcept;
     void Clear() noexcept;
     std::size_t Count() const noexcept { return m_count; }
 
@@ -57,15 +63,14 @@ public:
 private:
     struct Entry {
         std::uint64_t key = 0;
-        Block block;
+        CellBlock block;
     };
 
     void Place(const Entry& added) noexcept;
 
     std::size_t Home(std::uint64_t key) const noexcept {
-        // Multiplicative hashing: the product's top bits depend on every bit of both coordinates, and rows,
-        // columns and squares of blocks hardly meet. Without folding a slanted line has one stride in the
-        // table, which for some slopes is next to none: hundreds of tries.
+        // Multiplicative hashing of the folded key. Unfolded, the blocks of a slanted line would have one
+        // stride in the table, for some slopes next to none: hundreds of probes.
         const std::uint64_t folded = key ^ key >> 32;
         return static_cast<std::size_t>((folded * 0x9E3779B97F4A7C15U) >> m_shift);
     }

@@ -7,17 +7,17 @@
 namespace vex_util {
 namespace {
 
-// A new slab adds an eighth to what is there: few slabs, little idle room.
+// A new slab adds an eighth to the memory so far: few slabs, little of it unused.
 constexpr std::size_t GROWTH_DIVISOR = 8;
 
-// Larger blocks cannot exist: their bytes would not fit the address space.
+// The bytes of larger blocks would not fit the address space.
 constexpr std::size_t MOST_CELLS = std::numeric_limits<std::ptrdiff_t>::max() / (4 * sizeof(void*));
 
 }  // namespace
 
 std::size_t BlockPool::BlockBytes() const noexcept {
     const std::size_t bytes = FilledWords() * sizeof(std::uint64_t) + m_cellsPerBlock * sizeof(void*);
-    // Whole cache lines once a block is large enough for the rounding not to show.
+    // Whole cache lines, unless the block is so small that the rounding would show.
     return bytes < 4 * CACHE_LINE ? bytes : (bytes + CACHE_LINE - 1) & ~(CACHE_LINE - 1);
 }
 
@@ -30,25 +30,27 @@ void BlockPool::AddSlab() {
         m_slabs.reserve(2 * m_slabs.size() + 8);
     }
     const Slab& slab = m_slabs.emplace_back(std::max(blockBytes, m_bytes / GROWTH_DIVISOR), blockBytes);
-    m_next = slab.Begin();
-    m_left = slab.Bytes() / blockBytes;
+    m_spare += slab.Bytes() / blockBytes;
     m_bytes += slab.Bytes();
 }
 
-Block BlockPool::TakeReserved() noexcept {
+CellBlock BlockPool::Take() noexcept {
     const std::size_t bytes = BlockBytes();
+    if (m_left == 0) {
+        const Slab& slab = m_slabs[m_opened++];
+        m_next = slab.Begin();
+        m_left = slab.Bytes() / bytes;
+    }
     std::byte* const memory = m_next;
     std::memset(memory, 0, bytes);
     m_next += bytes;
     --m_left;
+    --m_spare;
     return {reinterpret_cast<void**>(memory)};
 }
 
 void BlockPool::Clear() noexcept {
-    m_slabs.clear();
-    m_next = nullptr;
-    m_left = 0;
-    m_bytes = 0;
+    BlockPool(m_cellsPerBlock).Swap(*this);
 }
 
 }  // namespace vex_util

@@ -1,4 +1,4 @@
-// Square blocks of cells and the memory they live in.
+// Square blocks of cells and their memory.
 #ifndef BASALT_SRC_SPARSE_BLOCK_POOL_H
 #define BASALT_SRC_SPARSE_BLOCK_POOL_H
 
@@ -11,10 +11,10 @@
 
 namespace vex_util {
 
-// A block: the cells' element pointers row by row, null for an empty cell, and behind them a bit for each
-// filled cell. The pointers answer Find with one look; the bits let a visit of a thin block cost its elements
-// and not its area. Cell i's bit is bit i % 64 of word i / 64.
-struct Block {
+// The cells' element pointers row by row, null for an empty cell, followed by one bit per cell that is set if
+// it is filled: Find reads the pointers, a visit of a thin block the bits. Cell i has bit i % 64 of word
+// i / 64.
+struct CellBlock {
     void** cells = nullptr;
 
     std::uint64_t* Filled(std::size_t cellsPerBlock) const noexcept {
@@ -23,7 +23,7 @@ struct Block {
     explicit operator bool() const noexcept { return cells != nullptr; }
 };
 
-// Blocks of one size, carved from slabs and given back all at once.
+// Blocks of one size, allocated in slabs and released all at once.
 class BlockPool {
 public:
     explicit BlockPool(std::size_t cellsPerBlock) noexcept : m_cellsPerBlock(cellsPerBlock) {}
@@ -31,25 +31,27 @@ public:
     BlockPool(const BlockPool&) = delete;
     BlockPool& operator=(const BlockPool&) = delete;
 
-    // Makes room for one block. Throws std::bad_alloc, with the pool as it was.
-    void Reserve() {
-        if (m_left == 0) {
+    // Makes the next `count` calls of Take() sure to succeed. Throws std::bad_alloc.
+    void Reserve(std::size_t count) {
+        while (m_spare < count) {
             AddSlab();
         }
     }
-    // A block of empty cells, for which room was made.
-    Block TakeReserved() noexcept;
+    // A reserved block, with all cells empty.
+    CellBlock Take() noexcept;
     void Clear() noexcept;
 
     std::size_t CellsPerBlock() const noexcept { return m_cellsPerBlock; }
-    // 64-bit words of a block's `filled`.
+    // 64-bit words of a block's bits.
     std::size_t FilledWords() const noexcept { return (m_cellsPerBlock + 63) / 64; }
 
     void Swap(BlockPool& other) noexcept {
         std::swap(m_cellsPerBlock, other.m_cellsPerBlock);
         std::swap(m_next, other.m_next);
         std::swap(m_left, other.m_left);
+        std::swap(m_spare, other.m_spare);
         std::swap(m_bytes, other.m_bytes);
+        std::swap(m_opened, other.m_opened);
         m_slabs.swap(other.m_slabs);
     }
 
@@ -58,9 +60,11 @@ private:
     void AddSlab();
 
     std::size_t m_cellsPerBlock;
-    std::byte* m_next = nullptr;  // the newest slab's first byte not handed out
-    std::size_t m_left = 0;       // blocks that still fit there
-    std::size_t m_bytes = 0;
+    std::byte* m_next = nullptr;  // the next block of the slab opened last
+    std::size_t m_left = 0;       // blocks left in it
+    std::size_t m_spare = 0;      // blocks left in all slabs
+    std::size_t m_bytes = 0;      // of all slabs
+    std::size_t m_opened = 0;     // slabs behind these are reserved
     std::vector<Slab> m_slabs;
 };
 

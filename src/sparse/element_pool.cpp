@@ -12,21 +12,42 @@ void ElementPool::AddChunk() {
     if (m_elementsPerChunk > std::numeric_limits<std::size_t>::max() / m_elementSize) {
         throw std::bad_alloc();
     }
-    // Room in the lists first: what follows must not have to be undone.
+    // Grow the lists first: the chunk itself must not have to be given back.
     const std::size_t slots = (m_chunks.size() + 1) * m_elementsPerChunk;
-    if (slots > FreeRoom()) {
-        // Nothing to take over: no slot is free when a chunk is wanted.
-        m_freeMemory = Slab(std::max(slots, 2 * FreeRoom()) * sizeof(void*));
+    if (slots > FreeCapacity()) {
+        Slab larger(std::max(slots, 2 * FreeCapacity()) * sizeof(void*));
+        std::copy_n(m_free, m_freeCount, reinterpret_cast<void**>(larger.Begin()));
+        m_freeMemory.Swap(larger);
         m_free = reinterpret_cast<void**>(m_freeMemory.Begin());
     }
     m_chunks.push_back(nullptr);
-    void* const chunk = vex_lib::vlSharedMemoryHeap::Alloc(m_elementSize * m_elementsPerChunk);
-    if (chunk == nullptr) {
+    m_chunks.back() = vex_lib::vlSharedMemoryHeap::Alloc(m_elementSize * m_elementsPerChunk);
+    if (m_chunks.back() == nullptr) {
         m_chunks.pop_back();
         throw std::bad_alloc();
     }
-    m_chunks.back() = chunk;
+}
+
+void ElementPool::OpenChunk() {
+    if (m_opened == m_chunks.size()) {
+        AddChunk();
+    }
+    m_chunk = static_cast<char*>(m_chunks[m_opened++]);
     m_unused = m_elementsPerChunk;
+}
+
+void ElementPool::TakeRow(void** slots, std::size_t count) noexcept {
+    const std::size_t freed = std::min(count, m_freeCount);
+    m_freeCount -= freed;
+    count -= freed;
+    std::copy_n(m_free + m_freeCount, freed, slots + count);
+    while (count != 0) {
+        if (m_unused == 0) {
+            OpenChunk();
+        }
+        m_unused -= 1;
+        slots[--count] = m_chunk + m_unused * m_elementSize;
+    }
 }
 
 void ElementPool::Clear() noexcept {
@@ -37,7 +58,9 @@ void ElementPool::Clear() noexcept {
     m_freeMemory = {};
     m_free = nullptr;
     m_freeCount = 0;
+    m_chunk = nullptr;
     m_unused = 0;
+    m_opened = 0;
 }
 
 }  // namespace vex_util

@@ -1,9 +1,9 @@
-// Slots for the elements of one sparse array, taken in chunks from the shared heap.
+// Slots for the elements of one sparse array, allocated in chunks from the shared heap.
 #ifndef BASALT_SRC_SPARSE_ELEMENT_POOL_H
 #define BASALT_SRC_SPARSE_ELEMENT_POOL_H
 
 #include <cstddef>
-#include <unordered_set>
+#include <cstring>
 #include <utility>
 #include <vector>
 
@@ -11,10 +11,8 @@
 
 namespace vex_util {
 
-// Slots are handed out last freed first, and a chunk's own slots from its last down to its first. The slots
-// of the newest chunk that were never used are a count, so a chunk is not touched before use. The freed ones
-// stand in a list beside the chunks, not in each other: giving a slot back need not wait for its memory, nor
-// taking it for the next one's address.
+// The slot freed last is used first; without free slots, a chunk's slots are used from its last to its first.
+// Unused slots are a count and free ones a list beside the chunks, so that no slot is touched before its use.
 class ElementPool {
 public:
     static constexpr std::size_t SMALLEST_ELEMENT = sizeof(void*);
@@ -28,49 +26,64 @@ public:
 
     std::size_t ElementSize() const noexcept { return m_elementSize; }
     std::size_t ElementsPerChunk() const noexcept { return m_elementsPerChunk; }
-    std::size_t ChunkCount() const noexcept { return m_chunks.size(); }
+    // Slots in use.
+    std::size_t Size() const noexcept { return m_opened * m_elementsPerChunk - m_unused - m_freeCount; }
 
-    // A slot with undefined contents. Throws std::bad_alloc, with the pool as it was.
+    // Makes the next `slots` calls of Take() sure to succeed. Throws std::bad_alloc; slots in use are
+    // unchanged.
+    void Reserve(std::size_t slots) {
+        while (m_freeCount + m_unused + (m_chunks.size() - m_opened) * m_elementsPerChunk < slots) {
+            AddChunk();
+        }
+    }
+
+    // A slot with undefined contents. Throws std::bad_alloc, with the pool unchanged.
     void* Take() {
         if (m_freeCount != 0) {
             return m_free[--m_freeCount];
         }
         if (m_unused == 0) {
-            AddChunk();
+            OpenChunk();
         }
-        --m_unused;
-        return static_cast<char*>(m_chunks.back()) + m_unused * m_elementSize;
+        return m_chunk + --m_unused * m_elementSize;
     }
 
-    // There is room for every slot of the pool.
+    // Takes reserved slots in the order of Take(), the first one for the last place.
+    void TakeRow(void** slots, std::size_t count) noexcept;
+
+    // The list has space for every slot of the pool.
     void Give(void* slot) noexcept { m_free[m_freeCount++] = slot; }
 
-    // Gives every chunk back to the shared heap, in the order they were taken.
+    // Returns every chunk to the shared heap, in the order of allocation.
     void Clear() noexcept;
 
     void Swap(ElementPool& other) noexcept {
         std::swap(m_elementSize, other.m_elementSize);
         std::swap(m_elementsPerChunk, other.m_elementsPerChunk);
-        std::swap(m_freeMemory, other.m_freeMemory);
+        m_freeMemory.Swap(other.m_freeMemory);
         std::swap(m_free, other.m_free);
         std::swap(m_freeCount, other.m_freeCount);
+        std::swap(m_chunk, other.m_chunk);
         std::swap(m_unused, other.m_unused);
+        std::swap(m_opened, other.m_opened);
         m_chunks.swap(other.m_chunks);
     }
 
-    // Throws std::logic_error naming the first broken invariant, given the slots that cells hold.
-    void CheckInvariants(std::size_t taken, const std::unordered_set<const void*>& takenSlots) const;
-
 private:
+    friend struct SparseInspector;
+
     void AddChunk();
-    std::size_t FreeRoom() const noexcept { return m_freeMemory.Bytes() / sizeof(void*); }
+    void OpenChunk();
+    std::size_t FreeCapacity() const noexcept { return m_freeMemory.Bytes() / sizeof(void*); }
 
     std::size_t m_elementSize;
     std::size_t m_elementsPerChunk;
-    Slab m_freeMemory;  // touched when slots are freed, not before
+    Slab m_freeMemory;
     void** m_free = nullptr;
     std::size_t m_freeCount = 0;
-    std::size_t m_unused = 0;  // slots 0 .. m_unused - 1 of the newest chunk were never handed out
+    char* m_chunk = nullptr;   // the chunk opened last
+    std::size_t m_unused = 0;  // its slots 0 .. m_unused - 1 have never been used
+    std::size_t m_opened = 0;  // chunks behind these are reserved
     std::vector<void*> m_chunks;
 };
 

@@ -4,7 +4,6 @@
 #include <limits>
 #include <utility>
 
-#include "src/sparse/rtree_split.h"
 #include "src/sparse/rtree_volume.h"
 
 namespace vex_util {
@@ -38,7 +37,7 @@ int choose_subtree(const Node& node, const Rect4& rect) {
     return std::countr_zero(bits4(volume[0] == smallest) | bits4(volume[1] == smallest) << 4);
 }
 
-// The query in lanes, against a node's entries.
+// The query, compared with four entries of a node at a time.
 struct Query {
     Int4 minX, minY, maxX, maxY;
 
@@ -61,14 +60,14 @@ private:
     }
 };
 
-// Gathers identifiers and hands them on in large pieces: a vector's own growth is paid once per piece.
+// Appends identifiers to a vector by way of a buffer, so that the vector grows once per buffer.
 class ResultWriter {
 public:
     explicit ResultWriter(std::vector<int>& results) : m_results(results) {}
 
     void add(const Node& leaf, unsigned entries) {
-        make_room();
-        // Every slot is written and only the wanted are counted: no branch to mispredict.
+        ensure_space();
+        // Branchless: every slot is written, only the matching ones are counted.
         for (int i = 0; i < MAX_ENTRIES; ++i) {
             m_buffer[m_count] = static_cast<int>(leaf.slot[i]);
             m_count += static_cast<int>(entries >> i & 1);
@@ -76,7 +75,7 @@ public:
     }
 
     void add_all(const Node& leaf) {
-        make_room();
+        ensure_space();
         std::memcpy(m_buffer + m_count, leaf.slot, sizeof leaf.slot);
         m_count += leaf.count;
     }
@@ -89,7 +88,7 @@ public:
 private:
     static constexpr int SIZE = 512;
 
-    void make_room() {
+    void ensure_space() {
         if (m_count > SIZE - MAX_ENTRIES) {
             flush();
         }
@@ -100,14 +99,14 @@ private:
     int m_buffer[SIZE];
 };
 
-// A search in waves: the chosen children of many nodes are asked of the memory at once and visited when all
-// are under way, where one path after the other would wait at every level. All leaves lie on one level and
-// waves keep their order, so the leaves come up in depth-first order.
-class Walk {
+// A search level by level, in batches: the children of many nodes are prefetched before the first is visited,
+// so that their cache misses overlap. All leaves have one level and batches keep their order, so leaves are
+// visited depth first.
+class BatchSearch {
 public:
-    // What lies within the query is not tested again. Corners within say nothing about a rectangle that has a
-    // min above its max, so a tree that holds one is tested to the leaves.
-    Walk(const NodePool& nodes, bool inverted, const Query& query, std::vector<int>& results)
+    // Nodes within the query are not tested again, unless the tree holds an inverted rectangle, about which
+    // the cover says nothing.
+    BatchSearch(const NodePool& nodes, bool inverted, const Query& query, std::vector<int>& results)
         : m_nodes(nodes), m_alwaysPartly(inverted ? ~0U : 0), m_query(query), m_writer(results) {}
 
     void run(NodeRef root) {
@@ -122,17 +121,17 @@ private:
         bool within;
     };
 
-    static constexpr int WAVE = 64;
+    static constexpr int BATCH = 64;
 
-    void visit(const Visit* wave, int size) {
-        if (wave->node->level == 0) {
-            visit_leaves(wave, size);
+    void visit(const Visit* batch, int size) {
+        if (batch->node->level == 0) {
+            visit_leaves(batch, size);
             return;
         }
-        Visit next[WAVE];
+        Visit next[BATCH];
         int count = 0;
         for (int k = 0; k < size; ++k) {
-            const auto [node, within] = wave[k];
+            const auto [node, within] = batch[k];
             unsigned chosen = valid_bits(*node);
             unsigned partly = 0;
             if (!within) {
@@ -145,7 +144,7 @@ private:
                 child->prefetch();
                 next[count++] = {child, (partly >> i & 1) == 0};
             }
-            if (count > WAVE - MAX_ENTRIES) {
+            if (count > BATCH - MAX_ENTRIES) {
                 visit(next, count);
                 count = 0;
             }
@@ -155,10 +154,10 @@ private:
         }
     }
 
-    void visit_leaves(const Visit* wave, int size) {
+    void visit_leaves(const Visit* batch, int size) {
         for (int k = 0; k < size; ++k) {
-            const Node& leaf = *wave[k].node;
-            if (wave[k].within) {
+            const Node& leaf = *batch[k].node;
+            if (batch[k].within) {
                 m_writer.add_all(leaf);
             } else {
                 m_writer.add(leaf, valid_bits(leaf) & m_query.meets(leaf));
@@ -176,25 +175,27 @@ private:
 
 slRTree::slRTree() {
     m_nodes.reserve(1);
-    plant();
+    make_root();
 }
 
 slRTree::~slRTree() = default;
 
-void slRTree::plant() noexcept {
+void slRTree::make_root() noexcept {
     m_root = m_nodes.take();
     m_nodes[m_root].clear(0);
     m_level = 0;
     m_inverted = false;
 }
 
-// A split of every node on the path, and a new root.
-void slRTree::Reserve() {
-    m_nodes.reserve(static_cast<std::size_t>(m_level) + 2);
+// Each insertion can split every node on its path and the root. Several can raise the tree in between, which
+// the last one then needs nodes for.
+void slRTree::Reserve(std::size_t inserts) {
+    const auto path = static_cast<std::size_t>(m_level) + 2;
+    m_nodes.reserve(inserts > 1 ? inserts * path + MAX_LEVEL : path);
 }
 
 void slRTree::Insert(const int min[2], const int max[2], const int& identifier) {
-    Reserve();
+    Reserve(1);
     Entry entry{{min[0], min[1], max[0], max[1]}, static_cast<std::uint32_t>(identifier)};
     m_inverted |= min[0] > max[0] || min[1] > max[1];
     const Rect4 rect = all4(entry.rect);
@@ -240,13 +241,13 @@ void slRTree::Insert(const int min[2], const int max[2], const int& identifier) 
 int slRTree::Search(const int min[2], const int max[2], std::vector<int>& results) const {
     results.clear();
     const Query query{all4(min[0]), all4(min[1]), all4(max[0]), all4(max[1])};
-    Walk(m_nodes, m_inverted, query, results).run(m_root);
+    BatchSearch(m_nodes, m_inverted, query, results).run(m_root);
     return static_cast<int>(results.size());
 }
 
 void slRTree::RemoveAll() noexcept {
     m_nodes.reset();
-    plant();
+    make_root();
 }
 
 void slRTree::swap(slRTree& other) noexcept {

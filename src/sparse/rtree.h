@@ -2,6 +2,7 @@
 #ifndef BASALT_SRC_SPARSE_RTREE_H
 #define BASALT_SRC_SPARSE_RTREE_H
 
+#include <cstddef>
 #include <vector>
 
 #include "src/sparse/rtree_pool.h"
@@ -9,15 +10,15 @@
 namespace vex_util {
 
 /// Guttman's R-tree with the quadratic split over rectangles of cells with int identifiers; rectangles are
-/// measured by the volume of their circumscribed sphere in single precision. It only grows, and its structure
-/// is fixed to the bit by the order of insertion. Corners are {x, y}, inclusive; nothing is checked: a min
-/// above a max is kept as given, and equal entries are kept and found as often as they were inserted.
-/// Threads: one at a time; searches of a tree that nobody changes may run at the same time.
+/// measured by the volume of their circumscribed sphere in single precision. Entries are never removed one by
+/// one, and the order of insertion determines the structure to the bit. Corners are {x, y}, inclusive.
+/// Nothing is checked: a min above a max is kept as given, and equal entries are found as often as they were
+/// inserted. Threads: one at a time; concurrent searches of an unchanging tree are safe.
 class slRTree {
 public:
     /// An empty tree. Throws std::bad_alloc.
     slRTree();
-    /// A tree of its own with the same structure. Throws std::bad_alloc.
+    /// A copy with the same structure. Throws std::bad_alloc.
     slRTree(const slRTree& other) = default;
     slRTree& operator=(const slRTree&) = delete;
     virtual ~slRTree();
@@ -25,12 +26,12 @@ public:
     /// Throws std::bad_alloc with the tree unchanged.
     void Insert(const int min[2], const int max[2], const int& identifier);
 
-    /// Takes every node the next Insert can need, so that it cannot fail. Throws std::bad_alloc with the tree
-    /// unchanged.
-    void Reserve();
+    /// Allocates every node that so many calls of Insert can need, so that they cannot fail. Throws
+    /// std::bad_alloc with the tree unchanged.
+    void Reserve(std::size_t inserts);
 
     /// Replaces `results` by the identifiers of all rectangles that meet the given one (shared edges and
-    /// corners do), depth first, and answers their number. Throws what the growth of `results` throws.
+    /// corners do), depth first, and returns their number. Throws what the growth of `results` throws.
     int Search(const int min[2], const int max[2], std::vector<int>& results) const;
 
     /// Empties the tree. Cannot fail.
@@ -41,7 +42,7 @@ public:
 private:
     friend struct RTreeInspector;
 
-    void plant() noexcept;
+    void make_root() noexcept;
 
     rtree::NodePool m_nodes;
     rtree::NodeRef m_root = 0;

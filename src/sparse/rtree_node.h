@@ -10,7 +10,7 @@ namespace vex_util::rtree {
 inline constexpr int MAX_ENTRIES = 8;
 inline constexpr int MIN_ENTRIES = 4;
 
-// Every node below the root holds MIN_ENTRIES or more, so that 32-bit references end before this level does.
+// Nodes below the root hold MIN_ENTRIES or more: 32-bit references are used up below this level.
 inline constexpr int MAX_LEVEL = 17;
 
 // Both corners are inclusive; a min above a max is kept as given.
@@ -25,16 +25,16 @@ inline Rect combine(const Rect& a, const Rect& b) {
             std::max(a.maxY, b.maxY)};
 }
 
-// A node's place in the pool: it survives copying the whole pool, which an address does not.
+// Index of a node in its pool, valid in copies of the pool too.
 using NodeRef = std::uint32_t;
 
-// A rectangle with an identifier (in a leaf) or the child it covers (above).
+// A rectangle with an identifier (in a leaf) or with the child it covers (above).
 struct Entry {
     Rect rect;
     std::uint32_t slot;
 };
 
-// Laid out by coordinate, so that one comparison of lanes tests four entries; three cache lines.
+// By coordinate, so that one SIMD comparison tests four entries; three cache lines.
 struct alignas(64) Node {
     int minX[MAX_ENTRIES], minY[MAX_ENTRIES], maxX[MAX_ENTRIES], maxY[MAX_ENTRIES];
     std::uint32_t slot[MAX_ENTRIES];
@@ -55,7 +55,7 @@ struct alignas(64) Node {
         maxY[i] = r.maxY;
     }
 
-    // Asks for room: count below MAX_ENTRIES.
+    // Requires count < MAX_ENTRIES.
     void append(const Entry& entry) {
         set_rect(count, entry.rect);
         slot[count] = entry.slot;
@@ -73,7 +73,7 @@ struct alignas(64) Node {
         return r;
     }
 
-    // All three lines at once: a walk that waits for one would otherwise wait for each.
+    // All three cache lines, whose misses then overlap.
     void prefetch() const {
         __builtin_prefetch(minX);
         __builtin_prefetch(maxX);
@@ -82,6 +82,10 @@ struct alignas(64) Node {
 };
 
 static_assert(sizeof(Node) == 192);
+
+// Distributes the entries of the full `node` and `extra` over `node` and `sibling`, four or five each; the
+// sibling gets the node's level. Source: Guttman, 1984, "R-trees", section 3.5.2.
+void split(Node& node, const Entry& extra, Node& sibling);
 
 }  // namespace vex_util::rtree
 

@@ -1,4 +1,4 @@
-// The nodes of one R-tree: slabs that grow with the tree and are given back all at once.
+// The nodes of one R-tree, allocated in slabs and released all at once.
 #ifndef BASALT_SRC_SPARSE_RTREE_POOL_H
 #define BASALT_SRC_SPARSE_RTREE_POOL_H
 
@@ -6,59 +6,60 @@
 #include <vector>
 
 #include "src/sparse/rtree_node.h"
+#include "src/sparse/slab.h"
 
 namespace vex_util::rtree {
 
 class NodePool {
 public:
     NodePool() = default;
-    // A copy has every node at the same reference. Throws std::bad_alloc.
+    // Nodes keep their references. Throws std::bad_alloc.
     NodePool(const NodePool& other);
     NodePool& operator=(const NodePool&) = delete;
-    ~NodePool();
+    ~NodePool() = default;
 
     void swap(NodePool& other) noexcept;
 
-    Node& operator[](NodeRef ref) { return m_slabs[ref >> SLAB_BITS].nodes[ref & SLAB_MASK]; }
-    const Node& operator[](NodeRef ref) const { return m_slabs[ref >> SLAB_BITS].nodes[ref & SLAB_MASK]; }
+    Node& operator[](NodeRef ref) { return m_pieces[ref >> PIECE_BITS].nodes()[ref & PIECE_MASK]; }
+    const Node& operator[](NodeRef ref) const {
+        return m_pieces[ref >> PIECE_BITS].nodes()[ref & PIECE_MASK];
+    }
 
-    // Makes the next `count` calls of take() sure to succeed; throws std::bad_alloc with nothing changed.
+    // Makes the next `count` calls of take() sure to succeed. Throws std::bad_alloc with nothing changed.
     void reserve(std::size_t count) {
         while (m_spare < count) {
-            add_slab();
+            add_piece();
         }
     }
 
-    // How many more nodes take() gives before the pool has to grow.
+    // Reserved nodes.
     std::size_t spare() const { return m_spare; }
 
-    // Asks for a reserved node; its contents are whatever they were.
+    // A reserved node with undefined contents.
     NodeRef take() noexcept;
 
-    // Every node is free again; the first slab stays, so that a small tree can follow without allocating.
+    // Releases all nodes but the first slab, so that a small tree can follow without allocating.
     void reset() noexcept;
 
 private:
-    static constexpr unsigned SLAB_BITS = 15;  // the largest slab: 6 MiB, three large pages
-    static constexpr NodeRef SLAB_MASK = (NodeRef{1} << SLAB_BITS) - 1;
-    static constexpr std::size_t MAX_SLABS = std::size_t{1} << (32 - SLAB_BITS);
-    static constexpr std::size_t FIRST_SLAB = 8;
+    static constexpr unsigned PIECE_BITS = 15;  // at most 6 MiB, three large pages
+    static constexpr NodeRef PIECE_MASK = (NodeRef{1} << PIECE_BITS) - 1;
+    static constexpr std::size_t MAX_PIECES = std::size_t{1} << (32 - PIECE_BITS);
+    static constexpr std::size_t FIRST_CAPACITY = 8;
 
-    struct Slab {
-        Node* nodes;
-        std::size_t capacity;
-        std::size_t used;
+    struct Piece {
+        Slab slab;
+        std::size_t used = 0;
+
+        Node* nodes() const { return reinterpret_cast<Node*>(slab.Begin()); }
+        std::size_t capacity() const { return slab.Bytes() / sizeof(Node); }
     };
 
-    static Node* allocate_slab(std::size_t capacity);
-    static void release_slab(const Slab& slab) noexcept;
-    void add_slab();
-    void release_all() noexcept;
+    void add_piece();
 
-    std::vector<Slab> m_slabs;
-    std::size_t m_current = 0;   // the slab that gives the next node
-    std::size_t m_capacity = 0;  // nodes in all slabs
-    std::size_t m_spare = 0;     // of them free
+    std::vector<Piece> m_pieces;
+    std::size_t m_current = 0;  // the piece of the next node
+    std::size_t m_spare = 0;
 };
 
 }  // namespace vex_util::rtree

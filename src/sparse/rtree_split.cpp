@@ -1,5 +1,4 @@
-#include "src/sparse/rtree_split.h"
-
+// Guttman's quadratic split of a full node.
 #include <bit>
 #include <limits>
 
@@ -12,13 +11,13 @@ namespace {
 constexpr int TOTAL = MAX_ENTRIES + 1;
 constexpr int FULL_GROUP = TOTAL - MIN_ENTRIES;
 constexpr int PADDED = 12;           // whole vectors of four
-constexpr int ROW_END = PADDED + 4;  // a row of pairs may be read past the padding
+constexpr int ROW_END = PADDED + 4;  // a row of pairs is read past the padding
 constexpr float INFINITE = std::numeric_limits<float>::infinity();
 
-// The nine entries by coordinate, rounded to float; the lanes after them repeat the ninth.
+// The nine entries by coordinate, rounded to float; the elements after them repeat the ninth.
 struct Candidates {
     float minX[ROW_END], minY[ROW_END], maxX[ROW_END], maxY[ROW_END];
-    float volume[ROW_END];  // infinite after the ninth: a pair with one of those wastes minus infinity
+    float volume[ROW_END];  // infinite after the ninth, so that no pair includes the padding
 
     Rect4 rects(int first) const {
         return {load4(minX + first), load4(minY + first), load4(maxX + first), load4(maxY + first)};
@@ -75,7 +74,7 @@ Seeds pick_seeds(const Candidates& c) {
             worstPair = larger ? pair : worstPair;
         }
     }
-    // Each lane holds its own first largest; equal ones are told apart by the order of pairs.
+    // Each element holds its own first largest; among equal ones the first pair wins.
     const unsigned largest = bits4(worst == greatest4(worst));
     int pair = std::numeric_limits<int>::max();
     for (int lane = 0; lane < 4; ++lane) {
@@ -117,8 +116,8 @@ unsigned distribute(const Candidates& c) {
         unsigned prefersSecond = 0;
         for (int v = 0; v < PADDED / 4; ++v) {
             const Float4 d = groups[1].growth[v] - groups[0].growth[v];
-            const Int4 lane = Int4{1, 2, 4, 8} << (4 * v);
-            const Int4 open = (all4(static_cast<int>(unassigned)) & lane) != 0;
+            const Int4 bit = Int4{1, 2, 4, 8} << (4 * v);
+            const Int4 open = (all4(static_cast<int>(unassigned)) & bit) != 0;
             prefersSecond |= bits4(d < 0.0F) << (4 * v);
             difference[v] = open ? max4(d, -d) : all4(-1.0F);
             biggest = max4(biggest, difference[v]);
@@ -153,7 +152,7 @@ unsigned distribute(const Candidates& c) {
 void split(Node& node, const Entry& extra, Node& sibling) {
     const unsigned second = distribute(gather(node, extra));
     sibling.clear(node.level);
-    // The node's entries move down within it: one is never written before it has been read.
+    // In place: an entry moves to a lower index of the node or stays.
     node.count = 0;
     for (int i = 0; i < MAX_ENTRIES; ++i) {
         Node& home = second >> i & 1 ? sibling : node;

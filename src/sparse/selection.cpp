@@ -6,18 +6,11 @@
 namespace vex_util {
 namespace {
 
-// Elements lie in as many runs as a block has rows, where the processor's own guess of what comes next fails:
-// they are asked of the memory this many cells ahead.
+// How many cells ahead elements are prefetched: where a row ends, the hardware prefetcher fails.
 constexpr std::size_t CELLS_AHEAD = 32;
 
-void ask_for(const void* element) {
-    if (element != nullptr) {
-        __builtin_prefetch(element);
-    }
-}
-
-// A callback may fill or empty cells ahead of it, so each word of bits is read again after each call; it may
-// clear or assign the array, which the generation tells, and then the block is gone.
+// The callback may fill or empty later cells, so the bits are read again after each call. If it cleared or
+// assigned the array, which changes the generation, the block no longer exists.
 template <class Storage>
 bool visit_block(const Storage& storage, std::size_t identifier,
                  bool (*visit)(int, int, const void*, const void*), const void* context) {
@@ -29,7 +22,7 @@ bool visit_block(const Storage& storage, std::size_t identifier,
     const BlockGrid grid = contents.Grid();
     const std::size_t cells = grid.CellsPerBlock();
     for (std::size_t cell = 0; cell < std::min(cells, CELLS_AHEAD); ++cell) {
-        ask_for(listed.block.cells[cell]);
+        __builtin_prefetch(listed.block.cells[cell]);
     }
     for (std::size_t word = 0; word < words; ++word) {
         std::uint64_t bits = filled[word];
@@ -38,7 +31,7 @@ bool visit_block(const Storage& storage, std::size_t identifier,
             const std::size_t cell = word * 64 + static_cast<std::size_t>(bit);
             const void* const element = listed.block.cells[cell];
             if (cell + CELLS_AHEAD < cells) {
-                ask_for(listed.block.cells[cell + CELLS_AHEAD]);
+                __builtin_prefetch(listed.block.cells[cell + CELLS_AHEAD]);
             }
             if (!visit(grid.X(listed.key, cell), grid.Y(listed.key, cell), element, context) ||
                 storage.generation != generation) {
@@ -54,7 +47,7 @@ bool visit_block(const Storage& storage, std::size_t identifier,
 
 bool Sparse2DArray::Select(const int* const min, const int* const max) {
     const AutoCriticalSection locked(m_storage->lock);
-    // Aside first: a search that runs out of memory leaves the old selection.
+    // If the search runs out of memory, the old selection stays.
     m_storage->contents.Tree().Search(min, max, m_storage->found);
     m_storage->selection.swap(m_storage->found);
     m_storage->selectionDirty.store(false, std::memory_order_relaxed);
@@ -64,7 +57,7 @@ bool Sparse2DArray::Select(const int* const min, const int* const max) {
 void Sparse2DArray::IterateSelected(bool (*visit)(int, int, const void*, const void*), const void* context) {
     const AutoCriticalSection locked(m_storage->lock);
     const std::vector<int>& selection = m_storage->selection;
-    // By position: a callback that selects again changes the list under the loop.
+    // By index: the callback may change the list.
     for (std::size_t i = 0; i < selection.size(); ++i) {  // NOLINT(modernize-loop-convert)
         if (!visit_block(*m_storage, static_cast<std::size_t>(selection[i]), visit, context)) {
             return;

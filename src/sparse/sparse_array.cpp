@@ -1,3 +1,5 @@
+#include <new>
+
 #include "src/sparse/sparse_array_storage.h"
 
 namespace vex_util {
@@ -12,13 +14,20 @@ Sparse2DArray& Sparse2DArray::operator=(Sparse2DArray& source) {
         return *this;
     }
     const AutoCriticalSectionPair locked(m_storage->lock, source.m_storage->lock);
-    const SparseContents& from = source.m_storage->contents;
-    SparseContents copy(from.ElementSize(), from.Grid().Side(), from.ElementsPerChunk());
-    copy.CopyNonEmptyBlocks(from);
-    m_storage->contents.Swap(copy);
-    m_storage->selection.clear();
-    m_storage->selectionDirty.store(!m_storage->contents.Blocks().empty(), std::memory_order_relaxed);
-    ++m_storage->generation;
+    const auto assign = [&] {
+        const SparseContents& from = source.m_storage->contents;
+        SparseContents copy(from.ElementSize(), from.Grid().Side(), from.ElementsPerChunk());
+        copy.CopyNonEmptyBlocks(from);
+        m_storage->contents.Swap(copy);
+    };
+    try {
+        assign();
+    } catch (const std::bad_alloc&) {
+        // There may be memory for one copy, if not for both.
+        RemoveAll();
+        assign();
+    }
+    m_storage->RenewContents(!m_storage->contents.Blocks().empty());
     return *this;
 }
 
@@ -48,9 +57,7 @@ bool Sparse2DArray::Remove(int x, int y) {
 void Sparse2DArray::RemoveAll() {
     const AutoCriticalSection locked(m_storage->lock);
     m_storage->contents.Clear();
-    m_storage->selection.clear();
-    m_storage->selectionDirty.store(false, std::memory_order_relaxed);
-    ++m_storage->generation;
+    m_storage->RenewContents(false);
 }
 
 }  // namespace vex_util

@@ -7,12 +7,12 @@
 #include <vector>
 
 #include "basalt/sparse.h"
-#include "src/sparse/lock.h"
+#include "src/sparse/critical_section_wrapper.h"
 #include "src/sparse/sparse_contents.h"
 
 namespace vex_util {
 
-// All of it is touched under the lock alone, but for the selection-dirty flag.
+// Guarded by the lock, except for the selection-dirty flag.
 struct Sparse2DArray::Storage {
     Storage(std::size_t elementSize, std::size_t blockSide, std::size_t elementsPerChunk)
         : contents(elementSize, blockSide, elementsPerChunk) {}
@@ -22,11 +22,18 @@ struct Sparse2DArray::Storage {
           selectionDirty(source.selectionDirty.load(std::memory_order_relaxed)) {}
     Storage& operator=(const Storage&) = delete;
 
+    // Drops the selection and ends visits.
+    void RenewContents(bool dirty) noexcept {
+        selection.clear();
+        selectionDirty.store(dirty, std::memory_order_relaxed);
+        ++generation;
+    }
+
     CriticalSectionWrapper lock;
     SparseContents contents;
     std::vector<int> selection;    // identifiers of the selected blocks, in the tree's order
-    std::vector<int> found;        // the next selection while it is being searched for
-    std::uint64_t generation = 0;  // counts what ends a visit: clearing and assignment
+    std::vector<int> found;        // the next selection while it is searched for
+    std::uint64_t generation = 0;  // counts clearing and assignment, which end visits
     std::atomic<bool> selectionDirty{false};
 };
 

@@ -8,10 +8,11 @@
 namespace vex_util {
 namespace {
 
+// Doubles at least, so that adding one by one stays linear.
 template <class Item>
-void reserve_one_more(std::vector<Item>& list) {
-    if (list.size() == list.capacity()) {
-        list.reserve(2 * list.size() + 16);
+void reserve_more(std::vector<Item>& list, std::size_t count) {
+    if (list.capacity() - list.size() < count) {
+        list.reserve(std::max(list.size() + count, 2 * list.size() + 16));
     }
 }
 
@@ -21,9 +22,9 @@ SparseContents::SparseContents(const SparseContents& source)
     : m_grid(source.m_grid),
       m_elements(source.m_elements.ElementSize(), source.m_elements.ElementsPerChunk()),
       m_blocks(source.m_blocks.CellsPerBlock()) {
-    // The clone of the tree comes last, over blocks entered without it.
+    // Blocks are entered without the tree, which is cloned.
     for (const ListedBlock& listed : source.m_list) {
-        ReserveBlock();
+        ReserveBlocks(1);
         CopyBlockElements(source, listed.block, EnterReservedBlock(listed.key));
     }
     slRTree(source.m_tree).swap(m_tree);
@@ -34,9 +35,9 @@ void SparseContents::CopyNonEmptyBlocks(const SparseContents& source) {
         const std::uint64_t* const filled = source.Filled(listed.block);
         if (std::any_of(filled, filled + source.FilledWords(),
                         [](std::uint64_t word) { return word != 0; })) {
-            ReserveBlock();
-            m_tree.Reserve();
-            const Block block = EnterReservedBlock(listed.key);
+            ReserveBlocks(1);
+            m_tree.Reserve(1);
+            const CellBlock block = EnterReservedBlock(listed.key);
             IndexNewestBlock();
             CopyBlockElements(source, listed.block, block);
         }
@@ -44,25 +45,26 @@ void SparseContents::CopyNonEmptyBlocks(const SparseContents& source) {
 }
 
 void SparseContents::InsertIntoNewBlock(int x, int y, const void* element) {
-    ReserveBlock();
-    m_tree.Reserve();
+    ReserveBlocks(1);
+    m_tree.Reserve(1);
     void* const slot = m_elements.Take();
-    const Block block = EnterReservedBlock(m_grid.KeyOf(x, y));
+    const CellBlock block = EnterReservedBlock(m_grid.KeyOf(x, y));
     IndexNewestBlock();
     Fill(block, m_grid.CellOf(x, y), slot, element);
 }
 
-void SparseContents::ReserveBlock() {
-    if (m_list.size() > static_cast<std::size_t>(std::numeric_limits<int>::max())) {
-        throw std::bad_alloc();  // identifiers are ints
+void SparseContents::ReserveBlocks(std::size_t count) {
+    constexpr std::size_t MOST = std::size_t{std::numeric_limits<int>::max()} + 1;  // identifiers are ints
+    if (count > MOST - m_list.size()) {
+        throw std::bad_alloc();
     }
-    reserve_one_more(m_list);
-    m_index.Reserve();
-    m_blocks.Reserve();
+    reserve_more(m_list, count);
+    m_index.Reserve(count);
+    m_blocks.Reserve(count);
 }
 
-Block SparseContents::EnterReservedBlock(BlockKey key) noexcept {
-    const Block block = m_blocks.TakeReserved();
+CellBlock SparseContents::EnterReservedBlock(BlockKey key) noexcept {
+    const CellBlock block = m_blocks.Take();
     m_index.Add(key, block);
     m_list.push_back({key, block});
     m_lastKey = packed(key);
@@ -78,7 +80,7 @@ void SparseContents::IndexNewestBlock() noexcept {
     m_tree.Insert(min, max, static_cast<int>(m_list.size() - 1));
 }
 
-void SparseContents::CopyBlockElements(const SparseContents& source, Block from, Block to) {
+void SparseContents::CopyBlockElements(const SparseContents& source, CellBlock from, CellBlock to) {
     const std::uint64_t* const filled = source.Filled(from);
     for (std::size_t word = 0; word < source.FilledWords(); ++word) {
         for (std::uint64_t bits = filled[word]; bits != 0; bits &= bits - 1) {

@@ -1,4 +1,4 @@
-// What a sparse array keeps: elements, blocks and their index.
+// What a sparse array holds: elements, blocks and their index, without the lock.
 #ifndef BASALT_SRC_SPARSE_SPARSE_CONTENTS_H
 #define BASALT_SRC_SPARSE_SPARSE_CONTENTS_H
 
@@ -7,6 +7,7 @@
 #include <cstring>
 #include <vector>
 
+#include "basalt/sparse_grid.h"
 #include "src/sparse/block_grid.h"
 #include "src/sparse/block_index.h"
 #include "src/sparse/block_pool.h"
@@ -15,30 +16,28 @@
 
 namespace vex_util {
 
-// A value without a lock that is built aside and swapped in whole. An insertion that fails throws
-// std::bad_alloc and leaves everything as it was: room is made everywhere first, then all is entered. A
-// copy that fails leaves an object that is good for destruction alone.
+// An insertion that throws std::bad_alloc changes nothing: all memory is reserved before anything is entered.
+// After a copy that throws, the object is only good for destruction.
 class SparseContents {
 public:
     struct ListedBlock {
         BlockKey key;
-        Block block;
+        CellBlock block;
     };
 
     SparseContents(std::size_t elementSize, std::size_t blockSide, std::size_t elementsPerChunk)
         : m_grid(blockSide), m_elements(elementSize, elementsPerChunk), m_blocks(m_grid.CellsPerBlock()) {}
 
-    // The same blocks under the same identifiers, empty ones among them, with copies of all elements.
+    // The same blocks with the same identifiers, empty ones too, and copies of all elements.
     SparseContents(const SparseContents& source);
     SparseContents& operator=(const SparseContents&) = delete;
 
-    // Into an empty object: copies of all elements, with only the blocks that hold one, in the source's
-    // order.
+    // Into an empty object: copies of all elements, and only the blocks that hold one, in the source's order.
     void CopyNonEmptyBlocks(const SparseContents& source);
 
-    // Copies the element into the cell; true if that made a block.
+    // Copies the element into the cell; true if that created a block.
     bool Insert(int x, int y, const void* element) {
-        const Block block = FindBlock(m_grid.KeyOf(x, y));
+        const CellBlock block = FindBlock(m_grid.KeyOf(x, y));
         if (!block) {
             InsertIntoNewBlock(x, y, element);
             return true;
@@ -53,12 +52,12 @@ public:
     }
 
     void* Find(int x, int y) noexcept {
-        const Block block = FindBlock(m_grid.KeyOf(x, y));
+        const CellBlock block = FindBlock(m_grid.KeyOf(x, y));
         return block ? block.cells[m_grid.CellOf(x, y)] : nullptr;
     }
 
     bool Remove(int x, int y) noexcept {
-        const Block block = FindBlock(m_grid.KeyOf(x, y));
+        const CellBlock block = FindBlock(m_grid.KeyOf(x, y));
         if (!block) {
             return false;
         }
@@ -69,33 +68,47 @@ public:
         }
         m_elements.Give(slot);
         slot = nullptr;
-        block.Filled(m_blocks.CellsPerBlock())[cell / 64] &= ~(std::uint64_t{1} << cell % 64);
+        Word(block, cell) &= ~(std::uint64_t{1} << cell % 64);
         return true;
     }
+
+    // As basalt::SparseCells describes them; InsertRow is true if it created a block.
+    bool InsertRow(int x, int y, const char* elements, std::size_t size, std::size_t count);
+    std::size_t CopyRow(int x, int y, char* elements, std::size_t size, bool* filled, std::size_t count);
+    std::size_t FindRow(int x, int y, void** elements, std::size_t count) noexcept;
+    std::size_t RemoveRow(int x, int y, std::size_t count) noexcept;
+
+    std::size_t FindCells(const basalt::GridCell* cells, void** elements, std::size_t count) const noexcept;
 
     void Clear() noexcept;
     void Swap(SparseContents& other) noexcept;
 
+    std::size_t Size() const noexcept { return m_elements.Size(); }
     std::size_t ElementSize() const noexcept { return m_elements.ElementSize(); }
     std::size_t ElementsPerChunk() const noexcept { return m_elements.ElementsPerChunk(); }
     const BlockGrid& Grid() const noexcept { return m_grid; }
     const std::vector<ListedBlock>& Blocks() const noexcept { return m_list; }
     const slRTree& Tree() const noexcept { return m_tree; }
     std::size_t FilledWords() const noexcept { return m_blocks.FilledWords(); }
-    const std::uint64_t* Filled(Block block) const noexcept { return block.Filled(m_blocks.CellsPerBlock()); }
-
-    // Throws std::logic_error naming the first broken invariant. For tests and debug builds: it visits
-    // everything.
-    void CheckInvariants() const;
+    const std::uint64_t* Filled(CellBlock block) const noexcept {
+        return block.Filled(m_blocks.CellsPerBlock());
+    }
 
 private:
-    Block FindBlock(BlockKey key) noexcept {
+    friend struct SparseInspector;
+
+    struct RowPiece;
+    template <class Step>
+    void EachPiece(int x, int y, std::size_t count, Step step);
+    void ReserveRow(int x, int y, std::size_t count);
+
+    CellBlock FindBlock(BlockKey key) noexcept {
         const std::uint64_t wanted = packed(key);
-        // Neighbouring cells come one after the other, so most look-ups end here.
+        // Most calls are on neighbouring cells and end here.
         if (m_lastBlock && wanted == m_lastKey) {
             return m_lastBlock;
         }
-        const Block found = m_index.Find(key);
+        const CellBlock found = m_index.Find(key);
         if (found) {
             m_lastKey = wanted;
             m_lastBlock = found;
@@ -104,21 +117,25 @@ private:
     }
 
     void InsertIntoNewBlock(int x, int y, const void* element);
-    // Makes room for one block everywhere but in the tree; entering it then cannot fail.
-    void ReserveBlock();
-    Block EnterReservedBlock(BlockKey key) noexcept;
+    // Reserves memory for blocks everywhere but in the tree; EnterReservedBlock then cannot fail.
+    void ReserveBlocks(std::size_t count);
+    CellBlock EnterReservedBlock(BlockKey key) noexcept;
     void IndexNewestBlock() noexcept;
-    void CopyBlockElements(const SparseContents& source, Block from, Block to);
+    void CopyBlockElements(const SparseContents& source, CellBlock from, CellBlock to);
 
-    void Fill(Block block, std::size_t cell, void* slot, const void* element) noexcept {
+    std::uint64_t& Word(CellBlock block, std::size_t cell) const noexcept {
+        return block.Filled(m_blocks.CellsPerBlock())[cell / 64];
+    }
+
+    void Fill(CellBlock block, std::size_t cell, void* slot, const void* element) noexcept {
         CopyElement(slot, element);
         block.cells[cell] = slot;
-        block.Filled(m_blocks.CellsPerBlock())[cell / 64] |= std::uint64_t{1} << cell % 64;
+        Word(block, cell) |= std::uint64_t{1} << cell % 64;
     }
 
     void CopyElement(void* to, const void* from) const noexcept {
         const std::size_t size = m_elements.ElementSize();
-        // A call costs more than copying a small record; sizes start at eight bytes.
+        // A call of memcpy costs more than copying a small element; sizes start at 8 bytes.
         if (size > 64) {
             std::memcpy(to, from, size);
             return;
@@ -138,10 +155,10 @@ private:
     ElementPool m_elements;
     BlockPool m_blocks;
     BlockIndex m_index;
-    std::vector<ListedBlock> m_list;  // in creation order; a block's place in it is its identifier
+    std::vector<ListedBlock> m_list;  // in creation order; the position of a block is its identifier
     slRTree m_tree;
     std::uint64_t m_lastKey = 0;
-    Block m_lastBlock;
+    CellBlock m_lastBlock;
 };
 
 }  // namespace vex_util

@@ -1,10 +1,11 @@
-# Prints a page's program: its first ```cpp block, under the page's own line numbers. With -v output=1 prints the
-# ```text block that follows the program: what the program writes.
+# Prints a page's program: its first ```cpp block, under the page's own line numbers; -v program=N prints the N-th.
+# With -v output=1 prints the ```text block that follows it: what the program writes.
+BEGIN { if (!program) program = 1 }
 /^```/ && !inside {
     inside = 1
     kind = substr($0, 4)
-    wanted = output ? program && kind == "text" : kind == "cpp"
-    if (kind == "cpp") program = 1
+    if (kind == "cpp") ++seen
+    wanted = seen == program && kind == (output ? "text" : "cpp")
     if (wanted && !output) printf "#line %d \"%s\"\n", NR + 1, FILENAME
     next
 }

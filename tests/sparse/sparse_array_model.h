@@ -1,11 +1,10 @@
-// The sparse array written down plainly: cells in a map, blocks in a list, selection by a plain R-tree.
+// The sparse array as maps and lists, with a number for each element slot: the reference for Sparse2DArray.
 #ifndef BASALT_TESTS_SPARSE_SPARSE_ARRAY_MODEL_H
 #define BASALT_TESTS_SPARSE_SPARSE_ARRAY_MODEL_H
 
 #include <algorithm>
 #include <cstdint>
 #include <map>
-#include <optional>
 #include <utility>
 #include <vector>
 
@@ -13,108 +12,134 @@
 
 namespace vex_util::testing {
 
-class SparseArrayModel {
-public:
-    using Value = std::uint64_t;
-    // A visited cell; in a block by rows, which is how its key compares.
+struct SparseArrayModel {
+    struct Element {
+        std::uint64_t value;
+        std::size_t slot;  // counted from the first chunk's slot 0
+    };
+    // Ordered as cells are visited.
     struct Cell {
-        int y;
-        int x;
+        int block, y, x;
         auto operator<=>(const Cell&) const = default;
     };
+    using Cells = std::map<Cell, Element>;
 
-    explicit SparseArrayModel(std::uint32_t side) {
-        while ((std::uint32_t{1} << m_shift) < side) {
-            ++m_shift;
+    SparseArrayModel(std::uint32_t side, std::size_t per_chunk) : chunk(std::max<std::size_t>(per_chunk, 1)) {
+        while ((std::uint32_t{1} << shift) < side) {
+            ++shift;
         }
     }
+    SparseArrayModel(const SparseArrayModel& source) : SparseArrayModel(1, 1) {
+        copy(source, true);
+        selection = source.selection;
+        dirty = source.dirty;
+    }
+    SparseArrayModel& operator=(const SparseArrayModel& source) {
+        if (&source != this) {
+            clear();
+            copy(source, false);
+        }
+        return *this;
+    }
 
-    void insert(int x, int y, Value value) {
-        const Key key{x >> m_shift, y >> m_shift};
-        if (!m_ids.contains(key)) {
-            m_ids[key] = static_cast<int>(m_blocks.size());
-            m_blocks.push_back({key, {}});
+    // The cell; its block is created, or -1 if it does not exist.
+    Cell cell_at(int x, int y, bool create) {
+        const std::pair key(x >> shift, y >> shift);
+        if (create && identifiers.try_emplace(key, static_cast<int>(blocks.size())).second) {
+            blocks.push_back(key);
             dirty = true;
         }
-        m_blocks[static_cast<std::size_t>(m_ids[key])].cells[{y, x}] = value;
+        const auto found = identifiers.find(key);
+        return {found == identifiers.end() ? -1 : found->second, y, x};
     }
 
-    std::optional<Value> find(int x, int y) const {
-        const auto id = m_ids.find({x >> m_shift, y >> m_shift});
-        if (id == m_ids.end()) {
-            return {};
+    void insert(int x, int y, std::uint64_t value) {
+        const Cell cell = cell_at(x, y, true);
+        const auto found = cells.find(cell);
+        cells[cell] = {value, found == cells.end() ? take() : found->second.slot};
+    }
+
+    // Values count up from the given one.
+    void insert_row(int x, int y, std::uint64_t value, int count) {
+        const int widest = 1 << std::min(shift, 6U);
+        for (int begin = 0, end = 0; begin < count; begin = end) {
+            end = std::min(count, begin + widest - ((x + begin) & (widest - 1)));
+            for (int i = end; i-- > begin;) {
+                insert(x + i, y, value + static_cast<std::uint64_t>(i));
+            }
         }
-        const auto& cells = m_blocks[static_cast<std::size_t>(id->second)].cells;
-        const auto cell = cells.find({y, x});
-        return cell == cells.end() ? std::nullopt : std::optional(cell->second);
     }
 
     bool remove(int x, int y) {
-        const auto id = m_ids.find({x >> m_shift, y >> m_shift});
-        return id != m_ids.end() && m_blocks[static_cast<std::size_t>(id->second)].cells.erase({y, x}) == 1;
+        const auto found = cells.find(cell_at(x, y, false));
+        if (found == cells.end()) {
+            return false;
+        }
+        free.push_back(found->second.slot);
+        cells.erase(found);
+        return true;
     }
 
     void clear() {
-        m_ids.clear();
-        m_blocks.clear();
+        identifiers.clear();
+        blocks.clear();
+        cells.clear();
+        free.clear();
         selection.clear();
+        taken = 0;
         dirty = false;
         ++generation;
     }
 
-    void assign(const SparseArrayModel& source) {
-        if (&source == this) {
-            return;
-        }
-        clear();
-        m_shift = source.m_shift;
-        for (const Block& block : source.m_blocks) {
-            if (!block.cells.empty()) {
-                m_ids[block.key] = static_cast<int>(m_blocks.size());
-                m_blocks.push_back(block);
-            }
-        }
-        dirty = !m_blocks.empty();
-    }
-
-    bool select(const int min[2], const int max[2]) {
+    std::vector<int> blocks_in(const rtree::Rect& window) const {
         RTreeModel tree;
-        const int last = static_cast<int>((std::uint32_t{1} << m_shift) - 1);
-        for (std::size_t i = 0; i < m_blocks.size(); ++i) {
-            const int low[2] = {first_cell(m_blocks[i].key.first), first_cell(m_blocks[i].key.second)};
-            const int high[2] = {low[0] + last, low[1] + last};
-            tree.Insert(low, high, static_cast<int>(i));
+        const int last = static_cast<int>((std::uint32_t{1} << shift) - 1);
+        for (const auto& [bx, by] : blocks) {
+            const int x = static_cast<int>(static_cast<std::uint32_t>(bx) << shift);
+            const int y = static_cast<int>(static_cast<std::uint32_t>(by) << shift);
+            tree.insert({x, y, x + last, y + last}, identifiers.at({bx, by}));
         }
-        tree.Search(min, max, selection);
-        dirty = false;
-        return !selection.empty();
+        return tree.search(window);
     }
 
-    // The first filled cell of a block behind `after`; none where the block has no more.
-    std::optional<std::pair<Cell, Value>> next_in_block(std::size_t block, std::optional<Cell> after) const {
-        const auto& cells = m_blocks[block].cells;
-        const auto next = after ? cells.upper_bound(*after) : cells.begin();
-        return next == cells.end() ? std::nullopt : std::optional(std::pair(next->first, next->second));
-    }
-
-    std::size_t blocks() const { return m_blocks.size(); }
-
+    std::vector<std::pair<int, int>> blocks;  // keys in the order of creation
+    Cells cells;
     std::vector<int> selection;
     bool dirty = false;
     int generation = 0;  // raised by what ends a visit
 
 private:
-    using Key = std::pair<int, int>;
-    struct Block {
-        Key key;
-        std::map<Cell, Value> cells;
-    };
+    std::size_t take() {
+        if (free.empty()) {
+            const std::size_t n = taken++;
+            return n - n % chunk + (chunk - 1 - n % chunk);
+        }
+        const std::size_t slot = free.back();
+        free.pop_back();
+        return slot;
+    }
 
-    int first_cell(int key) const { return static_cast<int>(static_cast<std::uint32_t>(key) << m_shift); }
+    void copy(const SparseArrayModel& source, bool empty_too) {
+        shift = source.shift;
+        chunk = source.chunk;
+        for (const auto& [bx, by] : source.blocks) {
+            const int block = source.identifiers.at({bx, by});
+            const auto begin = source.cells.lower_bound({block, INT32_MIN, INT32_MIN});
+            if (empty_too || (begin != source.cells.end() && begin->first.block == block)) {
+                cell_at(static_cast<int>(static_cast<std::uint32_t>(bx) << shift),
+                        static_cast<int>(static_cast<std::uint32_t>(by) << shift), true);
+            }
+            for (auto cell = begin; cell != source.cells.end() && cell->first.block == block; ++cell) {
+                insert(cell->first.x, cell->first.y, cell->second.value);
+            }
+        }
+    }
 
-    unsigned m_shift = 0;
-    std::map<Key, int> m_ids;
-    std::vector<Block> m_blocks;  // in the order of their creation
+    unsigned shift = 0;
+    std::size_t chunk;
+    std::size_t taken = 0;  // slots of chunks, free ones too
+    std::vector<std::size_t> free;
+    std::map<std::pair<int, int>, int> identifiers;
 };
 
 }  // namespace vex_util::testing

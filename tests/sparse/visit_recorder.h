@@ -1,4 +1,4 @@
-// Records what a visit reports.
+// Short forms of the sparse array's calls for elements of 8 bytes, and recorded visits.
 #ifndef BASALT_TESTS_SPARSE_VISIT_RECORDER_H
 #define BASALT_TESTS_SPARSE_VISIT_RECORDER_H
 
@@ -13,14 +13,14 @@
 namespace vex_util::testing {
 
 struct Visited {
-    int x;
-    int y;
+    int x, y;
     std::uint64_t value;
     bool operator==(const Visited&) const = default;
     friend std::ostream& operator<<(std::ostream& out, const Visited& v) {
         return out << '(' << v.x << ", " << v.y << ")=" << v.value;
     }
 };
+using Visits = std::vector<Visited>;
 
 inline std::uint64_t value_at(const void* element) {
     std::uint64_t value = 0;
@@ -28,37 +28,31 @@ inline std::uint64_t value_at(const void* element) {
     return value;
 }
 
-// Calls back with each element; answering false ends the visit.
-using Visitor = std::function<bool(const Visited&)>;
-
-inline bool call_visitor(int x, int y, const void* element, const void* context) {
-    return (*static_cast<const Visitor*>(context))({x, y, value_at(element)});
-}
-
-inline std::vector<Visited> visit_selected(Sparse2DArray& array) {
-    std::vector<Visited> all;
-    const Visitor record = [&](const Visited& v) { return all.push_back(v), true; };
-    array.IterateSelected(call_visitor, &record);
-    return all;
-}
-
-inline std::vector<Visited> visit_all(Sparse2DArray& array) {
-    std::vector<Visited> all;
-    const Visitor record = [&](const Visited& v) { return all.push_back(v), true; };
-    array.IterateAll(call_visitor, &record);
-    return all;
-}
-
 inline void insert_value(Sparse2DArray& array, int x, int y, std::uint64_t value) {
     array.Insert(x, y, &value);
 }
 
-inline bool select(Sparse2DArray& array, int minX, int minY, int maxX, int maxY) {
-    const int min[2] = {minX, minY};
-    const int max[2] = {maxX, maxY};
+inline bool select(Sparse2DArray& array, int min_x, int min_y, int max_x, int max_y) {
+    const int min[2] = {min_x, min_y}, max[2] = {max_x, max_y};
     return array.Select(min, max);
 }
 
+// Receives each element; false ends the visit.
+using Visitor = std::function<bool(const Visited&)>;
+
+// Visits all elements, or those of the selected blocks.
+inline void visit(Sparse2DArray& array, bool all, const Visitor& visitor) {
+    const auto call = [](int x, int y, const void* element, const void* context) {
+        return (*static_cast<const Visitor*>(context))({x, y, value_at(element)});
+    };
+    all ? array.IterateAll(call, &visitor) : array.IterateSelected(call, &visitor);
+}
+
+inline Visits visits(Sparse2DArray& array, bool all) {
+    Visits seen;
+    visit(array, all, [&](const Visited& v) { return seen.push_back(v), true; });
+    return seen;
+}
 }  // namespace vex_util::testing
 
 #endif

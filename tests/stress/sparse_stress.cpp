@@ -1,13 +1,12 @@
-// Sparse arrays: threads on several of them, visits whose callbacks change them, arrays assigned to each
-// other crosswise, and one thread that looks whether everything still hangs together.
+// Threads on several sparse arrays: all operations, visits that change the array, arrays assigned to each
+// other, by one of the threads also from a visit. One thread checks the invariants.
 #include <cstdint>
-#include <cstring>
 #include <memory>
 #include <vector>
 
-#include "basalt/sparse.h"
-#include "tests/sparse/array_inspection.h"
+#include "basalt/sparse_grid.h"
 #include "tests/stress/stress.h"
+#include "tests/support/sparse_inspector.h"
 
 namespace basalt::stress {
 
@@ -15,82 +14,69 @@ namespace {
 
 using vex_util::Sparse2DArray;
 
-constexpr int WRITERS = 6;
-constexpr int SIDE = 80;  // cells
+constexpr int THREADS = 7, SIDE = 80, ROW = 20;
 
-// Whichever thread wrote it, a cell holds what follows from its place; half an element is one that does not.
+// Follows from the cell, so that a mixture of two elements is detected.
 struct Element {
-    std::int32_t x, y;
-    std::uint64_t check;
+    std::int64_t x = 0, y = 0, sum = 0;
+
+    bool is_at(int cell_x, int cell_y) const { return x == cell_x && y == cell_y && sum == 31 * x + y; }
 };
 
-Element element_at(int x, int y) {
-    return {x, y,
-            (static_cast<std::uint64_t>(static_cast<std::uint32_t>(x)) << 32) ^
-                static_cast<std::uint64_t>(static_cast<std::uint32_t>(y)) * 0x9E3779B97F4A7C15U};
-}
-
-void require_whole(int x, int y, const void* bytes) {
-    Element element;
-    std::memcpy(&element, bytes, sizeof element);
-    const Element expected = element_at(x, y);
-    require(element.x == expected.x && element.y == expected.y && element.check == expected.check,
-            "a cell holds its own element");
-}
-
-void insert(Sparse2DArray& array, int x, int y) {
-    const Element element = element_at(x, y);
-    array.Insert(x, y, &element);
-}
-
-struct Visit {
-    Sparse2DArray& array;
+struct Context {
+    int thread;
     Random& random;
-    int left;  // changes that the callback may still make
+    Sparse2DArray &array, &other;
 };
 
-bool check_and_change(int x, int y, const void* element, const void* context) {
-    const Visit& visit = *static_cast<const Visit*>(context);
-    require_whole(x, y, element);
-    int& left = const_cast<Visit&>(visit).left;
-    if (left > 0 && draw(visit.random, 4) == 0) {
-        --left;
-        insert(visit.array, draw(visit.random, SIDE), draw(visit.random, SIDE));
-        visit.array.Remove(draw(visit.random, SIDE), draw(visit.random, SIDE));
+bool visit(int x, int y, const void* element, const void* context) {
+    const auto& [thread, random, array, other] = *static_cast<const Context*>(context);
+    require(static_cast<const Element*>(element)->is_at(x, y), "a cell holds its own element");
+    const int choice = draw(random, 400);
+    if (choice < SIDE) {
+        const Element added{choice, y, 31 * choice + y};
+        array.Insert(choice, y, &added);
+        array.Remove(draw(random, SIDE), y);
+    } else if (choice == SIDE && thread == 0) {
+        draw(random, 2) == 0 ? other = array : array = other;
     }
-    return draw(visit.random, 500) != 0;
+    return choice != 399;
 }
 
-// The lock is held while a callback runs, so nobody changes what is being looked at.
-bool check_whole(int, int, const void*, const void* context) {
-    vex_util::testing::check_invariants(*static_cast<Sparse2DArray*>(const_cast<void*>(context)));
+// The lock is held during a visit.
+bool check_array(int, int, const void*, const void* array) {
+    vex_util::testing::check_invariants(*static_cast<const Sparse2DArray*>(array));
     return false;
 }
 
-void change(Sparse2DArray& array, Sparse2DArray& other, Random& random) {
-    const int x = draw(random, SIDE);
-    const int y = draw(random, SIDE);
-    const int choice = draw(random, 100);
-    const Visit visit{array, random, 10};
-    if (choice < 50) {
-        insert(array, x, y);
-    } else if (choice < 75) {
-        array.Remove(x, y);
-    } else if (choice < 80) {
-        static_cast<void>(array.Find(x, y));  // what it points to may be gone by now
-    } else if (choice < 88) {
-        const int min[2] = {x - 8, y - 8};
-        const int max[2] = {x + 8, y + 8};
+void change(const Context& context) {
+    const auto& [thread, random, array, other] = context;
+    const int x = draw(random, SIDE), y = draw(random, SIDE), choice = draw(random, 200);
+    const int min[2] = {x - 8, y - 8}, max[2] = {x + 8, y + 8};
+    Element row[ROW];
+    bool filled[ROW];
+    for (int i = 0; i < ROW; ++i) {
+        row[i] = {x + i, y, 31 * (x + i) + y};
+    }
+    if (choice < 90) {
+        array.Insert(x, y, row);
+    } else if (choice < 110) {
+        SparseCells::insert_row(array, x, y, row, sizeof(Element), ROW);
+    } else if (choice < 150) {
+        SparseCells::remove_row(array, x, y, choice % ROW);
+    } else if (choice < 170) {
+        SparseCells::copy_row(array, x, y, row, sizeof(Element), filled, ROW);
+        for (int i = 0; i < ROW; ++i) {
+            require(!filled[i] || row[i].is_at(x + i, y), "a copied row holds its own elements");
+        }
+    } else if (choice < 180) {
         array.Select(min, max);
-    } else if (choice < 94) {
-        array.IterateSelected(check_and_change, &visit);
-    } else if (choice < 96) {
-        array.IterateAll(check_and_change, &visit);
-    } else if (choice < 98) {
         array.SetSelectionDirty(!array.IsSelectionDirty());
-    } else if (choice < 99) {
+    } else if (choice < 196) {
+        choice < 190 ? array.IterateSelected(visit, &context) : array.IterateAll(visit, &context);
+    } else if (choice < 199) {
         array = other;
-    } else if (draw(random, 8) == 0) {
+    } else if (x < 10) {
         array.RemoveAll();
     }
 }
@@ -99,29 +85,21 @@ void change(Sparse2DArray& array, Sparse2DArray& other, Random& random) {
 
 long stress_sparse(double seconds) {
     std::vector<std::unique_ptr<Sparse2DArray>> arrays;
-    for (const int side : {1, 4, 16}) {
+    for (const std::size_t side : {1U, 4U, 16U}) {
         arrays.push_back(std::make_unique<Sparse2DArray>(sizeof(Element), side, 7));
     }
-    Sparse2DArray still(sizeof(Element), 8, 16);  // read and copied by all
-    for (int i = 0; i < 200; ++i) {
-        insert(still, i % SIDE, i / 3);
-    }
-    const long rounds = run_threads(WRITERS + 1, seconds, [&](int thread, Random& random) {
-        Sparse2DArray& array = *arrays[static_cast<std::size_t>(draw(random, 3))];
-        if (thread == WRITERS) {
-            array.IterateAll(check_whole, &array);
-            Sparse2DArray copy(still);
-            require(copy.Find(7, 2) != nullptr, "a copy holds what the source does");
-            return;
+    return run_threads(THREADS, seconds, [&](int thread, Random& random) {
+        const auto any = [&]() -> Sparse2DArray& {
+            return *arrays[static_cast<std::size_t>(draw(random, 3))];
+        };
+        Sparse2DArray& array = any();
+        for (int i = 0; i < 50 && thread < THREADS - 1; ++i) {
+            change({thread, random, array, any()});
         }
-        for (int i = 0; i < 50; ++i) {
-            change(array, *arrays[static_cast<std::size_t>(draw(random, 3))], random);
+        if (thread == THREADS - 1) {
+            array.IterateAll(check_array, &array);
         }
     });
-    for (const auto& array : arrays) {
-        vex_util::testing::check_invariants(*array);
-    }
-    return rounds;
 }
 
 }  // namespace basalt::stress

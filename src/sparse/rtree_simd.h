@@ -1,6 +1,7 @@
-// Four numbers at a time, in the compiler's vector types: the same bits as one at a time on every machine.
-#ifndef BASALT_SRC_SPARSE_RTREE_LANES_H
-#define BASALT_SRC_SPARSE_RTREE_LANES_H
+// Four numbers at a time in the compiler's vector types, with the same bits as one at a time on every
+// machine.
+#ifndef BASALT_SRC_SPARSE_RTREE_SIMD_H
+#define BASALT_SRC_SPARSE_RTREE_SIMD_H
 
 #include <cmath>
 #include <cstring>
@@ -56,7 +57,7 @@ inline Float4 sqrt4(Float4 v) {
 #endif
 }
 
-// Bit i is lane i of a comparison's result.
+// Bit i is element i of a comparison's result.
 inline unsigned bits4(Int4 truth) {
 #if defined(__SSE2__)
     return static_cast<unsigned>(_mm_movemask_ps(reinterpret_cast<__m128>(truth)));
@@ -65,7 +66,7 @@ inline unsigned bits4(Int4 truth) {
 #endif
 }
 
-// The least and the greatest of four, in every lane.
+// The least and the greatest of four, in every element.
 inline Float4 least4(Float4 v) {
     v = min4(v, __builtin_shufflevector(v, v, 2, 3, 0, 1));
     return min4(v, __builtin_shufflevector(v, v, 1, 0, 3, 2));

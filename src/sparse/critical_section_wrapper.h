@@ -1,6 +1,6 @@
-// The recursive lock of a sparse array and its scope.
-#ifndef BASALT_SRC_SPARSE_LOCK_H
-#define BASALT_SRC_SPARSE_LOCK_H
+// The recursive lock of a sparse array, and scopes that hold it.
+#ifndef BASALT_SRC_SPARSE_CRITICAL_SECTION_WRAPPER_H
+#define BASALT_SRC_SPARSE_CRITICAL_SECTION_WRAPPER_H
 
 #include <utility>
 
@@ -23,7 +23,7 @@ private:
     CRITICAL_SECTION m_section;
 };
 
-// Holds the lock from construction to destruction, on every way out.
+// Holds the lock from construction to destruction.
 class AutoCriticalSection {
 public:
     explicit AutoCriticalSection(CriticalSectionWrapper& section) : m_section(&section) {
@@ -37,9 +37,8 @@ private:
     CriticalSectionWrapper* m_section;
 };
 
-// Holds two locks from construction to destruction. It never waits for one while it has just entered the
-// other: threads that lock the same two in any order do not wait for each other, not even where one of them
-// had a lock before, as the visitor of an array has.
+// Holds two locks from construction to destruction. It releases the one before it blocks on the other, so
+// threads that lock the same two in any order cannot deadlock, even if one of them held a lock before.
 class AutoCriticalSectionPair {
 public:
     AutoCriticalSectionPair(CriticalSectionWrapper& a, CriticalSectionWrapper& b)
@@ -48,7 +47,7 @@ public:
         while (!m_second->TryEnter()) {
             m_first->Leave();
             std::swap(m_first, m_second);
-            m_first->Enter();  // the one that was held
+            m_first->Enter();
         }
     }
     ~AutoCriticalSectionPair() {

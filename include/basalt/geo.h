@@ -19,6 +19,7 @@
 #include "basalt/geo/curves.h"
 #include "basalt/geo/ellipsoid.h"
 #include "basalt/geo/geodesic.h"
+#include "basalt/geo/local_frame.h"
 #include "basalt/geo/observations.h"
 #include "basalt/geo/plane.h"
 #include "basalt/geo/prepared_polygon.h"

@@ -5,7 +5,7 @@
 
 #include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
-#include "src/geo/local_frame.h"
+#include "src/geo/frame_axes.h"
 
 using namespace basalt::geo;
 
@@ -13,8 +13,7 @@ namespace {
 
 constexpr double SEMI_MAJOR_AXIS = 6378137.0;
 constexpr double ECCENTRICITY2 = 0.00669437999014;
-/// 1 - e^2 by the name of the place that uses it: they differ in the last digits, and each is part of
-/// results.
+/// 1 - e^2, named for its use: the two differ in the last digits, and results depend on both.
 constexpr double FIRST_ESTIMATE_FACTOR = 0.99330562000986;
 constexpr double Z_FACTOR = 0.9933056200098587;
 /// a (1 - e^2), metres.
@@ -45,7 +44,7 @@ geo_vector cartesian(const geo_llh& llh) {
             sine * (n * Z_FACTOR + llh.height)};
 }
 
-/// Latitude and height by the iteration as it is written in the books; p is the distance from the axis.
+/// Latitude and height by the textbook iteration; p is the distance from the axis.
 bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
     double latitude = std::atan2(z, p * FIRST_ESTIMATE_FACTOR);
     double sine = std::sin(latitude);
@@ -72,11 +71,10 @@ bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
 
 constexpr double FLAT = 1.0 - ECCENTRICITY2;
 
-/// The same passes without an angle: the latitude is the direction of (p, q), and a pass takes q to
-/// z + N e^2 sin = z + a e^2 q / sqrt(p^2 + (1 - e^2) q^2), a root and a division for a sine and an
-/// arctangent. Two latitudes differ by the angle whose tangent is p (q - q') / (p^2 + q q').
-/// False when anything might be decided otherwise than by convert_plainly(): a tolerance or a point outside
-/// the range where rounding stays below the margin, a change too close to the tolerance.
+/// The same passes without angles: the latitude is the direction of (p, q), and a pass maps q to
+/// z + N e^2 sin = z + a e^2 q / sqrt(p^2 + (1 - e^2) q^2). Two latitudes differ by the angle of tangent
+/// p (q - q') / (p^2 + q q'). False where convert_plainly() might decide otherwise: a tolerance or point out
+/// of range, or a change within rounding of the tolerance.
 bool settle_quickly(double p, double z, double tolerance, double& q) {
     const double p2 = p * p;
     const double distance2 = p2 + z * z;
@@ -86,7 +84,7 @@ bool settle_quickly(double p, double z, double tolerance, double& q) {
     constexpr double AXIS_PULL = SEMI_MAJOR_AXIS * ECCENTRICITY2;
     const double margin = tolerance * 1e-4 + 1e-14;
     const double base = p * FIRST_ESTIMATE_FACTOR;
-    // The first pass never settles: nothing stands before it.
+    // The first pass never settles.
     q = z + AXIS_PULL * z / std::sqrt(base * base + FLAT * (z * z));
     int passes = 1;
     for (;;) {
@@ -106,8 +104,8 @@ bool settle_quickly(double p, double z, double tolerance, double& q) {
     }
 }
 
-/// Latitude and height from where settle_quickly() ended; false when the latitude is too close to where the
-/// height's formula changes.
+/// Latitude and height after settle_quickly(); false within rounding of the latitude where the height's
+/// formula changes.
 bool convert_quickly(double p, double z, double tolerance, geo_llh& llh) {
     double q = 0.0;
     if (!settle_quickly(p, z, tolerance, q)) {
@@ -122,29 +120,23 @@ bool convert_quickly(double p, double z, double tolerance, geo_llh& llh) {
     return std::abs(beyond) > 1e-14;
 }
 
-/// Nothing when the place cannot be converted.
-std::optional<LocalFrame> local_frame_at(const geo_vector& xyz) {
+}  // namespace
+
+std::optional<FrameAxes> basalt::geo::axes_at(const geo_vector& xyz) {
     const double p = std::sqrt(xyz.x * xyz.x + xyz.y * xyz.y);
     double q = 0.0;
     // Off the axis no angle is needed.
     if (p > 1.0 && settle_quickly(p, xyz.z, LOCAL_FRAME_TOLERANCE, q)) {
         const double length = std::sqrt(p * p + q * q);
-        return LocalFrame(q / length, p / length, xyz.y / p, xyz.x / p);
+        return FrameAxes(q / length, p / length, xyz.y / p, xyz.x / p);
     }
     geo_llh at = {};
     if (_xyz2llh(&xyz, &at, LOCAL_FRAME_TOLERANCE) == 0) {
         return std::nullopt;
     }
-    return LocalFrame(std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude),
-                      std::cos(at.longitude));
+    return FrameAxes(std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude),
+                     std::cos(at.longitude));
 }
-
-/// Sum of products in the order x, y, z, from 0.
-double along(const geo_vector& axis, const geo_vector& d) {
-    return 0.0 + axis.x * d.x + axis.y * d.y + axis.z * d.z;
-}
-
-}  // namespace
 
 void _wgs84curvature(double latitude, double& meridianRadius, double& primeVerticalRadius) {
     const double w = curvature_factor(std::sin(latitude));
@@ -158,8 +150,7 @@ int _xyz2llh(const geo_vector* xyz, geo_llh* llh, double tolerance) {
     }
     const double p = std::sqrt(xyz->x * xyz->x + xyz->y * xyz->y);
     geo_llh result = {};
-    // First, so that its arctangent fills the time the roots and divisions of the latitude wait for each
-    // other.
+    // First: it overlaps with the dependent roots and divisions of the latitude.
     result.longitude = std::atan2(xyz->y, xyz->x);
     if (!convert_quickly(p, xyz->z, tolerance, result) && !convert_plainly(p, xyz->z, tolerance, result)) {
         return 0;
@@ -177,20 +168,19 @@ int _llh2xyz(const geo_llh* llh, geo_vector* xyz) {
 }
 
 int _xyz2nez(const geo_vector* origin, const geo_vector* point, geo_nee* out) {
-    const std::optional<LocalFrame> frame = local_frame_at(*origin);
-    if (!frame) {
+    const std::optional<FrameAxes> axes = axes_at(*origin);
+    if (!axes) {
         return 1;
     }
     const geo_vector d = {point->x - origin->x, point->y - origin->y, point->z - origin->z};
-    out->north = along(frame->north, d);
-    out->east = along(frame->east, d);
-    out->elevation = along(frame->up, d);
+    out->north = along(axes->north, d);
+    out->east = along(axes->east, d);
+    out->elevation = along(axes->up, d);
     return 1;
 }
 
 int llh_equal(const geo_llh& a, const geo_llh& b) {
-    // The conversion itself, not _llh2xyz(): that one refuses the all-zero point, which is a place like any
-    // other.
+    // Not by _llh2xyz(), which refuses the all-zero point.
     geo_vector va = cartesian(a);
     geo_vector vb = cartesian(b);
     return geo_vector_length(va, vb) < EQUALITY_TOLERANCE ? 1 : 0;

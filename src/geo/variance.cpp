@@ -6,9 +6,9 @@
 #include <cstddef>
 
 #include "basalt/geo/ellipsoid.h"
-#include "src/geo/local_frame.h"
+#include "src/geo/frame_axes.h"
 
-using basalt::geo::LocalFrame;
+using basalt::geo::FrameAxes;
 
 namespace {
 
@@ -25,12 +25,12 @@ geo_vector over(const geo_vector& row, double divisor) {
     return {row.x / divisor, row.y / divisor, row.z / divisor};
 }
 
-LocalFrame frame_at(const geo_llh& at) {
+FrameAxes frame_at(const geo_llh& at) {
     return {std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude), std::cos(at.longitude)};
 }
 
 Matrix north_east_up(const geo_llh& at) {
-    const LocalFrame frame = frame_at(at);
+    const FrameAxes frame = frame_at(at);
     return {frame.north, frame.east, frame.up};
 }
 
@@ -39,7 +39,7 @@ Matrix latitude_longitude_height(const geo_llh& at) {
     double meridian = 0.0;
     double prime_vertical = 0.0;
     _wgs84curvature(at.latitude, meridian, prime_vertical);
-    const LocalFrame frame = frame_at(at);
+    const FrameAxes frame = frame_at(at);
     geo_vector longitude = over(frame.east, (prime_vertical + at.height) * std::cos(at.latitude));
     longitude.z = 0.0;  // on the axis too, where 0 / 0 gave NaN
     return {over(frame.north, meridian + at.height), longitude, frame.up};

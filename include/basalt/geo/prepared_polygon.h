@@ -21,12 +21,12 @@ namespace basalt {
 /// crosses in c places some 2 c edges.
 ///
 /// Threads: const calls may run on any number of threads at once.
-class BASALT_API PreparedPolygon {
+class PreparedPolygon {
 public:
     /// @param vertices in either order, without a repeated closing vertex; may be null when count is 0
     /// @param count of vertices; 0 makes a polygon that contains nothing
     /// Throws std::bad_alloc or std::length_error when out of memory.
-    PreparedPolygon(const geo_nee* vertices, std::size_t count);
+    BASALT_API PreparedPolygon(const geo_nee* vertices, std::size_t count);
 
     /// From any contiguous container of geo_nee: std::vector, std::array, std::span.
     template <class Container,
@@ -34,15 +34,15 @@ public:
     explicit PreparedPolygon(const Container& vertices) : PreparedPolygon(vertices.data(), vertices.size()) {}
 
     /// Whether the point lies inside or exactly on a vertex, as geo_point_in_poly().
-    bool contains(const geo_nee& point) const noexcept;
+    BASALT_API bool contains(const geo_nee& point) const noexcept;
 
     /// Whether the point lies inside or within a tolerance of the outline, as geo_point_in_poly_2().
     /// @param tolerance metres; only the crossings count where it is negative or NaN
-    bool contains(const geo_nee& point, double tolerance) const noexcept;
+    BASALT_API bool contains(const geo_nee& point, double tolerance) const noexcept;
 
     /// contains() of each of `count` points.
     /// @param[out] inside buffer of `count` results
-    void contains(const geo_nee* points, std::size_t count, bool* inside) const noexcept;
+    BASALT_API void contains(const geo_nee* points, std::size_t count, bool* inside) const noexcept;
 
 private:
     /// Edges of a bucket, four at a time: from the previous vertex to the vertex. Padded with NaN.

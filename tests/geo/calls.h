@@ -133,6 +133,12 @@ inline int intersect(const geo_nee& p1, const geo_nee& p2, double bearing1, doub
     out = p1;
     return geo_grid_bb_intersect(out, p2, bearing1, bearing2, out);
 }
+inline double inverse(const geo_llh& from, const geo_llh& to, double& azimuth_from, double& azimuth_to) {
+    const basalt::GeodesicInverse line = basalt::geodesic_inverse(from, to);
+    azimuth_from = line.azimuth_from;
+    azimuth_to = line.azimuth_to;
+    return line.distance;
+}
 using Angles = double (*)(double, double);
 using Lines = double (*)(const geo_nee&, const geo_nee&, const geo_nee&, const geo_nee&);
 using OfVector = double (*)(const geo_vector&);
@@ -188,6 +194,7 @@ inline constexpr Call CALLS[] = {
     call<geo_vincenty_distance>("geo_vincenty_distance", 0, 20015087),
     call<geo_vincenty_bearing>("geo_vincenty_bearing", 0, 2 * PI),
     call<geo_vincenty_crosstrack>("geo_vincenty_crosstrack", -20015087, 20015087),
+    call<inverse>("geodesic_inverse", 0, 20003931.459),
     call<_degtorad>("_degtorad"),
     call<_radtodms>("_radtodms", -2147483647, 2147483647),
     call<_dmstorad>("_dmstorad"),

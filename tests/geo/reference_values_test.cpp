@@ -99,4 +99,26 @@ TEST(ReferenceValues, GeodesicsAreRightWithinTheirSeriesAndConstants) {
     });
 }
 
+TEST(ReferenceValues, TheInverseGeodesicIsRightTo20NanometresAnywhere) {
+    for_each_row(BASALT_TEST_DATA "/geodesic_inverse.csv", 7, [](const ReferenceRow& row) {
+        const geo_llh from = place(row[0], row[1]);
+        const geo_llh to = place(row[2], row[3]);
+        const basalt::GeodesicInverse line = basalt::geodesic_inverse(from, to);
+        EXPECT_LE(std::abs(line.distance - row[6]), 2e-8L);
+        EXPECT_EQ(basalt::geodesic_inverse(to, from).distance, line.distance);
+        // Among nearly opposite places on the equator there are two lines of a length.
+        if (row[6] < 19000e3L) {
+            EXPECT_LE(std::abs(angle_difference(line.azimuth_from, radians_of(row[4]))) * row[6], 3e-8L);
+            EXPECT_LE(std::abs(angle_difference(line.azimuth_to, radians_of(row[5]))) * row[6], 3e-8L);
+        }
+        double azimuth = 0.0;
+        geo_llh end = {};
+        geo_vincenty_direct(from, line.azimuth_from, line.distance, azimuth, end);
+        EXPECT_LE(basalt::geodesic_inverse(end, to).distance, 1.5e-4);
+        if (std::abs(row[2]) < 89) {
+            EXPECT_LE(std::abs(angle_difference(azimuth, line.azimuth_to)) * std::cos(to.latitude), 1e-10L);
+        }
+    });
+}
+
 }  // namespace

@@ -65,4 +65,33 @@ BASALT_API double geo_vincenty_crosstrack(geo_llh a, geo_llh b, geo_llh p);
 
 /// @}
 
+namespace basalt {
+
+/// The shortest line between two places on the ellipsoid.
+struct GeodesicInverse {
+    double distance;      ///< metres, 0 to 20003931.459
+    double azimuth_from;  ///< at the start, radians in [-pi, pi]
+    double azimuth_to;    ///< of the same direction at the end, radians in [-pi, pi]
+};
+
+/// Inverse problem on the WGS84 ellipsoid: distance and azimuths of the shortest line, for every pair of
+/// places.
+/// @param from geodetic point; latitude in [-pi/2, pi/2], longitude in any range, height ignored
+/// @param to geodetic point
+/// @return distance and azimuths: 0 all for equal places. Of several shortest lines (between opposite places)
+/// one is returned. At a pole the azimuth is counted from the meridian of the longitude given.
+///
+/// Bad input: three NaN for a latitude beyond a pole, NaN and an infinite longitude. At most 60 passes; 2 or
+/// 3 on most lines.
+///
+/// Accuracy: 1.5e-8 m in distance, nearly opposite places included. The azimuth is that of a line ending as
+/// close to `to`.
+///
+/// Threads: thread-safe.
+///
+/// Source: C. Karney, "Algorithms for geodesics", Journal of Geodesy 87, 2013.
+BASALT_API GeodesicInverse geodesic_inverse(const geo_llh& from, const geo_llh& to);
+
+}  // namespace basalt
+
 #endif

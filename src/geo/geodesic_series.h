@@ -1,0 +1,89 @@
+/// @file
+/// Karney's series for geodesics on the WGS84 ellipsoid, to the sixth order in epsilon. The numbers of
+/// equations are those of C. Karney, "Algorithms for geodesics", Journal of Geodesy 87, 2013.
+#ifndef BASALT_SRC_GEO_GEODESIC_SERIES_H
+#define BASALT_SRC_GEO_GEODESIC_SERIES_H
+
+#include <array>
+#include <cmath>
+
+namespace basalt::geo {
+
+inline constexpr double EQUATORIAL_RADIUS = 6378137.0;       // metres
+inline constexpr double FLATTENING = 0.0033528106647474805;  // 1 / 298.257223563
+inline constexpr double AXIS_RATIO = 1.0 - FLATTENING;       // b / a
+inline constexpr double POLAR_RADIUS = EQUATORIAL_RADIUS * AXIS_RATIO;
+inline constexpr double ECCENTRICITY_2 = FLATTENING * (2.0 - FLATTENING);
+inline constexpr double SECOND_ECCENTRICITY_2 = ECCENTRICITY_2 / (AXIS_RATIO * AXIS_RATIO);
+inline constexpr double THIRD_FLATTENING = FLATTENING / (2.0 - FLATTENING);
+
+/// An angle by its sine and cosine.
+struct Direction {
+    double sine, cosine;
+
+    Direction normalised() const {
+        const double length = std::sqrt(sine * sine + cosine * cosine);
+        return {sine / length, cosine / length};
+    }
+};
+
+/// Angle from one direction to another, as a direction. Its sine is not negative.
+inline Direction turn(const Direction& from, const Direction& to) {
+    const double sine = from.cosine * to.sine - from.sine * to.cosine;
+    return {sine > 0.0 ? sine : 0.0, from.cosine * to.cosine + from.sine * to.sine};
+}
+
+/// factor (angle + sum over l of coefficients[l - 1] sin(2 l angle)).
+template <std::size_t N>
+struct SineSeries {
+    double factor;
+    std::array<double, N> coefficients;
+
+    /// The sum at an angle, by Clenshaw's recurrence.
+    double sum(const Direction& angle) const {
+        const double twice_cosine = 2.0 * (angle.cosine - angle.sine) * (angle.cosine + angle.sine);
+        double next = 0.0;
+        double last = 0.0;
+        for (std::size_t l = N; l-- > 0;) {
+            const double here = coefficients[l] + twice_cosine * next - last;
+            last = next;
+            next = here;
+        }
+        return 2.0 * angle.sine * angle.cosine * next;
+    }
+    /// Difference of the series at two angles that are `arc` apart.
+    double between(const Direction& from, const Direction& to, double arc) const {
+        return factor * (arc + (sum(to) - sum(from)));
+    }
+};
+
+/// I1, the distance over the polar radius; eq. 17, 18.
+inline SineSeries<6> distance_series(double e) {
+    const double e2 = e * e;
+    return {(1.0 + e2 * (1.0 / 4 + e2 * (1.0 / 64 + e2 / 256))) / (1.0 - e),
+            {e * (-1.0 / 2 + e2 * (3.0 / 16 - e2 / 32)), e2 * (-1.0 / 16 + e2 * (1.0 / 32 - e2 * 9.0 / 2048)),
+             e * e2 * (-1.0 / 48 + e2 * 3.0 / 256), e2 * e2 * (-5.0 / 512 + e2 * 3.0 / 512),
+             e * e2 * e2 * (-7.0 / 1280), e2 * e2 * e2 * (-7.0 / 2048)}};
+}
+
+/// I3, the longitude less the one on the sphere, over -f sin(alpha0); eq. 24, 25.
+inline SineSeries<5> longitude_series(double e) {
+    constexpr double n = THIRD_FLATTENING;
+    constexpr double n2 = n * n;
+    const double e2 = e * e;
+    const double e3 = e2 * e;
+    return {1.0 - e * ((1.0 / 2 - n / 2) + e * ((1.0 / 4 + n / 8 - n2 * 3 / 8) +
+                                                e * ((1.0 / 16 + n * 3 / 16 + n2 / 16) +
+                                                     e * ((3.0 / 64 + n / 32) + e * 3.0 / 128)))),
+            {e * ((1.0 / 4 - n / 4) +
+                  e * ((1.0 / 8 - n2 / 8) +
+                       e * ((3.0 / 64 + n * 3 / 64 - n2 / 64) + e * ((5.0 / 128 + n / 64) + e * 3.0 / 128)))),
+             e2 * ((1.0 / 16 - n * 3 / 32 + n2 / 32) +
+                   e * ((3.0 / 64 - n / 32 - n2 * 3 / 64) + e * ((3.0 / 128 + n / 128) + e * 5.0 / 256))),
+             e3 * ((5.0 / 192 - n * 3 / 64 + n2 * 5 / 192) + e * ((3.0 / 128 - n * 5 / 192) + e * 7.0 / 512)),
+             e3 * e * ((7.0 / 512 - n * 7 / 256) + e * 7.0 / 512), e3 * e2 * 21.0 / 2560}};
+}
+
+}  // namespace basalt::geo
+
+#endif

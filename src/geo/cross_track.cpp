@@ -7,6 +7,7 @@
 #include "basalt/geo/geodesic.h"
 #include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
+#include "src/geo/elementary/elementary.h"
 #include "src/geo/geodesic_line.h"
 
 namespace basalt::geo {
@@ -41,28 +42,26 @@ struct Sight {
 class Target {
 public:
     explicit Target(const geo_llh& p)
-        : m_sine(std::sin(p.latitude)), m_cosine(std::cos(p.latitude)), m_longitude(p.longitude) {}
+        : m_latitude(elementary::sin_cos(p.latitude)), m_longitude(p.longitude) {}
 
     Sight seen_from(const LineEnd& foot, double start_longitude) const {
         const double east = m_longitude - (start_longitude + foot.longitude_change);
-        const double sin_east = std::sin(east);
-        const double cos_east = std::cos(east);
+        const auto [sin_east, cos_east] = elementary::sin_cos(east);
         const double length = length_of(foot.latitude_sine, foot.latitude_cosine);
         const double sine = foot.latitude_sine / length;
         const double cosine = foot.latitude_cosine / length;
         // Components of the sight towards north and east at the foot.
-        const double v = cosine * m_sine - sine * m_cosine * cos_east;
-        const double u = sin_east * m_cosine;
+        const double v = cosine * m_latitude.sine - sine * m_latitude.cosine * cos_east;
+        const double u = sin_east * m_latitude.cosine;
         const double azimuth_length = length_of(foot.azimuth_sine, foot.azimuth_cosine);
         const double along_north = foot.azimuth_cosine / azimuth_length;
         const double along_east = foot.azimuth_sine / azimuth_length;
         return {u * along_east + v * along_north, u * along_north - v * along_east,
-                sine * m_sine + cosine * m_cosine * cos_east, length_of(u, v)};
+                sine * m_latitude.sine + cosine * m_latitude.cosine * cos_east, length_of(u, v)};
     }
 
 private:
-    double m_sine;
-    double m_cosine;
+    elementary::SineCosine m_latitude;
     double m_longitude;
 };
 
@@ -82,8 +81,8 @@ struct Goal {
 
 double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& passes) {
     const double bearing = geo_vincenty_bearing(a, b);
-    double along =
-        std::cos(geo_grid_divergence(bearing, geo_vincenty_bearing(a, p))) * geo_vincenty_distance(a, p);
+    double along = elementary::cos(geo_grid_divergence(bearing, geo_vincenty_bearing(a, p))) *
+                   geo_vincenty_distance(a, p);
     const GeodesicLine line(a.latitude, bearing);
     const Target target(p);
     LineEnd best_foot = line.at(along);
@@ -117,8 +116,9 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
         (sight.skew() > goal.aim ? low : high) = along;
         // Napier's rule gives the foot on a great circle; on the ellipsoid each step leaves a fraction of the
         // way. From the second step on that fraction is known, and the sum of all further steps is taken.
-        const double leg = SPHERE_RADIUS * (std::atan2(sight.ahead, sight.cosine) -
-                                            std::atan2(goal.aim * sight.distance, std::abs(sight.cosine)));
+        const double leg =
+            SPHERE_RADIUS * (elementary::atan2(sight.ahead, sight.cosine) -
+                             elementary::atan2(goal.aim * sight.distance, std::abs(sight.cosine)));
         const double fraction = leg / step;
         step = std::abs(fraction) < 0.1 ? leg / (1.0 - fraction) : leg;
         along += step;
@@ -132,7 +132,7 @@ double cross_track(const geo_llh& a, const geo_llh& b, const geo_llh& p, int& pa
         foot = line.at(along);
         sight = target.seen_from(foot, a.longitude);
     }
-    const geo_llh end = {std::atan2(best_foot.latitude_sine, best_foot.latitude_cosine),
+    const geo_llh end = {elementary::atan2(best_foot.latitude_sine, best_foot.latitude_cosine),
                          a.longitude + best_foot.longitude_change, 0.0};
     const double distance = geo_vincenty_distance(end, p);
     return best.right >= 0.0 ? -distance : distance;

@@ -5,6 +5,7 @@
 
 #include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
+#include "src/geo/elementary/elementary.h"
 #include "src/geo/frame_axes.h"
 
 using namespace basalt::geo;
@@ -36,25 +37,24 @@ double prime_vertical_radius(double sine) {
 }
 
 geo_vector cartesian(const geo_llh& llh) {
-    const double sine = std::sin(llh.latitude);
-    const double cosine = std::cos(llh.latitude);
-    const double n = prime_vertical_radius(sine);
-    const double from_axis = (n + llh.height) * cosine;
-    return {std::cos(llh.longitude) * from_axis, std::sin(llh.longitude) * from_axis,
-            sine * (n * Z_FACTOR + llh.height)};
+    const auto [latitude, longitude] = elementary::sin_cos_two(llh.latitude, llh.longitude);
+    const double n = prime_vertical_radius(latitude.sine);
+    const double from_axis = (n + llh.height) * latitude.cosine;
+    return {longitude.cosine * from_axis, longitude.sine * from_axis,
+            latitude.sine * (n * Z_FACTOR + llh.height)};
 }
 
 /// Latitude and height by the textbook iteration; p is the distance from the axis.
 bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
-    double latitude = std::atan2(z, p * FIRST_ESTIMATE_FACTOR);
-    double sine = std::sin(latitude);
+    double latitude = elementary::atan2(z, p * FIRST_ESTIMATE_FACTOR);
+    double sine = elementary::sin(latitude);
     if (tolerance < NO_ITERATION) {
         double previous = -100.0;
         double change = 0.0;
         int passes = 0;
         do {
-            latitude = std::atan2(prime_vertical_radius(sine) * ECCENTRICITY2 * sine + z, p);
-            sine = std::sin(latitude);
+            latitude = elementary::atan2(prime_vertical_radius(sine) * ECCENTRICITY2 * sine + z, p);
+            sine = elementary::sin(latitude);
             change = std::abs(latitude - previous);
             previous = latitude;
             if (++passes > MOST_PASSES) {
@@ -64,8 +64,8 @@ bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
     }
     const double n = prime_vertical_radius(sine);
     llh.latitude = latitude;
-    llh.height =
-        std::abs(latitude) <= POLAR_LATITUDE ? p / std::cos(latitude) - n : z / sine - n + n * ECCENTRICITY2;
+    llh.height = std::abs(latitude) <= POLAR_LATITUDE ? p / elementary::cos(latitude) - n
+                                                      : z / sine - n + n * ECCENTRICITY2;
     return true;
 }
 
@@ -111,7 +111,7 @@ bool convert_quickly(double p, double z, double tolerance, geo_llh& llh) {
     if (!settle_quickly(p, z, tolerance, q)) {
         return false;
     }
-    llh.latitude = std::atan2(q, p);
+    llh.latitude = elementary::atan2(q, p);
     const double length = std::sqrt(p * p + q * q);  // p over the cosine
     // The divisor is 1 to the bit on the equator, so that heights there are exact.
     const double n = SEMI_MAJOR_AXIS / (std::sqrt(p * p + FLAT * (q * q)) / length);
@@ -134,12 +134,12 @@ std::optional<FrameAxes> basalt::geo::axes_at(const geo_vector& xyz) {
     if (_xyz2llh(&xyz, &at, LOCAL_FRAME_TOLERANCE) == 0) {
         return std::nullopt;
     }
-    return FrameAxes(std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude),
-                     std::cos(at.longitude));
+    const auto [latitude, longitude] = elementary::sin_cos_two(at.latitude, at.longitude);
+    return FrameAxes(latitude.sine, latitude.cosine, longitude.sine, longitude.cosine);
 }
 
 void _wgs84curvature(double latitude, double& meridianRadius, double& primeVerticalRadius) {
-    const double w = curvature_factor(std::sin(latitude));
+    const double w = curvature_factor(elementary::sin(latitude));
     meridianRadius = MERIDIAN_NUMERATOR / (w * w * w);
     primeVerticalRadius = SEMI_MAJOR_AXIS / w;
 }
@@ -151,7 +151,7 @@ int _xyz2llh(const geo_vector* xyz, geo_llh* llh, double tolerance) {
     const double p = std::sqrt(xyz->x * xyz->x + xyz->y * xyz->y);
     geo_llh result = {};
     // First: it overlaps with the dependent roots and divisions of the latitude.
-    result.longitude = std::atan2(xyz->y, xyz->x);
+    result.longitude = elementary::atan2(xyz->y, xyz->x);
     if (!convert_quickly(p, xyz->z, tolerance, result) && !convert_plainly(p, xyz->z, tolerance, result)) {
         return 0;
     }

@@ -33,6 +33,10 @@ struct Solution {
     Direction azimuth1, azimuth2;
 };
 
+double square(double x) {
+    return x * x;
+}
+
 double angle_of(const Direction& direction) {
     return elementary::atan2(direction.sine, direction.cosine);
 }
@@ -59,15 +63,14 @@ struct Trial {
         const Direction& b1 = p.beta1;
         const Direction& b2 = p.beta2;
         const double sin_alpha0 = azimuth1.sine * b1.cosine;
-        const double cos2_alpha0 = azimuth1.cosine * azimuth1.cosine + std::pow(azimuth1.sine * b1.sine, 2);
+        const double cos2_alpha0 = azimuth1.cosine * azimuth1.cosine + square(azimuth1.sine * b1.sine);
         const bool same_size = b1.cosine == b2.cosine;
         // Eq. 45, by whichever difference of squares loses less.
         const double difference = b1.cosine < -b1.sine ? (b2.cosine - b1.cosine) * (b2.cosine + b1.cosine)
                                                        : (b1.sine - b2.sine) * (b1.sine + b2.sine);
         azimuth2.sine = same_size ? azimuth1.sine : sin_alpha0 / b2.cosine;
-        azimuth2.cosine = same_size
-                              ? std::abs(azimuth1.cosine)
-                              : std::sqrt(std::pow(azimuth1.cosine * b1.cosine, 2) + difference) / b2.cosine;
+        azimuth2.cosine = same_size ? std::abs(azimuth1.cosine)
+                                    : std::sqrt(square(azimuth1.cosine * b1.cosine) + difference) / b2.cosine;
         const Direction s1 = {b1.sine, azimuth1.cosine * b1.cosine};
         const Direction s2 = {b2.sine, azimuth2.cosine * b2.cosine};
         sigma1 = s1.normalised();

@@ -3,6 +3,7 @@
 #include <cmath>
 
 #include "src/geo/constants.h"
+#include "src/geo/elementary/elementary.h"
 
 namespace basalt::geo {
 
@@ -21,10 +22,11 @@ constexpr int MOST_ARC_PASSES = 100;
 
 }  // namespace
 
-GeodesicLine::GeodesicLine(double latitude, double azimuth)
-    : m_sin_azimuth(std::sin(azimuth)), m_cos_azimuth(std::cos(azimuth)) {
-    // Cheaper than a tangent.
-    m_tan_u = ONE_LESS_FLATTENING * (std::sin(latitude) / std::cos(latitude));
+GeodesicLine::GeodesicLine(double latitude, double azimuth) {
+    const auto [at, towards] = elementary::sin_cos_two(latitude, azimuth);
+    m_sin_azimuth = towards.sine;
+    m_cos_azimuth = towards.cosine;
+    m_tan_u = ONE_LESS_FLATTENING * (at.sine / at.cosine);
     m_cos_u = 1.0 / std::sqrt(m_tan_u * m_tan_u + 1.0);
     m_sin_u = m_tan_u * m_cos_u;
     m_sin_alpha = m_cos_u * m_sin_azimuth;
@@ -42,8 +44,7 @@ GeodesicLine::GeodesicLine(double latitude, double azimuth)
 
 LineEnd GeodesicLine::at(double distance) const {
     const double first = distance / m_metres_per_radian;
-    const double first_sine = std::sin(first);
-    const double first_cosine = std::cos(first);
+    const auto [first_sine, first_cosine] = elementary::sin_cos(first);
     double sigma = first;
     double beyond = 0.0;
     double sine = first_sine;
@@ -70,7 +71,8 @@ LineEnd GeodesicLine::at(double distance) const {
         change = std::abs(sigma - previous);
     }
     const double t = m_sin_u * sine - m_cos_u * cosine * m_cos_azimuth;
-    const double lambda = std::atan2(sine * m_sin_azimuth, m_cos_u * cosine - m_sin_u * sine * m_cos_azimuth);
+    const double lambda =
+        elementary::atan2(sine * m_sin_azimuth, m_cos_u * cosine - m_sin_u * sine * m_cos_azimuth);
     const double k = FLATTENING_16TH * m_cos2_alpha * (4.0 + FLATTENING * (4.0 - 3.0 * m_cos2_alpha));
     return {m_sin_alpha, -t, m_sin_u * cosine + m_cos_u * sine * m_cos_azimuth,
             ONE_LESS_FLATTENING * std::sqrt(m_sin_alpha * m_sin_alpha + t * t),

@@ -2,6 +2,7 @@
 
 #include "basalt/geo.h"
 #include "src/geo/constants.h"
+#include "src/geo/elementary/elementary.h"
 
 using namespace basalt::geo;
 
@@ -11,11 +12,12 @@ int geo_point_on_line(const geo_nee& a, const geo_nee& b, const geo_nee& point, 
         angle = TWO_PI - angle;
     }
     const double distance = geo_horz_dist(a, point);
-    const double along = std::cos(angle) * distance;
+    const auto [sine, cosine] = elementary::sin_cos(angle);
+    const double along = cosine * distance;
     if (along < -tolerance || along > geo_horz_dist(a, b) + tolerance) {
         return 0;
     }
-    return std::abs(std::sin(angle) * distance) <= tolerance;
+    return std::abs(sine * distance) <= tolerance;
 }
 
 int geo_point_on_polyline(int n, const geo_nee* vertices, const geo_nee* point, double tolerance) {

@@ -2,6 +2,7 @@
 
 #include "basalt/geo.h"
 #include "src/geo/constants.h"
+#include "src/geo/elementary/elementary.h"
 
 using namespace basalt::geo;
 
@@ -31,9 +32,10 @@ void geo_reduce_obs(const geo_hvd& obs, const geo_nee& station, double heightOff
         out = {GEO_NULL, GEO_NULL, GEO_NULL};
         return;
     }
-    const double run = std::sin(obs.vertical) * obs.distance * scaleFactor;
-    const double rise = std::cos(obs.vertical) * obs.distance;
-    out = {std::cos(obs.horizontal) * run + station.north, std::sin(obs.horizontal) * run + station.east,
+    const auto [vertical, horizontal] = elementary::sin_cos_two(obs.vertical, obs.horizontal);
+    const double run = vertical.sine * obs.distance * scaleFactor;
+    const double rise = vertical.cosine * obs.distance;
+    out = {horizontal.cosine * run + station.north, horizontal.sine * run + station.east,
            heightOffset + station.elevation + rise};
 }
 
@@ -47,21 +49,23 @@ void geo_calc_obs(const geo_nee& from, double fromHeight, const geo_nee& to, dou
     const double rise = to.elevation + toHeight - from.elevation - fromHeight;
     const double run = std::sqrt(east * east + north * north) * scaleFactor;
     out.horizontal = geo_grid_bearing(from, to);
-    out.vertical = geo_normalised_bearing(HALF_PI - std::atan2(rise, run));
+    out.vertical = geo_normalised_bearing(HALF_PI - elementary::atan2(rise, run));
     out.distance = std::sqrt(run * run + rise * rise);
 }
 
 namespace {
 
 geo_nee followed(const geo_nee& start, double bearing, double distance, double elevation) {
-    return {start.north + std::cos(bearing) * distance, start.east + std::sin(bearing) * distance, elevation};
+    const auto [sine, cosine] = elementary::sin_cos(bearing);
+    return {start.north + cosine * distance, start.east + sine * distance, elevation};
 }
 
 }  // namespace
 
 void geo_grid_follow(const geo_nee& start, double bearing, double distance, double slopeAngle, geo_nee& out) {
     const bool vertical = slopeAngle == HALF_PI || slopeAngle == -HALF_PI;
-    const double elevation = vertical ? start.elevation : start.elevation + std::tan(slopeAngle) * distance;
+    const double elevation =
+        vertical ? start.elevation : start.elevation + elementary::tan(slopeAngle) * distance;
     out = followed(start, bearing, distance, elevation);
 }
 

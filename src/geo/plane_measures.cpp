@@ -2,6 +2,7 @@
 
 #include "basalt/geo.h"
 #include "src/geo/constants.h"
+#include "src/geo/elementary/elementary.h"
 #include "src/geo/one_turn.h"
 
 using basalt::is_null;
@@ -49,7 +50,7 @@ double geo_grid_bearing(const geo_nee& from, const geo_nee& to) {
     // + 0.0: a difference of -0 would reverse the bearing of coincident points.
     const double east = to.east - from.east + 0.0;
     const double north = to.north - from.north + 0.0;
-    return geo_normalised_bearing(std::atan2(east, north));
+    return geo_normalised_bearing(elementary::atan2(east, north));
 }
 
 double geo_gradient(const geo_nee& from, const geo_nee& to) {
@@ -58,7 +59,7 @@ double geo_gradient(const geo_nee& from, const geo_nee& to) {
     if (run < VERTICAL_RUN) {
         return rise > 0.0 ? HALF_PI : -HALF_PI;
     }
-    return std::atan(rise / run);
+    return elementary::atan(rise / run);
 }
 
 double geo_gradient2(const geo_nee& from, const geo_nee& to) {
@@ -102,7 +103,7 @@ double geo_vector_len(geo_vector& v) {
 }
 
 double geo_vector_direction(geo_vector& v) {
-    return geo_normalised_bearing(std::atan2(v.x, v.y));
+    return geo_normalised_bearing(elementary::atan2(v.x, v.y));
 }
 
 namespace {
@@ -110,7 +111,7 @@ namespace {
 /// Angle of slope over a run; vertical for a run that is too short, negative or NaN.
 double slope_angle(double rise, double run) {
     if (run > VERTICAL_RUN) {
-        return std::atan2(rise, run);
+        return elementary::atan2(rise, run);
     }
     return rise >= 0.0 ? HALF_PI : -HALF_PI;
 }

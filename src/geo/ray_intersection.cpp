@@ -2,6 +2,7 @@
 
 #include "basalt/geo.h"
 #include "src/geo/constants.h"
+#include "src/geo/elementary/elementary.h"
 
 using namespace basalt::geo;
 
@@ -16,20 +17,20 @@ bool is_along_north_axis(double direction) {
 /// Intersection of the lines through p1 and p2 in directions a1 and a2, not parallel.
 geo_nee meet_of_lines(const geo_nee& p1, const geo_nee& p2, double a1, double a2) {
     if (is_along_north_axis(a1)) {
-        return {std::tan(a2) * (p1.east - p2.east) + p2.north, p1.east, GEO_NULL};
+        return {elementary::tan(a2) * (p1.east - p2.east) + p2.north, p1.east, GEO_NULL};
     }
     if (is_along_north_axis(a2)) {
-        return {std::tan(a1) * (p2.east - p1.east) + p1.north, p2.east, GEO_NULL};
+        return {elementary::tan(a1) * (p2.east - p1.east) + p1.north, p2.east, GEO_NULL};
     }
-    const double t1 = std::tan(a1);
-    const double t2 = std::tan(a2);
+    const double t1 = elementary::tan(a1);
+    const double t2 = elementary::tan(a2);
     const double east = (p1.north - t1 * p1.east + t2 * p2.east - p2.north) / (t2 - t1);
     const double north = (t2 * p1.north - t1 * t2 * p1.east + t2 * t1 * p2.east - t1 * p2.north) / (t2 - t1);
     return {north, east, GEO_NULL};
 }
 
 bool is_ahead(const geo_nee& start, double direction, const geo_nee& target) {
-    const double bearing = std::atan2(target.north - start.north, target.east - start.east);
+    const double bearing = elementary::atan2(target.north - start.north, target.east - start.east);
     return geo_grid_divergence(direction, bearing) <= HALF_PI;
 }
 

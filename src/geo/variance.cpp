@@ -6,9 +6,10 @@
 #include <cstddef>
 
 #include "basalt/geo/ellipsoid.h"
+#include "src/geo/elementary/elementary.h"
 #include "src/geo/frame_axes.h"
 
-using basalt::geo::FrameAxes;
+using namespace basalt::geo;
 
 namespace {
 
@@ -26,7 +27,8 @@ geo_vector over(const geo_vector& row, double divisor) {
 }
 
 FrameAxes frame_at(const geo_llh& at) {
-    return {std::sin(at.latitude), std::cos(at.latitude), std::sin(at.longitude), std::cos(at.longitude)};
+    const auto [latitude, longitude] = elementary::sin_cos_two(at.latitude, at.longitude);
+    return {latitude.sine, latitude.cosine, longitude.sine, longitude.cosine};
 }
 
 Matrix north_east_up(const geo_llh& at) {
@@ -40,7 +42,7 @@ Matrix latitude_longitude_height(const geo_llh& at) {
     double prime_vertical = 0.0;
     _wgs84curvature(at.latitude, meridian, prime_vertical);
     const FrameAxes frame = frame_at(at);
-    geo_vector longitude = over(frame.east, (prime_vertical + at.height) * std::cos(at.latitude));
+    geo_vector longitude = over(frame.east, (prime_vertical + at.height) * elementary::cos(at.latitude));
     longitude.z = 0.0;  // on the axis too, where 0 / 0 gave NaN
     return {over(frame.north, meridian + at.height), longitude, frame.up};
 }

@@ -3,6 +3,7 @@
 #include "basalt/geo/units.h"
 #include "basalt/graphics/bitmap.h"
 #include "basalt/platform/drawing.h"
+#include "src/geo/elementary/elementary.h"
 #include "src/graphics/memory_surface.h"
 #include "src/graphics/solid_brush.h"
 
@@ -25,9 +26,10 @@ bool copy_turned(HDC to, HDC from, int width, int height, float degrees) {
     const int middle_row = height / 2;
     const auto x = static_cast<float>(middle_column);
     const auto y = static_cast<float>(middle_row);
-    const double radians = _degtorad(static_cast<double>(degrees));
-    const auto cosine = static_cast<float>(std::cos(radians));
-    const auto sine = static_cast<float>(std::sin(radians));
+    const geo::elementary::SineCosine turn =
+        geo::elementary::sin_cos(_degtorad(static_cast<double>(degrees)));
+    const auto cosine = static_cast<float>(turn.cosine);
+    const auto sine = static_cast<float>(turn.sine);
     const XFORM to_middle = {1.0F, 0.0F, 0.0F, 1.0F, x, y};
     const XFORM rotation = {cosine, sine, -sine, cosine, 0.0F, 0.0F};
     const XFORM from_middle = {1.0F, 0.0F, 0.0F, 1.0F, -x, -y};

@@ -1,11 +1,11 @@
 /// @file
-/// Sine, cosine, tangent and arctangents from + - * / and sqrt alone: the same bits under any compiler,
-/// processor and C library, where the C library's depend on whether the processor fuses multiplications and
-/// additions.
+/// Sine, cosine, tangent and arctangents from + - * / alone: the same bits under any compiler, on any
+/// processor and with any C library. The C library's own depend on whether the processor has fused
+/// multiply-add.
 ///
-/// Errors in units in the last place, over all arguments: sine and cosine at most 0.57, atan and atan2 0.58,
-/// tangent 0.60. Signed zeros, infinities, NaN and subnormals follow C's Annex F; no exception flag and no
-/// errno is promised. Rounding must be to nearest. All functions are thread-safe.
+/// Errors over all arguments, in units in the last place: sine and cosine at most 0.62, tangent 0.66,
+/// arctangents 0.58. Signed zeros, infinities, NaN and subnormals as in C's Annex F; errno and exception
+/// flags are unspecified. Rounding must be to nearest. All functions are thread-safe.
 #ifndef BASALT_SRC_GEO_ELEMENTARY_ELEMENTARY_H
 #define BASALT_SRC_GEO_ELEMENTARY_ELEMENTARY_H
 
@@ -26,8 +26,8 @@ double atan(double slope);
 /// Angle of the direction (x, y) from the x axis, in [-pi, pi].
 double atan2(double y, double x);
 
-// Several at a time, each with the bits of the single function. Two take the time of one, four with AVX2 as
-// well.
+// Several at a time, each with the bits of the single function. Two take little more time than one, and so do
+// four with AVX2.
 
 struct SineCosineTwo {
     SineCosine first, second;

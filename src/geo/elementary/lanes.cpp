@@ -51,29 +51,46 @@ BASALT_INLINE void atan2_lanes(const double* ys, const double* xs, double* angle
     }
 }
 
-#if defined(__x86_64__)
-
-[[gnu::target("avx2")]] void sin_cos_avx2(const double* angles, double* sines, double* cosines) {
-    sin_cos_lanes(angles, sines, cosines);
+BASALT_INLINE SineCosineTwo two_sines_and_cosines(double first, double second) {
+    const Two angle = {first, second};
+    Two sine;
+    Two cosine;
+    sine_and_cosine(reduce(angle), sine, cosine);
+    return {{sine[0], cosine[0]}, {sine[1], cosine[1]}};
 }
 
-[[gnu::target("avx2")]] void atan2_avx2(const double* y, const double* x, double* angles) {
+#if defined(__x86_64__)
+
+// AVX broadcasts constants as it loads them: a tenth faster for two as well.
+[[gnu::target("avx2")]] SineCosineTwo sin_cos_two_avx2(double first, double second) {
+    return two_sines_and_cosines(first, second);
+}
+[[gnu::target("avx2")]] void sin_cos_four_avx2(const double* angles, double* sines, double* cosines) {
+    sin_cos_lanes(angles, sines, cosines);
+}
+[[gnu::target("avx2")]] void atan2_four_avx2(const double* y, const double* x, double* angles) {
     atan2_lanes(y, x, angles);
 }
 
+bool has_avx2() {
+    return __builtin_cpu_supports("avx2") != 0;
+}
 #endif
 
 }  // namespace
 
 SineCosineTwo sin_cos_two(double first, double second) {
-    const Two angle = {first, second};
-    if (!all_within(size_of(angle), TINY, REDUCED_LIMIT)) {
+    const double first_size = size_of(first);
+    const double second_size = size_of(second);
+    if (!(smaller(first_size, second_size) >= TINY && larger(first_size, second_size) <= REDUCED_LIMIT)) {
         return {sin_cos(first), sin_cos(second)};
     }
-    Two sine;
-    Two cosine;
-    sine_and_cosine(reduce(angle), sine, cosine);
-    return {{sine[0], cosine[0]}, {sine[1], cosine[1]}};
+#if defined(__x86_64__)
+    if (has_avx2()) {
+        return sin_cos_two_avx2(first, second);
+    }
+#endif
+    return two_sines_and_cosines(first, second);
 }
 
 AngleTwo atan2_two(double first_y, double first_x, double second_y, double second_x) {
@@ -89,8 +106,8 @@ AngleTwo atan2_two(double first_y, double first_x, double second_y, double secon
 
 void sin_cos_four(const double* angles, double* sines, double* cosines) {
 #if defined(__x86_64__)
-    if (__builtin_cpu_supports("avx2") != 0) {
-        return sin_cos_avx2(angles, sines, cosines);
+    if (has_avx2()) {
+        return sin_cos_four_avx2(angles, sines, cosines);
     }
 #endif
     sin_cos_lanes(angles, sines, cosines);
@@ -98,8 +115,8 @@ void sin_cos_four(const double* angles, double* sines, double* cosines) {
 
 void atan2_four(const double* y, const double* x, double* angles) {
 #if defined(__x86_64__)
-    if (__builtin_cpu_supports("avx2") != 0) {
-        return atan2_avx2(y, x, angles);
+    if (has_avx2()) {
+        return atan2_four_avx2(y, x, angles);
     }
 #endif
     atan2_lanes(y, x, angles);

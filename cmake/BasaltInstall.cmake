@@ -1,5 +1,5 @@
-# The package: headers, library, find_package(basalt) and basalt.pc. Three components: the run-time library, what is
-# needed to build against it, and an archive alone, which joins a shared library's package.
+# Installs headers, library, find_package(basalt) and basalt.pc, as three components: the shared library, the
+# development files, and the static archive, which joins the development files of the shared library's package.
 include(GNUInstallDirs)
 include(CMakePackageConfigHelpers)
 
@@ -35,7 +35,7 @@ install(FILES ${PROJECT_BINARY_DIR}/basalt-config.cmake ${PROJECT_BINARY_DIR}/ba
   cmake/BasaltVersionResource.cmake cmake/version_resource.cpp.in
   DESTINATION ${config_dir} COMPONENT development)
 
-# The installed tree may be moved as a whole: basalt.pc finds the rest from where it stands, as the CMake package does.
+# The installed tree may be moved as a whole: basalt.pc has paths relative to itself, as the CMake package has.
 set(pc_libdir "${CMAKE_INSTALL_FULL_LIBDIR}")
 set(pc_includedir "${CMAKE_INSTALL_FULL_INCLUDEDIR}")
 set(pc_prefix "${CMAKE_INSTALL_PREFIX}")

@@ -1,7 +1,7 @@
-# Debian packages, made by cpack: the library, what is needed to build against it, the tool, and the documentation.
-# scripts/debian_packages.sh makes all of them, the static archive included, and the source archive.
+# Debian packages, made by cpack: library, development files, tool, documentation. scripts/debian_packages.sh makes all
+# of them, with the static archive, and the source archive.
 set(CPACK_PACKAGE_NAME basalt)
-set(CPACK_PACKAGE_CONTACT "The basalt authors <basalt@localhost>")
+set(CPACK_PACKAGE_CONTACT "The authors of basalt")
 set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "${PROJECT_DESCRIPTION}")
 set(CPACK_PACKAGE_VERSION "${PROJECT_VERSION}")
 set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
@@ -12,7 +12,7 @@ set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_RELEASE 1)
 set(CPACK_DEBIAN_PACKAGE_PRIORITY optional)
 
-# The run-time package is named after the soname, so that two interfaces can be installed beside each other.
+# The run-time package is named after the soname, so that two interfaces can be installed together.
 get_target_property(basalt_soversion basalt SOVERSION)
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_NAME "libbasalt${basalt_soversion}")
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_SECTION libs)
@@ -32,7 +32,6 @@ set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION "Headers and archives of basalt
 
 set(CPACK_DEBIAN_TOOLS_PACKAGE_NAME basalt)
 set(CPACK_DEBIAN_TOOLS_PACKAGE_SECTION science)
-# The library of the same build brings all that the tool needs.
 set(CPACK_DEBIAN_TOOLS_PACKAGE_SHLIBDEPS OFF)
 set(CPACK_DEBIAN_TOOLS_PACKAGE_DEPENDS
   "${CPACK_DEBIAN_RUNTIME_PACKAGE_NAME} (= ${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE})")
@@ -44,5 +43,19 @@ set(CPACK_DEBIAN_DOCUMENTATION_PACKAGE_SECTION doc)
 set(CPACK_DEBIAN_DOCUMENTATION_PACKAGE_ARCHITECTURE all)
 set(CPACK_COMPONENT_DOCUMENTATION_DESCRIPTION "Reference and guides of basalt
  The reference pages and guides of the basalt runtime library, for a browser.")
+
+# Licence, changes and examples, where Debian looks for them.
+option(BASALT_PACKAGE_DOCS "Install what Debian packages carry as documentation" OFF)
+if(BASALT_PACKAGE_DOCS)
+  execute_process(COMMAND gzip -9nc ${PROJECT_SOURCE_DIR}/CHANGELOG.md OUTPUT_FILE ${PROJECT_BINARY_DIR}/changelog.gz)
+  foreach(component RUNTIME DEVELOPMENT TOOLS DOCUMENTATION)
+    string(TOLOWER ${component} name)
+    install(FILES ${PROJECT_SOURCE_DIR}/cmake/copyright ${PROJECT_BINARY_DIR}/changelog.gz
+      DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/${CPACK_DEBIAN_${component}_PACKAGE_NAME} COMPONENT ${name})
+  endforeach()
+  install(DIRECTORY ${PROJECT_SOURCE_DIR}/examples
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/${CPACK_DEBIAN_DOCUMENTATION_PACKAGE_NAME} COMPONENT documentation
+    PATTERN "*test*" EXCLUDE)
+endif()
 
 include(CPack)

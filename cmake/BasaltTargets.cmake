@@ -1,4 +1,4 @@
-# Compile options of this project's own targets; consumers get none of them.
+# Compile options of this project's own targets, not of its users.
 #
 # -ffp-contract=off: a fused multiply-add rounds once where the documented order of operations rounds twice,
 # and results are fixed to the bit.
@@ -10,8 +10,7 @@ if(BASALT_IS_TOP_LEVEL)
   target_compile_options(basalt_options INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
 endif()
 
-# What stops an attacker costs this library nothing that can be measured. Fortified calls need an optimising
-# build, and sanitizers bring their own.
+# Hardening costs nothing measurable here. Fortified calls need optimisation, and sanitizers replace them.
 option(BASALT_HARDEN "Fortified calls, guarded stacks and return addresses, read-only tables" ${BASALT_IS_TOP_LEVEL})
 if(BASALT_HARDEN AND NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
   target_compile_options(basalt_options INTERFACE -fstack-protector-strong -fstack-clash-protection
@@ -22,6 +21,6 @@ if(BASALT_HARDEN AND NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
   target_link_options(basalt_options INTERFACE -Wl,-z,relro,-z,now,-z,noexecstack)
 endif()
 
-# The same sources give the same bytes, wherever they stand.
+# Reproducible: the same bytes from any folder.
 target_compile_options(basalt_options INTERFACE -ffile-prefix-map=${PROJECT_SOURCE_DIR}=.
   -ffile-prefix-map=${PROJECT_BINARY_DIR}=build)

@@ -1,18 +1,18 @@
 #!/usr/bin/env bash
-# Builds the library and a host program and runs it in the caller's folder, on its sample but for what is given.
+# Builds the library and an example program, and runs it in the caller's folder, on its sample unless told otherwise.
 # Usage: scripts/demo.sh [workarea options]      e.g. --grade 620 --view -84.3,36.5,-84.2,36.6
 #        scripts/demo.sh fieldbook [options]     e.g. --wgs84 K1,47.5,8.5,450 --interval 10
 #        scripts/demo.sh scratch [options]       e.g. --points 1000000 --cells cells.csv
 #        scripts/demo.sh hostinfo [options]      e.g. --json
 #        scripts/demo.sh palette [options]       e.g. FF8800 --picture palette.bmp
-# A terrain or a field book that is given, or --synthetic, takes the place of the sample and of all that goes with it.
+# A terrain or field book of your own, or --synthetic, replaces the sample and its boundary, grade and alignment.
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
 
 need_packages "${BUILD_PACKAGES[@]}"
-mkdir -p build
-cmake -S . -B build/demo -G Ninja -DCMAKE_BUILD_TYPE=Release -DBASALT_BUILD_TESTS=OFF >build/demo.log
+cmake -S . -B build/demo -G Ninja -DCMAKE_BUILD_TYPE=Release -DBASALT_BUILD_TESTS=OFF >build/demo.log 2>&1 ||
+    { cat build/demo.log >&2; exit 1; }
 program=workarea
 case "${1:-}" in
     workarea | fieldbook | scratch | hostinfo | palette)
@@ -20,9 +20,9 @@ case "${1:-}" in
         shift
         ;;
 esac
-cmake --build build/demo --target $program >>build/demo.log || { cat build/demo.log; exit 1; }
+build_with_progress "$program" build/demo --target "$program"
 
-given=' '  # names of options that are given, and `input` for an operand
+given=' '  # names of the options given, and `input` for an operand
 value_follows=false
 for argument in "$@"; do
     if $value_follows; then

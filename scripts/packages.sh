@@ -25,22 +25,24 @@ need_packages() {  # package names; needs no network when all are installed
         }
         as_root=sudo
     fi
-    echo "Installing: ${missing[*]}"
+    echo "Installing Debian packages: ${missing[*]}" >&2
     # shellcheck disable=SC2086  # the command is words
     { $as_root $apt update && $as_root env DEBIAN_FRONTEND=noninteractive $apt install -y --no-install-recommends \
         "${missing[@]}"; } >build/packages.log 2>&1 || { tail -n 20 build/packages.log >&2; exit 1; }
 }
 
-build_with_progress() {  # what is built, arguments of cmake --build; one line of progress, or the errors
+build_with_progress() {  # what is built, arguments of cmake --build; one line of progress on standard error
     local what=$1 log
-    log=build/${what// /-}.log
+    log=build/build-${what%%[ ,]*}.log
     shift
-    printf 'Building %s (output in %s):' "$what" "$log"
-    cmake --build "$@" 2>&1 | tee "$log" | awk 'match($0, /^\[[0-9]+\/[0-9]+\]/) {
-        split(substr($0, 2, RLENGTH - 2), done, "/")
-        for (; next_mark <= 100 * done[1] / done[2]; next_mark += 10) { printf " %d%%", next_mark; fflush() }
-    }' || { echo; grep -A 8 -E 'error: |FAILED' "$log" | head -n 60; exit 1; }
-    echo " done"
+    {
+        printf 'Building %s (output in %s):' "$what" "$log"
+        cmake --build "$@" 2>&1 | tee "$log" | awk 'match($0, /^\[[0-9]+\/[0-9]+\]/) {
+            split(substr($0, 2, RLENGTH - 2), done, "/")
+            for (; next_mark <= 100 * done[1] / done[2]; next_mark += 10) { printf " %d%%", next_mark; fflush() }
+        }' || { echo; grep -A 8 -E 'error: |FAILED' "$log" | head -n 60; exit 1; }
+        echo
+    } >&2
 }
 
 BUILD_PACKAGES=(g++ cmake ninja-build pkg-config libpixman-1-dev)

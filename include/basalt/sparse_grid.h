@@ -17,12 +17,16 @@ namespace basalt {
 
 /// A rectangle of cells; all four bounds are inclusive. A min above its max makes it empty.
 struct GridWindow {
-    int min_x, min_y, max_x, max_y;
+    int min_x;  ///< first column
+    int min_y;  ///< first row
+    int max_x;  ///< last column
+    int max_y;  ///< last row
 };
 
 /// A cell of a grid.
 struct GridCell {
-    int x, y;
+    int x;  ///< column
+    int y;  ///< row
 };
 
 /// Calls on many cells of a vex_util::Sparse2DArray, each under one lock. SparseGrid is the typed interface
@@ -35,7 +39,7 @@ struct GridCell {
 /// Failure: std::bad_alloc, with the array unchanged. Threads: thread-safe, as the array.
 class BASALT_API SparseCells {
 public:
-    using Array = vex_util::Sparse2DArray;
+    using Array = vex_util::Sparse2DArray;  ///< the array of all calls
 
     /// Inserts a row.
     ///
@@ -75,11 +79,12 @@ public:
     /// Cells of one row and one block: for each bit i that is set in both `*filled` and `wanted`, cell
     /// (x + i, y) with element `elements[i]`. After a change of `*generation` neither may be read.
     struct Row {
-        int x, y;
-        void* const* elements;
-        const std::uint64_t* filled;
-        std::uint64_t wanted;
-        const std::uint64_t* generation;
+        int x;                            ///< of bit 0
+        int y;                            ///< of all
+        void* const* elements;            ///< one for each bit
+        const std::uint64_t* filled;      ///< cells that hold an element
+        std::uint64_t wanted;             ///< cells of the window
+        const std::uint64_t* generation;  ///< changes when the array is cleared
     };
 
     /// Visits the rows with filled cells: of the whole array, blocks in the order of their creation, or of a
@@ -122,7 +127,9 @@ public:
         : m_block_side(block_side), m_elements_per_chunk(elements_per_chunk) {
         array();
     }
+    /// Moves leave an empty grid.
     SparseGrid(SparseGrid&&) noexcept = default;
+    /// As above.
     SparseGrid& operator=(SparseGrid&&) noexcept = default;
     ~SparseGrid() = default;
 
@@ -137,6 +144,7 @@ public:
 
     /// The cell's value, which may be changed in place; null if the cell is empty.
     T* find(int x, int y) { return m_array ? static_cast<T*>(m_array->Find(x, y)) : nullptr; }
+    /// As above.
     const T* find(int x, int y) const {
         return m_array ? static_cast<const T*>(m_array->Find(x, y)) : nullptr;
     }
@@ -173,6 +181,7 @@ public:
     void for_each(F f) {
         visit<T, false>(nullptr, f);
     }
+    /// As above.
     template <class F>
     void for_each(F f) const {
         visit<const T, false>(nullptr, f);
@@ -184,6 +193,7 @@ public:
     void for_each(const GridWindow& window, F f) {
         visit<T, false>(&window, f);
     }
+    /// As above.
     template <class F>
     void for_each(const GridWindow& window, F f) const {
         visit<const T, false>(&window, f);
@@ -196,6 +206,7 @@ public:
     void for_each_span(F f) {
         visit<T, true>(nullptr, f);
     }
+    /// As above.
     template <class F>
     void for_each_span(const GridWindow& window, F f) {
         visit<T, true>(&window, f);

@@ -116,31 +116,39 @@ BASALT_API void geo_vector_add(geo_vector& a, geo_vector& b, geo_vector& sum);
 /// @name Vector measures of constants
 /// The functions above for vectors that may not be written.
 /// @{
+
+/// As above.
 inline double geo_vector_length(const geo_vector& a, const geo_vector& b) {
     geo_vector va = a;
     geo_vector vb = b;
     return geo_vector_length(va, vb);
 }
+/// As above.
 inline double geo_vector_len(const geo_vector& v) {
     geo_vector copy = v;
     return geo_vector_len(copy);
 }
+/// As above.
 inline double geo_vector_direction(const geo_vector& v) {
     geo_vector copy = v;
     return geo_vector_direction(copy);
 }
+/// As above.
 inline double geo_vector_gradient(const geo_vector& v) {
     geo_vector copy = v;
     return geo_vector_gradient(copy);
 }
+/// As above.
 inline double geo_vector_x_component_gradient(const geo_vector& v) {
     geo_vector copy = v;
     return geo_vector_x_component_gradient(copy);
 }
+/// As above.
 inline double geo_vector_y_component_gradient(const geo_vector& v) {
     geo_vector copy = v;
     return geo_vector_y_component_gradient(copy);
 }
+/// As above.
 inline void geo_vector_add(const geo_vector& a, const geo_vector& b, geo_vector& sum) {
     geo_vector va = a;
     geo_vector vb = b;

@@ -73,7 +73,7 @@ private:
 /// The process-wide shared heap, without limit, from the load of the library to its unload or the end of the
 /// process, which releases every block; threads that use it must have ended by then. Objects of derived
 /// classes are allocated on it: `new` returns null, and no constructor runs, when out of memory. Placement of
-/// such a class needs the global operator (`::new`). Threads: thread-safe.
+/// such a class needs the global `new`. Threads: thread-safe.
 class BASALT_API vlSharedMemoryHeap {
 public:
     /// As Alloc().

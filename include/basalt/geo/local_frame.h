@@ -28,18 +28,27 @@ public:
     /// Whether the origin is a place: not the all-zero point, NaN, infinite, or near the earth's centre.
     bool valid() const { return m_is_valid; }
 
+    /// Local point of a geodetic one.
     BASALT_API geo_nee to_local(const geo_llh& point) const;
+    /// Local point of a Cartesian one.
     BASALT_API geo_nee to_local(const geo_vector& point) const;
+    /// Geodetic point of a local one.
     BASALT_API geo_llh to_geodetic(const geo_nee& point) const;
+    /// Cartesian point of a local one.
     BASALT_API geo_vector to_cartesian(const geo_nee& point) const;
 
     /// @name Arrays
     /// As the call for each point.
     /// @return how many points were refused
     /// @{
+
+    /// As for one point.
     BASALT_API std::size_t to_local(const geo_llh* in, geo_nee* out, std::size_t count) const;
+    /// As for one point.
     BASALT_API std::size_t to_local(const geo_vector* in, geo_nee* out, std::size_t count) const;
+    /// As for one point.
     BASALT_API std::size_t to_geodetic(const geo_nee* in, geo_llh* out, std::size_t count) const;
+    /// As for one point.
     BASALT_API std::size_t to_cartesian(const geo_nee* in, geo_vector* out, std::size_t count) const;
     /// @}
 

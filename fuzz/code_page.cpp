@@ -1,13 +1,11 @@
-// The two character conversions into buffers of exactly their size, in the environment's encoding; and the
-// coders of UTF-8, plain ASCII and, made by localedef in the folder that LOCPATH names, ISO-8859-1 and EUC-KR
-// against the system's own routines. The C library keeps memory for each locale opened from such a folder, so
-// that needs ASAN_OPTIONS=detect_leaks=0.
+// The two character conversions into buffers of exactly their size, in the environment's encoding; and UTF-8,
+// plain ASCII and, if LOCPATH has them, ISO-8859-1 and EUC-KR, whole and in pieces, against the C library. It
+// keeps memory for each locale from LOCPATH, so that needs ASAN_OPTIONS=detect_leaks=0.
 #include <locale.h>
 
 #include <climits>
-#include <cstdint>
 #include <cstring>
-#include <string>
+#include <cwchar>
 #include <vector>
 
 #include "basalt/frame.h"
@@ -19,83 +17,83 @@ namespace {
 using namespace basalt::platform;
 using basalt::fuzz::require;
 
-// Both directions, cut and emptied as they are, against the whole conversion.
-void check_buffers(const std::string& bytes, const std::wstring& wide, int n) {
-    const auto room = static_cast<std::size_t>(n);
-    std::vector<wchar_t> to_wide(room + 1, L'?');
-    _char2tchar(bytes.c_str(), to_wide.data(), n);
-    const std::string cut(bytes.c_str(), strnlen(bytes.c_str(), room));
-    require(widen(cut) == to_wide.data());
-
-    std::vector<char> to_narrow(room + 1, '?');
-    _tchar2char(wide.c_str(), to_narrow.data(), n);
-    const std::string all = narrow(wide.c_str());
-    require((all.size() <= room ? all : "") == to_narrow.data());
-}
-
-// What comes of any bytes are characters, and those come back.
-void check_code_page(const CodePage& code_page, const std::string& bytes) {
-    const std::wstring wide = code_page.widen(bytes);
-    require(wide.size() <= bytes.size());
-    for (const wchar_t ch : wide) {
-        require(is_unicode_scalar(ch));
-    }
-    std::vector<wchar_t> some(wide.size() / 2);
-    require(code_page.widen_to(bytes, some.data(), some.size()) == wide.size());
-    require(wide.compare(0, some.size(), some.data(), some.size()) == 0);
-    if (wide.find(REPLACEMENT_CHARACTER) == wide.npos) {
-        require(code_page.widen(code_page.narrow(wide)) == wide);
-    }
-}
-
-// However a text is cut into pieces, it comes out as a whole; in lines, the same with more line ends.
-void check_pieces(const CodePage& code_page, const std::wstring& wide, std::size_t most) {
-    std::vector<char> bytes((wide.size() + 2) * MB_LEN_MAX);
-    char* end = bytes.data();
-    std::mbstate_t state{};
-    for (std::wstring_view left = wide; !left.empty();) {
-        end = code_page.narrow_piece(left, most, end, state);
-    }
-    require(std::string(bytes.data(), end) == code_page.narrow(wide));
-
-    end = bytes.data();
-    for (std::wstring_view left = wide; !left.empty();) {
-        end = code_page.narrow_line_piece(left, most, end, state);
-    }
-    std::string lines;
-    for (const char byte : code_page.narrow(wide.c_str())) {
-        lines.append(byte == '\n' ? "\r" : "").append(1, byte);
-    }
-    require(std::string(bytes.data(), end) == lines);
-}
-
-std::wstring wide_units(const std::uint8_t* data, std::size_t size) {
+// Both directions by the C library's routines, one character at a time.
+std::wstring widened(std::string_view bytes, locale_t locale) {
+    uselocale(locale);
     std::wstring wide;
-    for (; size >= 3; data += 3, size -= 3) {
-        wide += static_cast<wchar_t>(data[0] | data[1] << 8 | (data[2] & 0x1F) << 16);
+    for (std::size_t length = 0; !bytes.empty(); bytes.remove_prefix(length)) {
+        std::mbstate_t state{};
+        wchar_t ch = 0;
+        length = std::mbrtowc(&ch, bytes.data(), bytes.size(), &state);
+        const bool is_invalid = length > bytes.size() || !is_unicode_scalar(ch);
+        wide += is_invalid ? REPLACEMENT_CHARACTER : ch;
+        length = is_invalid || length == 0 ? 1 : length;
     }
+    uselocale(LC_GLOBAL_LOCALE);
     return wide;
+}
+std::string narrowed(const std::wstring& wide, locale_t locale) {
+    uselocale(locale);
+    std::string bytes;
+    for (const wchar_t ch : wide) {
+        std::mbstate_t state{};
+        char some[MB_LEN_MAX];
+        const std::size_t length = std::wcrtomb(some, ch, &state);
+        const bool is_invalid = length - 1 >= sizeof some || !is_unicode_scalar(ch);
+        bytes += is_invalid ? "?" : std::string(some, length);
+    }
+    uselocale(LC_GLOBAL_LOCALE);
+    return bytes;
+}
+
+void check(const CodePage& code_page, locale_t locale, const std::string& bytes, const std::wstring& wide,
+           int piece) {
+    require(code_page.widen(bytes) == widened(bytes, locale));
+    const std::string expected = narrowed(wide, locale);
+    std::string all;
+    std::string lines;
+    std::vector<char> some(static_cast<std::size_t>(piece) * MB_LEN_MAX);
+    for (std::wstring_view left = wide; !left.empty();) {
+        all.append(some.data(), code_page.narrow_piece(left, static_cast<std::size_t>(piece), some.data()));
+    }
+    for (std::wstring_view left = wide; !left.empty();) {
+        lines.append(some.data(),
+                     code_page.narrow_line_piece(left, static_cast<std::size_t>(piece), some.data()));
+    }
+    require(all == expected && code_page.narrow(wide) == expected);
+    std::string expected_lines;
+    for (const char byte : narrowed(wide.c_str(), locale)) {
+        expected_lines.append(byte == '\n' ? "\r" : "").append(1, byte);
+    }
+    require(lines == expected_lines);
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    static const CodePage code_pages[] = {CodePage(nullptr), CodePage("C"), CodePage("ISO-8859-1"),
-                                          CodePage("EUC-KR")};
-    static const locale_t utf8 = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
-    if (size == 0) {
-        return 0;
+    static const char* const NAMES[] = {"C.UTF-8", "C", "ISO-8859-1", "EUC-KR"};
+    static const CodePage code_pages[] = {CodePage(NAMES[0]), CodePage(NAMES[1]), CodePage(NAMES[2]),
+                                          CodePage(NAMES[3])};
+    basalt::fuzz::Input input(data, size);
+    const int n = input.byte();
+    const std::string bytes(input.data(), input.data() + input.left());
+    std::wstring wide;
+    while (!input.is_over()) {
+        wide += static_cast<wchar_t>(input.word() >> (input.byte() % 32));
     }
-    const std::string bytes(reinterpret_cast<const char*>(data + 1), size - 1);
-    const std::wstring wide = wide_units(data + 1, size - 1);
-    check_buffers(bytes, wide, data[0]);
-    for (const CodePage& code_page : code_pages) {
-        check_code_page(code_page, bytes);
-        check_pieces(code_page, wide, data[0] % 5 + 1);
-    }
-    if (utf8 != nullptr) {
-        require(wide_from_utf8(bytes) == widen_by_locale(bytes, utf8));
-        require(utf8_from_wide(wide) == narrow_by_locale(wide, utf8));
+    std::vector<wchar_t> to_wide(static_cast<std::size_t>(n) + 1, L'?');
+    _char2tchar(bytes.c_str(), to_wide.data(), n);
+    require(widen({bytes.c_str(), strnlen(bytes.c_str(), static_cast<std::size_t>(n))}) == to_wide.data());
+    std::vector<char> to_narrow(static_cast<std::size_t>(n) + 1, '?');
+    _tchar2char(wide.c_str(), to_narrow.data(), n);
+    const std::string all = narrow(wide.c_str());
+    require((all.size() <= static_cast<std::size_t>(n) ? all : "") == to_narrow.data());
+    for (std::size_t i = 0; i < std::size(NAMES); ++i) {
+        static locale_t locales[std::size(NAMES)];
+        locales[i] = locales[i] != nullptr ? locales[i] : newlocale(LC_CTYPE_MASK, NAMES[i], nullptr);
+        if (locales[i] != nullptr) {
+            check(code_pages[i], locales[i], bytes, wide, n % 5 + 1);
+        }
     }
     return 0;
 }

@@ -5,7 +5,6 @@
 
 #include "basalt/memory.h"
 #include "src/frame/codec_guard.h"
-#include "src/platform/codec.h"
 
 namespace {
 
@@ -13,21 +12,12 @@ namespace {
 // heap in their constructors and destructors.
 constexpr int MODULE_PRIORITY = 101;
 
-constexpr basalt::frame::CodecCalls CODEC = {
-    .start = []() -> std::uintptr_t {
-        const GdiplusStartupInput input = {1, nullptr, 0, 0};
-        std::uintptr_t token = 0;
-        return GdiplusStartup(&token, &input, nullptr) == Gdiplus::Ok ? token : 0;
-    },
-    .shut_down = GdiplusShutdown,
-};
-
 }  // namespace
 
 // 1. Module state of the application framework: none here.
 
 // 2. The image codec's start-up guard.
-[[gnu::init_priority(MODULE_PRIORITY)]] basalt::frame::CodecGuard basalt::frame::codec_guard(CODEC);
+[[gnu::init_priority(MODULE_PRIORITY)]] basalt::frame::CodecGuard basalt::frame::codec_guard;
 
 // 3. The standard library's error categories: constructed with that library.
 

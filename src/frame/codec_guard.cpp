@@ -1,9 +1,11 @@
 #include "src/frame/codec_guard.h"
 
+#include "src/platform/codec.h"
+
 namespace basalt::frame {
 
 CodecGuard::~CodecGuard() {
-    // In a forked child a thread that is not there may hold it for ever.
+    // In a forked child the lock may be held by a thread that does not exist there.
     if (const std::unique_lock hold(m_lock, std::try_to_lock); hold) {
         ShutDown();
     }
@@ -27,14 +29,17 @@ bool CodecGuard::Start() {
     }
     const std::lock_guard hold(m_lock);
     if (m_token == 0) {
-        m_token = m_calls.start();
+        const GdiplusStartupInput input = {1, nullptr, 0, 0};
+        if (GdiplusStartup(&m_token, &input, nullptr) != Gdiplus::Ok) {
+            m_token = 0;
+        }
     }
     return m_token != 0;
 }
 
 void CodecGuard::ShutDown() {
     if (m_token != 0) {
-        m_calls.shut_down(m_token);
+        GdiplusShutdown(m_token);
         m_token = 0;
     }
 }

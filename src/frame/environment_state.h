@@ -1,4 +1,4 @@
-// The frame's process-wide settings as stored, for the code that reads them without a query, and for tests.
+// The frame's process-wide settings as stored.
 #ifndef BASALT_SRC_FRAME_ENVIRONMENT_STATE_H
 #define BASALT_SRC_FRAME_ENVIRONMENT_STATE_H
 
@@ -11,11 +11,10 @@ namespace basalt::frame {
 
 inline constexpr basalt_language DEFAULT_LANGUAGE = 15;
 
-// Marks the resolution factor as not determined; compared exactly.
+// Marks the resolution factor as not determined, by exact comparison.
 inline constexpr double RESOLUTION_NOT_DETERMINED = 2e-308;
 
-// A value that all threads may read and write, with no order among different values: two threads that make
-// a first query at once both store the same answer.
+// Read and written by any thread, unordered: two threads that make the first query both store the same value.
 template <class T>
 class Setting {
 public:
@@ -38,7 +37,7 @@ struct EnvironmentState {
     Setting<std::uint32_t> last_random_seed{0};  // tick count last given to the random generator
 };
 
-// Constant-initialised: fresh at every load, and nothing to clean up at unload.
+// Constant-initialised: nothing to do at load and unload.
 extern EnvironmentState environment;
 
 }  // namespace basalt::frame

@@ -10,26 +10,26 @@ namespace {
 constexpr std::size_t LONGEST_VALUE = MAX_PATH - 1;
 constexpr wchar_t INBOX[] = L"\\Inbox";
 
-// A setting of at most LONGEST_VALUE characters. Nothing of an old value stays behind the terminator, so that
-// a buffer can be compared or written out whole.
-using Setting = wchar_t[MAX_PATH];
+// At most LONGEST_VALUE characters, filled with zeros, so that a buffer can be compared or written as a
+// whole.
+using FixedText = wchar_t[MAX_PATH];
 
-constinit Setting root_folder = {};
-constinit Setting product_folder = {};
-constinit Setting executable_folder = {};
-constinit Setting application_version = {};
+constinit FixedText root_folder = {};
+constinit FixedText product_folder = {};
+constinit FixedText executable_folder = {};
+constinit FixedText application_version = {};
 
-// Longer than the others, so that no inbox is ever cut.
+// Longer than the others, so that no inbox is truncated.
 constinit wchar_t inbox_folder[LONGEST_VALUE + std::size(INBOX)] = {};
 
-// By way of a copy: the value may stand in the very setting, or be another setting of the library's.
-void store(Setting& setting, const wchar_t* value) {
-    Setting copy = {};
+// Copied first: the value may be the destination itself or another of these texts.
+void store(FixedText& destination, const wchar_t* value) {
+    FixedText copy = {};
     std::wcsncpy(copy, value, LONGEST_VALUE);
-    std::copy(std::begin(copy), std::end(copy), setting);
+    std::copy(std::begin(copy), std::end(copy), destination);
 }
 
-void store_folder(Setting& folder, const wchar_t* value) {
+void store_folder(FixedText& folder, const wchar_t* value) {
     _operatingsystem();
     store(folder, value);
 }
@@ -76,9 +76,8 @@ wchar_t* _kestraApplicationVersion() {
 }
 
 CString _tempFilePath() {
-    Setting folder = {};
-    // A length beyond the buffer is the room the folder would have needed: then, as on failure, nothing was
-    // written.
+    FixedText folder = {};
+    // Writes nothing if the folder does not fit.
     GetTempPathW(MAX_PATH, folder);
     return folder;
 }

@@ -15,7 +15,7 @@ struct Replacement {
 constexpr std::size_t CAPACITY = 1000;
 using Table = std::array<Replacement, CAPACITY>;
 
-// A plain pointer: at unload a table that the host has not released stays, as the host may expect.
+// A plain pointer: unloading does not release the table, only _REPLACE_CLEANUP() does.
 constinit Table* table = nullptr;
 constinit std::size_t count = 0;
 constinit bool enabled = false;

@@ -7,11 +7,11 @@
 
 namespace basalt::frame {
 
-// The release code of a version record, 0 for a combination that is not in the table.
+// The release code of a version record, 0 for one that is not in the table.
 basalt_os release_code(const OSVERSIONINFOW& version);
 
-// Asks the platform for its version and stores the release code. A failed query or an unlisted version
-// leaves the stored code as it was. The stored version number becomes 0 either way.
+// Queries the platform's version and stores the release code. A failed query or an unlisted version leaves
+// the stored code unchanged. The stored version number becomes 0 in every case.
 void detect_operating_system();
 
 }  // namespace basalt::frame

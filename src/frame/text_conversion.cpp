@@ -3,12 +3,11 @@
 #include <cwchar>
 
 #include "basalt/frame.h"
-#include "src/platform/integer_text.h"
-#include "src/platform/multi_byte.h"
+#include "src/platform/text_conversion.h"
 
 namespace {
 
-// The text's length, read no further than n.
+// The text's length, at most n.
 template <class Character>
 int length_up_to(const Character* text, int n) {
     int length = 0;
@@ -18,7 +17,7 @@ int length_up_to(const Character* text, int n) {
     return length;
 }
 
-// The converters' result is a count of 16 bits when the terminator is placed.
+// The terminator's index has 16 bits.
 std::uint16_t terminator_index(int converted) {
     return static_cast<std::uint16_t>(converted);
 }
@@ -46,7 +45,7 @@ void _char2tchar(const char* source, wchar_t* destination, int n) {
 }
 
 void _tchar2char(const wchar_t* source, char* destination, int n) {
-    // Without room the converter would answer the room needed.
+    // With a capacity of 0 the result would be the number of bytes needed.
     int converted = 0;
     if (n > 0) {
         const auto length = static_cast<int>(std::wcslen(source));

@@ -1,4 +1,4 @@
-// Counts of 100-nanosecond ticks since 1601 as one number, and from the system's clock times.
+// Counts of 100-nanosecond ticks since 1601, from and to FILETIME and the system's times.
 #ifndef BASALT_SRC_PLATFORM_TICKS_H
 #define BASALT_SRC_PLATFORM_TICKS_H
 
@@ -27,9 +27,8 @@ constexpr std::int64_t tick_count(const FILETIME& time) {
     return static_cast<std::int64_t>(std::uint64_t{time.dwHighDateTime} << 32 | time.dwLowDateTime);
 }
 
-// Seconds may be negative, nanoseconds never; they are cut to ticks. Times before 1601 come to the first tick
-// and those after 30828 to the last second that a signed count holds whole: some file systems keep such
-// times.
+// Nanoseconds are not negative and are truncated to ticks. Times before 1601 and after 30828, which some file
+// systems can store, are clamped to the first tick and to the last whole second that a signed count holds.
 constexpr std::int64_t ticks_of(std::int64_t seconds_since_1970, std::int64_t nanoseconds) {
     constexpr std::int64_t LAST_SECOND = std::numeric_limits<std::int64_t>::max() / TICKS_PER_SECOND - 1;
     if (seconds_since_1970 < -SECONDS_BEFORE_1970) {

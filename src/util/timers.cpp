@@ -4,7 +4,7 @@
 #include <cmath>
 #include <mutex>
 
-#include "src/platform/performance_counter.h"
+#include "src/platform/clock.h"
 
 namespace vex_util {
 
@@ -20,8 +20,7 @@ double seconds(std::int64_t ticks) {
     return static_cast<double>(ticks) * HiResTimer::s_llFrequency;
 }
 
-// Atomically, so that no timer reads the shared value while another thread's first one writes it; under a
-// lock, so that only one of them asks.
+// Atomic because other threads' timers read the shared value; locked so that it is queried once.
 void determine_tick_length() {
     static constinit std::mutex lock;
     const std::atomic_ref<double> tick_length(HiResTimer::s_llFrequency);
@@ -42,7 +41,7 @@ constinit double HiResTimer::s_llFrequency = 0.0;
 
 HiResTimer::HiResTimer() : HiResTimer(CString(), false) {}
 
-// NOLINTNEXTLINE(modernize-pass-by-value): the published signature
+// NOLINTNEXTLINE(modernize-pass-by-value): the declared signature
 HiResTimer::HiResTimer(const CString& name, bool flag) : m_name(name), m_flag(flag) {
     determine_tick_length();
     Reset();
@@ -86,7 +85,7 @@ void PeriodicTimer::Reset(float period, bool startDue) {
 
 bool PeriodicTimer::Update(bool dropRemainder) {
     const float passed = m_stopwatch.GetElapsedS() + m_carry;
-    // Not the other way round: an unordered comparison reports nothing.
+    // False for NaN, which reports nothing.
     if (!(passed >= m_period)) {
         return false;
     }

@@ -1,15 +1,14 @@
-#include "basalt/frame.h"
-
 #include <gtest/gtest.h>
 #include <time.h>
 
+#include <algorithm>
 #include <bit>
 #include <cstdlib>
-#include <set>
-#include <utility>
+#include <string_view>
+#include <vector>
 
 #include "src/frame/environment_state.h"
-#include "src/platform/system_info.h"
+#include "src/frame/os_detection.h"
 
 namespace {
 
@@ -18,120 +17,88 @@ using basalt::frame::environment;
 // Stand-ins for the version query and the system's clock, put in place by the linker.
 struct FakePlatform {
     bool query_works = true;
-    DWORD platform = 2;
     DWORD major = 6;
     DWORD minor = 2;
     int queries = 0;
-    bool clock_is_set = false;
-    timespec clock{};
+    std::uint64_t milliseconds = 0;  // 0: the system's clock
 } fake;
 
 }  // namespace
 
 extern "C" {
-// The names the linker's --wrap makes of GetVersionExW and clock_gettime.
 int __real_clock_gettime(clockid_t id, timespec* time);
 int __wrap_clock_gettime(clockid_t id, timespec* time) {
-    if (!fake.clock_is_set) {
+    if (fake.milliseconds == 0) {
         return __real_clock_gettime(id, time);
     }
-    *time = fake.clock;
+    time->tv_sec = static_cast<time_t>(fake.milliseconds / 1000);
+    time->tv_nsec = static_cast<long>(fake.milliseconds % 1000) * 1'000'000 + 999'999;
     return 0;
 }
-BOOL __wrap__Z13GetVersionExWP14OSVERSIONINFOW(OSVERSIONINFOW* information) {
+BOOL __wrap__Z13GetVersionExWP14OSVERSIONINFOW(OSVERSIONINFOW* version) {
     ++fake.queries;
-    if (!fake.query_works || information->dwOSVersionInfoSize != 276) {
-        return 0;
-    }
-    information->dwPlatformId = fake.platform;
-    information->dwMajorVersion = fake.major;
-    information->dwMinorVersion = fake.minor;
-    return 1;
+    version->dwPlatformId = 2;
+    version->dwMajorVersion = fake.major;
+    version->dwMinorVersion = fake.minor;
+    return static_cast<BOOL>(fake.query_works && version->dwOSVersionInfoSize == 276);
 }
 }
 
 namespace {
 
-class Environment : public testing::Test {
-protected:
-    void SetUp() override {
-        fake = {};
-        environment.os_code.store(0);
-        environment.handheld_code.store(0);
-        environment.new_generation.store(false);
-        environment.rtk_option.store(false);
+TEST(Environment, operating_system_codes) {
+    constexpr DWORD ROWS[][4] = {{0, 0, 0, 1},  {0, 3, 10, 1}, {1, 4, 0, 2},  {1, 9, 0, 2},  {1, 4, 10, 3},
+                                 {1, 4, 90, 4}, {1, 4, 1, 0},  {1, 4, 91, 0}, {1, 4, 9, 0},  {1, 4, 11, 0},
+                                 {1, 4, 89, 0}, {2, 3, 51, 0}, {2, 4, 0, 5},  {2, 4, 77, 5}, {2, 5, 0, 6},
+                                 {2, 5, 1, 7},  {2, 5, 2, 7},  {2, 5, 3, 0},  {2, 6, 0, 9},  {2, 6, 1, 10},
+                                 {2, 6, 2, 11}, {2, 6, 3, 0},  {2, 10, 0, 0}, {2, 0, 0, 0},  {3, 6, 2, 0}};
+    for (const auto& [platform, major, minor, code] : ROWS) {
+        const OSVERSIONINFOW version{276, major, minor, 0, platform, {}};
+        EXPECT_EQ(basalt::frame::release_code(version), code) << platform << ' ' << major << '.' << minor;
     }
-    void TearDown() override { SetUp(); }
-
-    static void set_tick(std::uint64_t milliseconds) {
-        fake.clock_is_set = true;
-        fake.clock.tv_sec = static_cast<time_t>(milliseconds / 1000);
-        fake.clock.tv_nsec = static_cast<long>(milliseconds % 1000) * 1'000'000 + 999'999;
-    }
-};
-
-TEST_F(Environment, operating_system_is_asked_for_until_it_is_determined) {
-    fake.minor = 3;
+    environment.os_code.store(0);
+    fake = {.minor = 3};
     EXPECT_EQ(_operatingsystem(), 0U);
-    fake.query_works = false;
-    EXPECT_EQ(_operatingsystem(), 0U);
+    fake = {.query_works = false, .queries = 1};
+    EXPECT_EQ(_operatingsystem(), 0U) << "queried until it is determined";
     fake = {.queries = 2};
-    EXPECT_EQ(_operatingsystem(), 11U);
-    fake.minor = 1;
-    EXPECT_EQ(_operatingsystem(), 11U);
+    EXPECT_EQ(_operatingsystem() + _operatingsystem(), 22U);
     EXPECT_EQ(fake.queries, 3);
-}
-
-TEST_F(Environment, version_number_is_0_and_detects_at_every_call) {
-    EXPECT_EQ(_operatingsystemversion(), 0);
-    EXPECT_EQ(environment.os_code.load(), 11U);
     fake.minor = 1;
     EXPECT_EQ(_operatingsystemversion(), 0);
-    EXPECT_EQ(environment.os_code.load(), 10U) << "a detection stores what it finds";
+    EXPECT_EQ(_operatingsystem(), 10U) << "each version query stores what it detects";
     fake.major = 10;
     EXPECT_EQ(_operatingsystemversion(), 0);
-    EXPECT_EQ(environment.os_code.load(), 10U) << "an unlisted version leaves the code alone";
-    EXPECT_EQ(fake.queries, 3);
+    EXPECT_EQ(_operatingsystem(), 10U) << "but not an unlisted version";
+    EXPECT_EQ(fake.queries, 5);
+    environment.os_code.store(0);
 }
 
-TEST_F(Environment, handheld_capabilities) {
-    for (basalt_hh code = 1; code <= 15; ++code) {
-        const auto is_one_of = [code](const std::set<basalt_hh>& codes) { return codes.contains(code); };
-        for (const bool flag : {false, true}) {
-            SCOPED_TRACE(testing::Message() << code << ' ' << flag);
-            environment.handheld_code.store(code);
-            environment.new_generation.store(flag);
-            environment.rtk_option.store(flag);
-            EXPECT_EQ(_handheldCanHaveInBuildKV7Radio(), is_one_of({5, 6, 8}));
-            EXPECT_EQ(_handheldCanHaveInBuildModem(), is_one_of({3, 7, 10, 11, 14}));
-            EXPECT_EQ(_handheldCanHaveInBuildKestraRTK(), code == 7 || (code == 11 && flag));
-            EXPECT_EQ(_isDefaultFontSize(), !is_one_of({8, 9}));
-            EXPECT_EQ(_isNewLumoOS(), flag && is_one_of({6, 13}));
+TEST(Environment, handheld_display_and_language) {
+    struct Row {
+        bool (*query)();
+        std::string_view without_flags, with_flags;  // '1' at the index of each code that can
+    };
+    for (const Row& row : {Row{_handheldCanHaveInBuildKV7Radio, "0000011010000000", "0000011010000000"},
+                           Row{_handheldCanHaveInBuildModem, "0001000100110010", "0001000100110010"},
+                           Row{_handheldCanHaveInBuildKestraRTK, "0000000100000000", "0000000100010000"},
+                           Row{_isNewLumoOS, "0000000000000000", "0000001000000100"},
+                           Row{_isDefaultFontSize, "1111111100111111", "1111111100111111"}}) {
+        for (basalt_hh code = 0; code < 16; ++code) {
+            for (const bool flag : {false, true}) {
+                environment.handheld_code.store(code);
+                environment.new_generation.store(flag);
+                environment.rtk_option.store(flag);
+                EXPECT_EQ(row.query(), (flag ? row.with_flags : row.without_flags)[code] == '1') << code;
+                EXPECT_EQ(_handheldVersion(), std::max(code, 1U)) << "0 is detected as the desktop";
+            }
         }
     }
-}
-
-TEST_F(Environment, every_capability_query_detects_the_handheld) {
-    EXPECT_EQ(_handheldVersion(), 1U);
-    for (bool (*query)() : {_isNewLumoOS, _handheldCanHaveInBuildKV7Radio, _handheldCanHaveInBuildModem,
-                            _handheldCanHaveInBuildKestraRTK, _isDefaultFontSize}) {
-        environment.handheld_code.store(0);
-        query();
-        EXPECT_EQ(environment.handheld_code.load(), 1U);
-    }
-}
-
-TEST_F(Environment, resolution_factor_is_set_only_while_it_holds_the_start_value) {
     EXPECT_EQ(std::bit_cast<std::uint64_t>(basalt::frame::RESOLUTION_NOT_DETERMINED), 0x000E61ACF033D1A4U);
-    for (const auto& [stored, answer] : {std::pair(2e-308, 1.0), std::pair(1.5, 1.5), std::pair(0.0, 0.0)}) {
+    for (const double stored : {1.5, 0.0, 2e-308}) {
         environment.resolution_factor.store(stored);
-        EXPECT_EQ(_checkForHighResolution(), answer);
-        EXPECT_EQ(_checkForHighResolution(), answer);
+        EXPECT_EQ(_checkForHighResolution(), stored == 2e-308 ? 1.0 : stored);
     }
-    environment.resolution_factor.store(basalt::frame::RESOLUTION_NOT_DETERMINED);
-}
-
-TEST_F(Environment, language_0_reads_as_15) {
     EXPECT_EQ(_languageVersion(), 15U);
     for (const basalt_language language : {7U, 0U, 0xFFFFFFFFU, 15U}) {
         _setLanguageVersion(language);
@@ -140,28 +107,37 @@ TEST_F(Environment, language_0_reads_as_15) {
     EXPECT_EQ(_taskbarheight(), 26);
 }
 
-TEST_F(Environment, random_numbers_follow_the_tick_count) {
-    // The model: seed at each new tick, then draw on.
+TEST(Environment, random_numbers_follow_the_tick_count) {
     std::srand(123'456);
     const int first = std::rand() % 65535;
     const int second = std::rand() % 65535;
-
-    set_tick(123'456);
+    fake.milliseconds = 123'456;
     EXPECT_EQ(_random_uint16(), first);
     EXPECT_EQ(_random_uint16(), second) << "one sequence within a millisecond";
-    set_tick(123'457);
+    fake.milliseconds = (1ULL << 32) - 1;
     _random_uint16();
-    set_tick(123'456 + (std::uint64_t{1} << 32));
+    fake.milliseconds = 123'456 + (1ULL << 32);
     EXPECT_EQ(_random_uint16(), first) << "the count has 32 bits; the same tick draws the same again";
+    environment.last_random_seed.store(0);
+    fake.milliseconds = 1ULL << 32;
+    std::srand(123'456);
+    EXPECT_EQ(_random_uint16(), first) << "tick 0 is the seed that a fresh library has";
+    fake = {};
 }
 
-TEST_F(Environment, tick_0_does_not_reseed_a_fresh_library) {
-    environment.last_random_seed.store(0);
-    std::srand(99);
-    const int unseeded = std::rand() % 65535;
-    std::srand(99);
-    set_tick(0);
-    EXPECT_EQ(_random_uint16(), unseeded);
+TEST(Environment, reverses_bytes_of_any_number_and_alignment) {
+    _reversebytes(nullptr, 0);
+    for (std::uint32_t count = 0; count <= 100; ++count) {
+        for (std::size_t offset = 0; offset < 8; ++offset) {
+            std::vector<unsigned char> bytes(count + offset + 8);
+            std::generate(bytes.begin(), bytes.end(),
+                          [n = 0]() mutable { return static_cast<unsigned char>(n += 37); });
+            std::vector<unsigned char> expected = bytes;
+            std::reverse(expected.begin() + static_cast<long>(offset), expected.end() - 8);
+            _reversebytes(bytes.data() + offset, count);
+            ASSERT_EQ(bytes, expected) << count << " bytes at " << offset;
+        }
+    }
 }
 
 }  // namespace

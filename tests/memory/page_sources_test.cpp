@@ -32,7 +32,7 @@ bool fails(const Call& call) {
     if (static_cast<int>(calls.size()) != failing_call) {
         return false;
     }
-    SetLastError(ERROR_COMMITMENT_LIMIT);
+    SetLastError(ERROR_NO_SYSTEM_RESOURCES);
     return true;
 }
 
@@ -142,7 +142,7 @@ TEST(SharedMemoryAllocator, works_in_pieces_that_stop_at_32_mebibytes) {
     failing_call = 1;
     EXPECT_EQ(Virtual::Alloc(at + 0x2000, 0xFFFFF000, COMMIT, nullptr), nullptr);
     EXPECT_EQ(calls, std::vector{call(at + 0x2000, 0xFFFFF000, MEM_COMMIT)});
-    EXPECT_EQ(output.take(), report_of(ERROR_COMMITMENT_LIMIT));
+    EXPECT_EQ(output.take(), report_of(ERROR_NO_SYSTEM_RESOURCES));
 }
 
 TEST(SharedMemoryAllocator, a_failing_piece_ends_it_and_is_reported) {
@@ -152,13 +152,13 @@ TEST(SharedMemoryAllocator, a_failing_piece_ends_it_and_is_reported) {
     failing_call = 3;
     EXPECT_EQ(Virtual::Alloc(at, 0x3000000, COMMIT, nullptr), nullptr);
     EXPECT_EQ(calls.size(), 3U);
-    EXPECT_EQ(output.take(), report_of(ERROR_COMMITMENT_LIMIT));
+    EXPECT_EQ(output.take(), report_of(ERROR_NO_SYSTEM_RESOURCES));
     at[BOUNDARY - 1] = 'x';  // the first two pieces stay committed
     calls.clear();
     failing_call = 2;
     EXPECT_EQ(Virtual::Free(at, 0x3000000, DECOMMIT, 0), 0);
     EXPECT_EQ(calls.size(), 2U);
-    EXPECT_EQ(output.take(), report_of(ERROR_COMMITMENT_LIMIT));
+    EXPECT_EQ(output.take(), report_of(ERROR_NO_SYSTEM_RESOURCES));
     failing_call = 0;
 
     EXPECT_EQ(Virtual::Alloc(reserved.base() - 1, 1, COMMIT, nullptr), nullptr);

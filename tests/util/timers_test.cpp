@@ -9,7 +9,7 @@
 #include <random>
 #include <string>
 
-#include "src/platform/performance_counter.h"
+#include "src/platform/clock.h"
 #include "tests/support/threads.h"
 
 namespace {

@@ -14,30 +14,30 @@
 /// Days since 30 December 1899, 0:00.
 using DATE = double;
 
-/// Converts calendar time to an automation date. Weekday and milliseconds are not looked at.
-/// @return 1, or 0 with ERROR_INVALID_PARAMETER and `date` as it was for what is no date (nothing is rolled
-/// over: 31 April is none), no time of day, or a year before 100
+/// Converts calendar time to an automation date. Day of the week and milliseconds are ignored.
+/// @return 1, or 0 with ERROR_INVALID_PARAMETER and `date` unchanged for an invalid date (31 April is not
+/// rolled over), an invalid time of day and years outside 100 to 9999
 ///
-/// Accuracy: the nearest double, give or take one: 2e-5 s and better.
+/// Accuracy: within one unit in the last place, 2e-5 s or better.
 BASALT_API int SystemTimeToVariantTime(SYSTEMTIME* time, DATE* date);
 
 /// Converts an automation date to calendar time, to the nearest second; milliseconds are 0.
-/// @return 1, or 0 with ERROR_INVALID_PARAMETER and `time` as it was for a date that rounds to none of the
-/// years 100 to 9999 or that lies before 1 January 100, and NaN
+/// @return 1, or 0 with ERROR_INVALID_PARAMETER and `time` unchanged for NaN, a date before 1 January 100 and
+/// one that rounds to a day after 31 December 9999
 BASALT_API int VariantTimeToSystemTime(DATE date, SYSTEMTIME* time);
 
 /// An automation date with its status.
 ///
-/// Bad input: what is no date leaves the object invalid. The parts of a date that is not valid are -1, and it
-/// equals none and is neither before nor after any.
+/// Bad input: an invalid date makes the object invalid. Its parts are then -1, and it compares as neither
+/// equal to, before nor after any date.
 class BASALT_API COleDateTime {
 public:
-    /// What the value is worth.
+    /// Whether there is a date.
     enum DateTimeStatus {
-        error = -1,   ///< no answer
+        error = -1,   ///< result for a missing part
         valid = 0,    ///< a date
-        invalid = 1,  ///< no date; the value has no meaning
-        null = 2      ///< deliberately none
+        invalid = 1,  ///< no date; the value is meaningless
+        null = 2      ///< no date was set
     };
 
     /// 30 December 1899, 0:00, valid.
@@ -51,7 +51,7 @@ public:
 
     /// The status.
     DateTimeStatus GetStatus() const { return m_status; }
-    /// Sets the status; the value stays.
+    /// Sets the status and keeps the value.
     void SetStatus(DateTimeStatus status) { m_status = status; }
     /// Becomes the calendar time given.
     /// @return the new status: valid or invalid
@@ -60,7 +60,7 @@ public:
     /// The value.
     operator DATE() const { return m_dt; }
     /// The calendar time.
-    /// @return false, and the time as it was, when the date is not valid
+    /// @return false, with the time unchanged, if the date is not valid
     bool GetAsSystemTime(SYSTEMTIME& time) const;
 
     /// Year, 100 to 9999.
@@ -80,7 +80,7 @@ public:
 
     /// Whether both are the same time, to the second.
     bool operator==(const COleDateTime& other) const;
-    /// Whether they are not.
+    /// The opposite of ==.
     bool operator!=(const COleDateTime& other) const { return !(*this == other); }
     /// Whether this one is earlier.
     bool operator<(const COleDateTime& other) const;

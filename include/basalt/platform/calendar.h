@@ -19,15 +19,15 @@ static_assert(sizeof(FILETIME) == 8, "platform records keep their sizes");
 /// Ticks of a date and time of day.
 /// @param time the time, not null; its day of the week is not read
 /// @param[out] ticks the count, not null
-/// @return nonzero; 0, with ticks untouched and last error 87, for a year outside 1601 to 30827, a day that
+/// @return nonzero; 0, with ticks unchanged and last error 87, for a year outside 1601 to 30827, a day that
 /// does not exist or a time of day out of range
 /// Threads: reentrant.
 BASALT_API BOOL SystemTimeToFileTime(const SYSTEMTIME* time, FILETIME* ticks);
 
-/// Date and time of day of a count of ticks; what is below a millisecond is cut.
+/// Date and time of day of a count of ticks; truncated to milliseconds.
 /// @param ticks the count, not null
 /// @param[out] time the time with its day of the week, not null
-/// @return nonzero; 0, with time untouched and last error 87, for a count of 2^63 or more
+/// @return nonzero; 0, with time unchanged and last error 87, for a count of 2^63 or more
 /// Threads: reentrant.
 BASALT_API BOOL FileTimeToSystemTime(const FILETIME* ticks, SYSTEMTIME* time);
 

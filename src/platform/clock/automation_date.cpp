@@ -6,36 +6,27 @@
 #include <optional>
 
 #include "basalt/platform/error.h"
+#include "src/platform/clock/date_fields.h"
 
 namespace {
 
+using namespace basalt::platform;
 using std::chrono::sys_days;
-using std::chrono::year_month_day;
 
 constexpr sys_days ZERO = std::chrono::year{1899} / 12 / 30;
-constexpr sys_days FIRST = std::chrono::year{100} / 1 / 1;
-constexpr sys_days LAST = std::chrono::year{9999} / 12 / 31;
+constexpr int FIRST_YEAR = 100;
+constexpr int LAST_YEAR = 9999;
+constexpr sys_days FIRST = std::chrono::year{FIRST_YEAR} / 1 / 1;
+constexpr sys_days LAST = std::chrono::year{LAST_YEAR} / 12 / 31;
 constexpr std::int64_t SECONDS_PER_DAY = 86'400;
 
-// The calendar's own types keep months and days in a byte, so larger ones are refused before.
-bool is_valid(const SYSTEMTIME& time) {
-    return time.wYear >= 100 && time.wYear <= 9999 && time.wMonth <= 12 && time.wDay <= 31 &&
-           (std::chrono::year{time.wYear} / time.wMonth / time.wDay).ok() && time.wHour < 24 &&
-           time.wMinute < 60 && time.wSecond < 60;
-}
-
-int second_of_day(const SYSTEMTIME& time) {
-    return time.wHour * 3600 + time.wMinute * 60 + time.wSecond;
-}
-
-// A time by what can be counted: chronological order is the order of the seconds.
+// Dates in chronological order are in the order of their seconds.
 std::optional<std::int64_t> seconds_of(const COleDateTime& date) {
     SYSTEMTIME time{};
     if (!date.GetAsSystemTime(time)) {
         return std::nullopt;
     }
-    const sys_days day = std::chrono::year{time.wYear} / time.wMonth / time.wDay;
-    return (day - ZERO).count() * SECONDS_PER_DAY + second_of_day(time);
+    return (sys_days(date_of(time)) - ZERO).count() * SECONDS_PER_DAY + second_of_day(time);
 }
 
 int part_of(const COleDateTime& date, WORD SYSTEMTIME::*part) {
@@ -46,12 +37,11 @@ int part_of(const COleDateTime& date, WORD SYSTEMTIME::*part) {
 }  // namespace
 
 int SystemTimeToVariantTime(SYSTEMTIME* time, DATE* date) {
-    if (!is_valid(*time)) {
+    if (!is_valid(*time, FIRST_YEAR, LAST_YEAR)) {
         SetLastError(ERROR_INVALID_PARAMETER);
         return 0;
     }
-    const sys_days day = std::chrono::year{time->wYear} / time->wMonth / time->wDay;
-    const auto days = static_cast<double>((day - ZERO).count());
+    const auto days = static_cast<double>((sys_days(date_of(*time)) - ZERO).count());
     const double time_of_day = second_of_day(*time) / static_cast<double>(SECONDS_PER_DAY);
     *date = days < 0.0 ? days - time_of_day : days + time_of_day;
     return 1;
@@ -61,7 +51,7 @@ int VariantTimeToSystemTime(DATE date, SYSTEMTIME* time) {
     const double first = static_cast<double>((FIRST - ZERO).count());
     const double last = static_cast<double>((LAST - ZERO).count());
     const double whole = std::trunc(date);
-    // Not the other way round: NaN is no date.
+    // False for NaN.
     const bool is_date = whole >= first && whole <= last;
     sys_days day = is_date ? ZERO + std::chrono::days(static_cast<int>(whole)) : ZERO;
     auto second = is_date ? std::llround(std::abs(date - whole) * SECONDS_PER_DAY) : 0;
@@ -73,15 +63,7 @@ int VariantTimeToSystemTime(DATE date, SYSTEMTIME* time) {
         SetLastError(ERROR_INVALID_PARAMETER);
         return 0;
     }
-    const year_month_day calendar(day);
-    *time = {};
-    time->wYear = static_cast<WORD>(static_cast<int>(calendar.year()));
-    time->wMonth = static_cast<WORD>(static_cast<unsigned>(calendar.month()));
-    time->wDay = static_cast<WORD>(static_cast<unsigned>(calendar.day()));
-    time->wDayOfWeek = static_cast<WORD>(std::chrono::weekday(day).c_encoding());
-    time->wHour = static_cast<WORD>(second / 3600);
-    time->wMinute = static_cast<WORD>(second / 60 % 60);
-    time->wSecond = static_cast<WORD>(second % 60);
+    *time = system_time(day, static_cast<int>(second), 0);
     return 1;
 }
 
@@ -100,7 +82,7 @@ COleDateTime::COleDateTime(int year, int month, int day, int hour, int minute, i
 }
 
 int COleDateTime::SetDateTime(int year, int month, int day, int hour, int minute, int second) {
-    // What does not fit a field becomes its largest number, which no part of a date has.
+    // A value that does not fit its field becomes 65535, which is invalid in all of them.
     const auto field = [](int value) {
         constexpr int LARGEST = std::numeric_limits<WORD>::max();
         return static_cast<WORD>(value >= 0 && value < LARGEST ? value : LARGEST);

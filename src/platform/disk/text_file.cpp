@@ -98,9 +98,8 @@ void TextFile::write(std::wstring_view text) noexcept {
     }
     m_is_own = true;
     std::size_t before = m_size;
-    std::mbstate_t state{};
     while (!text.empty()) {
-        char* const end = code_page.narrow_line_piece(text, PIECE, m_bytes + m_size, state);
+        char* const end = code_page.narrow_line_piece(text, PIECE, m_bytes + m_size);
         m_size = static_cast<std::size_t>(end - m_bytes);
         while (m_size > BUFFER) {
             flush(before > 0 ? before : m_size);

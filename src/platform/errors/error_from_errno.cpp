@@ -28,8 +28,6 @@ DWORD error_from_errno(int number) {
             return ERROR_INVALID_HANDLE;
         case ENOMEM:
             return ERROR_NOT_ENOUGH_MEMORY;
-        case EXDEV:
-            return ERROR_NOT_SAME_DEVICE;
         case EROFS:
             return ERROR_WRITE_PROTECT;
         case ETXTBSY:
@@ -47,8 +45,6 @@ DWORD error_from_errno(int number) {
         case ENOSPC:
         case EDQUOT:
             return ERROR_DISK_FULL;
-        case ENOTEMPTY:
-            return ERROR_DIR_NOT_EMPTY;
         case EBUSY:
             return ERROR_BUSY;
         case ENAMETOOLONG:

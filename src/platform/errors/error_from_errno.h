@@ -1,4 +1,4 @@
-// From the system's error numbers to the published error codes.
+// The system's error numbers as Win32 error codes.
 #ifndef BASALT_SRC_PLATFORM_ERRORS_ERROR_FROM_ERRNO_H
 #define BASALT_SRC_PLATFORM_ERRORS_ERROR_FROM_ERRNO_H
 
@@ -8,16 +8,14 @@
 
 namespace basalt::platform {
 
-// The published code that says the same: 0 for 0, ERROR_GEN_FAILURE for a number without a counterpart.
-// EEXIST is ERROR_FILE_EXISTS; rooms in which the same number means more than one thing (EAGAIN of a lock,
-// EEXIST of a folder or mapping) set the code themselves.
+// The corresponding code: 0 for 0, ERROR_GEN_FAILURE for a number without one. EEXIST is ERROR_FILE_EXISTS;
+// callers for which a number means something else (EAGAIN of a lock) set the code themselves.
 DWORD error_from_errno(int number);
 
-// Sets the calling thread's last error from errno; call it directly after the call that failed.
+// Sets the calling thread's last error from errno, directly after the failed call.
 void set_last_error_from_errno();
 
-// The published code of an errno value that a call gave for a path: a missing file is told from a missing
-// folder.
+// The code for an errno value of a call with a path; distinguishes a missing file from a missing folder.
 DWORD error_of_path(std::string_view path, int number);
 
 }  // namespace basalt::platform

@@ -1,6 +1,7 @@
 #include "src/platform/error_message.h"
 
 #include <algorithm>
+#include <charconv>
 #include <cstdlib>
 #include <iterator>
 #include <string_view>
@@ -20,20 +21,16 @@ struct Message {
 // In ascending order of the codes.
 constexpr Message MESSAGES[] = {
     {ERROR_SUCCESS, L"No error."},
-    {ERROR_INVALID_FUNCTION, L"The operation is not a valid one."},
     {ERROR_FILE_NOT_FOUND, L"The file does not exist."},
     {ERROR_PATH_NOT_FOUND, L"A folder of the path does not exist."},
     {ERROR_TOO_MANY_OPEN_FILES, L"Too many files are open."},
     {ERROR_ACCESS_DENIED, L"Access is not allowed."},
     {ERROR_INVALID_HANDLE, L"The handle is not valid."},
     {ERROR_NOT_ENOUGH_MEMORY, L"There is not enough memory."},
-    {ERROR_OUTOFMEMORY, L"Memory is exhausted."},
-    {ERROR_NOT_SAME_DEVICE, L"The two files are on different devices."},
     {ERROR_NO_MORE_FILES, L"There are no further files."},
     {ERROR_WRITE_PROTECT, L"The medium is read-only."},
     {ERROR_GEN_FAILURE, L"The system reported a failure that has no code of its own."},
     {ERROR_SHARING_VIOLATION, L"The file is in use and not shared."},
-    {ERROR_LOCK_VIOLATION, L"Part of the file is locked by somebody else."},
     {ERROR_NOT_SUPPORTED, L"The operation is not supported."},
     {ERROR_DEV_NOT_EXIST, L"The device does not exist."},
     {ERROR_FILE_EXISTS, L"The file exists already."},
@@ -41,12 +38,9 @@ constexpr Message MESSAGES[] = {
     {ERROR_DISK_FULL, L"The disk is full."},
     {ERROR_INSUFFICIENT_BUFFER, L"The buffer is too small."},
     {ERROR_INVALID_NAME, L"The name is not valid."},
-    {ERROR_DIR_NOT_EMPTY, L"The folder is not empty."},
     {ERROR_BUSY, L"The object is busy."},
-    {ERROR_ALREADY_EXISTS, L"An object of this name exists already."},
     {ERROR_FILENAME_EXCED_RANGE, L"The name is too long."},
     {ERROR_FILE_TOO_LARGE, L"The file is too large."},
-    {ERROR_DIRECTORY, L"The name is not that of a folder."},
     {ERROR_INVALID_ADDRESS, L"The address is not valid."},
     {ERROR_ARITHMETIC_OVERFLOW, L"A number does not fit in its type."},
     {ERROR_OPERATION_ABORTED, L"The operation was interrupted."},
@@ -55,7 +49,6 @@ constexpr Message MESSAGES[] = {
     {ERROR_NO_UNICODE_TRANSLATION, L"A character has no counterpart in the encoding."},
     {ERROR_IO_DEVICE, L"The device failed to read or write."},
     {ERROR_NO_SYSTEM_RESOURCES, L"The system is short of resources."},
-    {ERROR_COMMITMENT_LIMIT, L"The system cannot provide more memory."},
     {ERROR_TIMEOUT, L"The operation took too long."},
     {ERROR_RESOURCE_DATA_NOT_FOUND, L"The file does not hold the resource."},
     {ERROR_RESOURCE_TYPE_NOT_FOUND, L"The resource does not hold the value."},
@@ -67,18 +60,6 @@ static_assert(std::is_sorted(std::begin(MESSAGES), std::end(MESSAGES),
 constexpr std::wstring_view UNKNOWN_ERROR = L"Unknown error ";
 
 constexpr std::size_t MAX_DIGITS = 10;
-
-// Writes the code in decimal and answers the end. Not std::to_chars, whose table would be exported.
-wchar_t* write_decimal(DWORD code, wchar_t* text) {
-    wchar_t digits[MAX_DIGITS];
-    wchar_t* const end = std::end(digits);
-    wchar_t* first = end;
-    do {
-        *--first = static_cast<wchar_t>(L'0' + code % 10);
-        code /= 10;
-    } while (code != 0);
-    return std::copy(first, end, text);
-}
 
 }  // namespace
 
@@ -95,16 +76,15 @@ DWORD FormatMessageW(DWORD flags, const void* /*source*/, DWORD code, DWORD lang
                                          [](const Message& m, DWORD wanted) { return m.code < wanted; });
     const bool is_known = known != std::end(MESSAGES) && known->code == code;
     const std::wstring_view text = is_known ? known->text : UNKNOWN_ERROR;
-    const std::size_t room = std::max<std::size_t>(size, text.size() + MAX_DIGITS + 1);
-    auto* const message = static_cast<wchar_t*>(std::malloc(room * sizeof(wchar_t)));
+    char digits[MAX_DIGITS];
+    char* const digits_end = is_known ? digits : std::to_chars(digits, std::end(digits), code).ptr;
+    const std::size_t capacity = std::max<std::size_t>(size, text.size() + MAX_DIGITS + 1);
+    auto* const message = static_cast<wchar_t*>(std::malloc(capacity * sizeof(wchar_t)));
     if (message == nullptr) {
         SetLastError(ERROR_NOT_ENOUGH_MEMORY);
         return 0;
     }
-    wchar_t* end = std::copy(text.begin(), text.end(), message);
-    if (!is_known) {
-        end = write_decimal(code, end);
-    }
+    wchar_t* const end = std::copy(digits, digits_end, std::copy(text.begin(), text.end(), message));
     *end = L'\0';
     *buffer = message;
     return static_cast<DWORD>(end - message);

@@ -6,11 +6,15 @@
 #include <string_view>
 
 #include "src/platform/code_page.h"
-#include "src/platform/text/text_or_empty.h"
 
-using basalt::platform::text_or_empty;
+using basalt::platform::active_code_page;
+using basalt::platform::CodePage;
 
 namespace {
+
+std::wstring_view text_or_empty(const wchar_t* text) {
+    return text != nullptr ? std::wstring_view(text) : std::wstring_view();
+}
 
 constexpr auto MAX_LENGTH = static_cast<std::size_t>(std::numeric_limits<int>::max());
 
@@ -30,6 +34,10 @@ void require_length(std::size_t length) {
 
 int sign(int comparison) {
     return (comparison > 0) - (comparison < 0);
+}
+
+bool is_space(wchar_t ch) {
+    return active_code_page().is_space(ch);
 }
 
 }  // namespace
@@ -70,15 +78,11 @@ CString& CString::operator=(wchar_t character) {
 }
 
 CString CString::Left(int count) const {
-    CString part;
-    part.m_text.assign(m_text, 0, clamp_to_size(count, m_text.size()));
-    return part;
+    return CString(m_text.substr(0, clamp_to_size(count, m_text.size())));
 }
 
 CString CString::Right(int count) const {
-    CString part;
-    part.m_text.assign(m_text, m_text.size() - clamp_to_size(count, m_text.size()));
-    return part;
+    return CString(m_text.substr(m_text.size() - clamp_to_size(count, m_text.size())));
 }
 
 CString CString::Mid(int first) const {
@@ -86,9 +90,7 @@ CString CString::Mid(int first) const {
 }
 
 CString CString::Mid(int first, int count) const {
-    CString part;
-    part.m_text.assign(m_text, clamp_to_size(first, m_text.size()), clamp_to_size(count, m_text.size()));
-    return part;
+    return CString(m_text.substr(clamp_to_size(first, m_text.size()), clamp_to_size(count, m_text.size())));
 }
 
 int CString::Find(wchar_t character, int start) const noexcept {
@@ -110,6 +112,20 @@ int CString::FindOneOf(const wchar_t* characters) const noexcept {
 
 int CString::Compare(const wchar_t* other) const noexcept {
     return sign(m_text.compare(text_or_empty(other)));
+}
+
+int CString::CompareNoCase(const wchar_t* other) const {
+    const CodePage& code_page = active_code_page();
+    const std::wstring_view others = text_or_empty(other);
+    const std::size_t shared = std::min(m_text.size(), others.size());
+    for (std::size_t i = 0; i < shared; ++i) {
+        const wchar_t a = code_page.to_lower(m_text[i]);
+        const wchar_t b = code_page.to_lower(others[i]);
+        if (a != b) {
+            return a < b ? -1 : 1;
+        }
+    }
+    return (m_text.size() > shared) - (others.size() > shared);
 }
 
 void CString::SetAt(int position, wchar_t character) noexcept {
@@ -190,6 +206,69 @@ int CString::Replace(const wchar_t* old_text, const wchar_t* new_text) {
 
 int CString::Remove(wchar_t character) noexcept {
     return static_cast<int>(std::erase(m_text, character));
+}
+
+CString& CString::MakeLower() {
+    const CodePage& code_page = active_code_page();
+    for (wchar_t& ch : m_text) {
+        ch = code_page.to_lower(ch);
+    }
+    return *this;
+}
+
+CString& CString::MakeUpper() {
+    const CodePage& code_page = active_code_page();
+    for (wchar_t& ch : m_text) {
+        ch = code_page.to_upper(ch);
+    }
+    return *this;
+}
+
+CString& CString::Trim() {
+    return TrimRight().TrimLeft();
+}
+
+CString& CString::Trim(wchar_t character) {
+    return TrimRight(character).TrimLeft(character);
+}
+
+// The characters may belong to the text itself, so both ends are found before either is trimmed.
+CString& CString::Trim(const wchar_t* characters) {
+    const std::wstring_view any = text_or_empty(characters);
+    const std::size_t first = m_text.find_first_not_of(any);
+    m_text.erase(m_text.find_last_not_of(any) + 1);  // none is -1
+    m_text.erase(0, first);
+    return *this;
+}
+
+CString& CString::TrimLeft() {
+    m_text.erase(m_text.begin(), std::find_if_not(m_text.begin(), m_text.end(), is_space));
+    return *this;
+}
+
+CString& CString::TrimLeft(wchar_t character) {
+    m_text.erase(0, m_text.find_first_not_of(character));
+    return *this;
+}
+
+CString& CString::TrimLeft(const wchar_t* characters) {
+    m_text.erase(0, m_text.find_first_not_of(text_or_empty(characters)));
+    return *this;
+}
+
+CString& CString::TrimRight() {
+    m_text.erase(std::find_if_not(m_text.rbegin(), m_text.rend(), is_space).base(), m_text.end());
+    return *this;
+}
+
+CString& CString::TrimRight(wchar_t character) {
+    m_text.erase(m_text.find_last_not_of(character) + 1);
+    return *this;
+}
+
+CString& CString::TrimRight(const wchar_t* characters) {
+    m_text.erase(m_text.find_last_not_of(text_or_empty(characters)) + 1);
+    return *this;
 }
 
 wchar_t* CString::GetBuffer(int least_length) {

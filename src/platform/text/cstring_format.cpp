@@ -1,4 +1,4 @@
-// CString::Format: reads the format, and writes each argument as its conversion and its own type have it.
+// CString::Format: numbers by the C library's printf, texts and padding here.
 
 #include <algorithm>
 #include <array>
@@ -12,30 +12,41 @@
 #include "basalt/platform/cstring.h"
 #include "src/platform/code_page.h"
 
+using basalt::platform::widen;
+
 namespace {
 
 using Argument = basalt::platform::FormatArgument;
 using Kind = Argument::Kind;
 
 constexpr int NO_PRECISION = -1;
-
-// Largest width, and precision of a number: a format may not ask for gigabytes of blanks.
+// Largest width, and precision of a number: limits the memory that a format can request.
 constexpr int MAX_FIELD = 1'000'000;
 
 struct Conversion {
-    bool left = false;  // '-'
-    bool plus = false;
-    bool blank = false;
-    bool zero = false;
-    bool alternate = false;  // '#'
-    int width = 0;
+    std::string flags;
+    int width = 0;  // negative: left-aligned
     int precision = NO_PRECISION;
-    unsigned integer_bytes = 0;  // 0: the argument's own width
+    const char* size = nullptr;  // "hh", "h" or "", that of an int; null: the argument's own
     wchar_t type = L'\0';        // 0: the format ended first
 };
 
 bool is_in(wchar_t ch, std::wstring_view set) {
     return ch != L'\0' && set.find(ch) != std::wstring_view::npos;
+}
+
+// At most `precision` units. If there are that many, the text needs no terminator.
+template <class Character>
+std::basic_string_view<Character> truncated(const void* text, int precision) {
+    const auto* const begin = static_cast<const Character*>(text);
+    if (precision == NO_PRECISION) {
+        return begin;
+    }
+    const Character* end = begin;
+    while (end - begin < precision && *end != Character{}) {
+        ++end;
+    }
+    return {begin, static_cast<std::size_t>(end - begin)};
 }
 
 class Formatter {
@@ -45,18 +56,19 @@ public:
 
     std::wstring run() {
         while (*m_format != L'\0') {
-            if (*m_format != L'%') {
-                m_result += *m_format++;
-                continue;
-            }
-            const wchar_t* const start = m_format++;
-            const Conversion conversion = read_conversion();
-            if (conversion.type == L'%') {
-                m_result += L'%';
-            } else if (is_in(conversion.type, L"diuoxXeEfFgGaAcCsSp")) {
-                write(conversion);
-            } else {
-                m_result.append(start, m_format);
+            const std::size_t literal = std::wcscspn(m_format, L"%");
+            m_result.append(m_format, literal);
+            m_format += literal;
+            if (*m_format == L'%') {
+                const wchar_t* const start = m_format++;
+                const Conversion conversion = read_conversion();
+                if (conversion.type == L'%') {
+                    m_result += L'%';
+                } else if (!is_in(conversion.type, L"diuoxXeEfFgGaAcCsSp")) {
+                    m_result.append(start, m_format);
+                } else if (m_arguments != m_end) {
+                    write(conversion, *m_arguments++);
+                }
             }
         }
         return std::move(m_result);
@@ -65,46 +77,33 @@ public:
 private:
     Conversion read_conversion() {
         Conversion conversion;
-        read_flags(conversion);
-        const int width = read_number();
-        conversion.left = conversion.left || width < 0;
-        conversion.width = std::min(std::abs(width), MAX_FIELD);
+        for (; is_in(*m_format, L"-+ 0#"); ++m_format) {
+            conversion.flags += static_cast<char>(*m_format);
+        }
+        const int width = std::clamp(read_number(), -MAX_FIELD, MAX_FIELD);
+        conversion.width = conversion.flags.find('-') != std::string::npos ? -std::abs(width) : width;
         if (*m_format == L'.') {
             ++m_format;
             conversion.precision = std::max(read_number(), NO_PRECISION);
         }
-        read_size(conversion);
+        if (skip(L"I32")) {
+            conversion.size = "";
+        } else if (skip(L"hh")) {
+            conversion.size = "hh";
+        } else if (skip(L"h")) {
+            conversion.size = "h";
+        } else if (!skip(L"I64")) {
+            while (is_in(*m_format, L"lwI")) {
+                ++m_format;
+            }
+        }
         if (*m_format != L'\0') {
             conversion.type = *m_format++;
         }
         return conversion;
     }
 
-    void read_flags(Conversion& conversion) {
-        for (;; ++m_format) {
-            switch (*m_format) {
-                case L'-':
-                    conversion.left = true;
-                    break;
-                case L'+':
-                    conversion.plus = true;
-                    break;
-                case L' ':
-                    conversion.blank = true;
-                    break;
-                case L'0':
-                    conversion.zero = true;
-                    break;
-                case L'#':
-                    conversion.alternate = true;
-                    break;
-                default:
-                    return;
-            }
-        }
-    }
-
-    // Digits, or '*' for the next argument; 0 where there is neither. Stops short of overflow.
+    // Digits, or '*' for the next argument; 0 if there is neither. Saturates.
     int read_number() {
         constexpr std::int64_t LARGEST = std::numeric_limits<int>::max();
         std::int64_t number = 0;
@@ -122,150 +121,81 @@ private:
         return static_cast<int>(number);
     }
 
-    // Steps over a text where it comes next. Looks no further: the rest of the format may be long.
+    // Skips a text if it is next. Its length bounds the comparison: the rest of the format may be long.
     bool skip(std::wstring_view text) {
-        const bool comes_next = std::wcsncmp(m_format, text.data(), text.size()) == 0;
-        m_format += comes_next ? text.size() : 0;
-        return comes_next;
+        const bool is_next = std::wcsncmp(m_format, text.data(), text.size()) == 0;
+        m_format += is_next ? text.size() : 0;
+        return is_next;
     }
 
-    void read_size(Conversion& conversion) {
-        if (skip(L"I32")) {
-            conversion.integer_bytes = 4;
-        } else if (skip(L"hh")) {
-            conversion.integer_bytes = 1;
-        } else if (skip(L"h")) {
-            conversion.integer_bytes = 2;
-        } else if (!skip(L"I64")) {
-            while (is_in(*m_format, L"lwI")) {
-                ++m_format;
+    void write(const Conversion& conversion, const Argument& argument) {
+        switch (argument.kind()) {
+            case Kind::INTEGER:
+                return write_integer(conversion, argument);
+            case Kind::FLOATING:
+                return write_number(conversion, "",
+                                    is_in(conversion.type, L"eEfFgGaA") ? conversion.type : L'g',
+                                    argument.floating());
+            default:
+                return write_pointer(conversion, argument.kind(), argument.pointer());
+        }
+    }
+
+    void write_pointer(const Conversion& conversion, Kind kind, const void* pointer) {
+        if (conversion.type == L'p' || kind == Kind::POINTER) {
+            write_address(conversion, reinterpret_cast<std::uintptr_t>(pointer));
+        } else if (pointer == nullptr) {
+            write_text(conversion, L"(null)");
+        } else if (kind == Kind::WIDE_TEXT) {
+            write_text(conversion, truncated<wchar_t>(pointer, conversion.precision));
+        } else {
+            write_text(conversion, widen(truncated<char>(pointer, conversion.precision)));
+        }
+    }
+
+    void write_text(const Conversion& conversion, std::wstring_view text) {
+        const auto width = static_cast<std::size_t>(std::abs(conversion.width));
+        const std::size_t padding = width > text.size() ? width - text.size() : 0;
+        m_result.append(conversion.width < 0 ? 0 : padding, L' ');
+        m_result.append(text);
+        m_result.append(conversion.width < 0 ? padding : 0, L' ');
+    }
+
+    void write_address(const Conversion& conversion, std::uint64_t address) {
+        Conversion digits;
+        digits.width = conversion.width;
+        digits.precision = 16;
+        write_number(digits, "ll", L'X', address);
+    }
+
+    void write_integer(const Conversion& conversion, const Argument& argument) {
+        const std::int64_t value = argument.integer();
+        if (conversion.type == L'p') {
+            write_address(conversion, static_cast<std::uint64_t>(value));
+        } else if (is_in(conversion.type, L"cC")) {
+            const auto ch = static_cast<wchar_t>(value);
+            const auto byte = static_cast<char>(value);
+            write_text(conversion, argument.size() == 1 ? widen({&byte, 1}) : std::wstring(1, ch));
+        } else {
+            const wchar_t plain_type = argument.is_signed() ? L'd' : L'u';
+            const wchar_t type = is_in(conversion.type, L"diuoxX") ? conversion.type : plain_type;
+            if (conversion.size == nullptr && argument.size() > sizeof(int)) {
+                write_number(conversion, "ll", type, value);
+            } else {
+                write_number(conversion, conversion.size != nullptr ? conversion.size : "", type,
+                             static_cast<int>(value));
             }
         }
     }
 
-    void write(Conversion conversion) {
-        if (m_arguments == m_end) {
-            return;
-        }
-        const Argument& argument = *m_arguments++;
-        const bool by_pointer = conversion.type == L'p';
-        switch (argument.kind()) {
-            case Kind::INTEGER:
-                if (is_in(conversion.type, L"cC")) {
-                    write_character(conversion, argument);
-                } else if (by_pointer) {
-                    write_address(conversion, static_cast<std::uint64_t>(argument.integer()));
-                } else {
-                    write_integer(conversion, argument);
-                }
-                break;
-            case Kind::FLOATING:
-                write_floating(conversion, argument.floating());
-                break;
-            case Kind::WIDE_TEXT:
-                if (const auto* const text = static_cast<const wchar_t*>(argument.pointer()); by_pointer) {
-                    write_address(conversion, reinterpret_cast<std::uintptr_t>(text));
-                } else {
-                    write_text(conversion, text != nullptr ? cut(text, conversion.precision) : NULL_TEXT);
-                }
-                break;
-            case Kind::NARROW_TEXT:
-                if (const auto* const text = static_cast<const char*>(argument.pointer()); by_pointer) {
-                    write_address(conversion, reinterpret_cast<std::uintptr_t>(text));
-                } else {
-                    write_text(conversion, text != nullptr
-                                               ? basalt::platform::widen(cut(text, conversion.precision))
-                                               : std::wstring(NULL_TEXT));
-                }
-                break;
-            case Kind::POINTER:
-                write_address(conversion, reinterpret_cast<std::uintptr_t>(argument.pointer()));
-                break;
-        }
-    }
-
-    static constexpr std::wstring_view NULL_TEXT = L"(null)";
-
-    // At most `precision` units; where that many are there, no zero need follow them.
-    template <class Character>
-    static std::basic_string_view<Character> cut(const Character* text, int precision) {
-        if (precision == NO_PRECISION) {
-            return text;
-        }
-        const Character* end = text;
-        while (end - text < precision && *end != Character{}) {
-            ++end;
-        }
-        return {text, static_cast<std::size_t>(end - text)};
-    }
-
-    void write_text(const Conversion& conversion, std::wstring_view text) {
-        const auto width = static_cast<std::size_t>(conversion.width);
-        const std::size_t padding = width > text.size() ? width - text.size() : 0;
-        if (!conversion.left) {
-            m_result.append(padding, L' ');
-        }
-        m_result.append(text);
-        if (conversion.left) {
-            m_result.append(padding, L' ');
-        }
-    }
-
-    void write_character(const Conversion& conversion, const Argument& argument) {
-        if (argument.size() == 1) {
-            const auto byte = static_cast<char>(argument.integer());
-            write_text(conversion, basalt::platform::widen({&byte, 1}));
-        } else {
-            const auto ch = static_cast<wchar_t>(argument.integer());
-            write_text(conversion, {&ch, 1});
-        }
-    }
-
-    void write_address(const Conversion& conversion, std::uint64_t address) {
-        constexpr std::wstring_view DIGITS = L"0123456789ABCDEF";
-        std::array<wchar_t, 16> text;
-        for (auto digit = text.rbegin(); digit != text.rend(); ++digit, address >>= 4) {
-            *digit = DIGITS[address & 0xF];
-        }
-        write_text(conversion, {text.data(), text.size()});
-    }
-
-    void write_integer(const Conversion& conversion, const Argument& argument) {
-        // An argument narrower than an int counts as one, as ever in C.
-        const unsigned own_bytes = std::max(argument.size(), 4U);
-        const unsigned bytes = conversion.integer_bytes != 0 ? conversion.integer_bytes : own_bytes;
-        const unsigned unused_bits = 64 - 8 * bytes;
-        const std::uint64_t pattern = static_cast<std::uint64_t>(argument.integer()) << unused_bits;
-        const char plain_type = argument.is_signed() ? 'd' : 'u';
-        const char type = is_in(conversion.type, L"diuoxX") ? static_cast<char>(conversion.type) : plain_type;
-        if (type == 'd' || type == 'i') {
-            write_number(conversion, "ll", 'd',
-                         static_cast<long long>(static_cast<std::int64_t>(pattern) >> unused_bits));
-        } else {
-            write_number(conversion, "ll", type, static_cast<unsigned long long>(pattern >> unused_bits));
-        }
-    }
-
-    void write_floating(const Conversion& conversion, double value) {
-        const bool is_suited = is_in(conversion.type, L"eEfFgGaA");
-        write_number(conversion, "", is_suited ? static_cast<char>(conversion.type) : 'g', value);
-    }
-
     template <class Number>
-    void write_number(const Conversion& conversion, const char* size, char type, Number number) {
-        std::string format = "%";
-        format.append(conversion.left ? "-" : "")
-            .append(conversion.plus ? "+" : "")
-            .append(conversion.blank ? " " : "")
-            .append(conversion.zero ? "0" : "")
-            .append(conversion.alternate ? "#" : "")
-            .append("*.*")
-            .append(size)
-            .append(1, type);
+    void write_number(const Conversion& conversion, const char* size, wchar_t type, Number number) {
+        const std::string format = '%' + conversion.flags + "*.*" + size + static_cast<char>(type);
         const int precision = std::min(conversion.precision, MAX_FIELD);
-        const auto print = [&](char* text, std::size_t room) {
-            const int length = std::snprintf(text, room, format.c_str(), conversion.width, precision, number);
-            // Lengths are limited, and no format is wrong: the C library found no memory.
+        const auto print = [&](char* text, std::size_t capacity) {
+            const int length =
+                std::snprintf(text, capacity, format.c_str(), conversion.width, precision, number);
+            // Lengths are limited and the format is valid: the C library is out of memory.
             if (length < 0) {
                 throw std::bad_alloc();
             }
@@ -273,13 +203,13 @@ private:
         };
         std::array<char, 64> usual;
         const std::size_t length = print(usual.data(), usual.size());
-        // A locale's decimal point may be any character of its encoding.
+        // The decimal point may be any character of the locale's encoding.
         if (length < usual.size()) {
-            m_result.append(basalt::platform::widen({usual.data(), length}));
+            m_result.append(widen({usual.data(), length}));
         } else {
             std::string longer(length, '\0');
             print(longer.data(), length + 1);
-            m_result.append(basalt::platform::widen(longer));
+            m_result.append(widen(longer));
         }
     }
 

@@ -8,7 +8,7 @@
 namespace basalt::platform {
 namespace {
 
-// Low surrogates, which no UTF-8 holds: a byte's value is added to the first.
+// Low surrogates, which UTF-8 does not contain, encode single bytes.
 constexpr wchar_t BYTES = 0xDC00;
 
 constexpr bool stands_for_byte(wchar_t ch) {
@@ -37,7 +37,7 @@ bool file_name_from_wide(std::wstring_view name, std::string& result) {
 
 bool FileName::set(std::wstring_view name) {
     if (name.size() < std::size(m_short) && write_printing(name, m_short) == name.size()) {
-        // Stores every byte, unlike std::replace, so that the compiler makes lanes of it.
+        // Stores every byte, unlike std::replace, so that the compiler vectorises it.
         for (std::size_t i = 0; i < name.size(); ++i) {
             m_short[i] = m_short[i] == '\\' ? '/' : m_short[i];
         }
@@ -53,7 +53,7 @@ bool FileName::set(std::wstring_view name) {
 void wide_from_file_name(std::string_view name, std::wstring& result) {
     result.resize(name.size());
     result.resize(write_wide(name, result.data(), result.size()));
-    // The replacement character is a character too: only a name that does not come back was no UTF-8.
+    // The name itself may contain the replacement character.
     if (result.find(REPLACEMENT_CHARACTER) == std::wstring::npos || utf8_from_wide(result) == name) {
         return;
     }

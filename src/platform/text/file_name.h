@@ -1,4 +1,4 @@
-// Names of files between wide text and the disk.
+// File names between wide text and the system.
 #ifndef BASALT_SRC_PLATFORM_TEXT_FILE_NAME_H
 #define BASALT_SRC_PLATFORM_TEXT_FILE_NAME_H
 
@@ -7,11 +7,11 @@
 
 namespace basalt::platform {
 
-// The name the system knows: UTF-8, each `\` a `/`. False for text with values that are no characters; those
-// from 0xDC80 to 0xDCFF and 0xDC5C stand for single bytes, the last for a `\` that is part of a name.
+// The system's name: UTF-8, with '/' for each '\'. Values from 0xDC80 to 0xDCFF and 0xDC5C are single bytes,
+// the last a '\' that is part of a name. False for any other value that is not a character.
 bool file_name_from_wide(std::wstring_view name, std::string& result);
 
-// The same for the time of a call. A name in ASCII that is not very long, as nearly all are, takes no memory.
+// The same for the duration of a call. Names in ASCII of usual length need no allocation.
 class FileName {
 public:
     FileName() = default;
@@ -27,18 +27,18 @@ private:
     char m_short[512];
 };
 
-// The value that stands for a byte that belongs to no character.
+// The value for a byte that is not part of a character.
 constexpr wchar_t wide_from_byte(char byte) {
     const auto value = static_cast<unsigned char>(byte);
     return static_cast<wchar_t>(value < 0x80 ? value : 0xDC00 + value);
 }
 
-// The wide text that file_name_from_wide leads back to the same bytes. Should a name not be UTF-8, each of
-// its bytes from 0x80 on becomes a value from 0xDC80 on.
+// The wide text that file_name_from_wide() converts back to the same bytes. If a name is not UTF-8, each of
+// its bytes from 0x80 becomes a value from 0xDC80.
 std::wstring wide_from_file_name(std::string_view name);
-// The same in the storage that the result has.
+// The same, reusing the result's storage.
 void wide_from_file_name(std::string_view name, std::wstring& result);
-// The same of a name that the system gave, where a `\` is no separator: it would lead somewhere else.
+// The same for a name returned by the system, in which '\' is not a separator.
 void wide_from_system_name(std::string_view name, std::wstring& result);
 
 }  // namespace basalt::platform

@@ -13,7 +13,7 @@ namespace basalt::platform {
 
 namespace {
 
-// How many bytes at the front are ASCII, found eight at a time: names and messages are nearly all ASCII.
+// Number of leading ASCII bytes, eight at a time: names and messages are nearly all ASCII.
 std::size_t ascii_prefix(std::string_view text) {
     constexpr std::uint64_t HIGH_BITS = 0x8080808080808080;
     std::size_t count = 0;
@@ -31,8 +31,8 @@ std::size_t ascii_prefix(std::string_view text) {
 }
 
 #if defined(__SSE2__)
-// Narrows sixteen characters and answers how many at their front are from ' ' to 0x7F. Narrowing saturates: a
-// character beyond 0xFF becomes 0xFF, one below 0 becomes 0, and as signed bytes all others are below ' '.
+// Narrows sixteen characters and returns how many leading ones are from ' ' to 0x7F. Narrowing saturates, to
+// 0xFF and 0; as signed bytes all but the printing characters are below ' '.
 std::size_t copy_sixteen(const wchar_t* text, char* bytes) {
     const auto four = [text](std::size_t offset) {
         return _mm_loadu_si128(reinterpret_cast<const __m128i*>(text + offset));
@@ -52,13 +52,13 @@ struct Decoded {
 
 constexpr Decoded INVALID = {REPLACEMENT_CHARACTER, 1};
 
-// The character at the front of a text that is not empty.
+// The first character of a text that is not empty.
 Decoded decode_front(std::string_view text) {
     const auto lead = static_cast<unsigned char>(text[0]);
     if (lead < 0x80) {
         return {static_cast<wchar_t>(lead), 1};
     }
-    // 0xC0 and 0xC1 could only begin overlong forms.
+    // 0xC0 and 0xC1 only begin overlong forms.
     if (lead < 0xC2 || lead > 0xF4) {
         return INVALID;
     }
@@ -84,7 +84,7 @@ Decoded decode_front(std::string_view text) {
 std::size_t write_printing(std::wstring_view text, char* bytes) {
     std::size_t count = 0;
 #if defined(__SSE2__)
-    // Where the processor always can. The last sixteen overlap the ones before, which are printing.
+    // The last sixteen overlap the ones before.
     if (text.size() >= 16) {
         const std::size_t last = text.size() - 16;
         for (; count < last; count += 16) {
@@ -122,20 +122,6 @@ std::size_t encode_utf8(wchar_t ch, char* bytes) {
     return length;
 }
 
-std::string utf8_from_wide(std::wstring_view text) {
-    std::string result;
-    result.reserve(text.size());
-    for (const wchar_t ch : text) {
-        if (static_cast<char32_t>(ch) < 0x80) {
-            result.push_back(static_cast<char>(ch));
-        } else {
-            char bytes[MAX_UTF8_BYTES];
-            result.append(bytes, encode_utf8(ch, bytes));
-        }
-    }
-    return result;
-}
-
 char* write_utf8(std::wstring_view text, char* bytes) {
     while (!text.empty()) {
         const std::size_t printing = write_printing(text, bytes);
@@ -149,34 +135,29 @@ char* write_utf8(std::wstring_view text, char* bytes) {
     return bytes;
 }
 
-std::size_t write_utf8_lines(std::wstring_view text, char*& bytes) {
-    std::size_t done = 0;
-    for (;;) {
-        const std::size_t printing = write_printing(text.substr(done), bytes);
-        bytes += printing;
-        done += printing;
-        if (done == text.size() || text[done] == L'\0') {
-            return done;
-        }
-        if (text[done] == L'\n') {
-            *bytes++ = '\r';
-        }
-        bytes += encode_utf8(text[done++], bytes);
+std::string utf8_from_wide(std::wstring_view text) {
+    constexpr std::size_t PIECE = 64;
+    char bytes[PIECE * MAX_UTF8_BYTES];
+    std::string result;
+    result.reserve(text.size());
+    for (; !text.empty(); text.remove_prefix(std::min(PIECE, text.size()))) {
+        result.append(bytes, write_utf8(text.substr(0, PIECE), bytes));
     }
+    return result;
 }
 
-std::size_t write_wide(std::string_view text, wchar_t* characters, std::size_t room) {
+std::size_t write_wide(std::string_view text, wchar_t* characters, std::size_t capacity) {
     std::size_t count = 0;
     while (!text.empty()) {
         const std::size_t ascii = ascii_prefix(text);
-        if (count < room) {
-            std::copy_n(text.begin(), std::min(ascii, room - count), characters + count);
+        if (count < capacity) {
+            std::copy_n(text.begin(), std::min(ascii, capacity - count), characters + count);
         }
         count += ascii;
         text.remove_prefix(ascii);
         while (!text.empty() && static_cast<unsigned char>(text[0]) >= 0x80) {
             const Decoded front = decode_front(text);
-            if (count < room) {
+            if (count < capacity) {
                 characters[count] = front.ch;
             }
             ++count;

@@ -74,7 +74,8 @@ TEST(CString, searches_splits_and_compares) {
 TEST(CString, concatenates_texts_and_characters_and_itself) {
     CString text("\xE2\x82\xAC 5", 4);
     ((((text += L"b") += L'c') += CString(L'd', 2)) += "e") += NONE;
-    (text += text) += text.GetString() + 12;
+    text += text;
+    text += text.GetString() + 12;
     text.AppendChar(L'f');
     text.Append(L"g\0h", 2);
     EXPECT_EQ(text, CString(L"\x20AC bcdde\x20AC bcddedefg\0", 19));

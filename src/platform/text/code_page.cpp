@@ -53,7 +53,7 @@ locale_t open_locale(const char* name) {
 bool is_stateless(locale_t locale) {
     const ScopedLocale scope(locale);
     std::mbstate_t state{};
-    return std::mbrtowc(nullptr, "a", 1, &state) == 1;
+    return std::mbrtowc(nullptr, "a", 1, &state) == 1 && std::mbsinit(&state) != 0;
 }
 
 // Writes one character in the thread's locale and returns the number of bytes.

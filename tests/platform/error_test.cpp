@@ -64,13 +64,13 @@ TEST(LastError, result_codes) {
 TEST(LastError, from_errno) {
     using Row = std::pair<int, DWORD>;
     for (const auto& [number, code] :
-         {Row{0, 0},        {ENOENT, 2},    {ENOTDIR, 3},     {EMFILE, 4},         {ENFILE, 4},
-          {EACCES, 5},      {EPERM, 5},     {EBADF, 6},       {ENOMEM, 8},         {EEXIST, 80},
-          {EINVAL, 87},     {ENOSPC, 112},  {EDQUOT, 112},    {ENAMETOOLONG, 206}, {EAGAIN, 1450},
-          {-1, 31},         {99999, 31},    {EISDIR, 5},      {EROFS, 19},
-          {ETXTBSY, 32},    {ENOSYS, 50},   {EOPNOTSUPP, 50}, {ENODEV, 55},        {ENXIO, 55},
-          {EBUSY, 170},   {EFBIG, 223},     {EOVERFLOW, 534},    {EINTR, 995},
-          {EFAULT, 998},    {EILSEQ, 1113}, {EIO, 1117},      {ETIMEDOUT, 1460},   {ELOOP, 1921}}) {
+         {Row{0, 0},    {ENOENT, 2},       {ENOTDIR, 3},  {EMFILE, 4},         {ENFILE, 4},
+          {EACCES, 5},  {EPERM, 5},        {EBADF, 6},    {ENOMEM, 8},         {EEXIST, 80},
+          {EINVAL, 87}, {ENOSPC, 112},     {EDQUOT, 112}, {ENAMETOOLONG, 206}, {EAGAIN, 1450},
+          {-1, 31},     {99999, 31},       {EISDIR, 5},   {EROFS, 19},         {ETXTBSY, 32},
+          {ENOSYS, 50}, {EOPNOTSUPP, 50},  {ENODEV, 55},  {ENXIO, 55},         {EBUSY, 170},
+          {EFBIG, 223}, {EOVERFLOW, 534},  {EINTR, 995},  {EFAULT, 998},       {EILSEQ, 1113},
+          {EIO, 1117},  {ETIMEDOUT, 1460}, {ELOOP, 1921}}) {
         errno = number;
         basalt::platform::set_last_error_from_errno();
         EXPECT_EQ(GetLastError(), code) << number;
@@ -80,8 +80,7 @@ TEST(LastError, from_errno) {
 TEST(ErrorMessage, every_code_has_one_without_a_line_break) {
     EXPECT_EQ(message_of(9999), L"Unknown error 9999");
     EXPECT_EQ(message_of(0xFFFFFFFF), L"Unknown error 4294967295");
-    for (const DWORD code :
-         {2U, 3U, 4U, 5U, 6U, 8U, 80U, 87U, 112U, 122U, 206U, 487U, 1450U}) {
+    for (const DWORD code : {2U, 3U, 4U, 5U, 6U, 8U, 80U, 87U, 112U, 122U, 206U, 487U, 1450U}) {
         const std::wstring message = message_of(code);
         EXPECT_EQ(message.find(L"Unknown"), message.npos) << code;
         EXPECT_EQ(message.find_first_of(L"\r\n"), message.npos) << code;

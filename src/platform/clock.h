@@ -18,8 +18,8 @@ struct LARGE_INTEGER {
 // The counter's ticks per second: 1,000,000,000. Result: nonzero.
 BOOL QueryPerformanceFrequency(LARGE_INTEGER* frequency);
 
-// Ticks of a clock that is never set and stops while the machine sleeps; no thread reads an earlier value than
-// another thread read before. Result: nonzero.
+// Ticks of a clock that is never set and stops while the machine sleeps; no thread reads an earlier value
+// than another thread read before. Result: nonzero.
 BOOL QueryPerformanceCounter(LARGE_INTEGER* count);
 
 #endif

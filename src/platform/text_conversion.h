@@ -26,10 +26,10 @@ int WideCharToMultiByte(UINT code_page, DWORD flags, const wchar_t* source, int 
 
 using errno_t = int;
 
-// Writes a number in radix 2 to 36, in lower-case digits, and a terminator into a buffer of `size` characters:
-// with a minus sign in radix 10, as its 32-bit pattern in the others.
-// Result: 0; EINVAL for a null or empty buffer (nothing is written) and for another radix, ERANGE if text and
-// terminator do not fit (the text is then empty). Threads: reentrant.
+// Writes a number in radix 2 to 36, in lower-case digits, and a terminator into a buffer of `size`
+// characters: with a minus sign in radix 10, as its 32-bit pattern in the others. Result: 0; EINVAL for a
+// null or empty buffer (nothing is written) and for another radix, ERANGE if text and terminator do not fit
+// (the text is then empty). Threads: reentrant.
 errno_t _itow_s(int value, wchar_t* text, std::size_t size, int radix);
 
 #endif

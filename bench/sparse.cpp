@@ -1,5 +1,5 @@
-// The sparse array beside a locked flat hash map and a sparse volume. Times are per element unless the row
-// says otherwise; every peer's contents are compared with ours before anything is timed.
+// The sparse array beside a flat hash map and a sparse volume, with and without a lock. Times are per element
+// unless the row says otherwise. Contents are compared before anything is timed.
 #include <benchmark/benchmark.h>
 
 #include <algorithm>
@@ -20,6 +20,7 @@
 
 #include "bench/limits.h"
 #include "bench/resident_memory.h"
+#include "bench/sparse_rows.h"
 #include "bench/sparse_stores.h"
 #include "src/sparse/critical_section_wrapper.h"
 
@@ -134,6 +135,38 @@ void add_cell_rows(const std::string& order, const std::vector<Cell>& cells) {
     });
 }
 
+// Whole rows, and many scattered cells, in one call.
+void add_grid_rows(int side, const std::vector<Cell>& random) {
+    using bench::GridRows;
+    const std::size_t n = random.size();
+    const auto shared = std::make_shared<std::vector<Cell>>(random);
+    const auto filled_rows = [=] {
+        auto rows = std::make_shared<GridRows>(side);
+        rows->insert_all();
+        return rows;
+    };
+    add("insert row by row", GridRows::NAME, n, [=] {
+        const auto rows = std::make_shared<GridRows>(side);
+        return [=] { rows->insert_all(); };
+    });
+    add("find row by row", GridRows::NAME, n, [=] {
+        const auto rows = filled_rows();
+        return [=] { benchmark::DoNotOptimize(rows->copy_all()); };
+    });
+    add("remove row by row", GridRows::NAME, n, [=] {
+        const auto rows = filled_rows();
+        return [=] { rows->remove_all(); };
+    });
+    add("find at random", GridRows::NAME, n, [=] {
+        const auto rows = filled_rows();
+        return [=] { benchmark::DoNotOptimize(rows->find_cells(*shared)); };
+    });
+    add("visit all of " + std::to_string(n), "basalt_spans", n, [=] {
+        const auto rows = filled_rows();
+        return [=] { benchmark::DoNotOptimize(rows->visit_spans()); };
+    });
+}
+
 template <class Store>
 void add_visit_rows() {
     for (const int side : {100, 1000}) {
@@ -142,6 +175,9 @@ void add_visit_rows() {
         const auto store = std::make_shared<std::unique_ptr<Store>>();
         if constexpr (std::is_constructible_v<Store, int>) {
             *store = std::make_unique<Store>(side);
+            if constexpr (requires(Store s) { s.insert_all(); }) {
+                (*store)->insert_all();
+            }
         } else {
             *store = filled<Store>(cells);
         }
@@ -208,8 +244,8 @@ template <class Lock>
 void add_lock_row(const char* who) {
     benchmark::RegisterBenchmark((std::string("lock pair, uncontended/") + who).c_str(),
                                  [](benchmark::State& state) {
-                                     // A second thread that has lived keeps the C library from skipping its
-                                     // locked instructions.
+                                     // A process that never had a second thread is spared locked
+                                     // instructions.
                                      std::thread([] {}).join();
                                      Lock lock;
                                      long guarded = 0;
@@ -249,6 +285,9 @@ int main(int argc, char** argv) {
     });
     const std::vector<Cell> few(random.begin(), random.begin() + 10000);
     add_store<Basalt>(rows, random, tenth);
+    bench::require_same_rows(*filled<Basalt>(square(100)), 100);
+    add_grid_rows(1000, random);
+    add_visit_rows<bench::GridRows>();
 #ifdef HAVE_ABSEIL
     require_same<bench::FlatMap<std::recursive_mutex>>(few);
     add_store<bench::FlatMap<std::recursive_mutex>>(rows, random, tenth);

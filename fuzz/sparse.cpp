@@ -14,8 +14,6 @@
 
 namespace {
 
-using basalt::GridCell;
-using basalt::GridWindow;
 using basalt::SparseCells;
 using basalt::fuzz::Input;
 using basalt::fuzz::require;
@@ -153,21 +151,17 @@ private:
         const std::size_t number = SparseCells::find_row(array, x - 10, y, found, ROW);
         require(SparseCells::copy_row(array, x - 10, y, copies.data(), size, filled, ROW) == number);
         require(ROW - std::count(found, found + ROW, nullptr) == static_cast<std::ptrdiff_t>(number));
-        for (int i = 0; i < ROW; ++i) {
-            pair.check_cell(x - 10 + i, y, found[i]);
+        for (std::size_t i = 0; i < ROW; ++i) {
+            pair.check_cell(x - 10 + static_cast<int>(i), y, found[i]);
             require(filled[i] == (found[i] != nullptr));
-            require(!filled[i] || std::equal(copies.begin() + i * static_cast<std::ptrdiff_t>(size),
-                                             copies.begin() + (i + 1) * static_cast<std::ptrdiff_t>(size),
-                                             static_cast<unsigned char*>(found[i])));
+            require(!filled[i] || std::memcmp(found[i], copies.data() + i * size, size) == 0);
         }
     }
 
     void find_cells(Pair& pair, int y) {
-        GridCell cells[80];
+        basalt::GridCell cells[80];
         void* elements[80];
-        for (GridCell& cell : cells) {
-            cell = {m_input.coordinate(), y};
-        }
+        std::generate(cells, cells + 80, [&] { return basalt::GridCell{m_input.coordinate(), y}; });
         SparseCells::find(pair.array, cells, elements, 80);
         for (int i = 0; i < 80; ++i) {
             pair.check_cell(cells[i].x, y, elements[i]);
@@ -179,7 +173,7 @@ private:
         World& world;
         Pair& pair;
         const std::vector<int>* list;  // of blocks; null for all
-        GridWindow window = {INT32_MIN, INT32_MIN, INT32_MAX, INT32_MAX};
+        basalt::GridWindow window = {INT32_MIN, INT32_MIN, INT32_MAX, INT32_MAX};
         int generation = pair.model.generation;
         std::size_t position = 0;
         int block = -1;

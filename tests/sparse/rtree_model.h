@@ -180,12 +180,10 @@ struct RTreeInspector {
     // In the form of RTreeModel::dump.
     static std::string dump(const slRTree& tree) { return RTreeModel::dump(*model_of(tree, tree.m_root)); }
 
-    static int level(const slRTree& tree) { return tree.m_level; }
-
-    // Uses up reserved nodes if the next insertion could split the root.
-    static void leave_spare(slRTree& tree, int count) {
+    // Uses up reserved nodes until a split of the root needs one more.
+    static void leave_too_few(slRTree& tree) {
         while (tree.m_nodes[tree.m_root].count == rtree::MAX_ENTRIES &&
-               tree.m_nodes.spare() > static_cast<std::size_t>(count)) {
+               tree.m_nodes.spare() > static_cast<std::size_t>(tree.m_level) + 1) {
             tree.m_nodes.take();
         }
     }

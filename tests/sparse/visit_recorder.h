@@ -5,7 +5,6 @@
 #include <cstdint>
 #include <cstring>
 #include <functional>
-#include <ostream>
 #include <vector>
 
 #include "basalt/sparse.h"
@@ -16,9 +15,6 @@ struct Visited {
     int x, y;
     std::uint64_t value;
     bool operator==(const Visited&) const = default;
-    friend std::ostream& operator<<(std::ostream& out, const Visited& v) {
-        return out << '(' << v.x << ", " << v.y << ")=" << v.value;
-    }
 };
 using Visits = std::vector<Visited>;
 

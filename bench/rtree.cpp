@@ -1,5 +1,5 @@
-// The R-tree beside those of Boost.Geometry and libspatialindex, with the same split and the same entries a
-// node: the same blocks, the same windows, the results compared before any timing.
+// The R-tree beside those of Boost.Geometry and libspatialindex with the same split and entries per node, on
+// the same blocks and windows. Results are compared before anything is timed.
 #include <benchmark/benchmark.h>
 
 #include <algorithm>
@@ -31,15 +31,15 @@
 
 namespace {
 
-using bench::Block;
 using bench::orders_of_blocks;
+using bench::Rectangle;
 using bench::shuffled_blocks;
 using bench::windows;
 using vex_util::slRTree;
 
-void fill(slRTree& tree, const std::vector<Block>& blocks) {
+void fill(slRTree& tree, const std::vector<Rectangle>& blocks) {
     int id = 0;
-    for (const Block& b : blocks)
+    for (const Rectangle& b : blocks)
         tree.Insert(b.min, b.max, id++);
 }
 
@@ -71,7 +71,7 @@ void window(benchmark::State& state) {
     std::vector<int> found;
     std::size_t i = 0;
     for (auto _ : state) {
-        const Block& q = queries[i++ % queries.size()];
+        const Rectangle& q = queries[i++ % queries.size()];
         benchmark::DoNotOptimize(tree.Search(q.min, q.max, found));
     }
 }
@@ -83,13 +83,13 @@ using Box = bg::model::box<Point>;
 using Value = std::pair<Box, int>;
 using BoostTree = bg::index::rtree<Value, bg::index::quadratic<8, 4>>;
 
-Box box(const Block& b) {
+Box box(const Rectangle& b) {
     return {Point(b.min[0], b.min[1]), Point(b.max[0], b.max[1])};
 }
 
-std::vector<Value> values(const std::vector<Block>& blocks) {
+std::vector<Value> values(const std::vector<Rectangle>& blocks) {
     std::vector<Value> result;
-    for (const Block& b : blocks)
+    for (const Rectangle& b : blocks)
         result.emplace_back(box(b), static_cast<int>(result.size()));
     return result;
 }
@@ -129,7 +129,7 @@ struct IdWriter {
     }
 };
 
-void boost_search(const BoostTree& tree, const Block& q, std::vector<int>& found) {
+void boost_search(const BoostTree& tree, const Rectangle& q, std::vector<int>& found) {
     found.clear();
     tree.query(bg::index::intersects(box(q)), IdWriter{&found});
 }
@@ -176,16 +176,16 @@ void spatial_window(benchmark::State& state) {
 }
 #endif
 
-// What no tree beats: what a window finds stands side by side and is tested and written.
+// Lower bound of a window query: the hits, already side by side, are tested and written.
 void limit_window(benchmark::State& state) {
     struct Found {
-        Block query;
-        std::vector<std::pair<Block, int>> hits;
+        Rectangle query;
+        std::vector<std::pair<Rectangle, int>> hits;
     };
     const auto blocks = shuffled_blocks(STORED);
     std::vector<Found> answers;
     std::vector<int> found;
-    for (const Block& q :
+    for (const Rectangle& q :
          windows(STORED, static_cast<int>(state.range(0)), static_cast<int>(state.range(1)))) {
         stored().Search(q.min, q.max, found);
         answers.push_back({q, {}});
@@ -208,8 +208,8 @@ void limit_window(benchmark::State& state) {
     }
 }
 
-// What no insertion into a growing tree of such nodes beats: a look at one node on each level, each of which
-// tells the next, and the entry written. Nodes hold 5.6 entries, as in a tree that was split at random.
+// Lower bound of insertion into a growing tree: one dependent node read per level, and the entry written.
+// Nodes hold 5.6 entries, as after splits at random.
 void limit_insert(benchmark::State& state) {
     using vex_util::rtree::Node;
     constexpr double FILL = 5.6;
@@ -219,12 +219,12 @@ void limit_insert(benchmark::State& state) {
         for (std::size_t i = 1; i <= count; ++i) {
             const double leaves = static_cast<double>(i) / FILL;
             std::size_t at = 0;
-            std::size_t told = i * 0x9E3779B97F4A7C15U;
+            std::size_t next = i * 0x9E3779B97F4A7C15U;
             for (double level = 1; level < leaves;) {
                 level = std::min(level * FILL, leaves);
-                at = static_cast<std::size_t>(level * static_cast<double>(told >> 32) * 0x1p-32);
-                told += static_cast<std::size_t>(nodes[at].count);
-                told *= 0x9E3779B97F4A7C15U;
+                at = static_cast<std::size_t>(level * static_cast<double>(next >> 32) * 0x1p-32);
+                next += static_cast<std::size_t>(nodes[at].count);
+                next *= 0x9E3779B97F4A7C15U;
             }
             nodes[at].slot[i % 8] = static_cast<std::uint32_t>(i);
         }
@@ -235,7 +235,7 @@ void limit_insert(benchmark::State& state) {
 template <class Search>
 void require_same(const char* peer, Search search) {
     for (const auto& [across, down] : {std::pair{5, 2}, {40, 25}}) {
-        for (const Block& q : windows(STORED, across, down)) {
+        for (const Rectangle& q : windows(STORED, across, down)) {
             std::vector<int> ours;
             std::vector<int> theirs;
             stored().Search(q.min, q.max, ours);
@@ -258,7 +258,7 @@ void window_sizes(benchmark::internal::Benchmark* b) {
     b->ArgNames({"across", "down"})->Args({5, 2})->Args({40, 25});
 }
 
-// A million take libspatialindex ten seconds or so.
+// libspatialindex takes about ten seconds for a million.
 [[maybe_unused]] void small_insert_sizes(benchmark::internal::Benchmark* b) {
     b->Arg(1000)->Arg(10000)->Arg(100000)->Unit(benchmark::kMillisecond);
 }
@@ -284,10 +284,10 @@ BENCHMARK(limit_window)->Name("window/limit_testing_the_hits")->Apply(window_siz
 int main(int argc, char** argv) {
 #if HAVE_BOOST
     const BoostTree peer = boost_tree(false);
-    require_same("boost", [&](const Block& q, auto& found) { boost_search(peer, q, found); });
+    require_same("boost", [&](const Rectangle& q, auto& found) { boost_search(peer, q, found); });
 #endif
 #if HAVE_SPATIALINDEX
-    require_same("spatialindex", [](const Block& q, auto& found) { spatial_stored().search(q, found); });
+    require_same("spatialindex", [](const Rectangle& q, auto& found) { spatial_stored().search(q, found); });
 #endif
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();

@@ -1,4 +1,4 @@
-// What the R-trees are filled with and asked for.
+// The rectangles and windows of bench_rtree.
 #ifndef BASALT_BENCH_RTREE_BLOCKS_H
 #define BASALT_BENCH_RTREE_BLOCKS_H
 
@@ -9,14 +9,14 @@
 
 namespace bench {
 
-struct Block {
+struct Rectangle {
     int min[2], max[2];
 };
 
-// A square of 16 x 16 blocks, block by block without a gap, in random order; the order is the identifier.
-inline std::vector<Block> shuffled_blocks(int count, unsigned seed = 1) {
+// A square of 16 x 16 blocks without gaps, in random order; the position is the identifier.
+inline std::vector<Rectangle> shuffled_blocks(int count, unsigned seed = 1) {
     const int side = static_cast<int>(std::ceil(std::sqrt(count)));
-    std::vector<Block> blocks;
+    std::vector<Rectangle> blocks;
     for (int i = 0; i < count; ++i) {
         const int x = i % side * 16, y = i / side * 16;
         blocks.push_back({{x, y}, {x + 15, y + 15}});
@@ -25,22 +25,20 @@ inline std::vector<Block> shuffled_blocks(int count, unsigned seed = 1) {
     return blocks;
 }
 
-// Several orders, 100,000 blocks together where one has less: the branches of a thousand insertions that are
-// always the same are learnt by heart, which no user's are.
-inline std::vector<std::vector<Block>> orders_of_blocks(int count) {
-    std::vector<std::vector<Block>> orders;
+// Several orders, 100,000 blocks in all: branch predictors learn a short sequence that repeats.
+inline std::vector<std::vector<Rectangle>> orders_of_blocks(int count) {
+    std::vector<std::vector<Rectangle>> orders;
     for (unsigned seed = 1; seed == 1 || static_cast<int>(seed) * count <= 100'000; ++seed) {
         orders.push_back(shuffled_blocks(count, seed));
     }
     return orders;
 }
 
-// Windows that meet `hits` blocks each (hits a square times the side ratio), anywhere in the square of
-// blocks.
-inline std::vector<Block> windows(int count, int across, int down) {
+// Windows of `across` x `down` blocks anywhere in the square.
+inline std::vector<Rectangle> windows(int count, int across, int down) {
     const int side = static_cast<int>(std::ceil(std::sqrt(count)));
     std::mt19937 random(2);
-    std::vector<Block> result;
+    std::vector<Rectangle> result;
     for (int i = 0; i < 1000; ++i) {
         const int x = std::uniform_int_distribution<int>(0, side - across - 1)(random) * 16;
         const int y = std::uniform_int_distribution<int>(0, side - down - 2)(random) * 16;

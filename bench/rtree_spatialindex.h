@@ -1,4 +1,4 @@
-// The R-tree of libspatialindex, in memory, with the same split and as many entries a node.
+// The R-tree of libspatialindex in memory, with the same split and entries per node.
 #ifndef BASALT_BENCH_RTREE_SPATIALINDEX_H
 #define BASALT_BENCH_RTREE_SPATIALINDEX_H
 
@@ -13,7 +13,7 @@ namespace bench {
 
 namespace si = SpatialIndex;
 
-inline si::Region region(const Block& b) {
+inline si::Region region(const Rectangle& b) {
     const double low[2] = {static_cast<double>(b.min[0]), static_cast<double>(b.min[1])};
     const double high[2] = {static_cast<double>(b.max[0]), static_cast<double>(b.max[1])};
     return {low, high, 2};
@@ -21,15 +21,15 @@ inline si::Region region(const Block& b) {
 
 class SpatialTree {
 public:
-    explicit SpatialTree(const std::vector<Block>& blocks) {
+    explicit SpatialTree(const std::vector<Rectangle>& blocks) {
         si::id_type own = 0;
         m_tree.reset(si::RTree::createNewRTree(*m_storage, 0.5, 8, 8, 2, si::RTree::RV_QUADRATIC, own));
         si::id_type id = 0;
-        for (const Block& b : blocks) {
+        for (const Rectangle& b : blocks) {
             m_tree->insertData(0, nullptr, region(b), id++);
         }
     }
-    void search(const Block& q, std::vector<int>& found) const {
+    void search(const Rectangle& q, std::vector<int>& found) const {
         found.clear();
         Collector collector(found);
         m_tree->intersectsWithQuery(region(q), collector);

@@ -27,25 +27,11 @@
 namespace {
 
 using Clock = std::chrono::steady_clock;
-using Cell = std::pair<int, int>;
 using bench::Basalt;
+using bench::Cell;
 using bench::record_of;
-
-std::vector<Cell> square(int side) {
-    std::vector<Cell> cells;
-    cells.reserve(static_cast<std::size_t>(side) * static_cast<std::size_t>(side));
-    for (int y = 0; y < side; ++y) {
-        for (int x = 0; x < side; ++x) {
-            cells.emplace_back(x - side / 2, y - side / 2);
-        }
-    }
-    return cells;
-}
-
-std::vector<Cell> shuffled(std::vector<Cell> cells) {
-    std::shuffle(cells.begin(), cells.end(), std::mt19937_64(7));
-    return cells;
-}
+using bench::shuffled;
+using bench::square;
 
 template <class Store>
 std::unique_ptr<Store> filled(const std::vector<Cell>& cells) {
@@ -77,7 +63,7 @@ void require_same_visits(int side) {
     const bench::PlainSquare plain(side);
     if (ours->visit_all() != plain.visit_all() ||
         ours->visit_window(-20, -3, 21) != plain.visit_window(-20, -3, 21)) {
-        std::fprintf(stderr, "the limit of visits reads other records\n");
+        std::fprintf(stderr, "the lower bound of visits reads other records\n");
         std::exit(1);
     }
 }
@@ -257,8 +243,7 @@ void add_lock_row(const char* who) {
                                  });
 }
 
-// What a call cannot beat: the record read or written and nothing else; of a removal, the cell's pointer
-// cleared.
+// Lower bounds: reading or writing the record alone; for a removal, clearing the cell's pointer.
 void add_limits(std::size_t records) {
     for (const bool in_order : {true, false}) {
         const std::string order = in_order ? " row by row/" : " at random/";

@@ -1,4 +1,4 @@
-// The stores that bench_sparse sets side by side, all by the same few calls.
+// The stores that bench_sparse compares, behind the same few calls.
 #ifndef BASALT_BENCH_SPARSE_STORES_H
 #define BASALT_BENCH_SPARSE_STORES_H
 
@@ -7,7 +7,9 @@
 #include <cstddef>
 #include <cstdint>
 #include <mutex>
+#include <random>
 #include <type_traits>
+#include <utility>
 #include <vector>
 
 #if __has_include(<absl/container/flat_hash_map.h>)
@@ -30,6 +32,24 @@ inline Record record_of(int x, int y) {
 }
 
 constexpr int BLOCK_SIDE = 16;
+
+using Cell = std::pair<int, int>;
+
+inline std::vector<Cell> square(int side) {
+    std::vector<Cell> cells;
+    cells.reserve(static_cast<std::size_t>(side) * static_cast<std::size_t>(side));
+    for (int y = 0; y < side; ++y) {
+        for (int x = 0; x < side; ++x) {
+            cells.emplace_back(x - side / 2, y - side / 2);
+        }
+    }
+    return cells;
+}
+
+inline std::vector<Cell> shuffled(std::vector<Cell> cells) {
+    std::shuffle(cells.begin(), cells.end(), std::mt19937_64(7));
+    return cells;
+}
 
 struct Basalt {
     static constexpr const char* NAME = "basalt";
@@ -60,8 +80,7 @@ struct Basalt {
     vex_util::Sparse2DArray array{sizeof(Record), BLOCK_SIDE, 64};
 };
 
-// The peers, as they are and with the lock that a user who needs what ours promises would put around each
-// call.
+// The peers, without a lock and with the one that makes them thread-safe as ours.
 struct NoMutex {
     void lock() {}
     void unlock() {}
@@ -103,7 +122,7 @@ struct FlatMap {
 #endif
 
 #ifdef HAVE_OPENVDB
-// The plane folded into the volume's 8 x 8 x 8 leaves, 32 x 16 cells a leaf, so that no leaf is wasted.
+// The plane folded into the volume's 8 x 8 x 8 leaves, 32 x 16 cells per leaf, so that leaves are full.
 template <class Mutex>
 struct Volume {
     static constexpr const char* NAME = LOCKED<Mutex> ? "openvdb_locked" : "openvdb";
@@ -153,7 +172,7 @@ struct Volume {
 };
 #endif
 
-// What the visits cannot beat: the same records in one array row by row, read in the same order by a loop.
+// The lower bound of visits: the same records in one array, read in the same order by a loop.
 class PlainSquare {
 public:
     static constexpr const char* NAME = "limit_reading_the_records";
@@ -165,7 +184,7 @@ public:
         }
     }
     double visit_all() const { return visit_window(-m_side / 2, -m_side / 2, m_side); }
-    // By whole blocks, as far as the square goes.
+    // Whole blocks, within the square.
     double visit_window(int x0, int y0, int side) const {
         const int middle = m_side / 2;
         double sum = 0;

@@ -45,8 +45,14 @@ void ElementPool::TakeRow(void** slots, std::size_t count) noexcept {
         if (m_unused == 0) {
             OpenChunk();
         }
-        m_unused -= 1;
-        slots[--count] = m_chunk + m_unused * m_elementSize;
+        const std::size_t run = std::min(count, m_unused);
+        const std::size_t size = m_elementSize;
+        char* const first = m_chunk + (m_unused - run) * size;
+        for (std::size_t i = 0; i < run; ++i) {
+            slots[count - run + i] = first + i * size;
+        }
+        m_unused -= run;
+        count -= run;
     }
 }
 

@@ -10,21 +10,19 @@
 
 namespace {
 
-/// A selection comes as whole blocks: this says which of their cells count.
+/// Selections consist of whole blocks: this filters their cells.
 class CellFilter {
 public:
     CellFilter(const CellBox& view, const std::vector<geo_nee>& boundary)
-        : m_view(view), m_boundary(boundary) {}
+        : m_view(view), m_has_boundary(!boundary.empty()), m_boundary(boundary) {}
 
     bool in_view(int x, int y) const { return m_view.contains(x, y); }
-    bool inside_boundary(const geo_nee& point) const {
-        return m_boundary.empty() ||
-               geo_point_in_poly(static_cast<int>(m_boundary.size()), m_boundary.data(), &point) == 1;
-    }
+    bool inside_boundary(const geo_nee& point) const { return !m_has_boundary || m_boundary.contains(point); }
 
 private:
     const CellBox& m_view;
-    const std::vector<geo_nee>& m_boundary;
+    bool m_has_boundary;
+    basalt::PreparedPolygon m_boundary;
 };
 
 /// Area of a cell by row, for the view's rows.
@@ -91,7 +89,7 @@ public:
     }
 
 private:
-    /// The visit's order is the array's business; ties go to the southernmost, then westernmost cell.
+    /// Independent of the order of the visit: ties go to the southernmost, then westernmost cell.
     void widen(const Extreme& cell) {
         const auto place = [](const Extreme& e) { return std::tie(e.y, e.x); };
         const auto ties = [&](const Extreme& e) {

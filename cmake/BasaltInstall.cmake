@@ -11,17 +11,10 @@ install(DIRECTORY ${PROJECT_SOURCE_DIR}/include/basalt DESTINATION ${CMAKE_INSTA
 install(FILES ${PROJECT_BINARY_DIR}/include/basalt/version.h
   DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/basalt COMPONENT development)
 
-# A static archive leaves its own dependencies to whoever links it.
+# A static archive needs the standard library named where it is linked.
 if(BUILD_SHARED_LIBS)
-  set(basalt_static_dependencies "")
-  set(pc_requires "Requires.private: pixman-1")
   set(pc_static_libs "\nLibs.private: -lstdc++ -lm")
 else()
-  set(basalt_static_dependencies "include(CMakeFindDependencyMacro)
-find_dependency(PkgConfig)
-pkg_check_modules(PIXMAN REQUIRED IMPORTED_TARGET GLOBAL pixman-1)
-")
-  set(pc_requires "Requires: pixman-1")
   set(pc_static_libs " -lstdc++ -lm")
 endif()
 

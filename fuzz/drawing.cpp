@@ -1,239 +1,237 @@
-// Drawing: sequences of calls on a few objects, good and bad handles, and coordinates of every size. Whatever
-// the calls answer, nothing outside a surface may be touched, everything can be deleted afterwards, and what
-// two calls say about the same pixel agrees.
-#include <algorithm>
+// Drawing calls drawn at random, on a few contexts, bitmaps and regions: after each, every pixel is what the
+// picture model says, and everything can be deleted in the end.
+#include <array>
 #include <cstddef>
 #include <cstdint>
-#include <vector>
 
-#include "basalt/platform.h"
 #include "fuzz/input.h"
-#include "src/platform/region_rectangles.h"
+#include "tests/support/drawing.h"
 
 namespace {
 
 using basalt::fuzz::Input;
 using basalt::fuzz::require;
+using namespace drawing;
 
-constexpr int SLOTS = 4;
-constexpr int DEPTHS[] = {1, 4, 8, 16, 24, 32};
+constexpr int SIDE = 30;  // of the regions
+const XFORM TRANSFORMS[] = {
+    {1, 0, 0, 1, 0, 0},    turn_about(30, 12, 9),  turn_about(123.4, 5, 5),
+    turn_about(90, 10, 8), {2, 0, 0, 2, -3, 1},    {-1, 0, 0, 1, 20, 0},
+    {1, 0, 0, 1, 3, -4},   {0.25F, 0, 0, 4, 1, 1}, {1, 0.3F, -0.7F, 1.2F, 5.25F, -3.5F}};
+
+// A context with its bitmap, and the model of both.
+struct Surface {
+    Picture picture;
+    Canvas canvas;
+    Settings settings;
+
+    explicit Surface(Input& in)
+        : picture(
+              random_picture(1 + in.byte() % 40, 1 + in.byte() % 20, DEPTHS[in.byte() % 6],
+                             [word = in.word()]() mutable { return word = word * 1664525 + 1013904223; })),
+          canvas(picture) {}
+};
 
 struct World {
-    HDC contexts[SLOTS] = {};
-    HGDIOBJ objects[SLOTS * 2] = {};
-    Input& input;
+    Input& in;
+    std::array<Surface, 3> surfaces{Surface(in), Surface(in), Surface(in)};
+    std::array<Picture, 3> sets{Picture(SIDE, SIDE, 1), Picture(SIDE, SIDE, 1), Picture(SIDE, SIDE, 1)};
+    std::array<CRgn, 3> regions;
 
-    explicit World(Input& its_input) : input(its_input) {}
-    World(const World&) = delete;
-    World& operator=(const World&) = delete;
-    ~World() {
-        for (HDC const dc : contexts) {
-            require(DeleteDC(dc) != 0 || ReleaseDC(nullptr, dc) != 0 || dc == nullptr);
-        }
-        for (HGDIOBJ const object : objects) {
-            require(DeleteObject(object) != 0 || object == nullptr);
-            require(DeleteObject(object) == 0);
+    explicit World(Input& its_input) : in(its_input) {
+        for (CRgn& region : regions) {
+            region.CreateRectRgn(0, 0, 0, 0);
         }
     }
 
-    HDC& context() { return contexts[input.byte() % SLOTS]; }
-    HGDIOBJ& object() { return objects[input.byte() % (SLOTS * 2)]; }
-    HRGN region() { return static_cast<HRGN>(object()); }
-    RECT rectangle() {
-        return {input.coordinate(), input.coordinate(), input.coordinate(), input.coordinate()};
+    Surface& surface() { return surfaces[in.byte() % 3U]; }
+    // Near 0 mostly, never so far that a shift leaves 32 bits.
+    int coordinate() { return std::clamp(in.coordinate(), -2147483000, 2147483000); }
+    RECT rectangle() { return {coordinate(), coordinate(), coordinate(), coordinate()}; }
+    COLORREF colour(const Surface& s) {
+        const int kind = in.byte();
+        return kind % 2 == 0 ? in.word()
+                             : colour_of(s.picture.depth, s.picture.pixels[kind % s.picture.pixels.size()]);
+    }
+    bool is_shift(const Surface& s) const { return s.settings.world.eM11 == 1 && s.settings.world.eM12 == 0; }
+
+    // Runs a call that draws on rectangles: refused under a transform, else as `paint` does it without.
+    template <class Call, class Paint>
+    void draw(Surface& s, const Call& call, const Paint& paint) {
+        require(call() == (is_shift(s) ? 1 : 0));
+        if (is_shift(s)) {
+            paint(static_cast<int>(s.settings.world.eDx), static_cast<int>(s.settings.world.eDy));
+        }
+    }
+    static RECT moved(const RECT& r, int dx, int dy) {
+        return {r.left + dx, r.top + dy, r.right + dx, r.bottom + dy};
     }
 
-    void make_context() {
-        HDC& dc = context();
-        if (DeleteDC(dc) != 0 || ReleaseDC(nullptr, dc) != 0 || dc == nullptr) {
-            dc = input.byte() % 8 == 0 ? GetDC(nullptr) : CreateCompatibleDC(nullptr);
-            require(dc != nullptr);
+    void pixel(Surface& s) {
+        const int x = coordinate(), y = coordinate();
+        const COLORREF drawn = colour(s);
+        const std::int64_t px = x + static_cast<std::int64_t>(s.settings.world.eDx);
+        const std::int64_t py = y + static_cast<std::int64_t>(s.settings.world.eDy);
+        const bool is_there = is_shift(s) && s.picture.has(px, py);
+        require(GetPixel(s.canvas, x, y) ==
+                (is_there ? colour_of(s.picture.depth, s.picture.at(px, py)) : CLR_INVALID));
+        const std::uint32_t value = value_of(s.picture.depth, drawn);
+        require(SetPixel(s.canvas, x, y, drawn) ==
+                (is_there ? colour_of(s.picture.depth, value) : CLR_INVALID));
+        if (is_there) {
+            s.picture.at(px, py) = value;
         }
     }
 
-    void make_object() {
-        HGDIOBJ& place = object();
-        if (place != nullptr && DeleteObject(place) == 0) {
-            return;  // it is selected
-        }
-        place = new_object();
-    }
-
-    HGDIOBJ new_object() {
-        switch (input.byte() % 6) {
-            case 0:
-                return CreateSolidBrush(input.word());
-            case 1:
-                return CreatePen(input.byte() % 8, input.coordinate(), input.word());
-            case 2:
-                return CreateRectRgn(input.coordinate(), input.coordinate(), input.coordinate(),
-                                     input.coordinate());
-            case 3:
-                return new_bitmap();
-            case 4:
-                return CreateCompatibleBitmap(context(), input.byte(), input.byte());
-            default: {
-                std::vector<RECT> rectangles(input.byte() % 16);
-                for (RECT& r : rectangles) {
-                    r = rectangle();
-                }
-                return basalt::platform::create_region(rectangles);
-            }
-        }
-    }
-
-    HGDIOBJ new_bitmap() {
-        const int width = input.byte() % 64;
-        const int height = input.byte() % 32;
-        const int depth = DEPTHS[input.byte() % 6];
-        // Exactly what the call may read.
-        std::vector<std::uint8_t> bits(static_cast<std::size_t>((width * depth + 15) / 16 * 2 * height));
-        for (std::uint8_t& byte : bits) {
-            byte = input.byte();
-        }
-        return CreateBitmap(width, height, 1, static_cast<UINT>(depth), bits.empty() ? nullptr : bits.data());
-    }
-
-    void set_pixel() {
-        HDC const dc = context();
-        const int x = input.coordinate();
-        const int y = input.coordinate();
-        const COLORREF before = GetPixel(dc, x, y);
-        const COLORREF stored = SetPixel(dc, x, y, input.word());
-        require((before == CLR_INVALID) == (stored == CLR_INVALID));
-        require(GetPixel(dc, x, y) == stored);
-    }
-
-    void read_rows() {
-        HGDIOBJ const bitmap = object();
-        struct {
-            BITMAPINFOHEADER header;
-            RGBQUAD table[256];
-        } dib = {};
-        BITMAP record = {};
-        if (GetObjectW(bitmap, sizeof record, &record) == 0) {
+    void fills(Surface& s) {
+        const RECT r = rectangle();
+        const COLORREF drawn = colour(s);
+        const CBrush brush(drawn);
+        const std::uint32_t value = value_of(s.picture.depth, drawn);
+        const auto fill = [&](int, int, std::uint32_t& pixel) { pixel = value; };
+        if (in.byte() % 2 == 0) {
+            draw(
+                s, [&] { return FillRect(s.canvas, &r, brush); },
+                [&](int dx, int dy) { on(s.picture, moved(r, dx, dy), fill); });
             return;
         }
-        const int depth = DEPTHS[input.byte() % 6];
-        dib.header.biSize = 40;
-        dib.header.biWidth = record.bmWidth;
-        dib.header.biHeight = input.byte() % 2 == 0 ? record.bmHeight : -record.bmHeight;
-        dib.header.biPlanes = 1;
-        dib.header.biBitCount = static_cast<WORD>(depth);
-        const UINT first = input.byte() % 64;
-        const UINT count = input.byte();
-        const auto height = static_cast<UINT>(record.bmHeight);
-        const UINT rows = first < height ? std::min(count, height - first) : 0;
-        const auto row_bytes = static_cast<std::size_t>((record.bmWidth * depth + 31) / 32 * 4);
-        std::vector<std::uint8_t> bits(std::max<std::size_t>(rows * row_bytes, 1));
-        require(GetDIBits(context(), static_cast<HBITMAP>(bitmap), first, count, bits.data(),
-                          reinterpret_cast<BITMAPINFO*>(&dib), DIB_RGB_COLORS) <= static_cast<int>(rows));
+        const int width = coordinate(), height = coordinate();
+        HGDIOBJ const before = SelectObject(s.canvas, brush);
+        draw(
+            s, [&] { return RoundRect(s.canvas, r.left, r.top, r.right, r.bottom, width, height); },
+            [&](int dx, int dy) {
+                const RECT box = ordered(moved(r, dx, dy));
+                on(s.picture, box, [&](int x, int y, std::uint32_t& pixel) {
+                    pixel = is_in_rounded(box, std::abs(width), std::abs(height), x, y) ? value : pixel;
+                });
+            });
+        SelectObject(s.canvas, before);
     }
 
-    void transform() {
-        HDC const dc = context();
-        SetGraphicsMode(dc, GM_ADVANCED);
-        const XFORM t = {input.factor(), input.factor(),      input.factor(),
-                         input.factor(), input.factor() * 16, input.factor() * 16};
-        ModifyWorldTransform(dc, &t, input.byte() % 4);
-        POINT point = {input.coordinate(), input.coordinate()};
-        DPtoLP(dc, &point, 1);
+    void gradients(Surface& s) {
+        TRIVERTEX ends[2];
+        for (TRIVERTEX& end : ends) {
+            const auto channel = [&] { return static_cast<WORD>(in.byte() << 8 | in.byte()); };
+            end = {coordinate(), coordinate(), channel(), channel(), channel(), 0};
+        }
+        const GRADIENT_RECT mesh = {0, 1};
+        const bool across = in.byte() % 2 == 0;
+        draw(
+            s, [&] { return GradientFill(s.canvas, ends, 2, &mesh, 1, across ? 0 : 1); },
+            [&](int dx, int dy) {
+                TRIVERTEX a = ends[0], b = ends[1];
+                a.x += dx, a.y += dy, b.x += dx, b.y += dy;
+                gradient(s.picture, a, b, across);
+            });
+    }
+
+    void copies(Surface& to, Surface& from) {
+        constexpr DWORD OPERATIONS[] = {SRCCOPY, NOTSRCCOPY, SRCAND, SRCPAINT, SRCINVERT};
+        const RECT r = rectangle();
+        const Block b = {r.left, r.top, r.right, r.bottom, coordinate(), coordinate()};
+        const DWORD rop = OPERATIONS[in.byte() % 5];
+        const XFORM& w = from.settings.world;
+        const bool is_moved = w.eDx != 0 || w.eM11 != 1 || w.eM12 != 0;
+        const bool done =
+            BitBlt(to.canvas, b.x, b.y, b.width, b.height, from.canvas, b.source_x, b.source_y, rop);
+        require(done == (w.eM12 == 0 && w.eM21 == 0));
+        if (!done) {
+            return;
+        }
+        const Picture result = to.canvas.picture();
+        if (!is_moved) {  // a model of one transform at a time
+            Picture expected = to.picture;
+            std::vector<std::pair<int, int>> open;
+            expected = copied(to.picture, b, from.picture, rop, to.settings, from.settings.background, 1e-6,
+                              [&](int x, int y) { open.emplace_back(x, y); });
+            for (const auto& [x, y] : open) {
+                expected.at(x, y) = result.at(x, y);
+            }
+            require(result == expected);
+        }
+        to.picture = result;
+    }
+
+    void keyed_copies(Surface& to, Surface& from) {
+        const RECT r = rectangle(), source = rectangle();
+        const COLORREF key = colour(from);
+        const bool is_sized = r.right >= 0 && r.bottom >= 0 && source.right >= 0 && source.bottom >= 0;
+        require(TransparentBlt(to.canvas, r.left, r.top, r.right, r.bottom, from.canvas, source.left,
+                               source.top, source.right, source.bottom,
+                               key) == (is_sized && is_shift(to) && is_shift(from) ? 1 : 0));
+        if (is_sized && is_shift(to) && is_shift(from)) {
+            const auto dx = static_cast<int>(to.settings.world.eDx),
+                       dy = static_cast<int>(to.settings.world.eDy);
+            const auto sx = static_cast<int>(from.settings.world.eDx),
+                       sy = static_cast<int>(from.settings.world.eDy);
+            const RECT place = moved({r.left, r.top, 0, 0}, dx, dy),
+                       part = moved({source.left, source.top, 0, 0}, sx, sy);
+            to.picture = keyed(
+                to.picture,
+                {place.left, place.top, r.right, r.bottom, part.left, part.top, source.right, source.bottom},
+                from.picture, key, to.settings, from.settings.background);
+        }
+    }
+
+    void settings(Surface& s) {
+        s.settings.text = in.word();
+        s.settings.background = in.word();
+        s.settings.world = TRANSFORMS[in.byte() % 9U];
+        SetTextColor(s.canvas, s.settings.text);
+        SetBkColor(s.canvas, s.settings.background);
+        SetGraphicsMode(s.canvas, GM_ADVANCED);
+        require(SetWorldTransform(s.canvas, &s.settings.world) != 0);
     }
 
     void combine() {
-        HRGN const a = region();
-        HRGN const b = region();
-        HRGN const result = region();
-        const int x = input.coordinate();
-        const int y = input.coordinate();
-        const bool in_either = PtInRegion(a, x, y) != 0 || PtInRegion(b, x, y) != 0;
-        const int mode = input.byte() % 7;
-        if (CombineRgn(result, a, b, mode) != RGN_ERROR && mode == RGN_OR) {
-            require(in_either == (PtInRegion(result, x, y) != 0));
-            RECT box = {};
-            require(GetRgnBox(result, &box) != RGN_ERROR && EqualRgn(result, result) == 1);
+        const std::size_t a = in.byte() % 3, b = in.byte() % 3, into = in.byte() % 3;
+        const int mode = RGN_AND + in.byte() % 5;
+        if (in.byte() % 2 == 0) {
+            const RECT r = rectangle();
+            Picture set(SIDE, SIDE, 1);
+            on(set, ordered(r), [](int, int, std::uint32_t& value) { value = 1; });
+            const RECT part = {std::clamp<LONG>(r.left, 0, SIDE), std::clamp<LONG>(r.top, 0, SIDE),
+                               std::clamp<LONG>(r.right, 0, SIDE), std::clamp<LONG>(r.bottom, 0, SIDE)};
+            require(regions[b].SetRectRgn(&part) != 0);
+            sets[b] = set;
         }
-    }
-
-    void gradient() {
-        TRIVERTEX corners[3] = {};
-        for (TRIVERTEX& corner : corners) {
-            corner = {input.coordinate(),
-                      input.coordinate(),
-                      static_cast<WORD>(input.byte() << 8),
-                      static_cast<WORD>(input.word()),
-                      static_cast<WORD>(input.word()),
-                      0};
+        Picture result(SIDE, SIDE, 1);
+        for (std::size_t i = 0; i < result.pixels.size(); ++i) {
+            const std::uint32_t x = sets[a].pixels[i], y = sets[b].pixels[i];
+            const std::uint32_t results[] = {x & y, x | y, x ^ y, x & ~y, x};
+            result.pixels[i] = results[mode - RGN_AND];
         }
-        const GRADIENT_RECT mesh[2] = {{input.byte() % 4U, input.byte() % 4U}, {input.byte() % 4U, 0}};
-        GradientFill(context(), corners, 3, mesh, 1 + input.byte() % 2U, input.byte() % 3U);
+        require(regions[into].CombineRgn(&regions[a], &regions[b], mode) != RGN_ERROR);
+        sets[into] = result;
+        require(holds(regions[into], result));
     }
 
     void step() {
-        Input& in = input;
-        switch (in.byte() % 16) {
+        Surface& s = surface();
+        switch (in.byte() % 8) {
             case 0:
-                make_context();
+                pixel(s);
                 break;
             case 1:
+                fills(s);
+                break;
             case 2:
-                make_object();
+                gradients(s);
                 break;
             case 3:
-            case 4: {
-                HGDIOBJ const stock = GetStockObject(in.byte() % 12);
-                SelectObject(context(), in.byte() % 4 == 0 ? stock : object());
+            case 4:
+                copies(s, surface());
                 break;
-            }
             case 5:
-                set_pixel();
+                keyed_copies(s, surface());
                 break;
-            case 6: {
-                const RECT r = rectangle();
-                FillRect(context(), &r, static_cast<HBRUSH>(object()));
+            case 6:
+                settings(s);
                 break;
-            }
-            case 7: {
-                const RECT r = rectangle();
-                RoundRect(context(), r.left, r.top, r.right, r.bottom, in.coordinate(), in.coordinate());
-                break;
-            }
-            case 8:
-                gradient();
-                break;
-            case 9:
-            case 10: {
-                const RECT r = rectangle();
-                BitBlt(context(), r.left, r.top, r.right, r.bottom, context(), in.coordinate(),
-                       in.coordinate(), static_cast<DWORD>(in.byte()) << 16);
-                break;
-            }
-            case 11: {
-                const RECT r = rectangle();
-                const RECT s = rectangle();
-                TransparentBlt(context(), r.left, r.top, r.right, r.bottom, context(), s.left, s.top, s.right,
-                               s.bottom, in.word());
-                break;
-            }
-            case 12:
-                read_rows();
-                break;
-            case 13:
-                transform();
-                break;
-            case 14:
+            default:
                 combine();
-                break;
-            default: {
-                HDC const dc = context();
-                SetBkColor(dc, in.word());
-                SetTextColor(dc, in.word());
-                if (in.byte() % 2 == 0) {
-                    ModifyWorldTransform(dc, nullptr, MWT_IDENTITY);
-                }
-                break;
-            }
         }
+        require(s.canvas.picture() == s.picture);
     }
 };
 

@@ -1,143 +1,131 @@
-// Bitmaps of any size, depth and contents: written to a file, read as rows, turned, as a region, and drawn on
-// with any numbers. What several calls say about the same pixels agrees.
+// Bitmaps of any size, depth and contents: as a file, as a region, rotated, and drawn on by the family's
+// functions, held against the picture model.
 #include <sys/mman.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cmath>
 #include <cstdint>
-#include <cstring>
 #include <memory>
 #include <string>
-#include <vector>
 
 #include "basalt/frame.h"
 #include "basalt/graphics.h"
-#include "basalt/platform.h"
 #include "fuzz/input.h"
+#include "tests/support/drawing.h"
 
 namespace {
 
 using basalt::fuzz::Input;
 using basalt::fuzz::require;
+using namespace drawing;
 
-constexpr unsigned DEPTHS[] = {1, 4, 8, 16, 24, 32};
+// Few values, so that colours meet.
+Picture drawn_picture(Input& in) {
+    const std::uint32_t values[] = {0, ~0U, in.word(), in.word() & 0xFFFFFF};
+    return random_picture(1 + in.byte() % 70, 1 + in.byte() % 40, DEPTHS[in.byte() % 6],
+                          [&] { return values[in.byte() % 4]; });
+}
 
-struct Picture {
-    int width;
-    int height;
-    unsigned depth;
-    CBitmap bitmap;
-
-    explicit Picture(Input& input)
-        : width(1 + input.byte() % 70), height(1 + input.byte() % 40), depth(DEPTHS[input.byte() % 6]) {
-        const auto row = (static_cast<std::size_t>(width) * depth + 15) / 16 * 2;
-        std::vector<std::uint8_t> bits(row * static_cast<std::size_t>(height));  // exactly what may be read
-        // Few values, so that colours meet; some of any kind.
-        const std::uint8_t values[] = {0, 0xFF, input.byte(), input.byte()};
-        for (std::uint8_t& byte : bits) {
-            const std::uint8_t next = input.byte();
-            byte = next < 250 ? values[next % 4] : next;
-        }
-        require(bitmap.CreateBitmap(width, height, 1, depth, bits.data()) != 0);
-    }
-    std::size_t dib_row() const { return (static_cast<std::size_t>(width) * depth + 31) / 32 * 4; }
-};
-
-// The file has the rows that reading the bitmap gives, bottom row first, but for bits that mean nothing.
-void check_file(Picture& picture) {
+// The file holds what unpacks to the picture, bottom row first, without the unused byte.
+void check_file(Canvas& canvas, const Picture& picture) {
     static const int file = memfd_create("picture", MFD_CLOEXEC);
-    static const std::string path = "/proc/self/fd/" + std::to_string(file);
-    vex_util::mfc::DumpBitmap(picture.bitmap, CString(path.c_str()));
-    const std::size_t table = picture.depth <= 8 ? std::size_t{4} << picture.depth : 0;
-    const std::size_t size = 54 + table + picture.dib_row() * static_cast<std::size_t>(picture.height);
-    struct stat status = {};
-    require(fstat(file, &status) == 0 && static_cast<std::size_t>(status.st_size) == size);
-    std::vector<std::uint8_t> bytes(size);
-    require(pread(file, bytes.data(), size, 0) == static_cast<ssize_t>(size) && bytes[0] == 'B');
-
-    BITMAPINFOHEADER header = {};
-    const std::unique_ptr<unsigned char[]> rows(vex_util::mfc::GetDIBits(picture.bitmap, header));
-    require(rows != nullptr && header.biWidth == picture.width && header.biHeight == -picture.height &&
-            header.biBitCount == picture.depth);
-    if (picture.depth == 8 || picture.depth == 24) {
-        const std::size_t row = picture.dib_row();
-        for (std::size_t y = 0; y < static_cast<std::size_t>(picture.height); ++y) {
-            const std::uint8_t* const stored = bytes.data() + size - (y + 1) * row;
-            require(std::memcmp(stored, rows.get() + y * row,
-                                static_cast<std::size_t>(picture.width) * picture.depth / 8) == 0);
-        }
-    }
+    vex_util::mfc::DumpBitmap(canvas.bitmap(), CString(("/proc/self/fd/" + std::to_string(file)).c_str()));
+    const std::size_t start = 54 + (picture.depth <= 8 ? std::size_t{4} << picture.depth : 0);
+    Bytes bytes(start + packed(picture, 32).size() + 1);
+    require(pread(file, bytes.data(), bytes.size(), 0) == static_cast<ssize_t>(bytes.size()) - 1 &&
+            bytes[0] == 'B');
+    const Picture rows = unpacked(&bytes[start], picture.width, picture.height, picture.depth, 32);
+    on(const_cast<Picture&>(rows), {0, 0, picture.width, picture.height},
+       [&](int x, int y, std::uint32_t& value) {
+           const std::uint32_t stored = picture.at(x, picture.height - 1 - y);
+           require(value == (picture.depth == 32 ? stored & 0xFFFFFF : stored));
+       });
 }
 
-void check_region(Picture& picture, Input& input) {
-    CDC dc;
-    require(dc.CreateCompatibleDC(nullptr) != 0);
-    const int x = input.byte() % picture.width;
-    const int y = input.byte() % picture.height;
-    HGDIOBJ const before = SelectObject(dc, picture.bitmap);
-    const COLORREF colour = GetPixel(dc, x, y);
-    SelectObject(dc, before);
+void check_region(Canvas& canvas, const Picture& picture, COLORREF key) {
     CRgn region;
-    require(vex_util::mfc::RegionFromBitmap(region, picture.bitmap, colour));
-    // A pixel whose unused bits are set is of no colour; elsewhere it is not in the region of its own.
-    if (picture.depth != 16 && picture.depth != 32) {
-        require(PtInRegion(static_cast<HRGN>(region.GetSafeHandle()), x, y) == 0);
+    require(vex_util::mfc::RegionFromBitmap(region, canvas.bitmap(), key));
+    Picture words = picture;
+    for (std::uint32_t& value : words.pixels) {
+        value = picture.depth == 16 || picture.depth == 32 ? value
+                                                           : value_of(32, colour_of(picture.depth, value));
     }
-    CRgn other;
-    static_cast<void>(vex_util::mfc::RegionFromBitmap(other, picture.bitmap, input.word()));
-    RECT box = {};
-    GetRgnBox(static_cast<HRGN>(region.GetSafeHandle()), &box);
-    require(box.left >= 0 && box.top >= 0 && box.right <= picture.width && box.bottom <= picture.height);
+    require(holds(region, words, value_of(picture.depth == 16 ? 16 : 32, key)));
 }
 
-void check_turn(Picture& picture, Input& input) {
+void check_rotation(Canvas& canvas, const Picture& picture, float angle) {
     CDC dc;
-    require(dc.CreateCompatibleDC(nullptr) != 0);
-    const float angle = input.factor() * 90;
-    const bool turned = vex_util::mfc::RotateBitmap(&dc, &picture.bitmap, angle);
-    require(turned == (std::isfinite(angle) && angle != 0));
-    BITMAP record = {};
-    require(GetObjectW(picture.bitmap, sizeof record, &record) != 0);
-    require(record.bmWidth == picture.width && record.bmHeight == picture.height);
+    dc.CreateCompatibleDC(nullptr);
+    require(vex_util::mfc::RotateBitmap(&dc, &canvas.bitmap(), angle) ==
+            (std::isfinite(angle) && angle != 0));
+    if (!std::isfinite(angle) || angle == 0) {
+        return require(canvas.picture() == picture);
+    }
+    Settings turned;
+    turned.world = turn_about(static_cast<double>(angle), picture.width / 2, picture.height / 2);
+    const Picture ground(picture.width, picture.height, picture.depth, value_of(picture.depth, 0x008080));
+    const Picture result = canvas.picture();
+    Picture expected = ground;
+    std::vector<std::pair<int, int>> open;
+    expected = copied(ground, {0, 0, picture.width, picture.height, 0, 0}, picture, SRCCOPY, turned, 0, 1e-3,
+                      [&](int x, int y) { open.emplace_back(x, y); });
+    for (const auto& [x, y] : open) {
+        expected.at(x, y) = result.at(x, y);
+    }
+    require(result == expected || std::fabs(angle) > 3600);  // where a turn in single precision is another
 }
 
-void draw(Picture& to, Picture& from, Input& input) {
-    CDC target;
-    CDC source;
-    require(target.CreateCompatibleDC(nullptr) != 0 && source.CreateCompatibleDC(nullptr) != 0);
-    HGDIOBJ const target_before = SelectObject(target, to.bitmap);
-    HGDIOBJ const source_before = SelectObject(source, from.bitmap);
-    for (int i = 0; i < 6 && !input.is_over(); ++i) {
-        const int left = input.coordinate(), top = input.coordinate();
-        const int right = input.coordinate(), bottom = input.coordinate();
-        if (input.byte() % 2 == 0) {
-            _gradientfill(target, left, top, right, bottom, input.coordinate(), input.word(), input.word(),
-                          input.factor(), input.byte() % 3);
-        } else {
-            _transparentblt(target, left, top, right, bottom, source, input.coordinate(), input.coordinate(),
-                            input.coordinate(), input.coordinate(), input.word());
+void check_drawing(Input& in) {
+    Picture to = drawn_picture(in);
+    const Picture from = drawn_picture(in);
+    Canvas canvas(to), source(from);
+    const RECT r = {in.coordinate(), in.coordinate(), in.coordinate(), in.coordinate()};
+    const int diameter = in.coordinate();
+    const COLORREF corner = in.word(), start = in.word();
+    const TRIVERTEX a = {r.left,
+                         r.top,
+                         static_cast<WORD>(GetRValue(start) << 8),
+                         static_cast<WORD>(GetGValue(start) << 8),
+                         static_cast<WORD>(GetBValue(start) << 8),
+                         0};
+    TRIVERTEX b = a;
+    b.x = r.right, b.y = r.bottom, b.Red /= 2, b.Green /= 2, b.Blue /= 2;
+    _gradientfill(canvas, r.left, r.top, r.right, r.bottom, diameter, corner, start, 2.0F, in.byte() % 2);
+    Picture across = to, down = to;
+    gradient(across, a, b, true);
+    gradient(down, a, b, false);
+    for (Picture* const p : {&across, &down}) {
+        const std::uint32_t value = value_of(p->depth, corner);
+        if (diameter > 0 && value != value_of(p->depth, 0x808080)) {
+            on(*p, r, [&](int x, int y, std::uint32_t& pixel) {
+                pixel = is_in_rounded(r, diameter, diameter, x, y) ? pixel : value;
+            });
         }
     }
-    SelectObject(source, source_before);
-    SelectObject(target, target_before);
+    const Picture filled = canvas.picture();
+    require(filled == across || filled == down);
+    const Stretch s = {in.coordinate(), in.coordinate(), in.byte(), in.byte(),
+                       in.coordinate(), in.coordinate(), in.byte(), in.byte()};
+    require(_transparentblt(canvas, s.x, s.y, s.width, s.height, source, s.source_x, s.source_y,
+                            s.source_width, s.source_height, start) == 1);
+    require(canvas.picture() == keyed(filled, s, from, start));
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     _operatingsystem();
-    Input input(data, size);
-    Picture picture(input);
-    Picture other(input);
-    draw(picture, other, input);
-    check_region(picture, input);
-    check_file(picture);
-    check_turn(picture, input);
-    ColorPalette palette;
-    const std::uint32_t colour = input.word();
-    const std::uint32_t known = palette[input.byte()];
-    require(palette[palette.FindClosestColor(known)] == known);
-    static_cast<void>(palette.FindClosestColor(colour) + _complementarycolor(colour));
+    Input in(data, size);
+    check_drawing(in);
+    const float angle = in.factor() * 90;
+    const COLORREF key = in.word();
+    const Picture picture = drawn_picture(in);
+    Canvas canvas(picture);
+    canvas.deselect();
+    check_file(canvas, picture);
+    check_region(canvas, picture, key);
+    check_region(canvas, picture, colour_of(picture.depth, picture.pixels[0]));
+    check_rotation(canvas, picture, angle);
+    canvas.select();
     return 0;
 }

@@ -17,7 +17,7 @@ if [ ! -f "$root/ready" ]; then
     suite=$(. /etc/os-release && echo "$VERSION_CODENAME")
     mirror=$(apt-get indextargets --format '$(SITE)' 'Created-By: Packages' | awk '!/security/ && !found++')
     "${as_root[@]}" debootstrap --variant=minbase \
-        --include=ca-certificates,cmake,g++,libpixman-1-dev,ninja-build,pkg-config "$suite" "$root" "$mirror" \
+        --include=ca-certificates,cmake,g++,ninja-build,pkg-config "$suite" "$root" "$mirror" \
         >build/debian-root.log 2>&1 || { tail -n 20 build/debian-root.log; exit 1; }
     "${as_root[@]}" touch "$root/ready"
 fi

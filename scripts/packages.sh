@@ -45,7 +45,8 @@ build_with_progress() {  # what is built, arguments of cmake --build; one line o
     } >&2
 }
 
-BUILD_PACKAGES=(g++ cmake ninja-build pkg-config libpixman-1-dev)
+BUILD_PACKAGES=(g++ cmake ninja-build pkg-config)
 TEST_PACKAGES=(libgtest-dev locales)
 PEER_PACKAGES=(libbenchmark-dev libabsl-dev libopenvdb-dev libtbb-dev libboost1.81-dev libgeos-dev
-    libspatialindex-dev libgeographiclib-dev libproj-dev libspdlog-dev libcairo2-dev)
+    libspatialindex-dev libgeographiclib-dev libproj-dev libspdlog-dev libcairo2-dev
+    libpixman-1-dev)

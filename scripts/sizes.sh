@@ -17,9 +17,8 @@ done
 
 program() {  # name, headers, statement: a program whose library parts are linked in
     printf '%s\nint main(int count, char**) { %s }\n' "$2" "$3" >"$work/$1.cpp"
-    # shellcheck disable=SC2046  # the flags are words
     g++ -std=c++17 -O2 -Iinclude -I$work/OFF/include "$work/$1.cpp" -o "$work/$1" -Wl,--gc-sections -s \
-        $work/OFF/src/libbasalt.a $(pkg-config --libs pixman-1)
+        $work/OFF/src/libbasalt.a
 }
 sections() { size "$1" | awk 'NR == 2 { print $1, $2, $3 }'; }
 

@@ -4,7 +4,6 @@ With BASALT_LIBRARY set to a build folder of the library, static and released, t
 """
 import os
 import pathlib
-import shlex
 import subprocess
 
 import numpy
@@ -33,11 +32,6 @@ class BuildWithLibrary(build_ext):
         super().run()
 
 
-def words_of_pkg_config(option):
-    return shlex.split(subprocess.run(["pkg-config", option, "pixman-1"], check=True, capture_output=True,
-                                      text=True).stdout)
-
-
 ParallelCompile(default=os.cpu_count()).install()
 setup(
     ext_modules=[Extension(
@@ -49,8 +43,7 @@ setup(
                       numpy.get_include()],
         extra_compile_args=["-std=c++20", "-O3", "-ffp-contract=off", "-fvisibility=hidden", "-Wall", "-Wextra"],
         # The library's own symbols stay inside: a host that has loaded another basalt would otherwise lend its own.
-        extra_link_args=[f"-Wl,--version-script={HERE / 'src' / 'exported.map'}", str(LIBRARY / "src" / "libbasalt.a"),
-                         *words_of_pkg_config("--libs")],
+        extra_link_args=[f"-Wl,--version-script={HERE / 'src' / 'exported.map'}", str(LIBRARY / "src" / "libbasalt.a")],
     )],
     cmdclass={"build_ext": BuildWithLibrary},
     options={"build": {"build_base": str(WORK)}, "egg_info": {"egg_base": str(WORK)}},

@@ -5,8 +5,8 @@
 #ifndef BASALT_GRAPHICS_H
 #define BASALT_GRAPHICS_H
 
-#include "basalt/graphics/bitmap.h"
-#include "basalt/graphics/drawing.h"
+#include "basalt/graphics/bitmap_functions.h"
+#include "basalt/graphics/drawing_functions.h"
 #include "basalt/graphics/palette.h"
 
 #endif

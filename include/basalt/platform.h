@@ -12,6 +12,7 @@
 #include "basalt/platform/error.h"
 #include "basalt/platform/graphics_objects.h"
 #include "basalt/platform/graphics_types.h"
+#include "basalt/platform/rectangles.h"
 #include "basalt/platform/region.h"
 #include "basalt/platform/text_types.h"
 #include "basalt/platform/types.h"

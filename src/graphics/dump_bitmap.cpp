@@ -3,7 +3,7 @@
 #include <new>
 #include <optional>
 
-#include "basalt/graphics/bitmap.h"
+#include "basalt/graphics/bitmap_functions.h"
 #include "src/frame/codec_guard.h"
 #include "src/platform/codec.h"
 
@@ -31,7 +31,7 @@ std::optional<CLSID> bmp_encoder() {
     if (GdipGetImageEncodersSize(&count, &bytes) != Gdiplus::Ok) {
         return std::nullopt;
     }
-    // In whole records, for their alignment; texts may stand behind the last.
+    // In whole records, for their alignment; texts may follow the last.
     const std::size_t records = (bytes + sizeof(ImageCodecInfo) - 1) / sizeof(ImageCodecInfo);
     const std::unique_ptr<ImageCodecInfo[]> encoders(new (std::nothrow) ImageCodecInfo[records]);
     if (encoders == nullptr || GdipGetImageEncoders(count, bytes, encoders.get()) != Gdiplus::Ok) {

@@ -1,67 +1,108 @@
 #include <algorithm>
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <limits>
 #include <span>
-#include <vector>
 
-#include "basalt/graphics/bitmap.h"
-#include "src/graphics/dib_rows.h"
-#include "src/graphics/opaque_runs.h"
-#include "src/graphics/screen_context.h"
-#include "src/platform/pixel_format.h"
-#include "src/platform/region_rectangles.h"
+#include "basalt/graphics/bitmap_functions.h"
+#include "src/platform/raster_extras.h"
+
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
 
 namespace basalt::graphics {
 
 namespace {
 
-/// Bytes of rows read at a time: they stay in the cache, and a large bitmap needs no copy as large.
-constexpr std::size_t STRIP_BYTES = 65536;
+/// Pixels that are compared with the key at a time, a bit of a word each.
+constexpr std::size_t WORD_BITS = 64;
+/// Pixels read at a time, on the stack: a bitmap may have a row of 2^31 pixels.
+constexpr std::size_t PIECE = 64 * WORD_BITS;
 
-std::uint32_t key_of(COLORREF colour, std::uint32_t) {
-    return platform::word_of_colour(colour);
+/// One bit a pixel, the first in bit 0: whether it differs from the key.
+std::uint64_t opaque_bits(std::span<const std::uint32_t> pixels, std::uint32_t key) {
+    std::uint64_t bits = 0;
+    for (std::size_t i = 0; i < pixels.size(); ++i) {
+        bits |= std::uint64_t{pixels[i] != key} << i;
+    }
+    return bits;
 }
 
-/// The code that drawing in the colour stores: a background filled with it is of it.
-std::uint16_t key_of(COLORREF colour, std::uint16_t) {
-    return static_cast<std::uint16_t>(platform::value_of_colour(16, colour));
+/// The same for 64 pixels.
+std::uint64_t opaque_word(const std::uint32_t* pixels, std::uint32_t key) {
+#if defined(__SSE2__)
+    const __m128i keys = _mm_set1_epi32(static_cast<int>(key));
+    const auto equal = [keys](const std::uint32_t* four) {
+        return _mm_cmpeq_epi32(_mm_loadu_si128(reinterpret_cast<const __m128i*>(four)), keys);
+    };
+    std::uint64_t equal_bits = 0;
+    for (std::size_t i = 0; i < WORD_BITS; i += 16) {
+        const std::uint32_t* const at = pixels + i;
+        const __m128i low = _mm_packs_epi32(equal(at), equal(at + 4));
+        const __m128i high = _mm_packs_epi32(equal(at + 8), equal(at + 12));
+        const auto bits = static_cast<unsigned>(_mm_movemask_epi8(_mm_packs_epi16(low, high)));
+        equal_bits |= std::uint64_t{bits} << i;
+    }
+    return ~equal_bits;
+#else
+    return opaque_bits(std::span(pixels, WORD_BITS), key);
+#endif
 }
 
-/// Appends the runs of all rows; neighbouring rows that are alike give one rectangle a run.
-/// @return false when the bitmap cannot be read
-template <class Pixel>
-bool gather_runs(HBITMAP bitmap, const BITMAP& record, COLORREF transparent, std::vector<RECT>& rectangles) {
-    constexpr WORD DEPTH = 8 * sizeof(Pixel);
-    const auto key = key_of(transparent, Pixel());
-    const auto width = static_cast<std::size_t>(record.bmWidth);
-    const std::size_t stride = row_bytes(record.bmWidth, DEPTH) / sizeof(Pixel);
-    const int strip_rows = static_cast<int>(std::clamp<std::size_t>(
-        STRIP_BYTES / sizeof(Pixel) / stride, 1, static_cast<std::size_t>(record.bmHeight)));
-    std::vector<Pixel> strip(stride * static_cast<std::size_t>(strip_rows));
-    std::vector<std::uint64_t> mask(mask_words(width));
-    std::vector<std::uint64_t> band(mask_words(width));  // the rows from band_top on; none opaque at first
-    int band_top = 0;
-    BITMAPINFO info = {top_down_header(record, DEPTH), {}};
-    const ScreenContext screen;
-    for (int row = 0; row < record.bmHeight; ++row) {
-        const int in_strip = row % strip_rows;
-        if (in_strip == 0) {
-            const int rows = std::min(strip_rows, record.bmHeight - row);
-            if (::GetDIBits(screen.dc(), bitmap, static_cast<UINT>(row), static_cast<UINT>(rows),
-                            strip.data(), &info, DIB_RGB_COLORS) != rows) {
-                return false;
-            }
-        }
-        mask_opaque(std::span<const Pixel>(strip.data() + stride * static_cast<std::size_t>(in_strip), width),
-                    key, mask.data());
-        if (mask != band) {
-            append_runs(band, band_top, row, rectangles);
-            band.swap(mask);
-            band_top = row;
+/// Adds the runs of one row of opaque pixels, given 64 at a time, to a band.
+class RunCollector {
+public:
+    explicit RunCollector(platform::BandBuilder& band) : m_band(band) {}
+
+    /// The next pixels, from a column on; bits behind the row's end are 0.
+    void add(int column, std::uint64_t opaque) {
+        // A bit wherever a pixel differs from the one before.
+        std::uint64_t changes = opaque ^ (opaque << 1 | std::uint64_t{m_is_open});
+        for (; changes != 0; changes &= changes - 1) {
+            toggle(column + std::countr_zero(changes));
         }
     }
-    append_runs(band, band_top, record.bmHeight, rectangles);
+    void end_row(int width) {
+        if (m_is_open) {
+            toggle(width);
+        }
+    }
+
+private:
+    void toggle(int column) {
+        if (m_is_open) {
+            m_band.add(m_left, column);
+        }
+        m_left = column;
+        m_is_open = !m_is_open;
+    }
+
+    platform::BandBuilder& m_band;
+    bool m_is_open = false;
+    int m_left = 0;
+};
+
+/// Adds the runs of a row; false when it cannot be read.
+bool add_row(HBITMAP bitmap, int row, int width, std::uint32_t key, platform::BandBuilder& band) {
+    RunCollector runs(band);
+    std::uint32_t pixels[PIECE];
+    for (int column = 0; column < width;) {
+        const std::size_t size = std::min(PIECE, static_cast<std::size_t>(width - column));
+        if (!platform::read_row(bitmap, row, column, std::span(pixels, size))) {
+            return false;
+        }
+        std::size_t i = 0;
+        for (; i + WORD_BITS <= size; i += WORD_BITS) {
+            runs.add(column + static_cast<int>(i), opaque_word(pixels + i, key));
+        }
+        if (i < size) {
+            runs.add(column + static_cast<int>(i), opaque_bits(std::span(pixels + i, size - i), key));
+        }
+        column += static_cast<int>(size);
+    }
+    runs.end_row(width);
     return true;
 }
 
@@ -72,18 +113,22 @@ bool gather_runs(HBITMAP bitmap, const BITMAP& record, COLORREF transparent, std
 namespace vex_util::mfc {
 
 bool RegionFromBitmap(CRgn& region, CBitmap& bitmap, unsigned long transparentColour) {
-    using namespace basalt::graphics;
     BITMAP record = {};
     if (region.GetSafeHandle() != nullptr || transparentColour > std::numeric_limits<COLORREF>::max() ||
         bitmap.GetBitmap(&record) == 0) {
         return false;
     }
-    const auto transparent = static_cast<COLORREF>(transparentColour);
-    std::vector<RECT> rectangles;
-    const bool is_read = record.bmBitsPixel == 16
-                             ? gather_runs<std::uint16_t>(bitmap, record, transparent, rectangles)
-                             : gather_runs<std::uint32_t>(bitmap, record, transparent, rectangles);
-    return is_read && region.Attach(basalt::platform::create_region(rectangles)) != 0;
+    const std::uint32_t key =
+        basalt::platform::row_value(record.bmBitsPixel, static_cast<COLORREF>(transparentColour));
+    basalt::platform::BandBuilder rows;
+    for (int row = 0; row < record.bmHeight; ++row) {
+        rows.begin(row, row + 1);
+        if (!basalt::graphics::add_row(bitmap, row, record.bmWidth, key, rows)) {
+            return false;
+        }
+        rows.end();
+    }
+    return region.Attach(basalt::platform::create_region(rows.take())) != 0;
 }
 
 }  // namespace vex_util::mfc

@@ -1,26 +1,25 @@
 #include <cmath>
 
 #include "basalt/geo/units.h"
-#include "basalt/graphics/bitmap.h"
+#include "basalt/graphics/bitmap_functions.h"
 #include "basalt/platform/drawing.h"
 #include "src/geo/elementary/elementary.h"
-#include "src/graphics/memory_surface.h"
-#include "src/graphics/solid_brush.h"
+#include "src/graphics/owned_objects.h"
 
 namespace basalt::graphics {
 
 namespace {
 
-/// What nothing turns into: red 128, green 128, blue 0.
+/// Where no source pixel comes: red 128, green 128, blue 0.
 constexpr COLORREF UNCOVERED = 0x008080;
 
 bool fill(HDC dc, int width, int height, COLORREF colour) {
-    const SolidBrush brush(colour);
+    const CBrush brush(colour);
     const RECT all = {0, 0, width, height};
-    return brush.is_ready() && FillRect(dc, &all, brush.get()) != 0;
+    return FillRect(dc, &all, brush) != 0;
 }
 
-/// Copies a picture turned clockwise about the middle, on a surface that takes a transform.
+/// Copies a picture turned clockwise about the middle, to a context in GM_ADVANCED.
 bool copy_turned(HDC to, HDC from, int width, int height, float degrees) {
     const int middle_column = width / 2;
     const int middle_row = height / 2;
@@ -33,7 +32,7 @@ bool copy_turned(HDC to, HDC from, int width, int height, float degrees) {
     const XFORM to_middle = {1.0F, 0.0F, 0.0F, 1.0F, x, y};
     const XFORM rotation = {cosine, sine, -sine, cosine, 0.0F, 0.0F};
     const XFORM from_middle = {1.0F, 0.0F, 0.0F, 1.0F, -x, -y};
-    // Each multiplication from the left comes before what is there: the last one meets a point first.
+    // Each is multiplied from the left, so the last one is applied to a point first.
     return SetWorldTransform(to, &to_middle) != 0 &&
            ModifyWorldTransform(to, &rotation, MWT_LEFTMULTIPLY) != 0 &&
            ModifyWorldTransform(to, &from_middle, MWT_LEFTMULTIPLY) != 0 &&

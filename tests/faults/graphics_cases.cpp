@@ -43,7 +43,6 @@ void check_object(const char* operation, Create create) {
 
 void check_objects() {
     check_object("CreateSolidBrush", [] { return CreateSolidBrush(0x102030); });
-    check_object("CreatePen", [] { return CreatePen(PS_SOLID, 1, 0x102030); });
     check_object("CreateBitmap", [] { return CreateBitmap(100, 100, 1, 24, nullptr); });
     check_object("CreateRectRgn", [] { return CreateRectRgn(1, 2, 3, 4); });
     check("CreateCompatibleDC, CreateCompatibleBitmap", [](Trial& t) {
@@ -96,7 +95,9 @@ void check_drawing() {
         };
         t.expect(t.attempt(draw) || t.struck(), "0 only for a failure");
         ModifyWorldTransform(surface.dc, nullptr, MWT_IDENTITY);
-        t.expect(draw() && GetPixel(surface.dc, 5, 5) == 0xFF, "drawn afterwards");
+        const bool drawn = draw();
+        ModifyWorldTransform(surface.dc, nullptr, MWT_IDENTITY);
+        t.expect(drawn && GetPixel(surface.dc, 10, 10) == 0xFF, "drawn afterwards");
     });
     check("_gradientfill, _transparentblt", [](Trial& t) {
         _operatingsystem();

@@ -1,24 +1,23 @@
+#include "basalt/graphics/palette.h"
+
 #include <gtest/gtest.h>
 
 #include <array>
-#include <cstdint>
 #include <cstdlib>
 #include <random>
 #include <vector>
 
-#include "basalt/graphics.h"
 #include "src/graphics/closest_colour.h"
 
 namespace {
 
 using Colours = std::array<std::uint32_t, 256>;
 
-int channel(std::uint32_t colour, int shift) {
-    return static_cast<int>(colour >> shift & 0xFF);
-}
-
-/// The search as a scan from the first colour to the last.
+// The search as a scan from the first colour to the last.
 int plain_closest(const Colours& colours, std::uint32_t wanted) {
+    const auto channel = [](std::uint32_t colour, int shift) {
+        return static_cast<int>(colour >> shift & 0xFF);
+    };
     int best = 300;
     int candidate = 0;
     for (int i = 0; i < 256; ++i) {
@@ -44,24 +43,21 @@ Colours colours_of(const ColorPalette& palette) {
     return colours;
 }
 
-TEST(DefaultPalette, IsMadeOfBasicColoursHuesAndGreys) {
+TEST(DefaultPalette, is_made_of_basic_colours_hues_and_greys) {
     std::vector<std::uint32_t> expected = {0x0000FF, 0x00FFFF, 0x00FF00, 0xFFFF00, 0xFF0000,
                                            0xFF00FF, 0xFFFFFF, 0x808080, 0xC0C0C0};
-    // From red to yellow, green, cyan, blue, magenta and back: one channel leads, and a second one goes up or
-    // down by quarters of it. Each of five levels comes in the full colour and, after it, with the other
-    // channels halfway to the leading one, all cut to whole numbers.
-    const struct {
-        int leading, moving;  // places of the channels' bits
-    } sixths[] = {{0, 8}, {8, 0}, {8, 16}, {16, 8}, {16, 0}, {0, 16}};
+    // From red to yellow, green, cyan, blue, magenta and back: one channel leads, a second one rises or falls
+    // by quarters. Each of five levels comes full and then with the other channels halfway to the leading
+    // one, truncated.
+    const int sixths[][2] = {{0, 8}, {8, 0}, {8, 16}, {16, 8}, {16, 0}, {0, 16}};
     for (int group = 0; group < 24; ++group) {
         const auto [leading, moving] = sixths[group / 4];
         const int quarters = group / 4 % 2 == 0 ? group % 4 : 4 - group % 4;
         for (const int level : {255, 204, group < 4 ? 153 : 152, 127, 76}) {
             const int rise = level * quarters / 4;
-            const int full = level << leading | rise << moving;
             const int paler =
                 level << leading | (rise + level) / 2 << moving | level / 2 << (24 - leading - moving);
-            expected.push_back(static_cast<std::uint32_t>(full));
+            expected.push_back(static_cast<std::uint32_t>(level << leading | rise << moving));
             expected.push_back(static_cast<std::uint32_t>(paler));
         }
     }
@@ -73,57 +69,32 @@ TEST(DefaultPalette, IsMadeOfBasicColoursHuesAndGreys) {
     EXPECT_EQ(ColorPalette()[9], colours[9]);
 }
 
-TEST(Palette, SaysItsRanges) {
-    EXPECT_EQ(ColorPalette::GetSize(), 256U);
-    EXPECT_EQ(ColorPalette()[ColorPalette::GetWhiteColorIndex()], 0xFFFFFFU);
-    EXPECT_EQ(ColorPalette::GetSecondPaletteStartIndex(), 0);
-    EXPECT_EQ(ColorPalette::GetSecondPaletteEndIndex() + 1, ColorPalette::GetLargePaletteStartIndex());
-    EXPECT_EQ(ColorPalette::GetLargePaletteStartIndex() + 24 * 10, ColorPalette::GetThirdPaletteStartIndex());
-    EXPECT_EQ(ColorPalette::GetLargePaletteEndIndex() + 1, ColorPalette::GetThirdPaletteStartIndex());
-    EXPECT_EQ(ColorPalette::GetThirdPaletteEndIndex(), 254);
-    static_assert(sizeof(ColorPalette) == 1024);
+TEST(Palette, has_fixed_ranges) {
+    using P = ColorPalette;
+    const int bounds[] = {P::GetSecondPaletteStartIndex(), P::GetSecondPaletteEndIndex(),
+                          P::GetLargePaletteStartIndex(),  P::GetLargePaletteEndIndex(),
+                          P::GetThirdPaletteStartIndex(),  P::GetThirdPaletteEndIndex()};
+    const int expected[] = {0, 8, 9, 248, 249, 254};
+    EXPECT_TRUE(std::equal(bounds, bounds + 6, expected));
+    EXPECT_TRUE(P::GetSize() == 256 && P::GetWhiteColorIndex() == 6 && sizeof(P) == 1024);
 }
 
-TEST(Palette, GoesThroughMemory) {
-    Colours colours = {};
-    for (std::uint32_t i = 0; i < 256; ++i) {
-        colours[i] = i * 0x01010101U;
-    }
-    ColorPalette palette;
-    palette.FromMemory(colours.data());
-    ColorPalette other;
-    other = palette;
-    EXPECT_EQ(colours_of(other), colours);
-    EXPECT_NE(colours_of(ColorPalette()), colours);
-}
-
-TEST(ClosestColour, IsTheFirstOfTheNearest) {
-    Colours colours;
-    colours.fill(0x01FFFFFF);
-    ColorPalette white;
-    white.FromMemory(colours.data());
-    EXPECT_EQ(white.FindClosestColor(0), 0);  // nothing nearer than the greatest distance
-    colours[7] = 0x02FFFFFF;
-    white.FromMemory(colours.data());
-    EXPECT_EQ(white.FindClosestColor(0x02FFFFFF), 7);  // entry 0 is at distance 0, 7 is equal
-}
-
-TEST(ClosestColour, AgreesWithTheScan) {
+TEST(ClosestColour, is_that_of_the_scan) {
     std::mt19937 random(17);
     SCOPED_TRACE("seed 17");
     for (int round = 0; round < 400; ++round) {
-        ColorPalette palette;
+        ColorPalette palette, copy;
+        Colours colours = colours_of(palette);
         if (round % 2 == 1) {
             // Few levels make equal distances and equal colours common; the high byte counts for equality
             // alone.
             const std::uint32_t mask = round % 4 == 1 ? 0x01030303U : 0x80FFFFFFU;
-            Colours colours = {};
-            for (std::uint32_t& colour : colours) {
-                colour = static_cast<std::uint32_t>(random()) & mask;
-            }
+            std::generate(colours.begin(), colours.end(),
+                          [&] { return static_cast<std::uint32_t>(random()) & mask; });
             palette.FromMemory(colours.data());
         }
-        const Colours colours = colours_of(palette);
+        copy = palette;
+        ASSERT_EQ(colours_of(copy), colours);
         for (int i = 0; i < 200; ++i) {
             const auto drawn = static_cast<std::uint32_t>(random());
             const std::uint32_t wanted =
@@ -133,14 +104,18 @@ TEST(ClosestColour, AgreesWithTheScan) {
             ASSERT_EQ(basalt::graphics::closest_colour_portable(colours.data(), wanted), expected);
         }
     }
+    Colours far;
+    far.fill(0xFFFFFF);
+    ColorPalette white;
+    white.FromMemory(far.data());
+    EXPECT_EQ(white.FindClosestColor(0), 0) << "nothing nearer than the greatest distance";
 }
 
-TEST(ComplementaryColour, IsDarkOverLight) {
-    EXPECT_EQ(_complementarycolor(0x808080), 0xFFFFFFU);
+TEST(ComplementaryColour, is_dark_over_light) {
+    EXPECT_TRUE(_complementarycolor(0x808080) == 0xFFFFFF && _complementarycolor(0xFF000000) == 0xFFFFFF);
     for (const std::uint32_t lighter : {0x818080U, 0x808180U, 0x808081U}) {
         EXPECT_EQ(_complementarycolor(lighter), 0x505050U);
     }
-    EXPECT_EQ(_complementarycolor(0xFF000000), 0xFFFFFFU);
 }
 
 }  // namespace

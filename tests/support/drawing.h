@@ -1,16 +1,15 @@
-// Pictures and surfaces for tests: pixels taken apart, and copies and shapes made, without the library's
-// help.
+// The picture model: what each drawing call makes of a picture, pixel by pixel and without the library's
+// help, and surfaces of the library to compare with. Shared by tests and fuzz targets.
 #ifndef BASALT_TESTS_SUPPORT_DRAWING_H
 #define BASALT_TESTS_SUPPORT_DRAWING_H
 
-#include <gtest/gtest.h>
-
 #include <algorithm>
+#include <array>
 #include <cmath>
 #include <cstdint>
+#include <cstdlib>
 #include <cstring>
 #include <numbers>
-#include <random>
 #include <vector>
 
 #include "basalt/platform.h"
@@ -18,86 +17,81 @@
 namespace drawing {
 
 inline constexpr int DEPTHS[] = {1, 4, 8, 16, 24, 32};
+using Bytes = std::vector<unsigned char>;
 
-/// Colours, or values as a bitmap stores them, row by row.
+constexpr std::uint32_t all_ones(int depth) {
+    return depth == 32 ? 0xFFFFFFFFU : (1U << depth) - 1U;
+}
+// Without the bits that mean nothing.
+constexpr std::uint32_t colour_bits(int depth, std::uint32_t value) {
+    return value & (depth == 16 ? 0x7FFF : all_ones(depth) & 0xFFFFFF);
+}
+
+// Values as a bitmap stores them, row by row.
 struct Picture {
-    int width;
-    int height;
+    int width, height, depth;
     std::vector<std::uint32_t> pixels;
 
-    Picture(int its_width, int its_height, std::uint32_t pixel = 0)
+    Picture(int its_width, int its_height, int its_depth, std::uint32_t value = 0)
         : width(its_width),
           height(its_height),
-          pixels(static_cast<std::size_t>(its_width) * static_cast<std::size_t>(its_height), pixel) {}
-
+          depth(its_depth),
+          pixels(static_cast<std::size_t>(its_width) * static_cast<std::size_t>(its_height), value) {}
     bool has(std::int64_t x, std::int64_t y) const { return x >= 0 && y >= 0 && x < width && y < height; }
-    std::uint32_t& at(std::int64_t x, std::int64_t y) {
-        return pixels[static_cast<std::size_t>(y * width + x)];
+    std::size_t index(std::int64_t x, std::int64_t y) const {
+        return static_cast<std::size_t>(y * width + x);
     }
-    std::uint32_t at(std::int64_t x, std::int64_t y) const {
-        return pixels[static_cast<std::size_t>(y * width + x)];
-    }
+    std::uint32_t& at(std::int64_t x, std::int64_t y) { return pixels[index(x, y)]; }
+    std::uint32_t at(std::int64_t x, std::int64_t y) const { return pixels[index(x, y)]; }
     friend bool operator==(const Picture&, const Picture&) = default;
 };
 
-inline std::uint32_t all_ones(int depth) {
-    return depth == 32 ? 0xFFFFFFFFU : (1U << depth) - 1U;
-}
-
-/// White as a bitmap stores it; what 32 bits do not use is 0.
-inline std::uint32_t white(int depth) {
-    return depth == 16 ? 0x7FFF : all_ones(depth) & 0xFFFFFF;
-}
-
-inline Picture random_picture(int width, int height, int depth, std::mt19937& random) {
-    Picture picture(width, height);
-    for (std::uint32_t& value : picture.pixels) {
-        value = static_cast<std::uint32_t>(random()) & all_ones(depth);
-    }
+template <class Next>
+Picture random_picture(int width, int height, int depth, Next next) {
+    Picture picture(width, height, depth);
+    std::generate(picture.pixels.begin(), picture.pixels.end(),
+                  [&] { return static_cast<std::uint32_t>(next()) & all_ones(depth); });
     return picture;
 }
 
-/// Rows with a padding of `align` bits, bit by bit: pixels follow each other from a byte's highest bit on
-/// when they are smaller than one, and have their lowest byte first when they are larger.
-inline std::vector<unsigned char> packed(const Picture& picture, int depth, int align) {
-    const int row_bytes = (picture.width * depth + align - 1) / align * align / 8;
-    std::vector<unsigned char> bytes(static_cast<std::size_t>(row_bytes * picture.height));
-    for (int y = 0; y < picture.height; ++y) {
-        for (int x = 0; x < picture.width; ++x) {
-            for (int bit = 0; bit < depth; ++bit) {
-                const bool is_set = (picture.at(x, y) >> bit & 1) != 0;
-                const int place = x * depth + (depth < 8 ? depth - 1 - bit : bit);
-                const int shift = depth < 8 ? 7 - place % 8 : place % 8;
-                auto& byte = bytes[static_cast<std::size_t>(y * row_bytes + place / 8)];
-                byte = static_cast<unsigned char>(byte | (is_set ? 1 : 0) << shift);
-            }
-        }
+inline int row_bytes(int width, int depth, int align) {
+    return (width * depth + align - 1) / align * align / 8;
+}
+
+// Calls visit(pixel, bit, byte, shift) for each bit in rows padded to `align` bits: pixels follow each other
+// from a byte's highest bit on when smaller than one, and have their lowest byte first when larger.
+template <class Visit>
+void for_each_bit(const Picture& p, int align, const Visit& visit) {
+    for (int i = 0; i < p.width * p.height * p.depth; ++i) {
+        const int pixel = i / p.depth, bit = i % p.depth;
+        const int place = pixel % p.width * p.depth + (p.depth < 8 ? p.depth - 1 - bit : bit);
+        const int byte = pixel / p.width * row_bytes(p.width, p.depth, align) + place / 8;
+        visit(static_cast<std::size_t>(pixel), bit, static_cast<std::size_t>(byte),
+              p.depth < 8 ? 7 - place % 8 : place % 8);
     }
+}
+
+inline Bytes packed(const Picture& picture, int align) {
+    Bytes bytes(static_cast<std::size_t>(row_bytes(picture.width, picture.depth, align) * picture.height));
+    for_each_bit(picture, align, [&](std::size_t pixel, int bit, std::size_t byte, int shift) {
+        bytes[byte] = static_cast<unsigned char>(bytes[byte] | (picture.pixels[pixel] >> bit & 1U) << shift);
+    });
     return bytes;
 }
 
-inline Picture unpacked(const std::vector<unsigned char>& bytes, int width, int height, int depth,
-                        int align) {
-    const int row_bytes = (width * depth + align - 1) / align * align / 8;
-    Picture picture(width, height);
-    for (int y = 0; y < height; ++y) {
-        for (int x = 0; x < width; ++x) {
-            for (int bit = 0; bit < depth; ++bit) {
-                const int place = x * depth + (depth < 8 ? depth - 1 - bit : bit);
-                const int shift = depth < 8 ? 7 - place % 8 : place % 8;
-                const unsigned set = bytes[static_cast<std::size_t>(y * row_bytes + place / 8)] >> shift & 1U;
-                picture.at(x, y) |= set << bit;
-            }
-        }
-    }
+inline Picture unpacked(const unsigned char* bytes, int width, int height, int depth, int align) {
+    Picture picture(width, height, depth);
+    for_each_bit(picture, align, [&](std::size_t pixel, int bit, std::size_t byte, int shift) {
+        picture.pixels[pixel] |= (bytes[byte] >> shift & 1U) << bit;
+    });
     return picture;
 }
 
 struct DibHeader {
-    BITMAPINFOHEADER header;
-    RGBQUAD table[256];
+    BITMAPINFOHEADER header = {};
+    RGBQUAD table[256] = {};
 
-    DibHeader(int width, int height, int depth) : header(), table() {
+    DibHeader(int width, int height, int depth) {
         header.biSize = 40;
         header.biWidth = width;
         header.biHeight = height;
@@ -107,83 +101,99 @@ struct DibHeader {
     BITMAPINFO* info() { return reinterpret_cast<BITMAPINFO*>(this); }
 };
 
-/// A memory context with a bitmap of its own.
+// A memory context with a bitmap of its own.
 class Canvas {
 public:
-    Canvas(const Picture& picture, int its_depth)
-        : width(picture.width), height(picture.height), depth(its_depth), m_dc(CreateCompatibleDC(nullptr)) {
-        m_bitmap =
-            CreateBitmap(width, height, 1, static_cast<UINT>(depth), packed(picture, depth, 16).data());
+    explicit Canvas(const Picture& picture) : m_like(picture) {
+        m_bitmap.CreateBitmap(picture.width, picture.height, 1, static_cast<UINT>(picture.depth),
+                              packed(picture, 16).data());
+        m_dc.CreateCompatibleDC(nullptr);
         select();
     }
-    Canvas(int its_width, int its_height, int its_depth)
-        : Canvas(Picture(its_width, its_height), its_depth) {}
-    ~Canvas() {
-        deselect();
-        EXPECT_NE(DeleteObject(m_bitmap), 0);
-        EXPECT_NE(DeleteDC(m_dc), 0);
-    }
+    ~Canvas() { deselect(); }
     Canvas(const Canvas&) = delete;
     Canvas& operator=(const Canvas&) = delete;
 
     operator HDC() const { return m_dc; }
-    HBITMAP bitmap() const { return m_bitmap; }
-    void select() {
-        if (m_replaced == nullptr) {
-            m_replaced = SelectObject(m_dc, m_bitmap);
-            EXPECT_NE(m_replaced, nullptr);
-        }
-    }
-    void deselect() {
-        if (m_replaced != nullptr) {
-            EXPECT_EQ(SelectObject(m_dc, m_replaced), m_bitmap);
-            m_replaced = nullptr;
-        }
-    }
+    CDC& dc() { return m_dc; }
+    CBitmap& bitmap() { return m_bitmap; }
+    void select() { m_replaced = SelectObject(m_dc, m_bitmap); }
+    void deselect() { SelectObject(m_dc, m_replaced); }
+    // The bitmap as it is now.
     Picture picture() const {
-        std::vector<unsigned char> bytes(packed(Picture(width, height), depth, 32).size());
-        DibHeader dib(width, -height, depth);
-        EXPECT_EQ(
-            GetDIBits(m_dc, m_bitmap, 0, static_cast<UINT>(height), bytes.data(), dib.info(), DIB_RGB_COLORS),
-            height);
-        return unpacked(bytes, width, height, depth, 32);
+        Bytes bytes(packed(m_like, 32).size());
+        DibHeader dib(m_like.width, -m_like.height, m_like.depth);
+        if (GetDIBits(m_dc, m_bitmap, 0, static_cast<UINT>(m_like.height), bytes.data(), dib.info(),
+                      DIB_RGB_COLORS) != m_like.height) {
+            std::abort();
+        }
+        return unpacked(bytes.data(), m_like.width, m_like.height, m_like.depth, 32);
     }
-
-    const int width, height, depth;
 
 private:
-    HDC m_dc;
-    HBITMAP m_bitmap;
+    Picture m_like;
+    CBitmap m_bitmap;
+    CDC m_dc;
     HGDIOBJ m_replaced = nullptr;
 };
 
-/// Where a copy goes, and which part of a source it takes.
-struct Stretch {
-    int x, y, width, height, source_x, source_y, source_width, source_height;
-};
-
-inline Picture upside_down(const Picture& picture) {
-    Picture result = picture;
-    for (int y = 0; y < picture.height; ++y) {
-        for (int x = 0; x < picture.width; ++x) {
-            result.at(x, y) = picture.at(x, picture.height - 1 - y);
+// The colours of a depth's table, as the library writes it; tests hold facts about it.
+inline const std::vector<COLORREF>& table(int depth) {
+    static std::array<std::vector<COLORREF>, 9> tables;
+    std::vector<COLORREF>& colours = tables[static_cast<std::size_t>(depth)];
+    if (colours.empty()) {
+        Canvas canvas(Picture(1, 1, depth));
+        DibHeader dib(1, 1, depth);
+        GetDIBits(canvas, canvas.bitmap(), 0, 0, nullptr, dib.info(), DIB_RGB_COLORS);
+        for (std::size_t i = 0; i < std::size_t{1} << depth; ++i) {
+            colours.push_back(RGB(dib.table[i].rgbRed, dib.table[i].rgbGreen, dib.table[i].rgbBlue));
         }
     }
-    return result;
+    return colours;
 }
 
-/// Whether a pixel's middle lies in a rectangle whose corners are quarters of an ellipse; in half pixels.
-inline bool is_in_rounded(const RECT& r, int ellipse_width, int ellipse_height, std::int64_t x,
-                          std::int64_t y) {
-    const std::int64_t wide = std::min<std::int64_t>(ellipse_width, std::int64_t{r.right} - r.left);
-    const std::int64_t high = std::min<std::int64_t>(ellipse_height, std::int64_t{r.bottom} - r.top);
-    // From the nearest sides inwards, then to the middle of the corner's ellipse.
-    const std::int64_t in_x = std::min(2 * (x - r.left) + 1, 2 * (r.right - x) - 1);
-    const std::int64_t in_y = std::min(2 * (y - r.top) + 1, 2 * (r.bottom - y) - 1);
-    const std::int64_t dx = in_x - wide;
-    const std::int64_t dy = in_y - high;
-    return in_x >= 0 && in_y >= 0 &&
-           (dx >= 0 || dy >= 0 || dx * dx * high * high + dy * dy * wide * wide <= wide * wide * high * high);
+inline COLORREF colour_of(int depth, std::uint32_t value) {
+    const auto eight = [value](int shift) {
+        const int five = static_cast<int>(value >> shift & 0x1F);
+        return five << 3 | five >> 2;
+    };
+    return depth <= 8 ? table(depth)[value]
+           : depth == 16
+               ? RGB(eight(10), eight(5), eight(0))
+               : RGB(static_cast<int>(value >> 16), static_cast<int>(value >> 8), static_cast<int>(value));
+}
+
+// The nearest value of a depth.
+inline std::uint32_t value_of(int depth, COLORREF colour) {
+    const int r = GetRValue(colour), g = GetGValue(colour), b = GetBValue(colour);
+    const auto five = [](int level) { return static_cast<std::uint32_t>(level * 31 / 255.0 + 0.5); };
+    if (depth > 8) {
+        return depth == 16 ? five(r) << 10 | five(g) << 5 | five(b)
+                           : static_cast<std::uint32_t>(r << 16 | g << 8 | b);
+    }
+    const auto distance = [=](COLORREF c) {
+        const int x = GetRValue(c) - r, y = GetGValue(c) - g, z = GetBValue(c) - b;
+        return x * x + y * y + z * z;
+    };
+    const auto& colours = table(depth);
+    const auto nearest = std::min_element(colours.begin(), colours.end(),
+                                          [&](COLORREF x, COLORREF y) { return distance(x) < distance(y); });
+    return static_cast<std::uint32_t>(nearest - colours.begin());
+}
+
+// What a context is set to.
+struct Settings {
+    COLORREF text = 0, background = 0xFFFFFF;
+    XFORM world = {1, 0, 0, 1, 0, 0};
+};
+
+// A source's value on its way into a destination.
+inline std::uint32_t arriving(std::uint32_t value, int from, int to, const Settings& s,
+                              COLORREF source_background) {
+    return from == to  ? value
+           : from == 1 ? value_of(to, value != 0 ? s.background : s.text)
+           : to == 1   ? colour_bits(from, value) == value_of(from, source_background)
+                       : value_of(to, colour_of(from, value));
 }
 
 inline RECT ordered(const RECT& r) {
@@ -191,35 +201,51 @@ inline RECT ordered(const RECT& r) {
             std::max(r.top, r.bottom)};
 }
 
-/// A channel at place p of a ramp from `first` at a to `last` at b, by division of whole numbers. The ends
-/// are 8.8.
+// Calls paint(x, y, value&) for the pixels of a rectangle that exist.
+template <class Paint>
+void on(Picture& picture, const RECT& r, const Paint& paint) {
+    for (int y = std::max(r.top, 0); y < std::min(r.bottom, picture.height); ++y) {
+        for (int x = std::max(r.left, 0); x < std::min(r.right, picture.width); ++x) {
+            paint(x, y, picture.at(x, y));
+        }
+    }
+}
+
+__extension__ using Wide = __int128;
+
+// Whether a pixel's middle lies in a rectangle whose corners are quarters of an ellipse; in half pixels.
+inline bool is_in_rounded(const RECT& r, int ellipse_width, int ellipse_height, std::int64_t x,
+                          std::int64_t y) {
+    const Wide wide = std::min<std::int64_t>(ellipse_width, std::int64_t{r.right} - r.left);
+    const Wide high = std::min<std::int64_t>(ellipse_height, std::int64_t{r.bottom} - r.top);
+    // From the nearest sides inwards, then to the middle of the corner's ellipse.
+    const Wide dx = std::min(2 * (x - r.left) + 1, 2 * (r.right - x) - 1) - wide;
+    const Wide dy = std::min(2 * (y - r.top) + 1, 2 * (r.bottom - y) - 1) - high;
+    return dx >= 0 || dy >= 0 || dx * dx * high * high + dy * dy * wide * wide <= wide * wide * high * high;
+}
+
+// A channel of 8.8 at place p of a ramp from `first` at a to `last` at b.
 inline int gradient_level(std::int64_t first, std::int64_t last, std::int64_t a, std::int64_t b,
                           std::int64_t p) {
     return static_cast<int>((last * (p - a) + first * (b - p)) / (b - a) >> 8);
 }
 
-inline void fill(Picture& picture, const RECT& r, std::uint32_t pixel) {
-    for (int y = std::max(r.top, 0); y < std::min(r.bottom, picture.height); ++y) {
-        for (int x = std::max(r.left, 0); x < std::min(r.right, picture.width); ++x) {
-            picture.at(x, y) = pixel;
-        }
-    }
+inline void gradient(Picture& picture, const TRIVERTEX& a, const TRIVERTEX& b, bool across) {
+    on(picture, ordered({a.x, a.y, b.x, b.y}), [&](int x, int y, std::uint32_t& value) {
+        const auto level = [&](WORD first, WORD last) {
+            const int eight =
+                across ? gradient_level(first, last, a.x, b.x, x) : gradient_level(first, last, a.y, b.y, y);
+            return picture.depth == 16 ? eight >> 3 << 3 | eight >> 5 : eight;  // truncated, not the nearest
+        };
+        value =
+            value_of(picture.depth, RGB(level(a.Red, b.Red), level(a.Green, b.Green), level(a.Blue, b.Blue)));
+    });
 }
 
-/// That a region holds the pixels that are not the key, and no others.
-inline void expect_region(HRGN region, const Picture& picture, std::uint32_t key) {
-    for (int y = -1; y <= picture.height; ++y) {
-        for (int x = -1; x <= picture.width; ++x) {
-            ASSERT_EQ(PtInRegion(region, x, y) != 0, picture.has(x, y) && picture.at(x, y) != key)
-                << x << ", " << y;
-        }
-    }
-}
-
-/// A turn, clockwise to the eye, about a point.
+// A turn, clockwise to the eye, about a point.
 inline XFORM turn_about(double degrees, double x, double y) {
-    const double c = std::cos(degrees * std::numbers::pi / 180);
-    const double s = std::sin(degrees * std::numbers::pi / 180);
+    const double c = std::cos(degrees * std::numbers::pi / 180),
+                 s = std::sin(degrees * std::numbers::pi / 180);
     return {static_cast<float>(c),
             static_cast<float>(s),
             static_cast<float>(-s),
@@ -228,20 +254,110 @@ inline XFORM turn_about(double degrees, double x, double y) {
             static_cast<float>(y - x * s - y * c)};
 }
 
-/// Where the middle of a destination pixel comes from, and by how much it misses the border of a pixel.
-struct Origin {
-    std::int64_t x, y;
-    double margin;
+struct Block {
+    int x, y, width, height, source_x, source_y;
 };
 
-inline Origin origin(const XFORM& t, int x, int y) {
+// A copy, through the destination's transform. Calls open(x, y) for pixels whose middle comes from within
+// `margin` of a pixel's border, which rounding decides; they are left unchanged.
+template <class Open>
+Picture copied(const Picture& to, const Block& b, const Picture& from, DWORD rop, const Settings& s,
+               COLORREF source_background, double margin, const Open& open) {
+    const XFORM& t = s.world;
     const double determinant = double{t.eM11} * t.eM22 - double{t.eM12} * t.eM21;
-    const double px = x + 0.5 - t.eDx;
-    const double py = y + 0.5 - t.eDy;
-    const double u = (px * t.eM22 - py * t.eM21) / determinant;
-    const double v = (py * t.eM11 - px * t.eM12) / determinant;
-    return {static_cast<std::int64_t>(std::floor(u)), static_cast<std::int64_t>(std::floor(v)),
-            std::min(std::fabs(u - std::round(u)), std::fabs(v - std::round(v)))};
+    Picture result = to;
+    on(result, {0, 0, to.width, to.height}, [&](int x, int y, std::uint32_t& value) {
+        const double px = x + 0.5 - t.eDx, py = y + 0.5 - t.eDy;
+        const double u = (px * t.eM22 - py * t.eM21) / determinant,
+                     v = (py * t.eM11 - px * t.eM12) / determinant;
+        const double i = std::floor(u) - b.x, j = std::floor(v) - b.y;
+        if (std::min(std::fabs(u - std::round(u)), std::fabs(v - std::round(v))) < margin) {
+            return open(x, y);
+        }
+        const double column = b.source_x + i, row = b.source_y + j;
+        if (i < 0 || j < 0 || i >= b.width || j >= b.height || column < 0 || row < 0 ||
+            column >= from.width || row >= from.height) {
+            return;
+        }
+        const std::uint32_t source = arriving(from.at(static_cast<int>(column), static_cast<int>(row)),
+                                              from.depth, to.depth, s, source_background);
+        std::uint32_t combined = 0;
+        for (int bit = 0; bit < to.depth; ++bit) {  // by the operation's table: source * 2 + destination
+            combined |= (rop >> (16 + (source >> bit & 1) * 2 + (value >> bit & 1)) & 1) << bit;
+        }
+        value = combined;
+    });
+    return result;
+}
+inline Picture copied(const Picture& to, const Block& b, const Picture& from, DWORD rop,
+                      const Settings& s = {}, COLORREF source_background = 0xFFFFFF) {
+    return copied(to, b, from, rop, s, source_background, 0, [](int, int) {});
+}
+
+// Where a copy goes, and which part of a source it takes.
+struct Stretch {
+    int x, y, width, height, source_x, source_y, source_width, source_height;
+};
+
+inline Picture keyed(const Picture& to, const Stretch& s, const Picture& from, COLORREF key,
+                     const Settings& settings = {}, COLORREF source_background = 0xFFFFFF) {
+    Picture result = to;
+    on(result, {0, 0, to.width, to.height}, [&](int x, int y, std::uint32_t& value) {
+        const std::int64_t i = std::int64_t{x} - s.x, j = std::int64_t{y} - s.y;
+        if (i < 0 || j < 0 || i >= s.width || j >= s.height || s.source_width <= 0 || s.source_height <= 0) {
+            return;
+        }
+        const std::int64_t column = s.source_x + (2 * i + 1) * s.source_width / (2LL * s.width);
+        const std::int64_t row = s.source_y + (2 * j + 1) * s.source_height / (2LL * s.height);
+        if (from.has(column, row) &&
+            colour_bits(from.depth, from.at(column, row)) != value_of(from.depth, key)) {
+            value = arriving(from.at(column, row), from.depth, to.depth, settings, source_background);
+        }
+    });
+    return result;
+}
+
+// Whether a region holds the pixels that are not `out`, in its one form: runs of rows, joined where rows are
+// alike.
+inline bool holds(HRGN region, const Picture& picture, std::uint32_t out = 0) {
+    std::vector<RECT> rectangles, above, row;
+    for (int y = 0; y <= picture.height; ++y, row.clear()) {
+        for (int x = 0; y < picture.height && x < picture.width; ++x) {
+            if (picture.at(x, y) == out) {
+                continue;
+            }
+            if (row.empty() || row.back().right != x) {
+                row.push_back({x, y, x, y + 1});
+            }
+            row.back().right = x + 1;
+        }
+        const bool is_alike =
+            std::equal(row.begin(), row.end(), above.begin(), above.end(),
+                       [](RECT a, RECT b) { return a.left == b.left && a.right == b.right; });
+        if (!is_alike) {
+            rectangles.insert(rectangles.end(), above.begin(), above.end());
+            above = row;
+        }
+        std::for_each(above.begin(), above.end(), [&](RECT& r) { r.bottom = y + 1; });
+    }
+    CRect box, its_box(9, 9, 9, 9);
+    for (const RECT& r : rectangles) {
+        box |= r;
+    }
+    Bytes data(GetRegionData(region, 0, nullptr));
+    const DWORD written =
+        GetRegionData(region, static_cast<DWORD>(data.size()), reinterpret_cast<RGNDATA*>(data.data()));
+    const std::size_t bytes = rectangles.size() * sizeof(RECT);
+    const int kind = rectangles.size() > 1 ? COMPLEXREGION : rectangles.empty() ? NULLREGION : SIMPLEREGION;
+    bool is_same = written == 32 + bytes &&
+                   (bytes == 0 || std::memcmp(&data[32], rectangles.data(), bytes) == 0) &&
+                   GetRgnBox(region, &its_box) == kind && its_box == box;
+    for (int y = -1; y <= picture.height; ++y) {
+        for (int x = -1; x <= picture.width; ++x) {
+            is_same &= (PtInRegion(region, x, y) != 0) == (picture.has(x, y) && picture.at(x, y) != out);
+        }
+    }
+    return is_same;
 }
 
 }  // namespace drawing

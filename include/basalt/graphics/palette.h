@@ -1,6 +1,6 @@
 /// @file
-/// The colour palette: 256 colours for numbers of one byte, and back. What holds for all of graphics is said
-/// in basalt/graphics.h.
+/// The colour palette: 256 colours by an index of one byte, and back. basalt/graphics.h has what holds for
+/// all of graphics.
 #ifndef BASALT_GRAPHICS_PALETTE_H
 #define BASALT_GRAPHICS_PALETTE_H
 
@@ -8,10 +8,10 @@
 
 #include "basalt/export.h"
 
-/// 256 colours, at first those of the default table: nine basic colours (the second palette), 240 hues and
+/// 256 colours, initially those of the default table: nine basic colours (the second palette), 240 hues and
 /// shades (the large one), six greys (the third) and white.
 ///
-/// Threads: any number may read a palette; who writes one excludes all others.
+/// Threads: any number may read a palette; a writer excludes all others.
 class BASALT_API ColorPalette {
 public:
     /// A palette of the default colours.
@@ -20,42 +20,42 @@ public:
     ColorPalette(const ColorPalette& other) = default;
     ~ColorPalette() = default;
 
-    /// Takes all 256 colours of another.
+    /// Copies all 256 colours.
     ColorPalette& operator=(const ColorPalette& other) = default;
 
-    /// Colour of a number.
+    /// Colour at an index.
     std::uint32_t operator[](unsigned char index) const;
 
-    /// Number of the colour nearest to another one.
+    /// Index of the colour nearest to another one.
     /// @param colour 0x00BBGGRR
     /// @return the first entry equal to it in all 32 bits; without one, the first at the least distance: the
-    /// sum over the three channels of the difference in whole hundredths of 255, cut. 0 when every entry
+    /// sum over the three channels of the difference in hundredths of 255, truncated. 0 when every entry
     /// differs by 255 in all channels.
     unsigned char FindClosestColor(std::uint32_t colour) const;
 
     /// Replaces all colours.
-    /// @param colours 256 of them, any alignment a colour may have
+    /// @param colours 256 colours
     void FromMemory(const std::uint32_t* colours);
 
     /// Writes all colours out.
-    /// @param[out] colours room for 256
+    /// @param[out] colours buffer of 256 colours
     void ToMemory(std::uint32_t* colours) const;
 
-    /// Count of colours: 256.
+    /// Number of colours: 256.
     static std::uint64_t GetSize();
-    /// Number of white: 6.
+    /// Index of white: 6.
     static unsigned char GetWhiteColorIndex();
-    /// First number of the basic colours: 0.
+    /// First index of the basic colours: 0.
     static int GetSecondPaletteStartIndex();
-    /// Last number of the basic colours: 8.
+    /// Last index of the basic colours: 8.
     static int GetSecondPaletteEndIndex();
-    /// First number of the hues and shades: 9.
+    /// First index of the hues and shades: 9.
     static int GetLargePaletteStartIndex();
-    /// Last number of the hues and shades: 248.
+    /// Last index of the hues and shades: 248.
     static int GetLargePaletteEndIndex();
-    /// First number of the greys: 249.
+    /// First index of the greys: 249.
     static int GetThirdPaletteStartIndex();
-    /// Last number of the greys: 254.
+    /// Last index of the greys: 254.
     static int GetThirdPaletteEndIndex();
 
 private:
@@ -72,7 +72,7 @@ private:
     std::uint32_t m_colours[PALETTE_SIZE];
 };
 
-/// Colour for text over a background: dark grey 0x505050 where red, green and blue add up to more than 384,
+/// Colour for text over a background: dark grey 0x505050 where red + green + blue > 384,
 /// else white.
 /// @param colour background, 0x00BBGGRR
 /// Threads: reentrant.

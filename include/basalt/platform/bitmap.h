@@ -1,12 +1,12 @@
 /// @file
-/// Bitmaps: creation, description, and their rows in a stated format. What holds for all drawing objects is
-/// said in basalt/platform/graphics_objects.h.
+/// Bitmaps: creation, description, and their rows in a given format. basalt/platform/graphics_objects.h has
+/// what holds for all drawing objects.
 ///
 /// Depths and stored values: 1 bit (bit 7 of the first byte is the left pixel; 0 black, 1 white), 4 (the high
-/// nibble is the left pixel) and 8 bits are numbers in a fixed table of colours: the 16 standard ones, and
+/// nibble is the left pixel) and 8 bits are indices into a fixed table of colours: the 16 standard ones, and
 /// 256 that include the 20 system colours, 0 black and 255 white. 16 bits are 5-5-5: red in bits 10 to 14,
 /// green in 5 to 9, blue in 0 to 4. 24 bits are bytes blue, green, red; 32 bits the word 0x00RRGGBB, whose
-/// high byte is carried along but means nothing.
+/// high byte is copied but has no meaning.
 #ifndef BASALT_PLATFORM_BITMAP_H
 #define BASALT_PLATFORM_BITMAP_H
 
@@ -22,7 +22,7 @@ struct BITMAP {
     LONG bmWidthBytes;  ///< bytes of a row, padded to 16 bits
     WORD bmPlanes;      ///< 1
     WORD bmBitsPixel;   ///< 1, 4, 8, 16, 24 or 32
-    void* bmBits;       ///< null: the rows are the platform's
+    void* bmBits;       ///< null: the rows belong to the platform
 };
 
 /// Header of a device-independent image.
@@ -37,7 +37,7 @@ struct BITMAPINFOHEADER {
     LONG biXPelsPerMeter;  ///< pixels per metre, 0 if not known
     LONG biYPelsPerMeter;  ///< pixels per metre, 0 if not known
     DWORD biClrUsed;       ///< colours in the table, 0 for all
-    DWORD biClrImportant;  ///< colours that matter, 0 for all
+    DWORD biClrImportant;  ///< important colours, 0 for all
 };
 
 /// An entry of an image's table of colours.
@@ -54,14 +54,14 @@ struct BITMAPINFO {
     RGBQUAD bmiColors[1];        ///< the table: 2, 16 or 256 entries at 1, 4 or 8 bits
 };
 
-static_assert(sizeof(BITMAPINFOHEADER) == 40 && sizeof(RGBQUAD) == 4, "published sizes");
+static_assert(sizeof(BITMAPINFOHEADER) == 40 && sizeof(RGBQUAD) == 4, "the sizes of Win32");
 
 inline constexpr DWORD BI_RGB = 0;         ///< uncompressed
 inline constexpr UINT DIB_RGB_COLORS = 0;  ///< a table of colours follows the header
 
 /// @name Bitmaps
-/// Width or height 0 gives a monochrome bitmap of one pixel, whatever was asked for. A negative one, and rows
-/// that together take 2^31 bytes or more, give null (ERROR_INVALID_PARAMETER), as does a lack of memory
+/// Width or height 0 gives a monochrome bitmap of one pixel. The result is null for a negative size and for
+/// rows that together take 2^31 bytes or more (ERROR_INVALID_PARAMETER), and when out of memory
 /// (ERROR_NOT_ENOUGH_MEMORY).
 /// @{
 
@@ -79,19 +79,19 @@ BASALT_API HBITMAP CreateCompatibleBitmap(HDC dc, int width, int height);
 BASALT_API HBITMAP CreateBitmap(int width, int height, UINT planes, UINT bits_per_pixel, const void* bits);
 
 /// Copies rows of a bitmap in the format of a header: in the bitmap's own depth as they are stored, in
-/// another with the colours brought to the nearest the depth has.
+/// another with each colour replaced by the nearest of that depth.
 /// @param dc any context
-/// @param bitmap the bitmap, selected or not; the stock bitmap that SelectObject hands back has no rows of
-/// its own, and gives 0 (ERROR_INVALID_HANDLE)
+/// @param bitmap the bitmap, selected or not; the stock bitmap that SelectObject returns has no rows of its
+/// own: 0 (ERROR_INVALID_HANDLE)
 /// @param first first row to copy, counted in the header's order of rows
-/// @param count number of rows; those beyond the last are left out
-/// @param[out] bits room for the rows, each padded to 32 bits: (width * bits + 31) / 32 * 4 bytes; null
+/// @param count number of rows; those beyond the last are ignored
+/// @param[out] bits buffer for the rows, each padded to 32 bits: (width * bits + 31) / 32 * 4 bytes; null
 /// copies nothing
 /// @param[in,out] info header: size 40, the bitmap's width, its height of either sign, planes 1, a depth,
-/// BI_RGB. biSizeImage is filled in. Behind it goes the table of 2, 16 or 256 colours at 1, 4 or 8 bits.
-/// With null bits and biBitCount 0, width, height, planes, depth and compression are filled in instead.
+/// BI_RGB. biSizeImage is filled in. The table of 2, 16 or 256 colours at 1, 4 or 8 bits follows it. With
+/// null bits and biBitCount 0, width, height, planes, depth and compression are filled in instead.
 /// @param usage DIB_RGB_COLORS
-/// @return rows copied; without bits 1 on success; 0 when anything does not fit (ERROR_INVALID_PARAMETER)
+/// @return rows copied; without bits 1 on success; 0 for any other header or usage (ERROR_INVALID_PARAMETER)
 BASALT_API int GetDIBits(HDC dc, HBITMAP bitmap, UINT first, UINT count, void* bits, BITMAPINFO* info,
                          UINT usage);
 /// @}
@@ -106,7 +106,7 @@ public:
     CBitmap(const CBitmap&) = delete;
     CBitmap& operator=(const CBitmap&) = delete;
 
-    /// A wrapper that does not own the bitmap: lent by the platform, good as long as the bitmap exists.
+    /// A wrapper that does not own the bitmap; valid as long as the bitmap exists.
     /// @return null for a wrong handle
     static CBitmap* FromHandle(HBITMAP bitmap);
 

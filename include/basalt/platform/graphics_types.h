@@ -1,11 +1,11 @@
 /// @file
-/// Handles, colours and records of the drawing calls, with their published sizes.
+/// Handles, colours and records of the drawing calls, with the sizes of Win32.
 #ifndef BASALT_PLATFORM_GRAPHICS_TYPES_H
 #define BASALT_PLATFORM_GRAPHICS_TYPES_H
 
 #include "basalt/platform/types.h"
 
-/// Any drawing object: bitmap, brush, pen or region. The typed handles below convert to it.
+/// Any drawing object: bitmap, brush or region. The typed handles below convert to it.
 using HGDIOBJ = void*;
 /// A device context: a surface and the settings drawn with.
 using HDC = struct HDC__*;
@@ -13,23 +13,21 @@ using HDC = struct HDC__*;
 using HBITMAP = struct HBITMAP__*;
 /// A brush, which fills.
 using HBRUSH = struct HBRUSH__*;
-/// A pen, which outlines.
-using HPEN = struct HPEN__*;
 /// A region: a set of pixels.
 using HRGN = struct HRGN__*;
 struct HWND__;
 #ifndef __SQLTYPES_H  // unixODBC declares another HWND
-/// A window. There are none here, so the one valid value is null, which stands for the screen.
+/// A window. The only valid value is null, which stands for the screen.
 using HWND = HWND__*;
 #endif
 
-/// A colour, 0x00BBGGRR: red in the low byte. Drawing ignores the high byte.
+/// A colour, 0x00BBGGRR: red in the low byte. The high byte is ignored.
 using COLORREF = DWORD;
 
-/// What is no colour: the answer outside a surface.
+/// No colour: the result outside a surface.
 inline constexpr COLORREF CLR_INVALID = 0xFFFFFFFF;
 
-/// Colour of three channels, of which the low eight bits count.
+/// The colour of three channels; each is truncated to 8 bits.
 constexpr COLORREF RGB(int red, int green, int blue) {
     return static_cast<COLORREF>((red & 0xFF) | (green & 0xFF) << 8 | (blue & 0xFF) << 16);
 }
@@ -52,6 +50,12 @@ struct POINT {
     LONG y;  ///< downwards
 };
 
+/// A width and a height.
+struct SIZE {
+    LONG cx;  ///< width
+    LONG cy;  ///< height
+};
+
 /// A rectangle of pixels: `right` and `bottom` are the first column and row outside.
 struct RECT {
     LONG left;    ///< first column
@@ -59,6 +63,10 @@ struct RECT {
     LONG right;   ///< first column outside
     LONG bottom;  ///< first row outside
 };
+
+using LPPOINT = POINT*;       ///< points that a call changes
+using LPRECT = RECT*;         ///< a rectangle that a call changes
+using LPCRECT = const RECT*;  ///< a rectangle
 
 /// A transform of the plane: x' = x eM11 + y eM21 + eDx, y' = x eM12 + y eM22 + eDy. With y downwards,
 /// eM11 = eM22 = cos a, eM12 = -eM21 = sin a turns clockwise by a.
@@ -71,6 +79,6 @@ struct XFORM {
     float eDy;   ///< shift of y
 };
 
-static_assert(sizeof(RECT) == 16 && sizeof(POINT) == 8 && sizeof(XFORM) == 24, "published sizes");
+static_assert(sizeof(RECT) == 16 && sizeof(POINT) == 8 && sizeof(XFORM) == 24, "the sizes of Win32");
 
 #endif

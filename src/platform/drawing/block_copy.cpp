@@ -1,33 +1,46 @@
 #include "src/platform/drawing/block_copy.h"
 
+#include <cstddef>
 #include <optional>
 
 #include "basalt/platform/drawing.h"
 #include "basalt/platform/error.h"
-#include "src/platform/drawing/drawing_target.h"
 #include "src/platform/pixels/pixel_rows.h"
 
 namespace basalt::platform {
 
-RowWriter::RowWriter(const Context& destination, const Context* source, RasterOperation operation)
-    : m_depth(destination.surface().depth),
-      m_operation(operation),
-      m_is_plain_copy(operation.is_copy() && source != nullptr && source->surface().depth == m_depth),
-      m_brush(value_of_colour(m_depth, destination.brush.colour)),
-      m_converter(source != nullptr ? source->surface().depth : m_depth, m_depth, destination.text,
-                  destination.background, source != nullptr ? source->background : 0) {}
+namespace {
 
-void RowWriter::write(std::byte* row, int x, std::span<std::uint32_t> values) const {
-    m_converter.convert(values);
-    if (!m_operation.is_copy()) {
-        std::uint32_t present[PIECE];
-        read_pixels(m_depth, row, x, std::span(present, values.size()));
-        m_operation.combine(values, present, m_brush);
+// The truth table of an operation on source and destination; the other bits of a code do not matter.
+constexpr DWORD TABLE = 0x00FF0000;
+constexpr DWORD OPERATIONS[] = {SRCCOPY, NOTSRCCOPY, SRCAND, SRCPAINT, SRCINVERT};
+
+std::optional<DWORD> operation_of(DWORD rop) {
+    for (const DWORD operation : OPERATIONS) {
+        if ((rop & TABLE) == (operation & TABLE)) {
+            return operation;
+        }
     }
-    write_pixels(m_depth, row, x, values);
+    SetLastError(ERROR_INVALID_PARAMETER);
+    return std::nullopt;
 }
 
-namespace {
+// Replaces source values by their combination with those present.
+void combine(std::span<std::uint32_t> source, const std::uint32_t* present, DWORD operation) {
+    const auto each = [&](auto combined) {
+        for (std::size_t i = 0; i < source.size(); ++i) {
+            source[i] = combined(source[i], present[i]);
+        }
+    };
+    switch (operation) {
+        case SRCAND:
+            return each([](std::uint32_t s, std::uint32_t d) { return s & d; });
+        case SRCPAINT:
+            return each([](std::uint32_t s, std::uint32_t d) { return s | d; });
+        default:
+            return each([](std::uint32_t s, std::uint32_t d) { return s ^ d; });
+    }
+}
 
 // A copy between surfaces by a shift of whole pixels.
 struct ShiftedCopy {
@@ -38,7 +51,7 @@ struct ShiftedCopy {
     std::int64_t add_y;
     const RowWriter& writer;
 
-    // On one surface, a row or pixel is read before another is written over it.
+    // On one surface, rows and pixels are read before they are overwritten.
     void run() const {
         const bool from_below = &to == &from && add_y < 0;
         for (int i = 0; i < part.bottom - part.top; ++i) {
@@ -64,15 +77,6 @@ struct ShiftedCopy {
     }
 };
 
-void write_without_source(Surface& to, const RECT& part, const RowWriter& writer) {
-    for (int y = part.top; y < part.bottom; ++y) {
-        in_pieces(part.right - part.left, false, [&](int offset, int size) {
-            std::uint32_t values[PIECE] = {};
-            writer.write(to.row(y), part.left + offset, std::span(values, static_cast<std::size_t>(size)));
-        });
-    }
-}
-
 // The part of a box whose source pixels exist.
 Box with_source(const Box& box, const Surface& from, std::int64_t add_x, std::int64_t add_y) {
     return common_part(box, {-add_x, -add_y, from.width - add_x, from.height - add_y});
@@ -80,43 +84,48 @@ Box with_source(const Box& box, const Surface& from, std::int64_t add_x, std::in
 
 }  // namespace
 
+RowWriter::RowWriter(const Context& destination, const Context& source, DWORD operation)
+    : m_depth(destination.surface().depth),
+      m_operation(operation),
+      m_is_plain_copy(operation == SRCCOPY && source.surface().depth == m_depth),
+      m_converter(source.surface().depth, m_depth, destination.text, destination.background,
+                  source.background) {}
+
+void RowWriter::write(std::byte* row, int x, std::span<std::uint32_t> values) const {
+    m_converter.convert(values);
+    if (m_operation == NOTSRCCOPY) {
+        for (std::uint32_t& value : values) {
+            value = ~value;
+        }
+    } else if (m_operation != SRCCOPY) {
+        std::uint32_t present[PIECE];
+        read_pixels(m_depth, row, x, std::span(present, values.size()));
+        combine(values, present, m_operation);
+    }
+    write_pixels(m_depth, row, x, values);
+}
+
 }  // namespace basalt::platform
 
 BOOL BitBlt(HDC dc, int x, int y, int width, int height, HDC source, int source_x, int source_y, DWORD rop) {
     using namespace basalt::platform;
-    const RasterOperation operation(rop);
     auto* const to = object_of<Context>(dc);
-    if (to == nullptr) {
+    const auto* const from = to != nullptr ? object_of<Context>(source) : nullptr;
+    const std::optional<DWORD> operation = from != nullptr ? operation_of(rop) : std::nullopt;
+    if (!operation) {
         return 0;
     }
-    Context* from = nullptr;
-    if (operation.needs_source()) {
-        from = object_of<Context>(source);
-        if (from == nullptr) {
-            return 0;
-        }
-    }
-    if (operation.needs_brush() && !to->brush.draws) {
-        return 1;
-    }
-    const RowWriter writer(*to, from, operation);
-    const std::optional<PixelShift> shift = whole_pixel_shift(*to);
-    const std::optional<PixelShift> source_shift =
-        from != nullptr ? whole_pixel_shift(*from) : PixelShift{0, 0};
-    const Box target = box_at(x, y, width, height);
+    const RowWriter writer(*to, *from, *operation);
+    const std::optional<PixelShift> shift = to->pixel_shift();
+    const std::optional<PixelShift> source_shift = from->pixel_shift();
     if (!shift || !source_shift) {
-        return copy_transformed(*to, target, from, source_x, source_y, writer) ? 1 : 0;
+        return copy_transformed(*to, box_at(x, y, width, height), *from, source_x, source_y, writer) ? 1 : 0;
     }
     const Box pixels = box_at(x + shift->x, y + shift->y, width, height);
-    Surface& surface = to->surface();
-    if (from == nullptr) {
-        write_without_source(surface, part_on(surface, pixels), writer);
-        return 1;
-    }
     const std::int64_t add_x = source_x + source_shift->x - pixels.left;
     const std::int64_t add_y = source_y + source_shift->y - pixels.top;
     const Surface& source_surface = from->surface();
-    const RECT part = part_on(surface, with_source(pixels, source_surface, add_x, add_y));
-    ShiftedCopy{surface, source_surface, part, add_x, add_y, writer}.run();
+    const RECT part = part_on(to->surface(), with_source(pixels, source_surface, add_x, add_y));
+    ShiftedCopy{to->surface(), source_surface, part, add_x, add_y, writer}.run();
     return 1;
 }

@@ -11,7 +11,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/errors/error_from_errno.h"
-#include "src/platform/pixel_format.h"
+#include "src/platform/pixels/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
 #include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"

@@ -5,7 +5,7 @@
 #include <new>
 
 #include "src/platform/drawing/bmp_file.h"
-#include "src/platform/drawing/graphics_object_kinds.h"
+#include "src/platform/drawing/objects.h"
 
 struct GpImage {
     HBITMAP bitmap;

@@ -1,20 +1,17 @@
 #include "basalt/platform/device_context.h"
 
 #include <new>
-#include <optional>
 #include <utility>
 
 #include "basalt/platform/error.h"
-#include "src/platform/drawing/graphics_object_kinds.h"
+#include "src/platform/drawing/objects.h"
 
 namespace {
 
 using basalt::platform::Bitmap;
 using basalt::platform::Brush;
 using basalt::platform::Context;
-using basalt::platform::GraphicsKind;
 using basalt::platform::object_of;
-using basalt::platform::Paint;
 
 HDC keep_context(bool is_screen) {
     std::unique_ptr<Context> context(new (std::nothrow) Context);
@@ -28,18 +25,18 @@ HDC keep_context(bool is_screen) {
     return static_cast<HDC>(basalt::platform::keep_graphics_object(std::move(context)));
 }
 
-void count_selection(HGDIOBJ brush_or_pen, int change) {
-    if (!basalt::platform::is_stock_object(brush_or_pen)) {
-        // Nobody can delete what is counted, so a handle that was selected is still valid.
-        static_cast<Brush*>(basalt::platform::find_graphics_object(brush_or_pen))->selections += change;
+void count_selection(HGDIOBJ brush, int change) {
+    if (!basalt::platform::is_stock_object(brush)) {
+        // A counted brush cannot be deleted, so a handle that was selected is still valid.
+        static_cast<Brush*>(basalt::platform::find_graphics_object(brush))->selections += change;
     }
 }
 
-HGDIOBJ exchange_paint(HGDIOBJ& current, Paint& paint, HGDIOBJ next, GraphicsKind kind) {
-    paint = *basalt::platform::paint_of(next, kind);
+HGDIOBJ exchange_brush(Context& context, HGDIOBJ next) {
+    context.brush = *basalt::platform::paint_of(next);
     count_selection(next, 1);
-    count_selection(current, -1);
-    return std::exchange(current, next);
+    count_selection(context.brush_handle, -1);
+    return std::exchange(context.brush_handle, next);
 }
 
 HGDIOBJ exchange_bitmap(Context& context, HGDIOBJ next) {
@@ -66,7 +63,7 @@ HGDIOBJ exchange_bitmap(Context& context, HGDIOBJ next) {
     return std::exchange(context.bitmap_handle, next);
 }
 
-// Takes the context out if it is of the kind asked for.
+// Deletes a context of the kind that the call is for.
 BOOL end_context(HDC dc, bool is_screen) {
     const auto* const context = object_of<Context>(dc);
     if (context == nullptr) {
@@ -84,11 +81,6 @@ COLORREF exchange_colour(HDC dc, COLORREF Context::*member, COLORREF colour) {
     return context != nullptr ? std::exchange(context->*member, colour) : CLR_INVALID;
 }
 
-COLORREF colour_of(HDC dc, COLORREF Context::*member) {
-    const auto* const context = object_of<Context>(dc);
-    return context != nullptr ? context->*member : CLR_INVALID;
-}
-
 }  // namespace
 
 basalt::platform::Context::~Context() {
@@ -96,7 +88,6 @@ basalt::platform::Context::~Context() {
         bitmap->is_selected = false;
     }
     count_selection(brush_handle, -1);
-    count_selection(pen_handle, -1);
     lent.Detach();
 }
 
@@ -132,12 +123,11 @@ HGDIOBJ SelectObject(HDC dc, HGDIOBJ object) {
     if (context == nullptr) {
         return nullptr;
     }
-    const std::optional<GraphicsKind> kind = basalt::platform::kind_of(object);
-    if (kind == GraphicsKind::BRUSH) {
-        return exchange_paint(context->brush_handle, context->brush, object, *kind);
+    if (basalt::platform::is_brush(object)) {
+        return exchange_brush(*context, object);
     }
-    if (kind == GraphicsKind::PEN) {
-        return exchange_paint(context->pen_handle, context->pen, object, *kind);
+    if (basalt::platform::is_stock_pen(object)) {
+        return std::exchange(context->pen_handle, object);
     }
     return exchange_bitmap(*context, object);
 }
@@ -146,16 +136,8 @@ COLORREF SetBkColor(HDC dc, COLORREF colour) {
     return exchange_colour(dc, &Context::background, colour);
 }
 
-COLORREF GetBkColor(HDC dc) {
-    return colour_of(dc, &Context::background);
-}
-
 COLORREF SetTextColor(HDC dc, COLORREF colour) {
     return exchange_colour(dc, &Context::text, colour);
-}
-
-COLORREF GetTextColor(HDC dc) {
-    return colour_of(dc, &Context::text);
 }
 
 CDC* CDC::FromHandle(HDC dc) {

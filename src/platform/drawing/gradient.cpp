@@ -1,4 +1,4 @@
-// Rectangles filled with a change from one colour to another.
+// Rectangles filled with a gradient.
 #include <algorithm>
 #include <cstring>
 #include <optional>
@@ -6,16 +6,16 @@
 
 #include "basalt/platform/drawing.h"
 #include "basalt/platform/error.h"
-#include "src/platform/drawing/drawing_target.h"
-#include "src/platform/pixel_format.h"
+#include "src/platform/drawing/objects.h"
+#include "src/platform/pixels/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
 
 namespace {
 
 using namespace basalt::platform;
 
-// One channel along a line: (end (p - begin) + start (size - (p - begin))) / size, exact at every step
-// without a division a step.
+// One channel along a line: (end (p - begin) + start (size - (p - begin))) / size, exact at every step and
+// without a division per step.
 class Ramp {
 public:
     Ramp(WORD start, WORD end, std::int64_t size, std::int64_t first) : m_size(size) {
@@ -36,7 +36,7 @@ public:
     void advance() {
         m_value += m_step;
         m_rest += m_rest_step;
-        // Without a branch: which way it would go is anybody's guess.
+        // Branchless: the branch would be unpredictable.
         const std::int64_t carry = m_rest >= m_size ? 1 : 0;
         m_value += carry;
         m_rest -= carry * m_size;
@@ -57,7 +57,7 @@ public:
           m_green(start.Green, end.Green, size, first),
           m_blue(start.Blue, end.Blue, size, first) {}
 
-    // The next value of a depth.
+    // The next pixel, as a depth stores it.
     std::uint32_t next(int depth) {
         const std::uint32_t word = m_red.level() << 16 | m_green.level() << 8 | m_blue.level();
         m_red.advance();
@@ -66,7 +66,7 @@ public:
         if (depth > 16) {
             return word;
         }
-        return depth == 16 ? cut_555(word) : value_of_word(depth, word);
+        return depth == 16 ? truncated_555(word) : value_of_word(depth, word);
     }
 
 private:
@@ -107,7 +107,7 @@ void fill(Surface& surface, const PixelShift& shift, TRIVERTEX start, TRIVERTEX 
     if (part.left == part.right) {
         return;
     }
-    // The ramp belongs to the whole rectangle, whatever part of it is on the surface.
+    // The ramp runs over the whole rectangle, not only the part on the surface.
     if (from_left) {
         fill_from_left(surface, part, Gradient(start, end, box.right - box.left, part.left - box.left));
     } else {
@@ -132,7 +132,7 @@ BOOL GradientFill(HDC dc, const TRIVERTEX* vertices, DWORD vertex_count, const v
         SetLastError(ERROR_INVALID_PARAMETER);
         return 0;
     }
-    const std::optional<PixelShift> shift = required_shift(*context);
+    const std::optional<PixelShift> shift = context->required_shift();
     if (!shift) {
         return 0;
     }

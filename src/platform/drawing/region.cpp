@@ -1,105 +1,78 @@
 #include "basalt/platform/region.h"
 
-#include <pixman.h>
-
 #include <algorithm>
-#include <cstddef>
+#include <cstring>
 #include <limits>
 #include <new>
 #include <utility>
 
 #include "basalt/platform/error.h"
-#include "src/platform/drawing/graphics_handles.h"
-#include "src/platform/region_rectangles.h"
+#include "src/platform/drawing/handles.h"
+#include "src/platform/pixels/bands.h"
+#include "src/platform/raster_extras.h"
 
 namespace {
 
+using basalt::platform::Bands;
 using basalt::platform::GraphicsKind;
 using basalt::platform::GraphicsObject;
+using basalt::platform::Keep;
 using basalt::platform::object_of;
-
-// Bands of rectangles in the one form that a set of pixels has, so that equal sets are equal records.
-struct Area {
-    Area() { pixman_region32_init(&bands); }
-    Area(const Area&) = delete;
-    Area& operator=(const Area&) = delete;
-    ~Area() { pixman_region32_fini(&bands); }
-
-    pixman_region32_t bands;
-};
 
 struct DrawingRegion : GraphicsObject {
     static constexpr GraphicsKind KIND = GraphicsKind::REGION;
-    DrawingRegion() : GraphicsObject(KIND) {}
+    explicit DrawingRegion(Bands its_bands) : GraphicsObject(KIND), bands(std::move(its_bands)) {}
     ~DrawingRegion() override { lent.Detach(); }
 
-    Area area;
+    int complexity() const {
+        const std::size_t count = bands.rectangles().size();
+        return count == 0 ? NULLREGION : count == 1 ? SIMPLEREGION : COMPLEXREGION;
+    }
+
+    Bands bands;
     CRgn lent;  // what CRgn::FromHandle lends
 };
 
-static_assert(sizeof(RECT) == sizeof(pixman_box32_t) &&
-              offsetof(RECT, left) == offsetof(pixman_box32_t, x1) &&
-              offsetof(RECT, top) == offsetof(pixman_box32_t, y1) &&
-              offsetof(RECT, right) == offsetof(pixman_box32_t, x2) &&
-              offsetof(RECT, bottom) == offsetof(pixman_box32_t, y2));
-
-// The library's functions read the regions they are given, but do not say so.
-pixman_region32_t* bands_of(const DrawingRegion& region) {
-    return const_cast<pixman_region32_t*>(&region.area.bands);
+int refuse(DWORD error) {
+    SetLastError(error);
+    return RGN_ERROR;
 }
 
-int kind_of_area(pixman_region32_t* bands) {
-    if (!pixman_region32_not_empty(bands)) {
-        return NULLREGION;
-    }
-    return pixman_region32_n_rects(bands) == 1 ? SIMPLEREGION : COMPLEXREGION;
-}
-
-bool combine(pixman_region32_t* result, pixman_region32_t* a, pixman_region32_t* b, int mode) {
+Bands combined(const Bands& a, const Bands& b, int mode) {
     switch (mode) {
         case RGN_AND:
-            return pixman_region32_intersect(result, a, b);
+            return basalt::platform::combined(a, b, Keep::AND);
         case RGN_OR:
-            return pixman_region32_union(result, a, b);
+            return basalt::platform::combined(a, b, Keep::OR);
+        case RGN_XOR:
+            return basalt::platform::combined(a, b, Keep::XOR);
         case RGN_DIFF:
-            return pixman_region32_subtract(result, a, b);
-        case RGN_COPY:
-            return pixman_region32_copy(result, a);
+            return basalt::platform::combined(a, b, Keep::DIFF);
         default:
-            break;
+            return a;
     }
-    Area rest;
-    return pixman_region32_subtract(&rest.bands, b, a) && pixman_region32_subtract(result, a, b) &&
-           pixman_region32_union(result, result, &rest.bands);
-}
-
-HRGN keep_region(std::unique_ptr<DrawingRegion> region) {
-    return static_cast<HRGN>(basalt::platform::keep_graphics_object(std::move(region)));
 }
 
 }  // namespace
 
-HRGN basalt::platform::create_region(std::span<const RECT> rectangles) {
-    std::unique_ptr<DrawingRegion> region(new (std::nothrow) DrawingRegion);
-    // The library writes to standard error about a single rectangle that is reversed.
-    const bool holds_none =
-        rectangles.empty() || (rectangles.size() == 1 && (rectangles[0].left >= rectangles[0].right ||
-                                                          rectangles[0].top >= rectangles[0].bottom));
-    if (region != nullptr && !holds_none) {
-        if (rectangles.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()) ||
-            !pixman_region32_init_rects(&region->area.bands,
-                                        reinterpret_cast<const pixman_box32_t*>(rectangles.data()),
-                                        static_cast<int>(rectangles.size()))) {
-            region = nullptr;
-        }
-    }
-    return keep_region(std::move(region));
+HRGN basalt::platform::create_region(std::vector<RECT> rectangles) {
+    std::unique_ptr<DrawingRegion> region(new (std::nothrow) DrawingRegion(Bands(std::move(rectangles))));
+    return static_cast<HRGN>(keep_graphics_object(std::move(region)));
 }
 
 HRGN CreateRectRgn(int left, int top, int right, int bottom) {
-    const RECT rectangle = {std::min(left, right), std::min(top, bottom), std::max(left, right),
-                            std::max(top, bottom)};
-    return basalt::platform::create_region(std::span(&rectangle, 1));
+    const auto [first_column, end_column] = std::minmax(left, right);
+    const auto [first_row, end_row] = std::minmax(top, bottom);
+    try {
+        std::vector<RECT> rectangles;
+        if (left != right && top != bottom) {
+            rectangles.push_back({first_column, first_row, end_column, end_row});
+        }
+        return basalt::platform::create_region(std::move(rectangles));
+    } catch (const std::bad_alloc&) {
+        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
+        return nullptr;
+    }
 }
 
 int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {
@@ -110,21 +83,27 @@ int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {
         return RGN_ERROR;
     }
     if (mode < RGN_AND || mode > RGN_COPY) {
-        SetLastError(ERROR_INVALID_PARAMETER);
+        return refuse(ERROR_INVALID_PARAMETER);
+    }
+    try {
+        result->bands = combined(first->bands, second->bands, mode);
+    } catch (const std::bad_alloc&) {
+        return refuse(ERROR_NOT_ENOUGH_MEMORY);
+    }
+    return result->complexity();
+}
+
+int OffsetRgn(HRGN region, int x, int y) {
+    auto* const found = object_of<DrawingRegion>(region);
+    if (found == nullptr) {
         return RGN_ERROR;
     }
-    Area combined;
-    if (!combine(&combined.bands, bands_of(*first), bands_of(*second), mode)) {
-        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-        return RGN_ERROR;
-    }
-    std::swap(combined.bands, result->area.bands);
-    return kind_of_area(&result->area.bands);
+    return found->bands.shift(x, y) ? found->complexity() : refuse(ERROR_INVALID_PARAMETER);
 }
 
 BOOL PtInRegion(HRGN region, int x, int y) {
     const auto* const found = object_of<DrawingRegion>(region);
-    return found != nullptr && pixman_region32_contains_point(bands_of(*found), x, y, nullptr) ? 1 : 0;
+    return found != nullptr && found->bands.contains(x, y) ? 1 : 0;
 }
 
 int GetRgnBox(HRGN region, RECT* box) {
@@ -133,20 +112,42 @@ int GetRgnBox(HRGN region, RECT* box) {
         return RGN_ERROR;
     }
     if (box == nullptr) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return RGN_ERROR;
+        return refuse(ERROR_INVALID_PARAMETER);
     }
-    pixman_region32_t* const bands = bands_of(*found);
-    const int kind = kind_of_area(bands);
-    const pixman_box32_t* const extents = pixman_region32_extents(bands);
-    *box = kind == NULLREGION ? RECT{0, 0, 0, 0} : RECT{extents->x1, extents->y1, extents->x2, extents->y2};
-    return kind;
+    *box = found->bands.box();
+    return found->complexity();
+}
+
+DWORD GetRegionData(HRGN region, DWORD size, RGNDATA* data) {
+    const auto* const found = object_of<DrawingRegion>(region);
+    if (found == nullptr) {
+        return 0;
+    }
+    const std::vector<RECT>& rectangles = found->bands.rectangles();
+    const std::size_t bytes = rectangles.size() * sizeof(RECT);
+    const std::size_t needed = sizeof(RGNDATAHEADER) + bytes;
+    if (needed > std::numeric_limits<DWORD>::max() || (data != nullptr && size < needed)) {
+        SetLastError(ERROR_INSUFFICIENT_BUFFER);
+        return 0;
+    }
+    if (data != nullptr) {
+        const RGNDATAHEADER header = {sizeof(RGNDATAHEADER), RDH_RECTANGLES,
+                                      static_cast<DWORD>(rectangles.size()), static_cast<DWORD>(bytes),
+                                      found->bands.box()};
+        // The rectangles lie behind the record's end, so they are reached from the record's own address.
+        auto* const to = reinterpret_cast<std::byte*>(data);
+        std::memcpy(to, &header, sizeof header);
+        if (bytes > 0) {
+            std::memcpy(to + sizeof header, rectangles.data(), bytes);
+        }
+    }
+    return static_cast<DWORD>(needed);
 }
 
 BOOL EqualRgn(HRGN a, HRGN b) {
     const auto* const first = object_of<DrawingRegion>(a);
     const auto* const second = first != nullptr ? object_of<DrawingRegion>(b) : nullptr;
-    return second != nullptr && pixman_region32_equal(bands_of(*first), bands_of(*second)) ? 1 : 0;
+    return second != nullptr && first->bands == second->bands ? 1 : 0;
 }
 
 CRgn* CRgn::FromHandle(HRGN region) {

@@ -1,5 +1,6 @@
-// Copies through a transform: the middle of each destination pixel is taken back into the source.
+// Copies through a transform: the middle of each destination pixel is mapped back into the source.
 #include <algorithm>
+#include <cstddef>
 #include <optional>
 
 #include "basalt/platform/error.h"
@@ -42,43 +43,17 @@ void copy_run(const Surface& from, const AffineRows& rows, const AffineRows::Run
     });
 }
 
-void write_run(const AffineRows::Run& run, std::byte* row, const RowWriter& writer) {
-    in_pieces(run.end - run.begin, false, [&](int offset, int size) {
-        std::uint32_t values[PIECE] = {};
-        writer.write(row, run.begin + offset, std::span(values, static_cast<std::size_t>(size)));
-    });
-}
-
-std::optional<AffineRows> followed(std::optional<AffineRows> rows) {
-    if (!rows) {
-        SetLastError(ERROR_ARITHMETIC_OVERFLOW);
-    }
-    return rows;
-}
-
-bool write_transformed(Context& destination, const Box& target, const RowWriter& writer) {
-    const std::optional<AffineRows> rows = followed(AffineRows::create(
-        *destination.world.inverse(), static_cast<double>(target.left), static_cast<double>(target.top),
-        static_cast<double>(target.right), static_cast<double>(target.bottom)));
-    if (!rows) {
-        return false;
-    }
-    Surface& surface = destination.surface();
-    rows->on(surface, [&](int y, const AffineRows::Run& run) { write_run(run, surface.row(y), writer); });
-    return true;
-}
-
 }  // namespace
 
-bool copy_transformed(Context& destination, const Box& target, Context* source, std::int64_t source_x,
+bool copy_transformed(Context& destination, const Box& target, const Context& source, std::int64_t source_x,
                       std::int64_t source_y, const RowWriter& writer) {
-    if (source == nullptr) {
-        return write_transformed(destination, target, writer);
-    }
-    const Affine& world = source->world;
+    const Affine& world = source.world;
     if (world.m12 != 0 || world.m21 != 0) {
         SetLastError(ERROR_INVALID_PARAMETER);
         return false;
+    }
+    if (target.is_empty()) {
+        return true;
     }
     const auto left = static_cast<double>(source_x);
     const auto top = static_cast<double>(source_y);
@@ -91,34 +66,36 @@ bool copy_transformed(Context& destination, const Box& target, Context* source, 
         {world.x_of(left, 0), world.x_of(left + static_cast<double>(target.right - target.left), 0)});
     const auto [y_least, y_limit] = std::minmax(
         {world.y_of(0, top), world.y_of(0, top + static_cast<double>(target.bottom - target.top))});
-    if (target.is_empty()) {
-        return true;
-    }
     Surface& surface = destination.surface();
-    const Surface* from = &source->surface();
+    const Surface* from = &source.surface();
     Surface picture;
     if (from == &surface) {
-        // Rows are read in an order of their own, so what is read may not change meanwhile.
+        // Pixels would be overwritten before they are read.
         if (!picture.copy(surface)) {
             return false;
         }
         from = &picture;
     }
     const std::optional<AffineRows> rows =
-        followed(AffineRows::create(map, std::max(x_least, 0.0), std::max(y_least, 0.0),
-                                    std::min(x_limit, static_cast<double>(from->width)),
-                                    std::min(y_limit, static_cast<double>(from->height))));
+        AffineRows::create(map, std::max(x_least, 0.0), std::max(y_least, 0.0),
+                           std::min(x_limit, static_cast<double>(from->width)),
+                           std::min(y_limit, static_cast<double>(from->height)));
     if (!rows) {
+        SetLastError(ERROR_ARITHMETIC_OVERFLOW);
         return false;
     }
     const bool words = writer.is_plain_copy() && surface.depth == 32;
-    rows->on(surface, [&](int y, const AffineRows::Run& run) {
+    for (int y = 0; y < surface.height; ++y) {
+        const AffineRows::Run run = rows->row(y, surface.width);
+        if (run.begin >= run.end) {
+            continue;
+        }
         if (words) {
             copy_words(*from, *rows, run, surface.row(y));
         } else {
             copy_run(*from, *rows, run, surface.row(y), writer);
         }
-    });
+    }
     return true;
 }
 

@@ -1,13 +1,13 @@
-// A copy, stretched where the sizes differ, that leaves the pixels of one colour out.
+// A copy, stretched where the sizes differ, that leaves out the pixels of one colour.
 #include <algorithm>
 #include <cstring>
 
 #include "basalt/platform/drawing.h"
 #include "basalt/platform/error.h"
-#include "src/platform/drawing/drawing_target.h"
-#include "src/platform/pixel_format.h"
+#include "src/platform/drawing/objects.h"
+#include "src/platform/pixels/keyed_copy.h"
+#include "src/platform/pixels/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
-#include "src/platform/pixels/row_kernels.h"
 
 namespace {
 
@@ -69,7 +69,7 @@ struct TransparentCopy {
     }
 
     void copy_row(const std::byte* source_row, std::byte* row) const {
-        const std::uint32_t telling = telling_bits(from.depth);
+        const std::uint32_t colour_mask = colour_bits(from.depth);
         in_pieces(part.right - part.left, false, [&](int offset, int size) {
             std::uint32_t values[PIECE];
             std::uint32_t mixed[PIECE];
@@ -78,7 +78,7 @@ struct TransparentCopy {
             bool kept[PIECE];
             for (int i = 0; i < size; ++i) {
                 values[i] = read_pixel(from.depth, source_row, static_cast<int>(columns.of(x + i)));
-                kept[i] = (values[i] & telling) == key;
+                kept[i] = (values[i] & colour_mask) == key;
             }
             converter.convert(std::span(values, count));
             read_pixels(to.depth, row, x, std::span(mixed, count));
@@ -103,8 +103,8 @@ BOOL TransparentBlt(HDC dc, int x, int y, int width, int height, HDC source, int
         SetLastError(ERROR_INVALID_PARAMETER);
         return 0;
     }
-    const std::optional<PixelShift> shift = required_shift(*to);
-    const std::optional<PixelShift> source_shift = required_shift(*from);
+    const std::optional<PixelShift> shift = to->required_shift();
+    const std::optional<PixelShift> source_shift = from->required_shift();
     if (!shift || !source_shift) {
         return 0;
     }

@@ -7,10 +7,10 @@ namespace basalt::platform {
 
 namespace {
 
-constexpr double ONE = 4294967296.0;            // 2^32 places are a source pixel
+constexpr double ONE = 4294967296.0;            // places a source pixel
 constexpr double LARGEST_STEP = 1073741824.0;   // 2^30
 constexpr double LARGEST_PLACE = 2147483647.0;  // coordinates have 32 bits
-constexpr double LARGEST_START = 0x1p90;  // far beyond what steps could bring back, and 122 bits of places
+constexpr double LARGEST_START = 0x1p90;        // out of reach of any steps, and 122 bits of places
 
 // Rounded towards minus infinity; the divisor is positive.
 Int128 floor_divided(Int128 a, Int128 b) {
@@ -73,7 +73,7 @@ std::optional<AffineRows> AffineRows::create(const Affine& map, double left, dou
     return rows;
 }
 
-// The columns i with least <= place + per_column i < limit, out of those from begin to end.
+// Narrows columns to those with least <= place + per_column * column < limit.
 void AffineRows::Coordinate::narrow(Int128 place, std::int64_t& begin, std::int64_t& end) const {
     Int128 first = begin;
     Int128 last = end;

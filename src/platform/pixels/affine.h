@@ -1,11 +1,9 @@
-// Affine maps of the plane, and the rows of pixels that one takes into a rectangle.
+// Affine maps of the plane, and the rows of pixels that one maps into a rectangle.
 #ifndef BASALT_SRC_PLATFORM_PIXELS_AFFINE_H
 #define BASALT_SRC_PLATFORM_PIXELS_AFFINE_H
 
 #include <cstdint>
 #include <optional>
-
-#include "src/platform/pixels/surface.h"
 
 namespace basalt::platform {
 
@@ -27,42 +25,31 @@ struct Affine {
 
     // This map, then the next one.
     Affine then(const Affine& next) const;
-    // What undoes it; nothing when that is not finite.
+    // The inverse map; nothing when it is not finite.
     std::optional<Affine> inverse() const;
 
     static Affine shift(double x, double y) { return {1, 0, 0, 1, x, y}; }
 };
 
-// The pixels whose middles a map takes into a rectangle of the source, row by row, with the places they are
-// taken to. Places are counted in 2^-32 source pixels, so that adding up steps is exact.
+// The pixels whose middles a map takes into a rectangle of the source, row by row, with the places they map
+// to. Places are counted in units of 2^-32 source pixels, so that sums of steps are exact.
 class AffineRows {
 public:
     static constexpr int PLACE_BITS = 32;
 
-    // map: from pixels to the source. The rectangle ends before its right and bottom and is cut to what 32
-    // bits hold. Nothing when a step of one pixel would cross 2^30 source pixels.
+    // map: from pixels to the source. The rectangle excludes its right and bottom and is clamped to 32 bits.
+    // Nothing when a step of one pixel would cross 2^30 source pixels.
     static std::optional<AffineRows> create(const Affine& map, double left, double top, double right,
                                             double bottom);
 
     struct Run {
-        int begin;        // columns; none when not below end
-        int end;          //
+        int begin;        // first column; no run when not below end
+        int end;          // first column outside
         std::uint64_t x;  // place of the first column's middle; later ones wrap harmlessly past the last
         std::uint64_t y;
     };
-    // The run of a row within the columns from 0 to `columns`.
+    // The run of a row within columns 0 to `columns`, excluded.
     Run row(int y, int columns) const;
-
-    // Calls work(y, run) for each row of a surface that has a run.
-    template <typename Work>
-    void on(const Surface& surface, const Work& work) const {
-        for (int y = 0; y < surface.height; ++y) {
-            const Run run = row(y, surface.width);
-            if (run.begin < run.end) {
-                work(y, run);
-            }
-        }
-    }
 
     // Steps of a place from one column to the next.
     std::uint64_t step_x() const { return static_cast<std::uint64_t>(m_x.per_column); }

@@ -1,4 +1,4 @@
-#include "src/platform/pixel_format.h"
+#include "src/platform/pixels/pixel_format.h"
 
 #include <algorithm>
 #include <array>
@@ -13,8 +13,8 @@ constexpr std::array<std::uint32_t, 16> SIXTEEN = {0x000000, 0x800000, 0x008000,
                                                    0x008080, 0xC0C0C0, 0x808080, 0xFF0000, 0x00FF00, 0xFFFF00,
                                                    0x0000FF, 0xFF00FF, 0x00FFFF, 0xFFFFFF};
 
-// The system's ten first and ten last colours. Between them the cube of six levels a channel but for its
-// corners, which are system colours, and 28 greys between those of the cube.
+// The first ten and last ten system colours; between them the cube of six levels a channel without its
+// corners, which are system colours, and 28 greys.
 constexpr std::array<std::uint32_t, 256> make_mix() {
     std::array<std::uint32_t, 256> mix = {0x000000, 0x800000, 0x008000, 0x808000, 0x000080,
                                           0x800080, 0x008080, 0xC0C0C0, 0xC0DCC0, 0xA6CAF0};
@@ -125,9 +125,9 @@ void ValueConverter::convert(std::span<std::uint32_t> values) const {
         return;
     }
     if (m_by_background) {
-        const std::uint32_t telling = telling_bits(m_from);
+        const std::uint32_t colour_mask = colour_bits(m_from);
         for (std::uint32_t& value : values) {
-            value = (value & telling) == m_background ? 1 : 0;
+            value = (value & colour_mask) == m_background ? 1 : 0;
         }
     } else if (m_from <= 8) {
         for (std::uint32_t& value : values) {
@@ -138,7 +138,7 @@ void ValueConverter::convert(std::span<std::uint32_t> values) const {
             value &= COLOUR_BITS;
         }
     } else {
-        // Neighbours are often alike, and the search through a table is long.
+        // Neighbours are often equal, and the search through a table is slow.
         std::uint32_t last = values.empty() ? 0 : values[0];
         std::uint32_t result = value_of_word(m_to, word_of_value(m_from, last));
         for (std::uint32_t& value : values) {

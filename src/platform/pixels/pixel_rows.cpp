@@ -3,8 +3,6 @@
 #include <algorithm>
 #include <cstring>
 
-#include "src/platform/pixels/row_kernels.h"
-
 namespace basalt::platform {
 
 namespace {
@@ -103,7 +101,7 @@ void write_pixels(int depth, std::byte* row, int x, std::span<const std::uint32_
 
 void fill_pixels(int depth, std::byte* row, int x, int count, std::uint32_t value) {
     if (depth == 32) {
-        fill_words(reinterpret_cast<std::uint32_t*>(row) + x, at(count), value);
+        std::fill_n(reinterpret_cast<std::uint32_t*>(row) + x, count, value);
         return;
     }
     with_form(depth, [=](auto form) { form.fill(row, x, count, value); });

@@ -1,5 +1,5 @@
 // Rows of pixels as surfaces store them, at any depth: 1 bit with the left pixel in bit 7, 4 bits with the
-// left one in the high nibble, 24 bits as blue, green, red; whole bytes are in the machine's order.
+// left one in the high nibble, 24 bits as blue, green, red; 16 and 32 bits in the machine's byte order.
 #ifndef BASALT_SRC_PLATFORM_PIXELS_PIXEL_ROWS_H
 #define BASALT_SRC_PLATFORM_PIXELS_PIXEL_ROWS_H
 
@@ -9,7 +9,7 @@
 
 namespace basalt::platform {
 
-// Pixels that are unpacked at a time, on the stack.
+// Pixels unpacked at a time, on the stack.
 inline constexpr int PIECE = 512;
 
 // Reads pixels from column x on.
@@ -24,8 +24,8 @@ void copy_pixels(int depth, std::byte* to, int to_x, const std::byte* from, int 
 // One pixel.
 std::uint32_t read_pixel(int depth, const std::byte* row, int x);
 
-// Calls piece(offset, count) for pieces that together are `count` pixels: from the left, or from the right
-// where what a piece writes is what one to its left has yet to read.
+// Calls piece(offset, count) for pieces that make up `count` pixels: from the left, or from the right where a
+// piece would overwrite what one to its left has yet to read.
 template <typename Piece>
 void in_pieces(int count, bool from_right, const Piece& piece) {
     for (int done = 0; done < count;) {

@@ -5,12 +5,13 @@
 #include <limits>
 
 #include "basalt/platform/error.h"
+#include "src/platform/raster_extras.h"
 
 namespace basalt::platform {
 
 namespace {
 
-// The headers of images hold the bytes of all rows in 32 bits.
+// Image headers hold the bytes of all rows in 32 bits.
 constexpr std::int64_t MOST_BYTES = std::numeric_limits<std::int32_t>::max();
 
 }  // namespace

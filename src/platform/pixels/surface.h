@@ -11,23 +11,19 @@
 
 namespace basalt::platform {
 
-// Bytes of a row of a device-independent image; surfaces store theirs in the same way.
-constexpr std::int64_t image_row_bytes(std::int64_t width, int depth) {
-    return (width * depth + 31) / 32 * 4;
-}
-// Bytes of a row as bitmaps cross the interface.
+// Bytes of a row as CreateBitmap takes it, padded to 16 bits.
 constexpr std::int64_t bitmap_row_bytes(std::int64_t width, int depth) {
     return (width * depth + 15) / 16 * 2;
 }
 
 struct Surface {
-    // All pixels 0. False, with an empty surface, when there is no memory for it or its rows take 2^31
-    // bytes or more; the last error says which.
+    // Makes all pixels 0. False, with an empty surface and the last error set, when out of memory or the rows
+    // take 2^31 bytes or more. Rows are padded to 32 bits, as in a device-independent image.
     bool create(int new_width, int new_height, int new_depth);
-    // An equal surface.
+    // Makes an equal surface; false as create.
     bool copy(const Surface& other);
 
-    // A surface that may not change gives rows that may not either.
+    // A constant surface has constant rows.
     // NOLINTNEXTLINE(readability-make-member-function-const)
     std::byte* row(int y) { return bits.get() + static_cast<std::size_t>(y) * row_bytes; }
     const std::byte* row(int y) const { return bits.get() + static_cast<std::size_t>(y) * row_bytes; }
@@ -46,7 +42,7 @@ struct Surface {
     std::unique_ptr<std::byte, Free> bits;
 };
 
-// A rectangle of coordinates that no sum of two of the interface's can overflow.
+// A rectangle in 64 bits: sums of two 32-bit coordinates do not overflow.
 struct Box {
     std::int64_t left;
     std::int64_t top;

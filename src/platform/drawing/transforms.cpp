@@ -1,4 +1,4 @@
-// A context's coordinates: mapping and graphics mode, and the transform.
+// Coordinates of a context: mapping and graphics mode, and the transform.
 #include <cmath>
 #include <limits>
 #include <optional>
@@ -6,7 +6,7 @@
 
 #include "basalt/platform/device_context.h"
 #include "basalt/platform/error.h"
-#include "src/platform/drawing/graphics_object_kinds.h"
+#include "src/platform/drawing/objects.h"
 
 namespace {
 
@@ -26,7 +26,7 @@ std::optional<Affine> affine_of(const XFORM* transform) {
                   transform->eM22, transform->eDx,  transform->eDy};
 }
 
-// Sets a context's transform, if there is one and it may have it.
+// Sets a transform where the mode permits one and it can be undone.
 BOOL set_world(Context& context, const std::optional<Affine>& world) {
     if (context.graphics_mode != GM_ADVANCED || !world || !world->inverse()) {
         SetLastError(ERROR_INVALID_PARAMETER);
@@ -67,7 +67,7 @@ BOOL DPtoLP(HDC dc, POINT* points, int count) {
     if (context->world == Affine()) {
         return 1;
     }
-    const Affine back = *context->world.inverse();  // every transform that was let in has one
+    const Affine back = *context->world.inverse();  // set_world accepts no other
     const auto logical = [&back](const POINT& point) {
         return std::pair(std::floor(back.x_of(point.x, point.y) + 0.5),
                          std::floor(back.y_of(point.x, point.y) + 0.5));

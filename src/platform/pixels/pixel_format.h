@@ -1,9 +1,9 @@
-// Depths of pixels, and the colours their stored values stand for.
+// Depths of pixels, and the colours that their stored values mean.
 //
-// A value is what a surface stores: a number in the depth's table (1, 4, 8 bits), a 5-5-5 code (16), or the
-// word 0x00RRGGBB (24 and 32, where the high byte of 32 means nothing). A word is a colour in that last form.
-#ifndef BASALT_SRC_PLATFORM_PIXEL_FORMAT_H
-#define BASALT_SRC_PLATFORM_PIXEL_FORMAT_H
+// A value is what a surface stores: an index into the depth's table (1, 4, 8 bits), a 5-5-5 code (16), or the
+// word 0x00RRGGBB (24 and 32; the high byte at 32 is unused). A word is a colour in that last form.
+#ifndef BASALT_SRC_PLATFORM_PIXELS_PIXEL_FORMAT_H
+#define BASALT_SRC_PLATFORM_PIXELS_PIXEL_FORMAT_H
 
 #include <cstdint>
 #include <span>
@@ -23,12 +23,12 @@ constexpr std::uint32_t stored_bits(int depth) {
     return depth == 32 ? 0xFFFFFFFF : (std::uint32_t{1} << depth) - 1;
 }
 
-// The bits of a value that tell its colour.
-constexpr std::uint32_t telling_bits(int depth) {
+// The bits of a value that determine its colour.
+constexpr std::uint32_t colour_bits(int depth) {
     return depth == 16 ? 0x7FFF : stored_bits(depth) & COLOUR_BITS;
 }
 
-// Between a COLORREF and a word: red and blue change places.
+// Between a COLORREF and a word: red and blue are swapped.
 constexpr std::uint32_t word_of_colour(COLORREF colour) {
     return (colour & 0xFF) << 16 | (colour & 0xFF00) | (colour >> 16 & 0xFF);
 }
@@ -36,7 +36,7 @@ constexpr COLORREF colour_of_word(std::uint32_t word) {
     return word_of_colour(word);
 }
 
-// Five bits to eight and back: the top bits repeat below, and the nearest level leads back.
+// Five bits to eight, the top bits repeated below, and back to the nearest level.
 constexpr std::uint32_t word_of_555(std::uint32_t code) {
     const std::uint32_t high = (code & 0x7C00) << 9 | (code & 0x3E0) << 6 | (code & 0x1F) << 3;
     return high | (high >> 5 & 0x070707);
@@ -46,30 +46,30 @@ constexpr std::uint32_t nearest_555(std::uint32_t word) {
     return level(16) << 10 | level(8) << 5 | level(0);
 }
 // The upper five bits of each channel.
-constexpr std::uint32_t cut_555(std::uint32_t word) {
+constexpr std::uint32_t truncated_555(std::uint32_t word) {
     return (word >> 9 & 0x7C00) | (word >> 6 & 0x3E0) | (word >> 3 & 0x1F);
 }
 
 // The words of a depth's table; empty above 8 bits.
 std::span<const std::uint32_t> colour_table(int depth);
 
-// The word a value stands for.
+// The colour of a value.
 std::uint32_t word_of_value(int depth, std::uint32_t value);
 
-// The value whose colour is nearest to a word: the least sum of squares over the channels, the first of
-// equals; at 16 bits either of two equals in a channel, always the same.
+// The value whose colour is nearest to a word: the least sum of squared channel differences, the first of
+// equals. At 16 bits the level of each channel is rounded.
 std::uint32_t value_of_word(int depth, std::uint32_t word);
 inline std::uint32_t value_of_colour(int depth, COLORREF colour) {
     return value_of_word(depth, word_of_colour(colour));
 }
 
-// Brings values of one depth to another.
+// Converts values of one depth to another.
 class ValueConverter {
 public:
-    // As a picture is read: each value to the nearest colour.
+    // For reading a picture: each value to the nearest colour.
     ValueConverter(int from, int to);
-    // As a copy between contexts: monochrome by the destination's text and background colour, to monochrome
-    // by the source's background colour.
+    // For a copy between contexts: from monochrome by the destination's text and background colours, to
+    // monochrome by the source's background colour.
     ValueConverter(int from, int to, COLORREF text, COLORREF background, COLORREF source_background);
 
     // Converts values in place.
@@ -80,7 +80,7 @@ private:
     int m_to;
     bool m_by_background = false;
     std::uint32_t m_background = 0;  // the source's value for it
-    std::uint32_t m_table[256];      // for sources of up to 8 bits; the rest is not set
+    std::uint32_t m_table[256];      // for sources of up to 8 bits; the rest is unset
 };
 
 }  // namespace basalt::platform

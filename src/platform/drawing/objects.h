@@ -1,19 +1,20 @@
-// What stands behind the handles: contexts, bitmaps, brushes, pens.
-#ifndef BASALT_SRC_PLATFORM_DRAWING_GRAPHICS_OBJECT_KINDS_H
-#define BASALT_SRC_PLATFORM_DRAWING_GRAPHICS_OBJECT_KINDS_H
+// The objects behind the handles: contexts, bitmaps, brushes.
+#ifndef BASALT_SRC_PLATFORM_DRAWING_OBJECTS_H
+#define BASALT_SRC_PLATFORM_DRAWING_OBJECTS_H
 
 #include <atomic>
+#include <cstdint>
 #include <optional>
 
 #include "basalt/platform/bitmap.h"
 #include "basalt/platform/device_context.h"
-#include "src/platform/drawing/graphics_handles.h"
+#include "src/platform/drawing/handles.h"
 #include "src/platform/pixels/affine.h"
 #include "src/platform/pixels/surface.h"
 
 namespace basalt::platform {
 
-// What a brush fills or a pen outlines with.
+// What a brush fills with.
 struct Paint {
     COLORREF colour;
     bool draws;
@@ -22,26 +23,21 @@ struct Paint {
 // The stock bitmap's handle: in each context it stands for a pixel of the context's own.
 HGDIOBJ stock_bitmap();
 bool is_stock_object(const void* handle);
+bool is_stock_pen(const void* handle);
 
-// The kind of an object or stock object; nothing for another handle.
-std::optional<GraphicsKind> kind_of(const void* handle);
-
-// What a brush or a pen, as the kind says, paints with; nothing, and ERROR_INVALID_HANDLE, for another
-// handle.
-std::optional<Paint> paint_of(const void* handle, GraphicsKind kind);
+// The paint of a brush; nothing, and ERROR_INVALID_HANDLE, for another handle.
+std::optional<Paint> paint_of(const void* brush);
+bool is_brush(const void* handle);
 
 struct Brush : GraphicsObject {
     static constexpr GraphicsKind KIND = GraphicsKind::BRUSH;
-    explicit Brush(Paint its_paint, GraphicsKind its_kind = KIND)
-        : GraphicsObject(its_kind), paint(its_paint) {}
+    explicit Brush(COLORREF colour) : GraphicsObject(KIND), paint{colour, true} {}
+
+    ~Brush() override { lent.Detach(); }
 
     const Paint paint;
     std::atomic<int> selections{0};  // contexts it is selected into
-};
-
-struct Pen : Brush {
-    static constexpr GraphicsKind KIND = GraphicsKind::PEN;
-    explicit Pen(Paint its_paint) : Brush(its_paint, KIND) {}
+    CBrush lent;                     // what CBrush::FromHandle lends
 };
 
 struct Bitmap : GraphicsObject {
@@ -54,6 +50,16 @@ struct Bitmap : GraphicsObject {
     CBitmap lent;  // what CBitmap::FromHandle lends
 };
 
+struct PixelShift {
+    std::int64_t x;
+    std::int64_t y;
+};
+
+inline Box shifted(const RECT& rectangle, const PixelShift& shift) {
+    return {rectangle.left + shift.x, rectangle.top + shift.y, rectangle.right + shift.x,
+            rectangle.bottom + shift.y};
+}
+
 struct Context : GraphicsObject {
     static constexpr GraphicsKind KIND = GraphicsKind::CONTEXT;
     Context() : GraphicsObject(KIND) {}
@@ -62,14 +68,18 @@ struct Context : GraphicsObject {
     Surface& surface() { return bitmap != nullptr ? bitmap->surface : own; }
     const Surface& surface() const { return bitmap != nullptr ? bitmap->surface : own; }
 
+    // The shift by whole pixels that the transform is; nothing for another transform.
+    std::optional<PixelShift> pixel_shift() const;
+    // The same, with ERROR_NOT_SUPPORTED for another transform.
+    std::optional<PixelShift> required_shift() const;
+
     bool is_screen = false;
-    Surface own;               // the stock bitmap's pixel here; nothing for the screen
-    Bitmap* bitmap = nullptr;  // null while that is selected
+    Surface own;               // the stock bitmap's pixel here; empty for the screen
+    Bitmap* bitmap = nullptr;  // null while the stock bitmap is selected
     HGDIOBJ bitmap_handle = stock_bitmap();
     HGDIOBJ brush_handle = GetStockObject(WHITE_BRUSH);
     HGDIOBJ pen_handle = GetStockObject(BLACK_PEN);
     Paint brush = {0xFFFFFF, true};
-    Paint pen = {0, true};
     COLORREF text = 0;
     COLORREF background = 0xFFFFFF;
     int graphics_mode = GM_COMPATIBLE;

@@ -1,17 +1,17 @@
-// Handles of drawing objects and contexts: numbers that are checked before they are believed.
+// Handles of drawing objects and contexts, checked before they are used.
 //
 // A handle is a slot's number below its generation, which changes with every object the slot holds: the
-// handle of a deleted object is told apart from that of its successor. Looking one up takes no lock. Numbers
-// below 0x10000 are left to stock objects.
-#ifndef BASALT_SRC_PLATFORM_DRAWING_GRAPHICS_HANDLES_H
-#define BASALT_SRC_PLATFORM_DRAWING_GRAPHICS_HANDLES_H
+// handle of a deleted object differs from that of its successor. A lookup takes no lock, which a call per
+// pixel needs. Numbers below 0x10000 are left to stock objects.
+#ifndef BASALT_SRC_PLATFORM_DRAWING_HANDLES_H
+#define BASALT_SRC_PLATFORM_DRAWING_HANDLES_H
 
 #include <cstdint>
 #include <memory>
 
 namespace basalt::platform {
 
-enum class GraphicsKind : std::uint8_t { CONTEXT, BITMAP, BRUSH, PEN, REGION };
+enum class GraphicsKind : std::uint8_t { CONTEXT, BITMAP, BRUSH, REGION };
 
 struct GraphicsObject {
     explicit GraphicsObject(GraphicsKind its_kind) : kind(its_kind) {}
@@ -22,8 +22,8 @@ struct GraphicsObject {
     const GraphicsKind kind;
 };
 
-// Keeps an object under a new handle; null, with the last error set, when the object is null (there was no
-// memory for it) or 65,536 are there already. Threads: thread-safe.
+// Keeps an object under a new handle; null, with the last error set, when the object is null (out of memory)
+// or there are 65,536 already. Threads: thread-safe.
 void* keep_graphics_object(std::unique_ptr<GraphicsObject> object);
 
 // The object of a handle; null for any other. Threads: thread-safe.
@@ -32,7 +32,7 @@ GraphicsObject* find_graphics_object(const void* handle);
 // Takes the object of a handle out; null for any other. Threads: thread-safe.
 std::unique_ptr<GraphicsObject> release_graphics_object(const void* handle);
 
-// The object of a handle, which has to be of a kind; else null and ERROR_INVALID_HANDLE.
+// The object of a handle of one kind; for another handle null and ERROR_INVALID_HANDLE.
 GraphicsObject* object_of_kind(const void* handle, GraphicsKind kind);
 template <typename Object>
 Object* object_of(const void* handle) {

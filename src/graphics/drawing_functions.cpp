@@ -1,26 +1,64 @@
+#include "basalt/graphics/drawing_functions.h"
+
+#include <algorithm>
+#include <cstdint>
+
 #include "basalt/frame.h"
-#include "basalt/graphics/drawing.h"
 #include "basalt/platform/drawing.h"
 #include "src/frame/environment_state.h"
-#include "src/graphics/memory_surface.h"
-#include "src/graphics/os_codes.h"
+#include "src/graphics/owned_objects.h"
+#include "src/platform/raster_extras.h"
 
 namespace basalt::graphics {
 
 namespace {
+
+constexpr basalt_os OS_WITH_MASKS = 2;      // contexts copy between depths
+constexpr basalt_os OS_WITH_GRADIENTS = 5;  // gradients and transparent copies are calls of the platform
+
+/// Stands for the rounded interior, which is left out; corners of this colour show the gradient.
+constexpr COLORREF INSIDE = 0x808080;
+
+/// A channel as 8.8.
+WORD level(BYTE channel) {
+    return static_cast<WORD>(channel << 8);
+}
+
+/// A level divided and truncated, clamped to 16 bits.
+WORD darkened(WORD start, float darkening) {
+    const float end = static_cast<float>(start) / darkening;
+    constexpr float LARGEST = 0xFFFF;
+    if (!(end > 0.0F)) {  // also 0 / 0
+        return 0;
+    }
+    return static_cast<WORD>(std::min(end, LARGEST));
+}
+
+void fill_gradient(HDC dc, const RECT& rectangle, COLORREF colour, float darkening, DWORD mode) {
+    const WORD red = level(GetRValue(colour));
+    const WORD green = level(GetGValue(colour));
+    const WORD blue = level(GetBValue(colour));
+    const TRIVERTEX vertices[] = {
+        {rectangle.left, rectangle.top, red, green, blue, 0},
+        {rectangle.right, rectangle.bottom, darkened(red, darkening), darkened(green, darkening),
+         darkened(blue, darkening), 0},
+    };
+    constexpr GRADIENT_RECT JOINED = {0, 1};
+    GradientFill(dc, vertices, 2, &JOINED, 1, mode);
+}
 
 struct Place {
     HDC dc;
     int x, y;
 };
 
-/// The copy by masks, for a platform without one of its own. The letters are those of the surfaces: S source,
-/// K its copy, R result, M mask (1: transparent), I inverse mask.
+/// The copy by masks, for a platform without a transparent copy. Surfaces: s the source, k its copy, r the
+/// result, m the mask (1: transparent), i the inverse mask.
 void copy_by_masks(Place dest, Place src, int width, int height, COLORREF transparent) {
     const HDC like = dest.dc;
     const MemorySurface s(like, CreateCompatibleBitmap(like, width, height));
     if (BitBlt(s.dc(), 0, 0, width, height, src.dc, src.x, src.y, SRCCOPY) == 0) {
-        return;  // what the surfaces hold otherwise would spoil the destination; so below
+        return;  // the surfaces' contents would spoil the destination; also below
     }
     POINT size = {width, height};
     DPtoLP(src.dc, &size, 1);
@@ -39,7 +77,7 @@ void copy_by_masks(Place dest, Place src, int width, int height, COLORREF transp
     };
     SetMapMode(s.dc(), GetMapMode(like));
     combine(k, s, SRCCOPY);
-    // Going to one bit, what has the source's background colour becomes 1.
+    // To one bit, pixels of the source's background colour become 1.
     const COLORREF background = SetBkColor(s.dc(), transparent);
     combine(m, s, SRCCOPY);
     SetBkColor(s.dc(), background);
@@ -71,4 +109,17 @@ int _transparentblt(HDC dest, int xDest, int yDest, int wDest, int hDest, HDC sr
         return 0;
     }
     return BitBlt(dest, xDest, yDest, wDest, hDest, src, 0, 0, SRCAND);
+}
+
+void _gradientfill(HDC hdc, int left, int top, int right, int bottom, int cornerRadius,
+                   std::uint32_t cornerColour, std::uint32_t colour, float darkening, std::uint32_t mode) {
+    using namespace basalt::graphics;
+    if (basalt::frame::environment.os_code.load() < OS_WITH_GRADIENTS) {
+        return;
+    }
+    const RECT rectangle = {left, top, right, bottom};
+    fill_gradient(hdc, rectangle, colour, darkening, mode);
+    if (cornerRadius > 0) {
+        basalt::platform::fill_outside_rounding(hdc, rectangle, cornerRadius, cornerColour, INSIDE);
+    }
 }

@@ -1,4 +1,4 @@
-#include "src/platform/drawing/graphics_handles.h"
+#include "src/platform/drawing/handles.h"
 
 #include <atomic>
 #include <mutex>
@@ -16,17 +16,17 @@ constexpr std::uint32_t SLOTS = 1U << SLOT_BITS;
 struct Slot {
     std::atomic<GraphicsObject*> object;
     std::atomic<std::uint32_t> generation;
-    std::uint32_t next_free;  // number of the next free slot plus 1; 0 ends the list
+    std::uint32_t next_free;  // number of the next free slot plus 1; 0 at the end of the list
 };
 
-// A megabyte of zeros, of which the system gives only the pages that are used.
+// A megabyte of zeros; only the pages used take memory.
 constinit Slot slots[SLOTS] = {};
 constinit Lock slots_lock;
 constinit std::uint32_t first_free = 0;  // as next_free
-constinit std::uint32_t slots_used = 0;  // those from here on have never held an object
+constinit std::uint32_t slots_used = 0;  // slots from here on have never held an object
 
 void* handle_of(std::uint32_t slot, std::uint32_t generation) {
-    // One more than the generation, so that no handle falls among those of stock objects.
+    // The generation plus 1 keeps handles above those of stock objects.
     const std::uintptr_t upper = std::uintptr_t{generation} + 1;
     return reinterpret_cast<void*>(upper << SLOT_BITS | slot);  // NOLINT(performance-no-int-to-ptr)
 }

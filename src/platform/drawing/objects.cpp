@@ -1,11 +1,12 @@
-#include "basalt/platform/graphics_objects.h"
+#include "src/platform/drawing/objects.h"
 
-#include <cstdlib>
+#include <algorithm>
+#include <cmath>
 #include <cstring>
 #include <new>
 
 #include "basalt/platform/error.h"
-#include "src/platform/drawing/graphics_object_kinds.h"
+#include "src/platform/system/no_destructor.h"
 
 namespace {
 
@@ -14,26 +15,23 @@ using basalt::platform::Brush;
 using basalt::platform::GraphicsKind;
 using basalt::platform::GraphicsObject;
 using basalt::platform::Paint;
-using basalt::platform::Pen;
 
 constexpr std::uintptr_t FIRST_STOCK_HANDLE = 0x8000;
 constexpr std::uintptr_t STOCK_BITMAP = NULL_PEN + 1;
 
-constexpr Paint STOCK_PAINTS[] = {
-    {0xFFFFFF, true}, {0xC0C0C0, true}, {0x808080, true}, {0x404040, true}, {0, true},
-    {0, false},       {0xFFFFFF, true}, {0, true},        {0, false},
-};
+constexpr Paint STOCK_PAINTS[] = {{0xFFFFFF, true}, {0xC0C0C0, true}, {0x808080, true},
+                                  {0x404040, true}, {0, true},        {0, false}};
 
 HGDIOBJ stock_handle(std::uintptr_t number) {
     return reinterpret_cast<HGDIOBJ>(FIRST_STOCK_HANDLE + number);  // NOLINT(performance-no-int-to-ptr)
 }
 
-// Numbers that are too large for a stock object come out for any other handle.
+// Too large for a stock object for any other handle.
 std::uintptr_t stock_number(const void* handle) {
     return reinterpret_cast<std::uintptr_t>(handle) - FIRST_STOCK_HANDLE;
 }
 
-// Whether nothing keeps the object from being deleted; a context is no object in that sense.
+// Why an object cannot be deleted, if so. A context is no object in that sense.
 DWORD deletion_error(const GraphicsObject& object) {
     switch (object.kind) {
         case GraphicsKind::CONTEXT:
@@ -41,7 +39,6 @@ DWORD deletion_error(const GraphicsObject& object) {
         case GraphicsKind::BITMAP:
             return static_cast<const Bitmap&>(object).is_selected ? ERROR_BUSY : ERROR_SUCCESS;
         case GraphicsKind::BRUSH:
-        case GraphicsKind::PEN:
             return static_cast<const Brush&>(object).selections > 0 ? ERROR_BUSY : ERROR_SUCCESS;
         case GraphicsKind::REGION:
             break;
@@ -61,27 +58,39 @@ bool is_stock_object(const void* handle) {
     return stock_number(handle) <= STOCK_BITMAP;
 }
 
-std::optional<GraphicsKind> kind_of(const void* handle) {
-    if (is_stock_object(handle)) {
-        const std::uintptr_t number = stock_number(handle);
-        if (number == STOCK_BITMAP) {
-            return GraphicsKind::BITMAP;
-        }
-        return number <= NULL_BRUSH ? GraphicsKind::BRUSH : GraphicsKind::PEN;
-    }
-    const GraphicsObject* const object = find_graphics_object(handle);
-    return object != nullptr ? std::optional(object->kind) : std::nullopt;
+bool is_stock_pen(const void* handle) {
+    return stock_number(handle) >= WHITE_PEN && stock_number(handle) <= NULL_PEN;
 }
 
-std::optional<Paint> paint_of(const void* handle, GraphicsKind kind) {
-    if (kind_of(handle) != kind) {
-        SetLastError(ERROR_INVALID_HANDLE);
+bool is_brush(const void* handle) {
+    const GraphicsObject* const object = find_graphics_object(handle);
+    return stock_number(handle) <= NULL_BRUSH || (object != nullptr && object->kind == GraphicsKind::BRUSH);
+}
+
+std::optional<Paint> paint_of(const void* brush) {
+    if (stock_number(brush) <= NULL_BRUSH) {
+        return STOCK_PAINTS[stock_number(brush)];
+    }
+    const auto* const object = object_of<Brush>(brush);
+    return object != nullptr ? std::optional(object->paint) : std::nullopt;
+}
+
+std::optional<PixelShift> Context::pixel_shift() const {
+    if (world != Affine::shift(std::trunc(world.dx), std::trunc(world.dy))) {
         return std::nullopt;
     }
-    if (is_stock_object(handle)) {
-        return STOCK_PAINTS[stock_number(handle)];
+    // Beyond this nothing is on a surface, and sums with coordinates stay far from overflow.
+    constexpr double FARTHEST = 0x1p40;
+    return PixelShift{static_cast<std::int64_t>(std::clamp(world.dx, -FARTHEST, FARTHEST)),
+                      static_cast<std::int64_t>(std::clamp(world.dy, -FARTHEST, FARTHEST))};
+}
+
+std::optional<PixelShift> Context::required_shift() const {
+    const std::optional<PixelShift> shift = pixel_shift();
+    if (!shift) {
+        SetLastError(ERROR_NOT_SUPPORTED);
     }
-    return static_cast<const Brush*>(find_graphics_object(handle))->paint;
+    return shift;
 }
 
 }  // namespace basalt::platform
@@ -135,14 +144,35 @@ HGDIOBJ GetStockObject(int number) {
 
 HBRUSH CreateSolidBrush(COLORREF colour) {
     return static_cast<HBRUSH>(basalt::platform::keep_graphics_object(
-        std::unique_ptr<GraphicsObject>(new (std::nothrow) Brush({colour, true}))));
+        std::unique_ptr<GraphicsObject>(new (std::nothrow) Brush(colour))));
 }
 
-HPEN CreatePen(int style, int /*width*/, COLORREF colour) {
-    if (style != PS_SOLID && style != PS_NULL) {
-        SetLastError(ERROR_INVALID_PARAMETER);
+CBrush* CBrush::FromHandle(HBRUSH brush) {
+    if (stock_number(brush) <= NULL_BRUSH) {
+        // Never destroyed: a host's static objects may still use one while the library unloads.
+        struct Wrappers {
+            CBrush lent[NULL_BRUSH + 1];
+            Wrappers() {
+                for (int i = 0; i <= NULL_BRUSH; ++i) {
+                    lent[i].Attach(GetStockObject(i));
+                }
+            }
+        };
+        static basalt::platform::NoDestructor<Wrappers> wrappers;
+        CBrush& wrapper = wrappers->lent[stock_number(brush)];
+        // DeleteObject of the wrapper detaches the handle. Written only then: threads share the wrapper.
+        if (wrapper.m_hObject != brush) {
+            wrapper.m_hObject = brush;
+        }
+        return &wrapper;
+    }
+    auto* const object = basalt::platform::object_of<Brush>(brush);
+    if (object == nullptr) {
         return nullptr;
     }
-    return static_cast<HPEN>(basalt::platform::keep_graphics_object(
-        std::unique_ptr<GraphicsObject>(new (std::nothrow) Pen({colour, style == PS_SOLID}))));
+    // Written once: threads may share the brush.
+    if (object->lent.m_hObject != brush) {
+        object->lent.m_hObject = brush;
+    }
+    return &object->lent;
 }

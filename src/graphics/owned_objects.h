@@ -1,14 +1,14 @@
 /// @file
-/// Surfaces in memory that release what they hold on every way out.
-#ifndef BASALT_SRC_GRAPHICS_MEMORY_SURFACE_H
-#define BASALT_SRC_GRAPHICS_MEMORY_SURFACE_H
+/// Contexts and surfaces in memory that are released on every way out.
+#ifndef BASALT_SRC_GRAPHICS_OWNED_OBJECTS_H
+#define BASALT_SRC_GRAPHICS_OWNED_OBJECTS_H
 
 #include "basalt/platform/bitmap.h"
 #include "basalt/platform/device_context.h"
 
 namespace basalt::graphics {
 
-/// A memory context with a bitmap of the caller selected into it; in the end the bitmap is free again.
+/// A memory context with a bitmap of the caller selected into it until the end.
 class MemoryContext {
 public:
     /// @param like a context to be compatible with
@@ -25,7 +25,7 @@ public:
     MemoryContext(const MemoryContext&) = delete;
     MemoryContext& operator=(const MemoryContext&) = delete;
 
-    /// Whether there is a context, and the bitmap is selected into it.
+    /// Whether there is a context and the bitmap is selected into it.
     bool is_ready() const { return m_before != nullptr; }
     HDC dc() const { return m_dc; }
 
@@ -38,7 +38,7 @@ private:
 class MemorySurface {
 public:
     /// @param like a context to be compatible with
-    /// @param bitmap taken over
+    /// @param bitmap owned from now on
     MemorySurface(HDC like, HBITMAP bitmap) : m_context(like, bitmap) { m_bitmap.Attach(bitmap); }
 
     bool is_ready() const { return m_context.is_ready(); }

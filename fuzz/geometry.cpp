@@ -48,6 +48,45 @@ void any_numbers(Input& input) {
     require(!(out.at(0) < call.low) && !(out[0] > call.high));
 }
 
+bool same(double a, double b) {
+    return std::bit_cast<std::uint64_t>(a) == std::bit_cast<std::uint64_t>(b) ||
+           (std::isnan(a) && std::isnan(b));
+}
+bool same(const geo_llh& a, const geo_llh& b) {
+    return same(a.latitude, b.latitude) && same(a.longitude, b.longitude) && same(a.height, b.height);
+}
+
+// Arrays have the bits of the single calls.
+void arrays(Input& input) {
+    constexpr std::size_t COUNT = 7;
+    geo_llh llh[COUNT], llh_of_one[COUNT] = {}, ends[COUNT], geodetic[COUNT] = {};
+    geo_vector xyz[COUNT] = {}, xyz_of_one[COUNT] = {};
+    double azimuths[COUNT], distances[COUNT], at_ends[COUNT];
+    std::size_t refused = 0, not_settled = 0;
+    const double tolerance = input.byte() % 4 == 0 ? number(input) : 5e-10;
+    for (std::size_t i = 0; i < COUNT; ++i) {
+        const bool is_any = input.byte() % 8 == 0;
+        llh[i] =
+            is_any ? geo_llh{number(input), number(input), number(input)}
+                   : geo_llh{(input.byte() - 128) / 82.0, (input.byte() - 128) / 41.0, input.byte() * 100.0};
+        azimuths[i] = is_any ? number(input) : input.byte() / 41.0;
+        distances[i] = is_any ? number(input) : input.byte() * 5e4;
+        refused += _llh2xyz(&llh[i], &xyz_of_one[i]) == 0 ? 1 : 0;
+        not_settled += _xyz2llh(&xyz_of_one[i], &llh_of_one[i], tolerance) == 0 ? 1 : 0;
+    }
+    require(basalt::to_cartesian(llh, xyz, COUNT) == refused);
+    require(basalt::to_geodetic(xyz_of_one, geodetic, COUNT, tolerance) == not_settled);
+    basalt::direct(llh, azimuths, distances, ends, at_ends, COUNT);
+    for (std::size_t i = 0; i < COUNT; ++i) {
+        double at_end = 0;
+        geo_llh end = {};
+        geo_vincenty_direct(llh[i], azimuths[i], distances[i], at_end, end);
+        require(same(xyz[i].x, xyz_of_one[i].x) && same(xyz[i].y, xyz_of_one[i].y) &&
+                same(xyz[i].z, xyz_of_one[i].z));
+        require(same(geodetic[i], llh_of_one[i]) && same(ends[i], end) && same(at_ends[i], at_end));
+    }
+}
+
 // Every form of each predicate.
 void compare_polygons(const std::vector<geo_nee>& v, const geo_nee& p, double tolerance) {
     const auto n = static_cast<int>(v.size());
@@ -178,7 +217,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     for (int round = 0; round < 20 && !input.is_over(); ++round) {
         const unsigned choice = input.byte();
         if (choice < 128) {
-            any_numbers(input);
+            choice < 112 ? any_numbers(input) : arrays(input);
             continue;
         }
         Random random(input.double_word());

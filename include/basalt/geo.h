@@ -16,12 +16,15 @@
 #ifndef BASALT_GEO_H
 #define BASALT_GEO_H
 
+#include "basalt/geo/angle_text.h"
+#include "basalt/geo/arrays.h"
 #include "basalt/geo/curves.h"
 #include "basalt/geo/ellipsoid.h"
 #include "basalt/geo/geodesic.h"
 #include "basalt/geo/local_frame.h"
 #include "basalt/geo/observations.h"
 #include "basalt/geo/plane.h"
+#include "basalt/geo/polygon_measures.h"
 #include "basalt/geo/prepared_polygon.h"
 #include "basalt/geo/records.h"
 #include "basalt/geo/time_scales.h"

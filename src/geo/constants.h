@@ -9,6 +9,7 @@ namespace basalt::geo {
 inline constexpr double PI = 3.141592653589793;
 inline constexpr double TWO_PI = 6.283185307179586;
 inline constexpr double HALF_PI = 1.5707963267948966;
+inline constexpr double RADIANS_PER_DEGREE = 0.017453292519943295;
 
 /// Angles beyond +- this are not reduced to a bearing; radians.
 inline constexpr double REDUCTION_LIMIT = 100.0;

@@ -11,7 +11,6 @@ using namespace basalt::geo;
 
 namespace {
 
-constexpr double RADIANS_PER_DEGREE = 0.017453292519943295;
 constexpr double METRES_PER_FOOT = 0.3048006096012192;
 constexpr double INCHES_PER_FOOT = 12.0;
 constexpr double SECONDS_ROUNDING = 5e-6;

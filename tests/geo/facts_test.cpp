@@ -49,6 +49,10 @@ Numbers numbers_until(std::istream& line, const std::string& word) {
 /// A call by its name, on the polygon that the facts set last.
 Numbers results_of(const std::string& name, const Numbers& in, const std::vector<geo_nee>& polygon) {
     const auto n = static_cast<int>(polygon.size());
+    if (name == "area_and_perimeter") {
+        return {basalt::polygon_area(polygon.data(), polygon.size()),
+                basalt::polygon_perimeter(polygon.data(), polygon.size())};
+    }
     const geo_nee point = {in[0], in.size() > 1 ? in[1] : 0.0, 99.0};
     if (name == "in_polygon") {
         return {1.0 * geo_point_in_poly(n, polygon.data(), &point)};

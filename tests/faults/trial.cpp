@@ -1,12 +1,14 @@
+#include "tests/faults/trial.h"
+
 #include <unistd.h>
 
 #include <algorithm>
 #include <cstdio>
 #include <set>
+#include <vector>
 
 #include "basalt/memory.h"
-#include "tests/faults/more_system_calls.h"
-#include "tests/faults/trial.h"
+#include "basalt/platform.h"
 #include "tests/support/heap_inspection.h"
 #include "tests/support/open_descriptors.h"
 
@@ -17,155 +19,150 @@ namespace {
 constexpr unsigned SECONDS_AN_OPERATION = 120;  // then a signal ends the program: nothing may hang
 constexpr int MOST_CALLS = 5000;
 
-struct Totals {
-    int operations = 0;
-    int points = 0;
-    int faults = 0;
-};
-Totals totals;
+int operations = 0, points = 0, faults = 0;
+const test::ScratchFolder* current_folder = nullptr;
+std::vector<HBRUSH> taken_handles;
 
-// Whether a file is one that the library makes for itself; the others are a case's own.
-bool is_temporary(const std::string& name) {
-    return name.starts_with("vma") || name.starts_with("~") || name.starts_with("held");
+// Files that the library makes for itself; the others are a case's own.
+std::size_t temporary_files() {
+    return static_cast<std::size_t>(
+        std::ranges::count_if(Trial::folder().names(), [](const std::string& name) {
+            return name.starts_with("vma") || name.starts_with("~") || name.starts_with("held");
+        }));
 }
 
-// What is held; two that agree say that nothing leaked in between.
 struct Holdings {
     long blocks = live_allocations();
     long mapped = test::mapped_balance();
+    long unmap_refused = test::refused_to_unmap();
     long descriptors = test::open_descriptors();
     std::size_t shared_blocks =
-        basalt::platform::inspect_heap(vex_lib::vlSharedMemoryHeap::GetHeapHandle()).live_blocks;
-    std::size_t files;
-
-    explicit Holdings(const test::ScratchFolder& folder)
-        : files(static_cast<std::size_t>(std::ranges::count_if(folder.names(), is_temporary))) {}
+        platform::inspect_heap(vex_lib::vlSharedMemoryHeap::GetHeapHandle()).live_blocks;
+    std::size_t files = temporary_files();
+    long files_kept = test::files_made_to_stay();
 };
 
-// What stayed behind though nothing was made to stay; empty when nothing did. The shared heap may keep
-// regions, so the first run of a case, which takes them, does not count.
-std::string leak(const test::ScratchFolder& folder, const Holdings& before, long unmap_refused,
-                 long files_kept) {
-    const Holdings after(folder);
-    if (after.blocks != before.blocks && unmap_refused == 0) {
-        return "blocks: " + std::to_string(after.blocks - before.blocks) + " more";
+// What stayed behind though nothing was made to stay; empty when nothing did.
+std::string leak(const Holdings& before) {
+    const Holdings after;
+    const bool unmaps = after.unmap_refused == before.unmap_refused;
+    if (unmaps && after.blocks != before.blocks) {
+        return std::to_string(after.blocks - before.blocks) + " blocks leaked";
     }
-    if (after.mapped != before.mapped && unmap_refused == 0) {
-        return "mapped bytes: " + std::to_string(after.mapped - before.mapped) + " more";
+    if (unmaps && after.mapped != before.mapped) {
+        return std::to_string(after.mapped - before.mapped) + " mapped bytes leaked";
     }
-    if (after.descriptors != before.descriptors) {
-        return "descriptors: " + std::to_string(after.descriptors - before.descriptors) + " more";
-    }
-    if (after.shared_blocks != before.shared_blocks) {
-        return "blocks of the shared heap";
-    }
-    if (after.files > before.files + static_cast<std::size_t>(files_kept)) {
-        return "a temporary file";
-    }
-    return "";
+    const bool keeps_file =
+        after.files > before.files + static_cast<std::size_t>(after.files_kept - before.files_kept);
+    return after.descriptors != before.descriptors       ? "a descriptor leaked"
+           : after.shared_blocks != before.shared_blocks ? "a block of the shared heap leaked"
+           : keeps_file                                  ? "a temporary file stayed"
+                                                         : "";
 }
 
-struct Result {
-    bool struck;
-    std::string fault;
-};
-
-Result run_once(const Case& run, const Failure& failure, const test::ScratchFolder& folder) {
-    const Holdings before(folder);
-    const long unmap_before = test::refused_to_unmap();
-    const long files_before = files_made_to_stay();
-    Result result;
+// The fault found; whether a call was made to fail.
+std::pair<std::string, bool> run_once(const Case& run, const Failure& failure) {
+    const Holdings before;
+    std::pair<std::string, bool> result;
     {
-        Trial trial(failure, folder);
+        Trial trial(failure);
         run(trial);
-        result = {trial.was_ever_struck(), trial.fault()};
+        result = {trial.fault(), trial.was_ever_struck()};
     }
-    if (result.fault.empty()) {
-        result.fault = leak(folder, before, test::refused_to_unmap() - unmap_before,
-                            files_made_to_stay() - files_before);
+    if (result.first.empty()) {
+        result.first = leak(before);
     }
-    for (const std::string& name : folder.names()) {
-        std::filesystem::remove(folder / name);
+    for (const std::string& name : Trial::folder().names()) {
+        std::filesystem::remove(Trial::folder() / name);
     }
     return result;
 }
 
-const char* name_of(Source source) {
-    constexpr const char* NAMES[] = {"heap", "malloc", "system"};
-    return NAMES[static_cast<int>(source)];
-}
-
 }  // namespace
+
+const test::ScratchFolder& Trial::folder() {
+    return *current_folder;
+}
 
 void Trial::begin() {
     if (m_failure.nth == 0) {
         return;
     }
+    using Then = test::SystemFailure::Then;
     switch (m_failure.source) {
         case Source::HEAP:
             m_heap.emplace(m_failure.nth, m_failure.stays);
             break;
-        case Source::MALLOC:
-            m_malloc.emplace(m_failure.nth);
-            break;
         case Source::SYSTEM:
-            m_system.emplace(m_failure.nth, m_failure.stays ? test::SystemFailure::Then::STAYS
-                                                            : test::SystemFailure::Then::RECOVERS);
+            m_system.emplace(m_failure.nth, m_failure.stays ? Then::STAYS : Then::RECOVERS);
+            break;
+        case Source::HANDLES:
+            while (HBRUSH const brush = CreateSolidBrush(0)) {
+                taken_handles.push_back(brush);
+            }
+            for (int left = 1; left < m_failure.nth; ++left) {
+                DeleteObject(taken_handles.back());
+                taken_handles.pop_back();
+            }
             break;
     }
+}
+
+bool Trial::strikes() const {
+    return (m_heap && m_heap->fired()) || (m_system && test::SystemFailure::struck());
 }
 
 void Trial::end() {
-    m_struck = (m_heap && m_heap->fired()) || (m_malloc && test::HeapFailure::struck()) ||
-               (m_system && test::SystemFailure::struck());
+    m_struck = strikes() || (m_failure.source == Source::HANDLES && !m_done);
+    std::ranges::for_each(taken_handles, [](HBRUSH brush) { DeleteObject(brush); });
+    std::vector<HBRUSH>().swap(taken_handles);
     m_was_ever_struck |= m_struck;
     m_heap.reset();
-    m_malloc.reset();
     m_system.reset();
 }
 
-void check(const char* operation, const Case& run) {
+void check(const char* operation, const Case& run, Handles handles) {
     const test::ScratchFolder folder;
+    current_folder = &folder;
     alarm(SECONDS_AN_OPERATION);
-    int points = 0;
-    std::set<std::string> faults;
-    const auto note = [&](const Failure& failure, const std::string& fault) {
+    int tried = 0;
+    std::set<std::string> found;
+    const auto run_with = [&](const Failure& failure) {
+        constexpr const char* NAMES[] = {"heap", "system", "handles"};
+        const auto [fault, struck] = run_once(run, failure);
         if (!fault.empty()) {
-            faults.insert(fault + " [" + name_of(failure.source) + " call " + std::to_string(failure.nth) +
-                          (failure.stays ? " and later" : "") + "]");
+            found.insert(fault + " [" + NAMES[static_cast<int>(failure.source)] + " call " +
+                         std::to_string(failure.nth) + (failure.stays ? " and later" : "") + "]");
         }
+        return struck;
     };
-    run_once(run, {Source::HEAP, false, 0}, folder);  // tables made once, regions kept
-    note({}, run_once(run, {Source::HEAP, false, 0}, folder).fault);
-    for (const Source source : {Source::HEAP, Source::MALLOC, Source::SYSTEM}) {
-        for (const bool stays : {false, true}) {
-            for (int nth = 1; nth <= MOST_CALLS && !(stays && source == Source::MALLOC); ++nth) {
-                const Failure failure = {source, stays, nth};
-                const Result result = run_once(run, failure, folder);
-                note(failure, result.fault);
-                if (!result.struck) {
-                    break;
-                }
-                ++points;
+    run_once(run, {Source::HEAP, false, 0});  // tables are made once, and regions of the shared heap kept
+    run_with({Source::HEAP, false, 0});
+    for (const auto& [source, stays] :
+         {std::pair(Source::HEAP, false), std::pair(Source::HEAP, true), std::pair(Source::SYSTEM, false),
+          std::pair(Source::SYSTEM, true), std::pair(Source::HANDLES, true)}) {
+        for (int nth = 1; nth <= MOST_CALLS && (source != Source::HANDLES || handles == Handles::FAIL);
+             ++nth) {
+            if (!run_with({source, stays, nth})) {
+                break;
             }
+            ++tried;
         }
     }
     alarm(0);
-    std::printf("%-44s %6d  %s\n", operation, points, faults.empty() ? "ok" : "FAULTS");
-    int shown = 0;
-    for (const std::string& fault : faults) {
-        std::printf("    %s\n", ++shown <= 10 ? fault.c_str() : ".");
+    std::printf("%-44s %6d  %s\n", operation, tried, found.empty() ? "ok" : "FAULTS");
+    for (const std::string& fault : found) {
+        std::printf("    %s\n", fault.c_str());
     }
     std::fflush(stdout);
-    ++totals.operations;
-    totals.points += points;
-    totals.faults += static_cast<int>(faults.size());
+    ++operations;
+    points += tried;
+    faults += static_cast<int>(found.size());
 }
 
 bool report_totals() {
-    std::printf("%d operations, %d failure points, %d faults\n", totals.operations, totals.points,
-                totals.faults);
-    return totals.faults == 0;
+    std::printf("%d operations, %d failure points, %d faults\n", operations, points, faults);
+    return faults == 0;
 }
 
 }  // namespace basalt::faults

@@ -1,4 +1,4 @@
-// Each operation is tried with its n-th call of the heap or the system failing, for every n there is.
+// Each operation is tried with its n-th call of the heap or the system failing, for every n.
 #ifndef BASALT_TESTS_FAULTS_TRIAL_H
 #define BASALT_TESTS_FAULTS_TRIAL_H
 
@@ -10,15 +10,14 @@
 
 #include "basalt/platform/cstring.h"
 #include "tests/support/failing_new.h"
-#include "tests/support/heap_calls.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
 
 namespace basalt::faults {
 
-// Whose call fails. A program built with a sanitizer has the sanitizer's heap, which cannot be replaced:
-// there `operator new` and malloc are counted apart, and the other libraries' own calls do not fail.
-enum class Source { HEAP, MALLOC, SYSTEM };
+// The resource that fails. With a sanitizer, whose heap cannot be replaced, HEAP is `operator new` alone.
+// HANDLES: nth - 1 handles of drawing objects are left.
+enum class Source { HEAP, SYSTEM, HANDLES };
 
 struct Failure {
     Source source;
@@ -26,27 +25,32 @@ struct Failure {
     int nth;     // from 1; 0: none fails
 };
 
-// One run of an operation. What a case does outside attempt() does not fail.
+// One run of an operation. Only calls within attempt(), throws() and succeeds() fail.
 class Trial {
 public:
-    Trial(const Failure& failure, const test::ScratchFolder& folder) : m_folder(folder), m_failure(failure) {}
+    explicit Trial(const Failure& failure) : m_failure(failure) {}
 
-    // Does the work that is on trial; true when it left for want of memory (or of the length of a text).
-    template <class Work>
-    bool throws(Work work) {
-        return guarded([&] {
-            try {
-                work();
-                return false;
-            } catch (const std::exception&) {
-                return true;
-            }
-        });
-    }
-    // The same for work that may not throw: its result.
     template <class Work>
     auto attempt(Work work) noexcept {
-        return guarded(work);
+        const EndOfFailure end{*this};
+        begin();
+        return work();
+    }
+    // Whether the work throws.
+    template <class Work>
+    bool throws(Work work) {
+        return !succeeds([&] { return work(), true; });
+    }
+    // The result of the work, false if it throws.
+    template <class Work>
+    bool succeeds(Work work) {
+        const EndOfFailure end{*this};
+        begin();
+        try {
+            return m_done = work();
+        } catch (const std::exception&) {
+            return m_done = false;
+        }
     }
 
     void expect(bool holds, const char* what) {
@@ -55,21 +59,16 @@ public:
         }
     }
 
-    // Whether the last attempt had a call that was made to fail; whether any had.
+    // Whether a call of the present attempt has been made to fail; of the last attempt; of any.
+    bool strikes() const;
     bool struck() const { return m_struck; }
-    bool fails_memory() const { return m_failure.source != Source::SYSTEM; }
     bool was_ever_struck() const { return m_was_ever_struck; }
+    bool fails_memory() const { return m_failure.source == Source::HEAP; }
     const std::string& fault() const { return m_fault; }
-    const test::ScratchFolder& folder() const { return m_folder; }
-    CString path(const char* name) const { return CString((m_folder / name).c_str()); }
+    static const test::ScratchFolder& folder();
+    static CString path(const char* name) { return CString((folder() / name).c_str()); }
 
 private:
-    template <class Work>
-    auto guarded(Work work) {
-        const EndOfFailure end{*this};
-        begin();
-        return work();
-    }
     struct EndOfFailure {
         Trial& trial;
         ~EndOfFailure() { trial.end(); }
@@ -77,21 +76,40 @@ private:
     void begin();
     void end();
 
-    const test::ScratchFolder& m_folder;
     Failure m_failure;
     std::optional<FailAllocation> m_heap;
-    std::optional<test::HeapFailure> m_malloc;
     std::optional<test::SystemFailure> m_system;
+    bool m_done = true;
     bool m_struck = false;
     bool m_was_ever_struck = false;
     std::string m_fault;
 };
 
 using Case = std::function<void(Trial&)>;
+enum class Handles { SERVE, FAIL };
 
 // Runs a case with every failure there is and prints a line of the table. Nothing may stay behind: no block,
 // no page, no descriptor, no file.
-void check(const char* operation, const Case& run);
+void check(const char* operation, const Case& run, Handles handles = Handles::SERVE);
+
+// The common form: a row is a type.
+//   Row()         makes the object on trial; nothing fails here
+//   act()         the operation: whether it did its work, or an exception (`noexcept` where none may leave)
+//   holds(done)   whether the object is as promised after an act that did its work, or that did not
+// An act fails only for a reason, and succeeds when it is repeated without one.
+template <class Row>
+void run(const char* operation, Handles handles = Handles::SERVE) {
+    check(
+        operation,
+        [](Trial& trial) {
+            Row row;
+            const bool done = trial.succeeds([&] { return row.act(); });
+            trial.expect(done || trial.struck(), "fails for no reason");
+            trial.expect(row.holds(done), done ? "not as promised" : "not as promised after a failure");
+            trial.expect(done || (row.act() && row.holds(true)), "not usable after a failure");
+        },
+        handles);
+}
 
 // Whether all lines so far were in order; prints the totals.
 bool report_totals();

@@ -1,29 +1,22 @@
-// The general-purpose heap of the whole program, other libraries' use of it too, made to fail: the program's
-// own malloc in front of the C library's. It stands in for tests/support/failing_new.cpp and heap_calls.cpp.
+// The program's own malloc in front of the C library's, so that other libraries' use of the heap fails too.
+// It replaces tests/support/failing_new.cpp.
 #include <cerrno>
 #include <cstddef>
 
 #include "tests/support/failing_new.h"
-#include "tests/support/heap_calls.h"
 
 namespace {
 
 constinit thread_local long calls_left = 0;  // until one fails; 0: none will
-constinit thread_local bool failure_stays = false;
-constinit thread_local bool has_fired = false;
+constinit thread_local bool failure_stays = false, has_fired = false;
 constinit thread_local long live_blocks = 0;
-
-bool must_fail() {
-    if (has_fired) {
-        return failure_stays;
-    }
-    has_fired = calls_left > 0 && --calls_left == 0;
-    return has_fired;
-}
 
 template <class Take>
 void* taken(const void* before, Take take) {
-    if (must_fail()) {
+    if (basalt::test::failures_are_paused ? false
+        : has_fired                       ? failure_stays
+                                          : calls_left > 0 && --calls_left == 0) {
+        has_fired = true;
         errno = ENOMEM;
         return nullptr;
     }
@@ -82,14 +75,3 @@ bool FailAllocation::fired() const {
 long live_allocations() {
     return live_blocks;
 }
-
-namespace basalt::test {
-
-HeapFailure::HeapFailure(int) {}
-HeapFailure::~HeapFailure() = default;
-
-bool HeapFailure::struck() {
-    return false;
-}
-
-}  // namespace basalt::test

@@ -1,38 +1,23 @@
 #include "basalt/memory/memory_map.h"
 
 #include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
-#include <cstdlib>
+#include <csignal>
 #include <filesystem>
 #include <set>
 #include <string>
-#include <type_traits>
 
 #include "src/platform/file.h"
-#include "tests/memory/mapped_bytes.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 #include "tests/support/system_failures.h"
-#include "tests/support/with_failing_allocations.h"
-#include "tests/support/with_failing_calls.h"
-
-namespace {
-thread_local bool heap_is_exhausted = false;
-}
-
-extern "C" {
-void* __real_calloc(size_t, size_t);
-void* __wrap_calloc(size_t count, size_t size) {
-    return heap_is_exhausted ? nullptr : __real_calloc(count, size);
-}
-}
 
 namespace {
 
-using basalt::test::bytes;
-using basalt::test::mapped_balance;
 using basalt::test::open_descriptors;
 using basalt::test::ScratchFolder;
 using basalt::test::SystemFailure;
@@ -41,81 +26,65 @@ using Names = std::set<std::string>;
 
 constexpr unsigned long SIZE = 100'000;
 
-bool is_usable(const CMemoryMap& map, std::size_t size) {
+char* bytes(const CMemoryMap& map) {
+    return static_cast<char*>(static_cast<void*>(map));
+}
+
+bool is_zero_and_usable(const CMemoryMap& map, std::size_t size) {
     char* const data = bytes(map);
-    if (data == nullptr || std::count(data, data + size, 0) != static_cast<long>(size)) {
-        return false;
-    }
-    std::fill_n(data, size, 'x');
-    return true;
+    return data != nullptr && std::count(data, data + size, 0) == static_cast<long>(size) &&
+           std::fill_n(data, size, 'x') != nullptr;
 }
 
 TEST(MemoryMap, is_a_hidden_file_while_it_lives) {
     const ScratchFolder folder;
-    const long mapped = mapped_balance();
     const long descriptors = open_descriptors();
     {
         CMemoryMap map(SIZE);
-        EXPECT_TRUE(is_usable(map, SIZE));
-        ASSERT_EQ(folder.names().size(), 1U);
+        EXPECT_TRUE(is_zero_and_usable(map, SIZE));
         const std::string name = *folder.names().begin();
         EXPECT_EQ(name.substr(0, 3) + name.substr(8), "~00.mem");
         EXPECT_EQ(name.substr(3, 5).find_first_not_of("0123456789"), std::string::npos) << name;
         EXPECT_EQ(std::filesystem::file_size(folder / name), SIZE);
         EXPECT_EQ(open_descriptors(), descriptors);
-
-        EXPECT_TRUE(map.Create(2 * SIZE)) << "the first block and its file are given up";
-        EXPECT_TRUE(is_usable(map, 2 * SIZE));
-        EXPECT_EQ(folder.names().size(), 1U);
-        EXPECT_TRUE(map.Destroy());
+        EXPECT_TRUE(map.Create(2 * SIZE) && is_zero_and_usable(map, 2 * SIZE));
+        EXPECT_EQ(folder.names().size(), 1U) << "the first file is deleted";
+        EXPECT_TRUE(map.Destroy() && map.Destroy());
         EXPECT_EQ(bytes(map), nullptr);
         EXPECT_EQ(folder.names(), Names{});
         EXPECT_TRUE(map.Create(1));
+        EXPECT_FALSE(map.Create(0x100000001)) << "refused, not truncated to one byte";
+        EXPECT_EQ(bytes(map), nullptr);
+        EXPECT_TRUE(map.Create(1));
     }
     EXPECT_EQ(folder.names(), Names{});
-    EXPECT_EQ(mapped_balance(), mapped);
-    CMemoryMap empty;
-    EXPECT_EQ(bytes(empty), nullptr);
-    EXPECT_TRUE(empty.Destroy());
-    static_assert(!std::is_copy_constructible_v<CMemoryMap> && !std::is_copy_assignable_v<CMemoryMap>);
 }
 
+// 245 characters of the folder, a separator and 12 of the file's name (with its own) are 259, the most.
 TEST(MemoryMap, without_a_file_it_is_on_the_heap) {
     const ScratchFolder folder;
-    const long mapped = mapped_balance();
-    for (const std::string& place :
-         {folder / "missing", std::string(300, 'x'), folder / std::string(238, 'y')}) {
+    const auto long_folder = [&](std::size_t length) {
+        return folder / std::string(length - folder.path().size() - 1, 'd');
+    };
+    const std::pair<std::string, bool> ROWS[] = {{folder / "missing", false},
+                                                 {std::string(300, 'x'), false},
+                                                 {long_folder(246), false},
+                                                 {long_folder(245), true}};
+    for (const auto& [place, has_file] : ROWS) {
+        place.size() > 200 && place.size() < 300 ? std::filesystem::create_directory(place) : false;
         ScratchFolder::set_temporary(place);
-        CMemoryMap map(1024);
-        EXPECT_TRUE(is_usable(map, 1024));
+        const CMemoryMap map(1024);
+        EXPECT_TRUE(is_zero_and_usable(map, 1024));
         CMemoryMap::CleanUp();
-        EXPECT_EQ(mapped_balance(), mapped);
+        std::error_code missing;
+        EXPECT_EQ(std::filesystem::exists(place, missing) && !std::filesystem::is_empty(place), has_file)
+            << place.size();
     }
     ScratchFolder::set_temporary(folder.path());
-    CMemoryMap none(0);
-    EXPECT_NE(bytes(none), nullptr);
-    EXPECT_EQ(folder.names(), Names{});
-    CMemoryMap map(SIZE);
-    EXPECT_FALSE(map.Create(0x100000001)) << "refused, not cut to one byte";
-    EXPECT_EQ(bytes(map), nullptr);
-    EXPECT_EQ(folder.names(), Names{});
+    EXPECT_NE(bytes(CMemoryMap(0)), nullptr);
 }
 
-// Of a folder's 245 characters, two separators and 12 of the file's own name comes 259.
-TEST(MemoryMap, the_longest_name_that_fits) {
-    const ScratchFolder folder;
-    for (const std::size_t length : {245U, 246U}) {
-        const std::string place = folder / std::string(length - folder.path().size() - 1, 'd');
-        ASSERT_EQ(place.size(), length);
-        std::filesystem::create_directory(place);
-        ScratchFolder::set_temporary(place);
-        const CMemoryMap map(SIZE);
-        EXPECT_NE(bytes(map), nullptr);
-        EXPECT_EQ(std::filesystem::is_empty(place), length == 246) << length;
-    }
-}
-
-TEST(MemoryMap, deletes_the_file_it_made_and_a_stale_one_of_its_name_in_the_folder_of_then) {
+TEST(MemoryMap, deletes_its_own_file_and_an_unheld_one_of_its_name_in_the_current_folder) {
     const ScratchFolder folder;
     std::filesystem::create_directory(folder / "other");
     for (const bool is_held : {false, true}) {
@@ -135,103 +104,90 @@ TEST(MemoryMap, deletes_the_file_it_made_and_a_stale_one_of_its_name_in_the_fold
     }
 }
 
-TEST(MemoryMap, the_last_free_number_is_found) {
+TEST(MemoryMap, finds_the_last_free_number_or_takes_the_heap) {
     const ScratchFolder folder;
-    const std::string taken[] = {folder / "odd",
-                                 folder / "even"};  // a file has hardly more than 65,000 names
-    folder.write("odd");
-    folder.write("even");
-    char name[20];
+    folder.write("odd"), folder.write("even");  // a file has at most about 65,000 names
     for (int number = 0; number < 65'535; ++number) {
+        char name[20];
         std::snprintf(name, sizeof name, "~%07i.mem", number);
-        if (number != 54'321) {
-            ASSERT_EQ(link(taken[number % 2].c_str(), (folder / name).c_str()), 0);
-        }
+        ASSERT_TRUE(number == 54'321 || link((folder / (number % 2 != 0 ? "odd" : "even")).c_str(),
+                                             (folder / name).c_str()) == 0);
     }
     const CMemoryMap map(SIZE);
     EXPECT_TRUE(std::filesystem::exists(folder / "~0054321.mem"));
+    EXPECT_TRUE(is_zero_and_usable(CMemoryMap(SIZE), SIZE));
 }
 
-TEST(MemoryMap, with_all_numbers_taken_a_block_comes_from_the_heap) {
+TEST(MemoryMap, clean_up_deletes_what_no_process_holds) {
     const ScratchFolder folder;
-    CMemoryMap map;
-    {
-        const SystemFailure taken(1, SystemFailure::Then::STAYS, EEXIST);
-        EXPECT_TRUE(map.Create(SIZE));
+    const Names KEPT = {"x~0000001.mem", "~0000001.tmp", "~0000001.MEM",
+                        "vma1.tmp",      "~folder.mem",  "~within"};
+    std::filesystem::create_directory(folder / "~folder.mem");
+    std::filesystem::create_directory(folder / "~within");
+    for (const char* name :
+         {"~0000001.mem", "~.mem", "~other~.mem", "~\xFF.mem", "x~0000001.mem", "~0000001.tmp",
+          "~0000001.MEM", "vma1.tmp", "~within/kept.mem", "~within\\kept.mem"}) {
+        folder.write(name);
     }
-    EXPECT_TRUE(is_usable(map, SIZE));
-    EXPECT_EQ(folder.names(), Names{});
-    {
-        const SystemFailure taken(1, SystemFailure::Then::RECOVERS, EEXIST);
-        EXPECT_TRUE(map.Create(SIZE)) << "the next number is free";
+    const CMemoryMap map(SIZE);
+    CMemoryMap::CleanUp();
+    EXPECT_TRUE(std::filesystem::exists(folder / "~within/kept.mem"))
+        << "a backslash in a name is no separator";
+    const Names left = folder.names();
+    EXPECT_TRUE(std::includes(left.begin(), left.end(), KEPT.begin(), KEPT.end()));
+    EXPECT_EQ(left.size(), KEPT.size() + 1);
+}
+
+// A child that makes blocks and is killed, or exits, once it has said so.
+pid_t child_with_blocks(int count, bool exits) {
+    int ready[2];
+    EXPECT_EQ(pipe(ready), 0);
+    const pid_t child = fork();
+    if (child == 0) {
+        for (int i = 0; i < count; ++i) {
+            bytes(*new CMemoryMap(SIZE))[SIZE - 1] = 'x';
+        }
+        EXPECT_EQ(write(ready[1], "!", 1), 1);
+        exits ? std::exit(0) : static_cast<void>(pause());
     }
+    char byte;
+    EXPECT_EQ(read(ready[0], &byte, 1), 1);
+    close(ready[0]), close(ready[1]);
+    return child;
+}
+
+TEST(MemoryMap, files_of_killed_processes_are_deleted_and_those_of_living_ones_kept) {
+    const ScratchFolder folder;
+    const CMemoryMap ours(SIZE);
+    waitpid(child_with_blocks(3, true), nullptr, 0);
+    EXPECT_EQ(folder.names().size(), 1U) << "an exit takes its files along, and leaves the parent's";
+    const pid_t killed = child_with_blocks(40, false), living = child_with_blocks(20, false);
+    kill(killed, SIGKILL), waitpid(killed, nullptr, 0);
+    EXPECT_EQ(folder.names().size(), 61U);
+    CMemoryMap::CleanUp();
+    EXPECT_EQ(folder.names().size(), 21U);
+    kill(living, SIGKILL), waitpid(living, nullptr, 0);
+    CMemoryMap::CleanUp();
     EXPECT_EQ(folder.names().size(), 1U);
 }
 
-TEST(MemoryMap, clean_up_deletes_what_nobody_holds) {
-    const ScratchFolder folder;
-    CMemoryMap::CleanUp();
-    for (const char* name : {"~0000001.mem", "~.mem", "~other~.mem", "~\xFF.mem", "x~0000001.mem",
-                             "~0000001.tmp", "~0000001.MEM", "vma1.tmp"}) {
-        folder.write(name);
-    }
-    std::filesystem::create_directory(folder / "~folder.mem");
-    // A name that would lead elsewhere if its `\` were a separator.
-    std::filesystem::create_directory(folder / "~within");
-    folder.write("~within/kept.mem");
-    folder.write("~within\\kept.mem");
-    const CMemoryMap map(SIZE);
-    CMemoryMap::CleanUp();
-    EXPECT_TRUE(std::filesystem::remove(folder / "~within/kept.mem"));
-    EXPECT_TRUE(std::filesystem::remove(folder / "~within"));
-    Names left = folder.names();
-    for (const char* name : {"x~0000001.mem", "~0000001.tmp", "~0000001.MEM", "vma1.tmp", "~folder.mem"}) {
-        EXPECT_EQ(left.erase(name), 1U) << name;
-    }
-    EXPECT_EQ(left.size(), 1U);
-    bytes(map)[SIZE - 1] = 'x';
-}
+// Constructed before any file is made, and so destroyed after those that are left have been deleted.
+void (*at_the_end)() = nullptr;
+const struct AtTheEnd {
+    AtTheEnd() {}
+    ~AtTheEnd() { at_the_end != nullptr ? at_the_end() : void(); }
+} the_end;
 
-TEST(MemoryMap, every_failing_call_is_made_up_for_by_the_heap) {
+TEST(MemoryMap, a_block_made_while_the_process_ends_leaves_no_file) {
     const ScratchFolder folder;
-    const long mapped = mapped_balance();
-    const long descriptors = open_descriptors();
-    CMemoryMap map;
-    bool is_made = false;
-    basalt::test::with_failing_calls([&] { is_made = map.Create(SIZE); },
-                                     [&](bool fails) {
-                                         EXPECT_TRUE(is_made);
-                                         EXPECT_TRUE(is_usable(map, SIZE));
-                                         EXPECT_EQ(folder.names().size(), fails ? 0U : 1U);
-                                         EXPECT_EQ(open_descriptors(), descriptors);
-                                         map.Destroy();
-                                         EXPECT_EQ(folder.names(), Names{});
-                                     });
-    {
-        const SystemFailure failure(1);
-        heap_is_exhausted = true;
-        is_made = map.Create(SIZE);
-        heap_is_exhausted = false;
+    const pid_t child = fork();
+    if (child == 0) {
+        at_the_end = [] { bytes(*new CMemoryMap(SIZE))[SIZE - 1] = 'x'; };
+        const CMemoryMap first(SIZE);
+        std::exit(0);
     }
-    EXPECT_FALSE(is_made);
-    EXPECT_EQ(bytes(map), nullptr);
-    with_failing_allocations([&] { map.Create(SIZE); },
-                             [&](bool failed) {
-                                 EXPECT_TRUE(is_usable(map, SIZE));
-                                 EXPECT_EQ(folder.names().size(), failed ? 0U : 1U);
-                                 map.Destroy();
-                             });
-    with_failing_allocations(
-        [&] {
-            map.Create(SIZE);
-            CMemoryMap::CleanUp();
-            map.Destroy();
-        },
-        [&](bool) {
-            EXPECT_EQ(open_descriptors(), descriptors);
-            folder.write("~stale.mem");
-        });
-    EXPECT_EQ(mapped_balance(), mapped);
+    waitpid(child, nullptr, 0);
+    EXPECT_EQ(folder.names(), Names{});
 }
 
 }  // namespace

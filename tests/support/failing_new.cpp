@@ -1,145 +1,86 @@
 #include "tests/support/failing_new.h"
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdlib>
 #include <new>
 
 namespace {
 
-struct Countdown {
-    long remaining = 0;  // calls until the failure; 0 when no guard lives
-    bool forever = false;
-    bool fired = false;
-    long live = 0;
-};
+thread_local long calls_left = 0;  // until the failure; 0: none will fail
+thread_local bool failure_stays = false, has_fired = false;
+thread_local long live = 0;
 
-thread_local Countdown t_countdown;
+using std::align_val_t;
+using std::nothrow_t;
+using std::size_t;
+constexpr align_val_t PLAIN{alignof(std::max_align_t)};
 
-bool must_fail() {
-    Countdown& c = t_countdown;
-    if (c.fired)
-        return c.forever;
-    if (c.remaining == 0 || --c.remaining > 0)
-        return false;
-    c.fired = true;
-    return true;
-}
-
-void* allocate(std::size_t size, std::size_t alignment) {
-    if (must_fail())
+void* take(size_t size, align_val_t alignment = PLAIN) noexcept {
+    if (basalt::test::failures_are_paused ? false
+        : has_fired                       ? failure_stays
+                                          : calls_left > 0 && --calls_left == 0) {
+        has_fired = true;
         return nullptr;
-    if (size == 0)
-        size = 1;
-    void* block;
-    if (alignment <= alignof(std::max_align_t))
-        block = std::malloc(size);
-    else if (size > static_cast<std::size_t>(-1) - alignment)
-        block = nullptr;
-    else
-        block = std::aligned_alloc(alignment, (size + alignment - 1) / alignment * alignment);
-    if (block)
-        ++t_countdown.live;
-    return block;
+    }
+    void* block = nullptr;
+    const auto bytes = std::max(static_cast<size_t>(alignment), sizeof(void*));
+    const bool taken = posix_memalign(&block, bytes, std::max(size, size_t{1})) == 0;
+    live += taken ? 1 : 0;
+    return taken ? block : nullptr;
 }
 
-void* allocate_or_throw(std::size_t size, std::size_t alignment) {
-    void* block = allocate(size, alignment);
-    if (!block)
-        throw std::bad_alloc();
-    return block;
+void* take_or_throw(size_t size, align_val_t alignment = PLAIN) {
+    void* const block = take(size, alignment);
+    return block != nullptr ? block : throw std::bad_alloc();
 }
 
-void release(void* block) {
-    if (block)
-        --t_countdown.live;
+void give(void* block) noexcept {
+    live -= block != nullptr ? 1 : 0;
     std::free(block);
-}
-
-constexpr std::size_t PLAIN = alignof(std::max_align_t);
-
-std::size_t bytes(std::align_val_t alignment) {
-    return static_cast<std::size_t>(alignment);
 }
 
 }  // namespace
 
 FailAllocation::FailAllocation(long nth, bool forever) {
-    t_countdown.fired = false;
-    t_countdown.forever = forever;
-    t_countdown.remaining = nth;
+    calls_left = nth;
+    failure_stays = forever;
+    has_fired = false;
 }
 
 FailAllocation::~FailAllocation() {
-    t_countdown.remaining = 0;
-    t_countdown.fired = false;
+    calls_left = 0;
+    has_fired = false;
 }
 
 bool FailAllocation::fired() const {
-    return t_countdown.fired;
+    return has_fired;
 }
 
 long live_allocations() {
-    return t_countdown.live;
+    return live;
 }
 
-void* operator new(std::size_t n) {
-    return allocate_or_throw(n, PLAIN);
-}
-void* operator new[](std::size_t n) {
-    return allocate_or_throw(n, PLAIN);
-}
-void* operator new(std::size_t n, std::align_val_t a) {
-    return allocate_or_throw(n, bytes(a));
-}
-void* operator new[](std::size_t n, std::align_val_t a) {
-    return allocate_or_throw(n, bytes(a));
-}
-void* operator new(std::size_t n, const std::nothrow_t&) noexcept {
-    return allocate(n, PLAIN);
-}
-void* operator new[](std::size_t n, const std::nothrow_t&) noexcept {
-    return allocate(n, PLAIN);
-}
-void* operator new(std::size_t n, std::align_val_t a, const std::nothrow_t&) noexcept {
-    return allocate(n, bytes(a));
-}
-void* operator new[](std::size_t n, std::align_val_t a, const std::nothrow_t&) noexcept {
-    return allocate(n, bytes(a));
-}
-
-void operator delete(void* p) noexcept {
-    release(p);
-}
-void operator delete[](void* p) noexcept {
-    release(p);
-}
-void operator delete(void* p, std::size_t) noexcept {
-    release(p);
-}
-void operator delete[](void* p, std::size_t) noexcept {
-    release(p);
-}
-void operator delete(void* p, std::align_val_t) noexcept {
-    release(p);
-}
-void operator delete[](void* p, std::align_val_t) noexcept {
-    release(p);
-}
-void operator delete(void* p, std::size_t, std::align_val_t) noexcept {
-    release(p);
-}
-void operator delete[](void* p, std::size_t, std::align_val_t) noexcept {
-    release(p);
-}
-void operator delete(void* p, const std::nothrow_t&) noexcept {
-    release(p);
-}
-void operator delete[](void* p, const std::nothrow_t&) noexcept {
-    release(p);
-}
-void operator delete(void* p, std::align_val_t, const std::nothrow_t&) noexcept {
-    release(p);
-}
-void operator delete[](void* p, std::align_val_t, const std::nothrow_t&) noexcept {
-    release(p);
-}
+// Every form: the library's own would call a sanitizer's.
+// clang-format off
+void* operator new(size_t n) { return take_or_throw(n); }
+void* operator new[](size_t n) { return take_or_throw(n); }
+void* operator new(size_t n, align_val_t a) { return take_or_throw(n, a); }
+void* operator new[](size_t n, align_val_t a) { return take_or_throw(n, a); }
+void* operator new(size_t n, const nothrow_t&) noexcept { return take(n); }
+void* operator new[](size_t n, const nothrow_t&) noexcept { return take(n); }
+void* operator new(size_t n, align_val_t a, const nothrow_t&) noexcept { return take(n, a); }
+void* operator new[](size_t n, align_val_t a, const nothrow_t&) noexcept { return take(n, a); }
+void operator delete(void* p) noexcept { give(p); }
+void operator delete[](void* p) noexcept { give(p); }
+void operator delete(void* p, size_t) noexcept { give(p); }
+void operator delete[](void* p, size_t) noexcept { give(p); }
+void operator delete(void* p, align_val_t) noexcept { give(p); }
+void operator delete[](void* p, align_val_t) noexcept { give(p); }
+void operator delete(void* p, size_t, align_val_t) noexcept { give(p); }
+void operator delete[](void* p, size_t, align_val_t) noexcept { give(p); }
+void operator delete(void* p, const nothrow_t&) noexcept { give(p); }
+void operator delete[](void* p, const nothrow_t&) noexcept { give(p); }
+void operator delete(void* p, align_val_t, const nothrow_t&) noexcept { give(p); }
+void operator delete[](void* p, align_val_t, const nothrow_t&) noexcept { give(p); }
+// clang-format on

@@ -15,6 +15,10 @@ struct FailAllocation {
     bool fired() const;
 };
 
+namespace basalt::test {
+inline constinit thread_local bool failures_are_paused = false;  // no call of any kind fails meanwhile
+}
+
 // Blocks from operator new that this thread has taken and not given back (below zero when it gives back the
 // blocks of others). Two readings that agree say that nothing leaked in between.
 long live_allocations();

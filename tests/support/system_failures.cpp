@@ -2,25 +2,28 @@
 
 #include <dirent.h>
 #include <fcntl.h>
+#include <ifaddrs.h>
+#include <locale.h>
 #include <sys/mman.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include <atomic>
 #include <cerrno>
 #include <cstdarg>
 
+#include "tests/support/failing_new.h"
+
 namespace {
 
 thread_local int calls_left = -1;  // until one fails; negative: none will
-thread_local bool failure_stays = false;
-thread_local bool has_struck = false;
+thread_local bool failure_stays = false, has_struck = false;
 thread_local int chosen_number = 0;
-std::atomic<long> balance{0};
-std::atomic<long> refused{0};
+std::atomic<long> balance{0}, refused{0}, files_kept{0};
 
 // Whether a call has to fail; errno is set then.
-bool fails_now(int number) {
-    if (calls_left < 0 || (calls_left > 1 && calls_left-- > 1)) {
+bool fails(int number) {
+    if (basalt::test::failures_are_paused || calls_left < 0 || (calls_left > 1 && calls_left-- > 1)) {
         return false;
     }
     calls_left = failure_stays ? 1 : -1;
@@ -31,87 +34,82 @@ bool fails_now(int number) {
 
 }  // namespace
 
+// A call that fails with an errno value and a result.
+#define FAILING(type, name, parameters, arguments, number, result) \
+    type __real_##name parameters;                                 \
+    type __wrap_##name parameters {                                \
+        return fails(number) ? (result) : __real_##name arguments; \
+    }
+
 extern "C" {
 
-void* __real_mmap(void*, size_t, int, int, int, off_t);
-void* __real_mremap(void*, size_t, size_t, int);
-int __real_munmap(void*, size_t);
-int __real_madvise(void*, size_t, int);
-int __real_mprotect(void*, size_t, int);
-int __real_open(const char*, int, ...);
-int __real_fcntl(int, int, ...);
-int __real_fstat(int, struct stat*);
-int __real_posix_fallocate(int, off_t, off_t);
-int __real_statx(int, const char*, int, unsigned, struct statx*);
-DIR* __real_opendir(const char*);
-struct dirent* __real_readdir(DIR*);
+FAILING(int, fstat, (int file, struct stat* status), (file, status), EIO, -1)
+FAILING(int, madvise, (void* pages, size_t size, int advice), (pages, size, advice), ENOMEM, -1)
+FAILING(int, mprotect, (void* pages, size_t size, int access), (pages, size, access), ENOMEM, -1)
+FAILING(DIR*, opendir, (const char* path), (path), EMFILE, nullptr)
+FAILING(int, posix_fallocate, (int file, off_t offset, off_t size), (file, offset, size), ENOSPC, errno)
+FAILING(dirent*, readdir, (DIR * folder), (folder), EIO, nullptr)
+FAILING(int, statx, (int at, const char* path, int flags, unsigned mask, struct statx* to),
+        (at, path, flags, mask, to), EIO, -1)
 
-void* __wrap_mmap(void* address, size_t size, int protection, int flags, int file, off_t offset) {
-    void* pages =
-        fails_now(ENOMEM) ? MAP_FAILED : __real_mmap(address, size, protection, flags, file, offset);
+#ifdef BASALT_FURTHER_FAILURES
+FAILING(int, access, (const char* path, int mode), (path, mode), EACCES, -1)
+FAILING(int, close, (int file), (file), EIO,
+        (__real_close(file), -1))  // closes all the same, as the system does
+FAILING(int, fstatat, (int at, const char* path, struct stat* to, int flags), (at, path, to, flags), EIO, -1)
+FAILING(int, ftruncate, (int file, off_t size), (file, size), EIO, -1)
+FAILING(int, getifaddrs, (ifaddrs * *list), (list), ENOMEM, -1)
+FAILING(int, lstat, (const char* path, struct stat* status), (path, status), EIO, -1)
+FAILING(locale_t, newlocale, (int mask, const char* name, locale_t base), (mask, name, base), ENOMEM, nullptr)
+FAILING(ssize_t, pread, (int file, void* to, size_t size, off_t at), (file, to, size, at), EIO, -1)
+FAILING(ssize_t, readlink, (const char* path, char* to, size_t size), (path, to, size), EACCES, -1)
+FAILING(char*, realpath, (const char* path, char* to), (path, to), EIO, nullptr)
+FAILING(int, stat, (const char* path, struct stat* status), (path, status), EIO, (++files_kept, -1))
+FAILING(int, unlink, (const char* path), (path), EROFS, (++files_kept, -1))
+FAILING(ssize_t, write, (int file, const void* from, size_t size), (file, from, size), ENOSPC, -1)
+#endif
+
+void* __real_mmap(void*, size_t, int, int, int, off_t);
+void* __wrap_mmap(void* address, size_t size, int access, int flags, int file, off_t offset) {
+    void* const pages = fails(ENOMEM) ? MAP_FAILED : __real_mmap(address, size, access, flags, file, offset);
     const bool is_new = pages != MAP_FAILED && (flags & MAP_FIXED) == 0;  // not in another's place
     balance += is_new ? static_cast<long>(size) : 0;
     return pages;
 }
 
+void* __real_mremap(void*, size_t, size_t, int);
 void* __wrap_mremap(void* pages, size_t old_size, size_t new_size, int flags) {
-    void* moved = fails_now(ENOMEM) ? MAP_FAILED : __real_mremap(pages, old_size, new_size, flags);
+    void* const moved = fails(ENOMEM) ? MAP_FAILED : __real_mremap(pages, old_size, new_size, flags);
     balance += moved == MAP_FAILED ? 0 : static_cast<long>(new_size) - static_cast<long>(old_size);
     return moved;
 }
 
+int __real_munmap(void*, size_t);
 int __wrap_munmap(void* pages, size_t size) {
-    if (fails_now(ENOMEM)) {
-        refused += static_cast<long>(size);
-        return -1;
-    }
-    const int result = __real_munmap(pages, size);
-    balance -= result == 0 ? static_cast<long>(size) : 0;
+    const bool refuses = fails(ENOMEM);
+    const int result = refuses ? -1 : __real_munmap(pages, size);
+    (refuses ? refused : balance) += refuses       ? static_cast<long>(size)
+                                     : result == 0 ? -static_cast<long>(size)
+                                                   : 0;
     return result;
 }
 
-int __wrap_madvise(void* pages, size_t size, int advice) {
-    return fails_now(ENOMEM) ? -1 : __real_madvise(pages, size, advice);
-}
-
-int __wrap_mprotect(void* pages, size_t size, int protection) {
-    return fails_now(ENOMEM) ? -1 : __real_mprotect(pages, size, protection);
-}
-
+int __real_open(const char*, int, ...);
 int __wrap_open(const char* path, int flags, ...) {
     va_list rest;
     va_start(rest, flags);
     const mode_t mode = (flags & O_CREAT) != 0 ? va_arg(rest, mode_t) : 0;
     va_end(rest);
-    return fails_now(EMFILE) ? -1 : __real_open(path, flags, mode);
+    return fails(EMFILE) ? -1 : __real_open(path, flags, mode);
 }
 
+int __real_fcntl(int, int, ...);
 int __wrap_fcntl(int file, int command, ...) {
     va_list rest;
     va_start(rest, command);
     void* const argument = va_arg(rest, void*);
     va_end(rest);
-    return fails_now(ENOLCK) ? -1 : __real_fcntl(file, command, argument);
-}
-
-int __wrap_fstat(int file, struct stat* status) {
-    return fails_now(EIO) ? -1 : __real_fstat(file, status);
-}
-
-int __wrap_posix_fallocate(int file, off_t offset, off_t size) {
-    return fails_now(ENOSPC) ? errno : __real_posix_fallocate(file, offset, size);
-}
-
-int __wrap_statx(int folder, const char* path, int flags, unsigned mask, struct statx* status) {
-    return fails_now(EIO) ? -1 : __real_statx(folder, path, flags, mask, status);
-}
-
-DIR* __wrap_opendir(const char* path) {
-    return fails_now(EMFILE) ? nullptr : __real_opendir(path);
-}
-
-struct dirent* __wrap_readdir(DIR* folder) {
-    return fails_now(EIO) ? nullptr : __real_readdir(folder);
+    return fails(ENOLCK) ? -1 : __real_fcntl(file, command, argument);
 }
 }
 
@@ -132,16 +130,16 @@ bool SystemFailure::struck() {
     return has_struck;
 }
 
-bool system_call_fails(int number) {
-    return fails_now(number);
-}
-
 long refused_to_unmap() {
     return refused;
 }
 
 long mapped_balance() {
     return balance;
+}
+
+long files_made_to_stay() {
+    return files_kept;
 }
 
 }  // namespace basalt::test

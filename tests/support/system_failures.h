@@ -1,12 +1,11 @@
-// Makes system calls fail on purpose (linked with --wrap): mmap, mremap, munmap, madvise, mprotect, open,
-// fcntl, fstat, posix_fallocate, statx, opendir, readdir.
+// Makes system calls fail on purpose (linked with --wrap for each in system_failures.cpp).
 #ifndef BASALT_TESTS_SUPPORT_SYSTEM_FAILURES_H
 #define BASALT_TESTS_SUPPORT_SYSTEM_FAILURES_H
 
 namespace basalt::test {
 
-// While alive, the n-th call from now on (n = 1, 2, ...) of this thread fails, and those after it too when
-// so asked: with the errno value given, or one that is usual for the call.
+// While alive, the n-th call from now on (n = 1, 2, ...) of this thread fails, and with STAYS those after it
+// too: with the errno value given, or one that is usual for the call.
 class SystemFailure {
 public:
     enum class Then { RECOVERS, STAYS };
@@ -17,15 +16,14 @@ public:
     static bool struck();  // whether a call was made to fail
 };
 
-// For further calls that a program wraps: whether this one has to fail; errno is set then, to the value
-// chosen or else to this one.
-bool system_call_fails(int number);
-
 // Bytes that were made to stay mapped.
 long refused_to_unmap();
 
-// Bytes mapped minus bytes unmapped by this program through the calls above.
+// Bytes mapped minus bytes unmapped by this program through these calls.
 long mapped_balance();
+
+// Files that were made to stay: calls of stat and unlink that failed.
+long files_made_to_stay();
 
 }  // namespace basalt::test
 

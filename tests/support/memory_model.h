@@ -1,0 +1,311 @@
+// Heaps, the block allocator, the buffer and page sources against plain models: what a block holds stays
+// until it is freed, no two overlap, and what is no block is refused. Each model takes its steps from an
+// input, for the fuzzer, and with failing calls for the fault walk.
+#ifndef BASALT_TESTS_SUPPORT_MEMORY_MODEL_H
+#define BASALT_TESTS_SUPPORT_MEMORY_MODEL_H
+
+#include <algorithm>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <set>
+#include <utility>
+#include <vector>
+
+#include "basalt/memory.h"
+#include "basalt/platform/error.h"
+#include "fuzz/input.h"
+#include "src/platform/heap.h"
+#include "tests/support/failing_new.h"
+#include "tests/support/heap_inspection.h"
+
+namespace basalt::test {
+
+using fuzz::Input;
+using fuzz::require;
+using MayFail = std::function<bool()>;  // whether a call of the library was made to fail
+
+// A call of the library: only these are made to fail, not the model's own.
+template <class Call>
+auto in_library(Call call) {
+    const bool were_paused = std::exchange(failures_are_paused, false);
+    auto result = call();
+    failures_are_paused = were_paused;
+    return result;
+}
+
+// A block with a pattern of its own at both ends, which no one else may overwrite.
+class Marked {
+public:
+    Marked(void* block, std::size_t size) : m_block(static_cast<unsigned char*>(block)), m_size(size) {
+        mark();
+    }
+    // As far as it has been kept.
+    void check(std::size_t kept = SIZE_MAX) const {
+        for_ends([this, kept](std::size_t i) { require(i >= kept || m_block[i] == byte(i)); });
+    }
+    void move(void* block, std::size_t size) {
+        const std::size_t kept = std::min(m_size, size);
+        m_block = static_cast<unsigned char*>(block);
+        check(kept);
+        m_size = size;
+        mark();
+    }
+    unsigned char* block() const { return m_block; }
+
+private:
+    void mark() {
+        m_seed = ++s_seeds;
+        for_ends([this](std::size_t i) { m_block[i] = byte(i); });
+    }
+    template <class Work>
+    void for_ends(Work work) const {
+        for (std::size_t i = 0; i < std::min(std::size_t{64}, m_size); ++i) {
+            work(i), work(m_size - 1 - i);
+        }
+    }
+    unsigned char byte(std::size_t i) const { return static_cast<unsigned char>(m_seed * 7 + i); }
+
+    unsigned char* m_block;
+    std::size_t m_size;
+    unsigned m_seed = 0;
+    static inline unsigned s_seeds = 0;
+};
+
+// Small mostly, now and then more than regions share.
+inline std::size_t any_size(Input& input) {
+    const std::size_t size = input.byte();
+    const unsigned shift = input.byte() % 16;
+    return size << (shift < 14 ? shift % 8 : shift);
+}
+
+class HeapModel {
+public:
+    explicit HeapModel(unsigned long limit) : m_limit(limit) {}
+    ~HeapModel() {
+        std::ranges::for_each(m_blocks, [](const Marked& block) { block.check(); });
+        HeapDestroy(m_heap);
+    }
+    HeapModel(const HeapModel&) = delete;
+    HeapModel& operator=(const HeapModel&) = delete;
+
+    void step(Input& input, const MayFail& may_fail) {
+        if (m_heap == nullptr) {
+            m_heap = in_library([&] { return HeapCreate(0, 0, m_limit); });
+            require(m_heap != nullptr || may_fail());
+            return;
+        }
+        const unsigned choice = m_blocks.empty() ? 15 : input.byte() % 16;
+        Marked* const any = m_blocks.empty() ? nullptr : &m_blocks[input.byte() % m_blocks.size()];
+        if (choice == 0) {
+            in_library([&] { return HeapCompact(m_heap, 0); });
+        } else if (choice == 1) {  // inside a block, and nowhere near one
+            require(HeapFree(m_heap, 0, any->block() + 16) == 0 && HeapFree(m_heap, 0, this) == 0);
+        } else if (choice < 6) {
+            any->check();
+            if (in_library([&] { return HeapFree(m_heap, 0, any->block()); }) == 0) {
+                return any->check(), require(may_fail());  // it could not be unmapped
+            }
+            require(input.byte() % 8 != 0 || HeapFree(m_heap, 0, any->block()) == 0);
+            std::swap(*any, m_blocks.back());
+            m_blocks.pop_back();
+        } else {
+            const std::size_t size = any_size(input);
+            const bool moves = choice < 9;
+            void* const block = in_library([&] {
+                return moves ? HeapReAlloc(m_heap, 0, any->block(), size) : HeapAlloc(m_heap, 0, size);
+            });
+            require(reinterpret_cast<std::uintptr_t>(block) % 16 == 0);
+            require(block != nullptr || may_fail() || m_limit != 0);
+            if (block == nullptr) {
+                moves ? any->check() : void();
+            } else {
+                moves ? any->move(block, size) : static_cast<void>(m_blocks.emplace_back(block, size));
+            }
+        }
+    }
+    void inspect() const {
+        if (m_heap != nullptr) {
+            const platform::HeapReport report = platform::inspect_heap(m_heap);
+            require(report.fault == nullptr && report.live_blocks == m_blocks.size());
+        }
+    }
+
+private:
+    unsigned long m_limit;
+    HANDLE m_heap = nullptr;
+    std::vector<Marked> m_blocks;
+};
+
+// The addresses too: the allocator's lists of segments and blocks, written down as vectors, newest at the
+// back.
+class BlockModel {
+public:
+    BlockModel(unsigned long segment_size, unsigned long block_size)
+        : m_segment_size(segment_size), m_size(block_size), m_allocator(segment_size, block_size) {}
+
+    void step(Input& input, const MayFail& may_fail) {
+        const unsigned choice = input.byte();
+        if (choice < 16 && !m_segments.empty()) {
+            free_other(m_segments[input.byte() % m_segments.size()].base +
+                       input.byte() % (m_segment_size + 2) - 1);
+        } else if (choice < 110 && !m_live.empty()) {
+            std::swap(m_live[choice % m_live.size()], m_live.back());
+            m_live.back().check();
+            free(m_live.back().block());
+        } else {
+            alloc(may_fail);
+        }
+    }
+    void inspect() const {
+        std::ranges::for_each(m_live, [](const Marked& block) { block.check(); });
+    }
+
+private:
+    struct Segment {
+        unsigned char* base;
+        std::vector<unsigned long> free = {};
+        std::set<unsigned long> used = {};
+        unsigned long next = 0;  // offset of the first block never allocated
+    };
+
+    void alloc(const MayFail& may_fail) {
+        auto* const block =
+            static_cast<unsigned char*>(in_library([&] { return m_allocator.Alloc(m_size); }));
+        if (block == nullptr) {
+            return require(may_fail());
+        }
+        if (m_partial.empty() && m_empty.empty()) {
+            m_partial.push_back(m_segments.size());
+            m_segments.push_back({block});
+            require(reinterpret_cast<std::uintptr_t>(block) % 4096 == 0);
+        } else if (m_partial.empty()) {
+            m_partial.push_back(m_empty.back());
+            m_empty.pop_back();
+        }
+        Segment& segment = m_segments[m_partial.back()];
+        const bool is_new = segment.free.empty();
+        const unsigned long offset =
+            is_new ? std::exchange(segment.next, segment.next + m_size) : segment.free.back();
+        is_new ? void() : segment.free.pop_back();
+        require(block == segment.base + offset && segment.used.insert(offset).second);
+        require(!is_new || std::all_of(block, block + m_size, [](unsigned char byte) { return byte == 0; }));
+        if (segment.free.empty() && segment.next + m_size > m_segment_size) {
+            m_partial.pop_back();
+        }
+        m_live.emplace_back(block, m_size);
+    }
+    void free(unsigned char* block) {
+        m_allocator.Free(block);
+        const auto found = std::ranges::find_if(m_segments, [=, this](const Segment& segment) {
+            return block >= segment.base && block < segment.base + m_segment_size;
+        });
+        const auto number = static_cast<std::size_t>(found - m_segments.begin());
+        const bool was_full = std::ranges::count(m_partial, number) == 0;
+        const auto offset = static_cast<unsigned long>(block - found->base);
+        found->used.erase(offset);
+        found->free.push_back(offset);
+        if (was_full) {
+            m_partial.push_back(number);
+        } else if (found->used.empty()) {
+            std::erase(m_partial, number);
+            m_empty.push_back(number);
+        }
+        std::erase_if(m_live, [=](const Marked& one) { return one.block() == block; });
+    }
+    // An address in or just outside a view; ignored unless a live block begins there.
+    void free_other(unsigned char* address) {
+        const bool is_live =
+            std::ranges::any_of(m_live, [=](const Marked& one) { return one.block() == address; });
+        is_live ? free(address) : m_allocator.Free(address);
+        m_allocator.Free(nullptr);
+        require(m_allocator.Alloc(m_size + 1) == nullptr);
+    }
+
+    unsigned long m_segment_size, m_size;
+    vex_lib::vlVmAllocator m_allocator;
+    std::vector<Segment> m_segments;
+    std::vector<std::size_t> m_empty, m_partial;  // a segment in neither is full
+    std::vector<Marked> m_live;
+};
+
+class BufferModel {
+public:
+    explicit BufferModel(std::uint64_t step) : m_step(step), m_buffer(0, 0, step) {
+        resized(m_buffer.GetData(), step);
+    }
+    void step(Input& input, const MayFail& may_fail) {
+        const std::uint64_t size = any_size(input);
+        const std::uint64_t next = size > m_size && m_step != 0 ? (size / m_step + 1) * m_step : size;
+        void* const block = in_library([&] { return m_buffer.ReSize(size); });
+        require(block != nullptr || next == 0 || may_fail());
+        if (block != nullptr || next == 0) {
+            resized(block, next);
+        }
+        inspect();
+        require(m_buffer.ReSize(std::uint64_t{1} << 32) == nullptr);
+    }
+    void inspect() const {
+        require((m_buffer.GetData() != nullptr) == (m_size != 0));
+        m_contents ? m_contents->check() : void();
+    }
+
+private:
+    void resized(void* block, std::uint64_t size) {
+        m_contents&& block != nullptr ? m_contents->move(block, size) : m_contents.reset();
+        if (block != nullptr && !m_contents) {
+            m_contents = std::make_unique<Marked>(block, size);
+        }
+        m_size = block != nullptr ? size : 0;
+    }
+    std::uint64_t m_step, m_size = 0;
+    vex_lib::vlVmBuffer m_buffer;
+    std::unique_ptr<Marked> m_contents;
+};
+
+class PagesModel {
+public:
+    PagesModel() { std::ranges::fill(m_held, -1); }
+    ~PagesModel() { require(m_base == nullptr || Source::Free(m_base, 0, RELEASE, 0) != 0); }
+    PagesModel(const PagesModel&) = delete;
+    PagesModel& operator=(const PagesModel&) = delete;
+
+    void step(Input& input, const MayFail& may_fail) {
+        if (m_base == nullptr) {
+            m_base = static_cast<unsigned char*>(
+                in_library([] { return Source::Alloc(nullptr, PAGES * PAGE, RESERVE, nullptr); }));
+            return require(m_base != nullptr || may_fail());
+        }
+        const std::size_t first = input.byte() % PAGES, count = 1 + input.byte() % (PAGES - first);
+        unsigned char* const at = m_base + first * PAGE;
+        if (input.byte() % 3 == 0) {
+            const bool done = in_library([&] { return Source::Free(at, count * PAGE, DECOMMIT, 0); }) != 0;
+            require(done || may_fail());
+            done ? std::fill_n(m_held + first, count, -1) : m_held;
+        } else if (in_library([&] { return Source::Alloc(at, count * PAGE, COMMIT, nullptr); }) == nullptr) {
+            require(may_fail());
+        } else {
+            for (std::size_t page = first; page < first + count; ++page) {
+                require(m_base[page * PAGE] == std::max(m_held[page], 0));
+                m_base[page * PAGE] = static_cast<unsigned char>(m_held[page] = input.byte());
+            }
+        }
+        require(Source::Alloc(m_base, (PAGES + 16) * PAGE, COMMIT, nullptr) == nullptr);
+    }
+    void inspect() const {
+        for (std::size_t page = 0; page < PAGES; ++page) {
+            require(m_held[page] < 0 || m_base[page * PAGE] == m_held[page]);
+        }
+    }
+
+private:
+    using Source = vex_lib::vlSharedMemoryAllocator;
+    static constexpr unsigned long COMMIT = 0x1000, RESERVE = 0x2000, DECOMMIT = 0x4000, RELEASE = 0x8000;
+    static constexpr std::size_t PAGE = 4096, PAGES = 24;
+    unsigned char* m_base = nullptr;
+    int m_held[PAGES];  // -1 without memory, else the first byte of the page
+};
+
+}  // namespace basalt::test
+
+#endif

@@ -1,3 +1,4 @@
-# What the reference does with the links of a page: a header has a page there, and a folder has none.
+# Links of the pages in the reference: a header has a page there, and a folder's page is its README.
 s#\]\((\.\./)*include/(basalt/[a-z_/]+\.h)\)#](@ref \2)#g
-s#\[([^]]*)\]\((\.\./)*(bindings|examples|src|tools)/[^)]*\)#\1#g
+s#\]\(((\.\./)*(examples|tools|bindings/python|src/platform)/([a-z]+/)?)\)#](\1README.md)#g
+s#\[([^]]*)\]\([a-z/_]*\.py\)#\1#g

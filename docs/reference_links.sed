@@ -2,3 +2,4 @@
 s#\]\((\.\./)*include/(basalt/[a-z_/]+\.h)\)#](@ref \2)#g
 s#\]\(((\.\./)*(examples|tools|bindings/python|src/platform)/([a-z]+/)?)\)#](\1README.md)#g
 s#\[([^]]*)\]\([a-z/_]*\.py\)#\1#g
+s#\]\((\.\./)+docs/pictures/([a-z]+\.png)\)#](\2)#g

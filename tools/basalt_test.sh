@@ -33,6 +33,8 @@ rows 'abs($1 - $4) <= 2e-13 * 180 && apart($2, $5) * shrink($4) <= 3e-12 && abs(
 succeeds direct --degrees --csv --precision 7 <"$data/geodesics.csv"
 rows 'abs($1 - $4) <= 2e-9 && apart($2, $5) * shrink($4) <= 2e-9 && apart($3, $6) * shrink($4) <= 2e-9'
 awk -F, -v OFS=, '!/^#/ && $9 > 1 && $9 < 1e7 { print $1, $2, $5, $6, $8, $9 }' "$data/geodesics.csv" >pairs
+succeeds inverse --degrees --csv --precision 7 <pairs
+rows 'apart($1, $4) <= 3e-9 + 3e-7 / $5 && ($5 - $3) ^ 2 <= 3e-7 ^ 2'
 succeeds distance --degrees --csv <pairs
 rows 'abs($1 - $3) <= 0.0057 * $3'
 succeeds bearing --degrees --csv --keep <pairs

@@ -16,6 +16,7 @@ extern const Command NEU;
 /// @name geodesics.cpp
 /// @{
 extern const Command DIRECT;
+extern const Command INVERSE_GEODESIC;
 extern const Command DISTANCE;
 extern const Command BEARING;
 extern const Command CROSSTRACK;

@@ -20,6 +20,16 @@ Filter make_direct(const CommandLine&, const Format&) {
     };
 }
 
+Filter make_inverse(const CommandLine&, const Format&) {
+    return [](Fields& fields, Row& row) {
+        const geo_llh from = read_place(fields);
+        const basalt::GeodesicInverse line = basalt::geodesic_inverse(from, read_place(fields));
+        row.bearing(line.azimuth_from);
+        row.bearing(line.azimuth_to);
+        row.metres(line.distance);
+    };
+}
+
 Filter make_distance(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh from = read_place(fields);
@@ -55,12 +65,25 @@ const Command DIRECT = {
       "-37.652821146 143.926495523 307.173629707"}},
     make_direct};
 
+const Command INVERSE_GEODESIC = {
+    "inverse",
+    "",
+    "azimuths and length of the shortest line between two places",
+    "Reads LATITUDE LONGITUDE LATITUDE LONGITUDE. Writes AZIMUTH AZIMUTH DISTANCE of the geodesic on the\n"
+    "WGS84 ellipsoid: of leaving the first place and of going on at the second, clockwise from north, from "
+    "0\n"
+    "to a turn; metres.",
+    {DEGREES, RADIANS, CSV, KEEP, PRECISION},
+    {{"echo '36.12 -86.67 33.94 -118.40' | basalt inverse --degrees --precision 1",
+      "274.615580 256.080667 2892777.0"}},
+    make_inverse};
+
 const Command DISTANCE = {
     "distance",
     "",
-    "great-circle distance between two places",
+    "great-circle distance between two places, on a sphere",
     "Reads LATITUDE LONGITUDE LATITUDE LONGITUDE. Writes the distance in metres on a sphere of radius\n"
-    "6371000 m, which is up to 0.6 % off the ellipsoid's.",
+    "6371000 m, which is up to 0.6 % off the ellipsoid's; for that see inverse.",
     {DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '36.12 -86.67 33.94 -118.40' | basalt distance --degrees --precision 1", "2886444.4"}},
     make_distance};
@@ -68,7 +91,7 @@ const Command DISTANCE = {
 const Command BEARING = {
     "bearing",
     "",
-    "initial bearing of the great circle between two places",
+    "initial bearing of the great circle between two places, on a sphere",
     "Reads LATITUDE LONGITUDE LATITUDE LONGITUDE. Writes the bearing from the first place to the second,\n"
     "clockwise from north, from 0 to a turn, on a sphere; 0 for equal places.",
     {DEGREES, RADIANS, CSV, KEEP, PRECISION},

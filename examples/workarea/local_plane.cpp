@@ -4,23 +4,18 @@ namespace {
 
 constexpr double SEMI_MAJOR_AXIS = 6378137.0;  // WGS84, metres
 
-geo_vector on_ellipsoid(double longitude, double latitude) {
-    const geo_llh place = {_degtorad(latitude), _degtorad(longitude), 0.0};
-    // The one place whose three numbers are all 0 is refused as a record never set.
-    geo_vector xyz = {SEMI_MAJOR_AXIS, 0.0, 0.0};
-    _llh2xyz(&place, &xyz);
-    return xyz;
+geo_llh on_ellipsoid(double longitude, double latitude) {
+    // The library refuses the all-zero record. This height vanishes in the rounding of a coordinate.
+    constexpr double NO_HEIGHT = 1e-10;
+    return {_degtorad(latitude), _degtorad(longitude), latitude == 0 && longitude == 0 ? NO_HEIGHT : 0.0};
 }
 
 }  // namespace
 
-LocalPlane::LocalPlane(double longitude, double latitude) : m_origin(on_ellipsoid(longitude, latitude)) {}
+LocalPlane::LocalPlane(double longitude, double latitude) : m_frame(on_ellipsoid(longitude, latitude)) {}
 
 geo_nee LocalPlane::local(double longitude, double latitude) const {
-    const geo_vector xyz = on_ellipsoid(longitude, latitude);
-    geo_nee point = {};
-    _xyz2nez(&m_origin, &xyz, &point);
-    return point;
+    return m_frame.to_local(on_ellipsoid(longitude, latitude));
 }
 
 geo_nee LocalPlane::to_grid(double longitude, double latitude, double elevation) const {

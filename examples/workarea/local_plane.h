@@ -26,7 +26,7 @@ public:
 private:
     geo_nee local(double longitude, double latitude) const;
 
-    geo_vector m_origin;  // Cartesian
+    basalt::LocalFrame m_frame;
 };
 
 #endif

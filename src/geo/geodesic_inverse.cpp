@@ -64,7 +64,8 @@ struct Trial {
         const Direction& b2 = p.beta2;
         const double sin_alpha0 = azimuth1.sine * b1.cosine;
         const double cos2_alpha0 = azimuth1.cosine * azimuth1.cosine + square(azimuth1.sine * b1.sine);
-        const bool same_size = b1.cosine == b2.cosine;
+        // Both: near the equator cosines are equal that sines distinguish, and near a pole sines.
+        const bool same_size = b1.cosine == b2.cosine && std::abs(b1.sine) == std::abs(b2.sine);
         // Eq. 45, by whichever difference of squares loses less.
         const double difference = b1.cosine < -b1.sine ? (b2.cosine - b1.cosine) * (b2.cosine + b1.cosine)
                                                        : (b1.sine - b2.sine) * (b1.sine + b2.sine);

@@ -44,6 +44,5 @@ for subject in "${subjects[@]}"; do
 done
 if [ ${#page[@]} -gt 0 ]; then
     scripts/sizes.sh "${page[@]}"
-    scripts/header_cost.sh "${page[@]}"
     python3 scripts/bench_chart.py
 fi

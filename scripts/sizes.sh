@@ -1,12 +1,14 @@
 #!/usr/bin/env bash
-# Prints how large the library is, and a static program that uses one family: bytes of code and constants, of data,
-# and of data that begins as zero, stripped; programs beyond what the empty one has.
-# Usage: scripts/sizes.sh [--page PAGE]          also writes the table between the page's marks
+# Prints two tables. Sizes in bytes, stripped: the library, and a static program of each family beyond an empty one.
+# Headers beside other libraries': lines after preprocessing and milliseconds of compilation beyond an empty file, the
+# least of ROUNDS (7) in random order.
+# Usage: scripts/sizes.sh [--page PAGE]          also writes the tables between the page's marks
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
 
-need_packages "${BUILD_PACKAGES[@]}" python3
+need_packages "${BUILD_PACKAGES[@]}" libgeographiclib-dev libboost1.81-dev libspdlog-dev libopenvdb-dev libtbb-dev \
+    python3
 work=build/sizes
 mkdir -p $work
 for kind in ON OFF; do
@@ -15,7 +17,7 @@ for kind in ON OFF; do
     cmake --build $work/$kind --target basalt >>$work/log || { cat $work/log; exit 1; }
 done
 
-program() {  # name, headers, statement: a program whose library parts are linked in
+program() {  # name, headers, statement: builds a static program
     printf '%s\nint main(int count, char**) { %s }\n' "$2" "$3" >"$work/$1.cpp"
     g++ -std=c++17 -O2 -Iinclude -I$work/OFF/include "$work/$1.cpp" -o "$work/$1" -Wl,--gc-sections -s \
         $work/OFF/src/libbasalt.a
@@ -41,6 +43,40 @@ program graphics '#include <basalt/graphics.h>' 'return ColorPalette().FindClose
         read -r code data zeroed <<<"$(sections $work/$name)"
         printf "| a static program of \`%s\` | %'d | %'d | %'d |\n" $name $((code - code0)) $((data - data0)) $((zeroed - zeroed0))
     done
-} >$work/table
-cat $work/table
-[ "${1:-}" != --page ] || python3 scripts/bench_table.py --page "$2" sizes --text "$(cat $work/table)"
+} >$work/sizes
+
+headers=(basalt/{geo,sparse,memory,frame,util,files,graphics,basalt}.h GeographicLib/Geodesic.hpp
+    GeographicLib/Geocentric.hpp boost/geometry.hpp openvdb/openvdb.h spdlog/spdlog.h filesystem vector)
+source_of() { if [ "$1" = empty ]; then echo; else echo "#include <$1>"; fi; }
+compile() {  # header, compiler options
+    source_of "$1" | g++ -std=c++17 -Iinclude -I$work/ON/include "${@:2}" -x c++ -
+}
+
+declare -A least lines
+for header in empty "${headers[@]}"; do
+    compile "$header" -fsyntax-only 2>$work/log || { cat $work/log; exit 1; }
+    lines[$header]=$(compile "$header" -E -P | wc -l)
+    least[$header]=1000000000
+done
+for _ in $(seq "${ROUNDS:-7}"); do
+    for header in $(printf '%s\n' empty "${headers[@]}" | shuf); do
+        began=$(date +%s%N)
+        compile "$header" -fsyntax-only
+        taken=$((($(date +%s%N) - began) / 1000))
+        [ $taken -ge "${least[$header]}" ] || least[$header]=$taken
+    done
+done
+
+{
+    echo "| header | lines | milliseconds |"
+    echo "|---|---:|---:|"
+    for header in "${headers[@]}"; do
+        LC_ALL=C awk -v name="$header" -v lines="${lines[$header]}" -v us=$((least[$header] - least[empty])) \
+            'BEGIN { printf "| `%s` | %d | %.0f |\n", name, lines, us / 1000 }'
+    done
+} >$work/headers
+
+for table in sizes headers; do
+    cat $work/$table
+    [ "${1:-}" != --page ] || python3 scripts/bench_table.py --page "$2" $table --text "$(cat $work/$table)"
+done

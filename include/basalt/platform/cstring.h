@@ -24,6 +24,9 @@
 ///
 /// Threads: reentrant; one object is used by one thread at a time, or by many for reading.
 class BASALT_API CString {
+public:
+    /// @cond
+    // Not for hosts. Public because Clang checks the access of a friend template's default arguments.
     static int order(const CString& a, const CString& b) noexcept { return a.m_text.compare(b.m_text); }
     static int order(const CString& a, const wchar_t* b) noexcept { return a.Compare(b); }
     static int order(const wchar_t* a, const CString& b) noexcept { return -b.Compare(a); }
@@ -31,7 +34,9 @@ class BASALT_API CString {
     static int order(wchar_t a, const CString& b) noexcept { return -order(b, a); }
     template <class A, class B>
     using IfTexts = decltype(order(std::declval<const A&>(), std::declval<const B&>()));
+    /// @endcond
 
+private:
     template <class Character>  // an overload for char would make calls with an int ambiguous
     using IfNarrow = std::enable_if_t<std::is_same_v<Character, char>, int>;
 

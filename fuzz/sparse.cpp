@@ -7,7 +7,7 @@
 #include <memory>
 #include <vector>
 
-#include "basalt/sparse_grid.h"
+#include "basalt/sparse_cells.h"
 #include "fuzz/input.h"
 #include "tests/sparse/sparse_array_model.h"
 #include "tests/support/sparse_inspector.h"

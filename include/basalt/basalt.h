@@ -10,6 +10,7 @@
 #include "basalt/memory.h"
 #include "basalt/platform.h"
 #include "basalt/sparse.h"
+#include "basalt/sparse_cells.h"
 #include "basalt/sparse_grid.h"
 #include "basalt/util.h"
 #include "basalt/version.h"

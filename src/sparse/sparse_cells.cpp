@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <vector>
 
-#include "basalt/sparse_grid.h"
+#include "basalt/sparse_cells.h"
 #include "src/sparse/sparse_array_storage.h"
 
 namespace basalt {

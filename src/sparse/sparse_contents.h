@@ -7,7 +7,7 @@
 #include <cstring>
 #include <vector>
 
-#include "basalt/sparse_grid.h"
+#include "basalt/sparse_cells.h"
 #include "src/sparse/block_grid.h"
 #include "src/sparse/block_index.h"
 #include "src/sparse/block_pool.h"

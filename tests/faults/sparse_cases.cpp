@@ -2,7 +2,7 @@
 #include <tuple>
 #include <vector>
 
-#include "basalt/sparse_grid.h"
+#include "basalt/sparse_cells.h"
 #include "tests/faults/trial.h"
 #include "tests/sparse/visit_recorder.h"
 #include "tests/support/sparse_inspector.h"

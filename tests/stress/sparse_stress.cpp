@@ -4,7 +4,7 @@
 #include <memory>
 #include <vector>
 
-#include "basalt/sparse_grid.h"
+#include "basalt/sparse_cells.h"
 #include "tests/stress/stress.h"
 #include "tests/support/sparse_inspector.h"
 

@@ -1,8 +1,9 @@
 #!/usr/bin/env python3
 """Checks the direction of inclusion: which folder may include which, and which may include system headers.
 
-Usage: check_includes.py        prints each include that breaks a rule, each folder of more than 30 files, and each
-source (tests aside) that is not plain ASCII
+Usage: check_includes.py        prints each include that breaks a rule, each folder of more than 30 files, each source
+(tests aside) that is not plain ASCII, and each call in src/geo of a function of the C library whose last bit depends on
+the processor
 """
 import pathlib
 import re
@@ -17,6 +18,8 @@ ROOMS = {"": {"system", "text"}, "system": set(), "text": {"system"}, "errors": 
 MOST_FILES = 30
 STANDARD = re.compile(r"^[a-z_0-9]+$|^(stddef|stdint|string)\.h$")  # <vector>, and what C shares
 INTRINSICS = {"immintrin.h", "emmintrin.h"}
+INEXACT = re.compile(r"(?:std::|(?<![\w:.>]))(?:a?(?:sin|cos|tan)h?|atan2|sincos|exp[2m1]*|log(?:2|10|1p)?|pow|cbrt|hypot|fma|"
+                     r"remquo|[tl]gamma|erfc?)\s*\(")
 OUTSIDE = {"bindings", "console", "examples", "tools"}
 SOURCES = [f"{folder}/**/*{ending}"  # not those of tests, which hold texts
            for folder in ("include", "src", "bench", "bindings", "fuzz", "examples", "console", "tools")
@@ -61,6 +64,9 @@ def main():
             match = re.match(r'\s*#\s*include\s*([<"])([^>"]+)[>"]', line)
             if match and not may_include(path, room, match[1] == '"', match[2]):
                 errors.append(f"{path}:{number}: may not include {match[2]}")
+            call = room == "geo" and INEXACT.search(line.partition("//")[0])
+            if call and (path.parts[2] != "elementary" or call[0].startswith("std::")):
+                errors.append(f"{path}:{number}: {call[0]}) differs between processors; see src/geo/elementary")
     for folder in sorted({file.parent for top in ("include", "src") for file in (root / top).glob("**/*.*")}):
         files = sum(file.is_file() for file in folder.iterdir())
         if files > MOST_FILES:

@@ -1,5 +1,5 @@
-// Results made of + - * / sqrt and comparisons are the same bit for bit on every compiler and at every
-// optimisation. Thousands of them are folded into one number.
+// Results have the same bits under every compiler, at every optimisation, on every processor: thousands of
+// them are folded into one number each.
 #include <gtest/gtest.h>
 
 #include <bit>
@@ -70,6 +70,65 @@ TEST(ExactResults, OfCurvesAreTheSameOnEveryCompiler) {
                  geo_arc_to_chord(radius, separation), geo_spiral_deflection(length, k), x, y);
     }
     EXPECT_EQ(fold.value(), 14889729433225187223U);
+}
+
+TEST(ExactResults, OfAnglesAreTheSameOnEveryCompiler) {
+    plain::Random random(3);
+    Fold fold;
+    for (int round = 0; round < 4000; ++round) {
+        const auto point = [&] {
+            return geo_nee{random.real(-90.0, 90.0), random.real(-90.0, 90.0), random.real(0.0, 9.0)};
+        };
+        const geo_nee a = point(), b = point(), c = point();
+        const geo_vector v = {b.east, b.north, b.elevation};
+        const double t = random.real(-7.0, 7.0), u = random.real(-7.0, 7.0);
+        geo_nee met = {}, reduced = {}, followed = {};
+        geo_hvd seen = {};
+        const int meets = geo_grid_bb_intersect(a, b, t, u, met);
+        geo_reduce_obs({t, u, c.elevation}, a, 1.5, reduced, 0.9996);
+        geo_calc_obs(a, 1.5, b, 1.6, seen, 0.9996);
+        geo_grid_follow(a, t, c.north, u, followed);
+        fold.add(geo_grid_bearing(a, b), geo_gradient(a, b), geo_grid_divergence(a, b, b, c),
+                 geo_vector_direction(v), geo_vector_gradient(v), geo_vector_x_component_gradient(v),
+                 geo_vector_y_component_gradient(v), geo_point_on_line(a, b, c, 40.0), meets, met.north,
+                 met.east, reduced.north, reduced.east, reduced.elevation, seen.horizontal, seen.vertical,
+                 seen.distance, followed.north, followed.east, followed.elevation);
+    }
+    EXPECT_EQ(fold.value(), 5454054674292647459U);
+}
+
+TEST(ExactResults, OnTheEllipsoidAreTheSameOnEveryCompiler) {
+    plain::Random random(4);
+    Fold fold;
+    for (int round = 0; round < 4000; ++round) {
+        const auto place = [&] {
+            return geo_llh{random.real(-1.57, 1.57), random.real(-3.1, 3.1), random.real(-400.0, 9000.0)};
+        };
+        const geo_llh a = place(), b = place(), near = {a.latitude + 0.001, a.longitude - 0.002, 5.0};
+        geo_vector xyz = {};
+        geo_llh back = {}, end = {};
+        geo_nee local = {};
+        double meridian = 0.0, prime = 0.0, azimuth = 0.0, variance[12] = {};
+        const double covariance[6] = {4e-4, 9e-4, 1e-4, 1e-5, -2e-5, 3e-5};
+        _llh2xyz(&a, &xyz);
+        _xyz2llh(&xyz, &back, 5e-10);
+        const geo_vector origin = {xyz.x + 100.0, xyz.y - 200.0, xyz.z};
+        _xyz2nez(&origin, &xyz, &local);
+        _wgs84curvature(a.latitude, meridian, prime);
+        geo_vincenty_direct(a, b.longitude, 1e3 * b.height, azimuth, end);
+        Varxyz2varllh(&xyz, covariance, variance);
+        Varxyz2varneu(&xyz, covariance, variance + 6);
+        const basalt::GeodesicInverse inverse = basalt::geodesic_inverse(a, b);
+        fold.add(xyz.x, xyz.y, xyz.z, back.latitude, back.longitude, back.height, local.north, local.east,
+                 local.elevation, meridian, prime, end.latitude, end.longitude, azimuth,
+                 geo_vincenty_distance(a, b), geo_vincenty_bearing(a, b),
+                 geo_vincenty_crosstrack(a, end, near), inverse.distance, inverse.azimuth_from,
+                 inverse.azimuth_to);
+        for (const double v : variance) {
+            fold.add(v);
+        }
+    }
+    EXPECT_EQ(fold.value(), 8812659496721540907U);
 }
 
 }  // namespace

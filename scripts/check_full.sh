@@ -73,30 +73,37 @@ step_hardening() {
     scripts/check_library.sh hardening $installed/libbasalt.so $again/build/src/libbasalt.so
 }
 
-# Results to the bit: both compilers at three levels, then the installed library. Time scales are integers, and need
-# the platform's clock.
+# Results to the bit, and the elementary functions in one lane, two and four: both compilers at three levels, with the C
+# library's FMA and AVX2 forms masked, then the installed library. Time scales are integers, and need the platform's clock.
 exact_test=tests/geo/exact_results_test.cpp
 exact_sources() { find src/geo -name '*.cpp' ! -name 'time_scales*'; }
+exact_options=(-std=c++20 -ffp-contract=off -I. -Iinclude "-DBASALT_TEST_DATA=\"$PWD/tests/data\"")
 step_exact() {
     local program=build/exact_results
     for level in -O0 -O2 -O3; do
         for compiler in g++ clang++; do
             # shellcheck disable=SC2046  # one file a word
-            $compiler -std=c++20 $level -ffp-contract=off -I. -Iinclude $(exact_sources) $exact_test -o $program \
+            $compiler "${exact_options[@]}" $level $(exact_sources) $exact_test tests/geo/elementary_test.cpp -o $program \
                 -lgtest -lgtest_main
             $program --gtest_brief=1
+            GLIBC_TUNABLES=glibc.cpu.hwcaps=-FMA,-AVX2,-FMA4 $program --gtest_brief=1
         done
     done
     [ -d $installed ] || step_package
-    g++ -std=c++20 -ffp-contract=off -I. -Iinclude $exact_test -o $program -lgtest -lgtest_main -L$installed -lbasalt
-    LD_LIBRARY_PATH=$installed $program --gtest_brief=1
+    g++ "${exact_options[@]}" $exact_test -o $program-installed -lgtest -lgtest_main -L$installed -lbasalt
+    LD_LIBRARY_PATH=$installed $program-installed --gtest_brief=1
 }
+# The same on aarch64, and on an x86-64 processor without AVX and FMA.
 step_aarch64() {
     need_packages g++-aarch64-linux-gnu qemu-user googletest
-    # shellcheck disable=SC2046
-    aarch64-linux-gnu-g++ -std=c++20 -O2 -ffp-contract=off -static -I. -Iinclude -I/usr/src/googletest/googletest \
-        $(exact_sources) $exact_test /usr/src/googletest/googletest/src/gtest{-all,_main}.cc -o build/exact_results_aarch64
-    qemu-aarch64 build/exact_results_aarch64 --gtest_brief=1
+    local compiler program=build/exact_results
+    for compiler in aarch64-linux-gnu-g++ g++; do
+        # shellcheck disable=SC2046
+        $compiler "${exact_options[@]}" -O2 -static -I/usr/src/googletest/googletest $(exact_sources) $exact_test \
+            tests/geo/elementary_test.cpp /usr/src/googletest/googletest/src/gtest{-all,_main}.cc -o $program-$compiler
+    done
+    qemu-aarch64 $program-aarch64-linux-gnu-g++ --gtest_brief=1
+    qemu-x86_64 -cpu Westmere $program-g++ --gtest_brief=1
 }
 
 # The binary interface is that of the last release: RELEASED names its library or description, else its tag is built.

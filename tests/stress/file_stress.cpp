@@ -1,5 +1,5 @@
-// A log that all write, mapped blocks and block allocators while somebody cleans up, questions to the disk,
-// texts, and the settings and queries of the environment.
+// A log that all threads write, mapped blocks and block allocators during CleanUp(), file queries, texts, and
+// the settings and queries of the environment.
 #include <fstream>
 #include <string>
 

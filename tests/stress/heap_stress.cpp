@@ -1,8 +1,9 @@
-// The shared heap, a private heap with a limit, and page sources. Blocks go from hand to hand: one thread
-// takes them, another finds them as they were left and gives them back.
+// The shared heap, a private heap with a limit and one without, and page sources. One thread allocates a
+// block, another finds it as it was left and frees it.
 #include <cstring>
 
 #include "basalt/memory.h"
+#include "src/platform/heap.h"
 #include "tests/stress/stress.h"
 #include "tests/support/heap_inspection.h"
 
@@ -15,58 +16,48 @@ using namespace vex_lib;
 constexpr int THREADS = 8;
 constexpr std::size_t SLOTS = 64;
 
-struct Block {
-    std::size_t size;
-    std::size_t check;  // follows from the size, at the end of the block again
-};
-
-std::size_t check_of(std::size_t size) {
-    return ~size * 31;
-}
-
+// Both ends of a block hold its size.
 void mark(void* block, std::size_t size) {
-    const Block head = {size, check_of(size)};
-    std::memcpy(block, &head, sizeof head);
-    std::memcpy(static_cast<char*>(block) + size - sizeof head.check, &head.check, sizeof head.check);
+    std::memcpy(block, &size, sizeof size);
+    std::memcpy(static_cast<char*>(block) + size - sizeof size, &size, sizeof size);
 }
 
 void require_marked(const void* block) {
-    Block head;
-    std::memcpy(&head, block, sizeof head);
-    std::size_t end = 0;
-    std::memcpy(&end, static_cast<const char*>(block) + head.size - sizeof end, sizeof end);
-    require(head.check == check_of(head.size) && end == head.check, "a block holds what was left in it");
+    std::size_t size = 0, end = 0;
+    std::memcpy(&size, block, sizeof size);
+    std::memcpy(&end, static_cast<const char*>(block) + size - sizeof end, sizeof end);
+    require(end == size, "a block holds what was left in it");
 }
 
 std::size_t any_size(Random& random) {
-    const std::size_t size =
-        sizeof(Block) + sizeof(std::size_t) + static_cast<std::size_t>(draw(random, 400));
+    const auto size = 2 * sizeof(std::size_t) + static_cast<std::size_t>(draw(random, 400));
     const int kind = draw(random, 200);
     return kind == 0 ? size + (std::size_t{1} << 20) : kind < 10 ? size * 64 : size;
 }
 
-template <class Take, class Give>
-void exchange(std::atomic<void*>& slot, Random& random, Take take, Give give) {
-    const std::size_t size = any_size(random);
-    void* const block = take(size);
-    if (block != nullptr) {
-        mark(block, size);
-    }
-    if (void* const other = slot.exchange(block)) {
-        require_marked(other);
-        give(other);
-    }
-}
+struct Exchange {
+    void* (*take)(void* heap, std::size_t size);
+    void (*give)(void* heap, void* block);
+    void* heap;
+    std::atomic<void*> slots[SLOTS] = {};
 
-void inspect(void* heap) {
-    require(basalt::platform::inspect_heap(heap).fault == nullptr, "the heap is sound");
-}
+    void step(Random& random) {
+        const std::size_t size = any_size(random);
+        void* const block = take(heap, size);
+        block != nullptr ? mark(block, size) : void();
+        if (void* const other = slots[random() % SLOTS].exchange(block)) {
+            require_marked(other);
+            give(heap, other);
+        }
+    }
+    void inspect() const { require(platform::inspect_heap(heap).fault == nullptr, "the heap is sound"); }
+};
 
 void use_page_sources() {
     constexpr unsigned long SIZE = 1 << 20, COMMIT = 0x1000, RESERVE = 0x2000, RELEASE = 0x8000;
     void* const range = vlSharedMemoryAllocator::Alloc(nullptr, SIZE, RESERVE, nullptr);
     require(range != nullptr && vlSharedMemoryAllocator::Alloc(range, SIZE, COMMIT, nullptr) == range,
-            "a range of its own");
+            "a range");
     std::memset(range, 1, 4096);
     require(vlSharedMemoryAllocator::Free(range, 0, RELEASE, 0) != 0, "a range released");
     unsigned long handle = 0;
@@ -77,33 +68,30 @@ void use_page_sources() {
 }  // namespace
 
 long stress_heaps(double seconds) {
-    static std::atomic<void*> shared[SLOTS];
-    static std::atomic<void*> limited[SLOTS];
-    vlWinHeapAllocator heap(4 << 20);
+    const auto take = [](void* heap, std::size_t size) { return HeapAlloc(heap, 0, size); };
+    const auto give = [](void* heap, void* block) { require(HeapFree(heap, 0, block) != 0, "freed"); };
+    Exchange heaps[] = {
+        {take, give, HeapCreate(0, 0, 4 << 20)},
+        {take, give, HeapCreate(0, 0, 0)},
+        {[](void*, std::size_t size) { return vlSharedMemoryHeap::Alloc(size); },
+         [](void*, void* block) { vlSharedMemoryHeap::Free(block); }, vlSharedMemoryHeap::GetHeapHandle()}};
     const long rounds = run_threads(THREADS, seconds, [&](int thread, Random& random) {
         for (int i = 0; i < 100; ++i) {
-            const std::size_t slot = random() % SLOTS;
-            exchange(shared[slot], random, vlSharedMemoryHeap::Alloc, vlSharedMemoryHeap::Free);
-            exchange(
-                limited[slot], random, [&](std::size_t size) { return heap.Alloc(size); },
-                [&](void* block) { heap.Free(block); });
+            heaps[i % 3].step(random);
         }
-        if (thread == 0) {
-            inspect(vlSharedMemoryHeap::GetHeapHandle());
-            inspect(heap.Handle());
-        } else if (thread == 1) {
-            vlSharedMemoryHeap::Compact();
-            heap.Compact();
-        } else {
-            use_page_sources();
-        }
+        Exchange& any = heaps[draw(random, 3)];
+        thread == 0   ? any.inspect()
+        : thread == 1 ? static_cast<void>(HeapCompact(any.heap, 0))
+                      : use_page_sources();
     });
-    for (std::size_t slot = 0; slot < SLOTS; ++slot) {
-        vlSharedMemoryHeap::Free(shared[slot].exchange(nullptr));
-        heap.Free(limited[slot].exchange(nullptr));
+    for (Exchange& exchange : heaps) {
+        for (std::atomic<void*>& slot : exchange.slots) {
+            void* const block = slot.exchange(nullptr);
+            block != nullptr ? exchange.give(exchange.heap, block) : void();
+        }
+        exchange.inspect();
     }
-    inspect(heap.Handle());
-    return rounds;
+    return HeapDestroy(heaps[0].heap) != 0 && HeapDestroy(heaps[1].heap) != 0 ? rounds : 0;
 }
 
 }  // namespace basalt::stress

@@ -1,12 +1,19 @@
-// Runs one subject, or all but first_use, and prints how often the threads went round. A data race is the
-// thread sanitizer's to find; what is wrong without one ends the program. Usage: stress [SECONDS [SUBJECT]]
+// Runs one subject, or all but first_use, and prints how often the threads went round and what the process
+// holds. The thread sanitizer finds data races; other faults end the program, and so does memory that grows
+// in a run of a minute or more. Usage: stress [SECONDS (for each subject) [SUBJECT]]
+#include <malloc.h>
+#include <unistd.h>
+
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
+#include <fstream>
 #include <string_view>
 
+#include "basalt/memory.h"
 #include "basalt/platform/error.h"
 #include "tests/stress/stress.h"
+#include "tests/support/open_descriptors.h"
 #include "tests/support/threads.h"
 
 namespace basalt::stress {
@@ -23,7 +30,7 @@ long run_threads(int count, double seconds, const Round& round) {
     std::atomic<long> rounds = 0;
     test::run_threads(count, [&](int thread) {
         Random random(static_cast<unsigned>(thread + 1));
-        long mine = 0;  // what all count at once would order their rounds, and hide a race
+        long mine = 0;  // a shared count would order the threads' rounds and hide races
         do {
             round(thread, random);
             ++mine;
@@ -32,6 +39,36 @@ long run_threads(int count, double seconds, const Round& round) {
     });
     return rounds;
 }
+
+namespace {
+
+struct Holdings {
+    double resident = 0;  // MiB
+    long descriptors = test::open_descriptors();
+    Holdings() {
+        malloc_trim(0);
+        vex_lib::vlSharedMemoryHeap::Compact();
+        std::ifstream("/proc/self/statm") >> resident >> resident;
+        resident *= static_cast<double>(sysconf(_SC_PAGESIZE)) / (1 << 20);
+    }
+};
+
+// In ten parts; what is held after the second is compared with what is held at the end.
+void run(const char* name, long (*subject)(double), double seconds) {
+    long rounds = subject(seconds / 10) + subject(seconds / 10);
+    const Holdings before;
+    for (int part = 2; part < 10; ++part) {
+        rounds += subject(seconds / 10);
+    }
+    const Holdings after;
+    std::printf("%-10s %9ld rounds, resident %.1f and %.1f MiB, descriptors %ld and %ld\n", name, rounds,
+                before.resident, after.resident, before.descriptors, after.descriptors);
+    std::fflush(stdout);
+    require(after.descriptors <= before.descriptors, "descriptors do not grow");
+    require(seconds < 60 || after.resident <= 1.05 * before.resident + 1, "memory does not grow");
+}
+
+}  // namespace
 
 }  // namespace basalt::stress
 
@@ -44,20 +81,16 @@ int main(int argc, char** argv) {
         return 0;
     }
     basalt::platform::SetDebugOutputHandler([](const wchar_t*) {});
-    constexpr struct {
-        const char* name;
-        long (*run)(double);
-    } SUBJECTS[] = {{"sparse", stress_sparse},
-                    {"heaps", stress_heaps},
-                    {"files", stress_files},
-                    {"graphics", stress_graphics}};
-    bool known = false;
-    for (const auto& subject : SUBJECTS) {
-        if (wanted == "all" || wanted == subject.name) {
-            known = true;
-            std::printf("%-10s %ld rounds\n", subject.name, subject.run(seconds));
-            std::fflush(stdout);
+    const std::pair<const char*, long (*)(double)> subjects[] = {{"sparse", stress_sparse},
+                                                                 {"heaps", stress_heaps},
+                                                                 {"files", stress_files},
+                                                                 {"graphics", stress_graphics}};
+    bool is_known = false;
+    for (const auto& [name, subject] : subjects) {
+        if (wanted == "all" || wanted == name) {
+            is_known = true;
+            run(name, subject, seconds);
         }
     }
-    return known ? 0 : 2;
+    return is_known ? 0 : 2;
 }

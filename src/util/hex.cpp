@@ -20,7 +20,7 @@ std::string encode(const unsigned char* bytes, std::size_t count) {
     return digits;
 }
 
-// The pair rule for any two characters; for digits it gives what they stand for.
+// The byte of any two characters; for digits it is their value.
 unsigned char decode_pair(char32_t first, char32_t second) {
     const unsigned high = first & 0xFF;
     const unsigned low = second & 0xFF;
@@ -29,8 +29,7 @@ unsigned char decode_pair(char32_t first, char32_t second) {
     return static_cast<unsigned char>(high_part | low_part);
 }
 
-// The long way, for text in which not everything is a digit: what it is in wide lower-case characters
-// decides.
+// For text with other characters than digits, which counts in wide lower-case characters.
 template <class Bytes>
 Bytes decode_any(std::string_view text) {
     const platform::CodePage& code_page = platform::active_code_page();
@@ -45,7 +44,7 @@ Bytes decode_any(std::string_view text) {
     return bytes;
 }
 
-// Where everything is a digit no zero byte ends the text early, so its end need not be looked for first.
+// If all characters are digits, none is the zero that would end the text.
 template <class Bytes>
 Bytes decode(const std::string& hex) {
     Bytes bytes(hex.size() / 2, 0);
@@ -56,7 +55,7 @@ Bytes decode(const std::string& hex) {
 }
 
 bool has_zero(const std::string& text) {
-    // A short text has just been written in pieces, which the wide reads of find() would wait for.
+    // The wide reads of find() would stall on bytes that were just stored one by one.
     if (text.size() < 16) {
         return std::find(text.begin(), text.end(), '\0') != text.end();
     }

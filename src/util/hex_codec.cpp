@@ -12,13 +12,13 @@ namespace basalt::util {
 
 #if BASALT_HAS_VECTOR_HEX
 
-// The lanes, the same in both widths:
-//  - a nibble n becomes '0' + n, and 'a' - '0' - 10 more where n > 9;
-//  - a character's value as a decimal digit is one of 0 to 9, moved to the top of the range and back with
-//    saturation so that everything else comes to 16 or more; its value as a letter likewise by a saturating
-//    addition of 10; the smaller of the two is its value, 16 or more when it is no digit;
-//  - a pair of values becomes a byte in 16-bit lanes, of which the first character is the low half.
-// A last block that is not whole is taken together with what lies before it, a second time.
+// The same in both widths:
+//  - A nibble n becomes '0' + n, plus 'a' - '0' - 10 if n > 9.
+//  - A character's value is the smaller of its values as a decimal digit and as a letter. Saturating
+//  arithmetic
+//    makes each of them 16 or more for any other character.
+//  - A pair of values becomes a byte in 16-bit lanes, with the first character in the low half.
+// The last block overlaps the one before.
 
 namespace {
 
@@ -42,7 +42,7 @@ __m128i upper_8(__m128i lanes) {
     return _mm_unpackhi_epi64(lanes, lanes);
 }
 
-// Of sixteen digits; `largest` becomes the largest values met.
+// Converts sixteen digits and accumulates the largest values in `largest`.
 __m128i to_pairs(__m128i c, __m128i& largest) {
     const __m128i at_top =
         _mm_subs_epu8(_mm_add_epi8(c, _mm_set1_epi8(static_cast<char>(0xFF - '9'))), _mm_set1_epi8(6));
@@ -117,13 +117,13 @@ bool decode_hex_sse2(const char* digits, std::size_t count, unsigned char* bytes
 
 BASALT_AVX2 void encode_hex_avx2(const unsigned char* bytes, std::size_t count, char* digits) {
     const __m256i nibble = _mm256_set1_epi8(0x0F);
-    // Shuffling looks a nibble's digit up in one step.
+    // Looks up each nibble's digit by shuffling.
     const __m256i table = _mm256_broadcastsi128_si256(
         _mm_setr_epi8('0', '1', '2', '3', '4', '5', '6', '7', '8', '9', 'a', 'b', 'c', 'd', 'e', 'f'));
     std::size_t done = 0;
     for (; count - done >= 32; done += 32) {
         __m256i block = _mm256_loadu_si256(reinterpret_cast<const __m256i*>(bytes + done));
-        // The halves are interleaved apart, so the middle quarters change places first.
+        // Unpacking works on each half separately, so the middle quarters are swapped first.
         block = _mm256_permute4x64_epi64(block, 0b11'01'10'00);
         const __m256i high =
             _mm256_shuffle_epi8(table, _mm256_and_si256(_mm256_srli_epi16(block, 4), nibble));

@@ -1,5 +1,4 @@
-// Bytes to hexadecimal digits and back, in a portable form and in vector lanes. All forms give the same
-// results for every input.
+// Bytes to hexadecimal digits and back, portable and by SIMD. All forms return the same for every input.
 #ifndef BASALT_SRC_UTIL_HEX_CODEC_H
 #define BASALT_SRC_UTIL_HEX_CODEC_H
 
@@ -56,7 +55,7 @@ inline bool decode_hex_portable(const char* digits, std::size_t count, unsigned 
 }
 
 #if BASALT_HAS_VECTOR_HEX
-// 16 bytes at a time, less than that at once; every processor of this architecture runs these.
+// 16 bytes at a time; available on every processor of this architecture.
 void encode_hex_sse2(const unsigned char* bytes, std::size_t count, char* digits);
 bool decode_hex_sse2(const char* digits, std::size_t count, unsigned char* bytes);
 // 32 bytes at a time; only where __builtin_cpu_supports("avx2").
@@ -78,8 +77,8 @@ inline void encode_hex(const unsigned char* bytes, std::size_t count, char* digi
     encode_hex_portable(bytes, count, digits);
 }
 
-// Reads `count` pairs of digits, of either case. False when one of the characters is no digit; what was
-// written then has no meaning.
+// Reads `count` pairs of digits, of either case. False, with the output unspecified, if a character is not a
+// digit.
 inline bool decode_hex(const char* digits, std::size_t count, unsigned char* bytes) {
 #if BASALT_HAS_VECTOR_HEX
     return count >= 32 && can_use_avx2() ? decode_hex_avx2(digits, count, bytes)

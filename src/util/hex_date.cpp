@@ -18,7 +18,7 @@ bool ParseDateFromHexString(const std::string& hex, COleDateTime& date) {
     int day = 0;
     int month = 0;
     int year = 0;
-    // Fields that cannot be read stay 0, which is no date.
+    // Fields that cannot be read stay 0, which is invalid.
     static_cast<void>(std::sscanf(text.c_str(), "%2d%2d%4d", &day, &month, &year));
     SYSTEMTIME time{};
     time.wYear = static_cast<WORD>(year);

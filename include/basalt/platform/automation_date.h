@@ -8,8 +8,12 @@
 #ifndef BASALT_PLATFORM_AUTOMATION_DATE_H
 #define BASALT_PLATFORM_AUTOMATION_DATE_H
 
+#include <ctime>
+#include <cwchar>
+
 #include "basalt/export.h"
 #include "basalt/platform/calendar.h"
+#include "basalt/platform/cstring.h"
 
 /// Days since 30 December 1899, 0:00.
 using DATE = double;
@@ -49,6 +53,15 @@ public:
     /// The calendar time given.
     COleDateTime(int year, int month, int day, int hour, int minute, int second);
 
+    /// The time now in the local time zone.
+    static COleDateTime GetCurrentTime() {
+        const std::time_t now = std::time(nullptr);
+        std::tm local{};
+        localtime_r(&now, &local);
+        return {local.tm_year + 1900, local.tm_mon + 1, local.tm_mday,
+                local.tm_hour,        local.tm_min,     local.tm_sec};
+    }
+
     /// The status.
     DateTimeStatus GetStatus() const { return m_status; }
     /// Sets the status and keeps the value.
@@ -63,6 +76,36 @@ public:
     /// @return false, with the time unchanged, if the date is not valid
     bool GetAsSystemTime(SYSTEMTIME& time) const;
 
+    /// The date as text, by a format of std::wcsftime and in the process's locale. Empty if the date is not
+    /// valid, the format is null or the text is longer than a million characters.
+    CString Format(const wchar_t* format) const {
+        SYSTEMTIME time{};
+        if (format == nullptr || !GetAsSystemTime(time)) {
+            return {};
+        }
+        const double first_of_january = COleDateTime(time.wYear, 1, 1, 0, 0, 0);
+        const double day = COleDateTime(time.wYear, time.wMonth, time.wDay, 0, 0, 0);
+        std::tm fields{};
+        fields.tm_year = time.wYear - 1900;
+        fields.tm_mon = time.wMonth - 1;
+        fields.tm_mday = time.wDay;
+        fields.tm_hour = time.wHour;
+        fields.tm_min = time.wMinute;
+        fields.tm_sec = time.wSecond;
+        fields.tm_wday = time.wDayOfWeek;
+        fields.tm_yday = static_cast<int>(day - first_of_january);
+        const CString marked = format + CString(L'.');  // no result is empty but one that does not fit
+        CString text;
+        for (int size = 256; size <= 1 << 20; size *= 8) {
+            const auto length =
+                std::wcsftime(text.GetBuffer(size), static_cast<std::size_t>(size), marked, &fields);
+            text.ReleaseBuffer(length > 0 ? static_cast<int>(length) - 1 : 0);
+            if (length > 0) {
+                break;
+            }
+        }
+        return text;
+    }
     /// Year, 100 to 9999.
     int GetYear() const;
     /// Month, 1 to 12.

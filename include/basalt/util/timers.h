@@ -10,14 +10,14 @@
 
 namespace vex_util {
 
-/// Stopwatch on the performance counter. It runs from construction, queries never stop it, and copies run on
-/// from the same start.
-/// Threads: one timer is used by one thread at a time; different timers need no care, the first ones neither.
+/// Stopwatch on the performance counter. It starts at construction, queries do not stop it, and a copy keeps
+/// the same start.
+/// Threads: one timer is used by one thread at a time; different timers are independent.
 class BASALT_API HiResTimer {
 public:
     /// An unnamed timer, started now.
     HiResTimer();
-    /// A timer started now. Name and flag are the host's own: kept and copied, read by nothing here.
+    /// A timer started now. Name and flag are stored for the host and not used.
     HiResTimer(const CString& name, bool flag);
 
     /// Starts again from 0.
@@ -26,7 +26,7 @@ public:
     float GetElapsedS();
     /// The same as GetElapsedS().
     float GetElapsed();
-    /// Whole milliseconds since the last start, cut off, in their low 32 bits: from 0 again every 49.7 days.
+    /// Whole milliseconds since the last start, truncated to 32 bits: wraps around every 49.7 days.
     unsigned long GetElapsedMs();
 
     /// Length of one counter tick (seconds), one for the process; 0.0 until the first timer is constructed.
@@ -39,31 +39,31 @@ private:
     [[maybe_unused]] bool m_flag;
 };
 
-/// Tells a polling loop when each period of a given length has passed. The time by which a period was
-/// overshot counts towards the next, so a sequence of periods keeps its phase however late the polls come.
+/// Reports to a polling loop when a period has passed. The time by which a poll is late counts towards the
+/// next period, so the phase holds.
 ///
 /// Accuracy: carry and elapsed time are floats, so each completed period shifts the phase by at most 6e-8 of
 /// the elapsed time plus 6e-8 of the sum with the carry (1.2e-7 s for periods of a second polled often, in
-/// either direction), and by the time that passes between the two counter readings of one Update() call.
+/// either direction), and by the time between the two counter readings of one Update() call.
 /// Threads: one timer is used by one thread at a time.
 class BASALT_API PeriodicTimer {
 public:
     /// Periods of one second, the first complete a second from now.
     PeriodicTimer();
-    /// @param period length of a period (seconds); 0 or less is complete at every Update(), NaN never
+    /// @param period length of a period (seconds); 0 or less is complete at every Update(), NaN at none
     /// @param startDue true: the first Update() already reports a period
     PeriodicTimer(float period, bool startDue);
 
-    /// Starts the current period again; what was carried into it stays.
+    /// Restarts the current period and keeps the time carried into it.
     void Reset();
-    /// Starts with a new period (seconds). With `startDue` the next Update() reports one; without, what was
-    /// carried into the current period is carried into the new one.
+    /// Starts with a new period (seconds). With `startDue` the next Update() reports one; without, the time
+    /// carried into the current period is kept.
     void Reset(float period, bool startDue);
     /// Whether a period has passed since the last start; if so the next one starts.
     /// @param dropRemainder true: the next period starts now; false: it started when the last one ended
     /// @return true for one or more completed periods: those beyond the first are dropped, the phase holds.
-    /// Bad input: a period of 0 without `dropRemainder` leaves a NaN carry, after which nothing is reported
-    /// until a Reset() with `startDue`.
+    /// Bad input: after a period of 0 without `dropRemainder` nothing is reported until a Reset() with
+    /// `startDue`.
     bool Update(bool dropRemainder);
 
 private:

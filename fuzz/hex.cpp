@@ -1,9 +1,7 @@
-// Hexadecimal text: every form of the codec against the portable one, and both directions against each other.
+// Hexadecimal text: every form of the codec against the plain one, and both directions against each other.
 #include <algorithm>
-#include <cstdint>
+#include <cctype>
 #include <stdexcept>
-#include <string>
-#include <vector>
 
 #include "basalt/util/hex.h"
 #include "fuzz/input.h"
@@ -16,62 +14,70 @@ using namespace basalt::util;
 using basalt::fuzz::require;
 using Bytes = std::vector<unsigned char>;
 
-// In buffers of exactly the size needed, so that the sanitizer sees what reaches beyond.
-template <class Decode>
-void check_decode(const Decode& decode, const std::string& text, bool is_hex, const Bytes& expected) {
-    const std::vector<char> digits(text.begin(), text.end());
-    Bytes bytes(text.size() / 2);
-    require(decode(digits.data(), bytes.size(), bytes.data()) == is_hex);
-    require(!is_hex || bytes == expected);
-}
+struct Form {
+    void (*encode)(const unsigned char*, std::size_t, char*);
+    bool (*decode)(const char*, std::size_t, unsigned char*);
+};
 
-template <class Encode>
-void check_encode(const Encode& encode, const Bytes& bytes, const std::string& expected) {
-    std::vector<char> digits(2 * bytes.size());
-    encode(bytes.data(), bytes.size(), digits.data());
-    require(std::equal(digits.begin(), digits.end(), expected.begin(), expected.end()));
-}
-
-void check_round_trip(const Bytes& bytes) {
-    const std::string text = VectorToHexString(bytes);
-    require(text.size() == 2 * bytes.size() && IsHexString(text));
-    require(HexStringToVector(text) == bytes);
-    check_encode(encode_hex_portable, bytes, text);
+const std::vector<Form>& forms() {
+    static const std::vector<Form> all = [] {
+        std::vector<Form> found{{encode_hex, decode_hex}, {encode_hex_portable, decode_hex_portable}};
 #if BASALT_HAS_VECTOR_HEX
-    check_encode(encode_hex_sse2, bytes, text);
-    if (can_use_avx2()) {
-        check_encode(encode_hex_avx2, bytes, text);
-    }
+        found.push_back({encode_hex_sse2, decode_hex_sse2});
+        if (can_use_avx2()) {
+            found.push_back({encode_hex_avx2, decode_hex_avx2});
+        }
 #endif
+        return found;
+    }();
+    return all;
 }
 
-void check_any_text(const std::string& text) {
-    const std::string pairs = text.substr(0, text.size() / 2 * 2);
-    const bool is_hex = IsHexString(pairs);
-    const Bytes bytes = HexStringToVector(text);
-    require(bytes.size() <= text.size() / 2);
-    check_decode(decode_hex_portable, pairs, is_hex, bytes);
-#if BASALT_HAS_VECTOR_HEX
-    check_decode(decode_hex_sse2, pairs, is_hex, bytes);
-    if (can_use_avx2()) {
-        check_decode(decode_hex_avx2, pairs, is_hex, bytes);
-    }
-#endif
-    const bool has_zero = std::find(bytes.begin(), bytes.end(), 0) != bytes.end();
-    try {
-        const std::string decoded = HexStringToString(text);
-        require(!has_zero &&
-                std::equal(bytes.begin(), bytes.end(), decoded.begin(), decoded.end(),
-                           [](unsigned char a, char b) { return a == static_cast<unsigned char>(b); }));
-    } catch (const std::runtime_error&) {
-        require(has_zero);
+bool is_digit(char ch) {
+    return std::isxdigit(static_cast<unsigned char>(ch)) != 0;
+}
+
+// In buffers of exactly the size needed, so that the sanitizer sees accesses beyond.
+void check(const Bytes& bytes, const std::string& pairs, const std::string& text) {
+    const std::vector<char> any(pairs.begin(), pairs.end());
+    for (const auto& [encode, decode] : forms()) {
+        std::vector<char> digits(2 * bytes.size());
+        Bytes back(bytes.size());
+        Bytes some(any.size() / 2);
+        encode(bytes.data(), bytes.size(), digits.data());
+        require(std::equal(digits.begin(), digits.end(), text.begin(), text.end()));
+        require(decode(digits.data(), bytes.size(), back.data()) && back == bytes);
+        require(decode(any.data(), some.size(), some.data()) ==
+                std::all_of(any.begin(), any.end(), is_digit));
     }
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    check_round_trip(Bytes(data, data + size));
-    check_any_text(std::string(data, data + size));
+    const Bytes bytes(data, data + size);
+    const std::string any(data, data + size);
+    std::string text;
+    for (const unsigned char byte : bytes) {
+        text.append({"0123456789abcdef"[byte >> 4], "0123456789abcdef"[byte & 15]});
+    }
+    check(bytes, any.substr(0, size / 2 * 2), text);
+    std::string spoilt = text;  // one character is replaced, the others change their case
+    std::transform(text.begin(), text.end(), spoilt.begin(),
+                   [](char ch) { return static_cast<char>(std::toupper(ch)); });
+    if (size > 0) {
+        spoilt[data[0] * 7 % spoilt.size()] = any[size / 2];
+    }
+    check(bytes, spoilt, text);
+    require(VectorToHexString(bytes) == text && StringToHexString(any) == text &&
+            HexStringToVector(text) == bytes);
+    require(IsHexString(any) == std::all_of(any.begin(), any.end(), is_digit));
+    const Bytes decoded = HexStringToVector(any);
+    const bool has_zero = std::find(decoded.begin(), decoded.end(), 0) != decoded.end();
+    try {
+        require(HexStringToString(any) == std::string(decoded.begin(), decoded.end()) && !has_zero);
+    } catch (const std::runtime_error&) {
+        require(has_zero);
+    }
     return 0;
 }

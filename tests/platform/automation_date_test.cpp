@@ -1,139 +1,157 @@
+// Dates: automation dates, tick counts and dates in hexadecimal text, by one table of times.
 #include "basalt/platform/automation_date.h"
 
 #include <gtest/gtest.h>
 
+#include <climits>
 #include <cmath>
 #include <cstring>
-#include <limits>
 #include <random>
 
-#include "basalt/platform/error.h"
+#include "basalt/util/hex.h"
+#include "tests/platform/error_of.h"
 
 namespace {
 
-SYSTEMTIME at(int year, int month, int day, int hour = 0, int minute = 0, int second = 0) {
-    const auto word = [](int number) { return static_cast<WORD>(number); };
-    return {word(year), word(month), 0, word(day), word(hour), word(minute), word(second), 0};
+using basalt::test::error_of;
+
+constexpr double SECOND = 1.0 / 86'400.0;
+constexpr SYSTEMTIME UNCHANGED{1, 2, 3, 4, 5, 6, 7, 8};
+
+constexpr SYSTEMTIME at(WORD year, WORD month, WORD weekday, WORD day, WORD hour = 0, WORD minute = 0,
+                        WORD second = 0) {
+    return {year, month, weekday, day, hour, minute, second, 0};
 }
 
-// But for the day of the week, which what is expected does not know.
-void expect_same(SYSTEMTIME time, const SYSTEMTIME& expected) {
-    time.wDayOfWeek = expected.wDayOfWeek;
-    EXPECT_EQ(std::memcmp(&time, &expected, sizeof time), 0)
-        << testing::PrintToString(time) << ' ' << testing::PrintToString(expected);
+bool operator==(const SYSTEMTIME& a, const SYSTEMTIME& b) {
+    return std::memcmp(&a, &b, sizeof a) == 0;
 }
 
-TEST(AutomationDate, published_values) {
+TEST(Dates, have_known_values_days_of_the_week_and_tick_counts) {
     struct Row {
         SYSTEMTIME time;
         double date;
-        int weekday;
     };
-    for (const Row& row : {
-             Row{at(1899, 12, 30), 0.0, 6},
-             Row{at(1899, 12, 29, 6), -1.25, 5},
-             Row{at(1899, 12, 31, 18), 1.75, 0},
-             Row{at(1970, 1, 1), 25569.0, 4},
-             Row{at(2000, 2, 29, 12), 36585.5, 2},
-             Row{at(100, 1, 1), -657434.0, 5},
-             Row{at(9999, 12, 31), 2958465.0, 5},
-         }) {
-        SCOPED_TRACE(row.date);
-        SYSTEMTIME time = row.time;
-        double date = 0.5;
-        EXPECT_EQ(SystemTimeToVariantTime(&time, &date), 1);
-        EXPECT_EQ(date, row.date);
-        EXPECT_EQ(VariantTimeToSystemTime(row.date, &time), 1);
-        expect_same(time, row.time);
-        EXPECT_EQ(time.wDayOfWeek, row.weekday);
-    }
-    SYSTEMTIME time{};
-    EXPECT_EQ(VariantTimeToSystemTime(-0.25, &time), 1);
-    expect_same(time, at(1899, 12, 30, 6));
-}
-
-TEST(AutomationDate, what_is_no_date_is_refused) {
-    for (SYSTEMTIME time : {at(2021, 2, 29), at(2021, 4, 31), at(2021, 0, 1), at(2021, 13, 1), at(2021, 1, 0),
-                            at(1900, 2, 29), at(0, 1, 1), at(99, 12, 31), at(10000, 1, 1), at(65535, 1, 1),
-                            at(2021, 65535, 1), at(2021, 1, 65535), at(2021, 257, 1), at(2021, 1, 257),
-                            at(2021, 1, 1, 24), at(2021, 1, 1, 0, 60), at(2021, 1, 1, 0, 0, 60)}) {
-        double date = 0.5;
-        SetLastError(0);
-        EXPECT_EQ(SystemTimeToVariantTime(&time, &date), 0)
-            << time.wYear << ' ' << time.wMonth << ' ' << time.wDay;
-        EXPECT_EQ(GetLastError(), 87U);
-        EXPECT_EQ(date, 0.5);
-    }
-    const double nan = std::numeric_limits<double>::quiet_NaN();
-    const double infinity = std::numeric_limits<double>::infinity();
-    for (const double date :
-         {-657435.0, -657435.99999999, 2958466.0, 2958465.9999999, 1e300, -1e300, nan, infinity, -infinity}) {
-        SYSTEMTIME time = at(1, 2, 3);
-        EXPECT_EQ(VariantTimeToSystemTime(date, &time), 0) << date;
-        expect_same(time, at(1, 2, 3));
-    }
-}
-
-TEST(AutomationDate, rounds_to_the_nearest_second_on_both_sides_of_zero) {
-    constexpr double SECOND = 1.0 / 86'400.0;
-    SYSTEMTIME time{};
-    for (const auto& [date, expected] : {std::pair(2.0 - 0.4 * SECOND, at(1900, 1, 1)),
-                                         std::pair(2.0 - 0.6 * SECOND, at(1899, 12, 31, 23, 59, 59)),
-                                         std::pair(-2.0 + 0.4 * SECOND, at(1899, 12, 30)),
-                                         std::pair(-657434.0 - 1.4 * SECOND, at(100, 1, 1, 0, 0, 1))}) {
-        EXPECT_EQ(VariantTimeToSystemTime(date, &time), 1);
-        expect_same(time, expected);
-    }
-}
-
-TEST(AutomationDate, every_second_survives_the_way_there_and_back) {
-    const unsigned seed = std::random_device{}();
-    SCOPED_TRACE(seed);
-    std::mt19937 random(seed);
-    const auto draw = [&](int from, int to) { return std::uniform_int_distribution(from, to)(random); };
-    for (int round = 0; round < 20'000; ++round) {
-        const SYSTEMTIME time =
-            at(draw(100, 9999), draw(1, 12), draw(1, 28), draw(0, 23), draw(0, 59), draw(0, 59));
+    constexpr Row ROWS[] = {{at(1899, 12, 6, 30), 0},          {at(1899, 12, 5, 29, 6), -1.25},
+                            {at(100, 1, 5, 1), -657434},       {at(1601, 1, 1, 1), -109205},
+                            {at(2000, 2, 2, 29, 12), 36585.5}, {at(9999, 12, 5, 31), 2958465}};
+    for (const auto& [time, date] : ROWS) {
         SYSTEMTIME copy = time;
-        double date = 0.0;
-        ASSERT_EQ(SystemTimeToVariantTime(&copy, &date), 1);
-        SYSTEMTIME back{};
-        ASSERT_EQ(VariantTimeToSystemTime(date, &back), 1);
-        expect_same(back, time);
+        double value = 0.5;
+        FILETIME count{};
+        EXPECT_TRUE(SystemTimeToVariantTime(&copy, &value) == 1 && value == date) << date;
+        EXPECT_TRUE(VariantTimeToSystemTime(date, &copy) == 1 && copy == time) << date;
+        const bool has_ticks = SystemTimeToFileTime(&time, &count) != 0;
+        const double days = std::trunc(date) + std::abs(date - std::trunc(date)) + 109205.0;
+        EXPECT_EQ(has_ticks, days >= 0) << date;
+        EXPECT_EQ(count.dwHighDateTime * 4294967296.0 + count.dwLowDateTime, std::max(days, 0.0) * 864e9);
+        EXPECT_TRUE(!has_ticks || (FileTimeToSystemTime(&count, &copy) != 0 && copy == time)) << date;
+    }
+    constexpr SYSTEMTIME INVALID[] = {
+        at(99, 12, 0, 31),        at(2021, 2, 0, 29),          at(2021, 0, 0, 1), at(2021, 257, 0, 1),
+        at(2021, 1, 0, 257),      at(2021, 13, 0, 1),          at(2021, 1, 0, 0), at(2021, 1, 0, 1, 24),
+        at(2021, 1, 0, 1, 0, 60), at(2021, 1, 0, 1, 0, 0, 60), at(30828, 1, 0, 1)};
+    for (SYSTEMTIME time : INVALID) {
+        double date = 0.5;
+        FILETIME count{7, 7};
+        EXPECT_EQ(error_of(SystemTimeToVariantTime(&time, &date)), 87U) << testing::PrintToString(time);
+        EXPECT_EQ(error_of(SystemTimeToFileTime(&time, &count)), 87U) << testing::PrintToString(time);
+        EXPECT_TRUE(date == 0.5 && count.dwLowDateTime == 7 && count.dwHighDateTime == 7);
+    }
+    SYSTEMTIME time{2000, 1, 6, 1, 0, 0, 0, 1000};
+    FILETIME count{0, 1U << 31};
+    EXPECT_EQ(error_of(FileTimeToSystemTime(&count, &time)), 87U);
+    EXPECT_EQ(error_of(SystemTimeToFileTime(&time, &count)), 87U);
+    count = {0xFFFFFFFF, 0x7FFFFFFF};
+    EXPECT_TRUE(FileTimeToSystemTime(&count, &time) != 0 &&
+                time == (SYSTEMTIME{30828, 9, 4, 14, 2, 48, 5, 477}));
+    EXPECT_EQ(error_of(SystemTimeToVariantTime(&time, nullptr)), 87U) << "beyond 9999";
+    GetSystemTime(&time);
+    EXPECT_NEAR(COleDateTime(time), 25569.0 + static_cast<double>(std::time(nullptr)) * SECOND, 5 * SECOND);
+}
+
+TEST(Dates, round_to_the_nearest_second_on_both_sides_of_zero) {
+    constexpr std::pair<double, const wchar_t*> ROWS[] = {{2.0 - 0.4 * SECOND, L"1900-01-01 00:00:00"},
+                                                          {2.0 - 0.6 * SECOND, L"1899-12-31 23:59:59"},
+                                                          {-0.25, L"1899-12-30 06:00:00"},
+                                                          {-2.0 + 0.4 * SECOND, L"1899-12-30 00:00:00"},
+                                                          {-657434.0 - 1.4 * SECOND, L"100-01-01 00:00:01"}};
+    for (const auto& [date, text] : ROWS) {
+        EXPECT_EQ(COleDateTime(date).Format(L"%Y-%m-%d %H:%M:%S"), text);
+    }
+    for (const double date :
+         {-657435.0, -657435.99999999, 2958466.0, 2958465.9999999, 1e300, -HUGE_VAL, std::nan("")}) {
+        SYSTEMTIME time = UNCHANGED;
+        EXPECT_EQ(error_of(VariantTimeToSystemTime(date, &time)), 87U);
+        EXPECT_TRUE(time == UNCHANGED && COleDateTime(date).GetStatus() == COleDateTime::invalid);
+    }
+    std::mt19937 random(std::random_device{}());
+    for (int round = 0; round < 20'000; ++round) {
+        const double date = std::uniform_int_distribution(-657434, 2958465)(random);
+        const int second = std::uniform_int_distribution(0, 86'399)(random);
+        SYSTEMTIME time{};
+        double back = 0.5;
+        ASSERT_EQ(VariantTimeToSystemTime(std::copysign(std::abs(date) + second * SECOND, date), &time), 1);
+        ASSERT_EQ((time.wHour * 60 + time.wMinute) * 60 + time.wSecond, second);
+        ASSERT_EQ(SystemTimeToVariantTime(&time, &back), 1);
+        ASSERT_EQ(std::trunc(back), date);
     }
 }
 
-TEST(AutomationDate, object_knows_whether_it_is_a_date) {
-    EXPECT_EQ(COleDateTime().GetStatus(), COleDateTime::valid);
+TEST(Dates, objects_have_a_status_parts_an_order_and_a_text) {
     COleDateTime date(2021, 2, 1, 13, 14, 15);
-    EXPECT_EQ(date.GetYear(), 2021);
-    EXPECT_EQ(date.GetMonth(), 2);
-    EXPECT_EQ(date.GetDay(), 1);
-    EXPECT_EQ(date.GetHour(), 13);
-    EXPECT_EQ(date.GetMinute(), 14);
-    EXPECT_EQ(date.GetSecond(), 15);
-    EXPECT_EQ(date.GetDayOfWeek(), 2) << "a Monday";
-    EXPECT_EQ(COleDateTime(at(2021, 2, 1, 13, 14, 15)), date);
+    EXPECT_EQ(date.Format(L"%d.%m.%Y %H:%M:%S %j %a"), L"01.02.2021 13:14:15 032 Mon");
+    EXPECT_EQ((date.Format(CString(L'x', 5000)) + date.Format(nullptr) + date.Format(L"")).GetLength(), 5000);
+    CString parts;
+    parts.Format(L"%d-%d-%d %d:%d:%d %d", date.GetYear(), date.GetMonth(), date.GetDay(), date.GetHour(),
+                 date.GetMinute(), date.GetSecond(), date.GetDayOfWeek());
+    EXPECT_EQ(parts, L"2021-2-1 13:14:15 2");
     EXPECT_EQ(date.SetDateTime(2021, 2, 29, 0, 0, 0), COleDateTime::invalid);
-    EXPECT_EQ(date.GetYear(), -1);
-    EXPECT_EQ(date.GetDayOfWeek(), -1);
-    for (const int wrong : {-1, -65535, 65536 + 1, std::numeric_limits<int>::min()}) {
-        EXPECT_EQ(COleDateTime(2021, wrong, 1, 0, 0, 0).GetStatus(), COleDateTime::invalid);
-        EXPECT_EQ(COleDateTime(2021, 1, 1, wrong, 0, 0).GetStatus(), COleDateTime::invalid);
+    EXPECT_TRUE(date.GetYear() == -1 && date.GetDayOfWeek() == -1 && date.Format(L"%Y").IsEmpty());
+    for (const int wrong : {-1, -65535, 65536 + 1, INT_MIN}) {
+        EXPECT_EQ(COleDateTime(2021, wrong, 1, 0, 0, 0).GetStatus() +
+                      COleDateTime(2021, 1, 1, wrong, 0, 0).GetStatus(),
+                  2);
     }
-    EXPECT_EQ(COleDateTime(std::nan("")).GetStatus(), COleDateTime::invalid);
-    EXPECT_EQ(static_cast<DATE>(COleDateTime(-1.25)), -1.25);
-}
-
-TEST(AutomationDate, order_is_that_of_time) {
     const COleDateTime morning(-1.25);
     const COleDateTime evening(-1.75);  // the same day, though the smaller number
-    EXPECT_TRUE(morning < evening && evening > morning && morning <= evening && !(morning >= evening));
+    EXPECT_TRUE(morning < evening && evening > morning && morning <= evening && !(morning >= evening) &&
+                morning != evening);
     EXPECT_EQ(COleDateTime(-0.25), COleDateTime(0.25));
-    EXPECT_TRUE(COleDateTime(5.0) != COleDateTime(6.0));
-    COleDateTime none(5.0);
-    none.SetStatus(COleDateTime::null);
-    EXPECT_FALSE(none == none || none < COleDateTime(6.0) || none > COleDateTime(4.0) || none <= none);
+    date.SetStatus(COleDateTime::null);
+    EXPECT_FALSE(date == date || date < morning || date > morning || date <= date);
+    SYSTEMTIME utc{};
+    GetSystemTime(&utc);
+    EXPECT_NEAR(COleDateTime::GetCurrentTime(), COleDateTime(utc), 0.6) << "within half a day's time zone";
+}
+
+TEST(Dates, are_read_from_hexadecimal_text) {
+    constexpr double NONE = -1e9;
+    constexpr std::pair<const char*, double> ROWS[] = {{"01022021", 44228},
+                                                       {"29022020", 43890},
+                                                       {"30121899", 0},
+                                                       {"01010100", -657434},
+                                                       {"31129999", 2958465},
+                                                       {"1 2 2021", 44228},
+                                                       {"01022021 and more", 44228},
+                                                       {"+1+22021", 44228},
+                                                       {"29022021", NONE},
+                                                       {"00012021", NONE},
+                                                       {"01132021", NONE},
+                                                       {"", NONE},
+                                                       {"0102", NONE},
+                                                       {"01010099", NONE},
+                                                       {"abcdefgh", NONE},
+                                                       {"-1022021", NONE},
+                                                       {"01-12021", NONE},
+                                                       {"0102-999", NONE}};
+    COleDateTime date(5.0);
+    EXPECT_THROW(basalt::ParseDateFromHexString("3031003232303231", date), std::runtime_error);
+    EXPECT_TRUE(date.m_dt == 5.0 && date.GetStatus() == COleDateTime::valid);
+    for (const auto& [text, value] : ROWS) {
+        EXPECT_TRUE(basalt::ParseDateFromHexString(basalt::StringToHexString(text), date));
+        EXPECT_EQ(date.GetStatus() == COleDateTime::valid ? date.m_dt : NONE, value) << text;
+    }
 }
 
 }  // namespace

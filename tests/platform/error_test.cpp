@@ -5,162 +5,93 @@
 
 #include <array>
 #include <cerrno>
-#include <cstdio>
-#include <cstdlib>
-#include <cwchar>
-#include <string>
+#include <fstream>
 #include <thread>
-#include <utility>
 
 #include "src/platform/error_message.h"
 #include "src/platform/errors/error_from_errno.h"
+#include "tests/support/scratch_folder.h"
 
 namespace {
 
-constexpr DWORD SYSTEM_TEXT = 0x1300;
+using namespace basalt::platform;
 
-std::wstring message_of(DWORD code) {
-    wchar_t* text = nullptr;
-    const DWORD length = FormatMessageW(SYSTEM_TEXT, nullptr, code, 0, &text, 0, nullptr);
-    std::wstring message = text != nullptr ? text : L"(none)";
-    EXPECT_EQ(length, message.size());
-    EXPECT_EQ(LocalFree(text), nullptr);
-    return message;
-}
-
-// What a function writes to standard error.
-template <class Function>
-std::string standard_error_of(Function function) {
-    std::FILE* const file = std::tmpfile();
-    const int kept = dup(STDERR_FILENO);
-    dup2(fileno(file), STDERR_FILENO);
-    function();
-    dup2(kept, STDERR_FILENO);
-    close(kept);
-    std::rewind(file);
-    std::string output(200'000, '\0');
-    output.resize(std::fread(output.data(), 1, output.size(), file));
-    std::fclose(file);
-    return output;
-}
-
-TEST(LastError, each_thread_has_its_own) {
+TEST(Errors, are_a_threads_own_and_come_from_errno) {
     SetLastError(0xFFFFFFFF);
-    std::thread([] {
-        EXPECT_EQ(GetLastError(), 0U);
-        SetLastError(5);
-        EXPECT_EQ(GetLastError(), 5U);
-    }).join();
+    std::thread([] { EXPECT_EQ(GetLastError(), 0U); }).join();
     EXPECT_EQ(GetLastError(), 0xFFFFFFFFU);
-}
-
-TEST(LastError, result_codes) {
-    static_assert(HRESULT_FROM_WIN32(0) == 0);
-    static_assert(HRESULT_FROM_WIN32(5) == static_cast<HRESULT>(0x80070005));
-    static_assert(HRESULT_FROM_WIN32(0x12345) == static_cast<HRESULT>(0x80072345));
-    static_assert(HRESULT_FROM_WIN32(0x8007000E) == static_cast<HRESULT>(0x8007000E));
-}
-
-TEST(LastError, from_errno) {
-    using Row = std::pair<int, DWORD>;
-    for (const auto& [number, code] :
-         {Row{0, 0},    {ENOENT, 2},       {ENOTDIR, 3},  {EMFILE, 4},         {ENFILE, 4},
-          {EACCES, 5},  {EPERM, 5},        {EBADF, 6},    {ENOMEM, 8},         {EEXIST, 80},
-          {EINVAL, 87}, {ENOSPC, 112},     {EDQUOT, 112}, {ENAMETOOLONG, 206}, {EAGAIN, 1450},
-          {-1, 31},     {99999, 31},       {EISDIR, 5},   {EROFS, 19},         {ETXTBSY, 32},
-          {ENOSYS, 50}, {EOPNOTSUPP, 50},  {ENODEV, 55},  {ENXIO, 55},         {EBUSY, 170},
-          {EFBIG, 223}, {EOVERFLOW, 534},  {EINTR, 995},  {EFAULT, 998},       {EILSEQ, 1113},
-          {EIO, 1117},  {ETIMEDOUT, 1460}, {ELOOP, 1921}}) {
+    static_assert(HRESULT_FROM_WIN32(0) == 0 &&
+                  static_cast<DWORD>(HRESULT_FROM_WIN32(0x12345)) == 0x80072345);
+    static_assert(static_cast<DWORD>(HRESULT_FROM_WIN32(0x8007000E)) == 0x8007000E);
+    constexpr std::pair<int, DWORD> ROWS[] = {
+        {0, 0},           {ENOENT, 2},       {ENOTDIR, 3},  {EMFILE, 4},         {ENFILE, 4},
+        {EACCES, 5},      {EPERM, 5},        {EISDIR, 5},   {EBADF, 6},          {ENOMEM, 8},
+        {EROFS, 19},      {-1, 31},          {99999, 31},   {ETXTBSY, 32},       {ENOSYS, 50},
+        {EOPNOTSUPP, 50}, {ENODEV, 55},      {ENXIO, 55},   {EEXIST, 80},        {EINVAL, 87},
+        {ENOSPC, 112},    {EDQUOT, 112},     {EBUSY, 170},  {ENAMETOOLONG, 206}, {EFBIG, 223},
+        {EOVERFLOW, 534}, {EINTR, 995},      {EFAULT, 998}, {EILSEQ, 1113},      {EIO, 1117},
+        {EAGAIN, 1450},   {ETIMEDOUT, 1460}, {ELOOP, 1921}};
+    for (const auto& [number, code] : ROWS) {
         errno = number;
-        basalt::platform::set_last_error_from_errno();
+        set_last_error_from_errno();
         EXPECT_EQ(GetLastError(), code) << number;
     }
 }
 
-TEST(ErrorMessage, every_code_has_one_without_a_line_break) {
-    EXPECT_EQ(message_of(9999), L"Unknown error 9999");
-    EXPECT_EQ(message_of(0xFFFFFFFF), L"Unknown error 4294967295");
-    for (const DWORD code : {2U, 3U, 4U, 5U, 6U, 8U, 80U, 87U, 112U, 122U, 206U, 487U, 1450U}) {
-        const std::wstring message = message_of(code);
-        EXPECT_EQ(message.find(L"Unknown"), message.npos) << code;
-        EXPECT_EQ(message.find_first_of(L"\r\n"), message.npos) << code;
+DWORD format(DWORD code, wchar_t*& text, DWORD size = 0, DWORD flags = 0x1300, DWORD language = 0) {
+    return FormatMessageW(flags, nullptr, code, language, &text, size, nullptr);
+}
+
+TEST(Errors, have_messages_without_line_breaks) {
+    for (const DWORD code : {0U, 2U, 8U, 87U, 487U, 1921U, 9999U, 0xFFFFFFFFU}) {
+        wchar_t* text = nullptr;
+        const DWORD length = format(code, text, 5000);
+        text[4999] = L'x';  // the size requested
+        const std::wstring message(text, length);
+        EXPECT_EQ(message.find(L"Unknown error " + std::to_wstring(code)), code < 9999 ? message.npos : 0)
+            << code;
+        EXPECT_EQ(message.find_first_of(std::wstring(L"\0\r\n", 3)), message.npos);
+        LocalFree(text);
     }
-    EXPECT_NE(message_of(2), message_of(3));
-}
-
-TEST(ErrorMessage, buffer_has_the_least_size_asked_for) {
-    wchar_t* text = nullptr;
-    ASSERT_NE(FormatMessageW(SYSTEM_TEXT, nullptr, 5, 0, &text, 5000, nullptr), 0U);
-    text[4999] = L'x';
-    LocalFree(text);
-}
-
-TEST(ErrorMessage, other_uses_are_refused) {
-    wchar_t dummy[2] = L"x";
-    for (const DWORD flags : {0U, 0x1000U, 0x1200U, 0x1100U, 0x1301U, 0x1B00U}) {
+    for (const DWORD flags : {0U, 0x1000U, 0x1200U, 0x1100U, 0x1301U, 0x1B00U, 0x1300U}) {
+        wchar_t dummy[] = L"x";
         wchar_t* text = dummy;
         SetLastError(0);
-        EXPECT_EQ(FormatMessageW(flags, nullptr, 5, 0, &text, 0, nullptr), 0U);
-        EXPECT_EQ(GetLastError(), 87U);
-        EXPECT_EQ(text, nullptr);
+        EXPECT_EQ(format(5, text, 0, flags, flags == 0x1300 ? 1033 : 0), 0U);
+        EXPECT_TRUE(GetLastError() == 87 && text == nullptr);
     }
-    wchar_t* text = dummy;
-    EXPECT_EQ(FormatMessageW(SYSTEM_TEXT, nullptr, 5, 1033, &text, 0, nullptr), 0U);
-    SetLastError(0);
-    EXPECT_EQ(FormatMessageW(SYSTEM_TEXT, nullptr, 5, 0, nullptr, 0, nullptr), 0U);
-    EXPECT_EQ(GetLastError(), 87U);
+    EXPECT_EQ(FormatMessageW(0x1300, nullptr, 5, 0, nullptr, 0, nullptr), 0U);
 }
 
-TEST(DebugOutput, standard_error_gets_utf8_and_nothing_else_changes) {
+TEST(Errors, debugger_output_is_utf8_on_standard_error_or_the_handlers) {
+    static std::wstring received;
+    const DebugOutputHandler handler = [](const wchar_t* text) {
+        received += text;
+        SetLastError(errno = 1);
+    };
+    const basalt::test::ScratchFolder folder;
+    const int before = dup(STDERR_FILENO);
+    (void)!freopen((folder / "errors").c_str(), "w", stderr);
     std::wstring text;
     std::string expected;
-    // Longer than any buffer on the way, with characters of one to four bytes at every offset, and two that
-    // UTF-8 does not have.
-    for (std::size_t i = 0; i < 60'000; ++i) {
-        text += L"aé€\x1F600\xD800\x110000"[i % 6];
+    for (std::size_t i = 0; i < 10'000;
+         ++i) {  // longer than any buffer, with characters of each length at each offset
+        text += L"a\u00E9\u20AC\U0001F600\xD800\x110000"[i % 6];
         expected += std::array{"a", "\xC3\xA9", "\xE2\x82\xAC", "\xF0\x9F\x98\x80", "?", "?"}[i % 6];
     }
-    errno = E2BIG;
-    SetLastError(1234);
-    EXPECT_EQ(standard_error_of([&] {
-                  OutputDebugStringW(text.c_str());
-                  OutputDebugStringW(L"");
-                  OutputDebugStringW(nullptr);
-              }),
-              expected);
-    EXPECT_EQ(GetLastError(), 1234U);
-
-    const int kept = dup(STDERR_FILENO);
-    close(STDERR_FILENO);
-    errno = E2BIG;
-    OutputDebugStringW(L"nowhere");
-    const int errno_after = errno;
-    dup2(kept, STDERR_FILENO);
-    close(kept);
-    EXPECT_EQ(errno_after, E2BIG);
-}
-
-TEST(DebugOutput, handler_takes_over_and_back) {
-    static std::wstring received;
-    const auto handler = [](const wchar_t* text) {
-        received += text;
-        SetLastError(1);
-        errno = 1;
-    };
-    EXPECT_EQ(basalt::platform::SetDebugOutputHandler(handler), nullptr);
     SetLastError(77);
-    errno = 7;
-    EXPECT_EQ(standard_error_of([] {
-                  OutputDebugStringW(L"one");
-                  OutputDebugStringW(nullptr);
-                  OutputDebugStringW(L"two");
-              }),
-              "");
-    EXPECT_EQ(received, L"onetwo");
-    EXPECT_EQ(GetLastError(), 77U);
-    EXPECT_EQ(basalt::platform::SetDebugOutputHandler(nullptr),
-              static_cast<basalt::platform::DebugOutputHandler>(handler));
-    EXPECT_EQ(standard_error_of([] { OutputDebugStringW(L"three"); }), "three");
+    for (const DebugOutputHandler next : {handler, static_cast<DebugOutputHandler>(nullptr)}) {
+        errno = E2BIG;
+        OutputDebugStringW(text.c_str());
+        OutputDebugStringW(nullptr);
+        EXPECT_TRUE(errno == E2BIG && GetLastError() == 77);
+        EXPECT_NE(SetDebugOutputHandler(next), next);
+    }
+    dup2(before, STDERR_FILENO);
+    close(before);
+    std::ifstream file(folder / "errors");
+    EXPECT_EQ(std::string(std::istreambuf_iterator<char>(file), {}), expected);
+    EXPECT_EQ(received, text);
 }
 
 }  // namespace

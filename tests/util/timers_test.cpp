@@ -90,8 +90,8 @@ TEST(Timers, periods_carry_their_overshoot_unless_it_is_dropped) {
     timer.Reset(2.0F, false);
     EXPECT_EQ(polls(false, {1.25, 0.25}), "-x") << "0.5 carried into the new period";
     timer = PeriodicTimer(0.0F, false);
-    EXPECT_EQ(polls(true, {0.0, 0.0}) + polls(false, {0.0, 0.0}), "xxx-")
-        << "the remainder of a division by 0";
+    EXPECT_EQ(polls(true, {0.0, 0.0}), "xx");
+    EXPECT_EQ(polls(false, {0.0, 0.0}), "x-") << "the remainder of a division by 0";
     timer.Reset(1.0F, true);
     EXPECT_EQ(polls(false, {0.0}), "x");
     timer.Reset(std::nanf(""), true);

@@ -15,12 +15,15 @@ public:
     constexpr CSize(SIZE size) : SIZE(size) {}                         ///< a copy
 
     constexpr bool operator==(SIZE b) const { return cx == b.cx && cy == b.cy; }  ///< both are equal
-    constexpr bool operator!=(SIZE b) const { return !(*this == b); }             ///< one differs
-    constexpr CSize operator+(SIZE b) const { return {cx + b.cx, cy + b.cy}; }    ///< sum
-    constexpr CSize operator-(SIZE b) const { return {cx - b.cx, cy - b.cy}; }    ///< difference
-    constexpr CSize operator-() const { return {-cx, -cy}; }                      ///< negated
-    constexpr CSize& operator+=(SIZE b) { return *this = *this + b; }             ///< adds
-    constexpr CSize& operator-=(SIZE b) { return *this = *this - b; }             ///< subtracts
+    constexpr bool operator==(const CSize& b) const {
+        return *this == static_cast<const SIZE&>(b);
+    }                                                                           ///< as above
+    constexpr bool operator!=(SIZE b) const { return !(*this == b); }           ///< one differs
+    constexpr CSize operator+(SIZE b) const { return {cx + b.cx, cy + b.cy}; }  ///< sum
+    constexpr CSize operator-(SIZE b) const { return {cx - b.cx, cy - b.cy}; }  ///< difference
+    constexpr CSize operator-() const { return {-cx, -cy}; }                    ///< negated
+    constexpr CSize& operator+=(SIZE b) { return *this = *this + b; }           ///< adds
+    constexpr CSize& operator-=(SIZE b) { return *this = *this - b; }           ///< subtracts
 };
 
 /// A point.
@@ -31,9 +34,12 @@ public:
     constexpr CPoint(POINT point) : POINT(point) {}                    ///< a copy
     constexpr CPoint(SIZE size) : POINT{size.cx, size.cy} {}  ///< the point at this distance from the origin
 
-    constexpr void Offset(LONG dx, LONG dy) { x += dx, y += dy; }                 ///< moves
-    constexpr void Offset(SIZE by) { Offset(by.cx, by.cy); }                      ///< moves
-    constexpr bool operator==(POINT b) const { return x == b.x && y == b.y; }     ///< the same point
+    constexpr void Offset(LONG dx, LONG dy) { x += dx, y += dy; }              ///< moves
+    constexpr void Offset(SIZE by) { Offset(by.cx, by.cy); }                   ///< moves
+    constexpr bool operator==(POINT b) const { return x == b.x && y == b.y; }  ///< the same point
+    constexpr bool operator==(const CPoint& b) const {
+        return *this == static_cast<const POINT&>(b);
+    }                                                                             ///< as above
     constexpr bool operator!=(POINT b) const { return !(*this == b); }            ///< another point
     constexpr CPoint operator+(SIZE by) const { return {x + by.cx, y + by.cy}; }  ///< the point moved
     constexpr CPoint operator-(SIZE by) const { return {x - by.cx, y - by.cy}; }  ///< the point moved back
@@ -120,6 +126,8 @@ public:
     constexpr bool operator==(const RECT& r) const {
         return left == r.left && top == r.top && right == r.right && bottom == r.bottom;
     }
+    /// The same for two objects: C++20 finds the one above ambiguous.
+    constexpr bool operator==(const CRect& r) const { return *this == static_cast<const RECT&>(r); }
     constexpr bool operator!=(const RECT& r) const { return !(*this == r); }           ///< another side
     constexpr CRect& operator+=(POINT by) { return OffsetRect(by), *this; }            ///< moves
     constexpr CRect& operator-=(POINT by) { return OffsetRect(-by.x, -by.y), *this; }  ///< moves back

@@ -1,5 +1,5 @@
-// Taking paths apart and asking the disk about them, beside std::filesystem and the bare system call. Before
-// a row is timed, its answers are compared with the library's.
+// Splitting paths and querying the disk, beside std::filesystem and the bare system call. Results are
+// compared with the library's before a row is timed.
 #include <benchmark/benchmark.h>
 #include <dirent.h>
 #include <sys/stat.h>
@@ -22,7 +22,7 @@ using vex_util::Path;
 constexpr char NARROW_PATH[] = "/home/survey/data/2026/site-17/job.tar.gz";
 constexpr wchar_t WIDE_PATH[] = L"/home/survey/data/2026/site-17/job.tar.gz";
 
-// A folder with files, one of them the path that the rows are about.
+// A folder with files, one of them the path of the rows.
 class Folder {
 public:
     static constexpr int FILES = 200;
@@ -149,7 +149,7 @@ void set_std_filesystem(benchmark::State& state) {
 }
 BENCHMARK(set_std_filesystem)->Name("path_set/std_filesystem");
 
-// Whole paths too, in the text that a program by std::filesystem would keep them in.
+// Full paths, in the text type of a program that uses std::filesystem.
 std::vector<std::string> list_by_std_filesystem(const std::string& file) {
     std::vector<std::string> files;
     for (const fs::directory_entry& entry : fs::directory_iterator(fs::path(file).parent_path())) {
@@ -167,7 +167,7 @@ void list_basalt(benchmark::State& state) {
 }
 BENCHMARK(list_basalt)->Name("list_200_files/basalt")->Unit(benchmark::kMicrosecond);
 
-// The names as the system tells them, not kept.
+// The names as the system returns them, not kept.
 void list_limit(benchmark::State& state) {
     const Folder folder;
     const std::string path = fs::path(folder.file()).parent_path();

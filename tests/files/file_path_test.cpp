@@ -1,111 +1,178 @@
+#include <fcntl.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
-#include <algorithm>
 #include <filesystem>
-#include <random>
-#include <string>
 
 #include "basalt/files.h"
-#include "src/platform/text/utf8.h"
-#include "tests/files/file_tree.h"
-#include "tests/files/path_model.h"
+#include "tests/support/scratch_folder.h"
 
 namespace {
 
 using vex_util::CFilePath;
+using vex_util::Path;
 namespace fs = std::filesystem;
 
-void expect_parts(const CFilePath& path, const path_model::FilePath& model) {
-    EXPECT_EQ(static_cast<const CString&>(path), text(model.full));
-    EXPECT_EQ(path.Drive(), text(model.drive)) << model.full;
-    EXPECT_EQ(path.DirectoryOnly(), text(model.directory)) << model.full;
-    EXPECT_EQ(path.FileNameOnly(), text(model.name)) << model.full;
-    EXPECT_EQ(path.Extension(), text(model.extension)) << model.full;
-    EXPECT_EQ(path.Directory(), text(model.drive + L"\\" + model.directory)) << model.full;
-    const bool has_both = !model.name.empty() && !model.extension.empty();
-    EXPECT_EQ(path.FileName(), text(has_both ? model.name + L"." + model.extension : L"")) << model.full;
+struct Files : testing::Test {
+    const basalt::test::ScratchFolder folder;
+    CString at(const std::wstring& name) const { return folder.wide(name).c_str(); }
+};
+
+CString full(const CFilePath& path) {
+    return path;
+}
+CString parts(const CFilePath& path) {
+    return path.Drive() + L"|" + path.DirectoryOnly() + L"|" + path.FileNameOnly() + L"|" + path.Extension();
 }
 
-TEST(FilePath, extension_is_set_by_composing_anew) {
-    struct Row {
-        const wchar_t *path, *extension, *result;
-    };
-    for (const Row& row : {
-             Row{L"C:\\a\\job.txt", L"csv", L"C:\\a\\job.csv"},
-             Row{L"C:\\a\\job.txt", L".csv", L"C:\\a\\job..csv"},
-             Row{L"C:\\a\\job.txt", L"", L"C:\\a\\"},
-             Row{L"C:\\a\\", L"csv", L"C:\\a\\"},
-             Row{L"job.txt", L"csv", L"\\\\job.csv"},
-             Row{L"a/%s.%n", L"%d", L"\\a\\%s.%d"},
-         }) {
-        CFilePath path(row.path);
-        path.SetExtension(row.extension);
-        EXPECT_EQ(static_cast<const CString&>(path), row.result);
+TEST_F(Files, paths_are_composed_of_their_parts) {
+    const wchar_t* const rows[][3] = {
+        {L"C:\\a\\job.txt", L"csv", L"C:\\a\\job.csv"}, {L"C:\\a\\job.txt", L".csv", L"C:\\a\\job..csv"},
+        {L"C:\\a\\job.txt", L"", L"C:\\a\\"},           {L"C:\\a\\", L"csv", L"C:\\a\\"},
+        {L"job.txt", L"csv", L"\\\\job.csv"},           {L"a/%s.%n", L"%d", L"\\a\\%s.%d"}};
+    for (const auto& [from, extension, result] : rows) {
+        CFilePath path(from);
+        path.SetExtension(extension);
+        EXPECT_EQ(full(path), result);
     }
-    CFilePath path(L"C:\\a\\job.txt");
-    path.SetExtension(L".csv");
-    EXPECT_EQ(path.FileNameOnly(), L"job.");
-    EXPECT_EQ(path.Extension(), L"csv");
-}
-
-TEST(FilePath, arguments_may_be_its_own_members) {
     CFilePath path(L"C:\\a\\job.txt");
     path.SetExtension(path.FileNameOnly());
-    EXPECT_EQ(static_cast<const CString&>(path), L"C:\\a\\job.job");
     path.Combine(path, path.Extension());
-    EXPECT_EQ(static_cast<const CString&>(path), L"C:\\a\\job.job\\job");
-    path.Combine(path.DirectoryOnly(), path);
-    EXPECT_EQ(static_cast<const CString&>(path), L"a\\job.job\\C:\\a\\job.job\\job");
+    EXPECT_EQ(full(path), L"C:\\a\\job.job\\job");
     path = path.Directory();
-    EXPECT_EQ(static_cast<const CString&>(path), L"\\a\\job.job\\C:\\a\\job.job");
+    EXPECT_EQ(full(path), L"C:\\a\\job.job");
     path.Combine(CString(L"C:\\a\0\\b", 7), CString(L"job\0.txt", 8));
-    EXPECT_EQ(static_cast<const CString&>(path), L"C:\\a\\job") << "up to the first zeros";
-}
-
-TEST(FilePath, empty_path_leaves_the_parts_and_an_overlong_one_empties_them) {
-    CFilePath path(L"C:\\a\\b.txt");
-    CString empty;
-    path = empty;
-    EXPECT_EQ(static_cast<const CString&>(path), L"");
-    EXPECT_EQ(path.Directory(), L"C:\\a");
-    EXPECT_EQ(path.FileName(), L"b.txt");
-
-    CString longer = text(L"C:\\a\\" + std::wstring(256, L'n') + L".txt");
+    EXPECT_EQ(full(path), L"C:\\a\\job") << "up to the first zeros";
+    CString longer = L"C:\\a\\" + CString(L'n', 256) + L".txt";
     path = longer;
-    EXPECT_EQ(static_cast<const CString&>(path), longer);
-    expect_parts(path, {longer.GetString(), L"", L"", L"", L""});
+    EXPECT_EQ(full(path) + parts(path), longer + L"|||");
 }
 
-using FilePathOnDisk = FileTree;
-
-TEST_F(FilePathOnDisk, directory_name_belongs_to_the_directory) {
-    fs::create_directories(root / "dir" / "dir");
-    fs::create_directory(root / "a.old");
-    make_file("file.txt");
-    fs::create_directory_symlink("dir", root / "link");
-    const unsigned seed = std::random_device{}();
-    SCOPED_TRACE(seed);
-    std::mt19937 random(seed);
-    const wchar_t* const PIECES[] = {L"/", L"\\", L"dir",   L"/dir",    L"\\a.old", L"/file.txt",
-                                     L".", L"..", L"/link", L"missing", L"x:"};
-    CFilePath path;
-    path_model::FilePath model;
-    for (int round = 0; round < 3'000; ++round) {
-        std::wstring name = random() % 8 == 0 ? L"" : wide_root;
-        for (auto left = random() % 5; left > 0; --left) {
-            name += PIECES[random() % std::size(PIECES)];
-        }
-        std::string narrow = basalt::platform::utf8_from_wide(name);
-        std::replace(narrow.begin(), narrow.end(), '\\', '/');
-        std::error_code ignored;
-        const bool is_directory =
-            !narrow.empty() && narrow.back() != '/' && fs::is_directory(narrow, ignored);
-        model.set(name, is_directory);
-        CString wide = text(name);
-        path = wide;
-        expect_parts(path, model);
-        ASSERT_EQ(path.IsDirectory(), is_directory) << name;
+TEST_F(Files, the_empty_path_keeps_the_parts_whatever_its_value_category) {
+    CString empty;
+    const CString constant;
+    CFilePath paths[3] = {CString(L"C:\\a\\b.txt"), CString(L"C:\\a\\b.txt"), CString(L"C:\\a\\b.txt")};
+    paths[0] = empty;
+    paths[1] = constant;
+    paths[2] = CString();
+    for (const CFilePath& path : paths) {
+        EXPECT_EQ(full(path) + parts(path), L"C:|a|b|txt");
     }
+}
+
+TEST_F(Files, the_whole_name_of_a_folder_is_in_its_directory) {
+    const CString before = CFilePath(at(L"x")).Directory();
+    for (const wchar_t* const name : {L"site", L"site.2024", L".site", L"site."}) {
+        fs::create_directory(folder.wide(name));
+        CFilePath path(at(name));
+        EXPECT_EQ(path.Directory(), before + L"\\" + name);
+        EXPECT_EQ(path.FileNameOnly() + path.FileName(), L"");
+        const std::vector<CString> listed = path.GetFilesInDirectory(L".");
+        EXPECT_EQ(listed, std::vector{before + L"\\" + name + L"\\."});
+        path.SetExtension(path.Extension());
+        EXPECT_EQ(full(path), before + L"\\" + name + L"\\");
+    }
+    EXPECT_EQ(CFilePath(at(L"site.2024")).Extension(), L"2024");
+}
+
+TEST_F(Files, are_files_or_directories_or_neither) {
+    fs::create_directory(folder / "dir");
+    folder.write("file.txt");
+    const char* const links[][2] = {
+        {"file.txt", "to_file"}, {"dir", "to_dir"}, {"nowhere", "dangling"}, {"circle", "circle"}};
+    for (const auto& [target, link] : links) {
+        fs::create_symlink(target, folder / link);
+    }
+    ASSERT_EQ(mkfifo((folder / "pipe").c_str(), 0600), 0);
+    const std::pair<int, std::vector<const wchar_t*>> kinds[] = {
+        {1, {L"file.txt", L"to_file", L"dangling", L"circle", L"pipe", L"dir\\..\\file.txt", L"f*"}},
+        {2, {L"dir", L"to_dir", L".", L"di?"}},
+        {0, {L"none", L"dir/", L"dir\\", L"file.txt/", L"file.txt/x", L"FILE.TXT", L"di??", L"*\\file.txt"}}};
+    for (const auto& [kind, names] : kinds) {
+        for (const wchar_t* const name : names) {
+            const CFilePath path(at(name));
+            EXPECT_TRUE(path.FileExists() == (kind == 1) && path.IsFile() == (kind == 1)) << name;
+            EXPECT_EQ(path.IsDirectory(), kind == 2) << name;
+        }
+    }
+    for (const wchar_t* const name : {L"", L"/", L"\\", L"C:", L"C:\\", L"C:\\x"}) {
+        EXPECT_FALSE(CFilePath::FileExists(name) || CFilePath::IsDirectory(name)) << name;
+    }
+}
+
+std::uint64_t ticks(const FILETIME& time) {
+    return std::uint64_t{time.dwHighDateTime} << 32 | time.dwLowDateTime;
+}
+
+TEST_F(Files, times_are_those_of_the_second_match_or_the_only_one) {
+    for (const int second : {0, 1, 2}) {
+        const std::string name = folder / ("job" + std::to_string(second));
+        folder.write(fs::path(name).filename());
+        const timespec times[] = {{1'000'000'000 + second, 123'456'789}, {86'400, 0}};
+        ASSERT_EQ(utimensat(AT_FDCWD, name.c_str(), times, 0), 0);
+    }
+    const auto accessed = [](const CString& path) { return ticks(CFilePath(path).GetLastAccessTime()); };
+    EXPECT_EQ(accessed(at(L"job2")), 126'444'736'021'234'567U);
+    EXPECT_GT(ticks(CFilePath(at(L"job2")).GetCreationTime()), accessed(at(L"job2"))) << "created just now";
+    EXPECT_EQ(accessed(at(L"job*")), accessed(CFilePath(at(L"x")).GetFilesInDirectory(L"job*")[1]));
+    EXPECT_EQ(accessed(at(L"jo?1")), accessed(at(L"job1")));
+    for (const wchar_t* const name : {L"missing", L"", L"none*"}) {
+        FILETIME time{1, 2};
+        EXPECT_FALSE(CFilePath::GetFileCreationTime(at(name), time) ||
+                     CFilePath::GetLastAccessTime(at(name), time));
+        EXPECT_EQ(ticks(time), 0x200000001U);
+        EXPECT_EQ(ticks(CFilePath(at(name)).GetCreationTime()) + accessed(at(name)), 0U);
+    }
+}
+
+TEST_F(Files, lists_odd_names_and_finds_each_again) {
+    const std::string longest(255, 'n');
+    const std::pair<std::string, std::wstring> names[] = {
+        {" leading", L" leading"},
+        {"trailing.", L"trailing."},
+        {"..x", L"..x"},
+        {".hidden", L".hidden"},
+        {"%s%n.txt", L"%s%n.txt"},
+        {"[a]", L"[a]"},
+        {"\xC3\xA9t\xC3\xA9.txt", L"\xE9t\xE9.txt"},
+        {"\xE6\x97\xA5\xF0\x9F\x8C\x8D.gz", L"\x65E5\x1F30D.gz"},
+        {"latin\xE9.txt", L"latin\xDCE9.txt"},
+        {"back\\slash", L"back\xDC5Cslash"},
+        {longest, {longest.begin(), longest.end()}}};
+    std::set<std::wstring> expected, found;
+    for (const auto& [on_disk, name] : names) {
+        folder.write(on_disk);
+        expected.insert(name);
+    }
+    CFilePath path(at(L"none.txt"));  // the folder is listed whether the file exists or not
+    for (const CString& file : path.GetFilesInDirectory(L"*")) {
+        const CString name = file.Mid(path.Directory().GetLength() + 1);
+        EXPECT_TRUE(CFilePath::IsDirectory(file) == (name == L"." || name == L"..")) << name.GetString();
+        if (CFilePath::FileExists(file)) {
+            found.insert(name.GetString());
+        }
+    }
+    EXPECT_EQ(found, expected);
+    EXPECT_EQ(path.GetFilesInDirectory(L"*.txt").size(), 3U);
+    EXPECT_EQ(path.GetFilesInDirectory(L"?t?.t*t"), std::vector{path.Directory() + L"\\\xE9t\xE9.txt"});
+    EXPECT_TRUE(path.GetFilesInDirectory(L"").empty() && path.GetFilesInDirectory(L"none/*").empty());
+}
+
+TEST_F(Files, selectors_have_parts_of_255_characters_or_none) {
+    const CString directory = L"\\" + CString(L'd', 253) + L"/", name(L'n', 255), dot = L".", x(L'x', 254);
+    const CString path = L"C:" + directory + name + dot + x;
+    EXPECT_EQ(Path::GetPath(path, 15), path);
+    for (const CString& longer :
+         {L"C:\\" + directory + name + dot + x, L"C:" + directory + L"n" + name + dot + x, path + L"x",
+          L"C:" + directory + dot + name + L"n", CString()}) {
+        EXPECT_EQ(Path::GetPath(longer, 15), L"") << longer.GetLength();
+    }
+    Path first(L"C:\\a.b");
+    const CString& result = first.GetPath(1);
+    EXPECT_EQ(&result, &first.GetPath(4));
+    const Path copy(first);
+    first = Path(first.GetPath(8));
+    EXPECT_EQ(copy.GetPath(255) + first.GetPath(31), L"C:\\a.b.b");
 }
 
 }  // namespace

@@ -1,4 +1,4 @@
-// The path classes in their plainest form: what fast code is held against, in tests and by a fuzzer.
+// The path classes in their plainest form.
 #ifndef BASALT_TESTS_FILES_PATH_MODEL_H
 #define BASALT_TESTS_FILES_PATH_MODEL_H
 
@@ -6,37 +6,21 @@
 
 namespace path_model {
 
-inline bool is_separator(wchar_t ch) {
-    return ch == L'\\' || ch == L'/';
-}
-
 struct Parts {
     std::wstring drive, directory, name, extension;
     bool valid = false;
 };
 
-// One character after the other, each into the part that it belongs to as far as one has read.
 inline Parts split(const std::wstring& path) {
-    Parts parts;
-    std::size_t at = 0;
-    if (path.size() >= 2 && path[1] == L':') {
-        parts.drive = path.substr(0, 2);
-        at = 2;
-    }
-    for (; at < path.size(); ++at) {
-        if (is_separator(path[at])) {
-            parts.directory += parts.name + parts.extension + path[at];
-            parts.name.clear();
-            parts.extension.clear();
-        } else if (path[at] == L'.') {
-            parts.name += parts.extension;
-            parts.extension = L".";
-        } else {
-            (parts.extension.empty() ? parts.name : parts.extension) += path[at];
-        }
-    }
-    parts.valid = parts.directory.size() <= 255 && parts.name.size() <= 255 && parts.extension.size() <= 255;
-    return parts.valid ? parts : Parts{};
+    const std::size_t drive = path.size() > 1 && path[1] == L':' ? 2 : 0;
+    const std::size_t slash = path.find_last_of(L"\\/");
+    const std::size_t name = slash == std::wstring::npos || slash < drive ? drive : slash + 1;
+    const std::size_t last_dot = path.rfind(L'.');
+    const std::size_t dot = last_dot == std::wstring::npos || last_dot < name ? path.size() : last_dot;
+    const bool valid = name - drive <= 255 && dot - name <= 255 && path.size() - dot <= 255;
+    return valid ? Parts{path.substr(0, drive), path.substr(drive, name - drive),
+                         path.substr(name, dot - name), path.substr(dot), true}
+                 : Parts{};
 }
 
 inline std::wstring select(const Parts& parts, unsigned selector) {
@@ -44,7 +28,7 @@ inline std::wstring select(const Parts& parts, unsigned selector) {
            (selector % 8 >= 4 ? parts.name : L"") + (selector % 16 >= 8 ? parts.extension : L"");
 }
 
-// The members of a file path set to a path; whether that is an existing directory is told by the caller.
+// The members of a file path; the caller knows whether a path is an existing directory.
 struct FilePath {
     std::wstring full, drive, directory, name, extension;
 
@@ -56,14 +40,10 @@ struct FilePath {
         const Parts parts = split(path);
         drive = parts.drive;
         name = parts.name;
-        directory = parts.directory;
-        if (!directory.empty() && is_separator(directory.back())) {
-            directory.pop_back();
-        }
-        if (!directory.empty() && is_separator(directory.front())) {
-            directory.erase(0, 1);
-        }
-        extension = parts.extension.empty() ? L"" : parts.extension.substr(1);
+        extension = parts.extension.substr(parts.extension.empty() ? 0 : 1);
+        const std::size_t size = parts.directory.size();
+        const std::size_t first = size > 1 && parts.directory.find_first_of(L"\\/") == 0 ? 1 : 0;
+        directory = size == 0 ? L"" : parts.directory.substr(first, size - 1 - first);
         if (parts.valid && is_directory) {
             directory += L"\\" + name + parts.extension;
             name.clear();

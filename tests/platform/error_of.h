@@ -1,21 +1,17 @@
-// Tells why a call failed.
+// Why a call failed.
 #ifndef BASALT_TESTS_PLATFORM_ERROR_OF_H
 #define BASALT_TESTS_PLATFORM_ERROR_OF_H
-
-#include <gtest/gtest.h>
 
 #include "basalt/platform/error.h"
 
 namespace basalt::test {
 
-// The last error after a call that has to answer nothing: null or zero. It is taken away, so that the next
-// call is not credited with it.
-template <class Answer>
-DWORD error_of(Answer answer) {
-    EXPECT_TRUE(answer == Answer{});
+// The last error, cleared, after a call that returned null or 0; no error's code for any other result.
+template <class Result>
+DWORD error_of(Result result) {
     const DWORD error = GetLastError();
     SetLastError(ERROR_SUCCESS);
-    return error;
+    return result == Result{} ? error : 0xFFFFFFFF;
 }
 
 }  // namespace basalt::test

@@ -1,9 +1,10 @@
-// A log that all threads write, mapped blocks and block allocators during CleanUp(), file queries, texts, and
-// the settings and queries of the environment.
+// A log that all threads write, mapped blocks and block allocators during clean-ups, files made and deleted,
+// queries of the disk, texts, and the settings and queries of the environment.
 #include <fstream>
 #include <string>
 
 #include "basalt/basalt.h"
+#include "src/platform/file.h"
 #include "tests/stress/stress.h"
 #include "tests/support/scratch_folder.h"
 
@@ -21,6 +22,20 @@ void use_memory_on_files(Random& random) {
     bytes[size - 1] = 1;
     vex_lib::vlVmAllocator allocator(4096, 512);
     require(allocator.Alloc(512) != nullptr, "a block on a file");
+}
+
+// A new file is neither lost to another thread's DeleteFileW nor does that hit it.
+void make_and_delete(const std::wstring& name, int thread) {
+    if (thread % 2 == 0) {
+        DeleteFileW(name.c_str());
+        return;
+    }
+    const HANDLE file = CreateFileW(name.c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_NEW,
+                                    FILE_FLAG_DELETE_ON_CLOSE, nullptr);
+    require(
+        file != INVALID_HANDLE_VALUE ? DeleteFileW(name.c_str()) == 0 : GetLastError() == ERROR_FILE_EXISTS,
+        "held alone");
+    CloseHandle(file);
 }
 
 void use_texts(const CString& name, int thread) {
@@ -65,6 +80,7 @@ long stress_files(double seconds) {
         log.Write(text);
         ++written;
         use_texts(name, thread);
+        make_and_delete(folder.wide(L"held"), thread);
         if (draw(random, 4) == 0) {
             use_memory_on_files(random);
         }

@@ -1,4 +1,4 @@
-// What is written to the debugger output, and what the report of an error looks like.
+// Collects debugger output; the report of an error.
 #ifndef BASALT_TESTS_SUPPORT_DEBUG_OUTPUT_H
 #define BASALT_TESTS_SUPPORT_DEBUG_OUTPUT_H
 

@@ -1,4 +1,4 @@
-// Version resources and program files around them, made by hand for tests.
+// Version resources and program files around them, built by hand.
 #ifndef BASALT_TESTS_SUPPORT_VERSION_BLOCK_H
 #define BASALT_TESTS_SUPPORT_VERSION_BLOCK_H
 
@@ -38,26 +38,25 @@ inline VersionNode text_node(const std::u16string& key, const std::u16string& te
     return {key, utf16(text + u'\0'), true, {}};
 }
 
-inline void pad_to_4(Bytes& bytes) {
+inline void append(Bytes& bytes, const Bytes& more) {
     bytes.resize((bytes.size() + 3) / 4 * 4);
+    bytes.insert(bytes.end(), more.begin(), more.end());
 }
 
-inline void append_node(Bytes& bytes, const VersionNode& node) {
-    pad_to_4(bytes);
-    const std::size_t start = bytes.size();
-    bytes.resize(start + 6);
-    put_word(bytes, start + 2, node.is_text ? node.value.size() / 2 : node.value.size());
-    put_word(bytes, start + 4, node.is_text ? 1 : 0);
+inline Bytes block_of(const VersionNode& node) {
+    Bytes bytes(6);
+    put_word(bytes, 2, node.value.size() / (node.is_text ? 2 : 1));
+    put_word(bytes, 4, node.is_text ? 1 : 0);
     const Bytes key = utf16(node.key + u'\0');
     bytes.insert(bytes.end(), key.begin(), key.end());
     if (!node.value.empty()) {
-        pad_to_4(bytes);
-        bytes.insert(bytes.end(), node.value.begin(), node.value.end());
+        append(bytes, node.value);
     }
     for (const VersionNode& child : node.children) {
-        append_node(bytes, child);
+        append(bytes, block_of(child));
     }
-    put_word(bytes, start, bytes.size() - start);
+    put_word(bytes, 0, bytes.size());
+    return bytes;
 }
 
 // Fixed information with the file version 9.8.7.6 and this product version.
@@ -67,12 +66,6 @@ inline Bytes fixed_information(unsigned a, unsigned b, unsigned c, unsigned d) {
     for (std::size_t i = 0; i < std::size(words); ++i) {
         put_word(bytes, 2 * i, words[i]);
     }
-    return bytes;
-}
-
-inline Bytes block_of(const VersionNode& root) {
-    Bytes bytes;
-    append_node(bytes, root);
     return bytes;
 }
 

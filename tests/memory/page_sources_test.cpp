@@ -118,30 +118,34 @@ TEST_F(PageSources, ranges_are_served_in_pieces_that_end_at_32_mebibytes) {
 }
 
 TEST_F(PageSources, refusals_are_reported_and_unknown_codes_not) {
-    const auto expect_null = [&](void* at, unsigned long size, unsigned long type, DWORD code) {
-        EXPECT_EQ(Virtual::Alloc(at, size, type, nullptr), nullptr);
-        expect_report(code);
+    struct Row {
+        char* at;
+        unsigned long size, type;
+        DWORD reported;
     };
-    const auto expect_0 = [&](void* at, unsigned long size, unsigned long type, DWORD code) {
-        EXPECT_EQ(Virtual::Free(at, size, type, 0), 0);
-        expect_report(code);
-    };
-    for (const unsigned long type : {0UL, COMMIT | RESERVE, DECOMMIT, RELEASE, COMMIT | 1UL << 32}) {
-        expect_null(m_base, 1, type, NONE);
+    for (const Row& row : {Row{m_base, 1, 0, NONE},
+                           {m_base, 1, COMMIT | RESERVE, NONE},
+                           {m_base, 1, DECOMMIT, NONE},
+                           {m_base, 1, COMMIT | 1UL << 32, NONE},
+                           {m_base, 0, COMMIT, NONE},
+                           {nullptr, BEYOND, RESERVE, ERROR_INVALID_PARAMETER},
+                           {nullptr, 0, RESERVE, ERROR_INVALID_PARAMETER},
+                           {m_base, BEYOND, COMMIT, ERROR_INVALID_PARAMETER},
+                           {m_base - 1, 1, COMMIT, ERROR_INVALID_ADDRESS},
+                           {m_base, 1, RESERVE, ERROR_INVALID_ADDRESS}}) {
+        EXPECT_EQ(Virtual::Alloc(row.at, row.size, row.type, nullptr), nullptr) << row.type;
+        expect_report(row.reported);
     }
-    for (const unsigned long type : {0UL, COMMIT, RESERVE, DECOMMIT | RELEASE, RELEASE | 1UL << 32}) {
-        expect_0(m_base, 1, type, NONE);
+    for (const Row& row : {Row{m_base, 1, 0, NONE},
+                           {m_base, 1, COMMIT, NONE},
+                           {m_base, 1, DECOMMIT | RELEASE, NONE},
+                           {m_base, 1, RELEASE | 1UL << 32, NONE},
+                           {m_base, 0, DECOMMIT, NONE},
+                           {m_base, BEYOND, DECOMMIT, ERROR_INVALID_PARAMETER},
+                           {m_at, 0, RELEASE, ERROR_INVALID_ADDRESS}}) {
+        EXPECT_EQ(Virtual::Free(row.at, row.size, row.type, 0), 0) << row.type;
+        expect_report(row.reported);
     }
-    expect_null(m_base, 0, COMMIT, NONE), expect_0(m_base, 0, DECOMMIT, NONE);
-    for (const unsigned long type : {RESERVE, COMMIT}) {
-        expect_null(type == COMMIT ? m_base : nullptr, BEYOND, type, ERROR_INVALID_PARAMETER);
-    }
-    expect_0(m_base, BEYOND, DECOMMIT, ERROR_INVALID_PARAMETER);
-    EXPECT_EQ(calls, std::vector<Call>{});
-    expect_null(m_base - 1, 1, COMMIT, ERROR_INVALID_ADDRESS),
-        expect_null(m_base, 1, RESERVE, ERROR_INVALID_ADDRESS);
-    expect_0(m_at, 0, RELEASE, ERROR_INVALID_ADDRESS),
-        expect_null(nullptr, 0, RESERVE, ERROR_INVALID_PARAMETER);
 }
 
 TEST_F(PageSources, mapped_reservations_are_usable_at_once) {

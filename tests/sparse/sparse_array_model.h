@@ -95,8 +95,7 @@ struct SparseArrayModel {
         RTreeModel tree;
         const int last = static_cast<int>((std::uint32_t{1} << shift) - 1);
         for (const auto& [bx, by] : blocks) {
-            const int x = static_cast<int>(static_cast<std::uint32_t>(bx) << shift);
-            const int y = static_cast<int>(static_cast<std::uint32_t>(by) << shift);
+            const int x = first_cell(bx), y = first_cell(by);
             tree.insert({x, y, x + last, y + last}, identifiers.at({bx, by}));
         }
         return tree.search(window);
@@ -122,18 +121,15 @@ private:
     void copy(const SparseArrayModel& source, bool empty_too) {
         shift = source.shift;
         chunk = source.chunk;
-        for (const auto& [bx, by] : source.blocks) {
-            const int block = source.identifiers.at({bx, by});
-            const auto begin = source.cells.lower_bound({block, INT32_MIN, INT32_MIN});
-            if (empty_too || (begin != source.cells.end() && begin->first.block == block)) {
-                cell_at(static_cast<int>(static_cast<std::uint32_t>(bx) << shift),
-                        static_cast<int>(static_cast<std::uint32_t>(by) << shift), true);
-            }
-            for (auto cell = begin; cell != source.cells.end() && cell->first.block == block; ++cell) {
-                insert(cell->first.x, cell->first.y, cell->second.value);
-            }
+        for (std::size_t i = 0; empty_too && i < source.blocks.size(); ++i) {
+            cell_at(first_cell(source.blocks[i].first), first_cell(source.blocks[i].second), true);
+        }
+        for (const auto& [cell, element] : source.cells) {  // by block
+            insert(cell.x, cell.y, element.value);
         }
     }
+
+    int first_cell(int block) const { return static_cast<int>(static_cast<std::uint32_t>(block) << shift); }
 
     unsigned shift = 0;
     std::size_t chunk;

@@ -43,11 +43,13 @@ Reduced<double> reduce_huge(double angle) {
     const double fraction_low = ((part - sum) + next) + ((sum - fraction) + last);
 
     const double product = fraction * HALF_PI_SUM[0];
-    const double product_low = product_less(fraction, HALF_PI_SUM[0], product) +
-                               (fraction * HALF_PI_SUM[1] + fraction_low * HALF_PI_SUM[0]);
+    const double rest = product_less(fraction, HALF_PI_SUM[0], product) +
+                        (fraction * HALF_PI_SUM[1] + fraction_low * HALF_PI_SUM[0]);
+    const double high_part = product + rest;
+    const double low_part = (product - high_part) + rest;
     const auto count = static_cast<std::int64_t>(whole);
-    return angle < 0.0 ? Reduced<double>{-product, -product_low, -count}
-                       : Reduced<double>{product, product_low, count};
+    return angle < 0.0 ? Reduced<double>{-high_part, -low_part, -count}
+                       : Reduced<double>{high_part, low_part, count};
 }
 
 }  // namespace basalt::geo::elementary

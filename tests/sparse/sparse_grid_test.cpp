@@ -48,7 +48,7 @@ TEST(SparseGrid, UpdatesInPlaceOrInsertsAlsoSmallValues) {
 }
 
 TEST(SparseGrid, VisitsTheCellsOfAWindowOnly) {
-    for (const std::size_t side : {1, 4, 64, 256}) {
+    for (const std::size_t side : {1U, 4U, 64U, 256U}) {
         SCOPED_TRACE(side);
         SparseGrid<long> grid(side);
         Cells inside;

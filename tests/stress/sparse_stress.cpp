@@ -63,7 +63,7 @@ void change(const Context& context) {
     } else if (choice < 110) {
         SparseCells::insert_row(array, x, y, row, sizeof(Element), ROW);
     } else if (choice < 150) {
-        SparseCells::remove_row(array, x, y, choice % ROW);
+        SparseCells::remove_row(array, x, y, ROW / 2);
     } else if (choice < 170) {
         SparseCells::copy_row(array, x, y, row, sizeof(Element), filled, ROW);
         for (int i = 0; i < ROW; ++i) {

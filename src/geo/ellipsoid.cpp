@@ -6,25 +6,18 @@
 #include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
 #include "src/geo/elementary/elementary.h"
+#include "src/geo/ellipsoid_constants.h"
 #include "src/geo/frame_axes.h"
 
 using namespace basalt::geo;
 
 namespace {
 
-constexpr double SEMI_MAJOR_AXIS = 6378137.0;
-constexpr double ECCENTRICITY2 = 0.00669437999014;
-/// 1 - e^2, named for its use: the two differ in the last digits, and results depend on both.
-constexpr double FIRST_ESTIMATE_FACTOR = 0.99330562000986;
-constexpr double Z_FACTOR = 0.9933056200098587;
 /// a (1 - e^2), metres.
 constexpr double MERIDIAN_NUMERATOR = 6335439.327292829;
-/// Latitude above which the height is taken along the axis; 80 degrees in radians.
-constexpr double POLAR_LATITUDE = 1.3962634015954636;
 
 /// From this tolerance on (radians) the first estimate of the latitude is kept.
 constexpr double NO_ITERATION = 10.0;
-constexpr int MOST_PASSES = 10;
 constexpr double LOCAL_FRAME_TOLERANCE = 5e-10;
 
 /// Square root of 1 - e^2 sin^2 of the latitude.
@@ -69,8 +62,6 @@ bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
     return true;
 }
 
-constexpr double FLAT = 1.0 - ECCENTRICITY2;
-
 /// The same passes without angles: the latitude is the direction of (p, q), and a pass maps q to
 /// z + N e^2 sin = z + a e^2 q / sqrt(p^2 + (1 - e^2) q^2). Two latitudes differ by the angle of tangent
 /// p (q - q') / (p^2 + q q'). False where convert_plainly() might decide otherwise: a tolerance or point out
@@ -81,7 +72,6 @@ bool settle_quickly(double p, double z, double tolerance, double& q) {
     if (!(tolerance >= 1e-12 && tolerance <= 0.01 && distance2 > 1e12 && distance2 < 1e300)) {
         return false;
     }
-    constexpr double AXIS_PULL = SEMI_MAJOR_AXIS * ECCENTRICITY2;
     const double margin = tolerance * 1e-4 + 1e-14;
     const double base = p * FIRST_ESTIMATE_FACTOR;
     // The first pass never settles.

@@ -4,23 +4,9 @@
 
 #include "src/geo/constants.h"
 #include "src/geo/elementary/elementary.h"
+#include "src/geo/ellipsoid_constants.h"
 
 namespace basalt::geo {
-
-namespace {
-
-constexpr double FLATTENING = 0.0033528106647474805;
-constexpr double ONE_LESS_FLATTENING = 0.9966471893352525;
-constexpr double SEMI_MINOR_AXIS = 6356752.3142;
-/// a^2 - b^2 and b^2, square metres.
-constexpr double AXES_DIFFERENCE2 = 272331606681.9453;
-constexpr double SEMI_MINOR_AXIS2 = 40408299984087.055;
-constexpr double FLATTENING_16TH = 0.00020955066654671753;
-
-constexpr double SETTLED = 1e-12;
-constexpr int MOST_ARC_PASSES = 100;
-
-}  // namespace
 
 GeodesicLine::GeodesicLine(double latitude, double azimuth) {
     const auto [at, towards] = elementary::sin_cos_two(latitude, azimuth);
@@ -51,7 +37,7 @@ LineEnd GeodesicLine::at(double distance) const {
     double cosine = first_cosine;
     double c = m_cos_2sigma1 * cosine - m_sin_2sigma1 * sine;  // cosine of 2 sigma_m
     double change = std::abs(first - TWO_PI);
-    for (int pass = 0; change > SETTLED && pass < MOST_ARC_PASSES; ++pass) {
+    for (int pass = 0; change > SETTLED_ARC && pass < MOST_ARC_PASSES; ++pass) {
         if (pass > 0) {
             // The passes move the arc by less than 0.002 rad, so a short series turns the first sine and
             // cosine to the last place.
@@ -73,10 +59,11 @@ LineEnd GeodesicLine::at(double distance) const {
     const double t = m_sin_u * sine - m_cos_u * cosine * m_cos_azimuth;
     const double lambda =
         elementary::atan2(sine * m_sin_azimuth, m_cos_u * cosine - m_sin_u * sine * m_cos_azimuth);
-    const double k = FLATTENING_16TH * m_cos2_alpha * (4.0 + FLATTENING * (4.0 - 3.0 * m_cos2_alpha));
+    const double k =
+        FLATTENING_16TH * m_cos2_alpha * (4.0 + VINCENTY_FLATTENING * (4.0 - 3.0 * m_cos2_alpha));
     return {m_sin_alpha, -t, m_sin_u * cosine + m_cos_u * sine * m_cos_azimuth,
             ONE_LESS_FLATTENING * std::sqrt(m_sin_alpha * m_sin_alpha + t * t),
-            lambda - (1.0 - k) * FLATTENING * m_sin_alpha *
+            lambda - (1.0 - k) * VINCENTY_FLATTENING * m_sin_alpha *
                          (sigma + k * sine * (c + k * cosine * (2.0 * c * c - 1.0)))};
 }
 

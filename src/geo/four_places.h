@@ -1,0 +1,25 @@
+/// @file
+/// Four records at a time with AVX2, with the bits of the single calls. Each function is false, and writes
+/// nothing, where a record needs the single call: special numbers, and decisions within rounding.
+#ifndef BASALT_SRC_GEO_FOUR_PLACES_H
+#define BASALT_SRC_GEO_FOUR_PLACES_H
+
+#include "basalt/geo/records.h"
+
+#if defined(__x86_64__)
+#define BASALT_HAS_FOUR_PLACES 1
+
+namespace basalt::geo {
+
+bool to_cartesian_four(const geo_llh* in, geo_vector* out);
+bool to_geodetic_four(const geo_vector* in, geo_llh* out, double tolerance);
+bool direct_four(const geo_llh* starts, const double* azimuths, const double* distances, geo_llh* ends,
+                 double* final_azimuths);
+
+}  // namespace basalt::geo
+
+#else
+#define BASALT_HAS_FOUR_PLACES 0
+#endif
+
+#endif

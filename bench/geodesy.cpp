@@ -198,6 +198,94 @@ void direct_plain(benchmark::State& state) {
     });
 }
 
+// Whole arrays; the time is that of one place.
+
+template <typename Ask>
+void run_arrays(benchmark::State& state, const Ask& ask) {
+    for ([[maybe_unused]] auto _ : state) {
+        ask();
+        benchmark::ClobberMemory();
+    }
+    state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(COUNT));
+}
+
+void to_cartesian_arrays(benchmark::State& state) {
+    std::vector<geo_vector> out(COUNT);
+    run_arrays(state, [&] { basalt::to_cartesian(places().geodetic.data(), out.data(), COUNT); });
+}
+
+void to_geodetic_arrays(benchmark::State& state) {
+    std::vector<geo_llh> out(COUNT);
+    run_arrays(state, [&] { basalt::to_geodetic(places().cartesian.data(), out.data(), COUNT, TOLERANCE); });
+}
+
+void direct_arrays(benchmark::State& state) {
+    const std::vector<double> distances(COUNT, metres(state));
+    std::vector<geo_llh> ends(COUNT);
+    std::vector<double> azimuths(COUNT);
+    run_arrays(state, [&] {
+        basalt::direct(places().geodetic.data(), places().azimuth.data(), distances.data(), ends.data(),
+                       azimuths.data(), COUNT);
+    });
+}
+
+// The local frame of the first place.
+
+void to_local_basalt(benchmark::State& state) {
+    const basalt::LocalFrame frame(places().geodetic[0]);
+    const auto ask = [&](std::size_t i) {
+        const geo_nee local = frame.to_local(places().cartesian[i]);
+        return Triple{local.north, local.east, local.elevation};
+    };
+    run(state, {1e-300, 1, 1e-300}, ask, ask);
+}
+
+void to_local_single_call(benchmark::State& state) {
+    const auto ask = [](std::size_t i) {
+        geo_nee local = {};
+        _xyz2nez(&places().cartesian[0], &places().cartesian[i], &local);
+        return Triple{local.north, local.east, local.elevation};
+    };
+    run(state, {1e-300, 1, 1e-300}, ask, ask);
+}
+
+void to_local_arrays(benchmark::State& state) {
+    const basalt::LocalFrame frame(places().geodetic[0]);
+    std::vector<geo_nee> out(COUNT);
+    run_arrays(state, [&] { frame.to_local(places().cartesian.data(), out.data(), COUNT); });
+}
+
+// The inverse geodesic, over the ends of direct lines.
+
+constexpr Triple DISTANCE_AZIMUTHS = {5e-8, 1e-6, 1e-6};
+
+const std::vector<geo_llh>& ends(double distance) {
+    static std::vector<geo_llh> all;
+    all.clear();
+    for (std::size_t i = 0; i < COUNT; ++i) {
+        const Triple end = direct(i, distance);
+        all.push_back({end[0], end[1], 0});
+    }
+    return all;
+}
+
+Triple inverse(const geo_llh& from, const geo_llh& to) {
+    const basalt::GeodesicInverse line = basalt::geodesic_inverse(from, to);
+    return {line.distance, line.azimuth_from, line.azimuth_to};
+}
+
+template <typename Ask>
+void run_inverse(benchmark::State& state, const Ask& ask) {
+    const std::vector<geo_llh> to = ends(metres(state));
+    run(
+        state, DISTANCE_AZIMUTHS, [&](std::size_t i) { return ask(places().geodetic[i], to[i]); },
+        [&](std::size_t i) { return inverse(places().geodetic[i], to[i]); });
+}
+
+void inverse_basalt(benchmark::State& state) {
+    run_inverse(state, inverse);
+}
+
 // Cross-track: points some 600 m beside a line of 60 km.
 
 struct Lines {
@@ -277,6 +365,16 @@ void direct_geographiclib(benchmark::State& state) {
         earth.Direct(g.latitude / DEGREE, g.longitude / DEGREE, places().azimuth[i] / DEGREE, distance,
                      end[0], end[1], end[2]);
         return Triple{end[0] * DEGREE, end[1] * DEGREE, end[2] * DEGREE};
+    });
+}
+
+void inverse_geographiclib(benchmark::State& state) {
+    const GeographicLib::Geodesic& earth = GeographicLib::Geodesic::WGS84();
+    run_inverse(state, [&](const geo_llh& from, const geo_llh& to) {
+        Triple line = {};
+        earth.Inverse(from.latitude / DEGREE, from.longitude / DEGREE, to.latitude / DEGREE,
+                      to.longitude / DEGREE, line[0], line[1], line[2]);
+        return Triple{line[0], line[1] * DEGREE, line[2] * DEGREE};
     });
 }
 
@@ -367,6 +465,17 @@ void direct_proj(benchmark::State& state) {
     });
 }
 
+void inverse_proj(benchmark::State& state) {
+    geod_geodesic earth;
+    geod_init(&earth, 6378137.0, 1 / 298.257223563);
+    run_inverse(state, [&](const geo_llh& from, const geo_llh& to) {
+        Triple line = {};
+        geod_inverse(&earth, from.latitude / DEGREE, from.longitude / DEGREE, to.latitude / DEGREE,
+                     to.longitude / DEGREE, &line[0], &line[1], &line[2]);
+        return Triple{line[0], line[1] * DEGREE, line[2] * DEGREE};
+    });
+}
+
 #endif
 
 void distances(benchmark::internal::Benchmark* row) {
@@ -382,18 +491,27 @@ BENCHMARK(to_geodetic_plain)->Name("to_geodetic/plain");
 BENCHMARK(direct_basalt)->Name("direct/basalt")->Apply(distances);
 BENCHMARK(direct_functions)->Name("direct/limit_three_sines_and_cosines_three_arctangents")->Apply(distances);
 BENCHMARK(direct_plain)->Name("direct/plain")->Apply(distances);
+BENCHMARK(to_cartesian_arrays)->Name("to_cartesian/arrays");
+BENCHMARK(to_geodetic_arrays)->Name("to_geodetic/arrays");
+BENCHMARK(direct_arrays)->Name("direct/arrays")->Apply(distances);
+BENCHMARK(to_local_basalt)->Name("to_local/basalt");
+BENCHMARK(to_local_arrays)->Name("to_local/arrays");
+BENCHMARK(to_local_single_call)->Name("to_local/single_call");
+BENCHMARK(inverse_basalt)->Name("inverse/basalt")->Apply(distances);
 BENCHMARK(crosstrack_basalt)->Name("crosstrack/basalt");
 BENCHMARK(crosstrack_steps)->Name("crosstrack/metre_steps");
 #ifdef BENCH_HAS_GEOGRAPHICLIB
 BENCHMARK(to_cartesian_geographiclib)->Name("to_cartesian/geographiclib");
 BENCHMARK(to_geodetic_geographiclib)->Name("to_geodetic/geographiclib");
 BENCHMARK(direct_geographiclib)->Name("direct/geographiclib")->Apply(distances);
+BENCHMARK(inverse_geographiclib)->Name("inverse/geographiclib")->Apply(distances);
 BENCHMARK(crosstrack_geographiclib)->Name("crosstrack/geographiclib");
 #endif
 #ifdef BENCH_HAS_PROJ
 BENCHMARK(to_cartesian_proj)->Name("to_cartesian/proj");
 BENCHMARK(to_geodetic_proj)->Name("to_geodetic/proj");
 BENCHMARK(direct_proj)->Name("direct/proj")->Apply(distances);
+BENCHMARK(inverse_proj)->Name("inverse/proj")->Apply(distances);
 #endif
 
 }  // namespace

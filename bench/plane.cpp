@@ -81,6 +81,21 @@ void in_polygon_basalt(benchmark::State& state) {
     run(state, scene, in_poly(scene), in_poly(scene));
 }
 
+void in_polygon_prepared(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    const basalt::PreparedPolygon prepared(scene.polygon);
+    run(
+        state, scene, [&](const geo_nee& p) { return prepared.contains(p) ? 1 : 0; }, in_poly(scene));
+}
+
+void preparing(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    for ([[maybe_unused]] auto _ : state) {
+        const basalt::PreparedPolygon prepared(scene.polygon);
+        benchmark::DoNotOptimize(&prepared);
+    }
+}
+
 void in_polygon_plain_loop(benchmark::State& state) {
     const Scene scene(size_of(state));
     run(
@@ -92,6 +107,14 @@ void in_polygon_plain_loop(benchmark::State& state) {
 void in_band_basalt(benchmark::State& state) {
     const Scene scene(size_of(state));
     run(state, scene, in_band(scene), in_band(scene));
+}
+
+void in_band_prepared(benchmark::State& state) {
+    const Scene scene(size_of(state));
+    const basalt::PreparedPolygon prepared(scene.polygon);
+    run(
+        state, scene, [&](const geo_nee& p) { return prepared.contains(p, TOLERANCE) ? 1 : 0; },
+        in_band(scene));
 }
 
 void in_band_plain_loop(benchmark::State& state) {
@@ -184,13 +207,15 @@ void reading_the_points(benchmark::State& state) {
 }
 
 void polygon_sizes(benchmark::internal::Benchmark* row) {
-    row->Arg(10)->Arg(100)->Arg(1000)->Arg(10000);
+    row->Arg(10)->Arg(100)->Arg(1000)->Arg(10000)->Arg(100000);
 }
 void band_sizes(benchmark::internal::Benchmark* row) {
     row->Arg(100)->Arg(1000);
 }
 
 BENCHMARK(in_polygon_basalt)->Name("in_polygon/basalt")->Apply(polygon_sizes);
+BENCHMARK(in_polygon_prepared)->Name("in_polygon/prepared")->Apply(polygon_sizes);
+BENCHMARK(preparing)->Name("in_polygon/preparing")->Apply(polygon_sizes);
 BENCHMARK(in_polygon_plain_loop)->Name("in_polygon/plain_loop")->Apply(polygon_sizes);
 BENCHMARK(reading_the_points)->Name("in_polygon/limit_reading_the_points")->Apply(polygon_sizes);
 #ifdef HAS_BOOST_GEOMETRY
@@ -200,6 +225,7 @@ BENCHMARK(in_polygon_boost)->Name("in_polygon/boost")->Apply(polygon_sizes);
 BENCHMARK(in_polygon_geos_prepared)->Name("in_polygon/geos_prepared")->Apply(polygon_sizes);
 #endif
 BENCHMARK(in_band_basalt)->Name("in_band/basalt")->Apply(band_sizes);
+BENCHMARK(in_band_prepared)->Name("in_band/prepared")->Apply(band_sizes);
 BENCHMARK(in_band_plain_loop)->Name("in_band/plain_loop")->Apply(band_sizes);
 #ifdef HAS_BOOST_GEOMETRY
 BENCHMARK(in_band_boost)->Name("in_band/boost")->Apply(band_sizes);

@@ -209,20 +209,18 @@ PreparedPolygon::PreparedPolygon(const geo_nee* vertices, std::size_t count) {
 }
 
 bool PreparedPolygon::contains(const geo_nee& point) const noexcept {
-    bool inside = false;
-    contains(&point, 1, &inside);
-    return inside;
+    if (m_first.empty()) {
+        return false;
+    }
+    const std::size_t bucket = bucket_of(point.north);
+    const Found found =
+        PolygonQuads::find(m_quads.data() + m_first[bucket], m_quads.data() + m_first[bucket + 1], point);
+    return found.is_vertex || __builtin_parity(found.crossings) != 0;
 }
 
 void PreparedPolygon::contains(const geo_nee* points, std::size_t count, bool* inside) const noexcept {
     for (std::size_t i = 0; i < count; ++i) {
-        inside[i] = false;
-        if (!m_first.empty()) {
-            const std::size_t bucket = bucket_of(points[i].north);
-            const Found found = PolygonQuads::find(m_quads.data() + m_first[bucket],
-                                                   m_quads.data() + m_first[bucket + 1], points[i]);
-            inside[i] = found.is_vertex || __builtin_parity(found.crossings) != 0;
-        }
+        inside[i] = contains(points[i]);
     }
 }
 

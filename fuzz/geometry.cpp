@@ -196,18 +196,20 @@ void direct_geodesic(Random& random) {
 void crosstrack(Random& random) {
     const geo_llh a = {random.real(-1.5, 1.5), random.real(-PI, PI), 0};
     const double length = std::pow(10.0, random.real(1, 5.5));
-    const double off = std::pow(10.0, random.real(-0.2, 3)) * (random.below(2) == 0 ? 1 : -1);
+    const double off = std::pow(10.0, random.real(-5.5, 3)) * (random.below(2) == 0 ? 1 : -1);
     geo_llh b = {};
     geo_llh p = {};
     double azimuth = 0;
     geo_vincenty_direct(a, random.real(0, 2 * PI), length, azimuth, b);
     geo_vincenty_direct(a, geo_vincenty_bearing(a, b), length * random.real(-0.5, 1.5), azimuth, p);
     geo_vincenty_direct(p, azimuth + PI / 2, off, azimuth, p);
-    int steps = 20000;
+    int steps = 5000;
     const double expected = plain::crosstrack(a, b, p, steps);
     int passes = 0;
     const double distance = cross_track(a, b, p, passes);
-    require(passes <= 8 && (std::isnan(expected) || near(distance, expected, 1e-6)));
+    // Steps of a metre do not settle everywhere; there, sphere and ellipsoid differ by up to 0.7 %.
+    require(passes <= 8 && (std::isnan(expected) ? near(distance, -off, 0.007 * std::abs(off) + 5e-9)
+                                                 : near(distance, expected, 1e-6)));
 }
 
 }  // namespace
@@ -221,8 +223,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
             continue;
         }
         Random random(input.double_word());
-        if (choice == 128) {
-            crosstrack(random);  // by steps of a metre: slow
+        if (choice < 131) {
+            crosstrack(random);  // slow
         } else {
             void (*const runs[])(Random&) = {awkward_polygon, star_polygon, conversion, direct_geodesic};
             runs[choice % 4](random);

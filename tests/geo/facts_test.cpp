@@ -4,7 +4,6 @@
 #include <algorithm>
 #include <bit>
 #include <cmath>
-#include <cstddef>
 #include <cstdint>
 #include <cstdlib>
 #include <fstream>
@@ -113,20 +112,16 @@ void check_facts(bool flushes_subnormals) {
     EXPECT_GT(facts, 300);
 }
 
+static_assert(sizeof(geo_nee) == 24 && sizeof(geo_llh) == 24 && sizeof(geo_vector) == 24 &&
+              sizeof(geo_hvd) == 24);
+static_assert(std::bit_cast<std::uint64_t>(GEO_NULL) == 0x000E61ACF033D1A4U);
+
 TEST(GeometryFacts, Hold) {
     check_facts(false);
 }
 
 TEST(GeometryFacts, HoldOnAThreadThatFlushesSubnormals) {
     check_facts(true);
-}
-
-TEST(GeometryFacts, RecordsAreThreeDoublesInOrder) {
-    static_assert(sizeof(geo_nee) == 24 && sizeof(geo_llh) == 24 && sizeof(geo_vector) == 24 &&
-                  sizeof(geo_hvd) == 24);
-    static_assert(offsetof(geo_nee, east) == 8 && offsetof(geo_llh, longitude) == 8 &&
-                  offsetof(geo_vector, y) == 8 && offsetof(geo_hvd, vertical) == 8);
-    EXPECT_EQ(std::bit_cast<std::uint64_t>(GEO_NULL), 0x000E61ACF033D1A4U);
 }
 
 }  // namespace

@@ -22,7 +22,7 @@ int crossing_parity(int n, const geo_nee* polygon, const geo_nee& point) {
 }
 
 bool is_in_a_band(int n, const geo_nee* polygon, const geo_nee& point, double tolerance) {
-    // The closing edge is the one whose ends are not neighbours in memory.
+    // The closing edge: its ends are not adjacent in memory.
     const geo_nee& first = polygon[0];
     const geo_nee& last = polygon[n - 1];
     if (may_be_in_band(last, first, point, band_reach(tolerance)) &&
@@ -47,8 +47,7 @@ int geo_point_in_poly_2(int n, const geo_nee* polygon, const geo_nee* point, dou
     if (n < 1) {
         return 0;
     }
-    // A negative or NaN tolerance has no band. Bands and crossings are asked one after the other, since a hit
-    // in any band decides whatever the crossings say.
+    // A negative or NaN tolerance has no band. Bands first: a hit decides, whatever the crossings.
     if (tolerance >= 0.0 && is_in_a_band(n, polygon, *point, tolerance)) {
         return 1;
     }

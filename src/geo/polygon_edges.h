@@ -1,7 +1,7 @@
 /// @file
-/// The two questions asked of every edge of a polygon, each in a portable form and in vector lanes: how many
-/// edges cross the ray from a point towards east, and which edges may have the point in their tolerance band.
-/// Both forms give the same answer for every input; edges run from vertex i - 1 to vertex i.
+/// The two tests of a polygon's edges, each portable and with AVX2: which edges cross the ray from a point
+/// towards east, and which may have the point in their tolerance band. Both forms have the same result for
+/// every input. Edges run from vertex i - 1 to vertex i.
 #ifndef BASALT_SRC_GEO_POLYGON_EDGES_H
 #define BASALT_SRC_GEO_POLYGON_EDGES_H
 
@@ -21,11 +21,11 @@ namespace basalt::geo {
 
 enum class VertexTest { NO, YES };
 
-/// Stands for the rise of a level edge where one is divided by; metres.
+/// Divisor instead of the rise of a level edge; metres.
 inline constexpr double LEVEL_EDGE_RISE = 1e-8;
 
 /// Whether the edge from j to i straddles the point's northing (the lower end counts, the upper does not) and
-/// passes east of the point. A level edge never straddles, so nothing is divided by 0.
+/// passes east of the point. A level edge never straddles, so there is no division by 0.
 inline bool crosses_east_of(const geo_nee& j, const geo_nee& i, const geo_nee& point) {
     const bool straddles = (i.north <= point.north && point.north < j.north) ||
                            (j.north <= point.north && point.north < i.north);
@@ -33,7 +33,8 @@ inline bool crosses_east_of(const geo_nee& j, const geo_nee& i, const geo_nee& p
            (j.east - i.east) * (point.north - i.north) / (j.north - i.north) + i.east > point.east;
 }
 
-/// 1 when an odd number of edges crosses east of the point or, if asked, when the point is a vertex. n >= 1.
+/// 1 when an odd number of edges crosses east of the point or, with VertexTest::YES, the point is a vertex.
+/// n >= 1.
 template <VertexTest TEST>
 int crossing_parity_portable(int n, const geo_nee* polygon, const geo_nee& point) {
     int inside = 0;
@@ -48,10 +49,9 @@ int crossing_parity_portable(int n, const geo_nee* polygon, const geo_nee& point
 }
 
 /// Bounds for the band of an edge. The exact test accepts a point only in the rectangle that reaches
-/// `tolerance` beyond the edge, give or take its own rounding: some 1e-14 of edge and tolerance while the C
-/// library's sine, cosine and arc tangent are good to a few last places, and 1e-161 m where squares
-/// underflow. A turned rectangle reaches at most sqrt(2) tolerances beyond the ends along either axis. The
-/// numbers are generous against all that, so a point outside the margin is one the exact test would refuse.
+/// `tolerance` beyond the edge, with rounding of some 1e-14 of edge and tolerance, and 1e-161 m where squares
+/// underflow. A turned rectangle reaches at most sqrt(2) tolerances along either axis. The bounds are wider
+/// than all of that, so the exact test would refuse every point outside.
 inline constexpr double BAND_REACH = 1.5;
 inline constexpr double BAND_ROUNDING = 1e-12;
 inline constexpr double BAND_UNDERFLOW = 1e-150;
@@ -61,9 +61,9 @@ inline double band_reach(double tolerance) {
     return BAND_REACH * tolerance + BAND_UNDERFLOW;
 }
 
-/// Whether the band of edge a-b may hold the point. Differences, not bounds, are compared with the margin:
-/// they keep their relative accuracy far from the origin. With NaN anywhere the exact test refuses, so either
-/// answer is right; infinite edges and tolerances make the margin infinite or NaN, which keeps the edge.
+/// Whether the band of edge a-b may hold the point. Differences are compared with the margin, since they keep
+/// their relative accuracy far from the origin. With NaN anywhere the exact test refuses, so either result is
+/// right; infinite edges and tolerances make the margin infinite or NaN, which keeps the edge.
 inline bool may_be_in_band(const geo_nee& a, const geo_nee& b, const geo_nee& point, double reach) {
     const double margin = reach + BAND_ROUNDING * (std::abs(a.north - b.north) + std::abs(a.east - b.east));
     const double north_a = a.north - point.north;
@@ -96,7 +96,7 @@ inline bool is_in_a_band_portable(int n, const geo_nee* polygon, const geo_nee& 
 #define BASALT_AVX2 [[gnu::target("avx2")]]
 #define BASALT_AVX2_INLINE [[gnu::target("avx2"), gnu::always_inline]] inline
 
-/// Four vertices, a lane each.
+/// Four vertices.
 struct Quad {
     __m256d north;
     __m256d east;
@@ -121,7 +121,7 @@ BASALT_AVX2_INLINE unsigned cross_east_of(const geo_nee* i, const Quad& point) {
                                                          _mm256_cmp_pd(point.north, a.north, _CMP_LT_OQ)),
                                            _mm256_and_pd(_mm256_cmp_pd(a.north, point.north, _CMP_LE_OQ),
                                                          _mm256_cmp_pd(point.north, b.north, _CMP_LT_OQ)));
-    // Level edges do not straddle; the stand-in keeps a host that traps division by zero out of trouble.
+    // Level edges do not straddle, but a host may trap a division by zero.
     const __m256d rise = _mm256_blendv_pd(_mm256_sub_pd(a.north, b.north), _mm256_set1_pd(LEVEL_EDGE_RISE),
                                           _mm256_cmp_pd(a.north, b.north, _CMP_EQ_OQ));
     const __m256d run = _mm256_mul_pd(_mm256_sub_pd(a.east, b.east), _mm256_sub_pd(point.north, b.north));
@@ -129,16 +129,15 @@ BASALT_AVX2_INLINE unsigned cross_east_of(const geo_nee* i, const Quad& point) {
     return lane_bits(_mm256_and_pd(straddles, _mm256_cmp_pd(crossing, point.east, _CMP_GT_OQ)));
 }
 
-/// The walk along the vertices that crossing_parity_avx2() makes.
+/// State of crossing_parity_avx2() along the vertices.
 struct Walk {
     unsigned not_above;  ///< whether the last vertex seen is at most as far north as the point
     unsigned crossings;  ///< parity of crossings, spread over four bits
     bool on_vertex;
 };
 
-/// Goes on over 4 * QUADS vertices. Only edges whose ends differ in `not_above` can straddle; they are few,
-/// so one branch a step passes over the rest. Edges that end before vertex `fresh` of the first quad are not
-/// counted.
+/// Continues over 4 * QUADS vertices. Only edges whose ends differ in `not_above` can straddle; one branch a
+/// step skips all others. Edges that end before vertex `fresh` of the first quad are not counted.
 template <VertexTest TEST, int QUADS>
 BASALT_AVX2_INLINE void step(Walk& walk, const geo_nee* vertices, const Quad& point, int fresh = 0) {
     unsigned not_above = 0;
@@ -212,7 +211,7 @@ BASALT_AVX2 inline bool is_in_a_band_avx2(int n, const geo_nee* polygon, const g
     const Quad p = {_mm256_set1_pd(point.north), _mm256_set1_pd(point.east)};
     const double reach = band_reach(tolerance);
     for (int i = 1; i < n; i += 4) {
-        // The last quad may reach back over edges already seen; asking twice changes nothing.
+        // The last quad may overlap the one before; testing an edge twice changes nothing.
         const geo_nee* first = polygon + (i <= n - 4 ? i : n - 4);
         for (unsigned ends = may_be_in_bands(first, p, reach); ends != 0; ends &= ends - 1) {
             if (is_in_band(first + __builtin_ctz(ends), point, tolerance)) {

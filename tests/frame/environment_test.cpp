@@ -4,7 +4,7 @@
 #include <algorithm>
 #include <bit>
 #include <cstdlib>
-#include <string_view>
+#include <tuple>
 #include <vector>
 
 #include "src/frame/environment_state.h"
@@ -14,33 +14,24 @@ namespace {
 
 using basalt::frame::environment;
 
-// Stand-ins for the version query and the system's clock, put in place by the linker.
-struct FakePlatform {
-    bool query_works = true;
-    DWORD major = 6;
-    DWORD minor = 2;
-    int queries = 0;
-    std::uint64_t milliseconds = 0;  // 0: the system's clock
-} fake;
+DWORD fake_major = 6;
+DWORD fake_minor = 2;  // beyond 99: the query fails
+int queries = 0;
+std::uint64_t milliseconds = 0;
 
 }  // namespace
 
+// The linker's --wrap puts these in place of the version query and the system's clock.
 extern "C" {
-int __real_clock_gettime(clockid_t id, timespec* time);
-int __wrap_clock_gettime(clockid_t id, timespec* time) {
-    if (fake.milliseconds == 0) {
-        return __real_clock_gettime(id, time);
-    }
-    time->tv_sec = static_cast<time_t>(fake.milliseconds / 1000);
-    time->tv_nsec = static_cast<long>(fake.milliseconds % 1000) * 1'000'000 + 999'999;
+int __wrap_clock_gettime(clockid_t, timespec* time) {
+    *time = {static_cast<time_t>(milliseconds / 1000),
+             static_cast<long>(milliseconds % 1000) * 1'000'000 + 999'999};
     return 0;
 }
 BOOL __wrap__Z13GetVersionExWP14OSVERSIONINFOW(OSVERSIONINFOW* version) {
-    ++fake.queries;
-    version->dwPlatformId = 2;
-    version->dwMajorVersion = fake.major;
-    version->dwMinorVersion = fake.minor;
-    return static_cast<BOOL>(fake.query_works && version->dwOSVersionInfoSize == 276);
+    ++queries;
+    *version = {version->dwOSVersionInfoSize, fake_major, fake_minor, 0, 2, {}};
+    return static_cast<BOOL>(fake_minor < 100 && version->dwOSVersionInfoSize == 276);
 }
 }
 
@@ -57,39 +48,41 @@ TEST(Environment, operating_system_codes) {
         EXPECT_EQ(basalt::frame::release_code(version), code) << platform << ' ' << major << '.' << minor;
     }
     environment.os_code.store(0);
-    fake = {.minor = 3};
-    EXPECT_EQ(_operatingsystem(), 0U);
-    fake = {.query_works = false, .queries = 1};
-    EXPECT_EQ(_operatingsystem(), 0U) << "queried until it is determined";
-    fake = {.queries = 2};
-    EXPECT_EQ(_operatingsystem() + _operatingsystem(), 22U);
-    EXPECT_EQ(fake.queries, 3);
-    fake.minor = 1;
+    for (const auto& [next_major, next_minor, code] :
+         {std::tuple(6U, 3U, 0U), {6, 100, 0}, {6, 2, 11}, {6, 1, 11}}) {
+        fake_major = next_major;
+        fake_minor = next_minor;
+        EXPECT_EQ(_operatingsystem(), code) << "queried until it is determined";
+    }
+    EXPECT_EQ(queries, 3);
     EXPECT_EQ(_operatingsystemversion(), 0);
     EXPECT_EQ(_operatingsystem(), 10U) << "each version query stores what it detects";
-    fake.major = 10;
+    fake_major = 10;
     EXPECT_EQ(_operatingsystemversion(), 0);
     EXPECT_EQ(_operatingsystem(), 10U) << "but not an unlisted version";
-    EXPECT_EQ(fake.queries, 5);
+    EXPECT_EQ(queries, 5);
     environment.os_code.store(0);
+    fake_major = 6;
+    fake_minor = 2;
 }
 
 TEST(Environment, handheld_display_and_language) {
     struct Row {
         bool (*query)();
-        std::string_view without_flags, with_flags;  // '1' at the index of each code that can
+        unsigned without_flags, with_flags;  // a bit for each code that can
     };
-    for (const Row& row : {Row{_handheldCanHaveInBuildKV7Radio, "0000011010000000", "0000011010000000"},
-                           Row{_handheldCanHaveInBuildModem, "0001000100110010", "0001000100110010"},
-                           Row{_handheldCanHaveInBuildKestraRTK, "0000000100000000", "0000000100010000"},
-                           Row{_isNewLumoOS, "0000000000000000", "0000001000000100"},
-                           Row{_isDefaultFontSize, "1111111100111111", "1111111100111111"}}) {
+    constexpr Row ROWS[] = {{_handheldCanHaveInBuildKV7Radio, 0x160, 0x160},
+                            {_handheldCanHaveInBuildModem, 0x4C88, 0x4C88},
+                            {_handheldCanHaveInBuildKestraRTK, 0x80, 0x880},
+                            {_isNewLumoOS, 0, 0x2040},
+                            {_isDefaultFontSize, 0xFCFF, 0xFCFF}};
+    for (const auto& [query, without_flags, with_flags] : ROWS) {
         for (basalt_hh code = 0; code < 16; ++code) {
-            for (const bool flag : {false, true}) {
+            for (const unsigned codes : {without_flags, with_flags}) {
                 environment.handheld_code.store(code);
-                environment.new_generation.store(flag);
-                environment.rtk_option.store(flag);
-                EXPECT_EQ(row.query(), (flag ? row.with_flags : row.without_flags)[code] == '1') << code;
+                environment.new_generation.store(codes == with_flags);
+                environment.rtk_option.store(codes == with_flags);
+                EXPECT_EQ(query(), (codes >> code & 1) != 0) << code;
                 EXPECT_EQ(_handheldVersion(), std::max(code, 1U)) << "0 is detected as the desktop";
             }
         }
@@ -111,18 +104,17 @@ TEST(Environment, random_numbers_follow_the_tick_count) {
     std::srand(123'456);
     const int first = std::rand() % 65535;
     const int second = std::rand() % 65535;
-    fake.milliseconds = 123'456;
+    milliseconds = 123'456;
     EXPECT_EQ(_random_uint16(), first);
     EXPECT_EQ(_random_uint16(), second) << "one sequence within a millisecond";
-    fake.milliseconds = (1ULL << 32) - 1;
+    milliseconds = (1ULL << 32) - 1;
     _random_uint16();
-    fake.milliseconds = 123'456 + (1ULL << 32);
+    milliseconds = 123'456 + (1ULL << 32);
     EXPECT_EQ(_random_uint16(), first) << "the count has 32 bits; the same tick draws the same again";
     environment.last_random_seed.store(0);
-    fake.milliseconds = 1ULL << 32;
+    milliseconds = 1ULL << 32;
     std::srand(123'456);
     EXPECT_EQ(_random_uint16(), first) << "tick 0 is the seed that a fresh library has";
-    fake = {};
 }
 
 TEST(Environment, reverses_bytes_of_any_number_and_alignment) {

@@ -2,6 +2,7 @@
 
 #include <clocale>
 #include <string>
+#include <tuple>
 
 #include "basalt/frame.h"
 #include "tests/support/locales.h"
@@ -56,25 +57,22 @@ TEST(TextConversion, numbers_fit_with_their_terminator_or_are_empty) {
 TEST(TextConversion, is_in_the_environments_encoding) {
     GTEST_FLAG_SET(death_test_style, "threadsafe");
     const test_locales::Folder locales;
-    struct Encoding {
-        const char* name;
-        std::string narrow;  // of WIDE
-        std::wstring back;
-    };
-    const std::wstring wide = std::wstring(62, L'x') + L"a\u00E9\uAC00\u20AC\xD800z";  // across a piece of 64
-    const std::wstring start(62, L'x');
-    for (const auto& [name, narrow, back] :
-         {Encoding{"UTF-8", "a\xC3\xA9\xEA\xB0\x80\xE2\x82\xAC?z", L"a\u00E9\uAC00\u20AC?z"},
-          Encoding{"ISO-8859-1", "a\xE9???z", L"a\u00E9???z"},
-          Encoding{"EUC-KR", "a?\xB0\xA1\xA2\xE6?z", L"a?\uAC00\u20AC?z"}}) {
+    const std::string start(62, 'x');  // the others are about the end of a piece
+    const std::wstring wide_start(62, L'x');
+    const std::tuple<const char*, std::string, std::wstring> encodings[] = {
+        {"UTF-8", start + "a\xC3\xA9\xEA\xB0\x80\xE2\x82\xAC?z", wide_start + L"a\u00E9\uAC00\u20AC?z"},
+        {"ISO-8859-1", start + "a\xE9???z", wide_start + L"a\u00E9???z"},
+        {"EUC-KR", start + "a?\xB0\xA1\xA2\xE6?z", wide_start + L"a?\uAC00\u20AC?z"}};
+    for (const auto& [name, narrow, back] : encodings) {
         if (!locales.has(name)) {
             GTEST_SKIP() << "localedef cannot make a locale with " << name;
         }
-        const auto check = [&, narrow = std::string(62, 'x') + narrow] {
+        const auto check = [&, narrow = narrow, back = back] {
             const int length = static_cast<int>(narrow.size());
+            const std::wstring wide = wide_start + L"a\u00E9\uAC00\u20AC\xD800z";
             EXPECT_EQ(converted<char>(_tchar2char, wide, length), narrow);
             EXPECT_EQ(converted<char>(_tchar2char, wide, length - 1), "");
-            EXPECT_EQ(converted<wchar_t>(_char2tchar, narrow, length), start + back);
+            EXPECT_EQ(converted<wchar_t>(_char2tchar, narrow, length), back);
             EXPECT_STREQ(std::setlocale(LC_ALL, nullptr), "C");
             std::_Exit(testing::Test::HasFailure() ? 1 : 0);
         };

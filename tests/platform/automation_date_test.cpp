@@ -127,24 +127,12 @@ TEST(Dates, objects_have_a_status_parts_an_order_and_a_text) {
 
 TEST(Dates, are_read_from_hexadecimal_text) {
     constexpr double NONE = -1e9;
-    constexpr std::pair<const char*, double> ROWS[] = {{"01022021", 44228},
-                                                       {"29022020", 43890},
-                                                       {"30121899", 0},
-                                                       {"01010100", -657434},
-                                                       {"31129999", 2958465},
-                                                       {"1 2 2021", 44228},
-                                                       {"01022021 and more", 44228},
-                                                       {"+1+22021", 44228},
-                                                       {"29022021", NONE},
-                                                       {"00012021", NONE},
-                                                       {"01132021", NONE},
-                                                       {"", NONE},
-                                                       {"0102", NONE},
-                                                       {"01010099", NONE},
-                                                       {"abcdefgh", NONE},
-                                                       {"-1022021", NONE},
-                                                       {"01-12021", NONE},
-                                                       {"0102-999", NONE}};
+    constexpr std::pair<const char*, double> ROWS[] = {
+        {"01022021", 44228},   {"29022020", 43890}, {"30121899", 0},        {"01010100", -657434},
+        {"31129999", 2958465}, {"1 2 2021", 44228}, {"01022021999", 44228}, {"+1+22021", 44228},
+        {"29022021", NONE},    {"00012021", NONE},  {"01132021", NONE},     {"", NONE},
+        {"0102", NONE},        {"01010099", NONE},  {"abcdefgh", NONE},     {"-1022021", NONE},
+        {"01-12021", NONE},    {"0102-999", NONE}};
     COleDateTime date(5.0);
     EXPECT_THROW(basalt::ParseDateFromHexString("3031003232303231", date), std::runtime_error);
     EXPECT_TRUE(date.m_dt == 5.0 && date.GetStatus() == COleDateTime::valid);

@@ -45,8 +45,8 @@ DWORD format(DWORD code, wchar_t*& text, DWORD size = 0, DWORD flags = 0x1300, D
 TEST(Errors, have_messages_without_line_breaks) {
     for (const DWORD code : {0U, 2U, 8U, 87U, 487U, 1921U, 9999U, 0xFFFFFFFFU}) {
         wchar_t* text = nullptr;
-        const DWORD length = format(code, text, 5000);
-        text[4999] = L'x';  // the size requested
+        const DWORD length = format(code, text, code == 0 ? 5000 : 0);
+        text[code == 0 ? 4999 : length] = L'\0';  // the size requested
         const std::wstring message(text, length);
         EXPECT_EQ(message.find(L"Unknown error " + std::to_wstring(code)), code < 9999 ? message.npos : 0)
             << code;

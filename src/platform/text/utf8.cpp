@@ -58,8 +58,7 @@ Decoded decode_front(std::string_view text) {
     if (lead < 0x80) {
         return {static_cast<wchar_t>(lead), 1};
     }
-    // 0xC0 and 0xC1 only begin overlong forms.
-    if (lead < 0xC2 || lead > 0xF4) {
+    if (lead < 0xC0 || lead > 0xF4) {
         return INVALID;
     }
     const std::size_t length = lead < 0xE0 ? 2 : lead < 0xF0 ? 3 : 4;

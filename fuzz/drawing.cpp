@@ -50,8 +50,10 @@ struct World {
     RECT rectangle() { return {coordinate(), coordinate(), coordinate(), coordinate()}; }
     COLORREF colour(const Surface& s) {
         const int kind = in.byte();
-        return kind % 2 == 0 ? in.word()
-                             : colour_of(s.picture.depth, s.picture.pixels[kind % s.picture.pixels.size()]);
+        return kind % 2 == 0
+                   ? in.word()
+                   : colour_of(s.picture.depth,
+                               s.picture.pixels[static_cast<std::size_t>(kind) % s.picture.pixels.size()]);
     }
     bool is_shift(const Surface& s) const { return s.settings.world.eM11 == 1 && s.settings.world.eM12 == 0; }
 

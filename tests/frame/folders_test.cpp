@@ -24,7 +24,7 @@ constexpr Folder FOLDERS[] = {{_setKestraRootPath, _kestraRootPath, 11},
 
 TEST(Folders, keep_259_characters_and_nothing_of_earlier_values) {
     EXPECT_STREQ(_kestraPortulaInboxPath(), L"");
-    for (const std::size_t size : {300, 14, 259, 0}) {
+    for (const std::size_t size : {300U, 14U, 259U, 0U}) {
         for (const Folder& folder : FOLDERS) {
             std::wstring value(size, static_cast<wchar_t>(L'a' + (&folder - FOLDERS)));
             basalt::frame::environment.os_code.store(0);

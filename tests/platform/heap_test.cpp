@@ -136,7 +136,7 @@ TEST(Heap, keeps_up_to_32_mebibytes_until_it_is_compacted) {
     const Heap heap(0);
     SetLastError(ERROR_ACCESS_DENIED);
     EXPECT_EQ(error_of(heap.compact()), ERROR_SUCCESS) << "an unused heap has no free block";
-    for (const std::size_t size : {480, 2048}) {
+    for (const std::size_t size : {480U, 2048U}) {
         Blocks blocks = heap.take_up_to(100 * MIB / size, size);
         const auto falls = std::ranges::count_if(
             blocks, [&](void*& block) { return &block != blocks.data() && block < *(&block - 1); });

@@ -51,7 +51,7 @@ AxisPoint along_arc(const Element& arc, const AxisPoint& start, double length, d
     const double angle = geo_arc_length_to_angle(length, arc.radius);
     AxisPoint point = {{}, start.bearing + arc.hand * angle};
     geo_grid_follow3(start.at, start.bearing + arc.hand * 0.5 * angle,
-                     2.0 * arc.radius * std::sin(0.5 * angle), rise, point.at);
+                     2.0 * arc.radius * sine_cosine(0.5 * angle).sine, rise, point.at);
     return point;
 }
 
@@ -77,13 +77,16 @@ double pieces_within(double sagitta, double radius, double length) {
     }
     // At a sagitta of the radius or more, half the chord is the radius.
     const double half = sagitta < radius ? geo_arc_to_chord(radius, sagitta) : radius;
-    const double piece = geo_arc_angle_to_length(2.0 * std::asin(half / radius), radius);
+    const double half_angle =
+        geo_grid_bearing({0.0, 0.0, 0.0}, {std::sqrt(radius * radius - half * half), half, 0.0});
+    const double piece = geo_arc_angle_to_length(2.0 * half_angle, radius);
     constexpr double ROUNDING = 1e-9;
     return std::max(1.0, std::ceil(length / piece - ROUNDING));
 }
 
 double stand_off(double radius, double arc) {
-    return radius == GEO_INFINITY ? 0.0 : radius * (1.0 - std::cos(0.5 * std::min(arc / radius, PI)));
+    return radius == GEO_INFINITY ? 0.0
+                                  : radius * (1.0 - sine_cosine(0.5 * std::min(arc / radius, PI)).cosine);
 }
 
 const char* name_of(ElementKind kind) {

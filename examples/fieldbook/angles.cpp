@@ -29,6 +29,12 @@ std::string two_digits(const std::string& text) {
 
 }  // namespace
 
+SineCosine sine_cosine(double radians) {
+    geo_nee unit = {};
+    geo_grid_follow3({0.0, 0.0, 0.0}, radians, 1.0, 0.0, unit);
+    return {unit.east, unit.north};
+}
+
 std::optional<double> parse_angle(std::string_view text) {
     constexpr double TURN = 360.0;
     const std::size_t first = text.find('-');

@@ -10,6 +10,13 @@ inline constexpr double PI = 3.141592653589793;
 inline constexpr double RADIANS_PER_DEGREE = PI / 180.0;
 inline constexpr double RADIANS_PER_SECOND = PI / 648000.0;
 
+struct SineCosine {
+    double sine, cosine;
+};
+
+/// Sine and cosine by way of the library, whose results are the same on every processor.
+SineCosine sine_cosine(double radians);
+
 /// Radians from decimal degrees (`123.5`) or degrees, minutes and seconds (`123-30-00.0`) in [0, 360);
 /// nothing if the text is neither. Minutes and seconds are below 60.
 std::optional<double> parse_angle(std::string_view text);

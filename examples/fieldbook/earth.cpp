@@ -2,6 +2,7 @@
 
 #include <cmath>
 
+#include "angles.h"
 #include "input_error.h"
 
 namespace {
@@ -18,10 +19,8 @@ Earth::Earth(const geo_nee& anchor, const geo_llh& position, double scale)
     if (_llh2xyz(&position, &m_origin) == 0) {
         throw InputError("--wgs84: latitude, longitude and height may not be 0 all three");
     }
-    const double sin_lat = std::sin(position.latitude);
-    const double cos_lat = std::cos(position.latitude);
-    const double sin_lon = std::sin(position.longitude);
-    const double cos_lon = std::cos(position.longitude);
+    const auto [sin_lat, cos_lat] = sine_cosine(position.latitude);
+    const auto [sin_lon, cos_lon] = sine_cosine(position.longitude);
     m_axes[0] = {-sin_lat * cos_lon, -sin_lat * sin_lon, cos_lat};
     m_axes[1] = {-sin_lon, cos_lon, 0.0};
     m_axes[2] = {cos_lat * cos_lon, cos_lat * sin_lon, sin_lat};

@@ -2,6 +2,8 @@
 
 #include <cmath>
 
+#include "angles.h"
+
 namespace {
 
 /// Adds sigma^2 g g^T, for what moves the point by g per unit of an error sigma.
@@ -22,10 +24,8 @@ Precision::Precision(const Traverse& traverse, const InstrumentPrecision& instru
 
 /// Contribution of a slope distance and a zenith angle.
 void Precision::add_sight(Covariance& sum, const geo_hvd& observation) const {
-    const double sine = std::sin(observation.vertical);
-    const double cosine = std::cos(observation.vertical);
-    const double north = std::cos(observation.horizontal);
-    const double east = std::sin(observation.horizontal);
+    const auto [sine, cosine] = sine_cosine(observation.vertical);
+    const auto [east, north] = sine_cosine(observation.horizontal);
     add(sum, m_instrument.distance + m_instrument.per_metre * observation.distance,
         {sine * north, sine * east, cosine});
     add(sum, m_instrument.angle * observation.distance, {cosine * north, cosine * east, -sine});

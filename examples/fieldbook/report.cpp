@@ -133,10 +133,10 @@ std::string axis_section(const Results& results) {
     std::string text = section("Alignment") + table.text();
     if (results.axis_misclosure) {
         const AxisPoint& difference = *results.axis_misclosure;
-        text += line("End misclosure", metres(std::hypot(difference.at.north, difference.at.east)) +
-                                           " m  north " + metres(difference.at.north) + ", east " +
-                                           metres(difference.at.east) + "; bearing " +
-                                           seconds_text(difference.bearing) + " \"");
+        text +=
+            line("End misclosure", metres(geo_horz_dist({0.0, 0.0, 0.0}, difference.at)) + " m  north " +
+                                       metres(difference.at.north) + ", east " + metres(difference.at.east) +
+                                       "; bearing " + seconds_text(difference.bearing) + " \"");
     }
     return text;
 }

@@ -39,10 +39,4 @@ void BlockIndex::Place(const Entry& added) noexcept {
     ++m_count;
 }
 
-void BlockIndex::Clear() noexcept {
-    m_entries.clear();
-    m_count = 0;
-    m_shift = 64;
-}
-
 }  // namespace vex_util

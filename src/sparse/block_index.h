@@ -51,7 +51,6 @@ public:
     void Reserve(std::size_t count);
     // Adds a block that is not in the index; space must be reserved.
     void Add(BlockKey key, CellBlock block) noexcept;
-    void Clear() noexcept;
     std::size_t Count() const noexcept { return m_count; }
 
     void Swap(BlockIndex& other) noexcept {

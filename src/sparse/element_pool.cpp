@@ -60,7 +60,7 @@ void ElementPool::Clear() noexcept {
     for (void* const chunk : m_chunks) {
         vex_lib::vlSharedMemoryHeap::Free(chunk);
     }
-    m_chunks.clear();
+    std::vector<void*>().swap(m_chunks);
     m_freeMemory = {};
     m_free = nullptr;
     m_freeCount = 0;

@@ -93,8 +93,8 @@ void SparseContents::CopyBlockElements(const SparseContents& source, CellBlock f
 void SparseContents::Clear() noexcept {
     m_blocks.Clear();
     m_elements.Clear();
-    m_index.Clear();
-    m_list.clear();
+    BlockIndex().Swap(m_index);
+    std::vector<ListedBlock>().swap(m_list);
     m_tree.RemoveAll();
     m_lastBlock = {};
 }

@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "tests/sparse/visit_recorder.h"
+#include "tests/support/failing_new.h"
 #include "tests/support/sparse_inspector.h"
 
 namespace vex_util::testing {
@@ -54,6 +55,17 @@ TEST(SparseArray, SelectsASquareOfBlocksInTheOrderOfTheTree) {
     EXPECT_EQ(selected(0, 79), (std::vector<int>{2,  3,  4,  7,  8,  0,  1,  5,  6,  10, 9,  12, 13,
                                                  14, 11, 15, 16, 20, 21, 22, 17, 18, 19, 23, 24}));
     EXPECT_EQ(selected(20, 40), (std::vector<int>{7, 6, 12, 11}));
+}
+
+TEST(SparseArray, RemoveAllReleasesAllMemory) {
+    Sparse2DArray array(8, 4, 4);
+    const long live = live_allocations();
+    for (int i = 0; i < 1000; ++i) {
+        insert_value(array, i * 37, i, 1);
+    }
+    EXPECT_GT(live_allocations(), live);
+    array.RemoveAll();
+    EXPECT_EQ(live_allocations(), live);
 }
 
 TEST(SparseArray, AVisitorsExceptionPropagatesAndReleasesTheLock) {

@@ -57,7 +57,7 @@ TEST(VersionQuery, finds_values_by_their_path) {
           L"\\StringFileInfo\\ProductName", L"\\\\StringFileInfo", L"\\VarFileInfo\\Translation\\x"}) {
         EXPECT_EQ(place(block, missing), "error 1813") << missing;
     }
-    for (const std::size_t spoilt : {2, 40}) {  // the root value's size, its signature
+    for (const std::size_t spoilt : {2U, 40U}) {  // the root value's size, its signature
         --block[spoilt];
         EXPECT_EQ(place(block, L"\\"), "error 1813") << spoilt;
         ++block[spoilt];

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <fstream>
 
 #include "tests/support/scratch_folder.h"
 #include "tests/support/version_block.h"
@@ -58,6 +59,17 @@ TEST(Version, is_that_of_this_program_whatever_the_instance) {
     EXPECT_EQ(info.GetProductName(),
               L"\x41C"
               L"ap \x1F30D %d");
+}
+
+TEST(Version, is_in_the_program_once) {
+    std::ifstream file("/proc/self/exe", std::ios::binary);
+    const std::string program(std::istreambuf_iterator<char>(file), {});
+    std::string text;  // in UTF-16
+    for (const char ch : std::string("50 % of 'these'")) {
+        text += {ch, '\0'};
+    }
+    const std::size_t first = program.find(text);
+    EXPECT_TRUE(first != std::string::npos && program.find(text, first + 1) == std::string::npos);
 }
 
 TEST(Version, each_reading_replaces_what_it_finds) {

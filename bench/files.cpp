@@ -76,7 +76,7 @@ void split_std_filesystem(benchmark::State& state) {
     const StandardParts parts{fs::path(NARROW_PATH)};
     if (!equal(path.GetPath(1), parts.root) || !equal(path.GetPath(2), parts.parent / "") ||
         !equal(path.GetPath(4), parts.stem) || !equal(path.GetPath(8), parts.extension)) {
-        state.SkipWithError("answers differ");
+        state.SkipWithError("results differ");
     }
     const std::string text = NARROW_PATH;
     for ([[maybe_unused]] auto _ : state) {
@@ -98,7 +98,7 @@ BENCHMARK(select_basalt)->Name("path_select/basalt");
 void select_std_filesystem(benchmark::State& state) {
     const fs::path path(NARROW_PATH);
     if (!equal(Path(WIDE_PATH).GetPath(12), path.filename())) {
-        state.SkipWithError("answers differ");
+        state.SkipWithError("results differ");
     }
     for ([[maybe_unused]] auto _ : state) {
         benchmark::DoNotOptimize(path.filename());
@@ -123,7 +123,7 @@ void set_one_stat(benchmark::State& state) {
     struct stat status {};
     const bool is_directory = stat(file.c_str(), &status) != 0 || S_ISDIR(status.st_mode);
     if (is_directory != CFilePath(wide(file)).IsDirectory()) {
-        state.SkipWithError("answers differ");
+        state.SkipWithError("results differ");
     }
     for ([[maybe_unused]] auto _ : state) {
         benchmark::DoNotOptimize(stat(file.c_str(), &status));
@@ -138,7 +138,7 @@ void set_std_filesystem(benchmark::State& state) {
     const StandardParts parts{fs::path(file)};
     if (!equal(path.FileNameOnly(), parts.stem) ||
         !equal(path.Extension(), parts.extension.string().substr(1))) {
-        state.SkipWithError("answers differ");
+        state.SkipWithError("results differ");
     }
     for ([[maybe_unused]] auto _ : state) {
         const fs::path whole(file);
@@ -196,7 +196,7 @@ void list_std_filesystem(benchmark::State& state) {
     std::sort(ours.begin(), ours.end());
     std::sort(theirs.begin(), theirs.end());
     if (ours != theirs) {
-        state.SkipWithError("answers differ");
+        state.SkipWithError("results differ");
     }
     for ([[maybe_unused]] auto _ : state) {
         benchmark::DoNotOptimize(list_by_std_filesystem(file));

@@ -50,7 +50,13 @@ TEST_F(File, is_held_alone_and_deleted_on_close) {
     EXPECT_EQ(status.st_mode & 0777U, 0600U);
     EXPECT_EQ(open_error(name, CREATE_NEW), ERROR_FILE_EXISTS);
     EXPECT_EQ(open_error(name, OPEN_EXISTING), ERROR_SHARING_VIOLATION) << "not even in this process";
-    EXPECT_EQ(in_child([&] { std::exit(delete_error(name) == ERROR_SHARING_VIOLATION ? 0 : 1); }), 0);
+    EXPECT_EQ(in_child([&] {
+                  open(here + L"child's", CREATE_NEW);
+                  const DWORD error = delete_error(name);
+                  CloseHandle(file);
+                  std::exit(error == ERROR_SHARING_VIOLATION ? 0 : 1);
+              }),
+              0);
     EXPECT_EQ(folder.names().size(), 1U) << "a child's end leaves its parent's files";
     EXPECT_TRUE(CloseHandle(file) == 1 && CloseHandle(file) == 0 && GetLastError() == ERROR_INVALID_HANDLE);
     EXPECT_TRUE(folder.names().empty() && basalt::test::open_descriptors() == descriptors);

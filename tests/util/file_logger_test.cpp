@@ -43,7 +43,7 @@ struct FileLog : testing::Test {
     static std::string text(int lines) {
         std::string all;
         for (int line = 0; line < lines; ++line) {
-            all += std::to_string(line) + std::string(static_cast<std::size_t>(line % 80), 'x') + "\r\n";
+            all += std::to_string(line) + std::string(static_cast<std::size_t>(line % 400), 'x') + "\r\n";
         }
         return all;
     }

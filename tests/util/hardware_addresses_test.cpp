@@ -105,6 +105,10 @@ TEST(HardwareAddresses, end_when_interfaces_come_and_go_or_the_system_refuses) {
     MACAddressFromMIBTable list;
     s_shown = s_shown_more = 1;
     EXPECT_FALSE(list.Create()) << "the table grows each time";
+    s_shown = 17;
+    EXPECT_TRUE(list.Create()) << "it stops growing";
+    EXPECT_EQ(list.GetMACAddressesAsHexString().size(), 18U) << "all but the wireless ones";
+    list = {};
     s_shown = 4;
     s_shown_more = std::size_t{0} - 1;
     EXPECT_TRUE(list.Create());

@@ -69,13 +69,13 @@ public:
         node.value = std::min(align_4(terminator + 2), node.end);
         const bool is_text = word(offset + 4) == 1;
         node.value_size = word(offset + 2) * (is_text ? 2 : 1);
-        const std::size_t room = node.end - node.value;
-        if (node.value_size > room) {
+        const std::size_t space = node.end - node.value;
+        if (node.value_size > space) {
             // Some tools count a text in bytes; it still ends at its terminator.
             if (!is_text) {
                 return std::nullopt;
             }
-            node.value_size = room & ~std::size_t{1};
+            node.value_size = space & ~std::size_t{1};
         }
         node.children = std::min(align_4(node.value + node.value_size), node.end);
         return node;

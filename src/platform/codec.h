@@ -1,8 +1,8 @@
-// The image codec by its published names: starting it, listing its encoders, and writing a bitmap to a file.
+// The image codec (GDI+): starting it, listing its encoders, and writing a bitmap to a file.
 //
 // The one encoder writes BMP: the bitmap's own depth, uncompressed, bottom row first, the unused byte of
-// 32-bit pixels as 0. Every call but GdiplusStartup and GdiplusShutdown answers GdiplusNotInitialized while
-// no run of the codec is under way. Threads: all calls are thread-safe; one image is used by one at a time.
+// 32-bit pixels as 0. All calls but GdiplusStartup and GdiplusShutdown return GdiplusNotInitialized while the
+// codec does not run. Threads: all calls are thread-safe; one thread at a time uses an image.
 #ifndef BASALT_SRC_PLATFORM_CODEC_H
 #define BASALT_SRC_PLATFORM_CODEC_H
 
@@ -18,7 +18,7 @@ enum Status : int {
     InvalidParameter = 2,
     OutOfMemory = 3,
     InsufficientBuffer = 5,
-    Win32Error = 7,  // the last error says more
+    Win32Error = 7,  // see the last error
     UnsupportedGdiplusVersion = 17,
     GdiplusNotInitialized = 18,
 };
@@ -51,7 +51,7 @@ struct ImageCodecInfo {
     CLSID Clsid;
     GUID FormatID;
     const wchar_t* CodecName;
-    const wchar_t* DllName;  // null: part of the platform
+    const wchar_t* DllName;  // null: built in
     const wchar_t* FormatDescription;
     const wchar_t* FilenameExtension;  // patterns, separated by ;
     const wchar_t* MimeType;
@@ -67,11 +67,11 @@ struct GpImage;
 using GpBitmap = GpImage;
 struct EncoderParameters;
 
-// Begins a run. token takes what ends it, never 0. The version is 1; there is no background thread and no
-// outside codec, so the input's other fields play no part, and output may be null.
+// Begins a run. token takes the argument of GdiplusShutdown, never 0. The version is 1; the input's other
+// fields are ignored, as there is no background thread and no external codec, and output may be null.
 Gdiplus::Status GdiplusStartup(std::uintptr_t* token, const GdiplusStartupInput* input,
                                GdiplusStartupOutput* output);
-// Ends a run; another token does nothing.
+// Ends a run; any other token is ignored.
 void GdiplusShutdown(std::uintptr_t token);
 
 // The number of encoders and the bytes that GdipGetImageEncoders needs for their list.
@@ -79,15 +79,14 @@ Gdiplus::Status GdipGetImageEncodersSize(UINT* count, UINT* size);
 // The list; InsufficientBuffer when the size is too small, InvalidParameter for another count.
 Gdiplus::Status GdipGetImageEncoders(UINT count, UINT size, ImageCodecInfo* encoders);
 
-// An image of a bitmap, which stays the caller's and is read when the image is saved. InvalidParameter for a
-// handle that is no bitmap. palette is null.
+// Makes an image of a bitmap, which stays the caller's and is read when the image is saved. InvalidParameter
+// for a handle that is no bitmap. palette is null.
 Gdiplus::Status GdipCreateBitmapFromHBITMAP(HBITMAP bitmap, void* palette, GpBitmap** image);
-// Writes an image to a file, which is created or cut. Win32Error when that fails: then there is no file, but
-// for one that could not be opened in the first place. OutOfMemory without memory for the name. parameters is
-// null.
+// Writes an image to a file, which is created or truncated. Win32Error when that fails; the file is deleted
+// unless it could not be opened. OutOfMemory when out of memory for the name. parameters is null.
 Gdiplus::Status GdipSaveImageToFile(GpImage* image, const wchar_t* name, const CLSID* encoder,
                                     const EncoderParameters* parameters);
-// Ends an image; the bitmap stays.
+// Deletes an image; the bitmap stays.
 Gdiplus::Status GdipDisposeImage(GpImage* image);
 
 #endif

@@ -23,8 +23,8 @@ namespace {
 constexpr std::uint32_t FILE_HEADER_BYTES = 14;
 constexpr std::uint32_t IMAGE_HEADER_BYTES = 40;
 
-// A file being written, with a buffer of its own: where opening has emptied a file, nothing may be left that
-// can run out of memory. The first error stands; nothing is written after it.
+// A file being written, with a buffer of its own: once opening has truncated a file, nothing may run out of
+// memory. Keeps the first error and writes nothing after it.
 class Writer {
 public:
     explicit Writer(int file) noexcept : m_file(file) {}
@@ -89,10 +89,10 @@ void write_headers(const Surface& surface, Writer& writer) {
     writer.word16(static_cast<std::uint32_t>(surface.depth));
     writer.word32(0);  // uncompressed
     writer.word32(image);
-    writer.word32(0);  // pixels per metre, both ways: not known
+    writer.word32(0);  // pixels per metre, unknown
     writer.word32(0);
     writer.word32(static_cast<std::uint32_t>(table.size()));
-    writer.word32(0);  // all colours matter
+    writer.word32(0);  // all colours are important
     for (const std::uint32_t word : table) {
         writer.word32(word);
     }
@@ -114,7 +114,7 @@ void write_row(const Surface& surface, int y, Writer& writer) {
     });
 }
 
-// Whether the path, no link followed, is that file's; then it is deleted.
+// Deletes the path if it is that file, links not followed; whether it was.
 bool delete_if_it_is(const char* path, const struct stat& file) {
     struct stat there = {};
     if (::lstat(path, &there) != 0 || there.st_dev != file.st_dev || there.st_ino != file.st_ino) {
@@ -124,8 +124,8 @@ bool delete_if_it_is(const char* path, const struct stat& file) {
     return true;
 }
 
-// Deletes the file that was begun, wherever links lead to it, unless another has taken its place meanwhile. A
-// device or pipe that was named is not this layer's to delete.
+// Deletes a regular file that was begun, also behind links, unless another has taken its place. Devices and
+// pipes stay.
 void delete_begun(const char* name, const struct stat& begun) {
     char path[PATH_MAX];
     if (S_ISREG(begun.st_mode) && !delete_if_it_is(name, begun) && ::realpath(name, path) != nullptr) {
@@ -147,7 +147,7 @@ bool write_bmp_file(const Surface& surface, const wchar_t* name) {
         return false;
     }
     struct stat begun = {};
-    (void)::fstat(file, &begun);  // if it cannot be told, the file stays, empty
+    (void)::fstat(file, &begun);  // if it fails, the file stays, empty
     const OutputSignalBlocker blocker;
     Writer writer(file);
     write_headers(surface, writer);
@@ -156,14 +156,15 @@ bool write_bmp_file(const Surface& surface, const wchar_t* name) {
     }
     writer.flush();
     int error = writer.error();
-    // As long as one descriptor is open the file is told from any other; closing one may be what fails.
+    // Closing may be what fails; a second descriptor keeps the inode number from being reused until the
+    // deletion.
     const int last = ::fcntl(file, F_DUPFD_CLOEXEC, STDERR_FILENO + 1);
     if (last >= 0 && ::close(file) != 0 && error == 0) {
         error = errno;
     }
     const int open = last >= 0 ? last : file;
     if (error != 0) {
-        (void)!::ftruncate(open, 0);  // no part of a picture by another name either; no device or pipe minds
+        (void)!::ftruncate(open, 0);  // also for its other names; fails harmlessly on devices and pipes
         delete_begun(file_name.c_str(), begun);
     }
     if (::close(open) != 0 && error == 0 && last < 0) {

@@ -19,7 +19,7 @@ using basalt::platform::object_of;
 constexpr CLSID BMP_ENCODER = {0x557CF400, 0x1A04, 0x11D3, {0x9A, 0x73, 0x00, 0x00, 0xF8, 0x1E, 0xF3, 0x2E}};
 constexpr BYTE BMP_SIGNATURE[] = {'B', 'M'};
 constexpr BYTE BMP_SIGNATURE_MASK[] = {0xFF, 0xFF};
-// Encodes, reads bitmaps in memory, built in.
+// Encoder, reads bitmaps in memory, built in.
 constexpr DWORD ENCODER_FLAGS = 0x00000001 | 0x00000004 | 0x00010000;
 
 constexpr ImageCodecInfo ENCODERS[] = {{BMP_ENCODER, ImageFormatBMP, L"Built-in BMP Codec", nullptr, L"BMP",

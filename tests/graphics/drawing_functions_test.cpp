@@ -98,7 +98,8 @@ TEST(TransparentCopy, goes_by_the_family_of_the_system) {
     };
     const auto picture = [&](int width, int height, int depth) {
         constexpr std::uint32_t INKS[] = {0x4080C0, 0, 0xFFFFFF, 0x563412, 0x4180C0, 0x4080C0};
-        return random_picture(width, height, depth, [&] { return INKS[random() % 6]; });
+        const auto next = [&] { return INKS[random() % 6]; };
+        return random_picture(width, height, depth, next);
     };
     for (const int code : {0, 1, 2, 3, 4, 5, 6, 11}) {
         const StoredOsCode os(code);

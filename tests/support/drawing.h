@@ -47,10 +47,11 @@ struct Picture {
 };
 
 template <class Next>
-Picture random_picture(int width, int height, int depth, Next next) {
+Picture random_picture(int width, int height, int depth, Next& next) {
     Picture picture(width, height, depth);
-    std::generate(picture.pixels.begin(), picture.pixels.end(),
-                  [&] { return static_cast<std::uint32_t>(next()) & all_ones(depth); });
+    for (std::uint32_t& value : picture.pixels) {
+        value = static_cast<std::uint32_t>(next()) & all_ones(depth);
+    }
     return picture;
 }
 
@@ -104,9 +105,9 @@ struct DibHeader {
 // A memory context with a bitmap of its own.
 class Canvas {
 public:
-    explicit Canvas(const Picture& picture) : m_like(picture) {
-        m_bitmap.CreateBitmap(picture.width, picture.height, 1, static_cast<UINT>(picture.depth),
-                              packed(picture, 16).data());
+    explicit Canvas(const Picture& like) : m_like(like) {
+        const auto depth = static_cast<UINT>(like.depth);
+        m_bitmap.CreateBitmap(like.width, like.height, 1, depth, packed(like, 16).data());
         m_dc.CreateCompatibleDC(nullptr);
         select();
     }
@@ -119,15 +120,14 @@ public:
     CBitmap& bitmap() { return m_bitmap; }
     void select() { m_replaced = SelectObject(m_dc, m_bitmap); }
     void deselect() { SelectObject(m_dc, m_replaced); }
-    // The bitmap as it is now.
-    Picture picture() const {
-        Bytes bytes(packed(m_like, 32).size());
-        DibHeader dib(m_like.width, -m_like.height, m_like.depth);
-        if (GetDIBits(m_dc, m_bitmap, 0, static_cast<UINT>(m_like.height), bytes.data(), dib.info(),
-                      DIB_RGB_COLORS) != m_like.height) {
-            std::abort();
-        }
-        return unpacked(bytes.data(), m_like.width, m_like.height, m_like.depth, 32);
+    // The bitmap as it is now, in its own depth or as another reads it.
+    Picture picture() const { return picture(m_like.depth); }
+    Picture picture(int depth) const {
+        Bytes bytes(packed(Picture(m_like.width, m_like.height, depth), 32).size());
+        DibHeader dib(m_like.width, -m_like.height, depth);
+        GetDIBits(m_dc, m_bitmap, 0, static_cast<UINT>(m_like.height), bytes.data(), dib.info(),
+                  DIB_RGB_COLORS);
+        return unpacked(bytes.data(), m_like.width, m_like.height, depth, 32);
     }
 
 private:
@@ -258,11 +258,11 @@ struct Block {
     int x, y, width, height, source_x, source_y;
 };
 
-// A copy, through the destination's transform. Calls open(x, y) for pixels whose middle comes from within
-// `margin` of a pixel's border, which rounding decides; they are left unchanged.
-template <class Open>
-Picture copied(const Picture& to, const Block& b, const Picture& from, DWORD rop, const Settings& s,
-               COLORREF source_background, double margin, const Open& open) {
+// A copy, through the destination's transform. Pixels whose middle comes from within `margin` of a pixel's
+// border, which rounding decides, are taken from `actual`.
+inline Picture copied(const Picture& to, const Block& b, const Picture& from, DWORD rop,
+                      const Settings& s = {}, COLORREF source_background = 0xFFFFFF,
+                      const Picture* actual = nullptr, double margin = 0) {
     const XFORM& t = s.world;
     const double determinant = double{t.eM11} * t.eM22 - double{t.eM12} * t.eM21;
     Picture result = to;
@@ -270,28 +270,22 @@ Picture copied(const Picture& to, const Block& b, const Picture& from, DWORD rop
         const double px = x + 0.5 - t.eDx, py = y + 0.5 - t.eDy;
         const double u = (px * t.eM22 - py * t.eM21) / determinant,
                      v = (py * t.eM11 - px * t.eM12) / determinant;
-        const double i = std::floor(u) - b.x, j = std::floor(v) - b.y;
+        const double i = std::floor(u) - b.x, j = std::floor(v) - b.y, column = b.source_x + i,
+                     row = b.source_y + j;
+        const bool is_in = i >= 0 && j >= 0 && i < b.width && j < b.height;
         if (std::min(std::fabs(u - std::round(u)), std::fabs(v - std::round(v))) < margin) {
-            return open(x, y);
+            value = actual->at(x, y);
+        } else if (is_in && column >= 0 && row >= 0 && column < from.width && row < from.height) {
+            const std::uint32_t pixel = from.at(static_cast<int>(column), static_cast<int>(row)),
+                                before = value;
+            const std::uint32_t source = arriving(pixel, from.depth, to.depth, s, source_background);
+            value = 0;
+            for (int bit = 0; bit < to.depth; ++bit) {  // by the operation's table: source * 2 + destination
+                value |= (rop >> (16 + (source >> bit & 1) * 2 + (before >> bit & 1)) & 1) << bit;
+            }
         }
-        const double column = b.source_x + i, row = b.source_y + j;
-        if (i < 0 || j < 0 || i >= b.width || j >= b.height || column < 0 || row < 0 ||
-            column >= from.width || row >= from.height) {
-            return;
-        }
-        const std::uint32_t source = arriving(from.at(static_cast<int>(column), static_cast<int>(row)),
-                                              from.depth, to.depth, s, source_background);
-        std::uint32_t combined = 0;
-        for (int bit = 0; bit < to.depth; ++bit) {  // by the operation's table: source * 2 + destination
-            combined |= (rop >> (16 + (source >> bit & 1) * 2 + (value >> bit & 1)) & 1) << bit;
-        }
-        value = combined;
     });
     return result;
-}
-inline Picture copied(const Picture& to, const Block& b, const Picture& from, DWORD rop,
-                      const Settings& s = {}, COLORREF source_background = 0xFFFFFF) {
-    return copied(to, b, from, rop, s, source_background, 0, [](int, int) {});
 }
 
 // Where a copy goes, and which part of a source it takes.
@@ -318,46 +312,39 @@ inline Picture keyed(const Picture& to, const Stretch& s, const Picture& from, C
 }
 
 // Whether a region holds the pixels that are not `out`, in its one form: runs of rows, joined where rows are
-// alike.
+// equal.
 inline bool holds(HRGN region, const Picture& picture, std::uint32_t out = 0) {
-    std::vector<RECT> rectangles, above, row;
-    for (int y = 0; y <= picture.height; ++y, row.clear()) {
-        for (int x = 0; y < picture.height && x < picture.width; ++x) {
-            if (picture.at(x, y) == out) {
-                continue;
+    std::vector<CRect> rectangles, above, row;
+    CRect box, its_box(9, 9, 9, 9);
+    bool is_same = true;
+    for (int y = -1; y <= picture.height; ++y, row.clear()) {
+        for (int x = -1; x <= picture.width; ++x) {
+            const bool is_in = picture.has(x, y) && picture.at(x, y) != out;
+            is_same &= PtInRegion(region, x, y) == is_in;
+            if (is_in && (row.empty() || row.back().right != x)) {
+                row.emplace_back(x, y, x, y);
             }
-            if (row.empty() || row.back().right != x) {
-                row.push_back({x, y, x, y + 1});
+            if (is_in) {
+                row.back().right = x + 1;
             }
-            row.back().right = x + 1;
         }
-        const bool is_alike =
-            std::equal(row.begin(), row.end(), above.begin(), above.end(),
-                       [](RECT a, RECT b) { return a.left == b.left && a.right == b.right; });
-        if (!is_alike) {
+        const auto is_below = [](const CRect& a, const CRect& b) {
+            return a.left == b.left && a.right == b.right;
+        };
+        if (!std::equal(row.begin(), row.end(), above.begin(), above.end(), is_below)) {
             rectangles.insert(rectangles.end(), above.begin(), above.end());
             above = row;
         }
-        std::for_each(above.begin(), above.end(), [&](RECT& r) { r.bottom = y + 1; });
+        std::for_each(above.begin(), above.end(), [&](CRect& r) { r.bottom = y + 1, box |= r; });
     }
-    CRect box, its_box(9, 9, 9, 9);
-    for (const RECT& r : rectangles) {
-        box |= r;
-    }
-    Bytes data(GetRegionData(region, 0, nullptr));
-    const DWORD written =
-        GetRegionData(region, static_cast<DWORD>(data.size()), reinterpret_cast<RGNDATA*>(data.data()));
     const std::size_t bytes = rectangles.size() * sizeof(RECT);
     const int kind = rectangles.size() > 1 ? COMPLEXREGION : rectangles.empty() ? NULLREGION : SIMPLEREGION;
-    bool is_same = written == 32 + bytes &&
-                   (bytes == 0 || std::memcmp(&data[32], rectangles.data(), bytes) == 0) &&
-                   GetRgnBox(region, &its_box) == kind && its_box == box;
-    for (int y = -1; y <= picture.height; ++y) {
-        for (int x = -1; x <= picture.width; ++x) {
-            is_same &= (PtInRegion(region, x, y) != 0) == (picture.has(x, y) && picture.at(x, y) != out);
-        }
-    }
-    return is_same;
+    Bytes data(32 + bytes);
+    const auto size = static_cast<DWORD>(data.size());
+    return is_same && GetRegionData(region, 0, nullptr) == size &&
+           GetRegionData(region, size, reinterpret_cast<RGNDATA*>(data.data())) == size &&
+           (bytes == 0 || std::memcmp(&data[32], rectangles.data(), bytes) == 0) &&
+           GetRgnBox(region, &its_box) == kind && its_box == box;
 }
 
 }  // namespace drawing

@@ -183,7 +183,7 @@ TEST(Transform, takes_points_back_and_joins_before_or_after) {
 }
 
 TEST(Transform, of_a_source_may_scale) {
-    Canvas canvas(Picture(4, 1, 32)), source(Picture(2, 1, 32, 5));
+    Canvas canvas(Picture(4, 1, 32)), source(Picture(2, 2, 32, 5));
     SetGraphicsMode(source, GM_ADVANCED);
     SetWorldTransform(source, &TWICE);
     EXPECT_NE(BitBlt(canvas, 1, 0, 4, 1, source, 0, 0, SRCCOPY), 0);

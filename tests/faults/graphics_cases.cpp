@@ -115,10 +115,11 @@ void check_graphics() {
             const auto path = t.folder() / "picture.bmp";
             return std::filesystem::exists(path) ? static_cast<long>(std::filesystem::file_size(path)) : -1;
         };
-        t.attempt([&] { DumpBitmap(canvas.bitmap(), t.path("picture.bmp")); });
+        const CString name = t.path("picture.bmp");
+        t.attempt([&] { DumpBitmap(canvas.bitmap(), name); });
         t.expect(size() == 54 + 60000 || (t.struck() && (size() == -1 || !t.fails_memory())),
                  "whole or missing, unless the system refuses to delete it");
-        DumpBitmap(canvas.bitmap(), t.path("picture.bmp"));
+        DumpBitmap(canvas.bitmap(), name);
         t.expect(size() == 54 + 60000, "whole afterwards");
     });
 }

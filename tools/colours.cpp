@@ -30,7 +30,7 @@ void write_colour(COLORREF colour, Row& row) {
     row.text(text);
 }
 
-Filter make_palette(const CommandLine& line, const Format&) {
+Work make_palette(const CommandLine& line, const Format&) {
     const std::string& what = line.operands[0];
     if (what == "nearest") {
         return [palette = ColorPalette()](Fields& fields, Row& row) {

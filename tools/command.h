@@ -5,6 +5,7 @@
 #include <functional>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "command_line.h"
@@ -47,6 +48,18 @@ enum class Lines {
 /// the line.
 using Filter = std::function<void(Fields&, Row&)>;
 
+/// What a command does: a filter, and for one whose results are those of several lines, what writes them when
+/// a blank line or the input ends these; false for no result. Such a command writes nothing for a line.
+struct Work {
+    template <typename F>
+    Work(F filter) : line(std::move(filter)) {}
+    Work(Filter filter, std::function<bool(Row&)> end_of_group)
+        : line(std::move(filter)), end(std::move(end_of_group)) {}
+
+    Filter line;
+    std::function<bool(Row&)> end;
+};
+
 struct Command {
     const char* name;
     const char* operands;  ///< a word for each, as the usage shows them
@@ -56,7 +69,7 @@ struct Command {
     std::vector<Example> examples;
     /// Takes the operands, as many as there are words, and the options of its own. InputError for those that
     /// cannot be used.
-    Filter (*make)(const CommandLine& line, const Format& format);
+    Work (*make)(const CommandLine& line, const Format& format);
     Lines lines = Lines::MARKED;
     char separator = ' ';  ///< between the fields it writes, unless --csv says otherwise
 };

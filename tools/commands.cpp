@@ -13,10 +13,11 @@
 namespace {
 
 const Command* const COMMANDS[] = {
-    &XYZ2LLH,  &LLH2XYZ, &NEU,        &DIRECT, &INVERSE_GEODESIC,
-    &DISTANCE, &BEARING, &CROSSTRACK, &REDUCE, &OBSERVE,
-    &CONTAINS, &DMS,     &FTIN,       &MJD,    &GPS,
-    &JAVATIME, &HEX,     &UNHEX,      &PATH,   &PALETTE,
+    &XYZ2LLH,  &LLH2XYZ,  &NEU,        &DIRECT, &INVERSE_GEODESIC,
+    &DISTANCE, &BEARING,  &CROSSTRACK, &REDUCE, &OBSERVE,
+    &AREA,     &CONTAINS, &DMS,        &FTIN,   &MJD,
+    &GPS,      &JAVATIME, &HEX,        &UNHEX,  &PATH,
+    &PALETTE,
 };
 
 /// Letters to insert, delete or replace to make one word of the other (V. Levenshtein, 1966).

@@ -49,6 +49,7 @@ extern const Command PALETTE;
 /// @}
 /// @name regions.cpp
 /// @{
+extern const Command AREA;
 extern const Command CONTAINS;
 /// @}
 

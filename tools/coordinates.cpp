@@ -40,7 +40,7 @@ geo_llh geodetic(const geo_vector& xyz) {
     return llh;
 }
 
-Filter make_xyz2llh(const CommandLine&, const Format&) {
+Work make_xyz2llh(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh llh = geodetic(read_xyz(fields));
         row.angle(llh.latitude);
@@ -49,7 +49,7 @@ Filter make_xyz2llh(const CommandLine&, const Format&) {
     };
 }
 
-Filter make_llh2xyz(const CommandLine&, const Format&) {
+Work make_llh2xyz(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_vector xyz = read_llh(fields);
         row.metres(xyz.x);
@@ -58,7 +58,7 @@ Filter make_llh2xyz(const CommandLine&, const Format&) {
     };
 }
 
-Filter make_neu(const CommandLine& line, const Format& format) {
+Work make_neu(const CommandLine& line, const Format& format) {
     const auto read = has_flag(line, GEODETIC) ? read_llh : read_xyz;
     const auto read_origin = [read](Fields& fields) {
         const geo_vector origin = read(fields);

@@ -86,23 +86,28 @@ std::int64_t Fields::whole(const char* what, std::int64_t low, std::int64_t high
     return *value;
 }
 
-double Fields::angle(const char* what) {
-    const double value = number(what);
-    return m_format.degrees ? _degtorad(value) : value;
+double Fields::angle(const char* what, std::string_view wrong_letters) {
+    const std::string_view field = text(what);
+    if (const std::optional<double> value = parse_number(field)) {
+        return m_format.degrees ? _degtorad(*value) : *value;
+    }
+    const std::optional<double> radians = basalt::parse_angle(field);
+    if (!radians || field.find_first_of(wrong_letters) != std::string_view::npos) {
+        fail(what, field);
+    }
+    return *radians;
 }
 
 double Fields::latitude() {
     constexpr double POLE = std::numbers::pi / 2;
     // Rounding to few digits may carry a pole beyond 90 degrees.
     constexpr double SLACK = 1e-7;
-    const std::string_view field = text("a latitude");
-    const std::optional<double> value = parse_number(field);
-    if (!value) {
-        fail("a latitude", field);
-    }
-    const double radians = m_format.degrees ? _degtorad(*value) : *value;
+    const std::size_t begin = m_at;
+    const double radians = angle("a latitude", "EWew");
     if (std::abs(radians) > POLE + SLACK) {
-        throw InputError("latitude " + std::string(field.substr(0, 40)) +
+        m_at = begin;
+        m_ended = false;
+        throw InputError("latitude " + std::string(text("a latitude").substr(0, 40)) +
                          (m_format.degrees ? " is beyond 90 degrees"
                                            : " is beyond pi/2 radians (--degrees reads degrees)"));
     }

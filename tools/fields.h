@@ -22,9 +22,11 @@ public:
     std::int64_t whole(const char* what, std::int64_t low, std::int64_t high);
     /// @name Angles as the options say, in radians
     /// @{
-    double angle(const char* what);
+    /// A number, or degrees, minutes and seconds as basalt::parse_angle() reads them, without the letters
+    /// given.
+    double angle(const char* what, std::string_view wrong_letters = "NSEWnsew");
     double latitude();
-    double longitude() { return angle("a longitude"); }
+    double longitude() { return angle("a longitude", "NSns"); }
     /// @}
 
     /// The rest of the line as one field.

@@ -23,7 +23,7 @@ constexpr std::size_t MOST_REPORTED = 20;
 class Run {
 public:
     Run(const Command& command, const CommandLine& line)
-        : m_command(command), m_format(format_of(command, line)), m_filter(command.make(line, m_format)) {}
+        : m_command(command), m_format(format_of(command, line)), m_work(command.make(line, m_format)) {}
 
     int all(const std::vector<std::string>& files) {
         for (const std::string& path : files) {
@@ -31,13 +31,15 @@ public:
             while (reader.next()) {
                 const std::size_t kept = m_writer.text().size();
                 try {
-                    one(reader);
-                    m_writer.end_of_line();
+                    if (m_work.end ? grouped(reader) : one(reader)) {
+                        m_writer.end_of_line();
+                    }
                 } catch (const InputError& error) {
                     m_writer.text().resize(kept);
                     refuse(path, reader.number(), error.what());
                 }
             }
+            end_group();
         }
         m_writer.finish();
         if (m_refused > MOST_REPORTED) {
@@ -48,20 +50,46 @@ public:
     }
 
 private:
-    void one(const LineReader& reader) {
+    std::string_view line_of(const LineReader& reader) const {
         if (reader.too_long()) {
             throw InputError("the line is longer than " + std::to_string(LineReader::LONGEST) + " bytes");
         }
         std::string_view line = reader.line();
+        if (m_command.lines == Lines::MARKED && reader.number() == 1 && line.substr(0, 3) == "\xEF\xBB\xBF") {
+            line.remove_prefix(3);
+        }
+        return line;
+    }
+
+    /// Whether a line of output was made.
+    bool grouped(const LineReader& reader) {
+        const std::string_view line = line_of(reader);
+        if (is_copied(line)) {
+            return line.find('#') == std::string_view::npos && end_of_group();
+        }
+        Fields fields(line, m_format);
+        Row nothing(m_writer.text(), m_format);
+        m_work.line(fields, nothing);
+        return false;
+    }
+
+    bool end_of_group() {
+        Row row(m_writer.text(), m_format);
+        return m_work.end(row);
+    }
+
+    void end_group() {
+        if (m_work.end && end_of_group()) {
+            m_writer.end_of_line();
+        }
+    }
+
+    bool one(const LineReader& reader) {
+        const std::string_view line = line_of(reader);
         std::string& text = m_writer.text();
-        if (m_command.lines == Lines::MARKED) {
-            if (reader.number() == 1 && line.substr(0, 3) == "\xEF\xBB\xBF") {
-                line.remove_prefix(3);
-            }
-            if (is_copied(line)) {
-                text += line;
-                return;
-            }
+        if (m_command.lines == Lines::MARKED && is_copied(line)) {
+            text += line;
+            return true;
         }
         Fields fields(line, m_format);
         Row row(text, m_format);
@@ -70,10 +98,11 @@ private:
         } else if (m_format.keep) {
             row.text(line);
         }
-        m_filter(fields, row);
+        m_work.line(fields, row);
         if (!fields.ended() && !m_format.keep) {
             row.text(fields.rest());
         }
+        return true;
     }
 
     void refuse(const std::string& path, std::size_t number, const std::string& why) {
@@ -89,7 +118,7 @@ private:
 
     const Command& m_command;
     Format m_format;
-    Filter m_filter;
+    Work m_work;
     BlockWriter m_writer;
     std::size_t m_refused = 0;
 };

@@ -6,7 +6,7 @@
 
 namespace {
 
-Filter make_direct(const CommandLine&, const Format&) {
+Work make_direct(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh start = read_place(fields);
         const double azimuth = fields.angle("an azimuth");
@@ -20,7 +20,7 @@ Filter make_direct(const CommandLine&, const Format&) {
     };
 }
 
-Filter make_inverse(const CommandLine&, const Format&) {
+Work make_inverse(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh from = read_place(fields);
         const basalt::GeodesicInverse line = basalt::geodesic_inverse(from, read_place(fields));
@@ -30,21 +30,21 @@ Filter make_inverse(const CommandLine&, const Format&) {
     };
 }
 
-Filter make_distance(const CommandLine&, const Format&) {
+Work make_distance(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh from = read_place(fields);
         row.metres(geo_vincenty_distance(from, read_place(fields)));
     };
 }
 
-Filter make_bearing(const CommandLine&, const Format&) {
+Work make_bearing(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const geo_llh from = read_place(fields);
         row.bearing(geo_vincenty_bearing(from, read_place(fields)));
     };
 }
 
-Filter make_crosstrack(const CommandLine& line, const Format& format) {
+Work make_crosstrack(const CommandLine& line, const Format& format) {
     const geo_llh a = read_operand(line.operands[0], "A", format, read_place);
     const geo_llh b = read_operand(line.operands[1], "B", format, read_place);
     return

@@ -17,7 +17,8 @@ constexpr const char* LINES =
     "without, and are written with LF. Numbers have a point in every locale.";
 
 constexpr const char* NUMBERS =
-    "Angles are radians, with --degrees degrees; BASALT_ANGLES=degrees in the environment makes degrees the\n"
+    "Angles are radians, with --degrees degrees; 12-30-00.5, 12:30 and 12d30'S are read with either. "
+    "BASALT_ANGLES=degrees in the environment makes degrees the\n"
     "default. Metres and seconds have --precision decimals, degrees five more, radians seven more, seconds "
     "of arc two more, days five more.";
 

@@ -43,7 +43,7 @@ geo_nee read_point(Fields& fields) {
     return point;
 }
 
-Filter make_reduce(const CommandLine& line, const Format& format) {
+Work make_reduce(const CommandLine& line, const Format& format) {
     const geo_nee station = read_operand(line.operands[0], "STATION", format, read_point);
     const double rise = number_of(line, INSTRUMENT).value_or(0) - number_of(line, TARGET).value_or(0);
     const double scale = scale_of(line);
@@ -61,7 +61,7 @@ Filter make_reduce(const CommandLine& line, const Format& format) {
     };
 }
 
-Filter make_observe(const CommandLine& line, const Format& format) {
+Work make_observe(const CommandLine& line, const Format& format) {
     const geo_nee station = read_operand(line.operands[0], "STATION", format, read_point);
     const double instrument = number_of(line, INSTRUMENT).value_or(0);
     const double target = number_of(line, TARGET).value_or(0);

@@ -1,7 +1,10 @@
 // Points and polygons in the plane.
 #include <basalt/geo.h>
 
+#include <cstdint>
+#include <memory>
 #include <optional>
+#include <utility>
 #include <vector>
 
 #include "commands.h"
@@ -33,7 +36,7 @@ std::vector<geo_nee> read_polygon(const std::string& path) {
     return vertices;
 }
 
-Filter make_contains(const CommandLine& line, const Format&) {
+Work make_contains(const CommandLine& line, const Format&) {
     const basalt::PreparedPolygon polygon(read_polygon(line.operands[0]));
     std::optional<double> tolerance;
     if (const std::string* text = value_of(line, TOLERANCE)) {
@@ -49,7 +52,38 @@ Filter make_contains(const CommandLine& line, const Format&) {
     };
 }
 
+Work make_area(const CommandLine&, const Format&) {
+    const auto polygon = std::make_shared<std::vector<geo_nee>>();
+    return {[polygon](Fields& fields, Row&) {
+                const double north = fields.number("a northing in metres");
+                polygon->push_back({north, fields.number("an easting in metres"), 0});
+            },
+            [polygon](Row& row) {
+                const std::vector<geo_nee> vertices = std::move(*polygon);
+                polygon->clear();
+                if (!vertices.empty()) {
+                    row.metres(basalt::polygon_area(vertices.data(), vertices.size()));
+                    row.metres(basalt::polygon_perimeter(vertices.data(), vertices.size()));
+                    row.whole(static_cast<std::int64_t>(vertices.size()));
+                }
+                return !vertices.empty();
+            }};
+}
+
 }  // namespace
+
+const Command AREA = {
+    "area",
+    "",
+    "area and perimeter of polygons in the plane",
+    "Reads a vertex NORTH EAST in metres on each line; a blank line or the input's end completes a polygon.\n"
+    "Writes AREA PERIMETER COUNT for each: square metres, positive where the vertices run clockwise, "
+    "metres,\n"
+    "and the number of vertices. The first vertex need not be repeated.",
+    {CSV, PRECISION},
+    {{"printf '0 0\\n10 0\\n10 20\\n\\n0 0\\n0 5\\n5 5\\n5 0\\n' | basalt area --precision 2",
+      "100.00 52.36 3\n-25.00 20.00 4"}},
+    make_area};
 
 const Command CONTAINS = {
     "contains",

@@ -9,13 +9,13 @@
 
 namespace {
 
-Filter make_hex(const CommandLine&, const Format&) {
+Work make_hex(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         row.text(basalt::StringToHexString(std::string(fields.whole_line())));
     };
 }
 
-Filter make_unhex(const CommandLine&, const Format&) {
+Work make_unhex(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const std::string digits(fields.whole_line());
         if (!basalt::IsHexString(digits)) {
@@ -50,7 +50,7 @@ std::string narrowed(const CString& text) {
     return bytes;
 }
 
-Filter make_path(const CommandLine&, const Format&) {
+Work make_path(const CommandLine&, const Format&) {
     return [](Fields& fields, Row& row) {
         const std::string_view given = fields.whole_line();
         if (given.find('\0') != std::string_view::npos) {

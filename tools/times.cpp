@@ -77,7 +77,7 @@ void read_mjd(Fields& fields, Row& row, int digits) {
     row.text(moment_text(mjd, parse_number(decimals).value_or(0) * SECONDS_OF_DAY, digits));
 }
 
-Filter make_mjd(const CommandLine& line, const Format& format) {
+Work make_mjd(const CommandLine& line, const Format& format) {
     if (has_flag(line, INVERSE)) {
         return [digits = format.precision](Fields& fields, Row& row) { read_mjd(fields, row, digits); };
     }
@@ -110,7 +110,7 @@ void read_gps(Fields& fields, Row& row, int digits) {
     row.text(moment_text(mjd, seconds - days * SECONDS_OF_DAY, digits));
 }
 
-Filter make_gps(const CommandLine& line, const Format& format) {
+Work make_gps(const CommandLine& line, const Format& format) {
     const auto convert = has_flag(line, INVERSE) ? read_gps : write_gps;
     return [convert, digits = format.precision](Fields& fields, Row& row) { convert(fields, row, digits); };
 }
@@ -146,7 +146,7 @@ void read_javatime(Fields& fields, Row& row) {
     row.text(moment_text(mjd, seconds, 3).append("Z"));
 }
 
-Filter make_javatime(const CommandLine& line, const Format&) {
+Work make_javatime(const CommandLine& line, const Format&) {
     return has_flag(line, INVERSE) ? read_javatime : write_javatime;
 }
 

@@ -67,7 +67,7 @@ Sexagesimal rounded(double radians, int digits) {
     return angle;
 }
 
-Filter make_dms(const CommandLine& line, const Format& format) {
+Work make_dms(const CommandLine& line, const Format& format) {
     if (has_flag(line, INVERSE)) {
         return [](Fields& fields, Row& row) {
             const Signed degrees = read_signed(fields, "whole degrees");
@@ -144,7 +144,7 @@ void write_feet(double metres, int denominator, const Format& format, Row& row) 
     row.text(over == 0 ? "0/1" : std::to_string(over).append(1, '/').append(std::to_string(under)));
 }
 
-Filter make_ftin(const CommandLine& line, const Format& format) {
+Work make_ftin(const CommandLine& line, const Format& format) {
     const std::string* given = value_of(line, DENOMINATOR);
     if (has_flag(line, INVERSE)) {
         if (given != nullptr) {

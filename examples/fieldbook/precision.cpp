@@ -1,7 +1,5 @@
 #include "precision.h"
 
-#include <cmath>
-
 #include "angles.h"
 
 namespace {

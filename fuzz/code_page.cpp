@@ -4,7 +4,6 @@
 #include <locale.h>
 
 #include <climits>
-#include <cstring>
 #include <cwchar>
 #include <vector>
 
@@ -12,87 +11,70 @@
 #include "fuzz/input.h"
 #include "src/platform/code_page.h"
 
-namespace {
-
 using namespace basalt::platform;
 using basalt::fuzz::require;
 
-// Both directions by the C library's routines, one character at a time.
-std::wstring widened(std::string_view bytes, locale_t locale) {
-    uselocale(locale);
-    std::wstring wide;
-    for (std::size_t length = 0; !bytes.empty(); bytes.remove_prefix(length)) {
+namespace {
+
+// Against the C library's routines for one character at a time, in the thread's locale.
+void check(const CodePage& code_page, const std::string& bytes, const std::wstring& wide, std::size_t most) {
+    std::wstring widened;
+    for (std::size_t done = 0, length = 0; done < bytes.size(); done += length) {
         std::mbstate_t state{};
         wchar_t ch = 0;
-        length = std::mbrtowc(&ch, bytes.data(), bytes.size(), &state);
-        const bool is_invalid = length > bytes.size() || !is_unicode_scalar(ch);
-        wide += is_invalid ? REPLACEMENT_CHARACTER : ch;
-        length = is_invalid || length == 0 ? 1 : length;
+        length = std::mbrtowc(&ch, &bytes[done], bytes.size() - done, &state);
+        const bool is_valid = length <= bytes.size() && is_unicode_scalar(ch);
+        widened += is_valid ? ch : REPLACEMENT_CHARACTER;
+        length = is_valid && length > 0 ? length : 1;
     }
-    uselocale(LC_GLOBAL_LOCALE);
-    return wide;
-}
-std::string narrowed(const std::wstring& wide, locale_t locale) {
-    uselocale(locale);
-    std::string bytes;
-    for (const wchar_t ch : wide) {
+    require(code_page.widen(bytes) == widened);
+    std::string narrowed;
+    std::string lines;
+    for (bool is_over = false; const wchar_t ch : wide) {
         std::mbstate_t state{};
         char some[MB_LEN_MAX];
-        const std::size_t length = std::wcrtomb(some, ch, &state);
-        const bool is_invalid = length - 1 >= sizeof some || !is_unicode_scalar(ch);
-        bytes += is_invalid ? "?" : std::string(some, length);
+        const std::size_t length = is_unicode_scalar(ch) ? std::wcrtomb(some, ch, &state) : 0;
+        const std::string encoded = length - 1 < sizeof some ? std::string(some, length) : "?";
+        narrowed += encoded;
+        is_over = is_over || ch == L'\0';
+        lines += is_over ? "" : ch == L'\n' ? "\r\n" : encoded;
     }
-    uselocale(LC_GLOBAL_LOCALE);
-    return bytes;
-}
-
-void check(const CodePage& code_page, locale_t locale, const std::string& bytes, const std::wstring& wide,
-           int piece) {
-    require(code_page.widen(bytes) == widened(bytes, locale));
-    const std::string expected = narrowed(wide, locale);
+    std::vector<char> piece(most * MB_LEN_MAX);
     std::string all;
-    std::string lines;
-    std::vector<char> some(static_cast<std::size_t>(piece) * MB_LEN_MAX);
+    std::string all_lines;
     for (std::wstring_view left = wide; !left.empty();) {
-        all.append(some.data(), code_page.narrow_piece(left, static_cast<std::size_t>(piece), some.data()));
+        all.append(piece.data(), code_page.narrow_piece(left, most, piece.data()));
     }
     for (std::wstring_view left = wide; !left.empty();) {
-        lines.append(some.data(),
-                     code_page.narrow_line_piece(left, static_cast<std::size_t>(piece), some.data()));
+        all_lines.append(piece.data(), code_page.narrow_line_piece(left, most, piece.data()));
     }
-    require(all == expected && code_page.narrow(wide) == expected);
-    std::string expected_lines;
-    for (const char byte : narrowed(wide.c_str(), locale)) {
-        expected_lines.append(byte == '\n' ? "\r" : "").append(1, byte);
-    }
-    require(lines == expected_lines);
+    require(all == narrowed && code_page.narrow(wide) == narrowed && all_lines == lines);
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    static const char* const NAMES[] = {"C.UTF-8", "C", "ISO-8859-1", "EUC-KR"};
-    static const CodePage code_pages[] = {CodePage(NAMES[0]), CodePage(NAMES[1]), CodePage(NAMES[2]),
-                                          CodePage(NAMES[3])};
     basalt::fuzz::Input input(data, size);
-    const int n = input.byte();
+    const std::size_t n = input.byte();
     const std::string bytes(input.data(), input.data() + input.left());
     std::wstring wide;
     while (!input.is_over()) {
         wide += static_cast<wchar_t>(input.word() >> (input.byte() % 32));
     }
-    std::vector<wchar_t> to_wide(static_cast<std::size_t>(n) + 1, L'?');
-    _char2tchar(bytes.c_str(), to_wide.data(), n);
-    require(widen({bytes.c_str(), strnlen(bytes.c_str(), static_cast<std::size_t>(n))}) == to_wide.data());
-    std::vector<char> to_narrow(static_cast<std::size_t>(n) + 1, '?');
-    _tchar2char(wide.c_str(), to_narrow.data(), n);
+    std::vector<wchar_t> to_wide(n + 1, L'?');
+    _char2tchar(bytes.c_str(), to_wide.data(), static_cast<int>(n));
+    require(widen(bytes.substr(0, n).c_str()) == to_wide.data());
+    std::vector<char> to_narrow(n + 1, '?');
+    _tchar2char(wide.c_str(), to_narrow.data(), static_cast<int>(n));
     const std::string all = narrow(wide.c_str());
-    require((all.size() <= static_cast<std::size_t>(n) ? all : "") == to_narrow.data());
-    for (std::size_t i = 0; i < std::size(NAMES); ++i) {
-        static locale_t locales[std::size(NAMES)];
-        locales[i] = locales[i] != nullptr ? locales[i] : newlocale(LC_CTYPE_MASK, NAMES[i], nullptr);
-        if (locales[i] != nullptr) {
-            check(code_pages[i], locales[i], bytes, wide, n % 5 + 1);
+    require((all.size() <= n ? all : "") == to_narrow.data());
+    for (const char* const name : {"C.UTF-8", "C", "ISO-8859-1", "EUC-KR"}) {
+        if (const locale_t locale = newlocale(LC_CTYPE_MASK, name, nullptr)) {
+            const CodePage code_page(name);
+            uselocale(locale);
+            check(code_page, bytes, wide, n % 5 + 1);
+            uselocale(LC_GLOBAL_LOCALE);
+            freelocale(locale);
         }
     }
     return 0;

@@ -1,4 +1,4 @@
-// Hexadecimal text: every form of the codec against the plain one, and both directions against each other.
+// Hexadecimal text: every form of the codec against a plain one, and both directions against each other.
 #include <algorithm>
 #include <cctype>
 #include <stdexcept>
@@ -7,71 +7,46 @@
 #include "fuzz/input.h"
 #include "src/util/hex_codec.h"
 
-namespace {
-
 using namespace basalt;
 using namespace basalt::util;
 using basalt::fuzz::require;
 using Bytes = std::vector<unsigned char>;
 
-struct Form {
-    void (*encode)(const unsigned char*, std::size_t, char*);
-    bool (*decode)(const char*, std::size_t, unsigned char*);
-};
-
-const std::vector<Form>& forms() {
-    static const std::vector<Form> all = [] {
-        std::vector<Form> found{{encode_hex, decode_hex}, {encode_hex_portable, decode_hex_portable}};
-#if BASALT_HAS_VECTOR_HEX
-        found.push_back({encode_hex_sse2, decode_hex_sse2});
-        if (can_use_avx2()) {
-            found.push_back({encode_hex_avx2, decode_hex_avx2});
-        }
-#endif
-        return found;
-    }();
-    return all;
-}
-
-bool is_digit(char ch) {
-    return std::isxdigit(static_cast<unsigned char>(ch)) != 0;
-}
-
-// In buffers of exactly the size needed, so that the sanitizer sees accesses beyond.
-void check(const Bytes& bytes, const std::string& pairs, const std::string& text) {
-    const std::vector<char> any(pairs.begin(), pairs.end());
-    for (const auto& [encode, decode] : forms()) {
-        std::vector<char> digits(2 * bytes.size());
-        Bytes back(bytes.size());
-        Bytes some(any.size() / 2);
-        encode(bytes.data(), bytes.size(), digits.data());
-        require(std::equal(digits.begin(), digits.end(), text.begin(), text.end()));
-        require(decode(digits.data(), bytes.size(), back.data()) && back == bytes);
-        require(decode(any.data(), some.size(), some.data()) ==
-                std::all_of(any.begin(), any.end(), is_digit));
-    }
-}
-
-}  // namespace
-
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    const auto are_digits = [](const std::string& text) {
+        return std::all_of(text.begin(), text.end(), [](unsigned char ch) { return std::isxdigit(ch) != 0; });
+    };
+    std::vector<std::pair<decltype(&encode_hex), decltype(&decode_hex)>> forms = {
+        {encode_hex, decode_hex}, {encode_hex_portable, decode_hex_portable}};
+#if BASALT_HAS_VECTOR_HEX
+    forms.emplace_back(&encode_hex_sse2, &decode_hex_sse2);
+    if (can_use_avx2()) {
+        forms.emplace_back(&encode_hex_avx2, &decode_hex_avx2);
+    }
+#endif
     const Bytes bytes(data, data + size);
     const std::string any(data, data + size);
     std::string text;
+    std::string spoilt;  // in upper case, and one character is any
     for (const unsigned char byte : bytes) {
         text.append({"0123456789abcdef"[byte >> 4], "0123456789abcdef"[byte & 15]});
+        spoilt.append({"0123456789ABCDEF"[byte >> 4], "0123456789ABCDEF"[byte & 15]});
     }
-    check(bytes, any.substr(0, size / 2 * 2), text);
-    std::string spoilt = text;  // one character is replaced, the others change their case
-    std::transform(text.begin(), text.end(), spoilt.begin(),
-                   [](char ch) { return static_cast<char>(std::toupper(ch)); });
-    if (size > 0) {
-        spoilt[data[0] * 7 % spoilt.size()] = any[size / 2];
+    spoilt[size > 0 ? data[0] * 7U % spoilt.size() : 0] = size > 0 ? any[size / 2] : '\0';
+    for (const auto& [encode, decode] : forms) {  // in buffers of exactly their size
+        std::vector<char> digits(text.size());
+        encode(bytes.data(), size, digits.data());
+        require(std::equal(digits.begin(), digits.end(), text.begin()));
+        for (const std::string& pairs : {text, spoilt, any.substr(0, size / 2 * 2)}) {
+            const std::vector<char> from(pairs.begin(), pairs.end());
+            Bytes decoded(from.size() / 2);
+            require(decode(from.data(), decoded.size(), decoded.data()) == are_digits(pairs));
+            require(!are_digits(pairs) || decoded == HexStringToVector(pairs));
+        }
     }
-    check(bytes, spoilt, text);
     require(VectorToHexString(bytes) == text && StringToHexString(any) == text &&
             HexStringToVector(text) == bytes);
-    require(IsHexString(any) == std::all_of(any.begin(), any.end(), is_digit));
+    require(IsHexString(any) == are_digits(any));
     const Bytes decoded = HexStringToVector(any);
     const bool has_zero = std::find(decoded.begin(), decoded.end(), 0) != decoded.end();
     try {

@@ -1,6 +1,5 @@
-// Dates and day counts beside std::chrono and the C library; angles and variances beside the formulas written
-// out. Before a row is timed, its answers are compared with the library's. Peers stand behind functions with
-// the library's arguments, as a user's own would.
+// Dates and day counts compared with std::chrono and the C library; angles and variances with plain formulas.
+// Results are compared before anything is timed. Peers are called by functions with the library's arguments.
 #include <benchmark/benchmark.h>
 #include <time.h>
 
@@ -20,7 +19,7 @@ constexpr std::size_t COUNT = 1024;
 constexpr std::chrono::sys_days MJD_0 = std::chrono::year(1858) / std::chrono::November / 17;
 constexpr std::int64_t SECONDS_AT_MJD_0 = -3506716800;  // since 1970
 
-/// Wide fields: results written as four short ones and read as a whole would wait for the store buffer.
+/// Wide fields: a wide read of four short stores would stall.
 struct Date {
     unsigned year, month, day, day_of_week;
     bool operator==(const Date&) const = default;
@@ -70,13 +69,13 @@ auto mjd_by(decltype(_greg2mjd)* convert) {
     };
 }
 
-/// Times `ask` over the inputs, one a turn; `expected` is the library's own answer.
+/// Times `ask` over the inputs; `expected` returns the library's result.
 template <typename Input, typename Ask, typename Expected>
 void run(benchmark::State& state, const std::vector<Input>& inputs, const Ask& ask,
          const Expected& expected) {
     for (const Input& input : inputs) {
         if (!(ask(input) == expected(input))) {
-            state.SkipWithError("answers differ");
+            state.SkipWithError("results differ");
             return;
         }
     }
@@ -164,7 +163,7 @@ Six library_variance(const geo_vector& position) {
     return out;
 }
 
-/// What the work cannot do without: the conversion of the position, its sines and cosines.
+/// The least work: the conversion of the position, its sines and cosines.
 Six position_and_sines(const geo_vector& position) {
     geo_llh llh = {};
     _xyz2llh(&position, &llh, 5e-9);

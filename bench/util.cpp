@@ -1,5 +1,5 @@
-// Hexadecimal text beside table loops, Abseil and Boost, and one log line beside the C library's streams and
-// spdlog. What each wrote is compared before anything is timed.
+// Hexadecimal text compared with table loops, Abseil and Boost, and one log line with the C library's streams
+// and spdlog. Results are compared before anything is timed.
 #include <benchmark/benchmark.h>
 #include <fcntl.h>
 #include <unistd.h>
@@ -18,8 +18,8 @@
 #include <vector>
 
 #include "basalt/util.h"
+#include "bench/plain_hex.h"
 #include "tests/support/failing_new.h"
-#include "tests/util/plain_hex.h"
 
 #ifdef BENCH_HAS_ABSL
 #include <absl/strings/escaping.h>
@@ -51,7 +51,7 @@ template <class Encode>
 void run_encode(benchmark::State& state, const Encode& encode) {
     const Bytes bytes = some_bytes(state);
     if (encode(bytes) != basalt::VectorToHexString(bytes)) {
-        state.SkipWithError("answers differ");
+        state.SkipWithError("results differ");
         return;
     }
     for ([[maybe_unused]] auto _ : state) {
@@ -66,7 +66,7 @@ void run_decode(benchmark::State& state, const Decode& decode) {
     const auto decoded = decode(text);
     if (!std::equal(bytes.begin(), bytes.end(), decoded.begin(), decoded.end(),
                     [](unsigned char a, auto b) { return a == static_cast<unsigned char>(b); })) {
-        state.SkipWithError("answers differ");
+        state.SkipWithError("results differ");
         return;
     }
     for ([[maybe_unused]] auto _ : state) {
@@ -124,7 +124,7 @@ void hex_decode_boost(benchmark::State& state) {
 }
 #endif
 
-// What the result cannot do without: its container, which is made of zeros, and copying what is read into it.
+// The least that a call does: a container of zeros, and copying the input into it.
 template <class Result>
 void zeros_and_copies(benchmark::State& state, std::size_t result_bytes, std::size_t read_bytes) {
     const Bytes from(read_bytes, 1);
@@ -161,7 +161,7 @@ const std::filesystem::path& log_path() {
     return path;
 }
 
-// Whether the file holds the line `count` times, give or take carriage returns.
+// Whether the file holds the line `count` times, with or without carriage returns.
 bool holds_lines(int count) {
     std::ifstream stream(log_path());
     int found = 0;
@@ -171,7 +171,7 @@ bool holds_lines(int count) {
     return found == count;
 }
 
-// Times writing one line with a writer made by `open`, which is called a second time for an empty file.
+// Times writing one line with a writer made by `open`, which is called again for an empty file.
 template <class Open>
 void run(benchmark::State& state, const Open& open) {
     {
@@ -214,7 +214,7 @@ void log_line_basalt(benchmark::State& state) {
     });
 }
 
-// What a line cannot do without: its place in a buffer, and its share of the call that writes a full one.
+// The least work per line: a copy into a buffer and its share of the call that writes a full one.
 class BareLog {
 public:
     explicit BareLog(const std::filesystem::path& path)

@@ -50,7 +50,7 @@ public:
     void close() noexcept;
 
 private:
-    char* encode(std::wstring_view text, char* bytes) const;
+    char* encode(std::wstring_view& text, std::size_t most, char* bytes, bool as_lines) const;
 
     locale_t m_locale;  // null: closed, or no UTF-8 locale is installed; ASCII classes
     bool m_is_utf8;

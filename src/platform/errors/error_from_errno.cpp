@@ -2,74 +2,63 @@
 
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <iterator>
 #include <string>
 
 #include "basalt/platform/error.h"
 
 namespace basalt::platform {
 
+namespace {
+
+struct Row {
+    int number;
+    DWORD code;
+};
+
+constexpr Row ROWS[] = {
+    {0, ERROR_SUCCESS},
+    {ENOENT, ERROR_FILE_NOT_FOUND},
+    {ENOTDIR, ERROR_PATH_NOT_FOUND},
+    {EMFILE, ERROR_TOO_MANY_OPEN_FILES},
+    {ENFILE, ERROR_TOO_MANY_OPEN_FILES},
+    {EACCES, ERROR_ACCESS_DENIED},
+    {EPERM, ERROR_ACCESS_DENIED},
+    {EISDIR, ERROR_ACCESS_DENIED},
+    {EBADF, ERROR_INVALID_HANDLE},
+    {ENOMEM, ERROR_NOT_ENOUGH_MEMORY},
+    {EROFS, ERROR_WRITE_PROTECT},
+    {ETXTBSY, ERROR_SHARING_VIOLATION},
+    {ENOSYS, ERROR_NOT_SUPPORTED},
+    {EOPNOTSUPP, ERROR_NOT_SUPPORTED},
+    {ENODEV, ERROR_DEV_NOT_EXIST},
+    {ENXIO, ERROR_DEV_NOT_EXIST},
+    {EEXIST, ERROR_FILE_EXISTS},
+    {EINVAL, ERROR_INVALID_PARAMETER},
+    {ENOSPC, ERROR_DISK_FULL},
+    {EDQUOT, ERROR_DISK_FULL},
+    {EBUSY, ERROR_BUSY},
+    {ENAMETOOLONG, ERROR_FILENAME_EXCED_RANGE},
+    {EFBIG, ERROR_FILE_TOO_LARGE},
+    {EOVERFLOW, ERROR_ARITHMETIC_OVERFLOW},
+    {EINTR, ERROR_OPERATION_ABORTED},
+    {EFAULT, ERROR_NOACCESS},
+    {EILSEQ, ERROR_NO_UNICODE_TRANSLATION},
+    {EIO, ERROR_IO_DEVICE},
+    {EAGAIN, ERROR_NO_SYSTEM_RESOURCES},
+    {ETIMEDOUT, ERROR_TIMEOUT},
+    {ELOOP, ERROR_CANT_RESOLVE_FILENAME},
+};
+
+}  // namespace
+
 DWORD error_from_errno(int number) {
-    switch (number) {
-        case 0:
-            return ERROR_SUCCESS;
-        case ENOENT:
-            return ERROR_FILE_NOT_FOUND;
-        case ENOTDIR:
-            return ERROR_PATH_NOT_FOUND;
-        case EMFILE:
-        case ENFILE:
-            return ERROR_TOO_MANY_OPEN_FILES;
-        case EACCES:
-        case EPERM:
-        case EISDIR:
-            return ERROR_ACCESS_DENIED;
-        case EBADF:
-            return ERROR_INVALID_HANDLE;
-        case ENOMEM:
-            return ERROR_NOT_ENOUGH_MEMORY;
-        case EROFS:
-            return ERROR_WRITE_PROTECT;
-        case ETXTBSY:
-            return ERROR_SHARING_VIOLATION;
-        case ENOSYS:
-        case EOPNOTSUPP:
-            return ERROR_NOT_SUPPORTED;
-        case ENODEV:
-        case ENXIO:
-            return ERROR_DEV_NOT_EXIST;
-        case EEXIST:
-            return ERROR_FILE_EXISTS;
-        case EINVAL:
-            return ERROR_INVALID_PARAMETER;
-        case ENOSPC:
-        case EDQUOT:
-            return ERROR_DISK_FULL;
-        case EBUSY:
-            return ERROR_BUSY;
-        case ENAMETOOLONG:
-            return ERROR_FILENAME_EXCED_RANGE;
-        case EFBIG:
-            return ERROR_FILE_TOO_LARGE;
-        case EOVERFLOW:
-            return ERROR_ARITHMETIC_OVERFLOW;
-        case EINTR:
-            return ERROR_OPERATION_ABORTED;
-        case EFAULT:
-            return ERROR_NOACCESS;
-        case EILSEQ:
-            return ERROR_NO_UNICODE_TRANSLATION;
-        case EIO:
-            return ERROR_IO_DEVICE;
-        case EAGAIN:
-            return ERROR_NO_SYSTEM_RESOURCES;
-        case ETIMEDOUT:
-            return ERROR_TIMEOUT;
-        case ELOOP:
-            return ERROR_CANT_RESOLVE_FILENAME;
-        default:
-            return ERROR_GEN_FAILURE;
-    }
+    const auto* const row = std::find_if(std::begin(ROWS), std::end(ROWS), [number](const Row& candidate) {
+        return candidate.number == number;
+    });
+    return row != std::end(ROWS) ? row->code : ERROR_GEN_FAILURE;
 }
 
 void set_last_error_from_errno() {

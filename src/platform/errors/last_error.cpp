@@ -12,15 +12,13 @@ using basalt::platform::DebugOutputHandler;
 
 namespace {
 
-// Plain data: a thread_local with a destructor would keep the library from being unloaded. In the threads'
-// first memory: what is asked for at its first use, by a thread that reports to be out of memory, ends the
-// process.
+// No destructor, which would prevent unloading, and the initial-exec model: otherwise a thread's first use
+// allocates, and being out of memory then ends the process.
 [[gnu::tls_model("initial-exec")]] constinit thread_local DWORD last_error = ERROR_SUCCESS;
 
 constinit std::atomic<DebugOutputHandler> debug_output_handler = nullptr;
 
-// Through a buffer on the stack, since the failure being reported may be a lack of memory, and straight to
-// the descriptor: the host's stdio buffers, their locks and their orientation stay untouched.
+// Uses no heap, since the report may be that memory ran out, and not the host's stdio streams.
 void write_as_utf8(const wchar_t* text) {
     std::array<char, 1024> buffer;
     std::size_t used = 0;

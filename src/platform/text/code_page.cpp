@@ -143,35 +143,30 @@ std::wstring CodePage::widen_name(std::string_view name) const {
     return result;
 }
 
-char* CodePage::encode(std::wstring_view text, char* bytes) const {
+char* CodePage::encode(std::wstring_view& text, std::size_t most, char* bytes, bool as_lines) const {
+    std::wstring_view piece = text.substr(0, most);
+    const std::size_t size = piece.size();
     if (m_is_utf8) {
-        return write_utf8(text, bytes);
+        bytes = write_utf8(piece, bytes, as_lines);
+    } else {
+        const ScopedLocale scope(m_locale);
+        for (; !piece.empty() && !(as_lines && piece.front() == L'\0'); piece.remove_prefix(1)) {
+            if (as_lines && piece.front() == L'\n') {
+                *bytes++ = '\r';
+            }
+            bytes += encode_by_locale(piece.front(), bytes);
+        }
     }
-    const ScopedLocale scope(m_locale);
-    for (const wchar_t ch : text) {
-        bytes += encode_by_locale(ch, bytes);
-    }
+    text.remove_prefix(piece.empty() ? size : text.size());
     return bytes;
 }
 
 char* CodePage::narrow_piece(std::wstring_view& text, std::size_t most, char* bytes) const {
-    const std::wstring_view piece = text.substr(0, most);
-    text.remove_prefix(piece.size());
-    return encode(piece, bytes);
+    return encode(text, most, bytes, false);
 }
 
 char* CodePage::narrow_line_piece(std::wstring_view& text, std::size_t most, char* bytes) const {
-    std::wstring_view piece = text.substr(0, most);
-    const std::size_t zero = piece.find(L'\0');
-    piece = piece.substr(0, zero);
-    text.remove_prefix(zero != std::wstring_view::npos ? text.size() : piece.size());
-    for (std::size_t line_end; (line_end = piece.find(L'\n')) != std::wstring_view::npos;
-         piece.remove_prefix(line_end + 1)) {
-        bytes = encode(piece.substr(0, line_end), bytes);
-        *bytes++ = '\r';
-        *bytes++ = '\n';
-    }
-    return encode(piece, bytes);
+    return encode(text, most, bytes, true);
 }
 
 std::string CodePage::narrow(std::wstring_view text) const {

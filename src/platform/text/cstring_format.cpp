@@ -56,10 +56,12 @@ public:
 
     std::wstring run() {
         while (*m_format != L'\0') {
-            const std::size_t literal = std::wcscspn(m_format, L"%");
-            m_result.append(m_format, literal);
-            m_format += literal;
-            if (*m_format == L'%') {
+            const wchar_t* const percent = std::wcschr(m_format, L'%');
+            const wchar_t* const literal_end =
+                percent != nullptr ? percent : m_format + std::wcslen(m_format);
+            m_result.append(m_format, literal_end);
+            m_format = literal_end;
+            if (percent != nullptr) {
                 const wchar_t* const start = m_format++;
                 const Conversion conversion = read_conversion();
                 if (conversion.type == L'%') {
@@ -190,7 +192,8 @@ private:
 
     template <class Number>
     void write_number(const Conversion& conversion, const char* size, wchar_t type, Number number) {
-        const std::string format = '%' + conversion.flags + "*.*" + size + static_cast<char>(type);
+        std::string format = "%";
+        format.append(conversion.flags).append("*.*").append(size).append(1, static_cast<char>(type));
         const int precision = std::min(conversion.precision, MAX_FIELD);
         const auto print = [&](char* text, std::size_t capacity) {
             const int length =

@@ -121,17 +121,20 @@ std::size_t encode_utf8(wchar_t ch, char* bytes) {
     return length;
 }
 
-char* write_utf8(std::wstring_view text, char* bytes) {
-    while (!text.empty()) {
+char* write_utf8(std::wstring_view& text, char* bytes, bool as_lines) {
+    for (;;) {
         const std::size_t printing = write_printing(text, bytes);
         bytes += printing;
         text.remove_prefix(printing);
-        if (!text.empty()) {
-            bytes += encode_utf8(text.front(), bytes);
-            text.remove_prefix(1);
+        if (text.empty() || (as_lines && text.front() == L'\0')) {
+            return bytes;
         }
+        if (as_lines && text.front() == L'\n') {
+            *bytes++ = '\r';
+        }
+        bytes += encode_utf8(text.front(), bytes);
+        text.remove_prefix(1);
     }
-    return bytes;
 }
 
 std::string utf8_from_wide(std::wstring_view text) {
@@ -139,8 +142,10 @@ std::string utf8_from_wide(std::wstring_view text) {
     char bytes[PIECE * MAX_UTF8_BYTES];
     std::string result;
     result.reserve(text.size());
-    for (; !text.empty(); text.remove_prefix(std::min(PIECE, text.size()))) {
-        result.append(bytes, write_utf8(text.substr(0, PIECE), bytes));
+    while (!text.empty()) {
+        std::wstring_view piece = text.substr(0, PIECE);
+        text.remove_prefix(piece.size());
+        result.append(bytes, write_utf8(piece, bytes));
     }
     return result;
 }

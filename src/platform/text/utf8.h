@@ -26,9 +26,9 @@ std::size_t write_printing(std::wstring_view text, char* bytes);
 // Writes one character ('?' for an invalid one) and returns the number of bytes, 1 to MAX_UTF8_BYTES.
 std::size_t encode_utf8(wchar_t ch, char* bytes);
 
-// Writes a text, zeros included, into a buffer of MAX_UTF8_BYTES per character; returns the end of the
-// output.
-char* write_utf8(std::wstring_view text, char* bytes);
+// Removes a text from its front and writes it into a buffer of MAX_UTF8_BYTES per character; returns the end
+// of the output. As lines: with CR LF for each LF, and up to the first zero.
+char* write_utf8(std::wstring_view& text, char* bytes, bool as_lines = false);
 std::string utf8_from_wide(std::wstring_view text);
 
 // Decodes bytes, zeros included, with REPLACEMENT_CHARACTER for each byte that is not part of a character:

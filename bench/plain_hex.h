@@ -1,7 +1,6 @@
-// Hexadecimal text by a plain table loop: the model the library is held against, and what it is measured
-// beside.
-#ifndef BASALT_TESTS_UTIL_PLAIN_HEX_H
-#define BASALT_TESTS_UTIL_PLAIN_HEX_H
+// Hexadecimal text by a plain table loop, for comparison in the benchmark.
+#ifndef BASALT_BENCH_PLAIN_HEX_H
+#define BASALT_BENCH_PLAIN_HEX_H
 
 #include <array>
 #include <string>

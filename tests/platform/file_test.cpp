@@ -50,13 +50,12 @@ TEST_F(File, is_held_alone_and_deleted_on_close) {
     EXPECT_EQ(status.st_mode & 0777U, 0600U);
     EXPECT_EQ(open_error(name, CREATE_NEW), ERROR_FILE_EXISTS);
     EXPECT_EQ(open_error(name, OPEN_EXISTING), ERROR_SHARING_VIOLATION) << "not even in this process";
-    EXPECT_EQ(in_child([&] {
-                  open(here + L"child's", CREATE_NEW);
-                  const DWORD error = delete_error(name);
-                  CloseHandle(file);
-                  std::exit(error == ERROR_SHARING_VIOLATION ? 0 : 1);
-              }),
-              0);
+    in_child([&] {
+        open(here + L"child's", CREATE_NEW);
+        const DWORD error = delete_error(name);
+        CloseHandle(file);
+        std::exit(error == ERROR_SHARING_VIOLATION ? 0 : 1);
+    });
     EXPECT_EQ(folder.names().size(), 1U) << "a child's end leaves its parent's files";
     EXPECT_TRUE(CloseHandle(file) == 1 && CloseHandle(file) == 0 && GetLastError() == ERROR_INVALID_HANDLE);
     EXPECT_TRUE(folder.names().empty() && basalt::test::open_descriptors() == descriptors);
@@ -115,10 +114,12 @@ TEST_F(File, deletes_what_it_opened_and_nothing_else_unless_killed) {
     EXPECT_EQ(CloseHandle(replaced), 1);
     EXPECT_EQ(delete_error(here + L"replaced"), 0U);
     for (const bool is_killed : {false, true}) {
-        in_child([&] {
-            open(here + L"left", CREATE_NEW);
-            is_killed ? static_cast<void>(raise(SIGKILL)) : std::exit(0);
-        });
+        in_child(
+            [&] {
+                open(here + L"left", CREATE_NEW);
+                is_killed ? static_cast<void>(raise(SIGKILL)) : std::exit(0);
+            },
+            is_killed ? SIGKILL : 0);
         EXPECT_EQ(folder.names(), is_killed ? Names{"left"} : Names{});
     }
 }
@@ -170,19 +171,18 @@ TEST_F(File, a_new_temporary_one_is_reopened_or_nothing) {
 
 // Nothing that the library opens gets the number of standard input, output or error.
 TEST_F(File, descriptors_are_above_standard_error) {
-    EXPECT_EQ(in_child([&] {
-                  for (const int standard : {0, 1, 2}) {
-                      close(standard);
-                  }
-                  WIN32_FIND_DATAW entry;
-                  EXPECT_NE(open(here + L"file", CREATE_NEW), INVALID_HANDLE_VALUE);
-                  EXPECT_NE(FindFirstFileW((here + L"*").c_str(), &entry), INVALID_HANDLE_VALUE);
-                  const vex_util::FileLogger log((folder / "log").c_str());
-                  OutputDebugStringW(L"lost");
-                  EXPECT_EQ(folder.names().size(), 2U);
-                  EXPECT_TRUE(fcntl(0, F_GETFD) == -1 && fcntl(1, F_GETFD) == -1 && fcntl(2, F_GETFD) == -1);
-              }),
-              0);
+    in_child([&] {
+        for (const int standard : {0, 1, 2}) {
+            close(standard);
+        }
+        WIN32_FIND_DATAW entry;
+        EXPECT_NE(open(here + L"file", CREATE_NEW), INVALID_HANDLE_VALUE);
+        EXPECT_NE(FindFirstFileW((here + L"*").c_str(), &entry), INVALID_HANDLE_VALUE);
+        const vex_util::FileLogger log((folder / "log").c_str());
+        OutputDebugStringW(L"lost");
+        EXPECT_EQ(folder.names().size(), 2U);
+        EXPECT_TRUE(fcntl(0, F_GETFD) == -1 && fcntl(1, F_GETFD) == -1 && fcntl(2, F_GETFD) == -1);
+    });
 }
 
 // Standard error may be a full pipe, one without a reader, or a file at the limit on sizes.
@@ -193,25 +193,24 @@ TEST_F(File, reports_raise_no_signal_and_do_not_block) {
             OutputDebugStringW(std::wstring(100, L'x').c_str());
         }
     };
-    EXPECT_EQ(in_child([&] {
-                  int ends[2];
-                  ASSERT_EQ(pipe(ends), 0);
-                  report(ends[1]);
-                  close(ends[0]);
-                  report(ends[1]);
-                  sigset_t signals;
-                  sigemptyset(&signals);
-                  sigaddset(&signals, SIGPIPE);
-                  sigprocmask(SIG_BLOCK, &signals, nullptr);
-                  raise(SIGPIPE);
-                  report(ends[1]);
-                  sigpending(&signals);
-                  EXPECT_EQ(sigismember(&signals, SIGPIPE), 1) << "pending before, so still pending";
-                  const rlimit limit = {1000, RLIM_INFINITY};
-                  setrlimit(RLIMIT_FSIZE, &limit);
-                  report(::open((folder / "errors").c_str(), O_CREAT | O_WRONLY, 0600));
-              }),
-              0);
+    in_child([&] {
+        int ends[2];
+        ASSERT_EQ(pipe(ends), 0);
+        report(ends[1]);
+        close(ends[0]);
+        report(ends[1]);
+        sigset_t signals;
+        sigemptyset(&signals);
+        sigaddset(&signals, SIGPIPE);
+        sigprocmask(SIG_BLOCK, &signals, nullptr);
+        raise(SIGPIPE);
+        report(ends[1]);
+        sigpending(&signals);
+        EXPECT_EQ(sigismember(&signals, SIGPIPE), 1) << "pending before, so still pending";
+        const rlimit limit = {1000, RLIM_INFINITY};
+        setrlimit(RLIMIT_FSIZE, &limit);
+        report(::open((folder / "errors").c_str(), O_CREAT | O_WRONLY, 0600));
+    });
     EXPECT_EQ(folder.read("errors"), std::string(1000, 'x'));
 }
 

@@ -10,9 +10,9 @@
 
 namespace basalt::test {
 
-// Runs `work` in a forked child, which has ten seconds: its wait status, 0 unless it failed, died or hung.
+// Runs `work` in a forked child, which has ten seconds; its wait status is 0 unless it failed, died or hung.
 template <class Work>
-int in_child(Work work) {
+void in_child(Work work, int expected_status = 0) {
     const pid_t child = fork();
     if (child == 0) {
         alarm(10);
@@ -21,7 +21,7 @@ int in_child(Work work) {
     }
     int status = -1;
     waitpid(child, &status, 0);
-    return status;
+    EXPECT_EQ(status, expected_status) << "of the child";
 }
 
 }  // namespace basalt::test

@@ -117,30 +117,29 @@ TEST_F(FileLog, texts_of_every_length_arrive_whole_and_allocate_nothing) {
 }
 
 TEST_F(FileLog, keeps_whole_texts_however_its_process_ends) {
-    EXPECT_EQ(in_child([&] {
-                  FileLogger log(file.c_str());
-                  write_lines(log, 1000);
-                  raise(SIGKILL);
-              }),
-              SIGKILL);
+    in_child(
+        [&] {
+            FileLogger log(file.c_str());
+            write_lines(log, 1000);
+            raise(SIGKILL);
+        },
+        SIGKILL);
     EXPECT_EQ(contents(), text(1000).substr(0, contents().size()));
     EXPECT_TRUE(contents().size() > 30'000 && contents().back() == '\n') << "at most a buffer is lost";
-    EXPECT_EQ(in_child([&] {
-                  auto* const left = new FileLogger(file.c_str());
-                  FileLogger oldest, midst((folder / "midst").c_str()), newest((folder / "newest").c_str());
-                  midst.Close();
-                  left->Write(L"parent;");
-                  EXPECT_EQ(in_child([] { std::exit(0); }), 0);
-                  EXPECT_EQ(contents(), "") << "a child leaves its parent's texts alone";
-                  EXPECT_EQ(in_child([&] {
-                                left->Write(L"child;");
-                                std::exit(0);
-                            }),
-                            0);
-                  EXPECT_EQ(contents(), "parent;child;");
-                  std::exit(HasFailure() ? 1 : 0);
-              }),
-              0);
+    in_child([&] {
+        auto* const left = new FileLogger(file.c_str());
+        FileLogger oldest, midst((folder / "midst").c_str()), newest((folder / "newest").c_str());
+        midst.Close();
+        left->Write(L"parent;");
+        in_child([] { std::exit(0); });
+        EXPECT_EQ(contents(), "") << "a child leaves its parent's texts alone";
+        in_child([&] {
+            left->Write(L"child;");
+            std::exit(0);
+        });
+        EXPECT_EQ(contents(), "parent;child;");
+        std::exit(HasFailure() ? 1 : 0);
+    });
     EXPECT_EQ(contents(), "parent;child;parent;");
 }
 
@@ -154,12 +153,11 @@ TEST_F(FileLog, children_forked_while_a_thread_writes_neither_hang_nor_write_twi
         }
     });
     for (int round = 0; round < 50; ++round) {
-        ASSERT_EQ(in_child([&] {
-                      log.Close();
-                      other.Write(L"child\n");
-                      other.Close();
-                  }),
-                  0);
+        in_child([&] {
+            log.Close();
+            other.Write(L"child\n");
+            other.Close();
+        });
     }
     over = true;
     writing.join();
@@ -175,25 +173,23 @@ TEST_F(FileLog, drops_what_the_system_does_not_take) {
     FileLogger log("/dev/full");
     write_lines(log, 1000);
     ASSERT_EQ(mkfifo((folder / "pipe").c_str(), 0600), 0);
-    EXPECT_EQ(in_child([&] {
-                  const int reader = open((folder / "pipe").c_str(), O_RDONLY | O_NONBLOCK);
-                  log.Open((folder / "pipe").c_str());
-                  write_lines(log, 3000);  // more than a pipe holds
-                  char start[1000];
-                  ASSERT_EQ(read(reader, start, sizeof start), 1000);
-                  EXPECT_EQ(std::string(start, 1000), text(100).substr(0, 1000));
-                  close(reader);
-                  write_lines(log, 1000);
-              }),
-              0);
-    EXPECT_EQ(in_child([&] {
-                  const rlimit limit = {20'000, RLIM_INFINITY};
-                  setrlimit(RLIMIT_FSIZE, &limit);
-                  log.Open(file.c_str());
-                  write_lines(log, 1000);
-                  log.Close();
-              }),
-              0);
+    in_child([&] {
+        const int reader = open((folder / "pipe").c_str(), O_RDONLY | O_NONBLOCK);
+        log.Open((folder / "pipe").c_str());
+        write_lines(log, 3000);  // more than a pipe holds
+        char start[1000];
+        ASSERT_EQ(read(reader, start, sizeof start), 1000);
+        EXPECT_EQ(std::string(start, 1000), text(100).substr(0, 1000));
+        close(reader);
+        write_lines(log, 1000);
+    });
+    in_child([&] {
+        const rlimit limit = {20'000, RLIM_INFINITY};
+        setrlimit(RLIMIT_FSIZE, &limit);
+        log.Open(file.c_str());
+        write_lines(log, 1000);
+        log.Close();
+    });
     EXPECT_EQ(contents(), text(1000).substr(0, 20'000));
 }
 

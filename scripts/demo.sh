@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Builds the library and an example program, and runs it in the caller's folder, on its sample unless told otherwise.
+# Builds the library and an example program, and runs it in the caller's folder, on its sample by default.
 # Usage: scripts/demo.sh [workarea options]      e.g. --grade 620 --view -84.3,36.5,-84.2,36.6
 #        scripts/demo.sh fieldbook [options]     e.g. --wgs84 K1,47.5,8.5,450 --interval 10
 #        scripts/demo.sh scratch [options]       e.g. --points 1000000 --cells cells.csv

@@ -1,4 +1,4 @@
-// A host as users write it: stores, selects and measures, and tells what it linked.
+// A host as users write it: stores, selects, measures, and prints the version it linked.
 #include <basalt/basalt.h>
 
 #include <cstdio>

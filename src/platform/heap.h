@@ -6,7 +6,8 @@
 //
 // All calls: flags and options must be 0, else ERROR_INVALID_PARAMETER. A null handle, or one that is plainly
 // no heap, is ERROR_INVALID_HANDLE; a handle must not be used after HeapDestroy. The last error is set on
-// failure only. Threads: thread-safe; HeapDestroy must be the last call on its heap.
+// failure only. Threads: thread-safe, and threads that allocate from a heap without a limit do not wait for
+// each other; HeapDestroy must be the last call on its heap.
 #ifndef BASALT_SRC_PLATFORM_HEAP_H
 #define BASALT_SRC_PLATFORM_HEAP_H
 

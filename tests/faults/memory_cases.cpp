@@ -71,7 +71,7 @@ struct ManyRegionsRow {
     vlWinHeapAllocator heap{0};
     void* block = nullptr;
     ManyRegionsRow() {
-        for (int i = 0; i < 40; ++i) {  // as many as the record holds
+        for (int i = 0; i < 32; ++i) {  // as many as the record holds
             heap.Alloc(2 << 20);
         }
     }

@@ -23,7 +23,25 @@ struct HeapReport {
 // The friend of the heap's classes.
 class HeapInspection {
 public:
-    explicit HeapInspection(PrivateHeap& heap) : m_heap(heap) {
+    static HeapReport inspect(PrivateHeap& heap) {
+        HeapReport report = HeapInspection(heap.m_first).m_report;
+        for (const std::atomic<HeapPart*>& further : heap.m_further) {
+            if (HeapPart* const part = further.load()) {
+                const HeapReport of_part = HeapInspection(*part).m_report;
+                report.fault = report.fault != nullptr ? report.fault : of_part.fault;
+                report.regions += of_part.regions;
+                report.mapped += of_part.mapped;
+                report.live_blocks += of_part.live_blocks;
+                report.free_blocks += of_part.free_blocks;
+                report.quick_blocks += of_part.quick_blocks;
+                report.largest_free = std::max(report.largest_free, of_part.largest_free);
+            }
+        }
+        return report;
+    }
+
+private:
+    explicit HeapInspection(HeapPart& heap) : m_heap(heap) {
         const std::lock_guard guard(heap.m_lock);
         const std::byte* end_before = nullptr;
         for (const Region& region : heap.m_regions.all()) {
@@ -41,9 +59,7 @@ public:
         expect(m_live_shared == heap.m_live_shared, "live bytes are counted");
         expect(m_idle == heap.m_idle, "bytes of idle regions are counted");
     }
-    const HeapReport& report() const { return m_report; }
 
-private:
     void expect(bool holds, const char* invariant) {
         m_report.fault = holds || m_report.fault != nullptr ? m_report.fault : invariant;
     }
@@ -125,14 +141,14 @@ private:
         expect(bytes == lists.bytes() && listed == m_report.quick_blocks, "quick lists are counted");
     }
 
-    PrivateHeap& m_heap;
+    HeapPart& m_heap;
     HeapReport m_report;
     std::size_t m_shared = 0, m_live_shared = 0, m_idle = 0;  // bytes
 };
 
 // Takes the heap's lock; time grows with the number of blocks. The handle must be valid.
 inline HeapReport inspect_heap(void* handle) {
-    return HeapInspection(*static_cast<PrivateHeap*>(handle)).report();
+    return HeapInspection::inspect(*static_cast<PrivateHeap*>(handle));
 }
 
 }  // namespace basalt::platform

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <cstring>
-#include <mutex>
 #include <new>
 
 #include "src/platform/pages.h"
@@ -12,42 +11,20 @@ namespace {
 
 constexpr std::uint64_t MAGIC = 0x6261'7361'6c74'4850;
 
-// Smaller blocks share regions, and freeing makes no system call; larger ones are unmapped at once.
-constexpr std::size_t SINGLE_FROM = std::size_t{1} << 20;
-// Heaps with a maximum up to this have one region of that size, so that none of it is lost between regions.
-constexpr std::size_t ONE_REGION_UP_TO = std::size_t{64} << 20;
+// Regions without a live block are kept up to this: the page faults of new ones cost more than all the rest
+// of an allocation.
+constexpr std::size_t MOST_IDLE = std::size_t{32} << 20;
+constexpr std::size_t MOST_IDLE_FURTHER = std::size_t{2} << 20;  // in each further part
 
-// The quick lists hold up to this: a bound on the time that one call spends on emptying them.
-constexpr std::size_t MOST_QUICK = std::size_t{256} << 10;
-
-constexpr std::size_t ATTEMPTS_BEFORE_GROWTH = 8;
-constexpr std::size_t ALL = ~std::size_t{0};
-
-// Every block that can be formed in one region must have a list.
-static_assert(ONE_REGION_UP_TO < FreeLists::SIZE_LIMIT);
 static_assert(sizeof(PrivateHeap) <= SMALLEST_PAGE, "an unused heap costs one page");
-
-std::size_t record_bytes() {
-    const std::size_t page = page_size();
-    return (sizeof(PrivateHeap) + page - 1) & ~(page - 1);
-}
-
-// Different from the tags of blocks that are not live, and from most other heaps'.
-std::uint64_t tag_for(const void* heap) {
-    const auto address = reinterpret_cast<std::uintptr_t>(heap);
-    return (((address >> 12) * 0x9E37'79B9'7F4A'7C15) & TAG_BITS) | LIVE_BIT;
-}
 
 }  // namespace
 
 PrivateHeap::PrivateHeap(std::size_t maximum)
-    : m_magic(MAGIC),
-      m_tag(tag_for(this)),
-      m_single_from(maximum != 0 && maximum <= ONE_REGION_UP_TO ? ALL : SINGLE_FROM),
-      m_maximum(maximum != 0 ? maximum : ALL) {}
+    : m_magic(MAGIC), m_has_maximum(maximum != 0), m_first(maximum, MOST_IDLE) {}
 
 PrivateHeap* PrivateHeap::create(std::size_t maximum) {
-    std::byte* record = map_pages(record_bytes(), page_size());
+    std::byte* record = map_pages(whole_pages(sizeof(PrivateHeap)), page_size());
     return record == nullptr ? nullptr : new (record) PrivateHeap(maximum);
 }
 
@@ -60,177 +37,104 @@ PrivateHeap* PrivateHeap::from_handle(void* handle) {
 }
 
 void PrivateHeap::destroy() {
-    for (const Region& region : m_regions.all()) {
-        leave_region(region.begin, region.size);
-        unmap_pages(region.begin, region.size);
+    for (const std::atomic<HeapPart*>& further : m_further) {
+        if (HeapPart* part = further.load(std::memory_order_relaxed)) {
+            part->~HeapPart();
+            unmap_pages(reinterpret_cast<std::byte*>(part), whole_pages(sizeof(HeapPart)));
+        }
     }
     m_magic = 0;
     this->~PrivateHeap();
-    unmap_pages(reinterpret_cast<std::byte*>(this), record_bytes());
+    unmap_pages(reinterpret_cast<std::byte*>(this), whole_pages(sizeof(PrivateHeap)));
 }
 
-void* PrivateHeap::allocate(std::size_t size) {
-    const std::size_t need = block_size_for(size);
-    if (need == 0) {
-        return nullptr;
+// The part of a thread that has none yet; the first one when out of memory.
+HeapPart& PrivateHeap::make_part() {
+    const std::uintptr_t thread = this_thread();
+    std::uintptr_t first = 0;
+    if (m_first_thread.compare_exchange_strong(first, thread, std::memory_order_relaxed)) {
+        return m_first;
     }
-    const std::lock_guard guard(m_lock);
-    Block* block = need < m_single_from ? allocate_shared(need) : allocate_single(need);
-    if (block == nullptr) {
-        return nullptr;
+    std::byte* const record = map_pages(whole_pages(sizeof(HeapPart)), page_size());
+    if (record == nullptr) {
+        return m_first;
     }
-    permit_access(payload_of(block), size);
-    return payload_of(block);
+    auto* const part = new (record) HeapPart(0, MOST_IDLE_FURTHER);
+    HeapPart* made = nullptr;
+    if (place_of(thread).compare_exchange_strong(made, part, std::memory_order_acq_rel)) {
+        return *part;
+    }
+    // A thread of the same place was faster.
+    part->~HeapPart();
+    unmap_pages(record, whole_pages(sizeof(HeapPart)));
+    return *made;
+}
+
+// Calls visit(part), the thread's own part first, until it returns true.
+template <class Visit>
+void PrivateHeap::for_each_part(Visit visit) {
+    HeapPart* const own = own_part();
+    if ((own != nullptr && visit(*own)) || m_has_maximum || (own != &m_first && visit(m_first))) {
+        return;
+    }
+    for (const std::atomic<HeapPart*>& further : m_further) {
+        HeapPart* const part = further.load(std::memory_order_acquire);
+        if (part != nullptr && part != own && visit(*part)) {
+            return;
+        }
+    }
+}
+
+// From free memory of any part, when the thread's own can have no more.
+void* PrivateHeap::allocate_anywhere(std::size_t size) {
+    void* block = nullptr;
+    for_each_part([&](HeapPart& part) { return (block = part.allocate(size)) != nullptr; });
+    return block;
 }
 
 DWORD PrivateHeap::release(void* payload) {
     if (payload == nullptr) {
         return ERROR_SUCCESS;
     }
-    const std::lock_guard guard(m_lock);
-    const Region* region = region_of_live(payload);
-    if (region == nullptr) {
-        return ERROR_INVALID_PARAMETER;
-    }
-    Block* block = block_of(payload);
-    if (!region->single) {
-        free_shared(block);
-        return ERROR_SUCCESS;
-    }
-    if (!unmap_region(*region)) {
-        permit_access(payload, size_of(head_of(block)) - HEAD_BYTES);
-        return ERROR_NOT_ENOUGH_MEMORY;
-    }
-    return ERROR_SUCCESS;
+    DWORD error = ERROR_INVALID_PARAMETER;
+    for_each_part([&](HeapPart& part) { return (error = part.release(payload)) != ERROR_INVALID_PARAMETER; });
+    return error;
 }
 
 void* PrivateHeap::resize(void* payload, std::size_t size, DWORD& error) {
-    const std::size_t need = block_size_for(size);
-    std::size_t old_size = 0;
-    {
-        const std::lock_guard guard(m_lock);
-        const Region* region = payload != nullptr ? region_of_live(payload) : nullptr;
-        if (region == nullptr) {
-            error = ERROR_INVALID_PARAMETER;
-            return nullptr;
-        }
-        error = ERROR_NOT_ENOUGH_MEMORY;
-        if (need == 0) {
-            return nullptr;
-        }
-        Block* block = block_of(payload);
-        old_size = size_of(head_of(block)) - HEAD_BYTES;
-        const bool done = region->single ? resize_single(block, need, *region) : resize_in_place(block, need);
-        if (done) {
-            forbid_access(payload_of(block), size_of(head_of(block)) - HEAD_BYTES);
-            permit_access(payload_of(block), size);
-            return payload_of(block);
-        }
-    }
-    // No other thread uses either block: copying needs no lock.
-    void* moved = allocate(size);
-    if (moved == nullptr) {
+    error = ERROR_INVALID_PARAMETER;
+    if (payload == nullptr) {
         return nullptr;
     }
-    permit_access(payload, old_size);
-    std::memcpy(moved, payload, std::min(old_size, size));
-    release(payload);
+    void* moved = nullptr;
+    std::size_t old_size = 0;
+    HeapPart* owner = nullptr;
+    for_each_part([&](HeapPart& part) {
+        moved = part.resize(payload, size, old_size, error);
+        owner = &part;
+        return moved != nullptr || error != ERROR_INVALID_PARAMETER;
+    });
+    if (moved != nullptr || error == ERROR_INVALID_PARAMETER) {
+        return moved;
+    }
+    // No other thread uses either block: copying needs no lock.
+    moved = allocate(size);
+    if (moved != nullptr) {
+        permit_access(payload, old_size);
+        std::memcpy(moved, payload, std::min(old_size, size));
+        owner->release(payload);
+    }
     return moved;
 }
 
 std::size_t PrivateHeap::compact() {
-    const std::lock_guard guard(m_lock);
-    empty_quick_lists(0);
-    // Smaller blocks hold no whole page between their links and their end.
-    for (unsigned level = FreeLists::place_of(page_size()).level; level < FreeLists::LEVELS; ++level) {
-        for (unsigned list = 0; list < FreeLists::LISTS; ++list) {
-            Block* next = nullptr;
-            for (Block* block = m_free.first({level, list}); block != nullptr; block = next) {
-                next = next_of(block);
-                const std::size_t size = size_of(head_of(block));
-                // A heap that was used keeps its last region, so that it has a free block to report.
-                if (m_mapped_shared != size + REGION_OVERHEAD && drop_free_region(block)) {
-                    continue;
-                }
-                discard_pages(bytes_of(block) + MIN_BLOCK, bytes_of(block) + size - HEAD_BYTES);
-            }
-        }
-    }
-    const std::size_t largest = m_free.largest();
-    return largest == 0 ? 0 : largest - HEAD_BYTES - GUARD_BYTES;
-}
-
-// The region is looked up before the head is read, so any pointer is safe.
-const Region* PrivateHeap::region_of_live(void* payload) const {
-    const Region* region = m_regions.find(payload);
-    if (region == nullptr || (reinterpret_cast<std::uintptr_t>(payload) & (BLOCK_ALIGNMENT - 1)) != 0) {
-        return nullptr;
-    }
-    Block* block = block_of(payload);
-    const auto offset = static_cast<std::size_t>(bytes_of(block) - region->begin);
-    if (offset < HEAD_BYTES || offset >= region->size) {
-        return nullptr;
-    }
-    const std::uint64_t head = head_of(block);
-    const bool live = (head & TAG_BITS) == m_tag && size_of(head) <= region->size - REGION_OVERHEAD;
-    return live && (!region->single || offset == HEAD_BYTES) ? region : nullptr;
-}
-
-Block* PrivateHeap::find_free(std::size_t need) {
-    Block* block = m_free.find(need);
-    return block != nullptr ? block : m_free.find_in_own_list(need, ATTEMPTS_BEFORE_GROWTH);
-}
-
-Block* PrivateHeap::allocate_shared(std::size_t need) {
-    if (need < QuickLists::SIZE_LIMIT) {
-        if (Block* block = m_quick.take(need, m_tag)) {
-            m_live_shared += need;
-            return block;
-        }
-    }
-    Block* block = find_free(need);
-    if (block == nullptr && m_quick.bytes() != 0) {
-        empty_quick_lists(0);
-        block = find_free(need);
-    }
-    if (block == nullptr) {
-        block = add_shared_region(need);
-    }
-    if (block == nullptr) {
-        // No more can be mapped: now a longer search pays.
-        block = m_free.find_in_own_list(need, ALL);
-    }
-    if (block != nullptr) {
-        split(block, need);
-    }
-    return block;
-}
-
-// Frees a live block of a shared region.
-void PrivateHeap::free_shared(Block* block) {
-    const std::size_t size = size_of(head_of(block));
-    m_live_shared -= size;
-    if (size >= QuickLists::SIZE_LIMIT) {
-        coalesce(block);
-        return;
-    }
-    forbid_access(block, size);
-    if (size >= QuickLists::SMALL_LIMIT) {
-        if (Block* before = m_quick.take_first(QuickLists::LARGE)) {
-            coalesce(before);
-        }
-    }
-    m_quick.insert(block, size);
-    // Blocks in quick lists hide idle regions: no more of them than may be kept.
-    const std::size_t spare = m_mapped_shared - m_live_shared;
-    empty_quick_lists(spare <= MOST_IDLE ? MOST_QUICK : 0);
-}
-
-// Coalesces blocks of the quick lists until they hold at most so many bytes.
-void PrivateHeap::empty_quick_lists(std::size_t most) {
-    while (m_quick.bytes() > most) {
-        coalesce(m_quick.take_any());
-    }
+    std::size_t largest = 0;
+    for_each_part([&](HeapPart& part) {
+        // A heap that was used keeps a region, so that it has a free block to report.
+        largest = std::max(largest, part.compact(&part == &m_first));
+        return false;
+    });
+    return largest;
 }
 
 }  // namespace basalt::platform

@@ -1,20 +1,20 @@
-// A private heap: blocks of any size from regions of mapped pages, all unmapped with the heap.
+// A private heap: parts with a lock each, so that threads do not wait for each other.
 #ifndef BASALT_SRC_PLATFORM_HEAP_PRIVATE_HEAP_H
 #define BASALT_SRC_PLATFORM_HEAP_PRIVATE_HEAP_H
 
+#include <array>
+#include <atomic>
 #include <cstddef>
 #include <cstdint>
 
-#include "basalt/platform/error.h"
-#include "src/platform/heap/free_lists.h"
-#include "src/platform/heap/quick_lists.h"
-#include "src/platform/heap/regions.h"
-#include "src/platform/system/lock.h"
+#include "src/platform/heap/part.h"
 
 namespace basalt::platform {
 
-// The record has pages of its own; a handle is its address. Threads: thread-safe except create() and
-// destroy(); one lock for everything.
+// The record has pages of its own; a handle is its address. The first part is in the record and serves the
+// first thread, and every thread of a heap with a maximum; the others are made when further threads allocate.
+// A block is freed by any thread: its own part is searched first. Threads: thread-safe except create() and
+// destroy().
 class PrivateHeap {
 public:
     // At most so many bytes are mapped for blocks (a multiple of the page size, 0 for no limit).
@@ -24,13 +24,17 @@ public:
     // Null for a handle that is plainly no heap: null, not page-aligned, not a record.
     static PrivateHeap* from_handle(void* handle);
 
-    // Unmaps every region and the record.
+    // Unmaps every part and the record.
     void destroy();
 
     // A block of at least size bytes, 16-byte aligned, or null.
-    void* allocate(std::size_t size);
+    void* allocate(std::size_t size) {
+        HeapPart* const own = own_part();
+        void* const block = (own != nullptr ? *own : make_part()).allocate(size);
+        return block != nullptr || m_has_maximum ? block : allocate_anywhere(size);
+    }
 
-    // Frees a block. Error code: ERROR_INVALID_PARAMETER for anything but a live block of this heap.
+    // Frees a block. Error code: ERROR_INVALID_PARAMETER for anything but null and a live block of this heap.
     DWORD release(void* payload);
 
     // The block in its new size, perhaps at another address, contents kept up to the smaller size. On failure
@@ -43,48 +47,40 @@ public:
 private:
     friend class HeapInspection;
 
+    static constexpr std::size_t FURTHER_PARTS = 15;
+
     explicit PrivateHeap(std::size_t maximum);
+    ~PrivateHeap() = default;
 
-    const Region* region_of_live(void* payload) const;
+    // The address of a thread's control block. A later thread may have it again, and with it the part.
+    static std::uintptr_t this_thread() {
+        return reinterpret_cast<std::uintptr_t>(__builtin_thread_pointer());
+    }
 
-    Block* allocate_shared(std::size_t need);
-    Block* add_shared_region(std::size_t need);
-    Block* allocate_single(std::size_t need);
-    bool make_room(std::size_t bytes);
-    bool has_one_region() const { return m_single_from == ~std::size_t{0}; }
-    Block* add_region(std::byte* begin, std::size_t size, bool single);
+    std::atomic<HeapPart*>& place_of(std::uintptr_t thread) {
+        const std::uint64_t hash = (std::uint64_t{thread} >> 6) * 0x9E37'79B9'7F4A'7C15;
+        return m_further[(hash >> 32) % FURTHER_PARTS];
+    }
 
-    Block* find_free(std::size_t need);
-    void split(Block* block, std::size_t need);
-    void free_shared(Block* block);
-    void empty_quick_lists(std::size_t most);
-    void coalesce(Block* block);
-    bool resize_in_place(Block* block, std::size_t need);
-    bool resize_single(Block*& block, std::size_t need, const Region& region);
+    // The thread's part, null while it has none.
+    HeapPart* own_part() {
+        const std::uintptr_t thread = this_thread();
+        return m_has_maximum || m_first_thread.load(std::memory_order_relaxed) == thread
+                   ? &m_first
+                   : place_of(thread).load(std::memory_order_acquire);
+    }
 
-    bool is_idle_region(const Block* block) const;
-    void keep_idle_region(Block* block, std::size_t bytes);
-    bool drop_idle_regions();
-    bool drop_free_region(Block* block);
-    bool unmap_region(const Region& region);
+    HeapPart& make_part();
+    void* allocate_anywhere(std::size_t size);
+    template <class Visit>
+    void for_each_part(Visit visit);
 
-    // Idle regions, those without a live block, are kept up to this: page faults of new ones cost more than
-    // all the rest of an allocation.
-    static constexpr std::size_t MOST_IDLE = std::size_t{32} << 20;
-
-    // The members that every allocation uses come first.
+    // Read by all threads; the first part, which its thread writes, has cache lines of its own.
     std::uint64_t m_magic;
-    std::uint64_t m_tag;  // of this heap's live blocks
-    Lock m_lock;
-    std::size_t m_live_shared = 0;    // bytes of the live blocks in shared regions
-    std::size_t m_mapped_shared = 0;  // bytes of the regions that many blocks share
-    QuickLists m_quick;
-    FreeLists m_free;
-    std::size_t m_idle = 0;     // bytes of the idle regions
-    std::size_t m_single_from;  // blocks of this size and above have a region of their own
-    std::size_t m_maximum;
-    std::size_t m_mapped = 0;  // bytes of all regions
-    RegionTable m_regions;
+    const bool m_has_maximum;
+    std::atomic<std::uintptr_t> m_first_thread{0};
+    std::array<std::atomic<HeapPart*>, FURTHER_PARTS> m_further{};
+    alignas(64) HeapPart m_first;
 };
 
 }  // namespace basalt::platform

@@ -41,7 +41,7 @@ public:
 private:
     const Region* search(const std::byte* address) const;
 
-    static constexpr std::size_t INLINE_REGIONS = 40;  // heaps up to about 1 GiB need no further pages
+    static constexpr std::size_t INLINE_REGIONS = 32;  // heaps up to about 750 MiB need no further pages
 
     std::array<Region, INLINE_REGIONS> m_inline{};
     Region* m_regions = m_inline.data();

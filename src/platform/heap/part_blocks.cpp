@@ -1,10 +1,10 @@
 // Splitting and coalescing the blocks of shared regions.
-#include "src/platform/heap/private_heap.h"
+#include "src/platform/heap/part.h"
 
 namespace basalt::platform {
 
 // Makes a listed free block live; the excess at its end becomes a free block.
-void PrivateHeap::split(Block* block, std::size_t need) {
+void HeapPart::split(Block* block, std::size_t need) {
     const std::uint64_t head = head_of(block);
     std::size_t size = size_of(head);
     std::uint64_t last = head & LAST_OF_REGION;
@@ -30,7 +30,7 @@ void PrivateHeap::split(Block* block, std::size_t need) {
 }
 
 // Makes a block free, joined with its free neighbours. It is not counted as live any more.
-void PrivateHeap::coalesce(Block* block) {
+void HeapPart::coalesce(Block* block) {
     const std::uint64_t head = head_of(block);
     std::size_t size = size_of(head);
     std::uint64_t last = head & LAST_OF_REGION;
@@ -63,7 +63,7 @@ void PrivateHeap::coalesce(Block* block) {
     }
 }
 
-bool PrivateHeap::resize_in_place(Block* block, std::size_t need) {
+bool HeapPart::resize_in_place(Block* block, std::size_t need) {
     std::uint64_t head = head_of(block);
     if (size_of(head) < need) {
         Block* after = successor(block, size_of(head));

@@ -3,7 +3,7 @@
 #include <bit>
 #include <cstdint>
 
-#include "src/platform/heap/private_heap.h"
+#include "src/platform/heap/part.h"
 #include "src/platform/pages.h"
 
 namespace basalt::platform {
@@ -20,13 +20,13 @@ std::byte* map_region(std::size_t size) {
 }  // namespace
 
 // Whether so many bytes may be mapped under the maximum, perhaps after unmapping idle regions.
-bool PrivateHeap::make_room(std::size_t bytes) {
+bool HeapPart::make_room(std::size_t bytes) {
     const auto fits = [&] { return bytes <= m_maximum - m_mapped; };
     return fits() || (drop_idle_regions() && fits());
 }
 
 // A listed free block of at least this size in a new region, or null. Each region doubles the heap.
-Block* PrivateHeap::add_shared_region(std::size_t need) {
+Block* HeapPart::add_shared_region(std::size_t need) {
     const std::size_t least = whole_pages(need + REGION_OVERHEAD);
     if (!make_room(least) || !m_regions.reserve_one()) {
         return nullptr;
@@ -57,7 +57,7 @@ Block* PrivateHeap::add_shared_region(std::size_t need) {
 }
 
 // A live block in a region of its own, or null.
-Block* PrivateHeap::allocate_single(std::size_t need) {
+Block* HeapPart::allocate_single(std::size_t need) {
     const std::size_t size = whole_pages(need + REGION_OVERHEAD);
     if (!make_room(size) || !m_regions.reserve_one()) {
         return nullptr;
@@ -75,7 +75,7 @@ Block* PrivateHeap::allocate_single(std::size_t need) {
     return block;
 }
 
-Block* PrivateHeap::add_region(std::byte* begin, std::size_t size, bool single) {
+Block* HeapPart::add_region(std::byte* begin, std::size_t size, bool single) {
     enter_region(begin, size);
     m_regions.insert({begin, size, single});
     m_mapped += size;
@@ -83,7 +83,7 @@ Block* PrivateHeap::add_region(std::byte* begin, std::size_t size, bool single) 
 }
 
 // Resizes the region of a large block; the system moves its pages instead of copying them.
-bool PrivateHeap::resize_single(Block*& block, std::size_t need, const Region& region) {
+bool HeapPart::resize_single(Block*& block, std::size_t need, const Region& region) {
     const Region old = region;
     const std::size_t size = whole_pages(need + REGION_OVERHEAD);
     if (size == old.size) {
@@ -108,7 +108,7 @@ bool PrivateHeap::resize_single(Block*& block, std::size_t need, const Region& r
 }
 
 // Whether a free block fills its region. Only the first block of a region lies at this offset in a page.
-bool PrivateHeap::is_idle_region(const Block* block) const {
+bool HeapPart::is_idle_region(const Block* block) const {
     const std::uint64_t head = head_of(block);
     if (!is_free(head) || !is_last(head) ||
         (reinterpret_cast<std::uintptr_t>(block) & (SMALLEST_PAGE - 1)) != HEAD_BYTES) {
@@ -117,15 +117,15 @@ bool PrivateHeap::is_idle_region(const Block* block) const {
     return size_of(head) == m_regions.find(block)->size - REGION_OVERHEAD;
 }
 
-void PrivateHeap::keep_idle_region(Block* block, std::size_t bytes) {
+void HeapPart::keep_idle_region(Block* block, std::size_t bytes) {
     m_idle += bytes;
-    if (m_idle > MOST_IDLE) {
+    if (m_idle > m_most_idle) {
         drop_free_region(block);
     }
 }
 
 // False when there is none, or the system refuses to unmap any.
-bool PrivateHeap::drop_idle_regions() {
+bool HeapPart::drop_idle_regions() {
     empty_quick_lists(0);
     const std::size_t idle_before = m_idle;
     for (std::size_t i = m_regions.all().size(); i > 0 && m_idle > 0; --i) {
@@ -139,7 +139,7 @@ bool PrivateHeap::drop_idle_regions() {
 }
 
 // Unmaps the region of a listed free block if the block fills it.
-bool PrivateHeap::drop_free_region(Block* block) {
+bool HeapPart::drop_free_region(Block* block) {
     if (!is_idle_region(block)) {
         return false;
     }
@@ -155,7 +155,7 @@ bool PrivateHeap::drop_free_region(Block* block) {
     return true;
 }
 
-bool PrivateHeap::unmap_region(const Region& region) {
+bool HeapPart::unmap_region(const Region& region) {
     const Region old = region;
     leave_region(old.begin, old.size);
     if (!unmap_pages(old.begin, old.size)) {

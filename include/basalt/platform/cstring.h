@@ -68,7 +68,6 @@ public:
         return *this = CString(character);
     }
     /// @}
-
     /// @name Reading
     /// @{
     /// The number of characters.
@@ -87,7 +86,6 @@ public:
     /// Same as GetAt().
     wchar_t operator[](std::ptrdiff_t position) const noexcept { return GetAt(position); }
     /// @}
-
     /// @name Parts, as new texts
     /// @{
     /// The first `count` characters.
@@ -122,7 +120,6 @@ public:
         return CString(m_text.substr(first, end - first));
     }
     /// @}
-
     /// @name Searching
     /// The position of the first match at or after `start`, or of the last match; -1 if there is none, also
     /// for a start outside the text and a null pointer. The empty text matches at every start.
@@ -136,7 +133,6 @@ public:
     /// The first of any of the given characters.
     int FindOneOf(const wchar_t* characters) const noexcept;
     /// @}
-
     /// @name Comparison
     /// -1, 0 or 1: this text is before, equal to or after the other.
     /// @{
@@ -145,7 +141,6 @@ public:
     /// By the codes of the lower-case forms, in the environment's locale.
     int CompareNoCase(const wchar_t* other) const;
     /// @}
-
     /// @name Changing
     /// @{
     /// Becomes the empty text.
@@ -210,7 +205,6 @@ public:
     /// Removes any of the characters from the end.
     CString& TrimRight(const wchar_t* characters);
     /// @}
-
     /// @name Direct access
     /// @{
     /// A buffer of at least `least_length` characters and a zero, holding the text. The caller may write to

@@ -18,10 +18,8 @@
 /// outside the text is clamped. Narrow text is in the active code page: the encoding of the environment's
 /// locale, UTF-8 if that names none. A call without an overload for a narrow character takes its number as a
 /// wide one.
-///
 /// Bad input: no call fails; std::bad_alloc and std::length_error (more than 2^31 - 1 characters) leave the
 /// text unchanged.
-///
 /// Threads: reentrant; one object is used by one thread at a time, or by many for reading.
 class BASALT_API CString {
 public:
@@ -225,7 +223,6 @@ public:
     /// width. `p` writes 16 upper-case digits. Precision limits a wide text's characters and a narrow text's
     /// bytes. A width, and a number's precision, is limited to 1,000,000. The decimal point is that of the
     /// process's locale.
-    ///
     /// Arguments carry their types: %s and %S both accept wide text, CString and narrow text. An argument
     /// that does not match its type is written in its plain form, a missing one is skipped, an unknown type
     /// is copied. Arguments may come from the object itself.
@@ -290,7 +287,6 @@ public:
         return order(a, b) >= 0;
     }
     /// @}
-
 private:
     explicit CString(std::wstring&& text) noexcept : m_text(std::move(text)) {}
     static const wchar_t* or_empty(const wchar_t* text) noexcept { return text != nullptr ? text : L""; }

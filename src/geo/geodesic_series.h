@@ -33,10 +33,10 @@ inline Direction turn(const Direction& from, const Direction& to) {
     return {sine > 0.0 ? sine : 0.0, from.cosine * to.cosine + from.sine * to.sine};
 }
 
-/// factor (angle + sum over l of coefficients[l - 1] sin(2 l angle)).
+/// (1 + excess) (angle + sum over l of coefficients[l - 1] sin(2 l angle)).
 template <std::size_t N>
 struct SineSeries {
-    double factor;
+    double excess;  ///< small, so that the angle itself is not rounded by it
     std::array<double, N> coefficients;
 
     /// The sum at an angle, by Clenshaw's recurrence.
@@ -53,14 +53,14 @@ struct SineSeries {
     }
     /// Difference of the series at two angles that are `arc` apart.
     double between(const Direction& from, const Direction& to, double arc) const {
-        return factor * (arc + (sum(to) - sum(from)));
+        return arc + (excess * arc + (1.0 + excess) * (sum(to) - sum(from)));
     }
 };
 
 /// I1, the distance over the polar radius; eq. 17, 18.
 inline SineSeries<6> distance_series(double e) {
     const double e2 = e * e;
-    return {(1.0 + e2 * (1.0 / 4 + e2 * (1.0 / 64 + e2 / 256))) / (1.0 - e),
+    return {(e + e2 * (1.0 / 4 + e2 * (1.0 / 64 + e2 / 256))) / (1.0 - e),
             {e * (-1.0 / 2 + e2 * (3.0 / 16 - e2 / 32)), e2 * (-1.0 / 16 + e2 * (1.0 / 32 - e2 * 9.0 / 2048)),
              e * e2 * (-1.0 / 48 + e2 * 3.0 / 256), e2 * e2 * (-5.0 / 512 + e2 * 3.0 / 512),
              e * e2 * e2 * (-7.0 / 1280), e2 * e2 * e2 * (-7.0 / 2048)}};
@@ -72,9 +72,9 @@ inline SineSeries<5> longitude_series(double e) {
     constexpr double n2 = n * n;
     const double e2 = e * e;
     const double e3 = e2 * e;
-    return {1.0 - e * ((1.0 / 2 - n / 2) + e * ((1.0 / 4 + n / 8 - n2 * 3 / 8) +
-                                                e * ((1.0 / 16 + n * 3 / 16 + n2 / 16) +
-                                                     e * ((3.0 / 64 + n / 32) + e * 3.0 / 128)))),
+    return {-e * ((1.0 / 2 - n / 2) +
+                  e * ((1.0 / 4 + n / 8 - n2 * 3 / 8) +
+                       e * ((1.0 / 16 + n * 3 / 16 + n2 / 16) + e * ((3.0 / 64 + n / 32) + e * 3.0 / 128)))),
             {e * ((1.0 / 4 - n / 4) +
                   e * ((1.0 / 8 - n2 / 8) +
                        e * ((3.0 / 64 + n * 3 / 64 - n2 / 64) + e * ((5.0 / 128 + n / 64) + e * 3.0 / 128)))),

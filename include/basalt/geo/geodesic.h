@@ -84,8 +84,8 @@ struct GeodesicInverse {
 /// Bad input: three NaN for a latitude beyond a pole, NaN and an infinite longitude. At most 60 passes; 2 or
 /// 3 on most lines.
 ///
-/// Accuracy: 1.5e-8 m in distance, nearly opposite places included. The azimuth is that of a line ending as
-/// close to `to`.
+/// Accuracy: 2e-8 m in distance, nearly opposite places included. The azimuths are those of a line that ends
+/// as close to `to`.
 ///
 /// Threads: thread-safe.
 ///

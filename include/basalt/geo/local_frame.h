@@ -16,8 +16,8 @@ namespace basalt {
 /// Bad input: a frame that is not valid() and a point that is refused give three #GEO_NULL: the all-zero
 /// geodetic point, as _llh2xyz(), and a Cartesian one that _xyz2llh() refuses.
 ///
-/// Accuracy: there and back within 1e-8 m up to 100 km from the origin, plus that of _xyz2llh() where
-/// geodetic.
+/// Accuracy: Cartesian there and back within 1e-9 m up to 100 km from the origin; geodetic within that of
+/// _xyz2llh(), 2.2e-5 m.
 ///
 /// Threads: const calls may run on any number of threads at once.
 class LocalFrame {

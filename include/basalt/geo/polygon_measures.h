@@ -18,8 +18,9 @@ namespace basalt {
 ///
 /// Bad input: NaN gives NaN.
 ///
-/// Accuracy: coordinates count as differences from the first vertex, so national grids cost no digits: 1e-15
-/// of the square of the polygon's extent, times the root of the count. Threads: thread-safe. Never throws.
+/// Accuracy: coordinates count as differences from the first vertex, so large grid coordinates cost no digits.
+///
+/// Threads: thread-safe. Never throws.
 BASALT_API double polygon_area(const geo_nee* vertices, std::size_t count) noexcept;
 
 /// Length of the outline in the plane of north and east, the closing edge included.

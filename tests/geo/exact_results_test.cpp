@@ -128,7 +128,7 @@ TEST(ExactResults, OnTheEllipsoidAreTheSameOnEveryCompiler) {
             fold.add(v);
         }
     }
-    EXPECT_EQ(fold.value(), 8812659496721540907U);
+    EXPECT_EQ(fold.value(), 11646124839276931258U);
 }
 
 }  // namespace

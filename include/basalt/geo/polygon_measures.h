@@ -18,7 +18,8 @@ namespace basalt {
 ///
 /// Bad input: NaN gives NaN.
 ///
-/// Accuracy: coordinates count as differences from the first vertex, so large grid coordinates cost no digits.
+/// Accuracy: coordinates count as differences from the first vertex, so large grid coordinates cost no
+/// digits.
 ///
 /// Threads: thread-safe. Never throws.
 BASALT_API double polygon_area(const geo_nee* vertices, std::size_t count) noexcept;

@@ -7,21 +7,14 @@
 
 namespace {
 
-constinit thread_local long calls_left = 0;  // until one fails; 0: none will
-constinit thread_local bool failure_stays = false, has_fired = false;
-constinit thread_local long live_blocks = 0;
-
 template <class Take>
 void* taken(const void* before, Take take) {
-    if (basalt::test::failures_are_paused ? false
-        : has_fired                       ? failure_stays
-                                          : calls_left > 0 && --calls_left == 0) {
-        has_fired = true;
+    if (basalt::test::allocations.fails()) {
         errno = ENOMEM;
         return nullptr;
     }
     void* const block = take();
-    live_blocks += block != nullptr && before == nullptr ? 1 : 0;
+    basalt::test::allocations.live += block != nullptr && before == nullptr ? 1 : 0;
     return block;
 }
 
@@ -52,26 +45,7 @@ int posix_memalign(void** block, std::size_t alignment, std::size_t size) {
     return *block != nullptr ? 0 : ENOMEM;
 }
 void free(void* block) {
-    live_blocks -= block != nullptr ? 1 : 0;
+    basalt::test::allocations.live -= block != nullptr ? 1 : 0;
     __libc_free(block);
 }
-}
-
-FailAllocation::FailAllocation(long nth, bool forever) {
-    calls_left = nth;
-    failure_stays = forever;
-    has_fired = false;
-}
-
-FailAllocation::~FailAllocation() {
-    calls_left = 0;
-    has_fired = false;
-}
-
-bool FailAllocation::fired() const {
-    return has_fired;
-}
-
-long live_allocations() {
-    return live_blocks;
 }

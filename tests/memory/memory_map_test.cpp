@@ -11,6 +11,7 @@
 #include <string>
 
 #include "src/platform/file.h"
+#include "tests/support/child.h"
 #include "tests/support/open_descriptors.h"
 #include "tests/support/scratch_folder.h"
 
@@ -170,13 +171,11 @@ const struct AtTheEnd {
 
 TEST(MemoryMap, a_block_made_while_the_process_ends_leaves_no_file) {
     const ScratchFolder folder;
-    const pid_t child = fork();
-    if (child == 0) {
+    basalt::test::in_child([] {
         at_the_end = [] { bytes(*new CMemoryMap(SIZE))[SIZE - 1] = 'x'; };
         const CMemoryMap first(SIZE);
         std::exit(0);
-    }
-    waitpid(child, nullptr, 0);
+    });
     EXPECT_EQ(folder.names(), Names{});
 }
 

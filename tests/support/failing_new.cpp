@@ -7,26 +7,19 @@
 
 namespace {
 
-thread_local long calls_left = 0;  // until the failure; 0: none will fail
-thread_local bool failure_stays = false, has_fired = false;
-thread_local long live = 0;
-
 using std::align_val_t;
 using std::nothrow_t;
 using std::size_t;
 constexpr align_val_t PLAIN{alignof(std::max_align_t)};
 
 void* take(size_t size, align_val_t alignment = PLAIN) noexcept {
-    if (basalt::test::failures_are_paused ? false
-        : has_fired                       ? failure_stays
-                                          : calls_left > 0 && --calls_left == 0) {
-        has_fired = true;
+    if (basalt::test::allocations.fails()) {
         return nullptr;
     }
     void* block = nullptr;
     const auto bytes = std::max(static_cast<size_t>(alignment), sizeof(void*));
     const bool taken = posix_memalign(&block, bytes, std::max(size, size_t{1})) == 0;
-    live += taken ? 1 : 0;
+    basalt::test::allocations.live += taken ? 1 : 0;
     return taken ? block : nullptr;
 }
 
@@ -36,30 +29,11 @@ void* take_or_throw(size_t size, align_val_t alignment = PLAIN) {
 }
 
 void give(void* block) noexcept {
-    live -= block != nullptr ? 1 : 0;
+    basalt::test::allocations.live -= block != nullptr ? 1 : 0;
     std::free(block);
 }
 
 }  // namespace
-
-FailAllocation::FailAllocation(long nth, bool forever) {
-    calls_left = nth;
-    failure_stays = forever;
-    has_fired = false;
-}
-
-FailAllocation::~FailAllocation() {
-    calls_left = 0;
-    has_fired = false;
-}
-
-bool FailAllocation::fired() const {
-    return has_fired;
-}
-
-long live_allocations() {
-    return live;
-}
 
 // Every form: the library's own would call a sanitizer's.
 // clang-format off

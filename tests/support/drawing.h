@@ -89,16 +89,11 @@ inline Picture unpacked(const unsigned char* bytes, int width, int height, int d
 }
 
 struct DibHeader {
-    BITMAPINFOHEADER header = {};
+    BITMAPINFOHEADER header;
     RGBQUAD table[256] = {};
 
-    DibHeader(int width, int height, int depth) {
-        header.biSize = 40;
-        header.biWidth = width;
-        header.biHeight = height;
-        header.biPlanes = 1;
-        header.biBitCount = static_cast<WORD>(depth);
-    }
+    DibHeader(int width, int height, int depth)
+        : header{40, width, height, 1, static_cast<WORD>(depth), BI_RGB, 0, 0, 0, 0, 0} {}
     BITMAPINFO* info() { return reinterpret_cast<BITMAPINFO*>(this); }
 };
 
@@ -224,21 +219,17 @@ inline bool is_in_rounded(const RECT& r, int ellipse_width, int ellipse_height, 
     return dx >= 0 || dy >= 0 || dx * dx * high * high + dy * dy * wide * wide <= wide * wide * high * high;
 }
 
-// A channel of 8.8 at place p of a ramp from `first` at a to `last` at b.
-inline int gradient_level(std::int64_t first, std::int64_t last, std::int64_t a, std::int64_t b,
-                          std::int64_t p) {
-    return static_cast<int>((last * (p - a) + first * (b - p)) / (b - a) >> 8);
-}
-
+// Channels are 8.8; between the corners they change by exact fractions.
 inline void gradient(Picture& picture, const TRIVERTEX& a, const TRIVERTEX& b, bool across) {
+    const std::int64_t from = across ? a.x : a.y, to = across ? b.x : b.y;
     on(picture, ordered({a.x, a.y, b.x, b.y}), [&](int x, int y, std::uint32_t& value) {
+        const std::int64_t p = across ? x : y;
         const auto level = [&](WORD first, WORD last) {
-            const int eight =
-                across ? gradient_level(first, last, a.x, b.x, x) : gradient_level(first, last, a.y, b.y, y);
+            const auto eight = static_cast<int>((last * (p - from) + first * (to - p)) / (to - from) >> 8);
             return picture.depth == 16 ? eight >> 3 << 3 | eight >> 5 : eight;  // truncated, not the nearest
         };
-        value =
-            value_of(picture.depth, RGB(level(a.Red, b.Red), level(a.Green, b.Green), level(a.Blue, b.Blue)));
+        const COLORREF colour = RGB(level(a.Red, b.Red), level(a.Green, b.Green), level(a.Blue, b.Blue));
+        value = value_of(picture.depth, colour);
     });
 }
 
@@ -246,12 +237,8 @@ inline void gradient(Picture& picture, const TRIVERTEX& a, const TRIVERTEX& b, b
 inline XFORM turn_about(double degrees, double x, double y) {
     const double c = std::cos(degrees * std::numbers::pi / 180),
                  s = std::sin(degrees * std::numbers::pi / 180);
-    return {static_cast<float>(c),
-            static_cast<float>(s),
-            static_cast<float>(-s),
-            static_cast<float>(c),
-            static_cast<float>(x - x * c + y * s),
-            static_cast<float>(y - x * s - y * c)};
+    const auto f = [](double value) { return static_cast<float>(value); };
+    return {f(c), f(s), f(-s), f(c), f(x - x * c + y * s), f(y - x * s - y * c)};
 }
 
 struct Block {

@@ -1,5 +1,5 @@
 // Private heaps and the block allocator against malloc and pools. A second thread is kept alive, since the C
-// library spares single-threaded programs its locks.
+// library takes no locks in single-threaded programs.
 #include <benchmark/benchmark.h>
 #include <malloc.h>
 #include <sys/mman.h>
@@ -75,7 +75,7 @@ void chunks(benchmark::State& state) {
     state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(LIVE_CHUNKS));
 }
 
-// Many chunks alive, one freed and one taken in turn: what the calls themselves cost.
+// Many chunks alive, one freed and one allocated in turn: the cost of the calls alone.
 template <class Allocator>
 void chunk_exchange(benchmark::State& state) {
     Allocator allocator;
@@ -94,8 +94,8 @@ void chunk_exchange(benchmark::State& state) {
     }
 }
 
-// 16 to 512 bytes, 10,000 alive for each thread, in random order; the threads share the allocator. All runs
-// do, as all share malloc's: what fresh pages cost is in other rows.
+// 16 to 512 bytes, 10,000 alive for each thread, in random order; the threads and all runs share the
+// allocator, as they share malloc's; other rows have the cost of new pages.
 template <class Allocator>
 void small_mix(benchmark::State& state) {
     static Allocator s_alone;
@@ -127,8 +127,8 @@ void small_mix(benchmark::State& state) {
     }
 }
 
-// Seconds of the processor's time that an action takes; the other thread sleeps. A phase that is timed alone
-// is too short to share out what else the machine does in it.
+// Seconds of processor time of an action; the other thread sleeps. Wall time would include other processes,
+// which short phases do not average out.
 template <class Action>
 double timed(Action action) {
     const std::clock_t start = std::clock();
@@ -139,7 +139,7 @@ double timed(Action action) {
 constexpr std::size_t FRESH_BLOCKS = 1'000'000;
 constexpr std::size_t FRESH_SIZE = 64;
 
-// The least it can cost: pages from the system, written one block after the other.
+// The lower bound: new pages, written one block after the other.
 struct Pages {
     std::byte* first = static_cast<std::byte*>(
         mmap(nullptr, FRESH_BLOCKS* FRESH_SIZE, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0));
@@ -163,7 +163,7 @@ struct FreshMalloc {
     }
 };
 
-// Small blocks from an allocator that is new, each written, or giving all of them up again: a block's share.
+// Small blocks from a new allocator, each written, or the release of all of them: time per block.
 template <class Allocator, bool TIMES_DROP>
 void fresh(benchmark::State& state) {
     std::vector<void*> live(FRESH_BLOCKS);
@@ -181,7 +181,7 @@ void fresh(benchmark::State& state) {
     }
 }
 
-// A block that grows by 64 bytes at a time to 64 KiB, while others lie around it: a step's share.
+// A block that grows by 64 bytes at a time to 64 KiB, between other blocks: time per step.
 template <class Grow>
 void grow(benchmark::State& state, Grow grow_to) {
     constexpr std::size_t STEP = 64, STEPS = 1024;
@@ -239,7 +239,7 @@ struct BoostPool {
 enum class Order { NEWEST_FIRST, OLDEST_FIRST, RANDOM };
 enum class Timed { ALLOCATE, FREE };
 
-// Fills and empties an allocator that has been full before: a block's share of the one or the other.
+// Fills or empties an allocator that has been full before: time per block.
 template <class Allocator, Order ORDER, Timed TIMED>
 void blocks(benchmark::State& state) {
     Allocator allocator;
@@ -276,7 +276,7 @@ void blocks(benchmark::State& state) {
     }
 }
 
-// A full allocator from which blocks are freed and taken in random order.
+// A full allocator whose blocks are freed and allocated in random order.
 template <class Allocator>
 void block_churn(benchmark::State& state) {
     Allocator allocator;
@@ -286,7 +286,7 @@ void block_churn(benchmark::State& state) {
     }
     std::mt19937 random(4);
     std::shuffle(live.begin(), live.end(), random);
-    // Blocks of a window are freed and taken again, so that what is taken next was not freed just before.
+    // All blocks of a window are freed before any is allocated, so that none is reused at once.
     constexpr std::size_t WINDOW = 10'000;
     std::size_t first = 0;
     while (state.KeepRunningBatch(WINDOW)) {
@@ -381,7 +381,7 @@ int main(int argc, char** argv) {
         std::unique_lock lock(mutex);
         asleep.wait(lock, stop, [] { return false; });
     });
-    // The C library's heap, too, is to keep the memory that it has had.
+    // Let the C library's heap keep its freed memory too.
     mallopt(M_TRIM_THRESHOLD, 1 << 30);
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();

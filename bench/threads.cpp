@@ -1,5 +1,5 @@
-// Two threads on two arrays and on one, beside a hash map under a lock. A row's time is the wall's, shared
-// out over the operations of all threads: where they do not hold each other up, two take half of one's.
+// Two threads on two arrays and on one, beside a hash map under a lock. Times are wall time per operation
+// of all threads: without contention, two threads take half the time of one.
 #include <benchmark/benchmark.h>
 
 #include <array>
@@ -48,7 +48,7 @@ private:
 };
 #endif
 
-/// Each thread looks its own square up, cell by cell, in an array of its own or in one for both.
+// Each thread looks up its own square, cell by cell, in its own array or in one for both.
 template <class Store, bool SHARED>
 void find(benchmark::State& state) {
     static std::array<std::unique_ptr<Store>, 2> s_stores;

@@ -34,8 +34,8 @@ public:
     // and the block's size in old_size unless it is no live block of this part (ERROR_INVALID_PARAMETER).
     void* resize(void* payload, std::size_t size, std::size_t& old_size, DWORD& error);
 
-    // Returns free memory to the system, except the last region if so asked. Size of the largest free block,
-    // 0 without any.
+    // Returns free memory to the system, except for the last region if keeps_last_region. Size of the largest
+    // free block, 0 without any.
     std::size_t compact(bool keeps_last_region);
 
 private:

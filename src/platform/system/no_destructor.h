@@ -1,4 +1,4 @@
-// Objects that are made at their first use and never destroyed.
+// Static objects that are constructed at their first use and never destroyed.
 #ifndef BASALT_SRC_PLATFORM_SYSTEM_NO_DESTRUCTOR_H
 #define BASALT_SRC_PLATFORM_SYSTEM_NO_DESTRUCTOR_H
 
@@ -7,8 +7,8 @@
 
 namespace basalt::platform {
 
-// For a function's static table: a host's own static objects may still use it when statics are being
-// destroyed. The object must own nothing while it is empty, so that nothing is lost with it.
+// For static tables: a host's own static objects may use them in their destructors. The object must own
+// nothing while it is empty, so that nothing leaks.
 template <class T>
 class NoDestructor {
 public:

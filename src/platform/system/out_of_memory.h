@@ -1,4 +1,4 @@
-// The edge between calls that may not throw and the text and tables they are written with.
+// For calls that may not throw: std::bad_alloc and std::length_error as an error code.
 #ifndef BASALT_SRC_PLATFORM_SYSTEM_OUT_OF_MEMORY_H
 #define BASALT_SRC_PLATFORM_SYSTEM_OUT_OF_MEMORY_H
 
@@ -8,8 +8,7 @@
 
 namespace basalt::platform {
 
-// The body's result; when that runs out of memory (or of the length of a text), `failed` with
-// ERROR_NOT_ENOUGH_MEMORY.
+// The body's result; `failed`, with ERROR_NOT_ENOUGH_MEMORY set, when it throws.
 template <class Result, class Body>
 Result or_out_of_memory(Result failed, Body body) noexcept {
     try {
@@ -20,7 +19,7 @@ Result or_out_of_memory(Result failed, Body body) noexcept {
     }
 }
 
-// `failed`, with the error set.
+// Sets the last error and returns `failed`.
 template <class Result>
 Result fail_with(DWORD error, Result failed) noexcept {
     SetLastError(error);

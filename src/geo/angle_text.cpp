@@ -60,7 +60,8 @@ private:
 
 /// Text of a whole number with at least two digits.
 std::string two_digits(std::uint64_t number) {
-    return (number < 10 ? "0" : "") + std::to_string(number);
+    const std::string text = std::to_string(number);
+    return number < 10 ? "0" + text : text;
 }
 
 }  // namespace
@@ -126,7 +127,7 @@ std::string format_angle(double radians, int decimals, AngleStyle style) {
         std::to_string(seconds / 3600) + "-" + two_digits(seconds / 60 % 60) + "-" + two_digits(seconds % 60);
     if (places > 0) {
         const std::string fraction = std::to_string(units % per_second);
-        text += "." + std::string(static_cast<std::size_t>(places) - fraction.size(), '0') + fraction;
+        text.append(".").append(static_cast<std::size_t>(places) - fraction.size(), '0').append(fraction);
     }
     const bool is_negative = units > 0 && angle < 0.0;
     switch (style) {

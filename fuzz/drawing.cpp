@@ -29,7 +29,7 @@ struct Surface {
 
     explicit Surface(Input& in)
         : random(1 + in.byte()),
-          picture(random_picture(in.byte() % 16 == 15 ? 1200 : 1 + in.byte() % 40, 1 + in.byte() % 20,
+          picture(random_picture(in.byte() % 16 == 15 ? 520 : 1 + in.byte() % 40, 1 + in.byte() % 20,
                                  DEPTHS[in.byte() % 6], random)),
           canvas(picture) {}
     int depth() const { return picture.depth; }

@@ -102,6 +102,23 @@ TEST(Copy, goes_to_any_coordinates_by_five_operations) {
     EXPECT_EQ(canvas.picture(), source.picture());
 }
 
+TEST(Copy, within_a_surface_reads_before_it_writes) {
+    std::mt19937 random(13);
+    SCOPED_TRACE("seed 13");
+    for (const int depth : {1, 4, 24, 32}) {
+        const Picture before = random_picture(1500, 6, depth, random);
+        for (const Block& b :
+             {Block{1, 0, 1499, 6, 0, 0}, Block{0, 0, 1499, 6, 1, 0}, Block{3, 2, 1490, 4, 0, 0},
+              Block{0, 0, 1490, 4, 3, 2}, Block{0, 1, 1490, 4, 3, 0}}) {
+            for (const DWORD rop : {SRCCOPY, SRCINVERT}) {
+                Canvas canvas(before);
+                BitBlt(canvas, b.x, b.y, b.width, b.height, canvas, b.source_x, b.source_y, rop);
+                EXPECT_EQ(canvas.picture(), copied(before, b, before, rop)) << depth << " bits, at " << b.x;
+            }
+        }
+    }
+}
+
 TEST(Copy, kernels_agree) {
     std::mt19937 random(16);
     SCOPED_TRACE("seed 16");

@@ -39,7 +39,7 @@ struct Pair {
     }
 };
 
-// The last rectangle again, blocks near the origin, squares whose volumes lose the seed search's 1 by
+// The last rectangle again, blocks near the origin, squares whose volumes lose the 1 in the search for seeds by
 // rounding, any size, and now and then corners in the wrong order.
 Rect rectangle(Input& input, const Rect& last) {
     const unsigned kind = input.byte() % 16;

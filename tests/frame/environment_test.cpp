@@ -114,7 +114,7 @@ TEST(Environment, random_numbers_follow_the_tick_count) {
     environment.last_random_seed.store(0);
     milliseconds = 1ULL << 32;
     std::srand(123'456);
-    EXPECT_EQ(_random_uint16(), first) << "tick 0 is the seed that a fresh library has";
+    EXPECT_EQ(_random_uint16(), first) << "a fresh library is seeded with tick 0";
 }
 
 TEST(Environment, reverses_bytes_of_any_number_and_alignment) {

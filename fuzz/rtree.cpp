@@ -39,8 +39,8 @@ struct Pair {
     }
 };
 
-// The last rectangle again, blocks near the origin, squares whose volumes lose the 1 in the search for seeds by
-// rounding, any size, and now and then corners in the wrong order.
+// The last rectangle again, blocks near the origin, squares whose volumes round away the 1 of the search for
+// seeds, any size, and now and then corners in the wrong order.
 Rect rectangle(Input& input, const Rect& last) {
     const unsigned kind = input.byte() % 16;
     if (kind < 3) {

@@ -58,7 +58,7 @@ made=$(TZ=UTC stat -c %w "été 日本.txt")
 mkdir data.d
 succeeds "$work/data.d"
 is "is directory" yes
-is "composed directory" "\\${work#/}\\data"
+is "composed directory" "\\${work#/}\\data.d"
 LC_ALL=C.UTF-8 succeeds "$(printf 'line\nbreak')"
 is path 'line?break'
 

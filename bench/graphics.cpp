@@ -133,7 +133,7 @@ void nearest_colour(benchmark::State& state, const Find& find) {
     const std::vector<std::uint32_t> colours = random_colours();
     for (const std::uint32_t colour : colours) {
         if (find(colour) != palette.FindClosestColor(colour)) {
-            state.SkipWithError("answers differ");
+            state.SkipWithError("results differ");
             return;
         }
     }

@@ -158,25 +158,39 @@ public:
     /// @name The calls of the same names on this context
     /// With wrappers for handles; their results are those of the calls.
     /// @{
+    /// As ::SetBkColor.
     COLORREF SetBkColor(COLORREF colour) const { return ::SetBkColor(m_hDC, colour); }
+    /// As ::SetTextColor.
     COLORREF SetTextColor(COLORREF colour) const { return ::SetTextColor(m_hDC, colour); }
+    /// As ::SetMapMode.
     int SetMapMode(int mode) const { return ::SetMapMode(m_hDC, mode); }
+    /// As ::GetMapMode.
     int GetMapMode() const { return ::GetMapMode(m_hDC); }
+    /// As ::SetGraphicsMode.
     int SetGraphicsMode(int mode) const { return ::SetGraphicsMode(m_hDC, mode); }
+    /// As ::SetWorldTransform.
     BOOL SetWorldTransform(const XFORM* transform) const { return ::SetWorldTransform(m_hDC, transform); }
+    /// As ::ModifyWorldTransform.
     BOOL ModifyWorldTransform(const XFORM* transform, DWORD mode) const {
         return ::ModifyWorldTransform(m_hDC, transform, mode);
     }
+    /// As ::DPtoLP.
     void DPtoLP(POINT* points, int count = 1) const { ::DPtoLP(m_hDC, points, count); }
+    /// As ::GetPixel.
     COLORREF GetPixel(int x, int y) const { return ::GetPixel(m_hDC, x, y); }
+    /// As ::GetPixel.
     COLORREF GetPixel(POINT point) const { return ::GetPixel(m_hDC, point.x, point.y); }
+    /// As ::SetPixel.
     COLORREF SetPixel(int x, int y, COLORREF colour) const { return ::SetPixel(m_hDC, x, y, colour); }
+    /// As ::SetPixel.
     COLORREF SetPixel(POINT point, COLORREF colour) const {
         return ::SetPixel(m_hDC, point.x, point.y, colour);
     }
+    /// As ::SetPixel; nonzero when there is a pixel.
     BOOL SetPixelV(int x, int y, COLORREF colour) const {
         return ::SetPixel(m_hDC, x, y, colour) != CLR_INVALID ? 1 : 0;
     }
+    /// As ::FillRect.
     void FillRect(const RECT* rectangle, const CBrush* brush) const {
         ::FillRect(m_hDC, rectangle, brush != nullptr ? HBRUSH(*brush) : nullptr);
     }
@@ -190,20 +204,25 @@ public:
         const RECT rectangle = {x, y, x + width, y + height};
         FillSolidRect(&rectangle, colour);
     }
+    /// As ::RoundRect.
     BOOL RoundRect(int left, int top, int right, int bottom, int width, int height) const {
         return ::RoundRect(m_hDC, left, top, right, bottom, width, height);
     }
+    /// As ::RoundRect.
     BOOL RoundRect(const RECT* r, POINT ellipse) const {
         return RoundRect(r->left, r->top, r->right, r->bottom, ellipse.x, ellipse.y);
     }
+    /// As ::GradientFill.
     BOOL GradientFill(const TRIVERTEX* vertices, DWORD vertex_count, const void* mesh, DWORD mesh_count,
                       DWORD mode) const {
         return ::GradientFill(m_hDC, vertices, vertex_count, mesh, mesh_count, mode);
     }
+    /// As ::BitBlt.
     BOOL BitBlt(int x, int y, int width, int height, const CDC* source, int source_x, int source_y,
                 DWORD rop) const {
         return ::BitBlt(m_hDC, x, y, width, height, handle_of(source), source_x, source_y, rop);
     }
+    /// As ::TransparentBlt.
     BOOL TransparentBlt(int x, int y, int width, int height, const CDC* source, int source_x, int source_y,
                         int source_width, int source_height, UINT key) const {
         return ::TransparentBlt(m_hDC, x, y, width, height, handle_of(source), source_x, source_y,

@@ -1,9 +1,11 @@
 """Builds the library of this repository as a static archive and the extension module on top of it.
 
-With BASALT_LIBRARY set to a build folder of the library, static and released, that one serves.
+With BASALT_LIBRARY set to a build folder of the library, static and released, that one serves. A source distribution
+has the library in its folder library.
 """
 import os
 import pathlib
+import shutil
 import subprocess
 
 import numpy
@@ -11,9 +13,10 @@ import pybind11
 from pybind11.setup_helpers import ParallelCompile
 from setuptools import Extension, setup
 from setuptools.command.build_ext import build_ext
+from setuptools.command.sdist import sdist
 
 HERE = pathlib.Path(__file__).resolve().parent
-ROOT = HERE.parent.parent
+ROOT = HERE / "library" if (HERE / "library").exists() else HERE.parent.parent
 LIBRARY = pathlib.Path(os.environ.get("BASALT_LIBRARY", ROOT / "build" / "python" / "library"))
 
 
@@ -32,6 +35,17 @@ class BuildWithLibrary(build_ext):
         super().run()
 
 
+class SourcesWithLibrary(sdist):
+    def make_release_tree(self, base_dir, files):
+        # setuptools lists its own egg_base below WORK, and some versions what the extension depends on.
+        super().make_release_tree(base_dir, [name for name in files if not os.path.isabs(name) and ".." not in name])
+        library = pathlib.Path(base_dir) / "library"
+        library.mkdir()
+        shutil.copy(ROOT / "CMakeLists.txt", library)
+        for folder in ("cmake", "include", "src"):
+            shutil.copytree(ROOT / folder, library / folder)
+
+
 ParallelCompile(default=os.cpu_count()).install()
 setup(
     ext_modules=[Extension(
@@ -41,10 +55,11 @@ setup(
                  str(LIBRARY / "src" / "libbasalt.a")],
         include_dirs=[str(HERE / "src"), str(ROOT / "include"), str(LIBRARY / "include"), pybind11.get_include(),
                       numpy.get_include()],
-        extra_compile_args=["-std=c++20", "-O3", "-ffp-contract=off", "-fvisibility=hidden", "-Wall", "-Wextra"],
+        extra_compile_args=["-std=c++20", "-O3", "-g0", "-ffp-contract=off", "-fvisibility=hidden", "-Wall", "-Wextra"],
         # The library's own symbols stay inside: a host that has loaded another basalt would otherwise lend its own.
-        extra_link_args=[f"-Wl,--version-script={HERE / 'src' / 'exported.map'}", str(LIBRARY / "src" / "libbasalt.a")],
+        extra_link_args=["-Wl,--strip-all", f"-Wl,--version-script={HERE / 'src' / 'exported.map'}",
+                         str(LIBRARY / "src" / "libbasalt.a")],
     )],
-    cmdclass={"build_ext": BuildWithLibrary},
+    cmdclass={"build_ext": BuildWithLibrary, "sdist": SourcesWithLibrary},
     options={"build": {"build_base": str(WORK)}, "egg_info": {"egg_base": str(WORK)}},
 )

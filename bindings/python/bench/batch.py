@@ -53,6 +53,15 @@ def main():
     compare("direct / pyproj", lambda: geo.direct(latitude, longitude, latitude, distance),
             lambda: geod.fwd(longitude, latitude, latitude, distance, radians=True))
 
+    ends = latitude[::-1], longitude[::-1]
+    compare("geodesic_inverse / pyproj", lambda: geo.geodesic_inverse(latitude, longitude, *ends),
+            lambda: geod.inv(longitude, latitude, *ends[::-1], radians=True))
+    frame = geo.LocalFrame(0.8, 0.1, 300.0)
+    to_local = pyproj.Transformer.from_pipeline(
+        f"+proj=topocentric +ellps=WGS84 +lat_0={np.degrees(0.8)} +lon_0={np.degrees(0.1)} +h_0=300")
+    compare("LocalFrame.xyz_to_local / pyproj", lambda: frame.xyz_to_local(x, y, z),
+            lambda: to_local.transform(x, y, z))
+
     random = np.random.default_rng(3)
     turns = np.sort(random.uniform(0, 2 * np.pi, 100))
     norths, easts = 100 * np.cos(turns), 100 * np.sin(turns)
@@ -64,8 +73,10 @@ def main():
     else:
         from shapely import vectorized
         contains = vectorized.contains
-    compare("in_polygon, 100 vertices / shapely", lambda: geo.in_polygon(north, east, norths, easts),
-            lambda: contains(outline, north, east))
+    prepared = geo.PreparedPolygon(norths, easts)
+    for name, ours in (("in_polygon", lambda: geo.in_polygon(north, east, norths, easts)),
+                       ("PreparedPolygon.contains", lambda: prepared.contains(north, east))):
+        compare(f"{name}, 100 vertices / shapely", ours, lambda: contains(outline, north, east))
 
 
 if __name__ == "__main__":

@@ -1,7 +1,11 @@
 // The WGS84 ellipsoid, lines on it, and covariances of positions.
+#include <algorithm>
+#include <cstddef>
 #include <limits>
 
 #include "basalt/geo.h"
+#include "basalt/geo/arrays.h"
+#include "basalt/geo/local_frame.h"
 #include "universal.h"
 
 namespace basalt_python {
@@ -37,23 +41,53 @@ void add_covariance(pybind11::module_& m, const char* name, const char* text) {
     add_general(m, name, text, "(),(),(),(6)->(6)", &loop, types, 4, 1);
 }
 
+// Arguments: the frame's origin and a point; the converted point.
+template <class In, class Out, std::size_t (basalt::LocalFrame::*CONVERT)(const In*, Out*, std::size_t) const>
+void add_frame(pybind11::module_& m, const char* name) {
+    add_blocks<6, 3>(m, name, "See LocalFrame.", [](const Column* columns, std::size_t count) {
+        geo_llh origins[BLOCK];
+        In in[BLOCK];
+        Out out[BLOCK];
+        read_records(columns, origins, count);
+        read_records(columns + 3, in, count);
+        const bool is_one_frame = columns[0].step == 0 && columns[1].step == 0 && columns[2].step == 0;
+        const std::size_t run = is_one_frame ? count : 1;
+        for (std::size_t i = 0; i < count; i += run) {
+            (basalt::LocalFrame(origins[i]).*CONVERT)(in + i, out + i, run);
+        }
+        write_records(columns + 6, out, count);
+    });
+}
+
 }  // namespace
 
 void add_geodesy(pybind11::module_& m) {
-    add(m, "llh_to_xyz",
+    add_blocks<3, 3>(
+        m, "llh_to_xyz",
         "llh_to_xyz(latitude, longitude, height): (x, y, z), metres; NaN where all three are 0, which is "
         "refused as a record never set (_llh2xyz).",
-        [](double latitude, double longitude, double height) {
-            const geo_llh llh{latitude, longitude, height};
-            geo_vector xyz{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER};
-            _llh2xyz(&llh, &xyz);
-            return std::tuple{xyz.x, xyz.y, xyz.z};
+        [](const Column* columns, std::size_t count) {
+            geo_llh llh[BLOCK];
+            geo_vector xyz[BLOCK];
+            read_records(columns, llh, count);
+            std::fill_n(xyz, count, geo_vector{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER});
+            basalt::to_cartesian(llh, xyz, count);
+            write_records(columns + 3, xyz, count);
         });
-    add(m, "_xyz_to_llh", "See xyz_to_llh.", [](double x, double y, double z, double tolerance) {
-        const geo_vector xyz{x, y, z};
-        geo_llh llh{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER};
-        _xyz2llh(&xyz, &llh, tolerance);
-        return std::tuple{llh.latitude, llh.longitude, llh.height};
+    add_blocks<4, 3>(m, "_xyz_to_llh", "See xyz_to_llh.", [](const Column* columns, std::size_t count) {
+        geo_vector xyz[BLOCK];
+        geo_llh llh[BLOCK];
+        double tolerances[BLOCK];
+        read_records(columns, xyz, count);
+        for (std::size_t i = 0; i < count; ++i) {
+            tolerances[i] = columns[3][i];
+        }
+        std::fill_n(llh, count, geo_llh{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER});
+        const std::size_t run = columns[3].step == 0 ? count : 1;
+        for (std::size_t i = 0; i < count; i += run) {
+            basalt::to_geodetic(xyz + i, llh + i, run, tolerances[i]);
+        }
+        write_records(columns + 4, llh, count);
     });
     add(m, "xyz_to_local",
         "xyz_to_local(origin_x, origin_y, origin_z, x, y, z): (north, east, elevation) in the plane that "
@@ -79,24 +113,50 @@ void add_geodesy(pybind11::module_& m) {
         [](double lat1, double lon1, double h1, double lat2, double lon2, double h2) {
             return llh_equal({lat1, lon1, h1}, {lat2, lon2, h2}) != 0;
         });
-    add(m, "direct",
+    add_frame<geo_llh, geo_nee, &basalt::LocalFrame::to_local>(m, "_frame_llh_to_local");
+    add_frame<geo_vector, geo_nee, &basalt::LocalFrame::to_local>(m, "_frame_xyz_to_local");
+    add_frame<geo_nee, geo_llh, &basalt::LocalFrame::to_geodetic>(m, "_frame_local_to_llh");
+    add_frame<geo_nee, geo_vector, &basalt::LocalFrame::to_cartesian>(m, "_frame_local_to_xyz");
+    add(m, "_is_frame_origin", "See LocalFrame.", [](double latitude, double longitude, double height) {
+        return basalt::LocalFrame({latitude, longitude, height}).valid();
+    });
+    add_blocks<4, 3>(
+        m, "direct",
         "direct(latitude, longitude, azimuth, distance): (latitude, longitude, azimuth) at the end of a "
         "geodesic; azimuths in [-pi, pi], the longitude not wrapped (geo_vincenty_direct).",
-        [](double latitude, double longitude, double azimuth, double distance) {
-            geo_llh end{};
-            double at_end = 0;
-            geo_vincenty_direct({latitude, longitude, 0}, azimuth, distance, at_end, end);
-            return std::tuple{end.latitude, end.longitude, at_end};
+        [](const Column* columns, std::size_t count) {
+            geo_llh starts[BLOCK], ends[BLOCK];
+            double azimuths[BLOCK], distances[BLOCK], at_ends[BLOCK];
+            for (std::size_t i = 0; i < count; ++i) {
+                starts[i] = {columns[0][i], columns[1][i], 0};
+                azimuths[i] = columns[2][i];
+                distances[i] = columns[3][i];
+            }
+            basalt::direct(starts, azimuths, distances, ends, at_ends, count);
+            for (std::size_t i = 0; i < count; ++i) {
+                columns[4][i] = ends[i].latitude;
+                columns[5][i] = ends[i].longitude;
+                columns[6][i] = at_ends[i];
+            }
+        });
+    add(m, "geodesic_inverse",
+        "geodesic_inverse(latitude1, longitude1, latitude2, longitude2): (distance, azimuth_from, "
+        "azimuth_to) "
+        "of the shortest line on the ellipsoid, metres and radians in [-pi, pi]; exact to 1.5e-8 m for every "
+        "pair of places, NaN for a latitude beyond a pole (basalt::geodesic_inverse).",
+        [](double lat1, double lon1, double lat2, double lon2) {
+            const auto line = basalt::geodesic_inverse({lat1, lon1, 0}, {lat2, lon2, 0});
+            return std::tuple{line.distance, line.azimuth_from, line.azimuth_to};
         });
     add(m, "great_circle_distance",
         "great_circle_distance(latitude1, longitude1, latitude2, longitude2): metres on a sphere of 6371 "
-        "km, up to 0.6 % off (geo_vincenty_distance).",
+        "km, up to 0.6 % off; geodesic_inverse is exact (geo_vincenty_distance).",
         [](double lat1, double lon1, double lat2, double lon2) {
             return geo_vincenty_distance({lat1, lon1, 0}, {lat2, lon2, 0});
         });
     add(m, "great_circle_bearing",
-        "great_circle_bearing(latitude1, longitude1, latitude2, longitude2): radians in [0, 2 pi) "
-        "(geo_vincenty_bearing).",
+        "great_circle_bearing(latitude1, longitude1, latitude2, longitude2): radians in [0, 2 pi) on a "
+        "sphere; geodesic_inverse is exact (geo_vincenty_bearing).",
         [](double lat1, double lon1, double lat2, double lon2) {
             return geo_vincenty_bearing({lat1, lon1, 0}, {lat2, lon2, 0});
         });

@@ -1,7 +1,17 @@
 // Points against polygons and lines: whole outlines are one item, points are broadcast against them.
+#include <pybind11/numpy.h>
+
+#include <algorithm>
+#include <cstddef>
+#include <memory>
+#include <optional>
+#include <stdexcept>
+#include <utility>
 #include <vector>
 
 #include "basalt/geo.h"
+#include "basalt/geo/polygon_measures.h"
+#include "basalt/geo/prepared_polygon.h"
 #include "universal.h"
 
 namespace basalt_python {
@@ -12,9 +22,12 @@ double number_at(const char* place) {
     return *reinterpret_cast<const double*>(place);
 }
 
+// Preparing a polygon costs as much as testing it directly for some 60 points.
+constexpr npy_intp POINTS_WORTH_PREPARING = 100;
+
 // Arguments: point's north and east, the outline's norths and easts, and a tolerance where there is one.
-// Usually one outline meets many points: it is copied only when it changes.
-template <bool HAS_TOLERANCE, class Test>
+// Usually one outline meets many points: it is copied only when it changes, and prepared for many.
+template <bool HAS_TOLERANCE, bool IS_AREA, class Test>
 void each_point(char** arguments, const npy_intp* sizes, const npy_intp* steps, void*) {
     as_python_error([&] {
         constexpr int OUT = HAS_TOLERANCE ? 5 : 4;
@@ -24,27 +37,34 @@ void each_point(char** arguments, const npy_intp* sizes, const npy_intp* steps, 
             throw std::length_error("an outline has at most 2147483647 vertices");
         }
         std::vector<geo_nee> outline(static_cast<std::size_t>(vertices));
+        const bool is_one_outline = steps[2] == 0 && steps[3] == 0;
+        std::optional<basalt::PreparedPolygon> prepared;
         for (npy_intp i = 0; i < sizes[0]; ++i) {
-            if (i == 0 || steps[2] != 0 || steps[3] != 0) {
+            if (i == 0 || !is_one_outline) {
                 for (npy_intp v = 0; v < vertices; ++v) {
                     outline[static_cast<std::size_t>(v)] = {
                         number_at(arguments[2] + i * steps[2] + v * steps[CORE]),
                         number_at(arguments[3] + i * steps[3] + v * steps[CORE + 1]), 0};
+                }
+                if (IS_AREA && is_one_outline && sizes[0] >= POINTS_WORTH_PREPARING) {
+                    prepared.emplace(outline);
                 }
             }
             const geo_nee point{number_at(arguments[0] + i * steps[0]),
                                 number_at(arguments[1] + i * steps[1]), 0};
             const double tolerance = HAS_TOLERANCE ? number_at(arguments[4] + i * steps[4]) : 0;
             *reinterpret_cast<bool*>(arguments[OUT] + i * steps[OUT]) =
-                Test{}(static_cast<int>(vertices), outline.data(), point, tolerance) != 0;
+                !prepared       ? Test{}(static_cast<int>(vertices), outline.data(), point, tolerance) != 0
+                : HAS_TOLERANCE ? prepared->contains(point, tolerance)
+                                : prepared->contains(point);
         }
     });
     forget_float_flags();
 }
 
-template <bool HAS_TOLERANCE, class Test>
+template <bool HAS_TOLERANCE, bool IS_AREA, class Test>
 void add_outline_test(pybind11::module_& m, const char* name, const char* text, Test) {
-    static PyUFuncGenericFunction loop = &each_point<HAS_TOLERANCE, Test>;
+    static PyUFuncGenericFunction loop = &each_point<HAS_TOLERANCE, IS_AREA, Test>;
     if constexpr (HAS_TOLERANCE) {
         static char types[] = {NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE, NPY_BOOL};
         add_general(m, name, text, "(),(),(n),(n),()->()", &loop, types, 5, 1);
@@ -54,28 +74,135 @@ void add_outline_test(pybind11::module_& m, const char* name, const char* text, 
     }
 }
 
+// Arguments: the outline's norths and easts; a number out.
+template <double (*MEASURE)(const geo_nee*, std::size_t) noexcept>
+void each_outline(char** arguments, const npy_intp* sizes, const npy_intp* steps, void*) {
+    as_python_error([&] {
+        std::vector<geo_nee> outline(static_cast<std::size_t>(sizes[1]));
+        for (npy_intp i = 0; i < sizes[0]; ++i) {
+            for (npy_intp v = 0; v < sizes[1]; ++v) {
+                outline[static_cast<std::size_t>(v)] = {number_at(arguments[0] + i * steps[0] + v * steps[3]),
+                                                        number_at(arguments[1] + i * steps[1] + v * steps[4]),
+                                                        0};
+            }
+            *reinterpret_cast<double*>(arguments[2] + i * steps[2]) = MEASURE(outline.data(), outline.size());
+        }
+    });
+    forget_float_flags();
+}
+
+template <double (*MEASURE)(const geo_nee*, std::size_t) noexcept>
+void add_measure(pybind11::module_& m, const char* name, const char* text) {
+    static PyUFuncGenericFunction loop = &each_outline<MEASURE>;
+    static char types[] = {NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE};
+    add_general(m, name, text, "(n),(n)->()", &loop, types, 2, 1);
+}
+
+// A prepared polygon, owned by each of the universal functions that test points against it.
+struct Prepared {
+    basalt::PreparedPolygon polygon;
+    void* data = &polygon;
+
+    explicit Prepared(const std::vector<geo_nee>& outline) : polygon(outline) {}
+};
+
+void each_prepared(char** arguments, const npy_intp* sizes, const npy_intp* steps, void* data) {
+    const auto& polygon = *static_cast<const basalt::PreparedPolygon*>(data);
+    const Column norths{arguments[0], steps[0]}, easts{arguments[1], steps[1]};
+    geo_nee points[BLOCK];
+    bool inside[BLOCK];
+    const auto total = static_cast<std::size_t>(*sizes);
+    for (std::size_t first = 0; first < total; first += BLOCK) {
+        const std::size_t count = std::min(total - first, BLOCK);
+        for (std::size_t i = 0; i < count; ++i) {
+            points[i] = {norths[first + i], easts[first + i], 0};
+        }
+        polygon.contains(points, count, inside);
+        for (std::size_t i = 0; i < count; ++i) {
+            *reinterpret_cast<bool*>(arguments[2] + static_cast<npy_intp>(first + i) * steps[2]) = inside[i];
+        }
+    }
+    forget_float_flags();
+}
+
+void each_prepared_or_near(char** arguments, const npy_intp* sizes, const npy_intp* steps, void* data) {
+    const auto& polygon = *static_cast<const basalt::PreparedPolygon*>(data);
+    for (npy_intp i = 0; i < *sizes; ++i) {
+        const auto number = [&](int argument) {
+            return number_at(arguments[argument] + i * steps[argument]);
+        };
+        *reinterpret_cast<bool*>(arguments[3] + i * steps[3]) =
+            polygon.contains({number(0), number(1), 0}, number(2));
+    }
+    forget_float_flags();
+}
+
+pybind11::object made_with(Prepared& prepared, const pybind11::object& owner, PyUFuncGenericFunction* loop,
+                           char* types, int inputs, const char* name) {
+    PyObject* made = PyUFunc_FromFuncAndData(loop, &prepared.data, types, 1, inputs, 1, PyUFunc_None, name,
+                                             "See PreparedPolygon.", 0);
+    if (made == nullptr) {
+        throw pybind11::error_already_set();
+    }
+    reinterpret_cast<PyUFuncObject*>(made)->obj = owner.inc_ref().ptr();  // released with the function
+    return pybind11::reinterpret_steal<pybind11::object>(made);
+}
+
+using Numbers = pybind11::array_t<double, pybind11::array::c_style>;
+
+// Two functions: of north and east, and of these and a tolerance.
+std::pair<pybind11::object, pybind11::object> prepared_polygon(const Numbers& norths, const Numbers& easts) {
+    if (norths.ndim() != 1 || easts.ndim() != 1 || norths.size() != easts.size()) {
+        throw std::invalid_argument("an outline has as many norths as easts, along one axis");
+    }
+    std::vector<geo_nee> outline(static_cast<std::size_t>(norths.size()));
+    for (std::size_t i = 0; i < outline.size(); ++i) {
+        outline[i] = {norths.data()[i], easts.data()[i], 0};
+    }
+    auto prepared = std::make_unique<Prepared>(outline);
+    const pybind11::capsule owner(prepared.get(), [](void* held) { delete static_cast<Prepared*>(held); });
+    Prepared& kept = *prepared.release();
+    static PyUFuncGenericFunction loops[] = {&each_prepared, &each_prepared_or_near};
+    static char types[] = {NPY_DOUBLE, NPY_DOUBLE, NPY_BOOL};
+    static char types_near[] = {NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE, NPY_BOOL};
+    return {made_with(kept, owner, &loops[0], types, 2, "contains"),
+            made_with(kept, owner, &loops[1], types_near, 3, "contains_or_near")};
+}
+
 }  // namespace
 
 void add_polygons(pybind11::module_& m) {
-    add_outline_test<false>(m, "in_polygon",
-                            "in_polygon(north, east, norths, easts): whether points lie inside polygons, "
-                            "whose vertices lie along the last axis; on an edge what rounding leaves "
-                            "(geo_point_in_poly).",
-                            [](int n, const geo_nee* polygon, const geo_nee& point, double) {
-                                return geo_point_in_poly(n, polygon, &point);
-                            });
-    add_outline_test<true>(m, "in_polygon_or_near",
-                           "in_polygon_or_near(north, east, norths, easts, tolerance): as in_polygon, or "
-                           "within so many metres of the outline (geo_point_in_poly_2).",
-                           [](int n, const geo_nee* polygon, const geo_nee& point, double tolerance) {
-                               return geo_point_in_poly_2(n, polygon, &point, tolerance);
-                           });
-    add_outline_test<true>(m, "on_polyline",
-                           "on_polyline(north, east, norths, easts, tolerance): whether points lie within "
-                           "so many metres of a closed chain of segments (geo_point_on_polyline).",
-                           [](int n, const geo_nee* vertices, const geo_nee& point, double tolerance) {
-                               return geo_point_on_polyline(n, vertices, &point, tolerance);
-                           });
+    add_outline_test<false, true>(
+        m, "in_polygon",
+        "in_polygon(north, east, norths, easts): whether points lie inside polygons, "
+        "whose vertices lie along the last axis; on an edge what rounding leaves "
+        "(geo_point_in_poly).",
+        [](int n, const geo_nee* polygon, const geo_nee& point, double) {
+            return geo_point_in_poly(n, polygon, &point);
+        });
+    add_outline_test<true, true>(
+        m, "in_polygon_or_near",
+        "in_polygon_or_near(north, east, norths, easts, tolerance): as in_polygon, or "
+        "within so many metres of the outline (geo_point_in_poly_2).",
+        [](int n, const geo_nee* polygon, const geo_nee& point, double tolerance) {
+            return geo_point_in_poly_2(n, polygon, &point, tolerance);
+        });
+    add_outline_test<true, false>(
+        m, "on_polyline",
+        "on_polyline(north, east, norths, easts, tolerance): whether points lie within "
+        "so many metres of a closed chain of segments (geo_point_on_polyline).",
+        [](int n, const geo_nee* vertices, const geo_nee& point, double tolerance) {
+            return geo_point_on_polyline(n, vertices, &point, tolerance);
+        });
+    add_measure<&basalt::polygon_area>(
+        m, "polygon_area",
+        "polygon_area(norths, easts): square metres enclosed by polygons, whose vertices lie along the last "
+        "axis; positive where they run clockwise (basalt::polygon_area).");
+    add_measure<&basalt::polygon_perimeter>(
+        m, "polygon_perimeter",
+        "polygon_perimeter(norths, easts): metres around polygons, whose vertices lie along the last axis; "
+        "the closing edge counts (basalt::polygon_perimeter).");
+    m.def("_prepared_polygon", &prepared_polygon);
     add(m, "on_line",
         "on_line(north1, east1, north2, east2, north, east, tolerance): whether a point lies within so "
         "many metres of a segment (geo_point_on_line).",

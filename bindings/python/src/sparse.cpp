@@ -7,8 +7,6 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
-#include <exception>
-#include <limits>
 #include <memory>
 #include <mutex>
 #include <tuple>
@@ -16,6 +14,7 @@
 #include <vector>
 
 #include "basalt/sparse.h"
+#include "basalt/sparse_cells.h"
 #include "universal.h"
 
 namespace basalt_python {
@@ -23,6 +22,7 @@ namespace basalt_python {
 namespace {
 
 namespace py = pybind11;
+using basalt::SparseCells;
 using Cells = py::array_t<std::int32_t, py::array::c_style>;
 using Bytes = py::array_t<std::uint8_t, py::array::c_style>;
 using Flags = py::array_t<bool, py::array::c_style>;
@@ -43,19 +43,19 @@ public:
     SparseBytes(std::size_t element_size, std::size_t block_side, std::size_t elements_per_chunk)
         : m_size(element_size), m_array(std::max(element_size, LEAST_SIZE), block_side, elements_per_chunk) {}
 
+    // Neighbours along a row are inserted in one call.
     void insert(const Cells& x, const Cells& y, const Bytes& elements) {
         check(x, y, elements.size());
         const auto [xs, ys, bytes] = std::tuple{x.data(), y.data(), elements.data()};
         const py::ssize_t count = x.size();
         alone([&] {
-            std::uint8_t padded[LEAST_SIZE] = {};
-            for (py::ssize_t i = 0; i < count; ++i) {
-                const std::uint8_t* element = bytes + static_cast<std::size_t>(i) * m_size;
-                if (m_size < LEAST_SIZE) {
-                    std::memcpy(padded, element, m_size);
-                    element = padded;
+            for (py::ssize_t i = 0, run = 0; i < count; i += run) {
+                run = 1;
+                while (i + run < count && ys[i + run] == ys[i] && xs[i + run] == xs[i] + run) {
+                    ++run;
                 }
-                m_array.Insert(xs[i], ys[i], element);
+                SparseCells::insert_row(m_array, xs[i], ys[i], bytes + static_cast<std::size_t>(i) * m_size,
+                                        m_size, static_cast<std::size_t>(run));
             }
         });
     }
@@ -63,24 +63,87 @@ public:
     // Elements, zero where there is none, and whether there is one.
     std::pair<Bytes, Flags> find(const Cells& x, const Cells& y) {
         check(x, y, x.size() * static_cast<py::ssize_t>(m_size));
-        const py::ssize_t count = x.size();
-        Bytes elements(count * static_cast<py::ssize_t>(m_size));
-        Flags found(count);
+        const auto count = static_cast<std::size_t>(x.size());
+        Bytes elements(x.size() * static_cast<py::ssize_t>(m_size));
+        Flags found(x.size());
         const auto [xs, ys] = std::pair{x.data(), y.data()};
         const auto [bytes, flags] = std::pair{elements.mutable_data(), found.mutable_data()};
         alone([&] {
-            for (py::ssize_t i = 0; i < count; ++i) {
-                const void* element = m_array.Find(xs[i], ys[i]);
-                std::uint8_t* to = bytes + static_cast<std::size_t>(i) * m_size;
-                flags[i] = element != nullptr;
-                if (element != nullptr) {
-                    std::memcpy(to, element, m_size);
-                } else {
-                    std::memset(to, 0, m_size);
+            basalt::GridCell cells[BLOCK];
+            void* at[BLOCK];
+            for (std::size_t first = 0; first < count; first += BLOCK) {
+                const std::size_t some = std::min(count - first, BLOCK);
+                for (std::size_t i = 0; i < some; ++i) {
+                    cells[i] = {xs[first + i], ys[first + i]};
+                }
+                SparseCells::find(m_array, cells, at, some);
+                for (std::size_t i = 0; i < some; ++i) {
+                    std::uint8_t* to = bytes + (first + i) * m_size;
+                    flags[first + i] = at[i] != nullptr;
+                    if (at[i] != nullptr) {
+                        std::memcpy(to, at[i], m_size);
+                    } else {
+                        std::memset(to, 0, m_size);
+                    }
                 }
             }
         });
         return {std::move(elements), std::move(found)};
+    }
+
+    // Calls change(elements, found) and inserts the elements that it returns. Other threads wait.
+    void update(const Cells& x, const Cells& y, const py::function& change) {
+        const auto guard = locked();
+        const auto [elements, found] = find(x, y);
+        insert(x, y, change(elements, found).cast<Bytes>());
+    }
+
+    // Rows from y on, each of so many cells from x on.
+    void insert_rows(std::int32_t x, std::int32_t y, std::size_t columns, const Bytes& elements) {
+        const std::uint8_t* row = elements.data();
+        const std::uint8_t* const end = row + elements.size();
+        alone([&] {
+            for (; row != end; row += columns * m_size) {
+                SparseCells::insert_row(m_array, x, y++, row, m_size, columns);
+            }
+        });
+    }
+
+    // Into arrays of the caller; elements of empty cells are left.
+    void copy_rows(std::int32_t x, std::int32_t y, std::size_t columns, Bytes& elements, Flags& found) {
+        std::uint8_t* row = elements.mutable_data();
+        bool* flags = found.mutable_data();
+        const bool* const end = flags + found.size();
+        alone([&] {
+            for (; flags != end; flags += columns, row += columns * m_size) {
+                SparseCells::copy_row(m_array, x, y++, row, m_size, flags, columns);
+            }
+        });
+    }
+
+    // How many cells of a rectangle held an element.
+    std::size_t remove_window(std::int32_t min_x, std::int32_t min_y, std::int32_t max_x,
+                              std::int32_t max_y) {
+        struct Context {
+            vex_util::Sparse2DArray& array;
+            std::size_t removed;
+        } context{m_array, 0};
+        const basalt::GridWindow window{min_x, min_y, max_x, max_y};
+        const auto remove = [](const SparseCells::Row& row, void* at) {
+            auto& [array, removed] = *static_cast<Context*>(at);
+            const int first = __builtin_ctzll(row.wanted), end = 64 - __builtin_clzll(row.wanted);
+            removed +=
+                SparseCells::remove_row(array, row.x + first, row.y, static_cast<std::size_t>(end - first));
+            return true;
+        };
+        alone([&] { SparseCells::visit(m_array, &window, remove, &context); });
+        return context.removed;
+    }
+
+    std::size_t size() {
+        std::size_t filled = 0;
+        alone([&] { filled = SparseCells::size(m_array); });
+        return filled;
     }
 
     Flags remove(const Cells& x, const Cells& y) {
@@ -103,63 +166,40 @@ public:
     using Selected =
         std::tuple<py::array_t<std::int32_t>, py::array_t<std::int32_t>, py::array_t<std::uint8_t>>;
 
-    // What lies inside the rectangle, corners included.
+    // Cells inside the rectangle, corners included.
     Selected select(std::int32_t min_x, std::int32_t min_y, std::int32_t max_x, std::int32_t max_y) {
-        Window window{{min_x, min_y}, {max_x, max_y}, m_size, {}, {}, {}, {}};
-        alone([&] {
-            if (m_array.Select(window.min, window.max)) {
-                Window* collected = &window;  // the visit hands its context on as read-only
-                m_array.IterateSelected(&collect, &collected);
-            }
-        });
-        return given(window);
+        const basalt::GridWindow window{min_x, min_y, max_x, max_y};
+        return visited(&window);
     }
 
-    Selected all() {
-        constexpr int LEAST = std::numeric_limits<std::int32_t>::min();
-        constexpr int GREATEST = std::numeric_limits<std::int32_t>::max();
-        Window window{{LEAST, LEAST}, {GREATEST, GREATEST}, m_size, {}, {}, {}, {}};
-        alone([&] {
-            Window* collected = &window;
-            m_array.IterateAll(&collect, &collected);
-        });
-        return given(window);
-    }
+    Selected all() { return visited(nullptr); }
 
 private:
-    static constexpr std::size_t LEAST_SIZE = 8;  // what the library copies at least
+    static constexpr std::size_t LEAST_SIZE = 8;  // smallest element that the library stores
 
-    struct Window {
-        int min[2];
-        int max[2];
+    struct Visited {
         std::size_t size;
         std::vector<std::int32_t> xs, ys;
         std::vector<std::uint8_t> bytes;
-        std::exception_ptr error;
     };
 
-    static bool collect(int x, int y, const void* element, const void* context) {
-        Window& window = **static_cast<Window* const*>(context);
-        if (x < window.min[0] || x > window.max[0] || y < window.min[1] || y > window.max[1]) {
-            return true;  // of a block that only meets the rectangle
-        }
-        try {
-            window.xs.push_back(x);
-            window.ys.push_back(y);
-            const auto* first = static_cast<const std::uint8_t*>(element);
-            window.bytes.insert(window.bytes.end(), first, first + window.size);
-        } catch (...) {
-            window.error = std::current_exception();
-        }
-        return window.error == nullptr;
+    Selected visited(const basalt::GridWindow* window) {
+        Visited cells{m_size, {}, {}, {}};
+        alone([&] { SparseCells::visit(m_array, window, &collect, &cells); });
+        return {array_of(std::move(cells.xs)), array_of(std::move(cells.ys)),
+                array_of(std::move(cells.bytes))};
     }
 
-    static Selected given(Window& window) {
-        if (window.error != nullptr) {
-            std::rethrow_exception(window.error);
+    static bool collect(const SparseCells::Row& row, void* context) {
+        auto& [size, xs, ys, bytes] = *static_cast<Visited*>(context);
+        for (std::uint64_t left = *row.filled & row.wanted; left != 0; left &= left - 1) {
+            const int i = __builtin_ctzll(left);
+            xs.push_back(row.x + i);
+            ys.push_back(row.y);
+            const auto* element = static_cast<const std::uint8_t*>(row.elements[i]);
+            bytes.insert(bytes.end(), element, element + size);
         }
-        return {array_of(std::move(window.xs)), array_of(std::move(window.ys)),
-                array_of(std::move(window.bytes))};
+        return true;
     }
 
     void check(const Cells& x, const Cells& y, py::ssize_t bytes) const {
@@ -169,8 +209,13 @@ private:
         }
     }
 
-    // A batch is one step for other threads of Python, whose interpreter goes on meanwhile. The interpreter's
-    // lock is released before this one is taken, which avoids a deadlock.
+    // The interpreter's lock is released before this one is taken, which avoids a deadlock.
+    std::unique_lock<std::recursive_mutex> locked() {
+        const py::gil_scoped_release others_run;
+        return std::unique_lock(m_mutex);
+    }
+
+    // A batch is one step for other threads of Python, whose interpreter goes on meanwhile.
     template <class Work>
     void alone(Work work) {
         const py::gil_scoped_release others_run;
@@ -179,7 +224,7 @@ private:
     }
 
     std::size_t m_size;
-    std::mutex m_mutex;
+    std::recursive_mutex m_mutex;
     vex_util::Sparse2DArray m_array;
 };
 
@@ -191,6 +236,12 @@ void add_sparse(pybind11::module_& module) {
         .def("insert", &SparseBytes::insert)
         .def("find", &SparseBytes::find)
         .def("remove", &SparseBytes::remove)
+        .def("update", &SparseBytes::update)
+        .def("insert_rows", &SparseBytes::insert_rows)
+        .def("copy_rows", &SparseBytes::copy_rows, py::arg(), py::arg(), py::arg(), py::arg().noconvert(),
+             py::arg().noconvert())
+        .def("remove_window", &SparseBytes::remove_window)
+        .def("size", &SparseBytes::size)
         .def("clear", &SparseBytes::clear)
         .def("select", &SparseBytes::select)
         .def("all", &SparseBytes::all);

@@ -15,8 +15,10 @@
 #include <numpy/arrayobject.h>
 #include <numpy/ufuncobject.h>
 
+#include <algorithm>
 #include <array>
 #include <cfenv>
+#include <cstddef>
 #include <cstdint>
 #include <exception>
 #include <tuple>
@@ -108,6 +110,9 @@ struct Universal<Kernel, Out (Kernel::*)(In...) const> {
     static constexpr auto TYPES = types_of(std::make_index_sequence<OUTPUTS>{});
 };
 
+// A function's help with the units of its arguments, which their names imply. The text stays to the end.
+const char* with_units(const char* text);
+
 // Adds a universal function to a module; name and text have static storage. Of several kernels, for other
 // types of the same numbers, NumPy takes the first whose types hold what it is given.
 template <class Kernel, class... Others>
@@ -119,7 +124,72 @@ void add(pybind11::module_& module, const char* name, const char* text, Kernel, 
     static auto types =
         std::array<std::array<char, First::TYPES.size()>, KERNELS>{First::TYPES, Universal<Others>::TYPES...};
     PyObject* made = PyUFunc_FromFuncAndData(loops, nothing, types[0].data(), KERNELS, First::INPUTS,
-                                             First::OUTPUTS, PyUFunc_None, name, text, 0);
+                                             First::OUTPUTS, PyUFunc_None, name, with_units(text), 0);
+    if (made == nullptr) {
+        throw pybind11::error_already_set();
+    }
+    module.attr(name) = pybind11::reinterpret_steal<pybind11::object>(made);
+}
+
+// The numbers of one argument.
+struct Column {
+    char* first;
+    npy_intp step;
+
+    double& operator[](std::size_t i) const {
+        return *reinterpret_cast<double*>(first + static_cast<npy_intp>(i) * step);
+    }
+};
+
+template <class Record>
+void read_records(const Column* columns, Record* records, std::size_t count) {
+    for (std::size_t i = 0; i < count; ++i) {
+        records[i] = {columns[0][i], columns[1][i], columns[2][i]};
+    }
+}
+
+template <class Record>
+void write_records(const Column* columns, const Record* records, std::size_t count) {
+    for (std::size_t i = 0; i < count; ++i) {
+        const auto& [first, second, third] = records[i];
+        columns[0][i] = first;
+        columns[1][i] = second;
+        columns[2][i] = third;
+    }
+}
+
+// How many items a kernel for blocks takes at most: their records fit into the first-level cache.
+constexpr std::size_t BLOCK = 256;
+
+template <int ARGUMENTS, class Kernel>
+void each_block(char** arguments, const npy_intp* sizes, const npy_intp* steps, void*) {
+    as_python_error([&] {
+        std::array<Column, ARGUMENTS> columns;
+        for (std::size_t i = 0; i < columns.size(); ++i) {
+            columns[i] = {arguments[i], steps[i]};
+        }
+        for (auto left = static_cast<std::size_t>(*sizes); left != 0;) {
+            const std::size_t count = std::min(left, BLOCK);
+            Kernel{}(columns.data(), count);
+            for (Column& column : columns) {
+                column.first += static_cast<npy_intp>(count) * column.step;
+            }
+            left -= count;
+        }
+    });
+    forget_float_flags();
+}
+
+// Adds a universal function over the library's array calls. The kernel takes the columns, inputs first, and
+// a count of items; it reads all of them before it writes, since an output may be an input.
+template <int INPUTS, int OUTPUTS, class Kernel>
+void add_blocks(pybind11::module_& module, const char* name, const char* text, Kernel) {
+    static PyUFuncGenericFunction loop = &each_block<INPUTS + OUTPUTS, Kernel>;
+    static void* nothing = nullptr;
+    static std::array<char, INPUTS + OUTPUTS> types;
+    types.fill(NPY_DOUBLE);
+    PyObject* made = PyUFunc_FromFuncAndData(&loop, &nothing, types.data(), 1, INPUTS, OUTPUTS, PyUFunc_None,
+                                             name, with_units(text), 0);
     if (made == nullptr) {
         throw pybind11::error_already_set();
     }
@@ -131,7 +201,7 @@ inline void add_general(pybind11::module_& module, const char* name, const char*
                         PyUFuncGenericFunction* loop, char* types, int inputs, int outputs) {
     static void* nothing = nullptr;
     PyObject* made = PyUFunc_FromFuncAndDataAndSignature(loop, &nothing, types, 1, inputs, outputs,
-                                                         PyUFunc_None, name, text, 0, signature);
+                                                         PyUFunc_None, name, with_units(text), 0, signature);
     if (made == nullptr) {
         throw pybind11::error_already_set();
     }

@@ -148,6 +148,8 @@ FUNCTIONS = {
     "slope_angle": ([METRES] * 6, lambda a, b, c, d, e, f: np.arctan2(f - c, np.hypot(d - a, e - b))),
     "grade": ([METRES] * 6, lambda a, b, c, d, e, f: (f - c) / np.hypot(d - a, e - b)),
     "triangle_area": ([METRES] * 6, lambda a, b, c, d, e, f: abs((c - a) * (f - b) - (e - a) * (d - b)) / 2),
+    "polygon_area": ([METRES] * 2, lambda n, e: np.dot(n, np.roll(e, -1)) / 2 - np.dot(np.roll(n, -1), e) / 2),
+    "polygon_perimeter": ([METRES] * 2, lambda n, e: np.hypot(n - np.roll(n, 1), e - np.roll(e, 1)).sum()),
     "normalise_bearing": ([(-60.0, 60.0)], lambda b: np.mod(b, 2 * PI)),
     "divergence": ([TURN] * 2, turn),
     "divergence_of_lines": ([METRES] * 8, lambda a, b, c, d, e, f, g, h: turn(bearing(c - a, d - b),

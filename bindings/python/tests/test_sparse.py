@@ -1,5 +1,5 @@
 """The sparse grid of records, beside a dictionary."""
-import threading
+from concurrent.futures import ThreadPoolExecutor
 
 import numpy as np
 import pytest
@@ -34,6 +34,15 @@ def test_batches_agree_with_a_dictionary(dtype):
                            {c: e for c, e in model.items() if -7 <= c[0] <= 12 and 3 <= c[1] <= 9})):
         got = {(int(a), int(b)): element.tobytes() for a, b, element in zip(*chosen)}
         assert got == wanted and len(chosen[0]) == len(wanted)
+    assert len(array) == len(model) and set(array) == set(model) and f"{len(model)} cells" in repr(array)
+    dense, filled = array.window((-41, -20), (30, 9))
+    rows, columns = slice(-20 + 41, 9 + 42), slice(0, 30 + 42)
+    assert dense.tobytes() == elements.T[rows, columns].tobytes() and (filled == found.T[rows, columns]).all()
+    copy = Sparse2DArray(dtype)
+    copy.insert_window((-41, -20), dense)
+    assert (copy.window((-41, -20), (30, 9))[0] == dense).all() and len(copy) == dense.size
+    assert copy.remove_window((0, 0), (2**31 - 1, 2**31 - 1)) == 31 * 10 and len(copy) == dense.size - 310
+    assert (-1, 9) in copy and (0, 0) not in copy
     array.clear()
     assert len(array.all()[0]) == 0
 
@@ -45,18 +54,30 @@ def test_cells_of_the_whole_plane_and_none_beyond():
     assert array.find(edges, edges)[0].tolist() == [1.0, 2.0]
     assert len(array.select((edges[0],) * 2, (edges[1],) * 2)[0]) == 2
     assert len(array.select((5, 5), (0, 0))[0]) == 0
-    for bad in (2**31, -(2**31) - 1):
-        with pytest.raises(ValueError):
-            array.insert(bad, 0, 1.0)
-        with pytest.raises(ValueError):
-            array.select((0, 0), (0, bad))
-    with pytest.raises(TypeError):
-        array.find(0.5, 0)
-    with pytest.raises(ValueError):
-        array.insert([1, 2], [1, 2, 3], 0.0)
-    with pytest.raises(ValueError):
-        array.insert([1, 2], [1, 2], [1.0, 2.0, 3.0])
     assert len(array.all()[0]) == 2
+
+
+@pytest.mark.parametrize("error, call", [
+    (ValueError, lambda array: array.insert(2**31, 0, 1.0)),
+    (ValueError, lambda array: array.insert(-(2**31) - 1, 0, 1.0)),
+    (ValueError, lambda array: array.select((0, 0), (0, 2**31))),
+    (ValueError, lambda array: array.select((0, 0), (0, -(2**31) - 1))),
+    (TypeError, lambda array: array.find(0.5, 0)),
+    (ValueError, lambda array: array.insert([1, 2], [1, 2, 3], 0.0)),
+    (ValueError, lambda array: array.insert([1, 2], [1, 2], [1.0, 2.0, 3.0])),
+    (ValueError, lambda array: array.insert_window((2**31 - 1, 0), [1, 2])),
+    (ValueError, lambda array: array.insert_window((0, 2**31 - 1), [[1], [2]])),
+    (KeyError, lambda array: array[0, 1]),
+    (ValueError, lambda array: array.update([1, 1], 5, lambda elements, found: elements)),
+    (ValueError, lambda array: array.update([0, 1], 5, lambda elements, found: [1, 2, 3])),
+    (KeyError, lambda array: array.update([0, 1], 5, lambda elements, found: array[9, 9])),
+])
+def test_what_is_refused_changes_nothing(error, call):
+    array = Sparse2DArray("f8")
+    array[0, 0] = 1.0
+    with pytest.raises(error):
+        call(array)
+    assert set(array) == {(0, 0)}
 
 
 def test_elements_are_plain_and_results_live_on_their_own():
@@ -71,9 +92,9 @@ def test_elements_are_plain_and_results_live_on_their_own():
     array.clear()
     del array
     assert x.tolist() == list(range(10, 20)) and set(y) == {7} and elements.tolist() == list(range(10, 20))
-    array = Sparse2DArray("i8")
-    array.insert([], [], [])
-    assert array.find([], [])[0].shape == (0,)
+    empty = Sparse2DArray("i8")
+    empty.insert([], [], [])
+    assert empty.find([], [])[0].shape == (0,)
 
 
 def test_nothing_is_cut_on_the_way_in():
@@ -105,6 +126,19 @@ def test_fields_go_by_their_names():
     assert array.find(0, 0)[0].item() == (1.5, 2)
 
 
+def test_cells_are_read_written_and_changed_in_place():
+    array = Sparse2DArray("i4")
+    array[3, -4] = 7
+    array[[0, 1], 5] = [1, 2]
+    assert array[3, -4] == 7 and array[[1, 0], 5].tolist() == [2, 1]
+    array.update([0, 1, 2], 5, lambda elements, found: elements + 10 * found + 1)
+    assert array[np.arange(3), 5].tolist() == [12, 13, 1]
+    array.update(3, -4, lambda elements, found: elements + array[0, 5])
+    assert array[3, -4] == 19
+    array.insert_window((0, 0), [])
+    assert len(array) == 4 and array.window((1, 1), (0, 0))[0].shape == (0, 0)
+
+
 def test_threads_share_an_array():
     array = Sparse2DArray("i8")
     cells = np.arange(20_000)
@@ -114,11 +148,10 @@ def test_threads_share_an_array():
             array.insert(cells, row, cells * row)
             assert (array.find(cells, row)[0] == cells * row).all()
             array.select((0, row), (1000, row))
+            array.update([0, 1], 0, lambda elements, found: elements + 1)
 
-    threads = [threading.Thread(target=work, args=(row,)) for row in range(1, 5)]
-    for thread in threads:
-        thread.start()
-    for thread in threads:
-        thread.join()
+    with ThreadPoolExecutor(4) as pool:
+        list(pool.map(work, range(1, 5)))
     x, y, elements = array.all()
-    assert len(x) == 80_000 and (elements == x.astype(int) * y).all()
+    assert len(x) == 80_002 and (elements[y > 0] == (x.astype(int) * y)[y > 0]).all()
+    assert array[[0, 1], 0].tolist() == [20, 20]

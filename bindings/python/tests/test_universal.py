@@ -13,7 +13,8 @@ from basalt import geo, time_scales, units
 DATA = pathlib.Path(__file__).resolve().parents[3] / "tests" / "data"
 OTHERWISE = {  # held in tests of their own
     "in_polygon", "in_polygon_or_near", "on_polyline", "direct", "cross_track", "mjd_to_date", "java_time_to_calendar",
-    "radians_to_dms", "metres_to_feet_inches", "GEO_INFINITY", "GEO_NULL", "current_java_time"}
+    "radians_to_dms", "metres_to_feet_inches", "GEO_INFINITY", "GEO_NULL", "current_java_time", "geodesic_inverse",
+    "LocalFrame", "PreparedPolygon", "format_angle", "parse_angle"}
 
 
 def bound(name):
@@ -46,15 +47,18 @@ def test_results_agree_with_the_plain_form(name):
 def test_geodesics_end_where_an_independent_program_has_them():
     rows = np.loadtxt(DATA / "geodesics.csv", delimiter=",")
     p1, l1, a1, s, p2, l2, _ = rows.T[:7]
-    latitude, longitude, _ = geo.direct(*np.deg2rad([p1, l1, a1]), s)
-    np.testing.assert_allclose(latitude, np.deg2rad(p2), rtol=0, atol=1e-10)
-    east = (np.mod(longitude - np.deg2rad(l2) + np.pi, 2 * np.pi) - np.pi) * np.cos(latitude)
-    np.testing.assert_allclose(east, 0, rtol=0, atol=1e-10)
+    distance, azimuth, _ = geo.geodesic_inverse(*np.deg2rad([p1, l1, p2, l2]))
+    np.testing.assert_allclose(distance, s, rtol=0, atol=2e-8)
+    for start_azimuth in (np.deg2rad(a1), azimuth):
+        latitude, longitude, _ = geo.direct(*np.deg2rad([p1, l1]), start_azimuth, s)
+        np.testing.assert_allclose(latitude, np.deg2rad(p2), rtol=0, atol=1e-10)
+        east = (np.mod(longitude - np.deg2rad(l2) + np.pi, 2 * np.pi) - np.pi) * np.cos(latitude)
+        np.testing.assert_allclose(east, 0, rtol=0, atol=1e-10)
     assert geo.cross_track(0, 0, 0, 0.01, 0.001, 0.005) == pytest.approx(6371, rel=1e-6)  # left of a line to the east
     assert geo.cross_track(0, 0.01, 0, 0, 0.001, 0.005) == pytest.approx(-6371, rel=1e-6)
 
 
-@pytest.mark.parametrize("name", ["slope_distance", "direct", "mjd_to_gps"])
+@pytest.mark.parametrize("name", ["slope_distance", "direct", "llh_to_xyz", "xyz_to_llh", "mjd_to_gps"])
 def test_strides_do_not_matter_and_nothing_is_written_to(name):
     made = columns(name, 3000) if name in FUNCTIONS else columns("great_circle_distance", 3000)
     apart = []
@@ -63,8 +67,24 @@ def test_strides_do_not_matter_and_nothing_is_written_to(name):
         wide[:, 1] = column
         apart.append(wide[:, 1][::-1])
         apart[-1].flags.writeable = False
-    for ours, theirs in zip(called(name, apart), called(name, made), strict=True):
-        assert ours[::-1].tobytes() == theirs.tobytes()
+    one = called(name, [column[2000:2001] for column in made])
+    for ours, theirs, single in zip(called(name, apart), called(name, made), one, strict=True):
+        assert ours[::-1].tobytes() == theirs.tobytes() and single[0] == theirs[2000]
+
+
+def test_a_local_frame_agrees_with_single_conversions():
+    llh = columns("llh_to_xyz", 1000)
+    xyz = geo.llh_to_xyz(*llh)
+    frame = geo.LocalFrame(0.8, 0.1, 300.0)
+    local = np.array(geo.xyz_to_local(*geo.llh_to_xyz(0.8, 0.1, 300.0), *xyz))
+    for ours in (frame.llh_to_local(*llh), frame.xyz_to_local(*xyz)):
+        assert np.array(ours).tobytes() == local.tobytes()
+    np.testing.assert_allclose(frame.local_to_xyz(*local), xyz, rtol=0, atol=1e-6)
+    back = np.array(frame.local_to_llh(*local))
+    each = geo.xyz_to_llh(*frame.local_to_xyz(*local), np.full(1000, 5e-10))
+    assert np.array(each).tobytes() == back.tobytes()
+    assert frame.valid and not geo.LocalFrame(0, 0, 0).valid
+    assert geo.LocalFrame(0, 0, 0).xyz_to_local(1.0, 2.0, 3.0) == (geo.GEO_NULL,) * 3
 
 
 def test_arrays_are_not_copied():
@@ -92,6 +112,10 @@ def test_arrays_are_broadcast_and_scalars_stay_scalars():
     (TypeError, lambda: geo.direct(0, 0, 0)),
     (ValueError, lambda: time_scales.date_to_mjd([2024, 70000, 2024], 1, 1)),
     (ValueError, lambda: time_scales.mjd_to_date(-1)),
+    (ValueError, lambda: time_scales.date_to_mjd(2023, [2, 13], [29, 1])),
+    (ValueError, lambda: geo.PreparedPolygon([0, 1], [0, 1, 2])),
+    (ValueError, lambda: units.parse_angle("12-60")),
+    (ValueError, lambda: units.format_angle(1.0, 0, "east")),
     (ValueError, lambda: units.dms_to_radians(2**31, 0, 0.0)),
     (ValueError, lambda: time_scales.java_time_to_calendar(-1)),
     (ValueError, lambda: geo.covariance_to_neu(6e6, 0, 0, np.zeros((2, 5)))),
@@ -127,6 +151,9 @@ def test_dates_and_lengths_convert_both_ways():
     assert time_scales.calendar_to_java_time(2023, 2, 29, 0, 0, 0, 0) == 2**64 - 1
     assert units.metres_to_feet_inches(-1200 / 3937 * 5.5, 16) == (False, 5, pytest.approx(6.0), 0, 0)
     assert units.radians_to_dms(units.dms_to_radians(-12, 30, 1.5)) == (-12, 30, pytest.approx(1.5))
+    assert units.radians_to_dms(units.dms_to_radians(0, -30, -1.5)) == (0, -30, pytest.approx(-1.5))
+    assert units.parse_angle("0-30-01.5S") == pytest.approx(units.dms_to_radians(0, -30, -1.5), abs=1e-15)
+    assert units.format_angle(np.deg2rad(-0.5), 1, "latitude") == "0-30-00.0S"
 
 
 def test_points_meet_one_outline_or_one_each():
@@ -138,10 +165,14 @@ def test_points_meet_one_outline_or_one_each():
                for i in range(200)]
     inside = geo.in_polygon(north, east, norths, easts)
     assert (inside == np.sum(crossed, axis=0) % 2).all() and 1000 < inside.sum() < 4000
+    assert (geo.in_polygon(north[:50], east[:50], norths, easts) == inside[:50]).all()  # too few to prepare for
+    prepared = geo.PreparedPolygon(norths, easts)
+    assert (prepared.contains(north, east) == inside).all()
     outline = np.stack([norths, easts, easts], axis=1)
     assert (geo.in_polygon(north, east, outline[:, 0], outline[:, 1]) == inside).all()
     grown = geo.in_polygon_or_near(north, east, norths, easts, [[0.5], [5.0]])
     assert grown.shape == (2, 5000) and (grown[0] >= inside).all() and (grown[1] > grown[0]).any()
+    assert (prepared.contains(north, east, [[0.5], [5.0]]) == grown).all()
     edges = [(norths[i - 1], easts[i - 1], norths[i], easts[i]) for i in range(200)]
     near = np.any([geo.on_line(*edge[2:], *edge[:2], north, east, 5.0) for edge in edges], axis=0)
     assert (geo.in_polygon_or_near(north, east, norths, easts, 5.0) == (inside | near)).all()

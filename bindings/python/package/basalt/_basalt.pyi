@@ -1,15 +1,22 @@
 """The extension module: universal functions of NumPy, batches of a sparse array, paths and hexadecimal text."""
 import os
+from collections.abc import Callable
 
 import numpy as np
 import numpy.typing as npt
 
 _Path = str | os.PathLike[str]
 
+VERSION: str
 GEO_NULL: float
 GEO_INFINITY: float
 
 _calculate_observation: np.ufunc
+_frame_llh_to_local: np.ufunc
+_frame_local_to_llh: np.ufunc
+_frame_local_to_xyz: np.ufunc
+_frame_xyz_to_local: np.ufunc
+_is_frame_origin: np.ufunc
 _reduce_observation: np.ufunc
 _spiral_deltas: np.ufunc
 _xyz_to_llh: np.ufunc
@@ -36,6 +43,7 @@ first_face: np.ufunc
 follow: np.ufunc
 follow_grade: np.ufunc
 follow_height_change: np.ufunc
+geodesic_inverse: np.ufunc
 gps_to_mjd: np.ufunc
 grade: np.ufunc
 great_circle_bearing: np.ufunc
@@ -58,6 +66,8 @@ normalise_bearing: np.ufunc
 on_line: np.ufunc
 on_polyline: np.ufunc
 points_equal: np.ufunc
+polygon_area: np.ufunc
+polygon_perimeter: np.ufunc
 radians_to_dms: np.ufunc
 slope_angle: np.ufunc
 slope_distance: np.ufunc
@@ -71,7 +81,12 @@ vector_slope_angle_along_x: np.ufunc
 vector_slope_angle_along_y: np.ufunc
 xyz_to_local: np.ufunc
 
+_Numbers = npt.NDArray[np.float64]
+
+def _prepared_polygon(norths: _Numbers, easts: _Numbers) -> tuple[np.ufunc, np.ufunc]: ...
 def current_java_time() -> int: ...
+def format_angle(radians: float, decimals: int = 0, style: str = "sign") -> str: ...
+def parse_angle(text: str) -> float: ...
 
 def split_path(path: _Path) -> tuple[str, str, str, str]: ...
 def combine_path(first: _Path, second: _Path) -> str: ...
@@ -89,6 +104,11 @@ class SparseBytes:
     def insert(self, x: _Cells, y: _Cells, elements: _Bytes) -> None: ...
     def find(self, x: _Cells, y: _Cells) -> tuple[_Bytes, _Flags]: ...
     def remove(self, x: _Cells, y: _Cells) -> _Flags: ...
+    def update(self, x: _Cells, y: _Cells, change: Callable[[_Bytes, _Flags], _Bytes]) -> None: ...
+    def insert_rows(self, x: int, y: int, columns: int, elements: _Bytes) -> None: ...
+    def copy_rows(self, x: int, y: int, columns: int, elements: _Bytes, found: _Flags) -> None: ...
+    def remove_window(self, min_x: int, min_y: int, max_x: int, max_y: int) -> int: ...
+    def size(self) -> int: ...
     def clear(self) -> None: ...
     def select(self, min_x: int, min_y: int, max_x: int, max_y: int) -> tuple[_Cells, _Cells, _Bytes]: ...
     def all(self) -> tuple[_Cells, _Cells, _Bytes]: ...

@@ -1,19 +1,21 @@
-"""Paths taken apart and put together, and what lies in a folder, as the library's hosts see them.
+"""Parts of paths, and the files of a folder, as the library's hosts see them.
 
-What is put together has backslashes between its parts, which the library takes wherever it takes a path; other programs
-need them replaced by slashes.
+A backslash separates as a slash does; results have slashes only, so that any program can open them.
 """
+from __future__ import annotations
+
 import os
 import typing
 
-from ._basalt import combine_path as combine
-from ._basalt import files_in_directory, set_extension, split_path
+from . import _basalt
 
 __all__ = ["Parts", "combine", "files_in_directory", "set_extension", "split"]
 
+_Path = typing.Union[str, "os.PathLike[str]"]
+
 
 class Parts(typing.NamedTuple):
-    """What a path is made of, without the marks between the parts."""
+    """Parts of a path, without the marks between them."""
 
     drive: str
     directory: str
@@ -21,6 +23,28 @@ class Parts(typing.NamedTuple):
     extension: str
 
 
-def split(path: str | os.PathLike[str]) -> Parts:
+def _slashes(path: str) -> str:
+    return path.replace("\\", "/")
+
+
+def split(path: _Path) -> Parts:
     """The parts of a path (vex_util::CFilePath): "/site/day 1/levels.csv" has "site/day 1", "levels" and "csv"."""
-    return Parts(*split_path(path))
+    return Parts(*map(_slashes, _basalt.split_path(path)))
+
+
+def combine(first: _Path, second: _Path) -> str:
+    """Both in one path, with a slash between them (vex_util::CFilePath::Combine)."""
+    return _slashes(_basalt.combine_path(first, second))
+
+
+def set_extension(path: _Path, extension: str) -> str:
+    """The path with another extension, given without its dot (vex_util::CFilePath::SetExtension)."""
+    return _slashes(_basalt.set_extension(path, extension))
+
+
+def files_in_directory(directory: _Path, pattern: str) -> list[str]:
+    """Paths of the files whose names match a pattern with * and ? (vex_util::CFilePath::GetFilesInDirectory).
+
+    The directory ends with a separator, or exists.
+    """
+    return [_slashes(path) for path in _basalt.files_in_directory(directory, pattern)]

@@ -1,6 +1,9 @@
 """A sparse grid of records: elements of one dtype at the integer cells of the whole signed 32-bit plane."""
 from __future__ import annotations
 
+import operator
+from collections.abc import Callable, Iterator
+
 import numpy as np
 import numpy.typing as npt
 
@@ -46,10 +49,23 @@ def _elements(given, dtype):
     return np.asarray(given, dtype=dtype)
 
 
+def _bytes(given, dtype, shape):
+    elements = np.broadcast_to(_elements(given, dtype), shape)
+    return np.ascontiguousarray(elements).reshape(-1).view(np.uint8)
+
+
+def _corners(minimum, maximum):
+    corners = [operator.index(c) for c in (*minimum, *maximum)]
+    if len(corners) != 4 or min(corners) < _LEAST or max(corners) > _GREATEST:
+        raise ValueError("a rectangle is given by two cells of 32 bits")
+    return corners
+
+
 class Sparse2DArray:
     """Elements of one dtype by cell (vex_util::Sparse2DArray), in batches.
 
-    Records are copied in and out. Any thread may call at any time; a batch is one step for the others. block_side is
+    array[x, y] is the element of a cell, or those of arrays of cells, KeyError where one is empty; (x, y) in array,
+    len and iteration are of the filled cells. Records are copied in and out. Any thread may call at any time; a batch is one step for the others. block_side is
     rounded up to a power of two; elements_per_chunk is how many elements are taken from the heap at a time.
     """
 
@@ -65,20 +81,83 @@ class Sparse2DArray:
     def dtype(self) -> np.dtype:
         return self._dtype
 
+    def __repr__(self) -> str:
+        return f"<Sparse2DArray of {self._dtype}, {len(self)} cells>"
+
+    def __len__(self) -> int:
+        return self._array.size()
+
+    def __contains__(self, cell: tuple[int, int]) -> bool:
+        return bool(self.find(*cell)[1].all())
+
+    def __iter__(self) -> Iterator[tuple[int, int]]:
+        """The filled cells of this moment, ordered as select."""
+        x, y, _ = self._array.all()
+        return zip(x.tolist(), y.tolist())
+
+    def __getitem__(self, cell: tuple[npt.ArrayLike, npt.ArrayLike]):
+        elements, found = self.find(*cell)
+        if not found.all():
+            raise KeyError(cell)
+        return elements[()]
+
+    def __setitem__(self, cell: tuple[npt.ArrayLike, npt.ArrayLike], elements: npt.ArrayLike) -> None:
+        self.insert(*cell, elements)
+
     def insert(self, x: npt.ArrayLike, y: npt.ArrayLike, elements: npt.ArrayLike) -> None:
         """Copies elements into their cells, over those already there; a later one of the same cell wins.
 
         Numbers of another dtype are converted where nothing is cut by that; records have the dtype's field names.
         """
         x, y, shape = _cells(x, y)
-        elements = np.broadcast_to(_elements(elements, self._dtype), shape)
-        self._array.insert(x, y, np.ascontiguousarray(elements).reshape(-1).view(np.uint8))
+        self._array.insert(x, y, _bytes(elements, self._dtype, shape))
 
     def find(self, x: npt.ArrayLike, y: npt.ArrayLike) -> tuple[np.ndarray, np.ndarray]:
         """(elements, found): the elements of cells, zero where there is none, and whether there is one."""
         x, y, shape = _cells(x, y)
         elements, found = self._array.find(x, y)
         return elements.view(self._dtype).reshape(shape), found.reshape(shape)
+
+    def update(self, x: npt.ArrayLike, y: npt.ArrayLike,
+               change: Callable[[np.ndarray, np.ndarray], npt.ArrayLike]) -> None:
+        """Inserts what change(elements, found) makes of find(x, y), in one step for other threads.
+
+        ValueError where a cell is given twice. change may use this array, but must not wait for a thread that does.
+        """
+        x, y, shape = _cells(x, y)
+        if np.unique(x.astype(np.int64) * 2**32 + y).size != x.size:
+            raise ValueError("a cell is given twice")
+
+        def changed(elements, found):
+            made = change(elements.view(self._dtype).reshape(shape), found.reshape(shape))
+            return _bytes(made, self._dtype, shape)
+
+        self._array.update(x, y, changed)
+
+    def insert_window(self, minimum: tuple[int, int], elements: npt.ArrayLike) -> None:
+        """Inserts a row or a table of elements: x ascends along the last axis, y along the first, from the cell given.
+
+        Faster than insert, which is given every cell.
+        """
+        elements = np.atleast_2d(_elements(elements, self._dtype))
+        rows, columns = elements.shape
+        x, y = minimum
+        x, y, _, _ = _corners((x, y), (x + max(columns - 1, 0), y + max(rows - 1, 0)))
+        if elements.size:
+            self._array.insert_rows(x, y, columns, _bytes(elements, self._dtype, elements.shape))
+
+    def window(self, minimum: tuple[int, int], maximum: tuple[int, int]) -> tuple[np.ndarray, np.ndarray]:
+        """(elements, found) of every cell of a rectangle, as find: cell (x, y) at [y - min_y, x - min_x]."""
+        x, y, max_x, max_y = _corners(minimum, maximum)
+        rows, columns = max(max_y - y + 1, 0), max(max_x - x + 1, 0)
+        elements, found = np.zeros((rows, columns), self._dtype), np.zeros((rows, columns), bool)
+        if elements.size:
+            self._array.copy_rows(x, y, columns, elements.reshape(-1).view(np.uint8), found.reshape(-1))
+        return elements, found
+
+    def remove_window(self, minimum: tuple[int, int], maximum: tuple[int, int]) -> int:
+        """Empties the cells of a rectangle, and returns how many held an element."""
+        return self._array.remove_window(*_corners(minimum, maximum))
 
     def remove(self, x: npt.ArrayLike, y: npt.ArrayLike) -> np.ndarray:
         """Empties cells, and returns which of them held an element."""
@@ -94,10 +173,7 @@ class Sparse2DArray:
 
         In the order of visits: by blocks, whose order means nothing, in a block by rows of ascending y and x.
         """
-        corners = [int(c) for c in (*minimum, *maximum)]
-        if len(corners) != 4 or min(corners) < _LEAST or max(corners) > _GREATEST:
-            raise ValueError("two cells of 32 bits are wanted")
-        x, y, elements = self._array.select(*corners)
+        x, y, elements = self._array.select(*_corners(minimum, maximum))
         return x, y, elements.view(self._dtype)
 
     def all(self) -> tuple[np.ndarray, np.ndarray, np.ndarray]:

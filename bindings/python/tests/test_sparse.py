@@ -58,6 +58,8 @@ def test_cells_of_the_whole_plane_and_none_beyond():
 
 
 @pytest.mark.parametrize("error, call", [
+    (ValueError, lambda array: Sparse2DArray("f8", block_side=0)),
+    (TypeError, lambda array: Sparse2DArray("f4").insert(0, 0, np.array([1j]))),
     (ValueError, lambda array: array.insert(2**31, 0, 1.0)),
     (ValueError, lambda array: array.insert(-(2**31) - 1, 0, 1.0)),
     (ValueError, lambda array: array.select((0, 0), (0, 2**31))),
@@ -84,17 +86,11 @@ def test_elements_are_plain_and_results_live_on_their_own():
     for bad in ("O", [("a", "O")], "V0", ("f8", (3,))):
         with pytest.raises(TypeError):
             Sparse2DArray(bad)
-    with pytest.raises(ValueError):
-        Sparse2DArray("f8", block_side=0)
     array = Sparse2DArray("f8")
     array.insert(np.arange(1000), 7, np.arange(1000.0))
     x, y, elements = array.select((10, 0), (19, 10))
-    array.clear()
     del array
     assert x.tolist() == list(range(10, 20)) and set(y) == {7} and elements.tolist() == list(range(10, 20))
-    empty = Sparse2DArray("i8")
-    empty.insert([], [], [])
-    assert empty.find([], [])[0].shape == (0,)
 
 
 def test_nothing_is_cut_on_the_way_in():
@@ -102,17 +98,12 @@ def test_nothing_is_cut_on_the_way_in():
     whole.insert([0, 1], 0, [-(2**15), 2**15 - 1])
     whole.insert(2, 0, np.uint64(7))
     assert whole.find([0, 1, 2], 0)[0].tolist() == [-(2**15), 2**15 - 1, 7]
-    for bad in (2**15, [2**40], np.uint64(2**64 - 1)):
-        with pytest.raises(ValueError):
-            whole.insert(0, 0, bad)
-    for bad in (1.5, [2.0], 1j, np.array(["7"])):
-        with pytest.raises(TypeError):
+    for bad in (2**15, [2**40], np.uint64(2**64 - 1), 1.5, [2.0], 1j, np.array(["7"])):
+        with pytest.raises(ValueError if np.asarray(bad).dtype.kind in "iu" else TypeError):
             whole.insert(0, 0, bad)
     single = Sparse2DArray("f4")
     single.insert([0, 1, 2], 0, np.array([0.5, -1.0, 3.0]))  # a narrower type of the same kind, explicitly
     assert single.find([0, 1, 2], 0)[0].tolist() == [0.5, -1.0, 3.0]
-    with pytest.raises(TypeError):
-        single.insert(0, 0, np.array([1j]))
 
 
 def test_fields_go_by_their_names():
@@ -132,11 +123,11 @@ def test_cells_are_read_written_and_changed_in_place():
     array[[0, 1], 5] = [1, 2]
     assert array[3, -4] == 7 and array[[1, 0], 5].tolist() == [2, 1]
     array.update([0, 1, 2], 5, lambda elements, found: elements + 10 * found + 1)
-    assert array[np.arange(3), 5].tolist() == [12, 13, 1]
     array.update(3, -4, lambda elements, found: elements + array[0, 5])
-    assert array[3, -4] == 19
+    assert array[np.arange(3), 5].tolist() == [12, 13, 1] and array[3, -4] == 19
+    array.insert([], [], [])
     array.insert_window((0, 0), [])
-    assert len(array) == 4 and array.window((1, 1), (0, 0))[0].shape == (0, 0)
+    assert len(array) == 4 and array.find([], [])[0].shape == (0,) and array.window((1, 1), (0, 0))[0].shape == (0, 0)
 
 
 def test_threads_share_an_array():

@@ -80,9 +80,8 @@ def test_a_local_frame_agrees_with_single_conversions():
     for ours in (frame.llh_to_local(*llh), frame.xyz_to_local(*xyz)):
         assert np.array(ours).tobytes() == local.tobytes()
     np.testing.assert_allclose(frame.local_to_xyz(*local), xyz, rtol=0, atol=1e-6)
-    back = np.array(frame.local_to_llh(*local))
-    each = geo.xyz_to_llh(*frame.local_to_xyz(*local), np.full(1000, 5e-10))
-    assert np.array(each).tobytes() == back.tobytes()
+    llh = np.array(geo.xyz_to_llh(*frame.local_to_xyz(*local), np.full(1000, 5e-10)))
+    assert llh.tobytes() == np.array(frame.local_to_llh(*local)).tobytes()
     assert frame.valid and not geo.LocalFrame(0, 0, 0).valid
     assert geo.LocalFrame(0, 0, 0).xyz_to_local(1.0, 2.0, 3.0) == (geo.GEO_NULL,) * 3
 

@@ -43,19 +43,29 @@ public:
     SparseBytes(std::size_t element_size, std::size_t block_side, std::size_t elements_per_chunk)
         : m_size(element_size), m_array(std::max(element_size, LEAST_SIZE), block_side, elements_per_chunk) {}
 
-    // Neighbours along a row are inserted in one call.
+    // Neighbours along a row are inserted in one call, which pays from a few on.
     void insert(const Cells& x, const Cells& y, const Bytes& elements) {
         check(x, y, elements.size());
         const auto [xs, ys, bytes] = std::tuple{x.data(), y.data(), elements.data()};
         const py::ssize_t count = x.size();
         alone([&] {
+            std::uint8_t padded[LEAST_SIZE] = {};
             for (py::ssize_t i = 0, run = 0; i < count; i += run) {
+                const std::uint8_t* element = bytes + static_cast<std::size_t>(i) * m_size;
                 run = 1;
                 while (i + run < count && ys[i + run] == ys[i] && xs[i + run] == xs[i] + run) {
                     ++run;
                 }
-                SparseCells::insert_row(m_array, xs[i], ys[i], bytes + static_cast<std::size_t>(i) * m_size,
-                                        m_size, static_cast<std::size_t>(run));
+                if (run >= 4) {
+                    SparseCells::insert_row(m_array, xs[i], ys[i], element, m_size,
+                                            static_cast<std::size_t>(run));
+                    continue;
+                }
+                run = 1;
+                if (m_size < LEAST_SIZE) {
+                    element = static_cast<const std::uint8_t*>(std::memcpy(padded, element, m_size));
+                }
+                m_array.Insert(xs[i], ys[i], element);
             }
         });
     }
@@ -73,10 +83,17 @@ public:
             void* at[BLOCK];
             for (std::size_t first = 0; first < count; first += BLOCK) {
                 const std::size_t some = std::min(count - first, BLOCK);
+                bool is_row = true;
                 for (std::size_t i = 0; i < some; ++i) {
                     cells[i] = {xs[first + i], ys[first + i]};
+                    is_row &= cells[i].y == cells[0].y &&
+                              cells[i].x - std::int64_t{cells[0].x} == static_cast<std::int64_t>(i);
                 }
-                SparseCells::find(m_array, cells, at, some);
+                if (is_row) {
+                    SparseCells::find_row(m_array, cells[0].x, cells[0].y, at, some);
+                } else {
+                    SparseCells::find(m_array, cells, at, some);
+                }
                 for (std::size_t i = 0; i < some; ++i) {
                     std::uint8_t* to = bytes + (first + i) * m_size;
                     flags[first + i] = at[i] != nullptr;

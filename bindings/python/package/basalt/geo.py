@@ -9,24 +9,26 @@ import numpy as np
 
 from ._basalt import (GEO_INFINITY, GEO_NULL, _calculate_observation, _frame_llh_to_local, _frame_local_to_llh,
                       _frame_local_to_xyz, _frame_xyz_to_local, _is_frame_origin, _prepared_polygon,
-                      _reduce_observation, _spiral_deltas, _xyz_to_llh, arc_angle, arc_half_chord, arc_length, bearing_intersection, bisected_bearing, covariance_to_llh,
-                      covariance_to_neu, cross_track, curvature_radii, direct, distances_equal, divergence,
-                      divergence_of_lines, first_face, follow, follow_grade, follow_height_change, geodesic_inverse, grade,
-                      great_circle_bearing, great_circle_distance, grid_bearing, height_difference,
-                      horizontal_distance, horizontal_distance_squared, in_polygon, in_polygon_or_near, lines_cross,
-                      llh_equal, llh_to_xyz, midpoint, normalise_bearing, on_line, on_polyline, points_equal,
-                      polygon_area, polygon_perimeter, slope_angle, slope_distance, spiral_deflection, triangle_area, vector_bearing, vector_distance,
+                      _reduce_observation, _spiral_deltas, _xyz_to_llh, arc_angle, arc_half_chord, arc_length,
+                      bearing_intersection, bisected_bearing, covariance_to_llh, covariance_to_neu, cross_track,
+                      curvature_radii, direct, distances_equal, divergence, divergence_of_lines, first_face, follow,
+                      follow_grade, follow_height_change, geodesic_inverse, grade, great_circle_bearing,
+                      great_circle_distance, grid_bearing, height_difference, horizontal_distance,
+                      horizontal_distance_squared, in_polygon, in_polygon_or_near, lines_cross, llh_equal, llh_to_xyz,
+                      midpoint, normalise_bearing, on_line, on_polyline, points_equal, polygon_area, polygon_perimeter,
+                      slope_angle, slope_distance, spiral_deflection, triangle_area, vector_bearing, vector_distance,
                       vector_length, vector_slope_angle, vector_slope_angle_along_x, vector_slope_angle_along_y,
                       xyz_to_local)
 
-__all__ = ["GEO_INFINITY", "GEO_NULL", "LocalFrame", "PreparedPolygon", "arc_angle", "arc_half_chord", "arc_length", "bearing_intersection",
-           "bisected_bearing", "calculate_observation", "covariance_to_llh", "covariance_to_neu", "cross_track",
-           "curvature_radii", "direct", "distances_equal", "divergence", "divergence_of_lines", "first_face", "follow",
-           "follow_grade", "follow_height_change", "geodesic_inverse", "grade", "great_circle_bearing", "great_circle_distance",
-           "grid_bearing", "height_difference", "horizontal_distance", "horizontal_distance_squared", "in_polygon",
-           "in_polygon_or_near", "lines_cross", "llh_equal", "llh_to_xyz", "midpoint", "normalise_bearing", "on_line",
-           "on_polyline", "points_equal", "polygon_area", "polygon_perimeter", "reduce_observation", "slope_angle", "slope_distance", "spiral_deflection",
-           "spiral_deltas", "triangle_area", "vector_bearing", "vector_distance", "vector_length",
+__all__ = ["GEO_INFINITY", "GEO_NULL", "LocalFrame", "PreparedPolygon", "arc_angle", "arc_half_chord", "arc_length",
+           "bearing_intersection", "bisected_bearing", "calculate_observation", "covariance_to_llh",
+           "covariance_to_neu", "cross_track", "curvature_radii", "direct", "distances_equal", "divergence",
+           "divergence_of_lines", "first_face", "follow", "follow_grade", "follow_height_change", "geodesic_inverse",
+           "grade", "great_circle_bearing", "great_circle_distance", "grid_bearing", "height_difference",
+           "horizontal_distance", "horizontal_distance_squared", "in_polygon", "in_polygon_or_near", "lines_cross",
+           "llh_equal", "llh_to_xyz", "midpoint", "normalise_bearing", "on_line", "on_polyline", "points_equal",
+           "polygon_area", "polygon_perimeter", "reduce_observation", "slope_angle", "slope_distance",
+           "spiral_deflection", "spiral_deltas", "triangle_area", "vector_bearing", "vector_distance", "vector_length",
            "vector_slope_angle", "vector_slope_angle_along_x", "vector_slope_angle_along_y", "xyz_to_llh",
            "xyz_to_local"]
 
@@ -44,8 +46,9 @@ def reduce_observation(horizontal, vertical, distance, north, east, elevation, h
                        **options):
     """(north, east, elevation) of what a station at the given point observes (geo_reduce_obs).
 
-    horizontal and vertical in radians, the latter from the zenith; all else in metres. The height offset is that of the instrument less that of the target; the scale factor is grid over ground. All
-    GEO_NULL where a field of the observation is.
+    horizontal and vertical in radians, the latter from the zenith; all else in metres. The height offset is that of the
+    instrument less that of the target; the scale factor is grid over ground. All GEO_NULL where a field of the
+    observation is.
     """
     return _reduce_observation(horizontal, vertical, distance, north, east, elevation, height_offset, scale_factor,
                                **options)
@@ -55,8 +58,8 @@ def calculate_observation(north1, east1, elevation1, north2, east2, elevation2, 
                           scale_factor=1.0, **options):
     """(horizontal, vertical, distance) from one point to another (geo_calc_obs); NaN where a field is GEO_NULL.
 
-    Angles in radians, vertical from the zenith; all else in metres. height1 and height2 are those of instrument and target. The scale factor multiplies the grid distance: the
-    reciprocal of reduce_observation's undoes it.
+    Angles in radians, vertical from the zenith; all else in metres. height1 and height2 are those of instrument and
+    target. The scale factor multiplies the grid distance: the reciprocal of reduce_observation's undoes it.
     """
     return _calculate_observation(north1, east1, elevation1, height1, north2, east2, elevation2, height2, scale_factor,
                                   **options)

@@ -64,9 +64,10 @@ def _corners(minimum, maximum):
 class Sparse2DArray:
     """Elements of one dtype by cell (vex_util::Sparse2DArray), in batches.
 
-    array[x, y] is the element of a cell, or those of arrays of cells, KeyError where one is empty; (x, y) in array,
-    len and iteration are of the filled cells. Records are copied in and out. Any thread may call at any time; a batch is one step for the others. block_side is
-    rounded up to a power of two; elements_per_chunk is how many elements are taken from the heap at a time.
+    array[x, y] is the element of a cell, or those of arrays of cells, KeyError where one is empty; (x, y) in array, len
+    and iteration are of the filled cells. Records are copied in and out. Any thread may call at any time; a batch is
+    one step for the others. block_side is rounded up to a power of two; elements_per_chunk is how many elements are
+    taken from the heap at a time.
     """
 
     def __init__(self, dtype: npt.DTypeLike, block_side: int = 16, elements_per_chunk: int = 1024):

@@ -6,7 +6,6 @@
 #include "basalt/files.h"
 #include "fuzz/input.h"
 #include "src/platform/text/file_name.h"
-#include "tests/files/path_model.h"
 #include "tests/support/scratch_folder.h"
 
 namespace {
@@ -53,17 +52,58 @@ bool is_directory(const std::wstring& path) {
                      fs::is_directory(name, error);
 }
 
-void set(path_model::FilePath& model, const std::wstring& path) {
-    model.set(path, is_directory(path));
+struct Parts {
+    std::wstring drive, directory, name, extension;
+    bool valid = false;
+};
+
+Parts split(const std::wstring& path) {
+    const std::size_t drive = path.size() > 1 && path[1] == L':' ? 2 : 0;
+    const std::size_t slash = path.find_last_of(L"\\/");
+    const std::size_t name = slash == std::wstring::npos || slash < drive ? drive : slash + 1;
+    const std::size_t last_dot = path.rfind(L'.');
+    const std::size_t dot = last_dot == std::wstring::npos || last_dot < name ? path.size() : last_dot;
+    const bool valid = name - drive <= 255 && dot - name <= 255 && path.size() - dot <= 255;
+    return valid ? Parts{path.substr(0, drive), path.substr(drive, name - drive),
+                         path.substr(name, dot - name), path.substr(dot), true}
+                 : Parts{};
 }
 
-void require_same(const CFilePath& path, const path_model::FilePath& model) {
-    const bool has_name = !model.name.empty() && !model.extension.empty();
+std::wstring select(const Parts& parts, unsigned selector) {
+    return (selector % 2 >= 1 ? parts.drive : L"") + (selector % 4 >= 2 ? parts.directory : L"") +
+           (selector % 8 >= 4 ? parts.name : L"") + (selector % 16 >= 8 ? parts.extension : L"");
+}
+
+// The members of a file path.
+struct FilePath {
+    std::wstring full, drive, directory, name, extension;
+
+    void set(const std::wstring& path) {
+        full = path;
+        if (path.empty()) {
+            return;
+        }
+        const Parts parts = split(path);
+        drive = parts.drive;
+        name = parts.name;
+        extension = parts.extension.substr(parts.extension.empty() ? 0 : 1);
+        const std::size_t size = parts.directory.size();
+        const std::size_t first = size > 1 && parts.directory.find_first_of(L"\\/") == 0 ? 1 : 0;
+        directory = size == 0 ? L"" : parts.directory.substr(first, size - 1 - first);
+        if (parts.valid && is_directory(path)) {
+            directory += L"\\" + name + parts.extension;
+            name.clear();
+        }
+    }
+    std::wstring folder() const { return drive + L"\\" + directory; }
+    std::wstring file() const { return name.empty() || extension.empty() ? L"" : name + L"." + extension; }
+};
+
+void require_same(const CFilePath& path, const FilePath& model) {
     require(static_cast<const CString&>(path) == text(model.full) && path.Drive() == text(model.drive) &&
             path.DirectoryOnly() == text(model.directory) && path.FileNameOnly() == text(model.name) &&
-            path.Extension() == text(model.extension) &&
-            path.Directory() == text(model.drive + L"\\" + model.directory) &&
-            path.FileName() == text(has_name ? model.name + L"." + model.extension : L""));
+            path.Extension() == text(model.extension) && path.Directory() == text(model.folder()) &&
+            path.FileName() == text(model.file()));
 }
 
 }  // namespace
@@ -75,19 +115,17 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const std::size_t half = data[0] * (size - 2) / 255;
     const std::wstring first = (data[1] % 2 == 0 ? tree() : L"") + path_of(data + 2, half);
     const std::wstring second = path_of(data + 2 + half, size - 2 - half);
-    const path_model::Parts parts = path_model::split(first + second);
-    require(Path::GetPath(text(first + second), data[1]) == text(path_model::select(parts, data[1])));
+    require(Path::GetPath(text(first + second), data[1]) == text(select(split(first + second), data[1])));
     CFilePath path(text(first));
-    path_model::FilePath model;
-    set(model, first);
+    FilePath model;
+    model.set(first);
     require_same(path, model);
     path.Combine(path.Extension(), text(second));
-    set(model, model.extension + L"\\" + second);
+    model.set(model.extension + L"\\" + second);
     require_same(path, model);
     path.SetExtension(text(second));
     model.extension = second;
-    const std::wstring name = model.name.empty() || second.empty() ? L"" : model.name + L"." + second;
-    set(model, model.drive + L"\\" + model.directory + L"\\" + name);
+    model.set(model.folder() + L"\\" + model.file());
     require_same(path, model);
     return 0;
 }

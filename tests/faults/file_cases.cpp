@@ -1,7 +1,7 @@
 // Paths, files and their queries.
 #include "basalt/files.h"
 #include "basalt/platform/error.h"
-#include "src/platform/file.h"
+#include "src/platform/file_search.h"
 #include "tests/faults/trial.h"
 
 namespace basalt::faults {
@@ -50,17 +50,26 @@ void check_files() {
             t.expect(Path::GetPath(full, 12) == L"a name of some length.extension", "the name");
         });
     });
+    check("FindFirstFileW", [](Trial& t) {
+        const CString name = t.path("a folder");
+        std::filesystem::create_directory(t.folder() / "a folder");
+        for (const CString& pattern : {name, name + L"*"}) {
+            WIN32_FIND_DATAW entry;
+            const BOOL found = t.attempt([&] { return FindClose(FindFirstFileW(pattern, &entry)); });
+            t.expect(found != 0 ? entry.dwFileAttributes == FILE_ATTRIBUTE_DIRECTORY : t.struck(),
+                     "its kind");
+        }
+    });
     check("files held alone", [](Trial& t) {
-        const CString name = t.path("held");
+        const CString name = t.path("held"), folder(t.folder().path().c_str());
         const HANDLE file = t.attempt([&] {
             return CreateFileW(name, GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_NEW,
                                FILE_FLAG_DELETE_ON_CLOSE, nullptr);
         });
         t.expect(file != INVALID_HANDLE_VALUE || (t.struck() && GetLastError() != 0),
-                 "an error for a failure");
+                 "refused for a failure");
         t.attempt([=] { CloseHandle(file); });
         wchar_t made[MAX_PATH + 1];
-        const CString folder(t.folder().path().c_str());
         const UINT number = t.attempt([&] { return GetTempFileNameW(folder, L"vma", 0, made); });
         t.expect(number != 0 || t.struck(), "0 only for a failure");
         const BOOL deleted = number == 0 ? 1 : t.attempt([&] { return DeleteFileW(made); });

@@ -12,16 +12,9 @@ namespace basalt::test {
 
 class ScratchFolder {
 public:
-    ScratchFolder() {
-        const char* const before = std::getenv("TMPDIR");
-        m_was_set = before != nullptr;
-        m_before = m_was_set ? before : "";
-        std::string pattern = (std::filesystem::temp_directory_path() / "basalt-XXXXXX").string();
-        m_path = mkdtemp(pattern.data()) != nullptr ? pattern : "";
-        set_temporary(m_path);
-    }
+    ScratchFolder() { set_temporary(mkdtemp(m_path.data()) != nullptr ? m_path : ""); }
     ~ScratchFolder() {
-        m_was_set ? set_temporary(m_before) : static_cast<void>(unsetenv("TMPDIR"));
+        set_temporary(m_before);
         std::filesystem::remove_all(m_path);
     }
     ScratchFolder(const ScratchFolder&) = delete;
@@ -34,7 +27,6 @@ public:
     std::wstring wide(const std::wstring& name) const {
         return std::wstring(m_path.begin(), m_path.end()) + L"/" + name;
     }
-
     std::set<std::string> names() const {
         std::set<std::string> found;
         for (const auto& entry : std::filesystem::directory_iterator(m_path)) {
@@ -42,7 +34,6 @@ public:
         }
         return found;
     }
-
     std::string read(const std::string& name) const {
         std::ifstream stream(*this / name, std::ios::binary);
         return std::string(std::istreambuf_iterator<char>(stream), {});
@@ -52,9 +43,8 @@ public:
     }
 
 private:
-    std::string m_path;
-    std::string m_before;
-    bool m_was_set;
+    std::string m_before = std::filesystem::temp_directory_path();
+    std::string m_path = m_before + "/basalt-XXXXXX";
 };
 
 }  // namespace basalt::test

@@ -23,38 +23,39 @@ std::vector<Interface> s_interfaces;        // of the machine, named by their in
 std::size_t s_shown = 0, s_shown_more = 0;  // how many getifaddrs() reports, and how many more each time
 int s_refusal = 0;                          // its errno
 
+struct Entry {
+    ifaddrs entry{};
+    sockaddr_ll link{};
+    std::string name;
+};
+
 }  // namespace
 
 // Linked in place of the system's calls (--wrap).
 extern "C" int __wrap_getifaddrs(ifaddrs** list) {
     errno = s_refusal;
-    static std::vector<ifaddrs> entries;
-    static std::vector<sockaddr_ll> links;
-    static std::vector<std::string> names;
-    const std::size_t count = std::min(s_shown, s_interfaces.size());
-    entries.assign(count + 1, {});  // the first without an address
-    links.assign(count, {});
-    names.assign(count, {});
-    for (std::size_t i = 0; i < count; ++i) {
-        const auto& [index, type, address] = s_interfaces[i];
-        const auto length = static_cast<unsigned char>(address.size());
-        links[i] = {AF_PACKET, 0, index, type, 0, length, {}};
-        std::copy_n(address.begin(), std::min<std::size_t>(length, 8), links[i].sll_addr);
-        names[i] = "interface" + std::to_string(index);
-        entries[i].ifa_next = &entries[i + 1];
-        entries[i + 1].ifa_name = names[i].data();
-        entries[i + 1].ifa_addr = reinterpret_cast<sockaddr*>(&links[i]);
+    static std::vector<Entry> entries;
+    entries = std::vector<Entry>(std::min(s_shown, s_interfaces.size()) + 1);  // the first without an address
+    for (std::size_t i = 1; i < entries.size(); ++i) {
+        const auto& [index, type, address] = s_interfaces[i - 1];
+        Entry& next = entries[i];
+        next.link = {AF_PACKET, 0, index, type, 0, static_cast<unsigned char>(address.size()), {}};
+        address.copy(reinterpret_cast<char*>(next.link.sll_addr), 8);
+        next.name = "interface" + std::to_string(index);
+        next.entry.ifa_name = next.name.data();
+        next.entry.ifa_addr = reinterpret_cast<sockaddr*>(&next.link);
+        entries[i - 1].entry.ifa_next = &next.entry;
     }
     s_shown += s_shown_more;
-    *list = entries.data();
+    *list = &entries[0].entry;
     return s_refusal == 0 ? 0 : -1;
 }
 extern "C" void __wrap_freeifaddrs(ifaddrs*) {}
 extern "C" int __wrap_access(const char* path, int) {
     const std::string file = path;
-    const char* const wireless[] = {"/sys/class/net/interface5/phy80211",
-                                    "/sys/class/net/interface6/wireless"};
-    return file == wireless[0] || file == wireless[1] ? 0 : -1;
+    const bool is_wireless =
+        file == "/sys/class/net/interface5/phy80211" || file == "/sys/class/net/interface6/wireless";
+    return is_wireless ? 0 : -1;
 }
 
 namespace {
@@ -84,17 +85,14 @@ TEST(HardwareAddresses, are_those_of_ethernet_interfaces_by_ascending_index) {
     MIB_IFROW space[8];
     auto* const table = reinterpret_cast<MIB_IFTABLE*>(space);
     DWORD size = 4 + 7 * 860 - 1;
-    EXPECT_EQ(GetIfTable(table, &size, 1), 122U);
-    EXPECT_EQ(size, 4U + 7 * 860);
+    EXPECT_TRUE(GetIfTable(table, &size, 1) == 122 && size == 4 + 7 * 860);
     EXPECT_EQ(GetIfTable(table, &size, 0), 0U);
     std::string found;
     for (const MIB_IFROW& row : std::span(table->table, table->dwNumEntries)) {
         found +=
-            std::string(row.bDescr, row.bDescr + row.dwDescrLen) + "=" + std::to_string(row.dwType) + " ";
+            std::string(row.bDescr + 9, row.bDescr + row.dwDescrLen) + '=' + std::to_string(row.dwType) + ' ';
     }
-    EXPECT_EQ(
-        found,
-        "interface7=6 interface1=24 interface5=71 interface6=71 interface12=6 interface9=1 interface3=6 ");
+    EXPECT_EQ(found, "7=6 1=24 5=71 6=71 12=6 9=1 3=6 ");
 }
 
 TEST(HardwareAddresses, end_when_interfaces_come_and_go_or_the_system_refuses) {
@@ -102,17 +100,15 @@ TEST(HardwareAddresses, end_when_interfaces_come_and_go_or_the_system_refuses) {
     for (int i = 1; i <= 20; ++i) {
         s_interfaces.push_back({i, ARPHRD_ETHER, std::string(1, static_cast<char>(i))});
     }
-    MACAddressFromMIBTable list;
-    s_shown = s_shown_more = 1;
-    EXPECT_FALSE(list.Create()) << "the table grows each time";
-    s_shown = 17;
-    EXPECT_TRUE(list.Create()) << "it stops growing";
-    EXPECT_EQ(list.GetMACAddressesAsHexString().size(), 18U) << "all but the wireless ones";
-    list = {};
-    s_shown = 4;
-    s_shown_more = std::size_t{0} - 1;
-    EXPECT_TRUE(list.Create());
-    EXPECT_EQ(list.GetMACAddressesAsHexString(), Texts{"01"}) << "gone before their rows were read";
+    // Shown at first and more each time, addresses found: the table grows each time; it stops growing (and
+    // two are wireless); all but one are gone before their rows are read.
+    constexpr std::size_t ROWS[][3] = {{1, 1, 0}, {17, 1, 18}, {4, SIZE_MAX, 1}};
+    for (const auto& [shown, more, addresses] : ROWS) {
+        MACAddressFromMIBTable list;
+        s_shown = shown, s_shown_more = more;
+        EXPECT_EQ(list.Create(), addresses > 0);
+        EXPECT_EQ(list.GetMACAddressesAsHexString().size(), addresses);
+    }
     s_shown_more = 0;
     const std::pair<int, DWORD> errors[] = {{EMFILE, 4}, {ENOMEM, 8}, {0, 2}};
     for (const auto& [refusal, error] : errors) {

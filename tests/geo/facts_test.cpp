@@ -116,11 +116,8 @@ static_assert(sizeof(geo_nee) == 24 && sizeof(geo_llh) == 24 && sizeof(geo_vecto
               sizeof(geo_hvd) == 24);
 static_assert(std::bit_cast<std::uint64_t>(GEO_NULL) == 0x000E61ACF033D1A4U);
 
-TEST(GeometryFacts, Hold) {
+TEST(GeometryFacts, HoldWhetherOrNotTheThreadFlushesSubnormals) {
     check_facts(false);
-}
-
-TEST(GeometryFacts, HoldOnAThreadThatFlushesSubnormals) {
     check_facts(true);
 }
 

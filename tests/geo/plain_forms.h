@@ -18,30 +18,29 @@ inline constexpr double PI = std::numbers::pi;
 inline constexpr double INF = std::numeric_limits<double>::infinity();
 inline constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
 
-inline void cross(const geo_nee& vj, const geo_nee& vi, const geo_nee& p, int& inside) {
-    if ((vi.north <= p.north && p.north < vj.north) || (vj.north <= p.north && p.north < vi.north)) {
-        const double denominator = vj.north == vi.north ? 1e-8 : vj.north - vi.north;
-        const double crossing = (vj.east - vi.east) * (p.north - vi.north) / denominator + vi.east;
-        if (crossing > p.east) {
-            inside = inside == 0 ? 1 : 0;
+// Whether an edge touches the point, or it is inside by the crossings of the line to the east.
+template <class Touches>
+int in_polygon(int n, const geo_nee* polygon, const geo_nee& p, Touches touches) {
+    int inside = 0;
+    for (int i = 0, j = n - 1; i < n; j = i++) {
+        const geo_nee& vi = polygon[i];
+        const geo_nee& vj = polygon[j];
+        if (touches(vi, vj)) {
+            return 1;
+        }
+        if ((vi.north <= p.north && p.north < vj.north) || (vj.north <= p.north && p.north < vi.north)) {
+            const double crossing =
+                (vj.east - vi.east) * (p.north - vi.north) / (vj.north - vi.north) + vi.east;
+            inside ^= crossing > p.east ? 1 : 0;
         }
     }
+    return inside;
 }
 
 inline int point_in_poly(int n, const geo_nee* polygon, const geo_nee& p) {
-    if (n < 1) {
-        return 0;
-    }
-    int inside = 0;
-    int j = n - 1;
-    for (int i = 0; i < n; ++i) {
-        if (p.east == polygon[i].east && p.north == polygon[i].north) {
-            return 1;
-        }
-        cross(polygon[j], polygon[i], p, inside);
-        j = i;
-    }
-    return inside;
+    return in_polygon(n, polygon, p, [&](const geo_nee& vertex, const geo_nee&) {
+        return p.east == vertex.east && p.north == vertex.north;
+    });
 }
 
 inline int point_on_line(const geo_nee& a, const geo_nee& b, const geo_nee& p, double tolerance) {
@@ -49,10 +48,7 @@ inline int point_on_line(const geo_nee& a, const geo_nee& b, const geo_nee& p, d
     const double theta = geo_normalised_bearing(geo_grid_bearing(a, b) - geo_grid_bearing(a, p));
     const double d = geo_horz_dist(a, p);
     const double along = std::cos(theta > pi ? 6.283185307179586 - theta : theta) * d;
-    if (along < -tolerance) {
-        return 0;
-    }
-    if (along > geo_horz_dist(a, b) + tolerance) {
+    if (along < -tolerance || along > geo_horz_dist(a, b) + tolerance) {
         return 0;
     }
     const double offset = std::fabs(std::sin(theta > pi ? theta - 6.283185307179586 : theta) * d);
@@ -60,37 +56,25 @@ inline int point_on_line(const geo_nee& a, const geo_nee& b, const geo_nee& p, d
 }
 
 inline int point_in_poly_2(int n, const geo_nee* polygon, const geo_nee& p, double tolerance) {
-    if (n < 1) {
-        return 0;
-    }
-    int inside = 0;
-    int j = n - 1;
-    for (int i = 0; i < n; ++i) {
-        if (point_on_line(polygon[i], polygon[j], p, tolerance) == 1) {
-            return 1;
-        }
-        cross(polygon[j], polygon[i], p, inside);
-        j = i;
-    }
-    return inside;
+    return in_polygon(n, polygon, p, [&](const geo_nee& from, const geo_nee& to) {
+        return point_on_line(from, to, p, tolerance) == 1;
+    });
 }
 
 inline int point_on_polyline(int n, const geo_nee* v, const geo_nee& p, double tolerance) {
+    const auto square = [](const geo_nee& a, const geo_nee& b) {
+        return (a.north - b.north) * (a.north - b.north) + (a.east - b.east) * (a.east - b.east);
+    };
     for (int i = 0; i < n; ++i) {
         const geo_nee& a = v[i];
         const geo_nee& b = v[(i + 1) % n];
-        if ((p.east == a.east && p.north == a.north) || (p.east == b.east && p.north == b.north)) {
-            return 1;
-        }
-        const double length2 =
-            (a.north - b.north) * (a.north - b.north) + (a.east - b.east) * (a.east - b.east);
+        const double length2 = square(a, b);
         const double dist =
             std::fabs((b.north - p.north) * (a.east - p.east) - (b.east - p.east) * (a.north - p.north)) /
             std::sqrt(length2);
-        const double pa2 = (a.north - p.north) * (a.north - p.north) + (a.east - p.east) * (a.east - p.east);
-        const double pb2 = (b.north - p.north) * (b.north - p.north) + (b.east - p.east) * (b.east - p.east);
-        if (dist < tolerance && pa2 < length2 + tolerance * tolerance &&
-            pb2 < length2 + tolerance * tolerance) {
+        const double reach2 = length2 + tolerance * tolerance;
+        if ((p.east == a.east && p.north == a.north) || (p.east == b.east && p.north == b.north) ||
+            (dist < tolerance && square(a, p) < reach2 && square(b, p) < reach2)) {
             return 1;
         }
     }
@@ -98,16 +82,13 @@ inline int point_on_polyline(int n, const geo_nee* v, const geo_nee& p, double t
 }
 
 inline int lines_cross(const geo_nee& p1, const geo_nee& p2, const geo_nee& q1, const geo_nee& q2) {
-    const auto side_p = [&](const geo_nee& x) {
-        return (p2.east - p1.east) * x.north - (p2.north - p1.north) * x.east;
+    const auto side = [](const geo_nee& a, const geo_nee& b, const geo_nee& x) {
+        return (b.east - a.east) * x.north - (b.north - a.north) * x.east;
     };
-    const auto side_q = [&](const geo_nee& x) {
-        return (q2.east - q1.east) * x.north - (q2.north - q1.north) * x.east;
+    const auto parts = [&](const geo_nee& a, const geo_nee& b, const geo_nee& c, const geo_nee& d) {
+        return (side(a, b, a) > side(a, b, c)) != (side(a, b, a) > side(a, b, d));
     };
-    if ((side_p(p1) > side_p(q1)) == (side_p(p1) > side_p(q2))) {
-        return 0;
-    }
-    return (side_q(q1) > side_q(p1)) != (side_q(q1) > side_q(p2)) ? 1 : 0;
+    return parts(p1, p2, q1, q2) && parts(q1, q2, p1, p2) ? 1 : 0;
 }
 
 /// Knuth's MMIX generator; the low bits are poor, so the high ones are used.

@@ -40,15 +40,15 @@ void check(const CodePage& code_page, const std::string& bytes, const std::wstri
         lines += is_over ? "" : ch == L'\n' ? "\r\n" : encoded;
     }
     std::vector<char> piece(most * MB_LEN_MAX);
-    std::string all;
-    std::string all_lines;
-    for (std::wstring_view left = wide; !left.empty();) {
-        all.append(piece.data(), code_page.narrow_piece(left, most, piece.data()));
-    }
-    for (std::wstring_view left = wide; !left.empty();) {
-        all_lines.append(piece.data(), code_page.narrow_line_piece(left, most, piece.data()));
-    }
-    require(all == narrowed && code_page.narrow(wide) == narrowed && all_lines == lines);
+    const auto in_pieces = [&](auto next) {
+        std::string all;
+        for (std::wstring_view left = wide; !left.empty();) {
+            all.append(piece.data(), (code_page.*next)(left, most, piece.data()));
+        }
+        return all;
+    };
+    require(code_page.narrow(wide) == narrowed && in_pieces(&CodePage::narrow_piece) == narrowed);
+    require(in_pieces(&CodePage::narrow_line_piece) == lines);
 }
 
 }  // namespace

@@ -44,9 +44,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
             require(!are_digits(pairs) || decoded == HexStringToVector(pairs));
         }
     }
-    require(VectorToHexString(bytes) == text && StringToHexString(any) == text &&
-            HexStringToVector(text) == bytes);
-    require(IsHexString(any) == are_digits(any));
+    require(VectorToHexString(bytes) == text && StringToHexString(any) == text);
+    require(HexStringToVector(text) == bytes && IsHexString(any) == are_digits(any));
+    require(IsHexString(text) && IsHexString(spoilt) == are_digits(spoilt));
     const Bytes decoded = HexStringToVector(any);
     const bool has_zero = std::find(decoded.begin(), decoded.end(), 0) != decoded.end();
     try {

@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
+
+#include "basalt/frame.h"
 #include "src/platform/text_conversion.h"
 #include "tests/platform/error_of.h"
 #include "tests/support/locales.h"
@@ -33,8 +36,7 @@ void check_encodings() {
     closed.close();
     EXPECT_EQ(closed.narrow(L"\x20AC"), "\xE2\x82\xAC");
     for (const wchar_t ch : L"\x08\t\r\x0E !@AZ[`az{\xC9\x2003"s) {
-        EXPECT_EQ(closed.to_lower(ch), ascii.to_lower(ch));
-        EXPECT_EQ(closed.to_upper(ch), ascii.to_upper(ch));
+        EXPECT_TRUE(closed.to_lower(ch) == ascii.to_lower(ch) && closed.to_upper(ch) == ascii.to_upper(ch));
         EXPECT_EQ(closed.is_space(ch), ascii.is_space(ch));
     }
     EXPECT_EQ(CodePage("no_SUCH.locale").to_lower(L'\x17D'), L'\x17E');
@@ -49,8 +51,7 @@ TEST(CodePage, single_and_double_byte_encodings_and_the_one_the_environment_name
             GTEST_SKIP() << "localedef cannot make a locale with " << encoding;
         }
     }
-    GTEST_FLAG_SET(death_test_style,
-                   "threadsafe");  // each row is a process, since the environment is read once
+    GTEST_FLAG_SET(death_test_style, "threadsafe");  // the environment is read once in a process
     EXPECT_EXIT(check_encodings(), testing::ExitedWithCode(0), "");
     constexpr const char* ROWS[][3] = {{"ISO-8859-15", "", ""}, {"", "ISO-8859-15", "C"},
                                        {"", "", "ISO-8859-15"}, {"C", "ISO-8859-15", ""},
@@ -59,8 +60,13 @@ TEST(CodePage, single_and_double_byte_encodings_and_the_one_the_environment_name
         setenv("LC_ALL", row[0], 1);
         setenv("LC_CTYPE", row[1], 1);
         setenv("LANG", row[2], 1);
-        const std::size_t size = &row < ROWS + 3 ? 1 : 2;  // UTF-8 has two bytes
-        EXPECT_EXIT(std::_Exit(narrow(L"\xE9").size() != size), testing::ExitedWithCode(0), "") << row[0];
+        const auto size_converted = [] {
+            char bytes[9];
+            _tchar2char(L"\xE9", bytes, 8);
+            std::_Exit(static_cast<int>(std::strlen(bytes)));
+        };
+        const int size = &row < ROWS + 3 ? 1 : 2;  // UTF-8 has two bytes
+        EXPECT_EXIT(size_converted(), testing::ExitedWithCode(size), "") << row[0];
     }
     for (const char* const variable : {"LC_ALL", "LC_CTYPE", "LANG"}) {
         unsetenv(variable);

@@ -22,8 +22,9 @@ constexpr std::uint32_t LAST_COUNTED_DAY = (std::uint32_t{1} << 29) - 1;
 constexpr std::uint64_t NO_TIME = ~std::uint64_t{0};
 constexpr std::int64_t TICKS_OF_1970 = SECONDS_BEFORE_1970 * TICKS_PER_SECOND;
 
-/// Day of the week, 0 for Sunday, by the year as 16 bits hold it.
-int day_of_week(int year, int month, int day) {
+/// Day of the week, 0 for Sunday, by the year as 16 bits hold it: another year than the day's own before the
+/// year 1 and after 65535.
+int day_of_week_by_date(int year, int month, int day) {
     constexpr std::array<int, 12> DAYS_BEFORE_MONTH = {0, 31, 59, 90, 120, 151, 181, 212, 243, 273, 304, 334};
     const bool is_leap = (year % 4 == 0 && year % 100 != 0) || year % 400 == 0;
     const int day_of_year =
@@ -50,17 +51,20 @@ void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std
         year = month = day = dayOfWeek = 0;
         return;
     }
-    auto l = static_cast<int>(counted);
-    const int n = 4 * l / 146097;
-    l -= (146097 * n + 3) / 4;
-    const int i = 4000 * (l + 1) / 1461001;
+    const std::uint32_t n = 4 * counted / 146097;
+    std::uint32_t l = counted - (146097 * n + 3) / 4;
+    const std::uint32_t i = 4000 * (l + 1) / 1461001;
     l = l - 1461 * i / 4 + 31;
-    const int j = 80 * l / 2447;
-    const int k = j / 11;
-    year = static_cast<std::uint16_t>(100 * (n - 49) + i + k);
+    const std::uint32_t j = 80 * l / 2447;
+    const std::uint32_t k = j / 11;
+    const int whole_year = static_cast<int>(100 * n + i + k) - 4900;
+    year = static_cast<std::uint16_t>(whole_year);
     month = static_cast<std::uint16_t>(j + 2 - 12 * k);
     day = static_cast<std::uint16_t>(l - 2447 * j / 80);
-    dayOfWeek = static_cast<std::uint16_t>(day_of_week(year, month, day));
+    constexpr std::uint32_t WEEKDAY_OF_FIRST = 4;  // Thursday, the day that is counted as 0
+    dayOfWeek = static_cast<std::uint16_t>(whole_year >= 1 && whole_year <= 65535
+                                               ? (counted + WEEKDAY_OF_FIRST) % DAYS_PER_WEEK
+                                               : day_of_week_by_date(year, month, day));
 }
 
 void _mjd2gps(std::uint32_t mjd, double secondsOfDay, std::uint16_t& week, double& secondsOfWeek) {

@@ -25,9 +25,10 @@ using namespace plain;
 
 // Where formulas turn, near there, metres or radians, and any bits.
 double number(Input& input) {
-    constexpr double SPECIAL[] = {0.0,   -0.0,  1.0,      PI,           PI / 2,    2 * PI,
-                                  100.0, 1e-4,  5e-4,     1e-12,        6378137.0, 1e10,
-                                  1e154, 1e308, GEO_NULL, GEO_INFINITY, INF,       NOT_A_NUMBER};
+    constexpr double SPECIAL[] = {0.0,       -0.0,         1.0,   PI,          PI / 2, 2 * PI, 100.0,
+                                  1e-4,      5e-4,         1e-8,  1e-12,       1e-170, 1e-200, 5e-324,
+                                  6378137.0, 1e10,         2e100, 1e154,       1e160,  1e308,  1.7e308,
+                                  GEO_NULL,  GEO_INFINITY, INF,   NOT_A_NUMBER};
     const unsigned choice = input.byte();
     const double special = SPECIAL[choice % std::size(SPECIAL)];
     const double numbers[] = {special, -special, std::nextafter(special, 1e300), (choice - 128.0) / 40.0};
@@ -112,17 +113,27 @@ void compare_polygons(const std::vector<geo_nee>& v, const geo_nee& p, double to
     require(geo_lines_cross(first, last, middle, p) == plain::lines_cross(first, last, middle, p));
 }
 
+// Values of a grid that many share, some one unit in the last place beside it, and any other numbers.
 void awkward_polygon(Random& random) {
     constexpr double TOLERANCES[] = {0.0,  1e-300, 1e-9, 0.25, 0.5,   1.0,          1e6,     1e200,
                                      -0.0, -0.1,   -INF, INF,  1e308, NOT_A_NUMBER, GEO_NULL};
+    const auto coordinate = [&random] {
+        const std::uint32_t bits[] = {random.bits(), random.bits(), random.bits()};
+        Input input(reinterpret_cast<const std::uint8_t*>(bits), sizeof bits);
+        const double grid = random.below(6);
+        const double numbers[] = {number(input), random.real(0.0, 5.0),
+                                  std::nextafter(grid, random.below(2) * 9.0)};
+        const int choice = random.below(24);
+        return choice < 7 ? numbers[choice == 0 ? 0 : 1 + choice % 2] : grid;
+    };
     std::vector<geo_nee> v(static_cast<std::size_t>(1 + random.below(random.below(16) == 0 ? 70 : 12)));
     for (geo_nee& vertex : v) {
-        vertex = {random.awkward(), random.awkward(), NOT_A_NUMBER};
+        vertex = {coordinate(), coordinate(), NOT_A_NUMBER};
     }
     if (random.below(3) == 0) {
         v.push_back(v.front());
     }
-    compare_polygons(v, {random.awkward(), random.awkward(), NOT_A_NUMBER}, TOLERANCES[random.below(15)]);
+    compare_polygons(v, {coordinate(), coordinate(), NOT_A_NUMBER}, TOLERANCES[random.below(15)]);
 }
 
 // A point on or near a corner or side of the band of an edge.

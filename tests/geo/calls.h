@@ -3,6 +3,7 @@
 #define BASALT_TESTS_GEO_CALLS_H
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 #include <cstring>
 #include <initializer_list>
@@ -145,17 +146,17 @@ using OfVector = double (*)(const geo_vector&);
 using OfVectors = double (*)(const geo_vector&, const geo_vector&);
 using AddVectors = void (*)(const geo_vector&, const geo_vector&, geo_vector&);
 
-inline constexpr Call CALLS[] = {
-    call<geo_normalised_bearing>("geo_normalised_bearing"),
-    call<geo_horz_dist>("geo_horz_dist", 0),
-    call<geo_horz_distSq>("geo_horz_distSq", 0),
-    call<geo_vert_dist>("geo_vert_dist"),
-    call<geo_slope_dist>("geo_slope_dist", 0),
-    call<nee_equal>("nee_equal", 0, 1),
-    call<geo_dist_equal>("geo_dist_equal", 0, 1),
-    call<geo_grid_bearing>("geo_grid_bearing", 0, 2 * PI),
-    call<geo_gradient>("geo_gradient", -PI / 2, PI / 2),
-    call<geo_gradient2>("geo_gradient2"),
+template <class... Calls>
+constexpr std::array<Call, sizeof...(Calls)> table(const Calls&... calls) {
+    return {calls...};
+}
+
+inline constexpr auto CALLS = table(
+    call<geo_normalised_bearing>("geo_normalised_bearing"), call<geo_horz_dist>("geo_horz_dist", 0),
+    call<geo_horz_distSq>("geo_horz_distSq", 0), call<geo_vert_dist>("geo_vert_dist"),
+    call<geo_slope_dist>("geo_slope_dist", 0), call<nee_equal>("nee_equal", 0, 1),
+    call<geo_dist_equal>("geo_dist_equal", 0, 1), call<geo_grid_bearing>("geo_grid_bearing", 0, 2 * PI),
+    call<geo_gradient>("geo_gradient", -PI / 2, PI / 2), call<geo_gradient2>("geo_gradient2"),
     call<Angles(geo_grid_divergence)>("geo_grid_divergence"),
     call<Lines(geo_grid_divergence)>("divergence_of_lines", 0, PI),
     call<geo_bisected_bearing>("geo_bisected_bearing"),
@@ -165,48 +166,29 @@ inline constexpr Call CALLS[] = {
     call<OfVector(geo_vector_gradient)>("geo_vector_gradient", -PI / 2, PI / 2),
     call<OfVector(geo_vector_x_component_gradient)>("geo_vector_x_component_gradient", -PI / 2, PI / 2),
     call<OfVector(geo_vector_y_component_gradient)>("geo_vector_y_component_gradient", -PI / 2, PI / 2),
-    call<vector_reverse>("geo_vector_reverse"),
-    call<AddVectors(geo_vector_add)>("geo_vector_add"),
-    call<centroid>("geo_grid_centroid"),
-    call<geo_triangle_area>("geo_triangle_area", 0),
-    call<geo_point_on_line>("geo_point_on_line", 0, 1),
-    call<geo_lines_cross>("geo_lines_cross", 0, 1),
-    call<intersect>("geo_grid_bb_intersect", 0, 1),
-    call<normalise_obs>("geo_normalise_obs"),
-    call<geo_reduce_obs>("geo_reduce_obs"),
-    call<geo_calc_obs>("geo_calc_obs"),
-    call<geo_grid_follow>("geo_grid_follow"),
-    call<geo_grid_follow2>("geo_grid_follow2"),
-    call<geo_grid_follow3>("geo_grid_follow3"),
-    call<geo_arc_angle_to_length>("geo_arc_angle_to_length"),
-    call<geo_arc_length_to_angle>("geo_arc_length_to_angle"),
-    call<geo_arc_to_chord>("geo_arc_to_chord"),
-    call<geo_spiral_deflection>("geo_spiral_deflection"),
-    call<geo_spiral_deltas>("geo_spiral_deltas"),
-    call<_xyz2llh>("_xyz2llh", 0, 1),
-    call<_llh2xyz>("_llh2xyz", 0, 1),
-    call<_xyz2nez>("_xyz2nez", 1, 1),
-    call<_wgs84curvature>("_wgs84curvature"),
-    call<llh_equal>("llh_equal", 0, 1),
+    call<vector_reverse>("geo_vector_reverse"), call<AddVectors(geo_vector_add)>("geo_vector_add"),
+    call<centroid>("geo_grid_centroid"), call<geo_triangle_area>("geo_triangle_area", 0),
+    call<geo_point_on_line>("geo_point_on_line", 0, 1), call<geo_lines_cross>("geo_lines_cross", 0, 1),
+    call<intersect>("geo_grid_bb_intersect", 0, 1), call<normalise_obs>("geo_normalise_obs"),
+    call<geo_reduce_obs>("geo_reduce_obs"), call<geo_calc_obs>("geo_calc_obs"),
+    call<geo_grid_follow>("geo_grid_follow"), call<geo_grid_follow2>("geo_grid_follow2"),
+    call<geo_grid_follow3>("geo_grid_follow3"), call<geo_arc_angle_to_length>("geo_arc_angle_to_length"),
+    call<geo_arc_length_to_angle>("geo_arc_length_to_angle"), call<geo_arc_to_chord>("geo_arc_to_chord"),
+    call<geo_spiral_deflection>("geo_spiral_deflection"), call<geo_spiral_deltas>("geo_spiral_deltas"),
+    call<_xyz2llh>("_xyz2llh", 0, 1), call<_llh2xyz>("_llh2xyz", 0, 1), call<_xyz2nez>("_xyz2nez", 1, 1),
+    call<_wgs84curvature>("_wgs84curvature"), call<llh_equal>("llh_equal", 0, 1),
     call<propagate<Varxyz2varllh>>("Varxyz2varllh", 1, 1),
     call<propagate<Varxyz2varneu>>("Varxyz2varneu", 1, 1),
     call<geo_vincenty_direct>("geo_vincenty_direct", -PI, PI),
     call<geo_vincenty_distance>("geo_vincenty_distance", 0, 20015087),
     call<geo_vincenty_bearing>("geo_vincenty_bearing", 0, 2 * PI),
     call<geo_vincenty_crosstrack>("geo_vincenty_crosstrack", -20015087, 20015087),
-    call<inverse>("geodesic_inverse", 0, 20003931.459),
-    call<_degtorad>("_degtorad"),
-    call<_radtodms>("_radtodms", -2147483647, 2147483647),
-    call<_dmstorad>("_dmstorad"),
-    call<_mtoftin>("_mtoftin", 0, 1),
-    call<_ftintom>("_ftintom"),
-    call<_normalisedbearing>("_normalisedbearing"),
-    call<factorial>("factorial", 1),
-    call<_greg2mjd>("_greg2mjd", 0, 4294967295.0),
-    call<_mjd2greg>("_mjd2greg", 0, 65535),
-    call<_mjd2gps>("_mjd2gps", 0, 9362),
-    call<_gps2mjd>("_gps2mjd"),
-};
+    call<inverse>("geodesic_inverse", 0, 20003931.459), call<_degtorad>("_degtorad"),
+    call<_radtodms>("_radtodms", -2147483647, 2147483647), call<_dmstorad>("_dmstorad"),
+    call<_mtoftin>("_mtoftin", 0, 1), call<_ftintom>("_ftintom"),
+    call<_normalisedbearing>("_normalisedbearing"), call<factorial>("factorial", 1),
+    call<_greg2mjd>("_greg2mjd", 0, 4294967295.0), call<_mjd2greg>("_mjd2greg", 0, 65535),
+    call<_mjd2gps>("_mjd2gps", 0, 9362), call<_gps2mjd>("_gps2mjd"));
 
 }  // namespace geo_calls
 

@@ -104,24 +104,6 @@ public:
     /// In [low, high); exact steps of 2^-32 of the range.
     double real(double low, double high) { return low + (high - low) * (bits() * 0x1p-32); }
 
-    /// A grid value shared by many, one a unit in the last place beside it, another number, or an extreme.
-    double awkward() {
-        static constexpr double EXTREMES[] = {
-            0.0, -0.0, 5e-324,       GEO_NULL, 1e-200,  1e154, 1e160,     -1.7e308, 1.7e308,
-            INF, -INF, NOT_A_NUMBER, 1e-8,     -1e-170, 0.1,   1.0 / 3.0, 2e100,    4503599627370497.0};
-        const double grid = below(6);
-        switch (below(8)) {
-            case 0:
-                return std::nextafter(grid, below(2) == 0 ? -1.0 : 9.0);
-            case 1:
-                return real(0.0, 5.0);
-            case 2:
-                return below(4) == 0 ? EXTREMES[below(18)] : grid;
-            default:
-                return grid;
-        }
-    }
-
 private:
     std::uint64_t m_state;
 };

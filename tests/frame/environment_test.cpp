@@ -66,8 +66,7 @@ TEST(Environment, operating_system_codes) {
 }
 
 TEST(Environment, handheld_display_and_language) {
-    using Row =
-        std::tuple<bool (*)(), unsigned, unsigned>;  // a bit for each code that can: without and with flags
+    using Row = std::tuple<bool (*)(), unsigned, unsigned>;  // bits of the codes that can, then with flags
     for (const auto& [query, without_flags, with_flags] :
          {Row(_handheldCanHaveInBuildKV7Radio, 0x160, 0x160),
           Row(_handheldCanHaveInBuildModem, 0x4C88, 0x4C88),

@@ -88,8 +88,8 @@ TEST(CodePage, conversions_into_buffers) {
     for (const auto& [page, flags, length, room] :
          {std::tuple(1252U, 0U, 1, 4), {0U, 8U, 1, 4}, {0U, 0U, 0, 4}, {0U, 0U, -2, 4}, {0U, 0U, 1, -1}}) {
         EXPECT_EQ(error_of(MultiByteToWideChar(page, flags, back, length, wide, room)), 87U);
-        EXPECT_EQ(error_of(WideCharToMultiByte(page, flags, wide, length, back, room, nullptr, nullptr)),
-                  87U);
+        const auto to_narrow = WideCharToMultiByte(page, flags, wide, length, back, room, nullptr, nullptr);
+        EXPECT_EQ(error_of(to_narrow), 87U);
     }
     EXPECT_EQ(error_of(MultiByteToWideChar(CP_ACP, 0, "a", 1, nullptr, 4)), 87U);
     EXPECT_EQ(error_of(MultiByteToWideChar(CP_ACP, 0, nullptr, 1, wide, 4)), 87U);

@@ -91,8 +91,7 @@ TEST(CString, changes_in_place) {
     CString text = L"one two one";
     CString log;
     const auto step = [&](int result) { log += all(result, text); };
-    step(text.Replace(L"one", L"three")), step(text.Replace(L"three", nullptr)),
-        step(text.Replace(L"", L"x"));
+    step(text.Replace(L"one", L"three")), step(text.Replace(L"three", NONE)), step(text.Replace(L"", L"x"));
     step(text.Replace(L' ', L'.')), step(text.Replace(L'.', L'.')), step(text.Remove(L'.'));
     step(text.Insert(-3, L'<')), step(text.Insert(99, L">")), step(text.Insert(1, text.GetString()));
     step(text.Delete(6, 99)), step(text.Delete(0)), step(text.Delete(-5, 1)), step(text.Delete(2, -1));

@@ -35,14 +35,10 @@ TEST(Errors, are_a_threads_own_and_come_from_errno) {
     }
 }
 
-DWORD format(DWORD code, wchar_t*& text, DWORD size = 0, DWORD flags = 0x1300, DWORD language = 0) {
-    return FormatMessageW(flags, nullptr, code, language, &text, size, nullptr);
-}
-
 TEST(Errors, have_messages_without_line_breaks) {
+    wchar_t* text = nullptr;
     for (const DWORD code : {0U, 2U, 8U, 87U, 487U, 1921U, 9999U, 0xFFFFFFFFU}) {
-        wchar_t* text = nullptr;
-        const DWORD length = format(code, text, code == 0 ? 5000 : 0);
+        const DWORD length = FormatMessageW(0x1300, nullptr, code, 0, &text, code == 0 ? 5000 : 0, nullptr);
         text[code == 0 ? 4999 : length] = L'\0';  // the size requested
         const std::wstring message(text, length);
         const std::wstring unknown = L"Unknown error " + std::to_wstring(code);
@@ -52,10 +48,10 @@ TEST(Errors, have_messages_without_line_breaks) {
     }
     for (const DWORD flags : {0U, 0x1000U, 0x1200U, 0x1100U, 0x1301U, 0x1B00U, 0x1300U}) {
         wchar_t dummy[] = L"x";
-        wchar_t* text = dummy;
+        text = dummy;
         SetLastError(0);
-        EXPECT_EQ(format(5, text, 0, flags, flags == 0x1300 ? 1033 : 0), 0U);
-        EXPECT_TRUE(GetLastError() == 87 && text == nullptr);
+        EXPECT_EQ(FormatMessageW(flags, nullptr, 5, flags == 0x1300 ? 1033 : 0, &text, 0, nullptr), 0U);
+        EXPECT_TRUE(GetLastError() == 87 && text == nullptr) << flags;
     }
     EXPECT_EQ(FormatMessageW(0x1300, nullptr, 5, 0, nullptr, 0, nullptr), 0U);
 }

@@ -74,11 +74,9 @@ TEST_F(File, is_held_alone_and_deleted_on_close_or_exit) {
     EXPECT_EQ(folder.names().size(), 1U) << "a child leaves its parent's files";
     EXPECT_TRUE(CloseHandle(file) == 1 && error_of(CloseHandle(file)) == ERROR_INVALID_HANDLE);
     EXPECT_TRUE(folder.names().empty() && open_descriptors() == descriptors);
-    fs::create_directories(folder / "a/b");
-    const std::wstring same[] = {here + L"\\a\\/b\\x", here + L"a/b/x"};
-    EXPECT_EQ((Errors{open_error(same[0], CREATE_NEW, FILE_ATTRIBUTE_NORMAL),
-                      open_error(same[1], OPEN_EXISTING, 0x0C000102), delete_error(same[1])}),
-              (Errors{0, 0, 2}));
+    folder.write("x");
+    EXPECT_EQ(open_error(here + L"\\x", OPEN_EXISTING, 0x0C000102), 0U) << "both separators work";
+    EXPECT_EQ(delete_error(here + L"x"), 2U);
 }
 
 TEST_F(File, failures_have_their_win32_codes) {
@@ -109,35 +107,29 @@ TEST_F(File, deletes_what_it_opened_and_nothing_else) {
     fs::current_path(folder / "gone");
     const HANDLE relative = open(L"relative", CREATE_NEW), replaced = open(here + L"replaced", CREATE_NEW);
     fs::current_path(before);
-    EXPECT_EQ(CloseHandle(relative), 1);
     fs::remove(folder / "replaced");
     folder.write("replaced", "another's");
-    EXPECT_EQ(CloseHandle(replaced), 1);
-    EXPECT_EQ(delete_error(here + L"replaced"), 0U);
-    fs::current_path(folder / "gone");
-    fs::remove(folder / "gone");
-    EXPECT_EQ(open_error(L"relative", CREATE_NEW), ERROR_PATH_NOT_FOUND);
-    fs::current_path(before);
+    EXPECT_TRUE(CloseHandle(relative) == 1 && CloseHandle(replaced) == 1);
+    EXPECT_TRUE(fs::is_empty(folder / "gone") && folder.names().contains("replaced"));
 }
 
 TEST_F(File, temporary_ones_are_new_and_named_as_in_win32) {
     const std::wstring plain = here.substr(0, here.size() - 1);
     const std::wstring longest = std::wstring(MAX_PATH - 14 - plain.size(), L'/') + plain;
     wchar_t name[MAX_PATH] = {}, text[40];
-    for (const wchar_t* const prefix : {L"vmax", L""}) {
-        for (const std::wstring& place : {plain, plain + L"\\", longest}) {
-            const UINT number = make_temporary(place, prefix, name);
-            std::swprintf(text, 40, L"%.3ls%X.tmp", prefix, number);
-            EXPECT_EQ(name, place + (place.back() == L'\\' ? L"" : L"/") + text);
-            EXPECT_TRUE(number >= 1 && number <= 0xFFFF && delete_error(here + text) == 0);
-        }
+    for (const std::wstring& place : {plain, plain + L"\\", longest}) {
+        const UINT number = make_temporary(place, place == longest ? L"" : L"vmax", name);
+        std::swprintf(text, 40, L"%ls%X.tmp", place == longest ? L"" : L"vma", number);
+        EXPECT_EQ(name, place + (place.back() == L'\\' ? L"" : L"/") + text);
+        EXPECT_TRUE(number >= 1 && number <= 0xFFFF && delete_error(here + text) == 0);
     }
     const std::wstring last = name;
     const SystemFailure taken(1, SystemFailure::Then::STAYS, EEXIST);
-    EXPECT_EQ(error_of(make_temporary(L"/" + longest, L"vma", name)), 206U);
-    EXPECT_EQ(error_of(make_temporary(plain, L"\xD800", name)), 123U);
-    EXPECT_EQ(error_of(make_temporary(plain, L"vma", name, 7)), 87U);
-    EXPECT_EQ(error_of(make_temporary(plain, L"vma", name)), 80U);
+    EXPECT_EQ((Errors{error_of(make_temporary(L"/" + longest, L"vma", name)),
+                      error_of(make_temporary(plain, L"\xD800", name)),
+                      error_of(make_temporary(plain, L"vma", name, 7)),
+                      error_of(make_temporary(plain, L"vma", name))}),
+              (Errors{206, 123, 87, 80}));
     EXPECT_TRUE(name == last && folder.names().empty());
 }
 
@@ -165,7 +157,7 @@ TEST_F(File, mappings_have_disk_space_and_keep_the_files_lock_without_a_descript
         const HANDLE file = open(name, CREATE_NEW, view_first ? FILE_FLAG_DELETE_ON_CLOSE : 0);
         const HANDLE mapping = make_mapping(file), second = make_mapping(file);
         struct stat status = {};
-        ASSERT_EQ(stat((folder / "file").c_str(), &status), 0);
+        EXPECT_EQ(stat((folder / "file").c_str(), &status), 0);
         EXPECT_TRUE(status.st_size == off_t{SIZE} && status.st_blocks * 512 >= status.st_size);
         char* const view = map(mapping, view_first ? SIZE : 0);
         EXPECT_EQ(open_descriptors(), descriptors);
@@ -188,15 +180,12 @@ TEST_F(File, mappings_have_disk_space_and_keep_the_files_lock_without_a_descript
 TEST_F(File, other_uses_of_mappings_are_refused) {
     const HANDLE file = open(here + L"file", CREATE_NEW), mapping = make_mapping(file);
     char* const view = map(make_mapping(INVALID_HANDLE_VALUE));
-    EXPECT_EQ(error_of(make_mapping(INVALID_HANDLE_VALUE, 0)), 87U);
-    EXPECT_EQ(error_of(make_mapping(file, 0)), 1006U);
-    EXPECT_EQ(error_of(make_mapping(nullptr)), 6U);
-    EXPECT_EQ(error_of(make_mapping(file, SIZE_MAX)), 223U);
-    EXPECT_EQ(error_of(make_mapping(file, 1, PAGE_NOACCESS)), 87U);
-    EXPECT_EQ(error_of(map(file)), 6U);
-    EXPECT_EQ(error_of(map(mapping, SIZE + 1)), 87U);
-    EXPECT_EQ(error_of(map(mapping, SIZE, 4096)), 87U);
-    EXPECT_EQ(error_of(UnmapViewOfFile(view + 1)), 487U);
+    EXPECT_EQ((Errors{error_of(make_mapping(INVALID_HANDLE_VALUE, 0)), error_of(make_mapping(file, 0)),
+                      error_of(make_mapping(nullptr)), error_of(make_mapping(file, SIZE_MAX)),
+                      error_of(make_mapping(file, 1, PAGE_NOACCESS)), error_of(map(file)),
+                      error_of(map(mapping, SIZE + 1)), error_of(map(mapping, SIZE, 4096)),
+                      error_of(UnmapViewOfFile(view + 1))}),
+              (Errors{87, 1006, 6, 223, 87, 6, 87, 87, 487}));
     EXPECT_EQ((SystemFailure(1), error_of(UnmapViewOfFile(view))), ERROR_NOT_ENOUGH_MEMORY);
     EXPECT_TRUE(UnmapViewOfFile(view) && CloseHandle(mapping) && CloseHandle(file)) << "it stayed";
 }
@@ -235,8 +224,7 @@ TEST_F(File, reports_raise_no_signal_and_do_not_block) {
         sigprocmask(SIG_BLOCK, &signals, nullptr);
         raise(SIGPIPE);
         report(ends[1]);
-        sigpending(&signals);
-        EXPECT_EQ(sigismember(&signals, SIGPIPE), 1) << "pending before, so still pending";
+        EXPECT_TRUE(sigpending(&signals) == 0 && sigismember(&signals, SIGPIPE) == 1) << "as before";
         const rlimit limit = {1000, RLIM_INFINITY};
         setrlimit(RLIMIT_FSIZE, &limit);
         report(::open((folder / "errors").c_str(), O_CREAT | O_WRONLY, 0600));

@@ -17,6 +17,9 @@ using Place = std::pair<std::ptrdiff_t, UINT>;
 constexpr std::size_t FIRST = 40 + 36;  // offset of the first node below StringFileInfo
 constexpr Place NONE = {1813, 0};
 
+Bytes patched(Bytes block, std::size_t offset, std::size_t word) {
+    return put_word(block, offset, word), block;
+}
 // A value's offset and length in the block, or an error.
 Place place(const Bytes& block, const std::wstring& path) {
     void* value = nullptr;
@@ -32,9 +35,8 @@ std::wstring text_at(const Bytes& block, const std::wstring& path) {
 }
 
 TEST(VersionQuery, finds_values_by_their_path) {
-    Bytes block = survey_resource();
-    EXPECT_EQ(place(block, L"\\"), Place(40, 52));
-    EXPECT_EQ(place(block, L""), Place(40, 52));
+    const Bytes block = survey_resource();
+    EXPECT_TRUE(place(block, L"\\") == Place(40, 52) && place(block, L"") == Place(40, 52));
     EXPECT_EQ(place(block, L"\\VarFileInfo\\Translation").second, 8U);
     const wchar_t* const rows[][2] = {
         {L"040904b0\\ProductName", L"Survey"},     {L"040904B0\\PRODUCTNAME", L"Survey"},
@@ -44,17 +46,15 @@ TEST(VersionQuery, finds_values_by_their_path) {
     for (const auto& [path, text] : rows) {
         EXPECT_EQ(text_at(block, path), text);
     }
-    for (const wchar_t* const missing :
-         {L"\\ProductName", L"\\\\StringFileInfo", L"\\VarFileInfo\\Translation\\x"}) {
-        EXPECT_EQ(place(block, missing), NONE) << missing;
+    const std::wstring missing[] = {L"\\ProductName", L"\\\\StringFileInfo",
+                                    L"\\VarFileInfo\\Translation\\x"};
+    for (const std::wstring& path : missing) {
+        EXPECT_EQ(place(block, path), NONE) << path.c_str();
     }
-    for (const std::size_t spoilt : {2U, 40U}) {  // the root value's size, its signature
-        --block[spoilt];
-        EXPECT_EQ(place(block, L"\\"), NONE) << spoilt;
-        ++block[spoilt];
+    // Another signature, and sizes of the root's value.
+    for (const Bytes& bad : {patched(block, 40, 0x04BE), patched(block, 2, 51), patched(block, 2, 0xFFFF)}) {
+        EXPECT_EQ(place(bad, L"\\"), NONE);
     }
-    put_word(block, 2, 0xFFFF);
-    EXPECT_EQ(place(block, L"\\"), NONE);
 }
 
 TEST(VersionQuery, a_text_ends_at_its_terminator_or_its_length_in_units) {
@@ -65,14 +65,11 @@ TEST(VersionQuery, a_text_ends_at_its_terminator_or_its_length_in_units) {
         {{u'a', u'b', 0, 0}, 0xFFFF, L"ab"},
         {{0xDC00, u'a', 0xD83C, u'b', 0xD83C}, 5, L"\uFFFDa\uFFFDb\uFFFD"}};
     for (const auto& [value, claimed, text] : rows) {
-        Bytes block = resource({}, {node(u"Key", utf16(value), true, {text_node(u"x", u"y")})}, {});
-        put_word(block, FIRST + 2, claimed);
-        EXPECT_EQ(text_at(block, L"Key"), text);
+        const Bytes block = resource({}, {node(u"Key", utf16(value), true, {text_node(u"x", u"y")})}, {});
+        EXPECT_EQ(text_at(patched(block, FIRST + 2, claimed), L"Key"), text);
     }
-    Bytes last = resource({}, {text_node(u"Key", u"Survey")}, {});
-    put_word(last, FIRST + 2, 14);
-    put_word(last, FIRST + 4, 0);  // claims to be bytes
-    EXPECT_EQ(place(last, L"\\StringFileInfo\\Key"), Place(92, 7));
+    const Bytes last = patched(resource({}, {text_node(u"Key", u"Survey")}, {}), FIRST + 2, 14);
+    EXPECT_EQ(place(patched(last, FIRST + 4, 0), L"\\StringFileInfo\\Key"), Place(92, 7)) << "in bytes";
 }
 
 TEST(VersionQuery, nodes_that_do_not_fit_end_the_search) {
@@ -88,8 +85,7 @@ TEST(VersionQuery, nodes_that_do_not_fit_end_the_search) {
                                                                             {rest + 1, L"none", L"none"},
                                                                             {0xFFFF, L"none", L"none"}};
     for (const auto& [claimed, a, b] : rows) {
-        Bytes block = good;
-        put_word(block, FIRST, claimed);
+        const Bytes block = patched(good, FIRST, claimed);
         EXPECT_EQ(text_at(block, L"A") + L' ' + text_at(block, L"B"), std::wstring(a) + L' ' + b) << claimed;
     }
 }
@@ -97,21 +93,18 @@ TEST(VersionQuery, nodes_that_do_not_fit_end_the_search) {
 TEST(VersionResourceFile, is_read_from_its_section_or_refused) {
     const ScratchFolder folder;
     const std::wstring path = folder.wide(L"program");
-    const auto size_of = [](const std::wstring& file) {
+    const auto size_of = [&](const Bytes& bytes) {
+        write_file(folder / "program", bytes);
         DWORD handle = 1;
         SetLastError(0);
-        const DWORD size = GetFileVersionInfoSizeW(file.c_str(), &handle);
-        EXPECT_TRUE(handle == 0 && (GetLastError() == 0) == (size > 0));
+        const DWORD size = GetFileVersionInfoSizeW(path.c_str(), &handle);
+        EXPECT_TRUE(handle == 0 && GetLastError() == (size > 0 ? 0U : 1812U));
         return size;
-    };
-    const auto size_of_bytes = [&](const Bytes& bytes) {
-        write_file(folder / "program", bytes);
-        return size_of(path);
     };
     const Bytes block = survey_resource(), good = program_file(block);
     Bytes section = block, data(block.size() + 1, 0x55);
     section.resize(section.size() + 100, 0xAA);  // of another object file
-    ASSERT_EQ(size_of_bytes(program_file(section)), block.size());
+    ASSERT_EQ(size_of(program_file(section)), block.size());
     const auto read = [&](std::size_t size) {
         return GetFileVersionInfoW(path.c_str(), 0, static_cast<DWORD>(size), data.data());
     };
@@ -128,15 +121,15 @@ TEST(VersionResourceFile, is_read_from_its_section_or_refused) {
     for (const auto& [offset, value] : spoilt) {
         Bytes bytes = good;
         bytes[offset] = static_cast<unsigned char>(value);
-        EXPECT_EQ(size_of_bytes(bytes), 0U) << offset << " became " << value;
-        EXPECT_EQ(GetLastError(), 1812U);
+        EXPECT_EQ(size_of(bytes), 0U) << offset << " became " << value;
     }
     for (const std::size_t left : {0U, 3U, 63U, 64U, 100U, 282U}) {
-        EXPECT_EQ(size_of_bytes(Bytes(good.begin(), good.begin() + static_cast<long>(left))), 0U) << left;
+        EXPECT_EQ(size_of(Bytes(good.begin(), good.begin() + static_cast<long>(left))), 0U) << left;
     }
-    put_word(section, 0, 5);
-    EXPECT_EQ(size_of_bytes(program_file(section)) + size_of_bytes(program_file({})), 0U);
-    EXPECT_EQ(size_of(L"/") + size_of(L"/dev/zero") + size_of(L"") + size_of(L"/none"), 0U);
+    EXPECT_EQ(size_of(program_file(patched(block, 0, 5))) + size_of(program_file({})), 0U);
+    for (const wchar_t* const other : {L"/", L"/dev/zero", L"", L"/none"}) {
+        EXPECT_EQ(GetFileVersionInfoSizeW(other, nullptr), 0U);
+    }
     EXPECT_EQ(GetLastError(), 2U);
 }
 
@@ -145,11 +138,10 @@ TEST(ModuleFileName, is_the_running_programs) {
     const auto length = static_cast<DWORD>(expected.size());
     std::wstring name(length + 1, L'#');
     EXPECT_TRUE(GetModuleFileNameW(nullptr, name.data(), length + 1) == length && name == expected + L'\0');
-    name[length] = L'#';
-    EXPECT_TRUE(GetModuleFileNameW(nullptr, name.data(), length) == length && GetLastError() == 122U);
-    EXPECT_EQ(name, expected.substr(0, length - 1) + L'\0' + L'#');
-    EXPECT_EQ(GetModuleFileNameW(nullptr, name.data(), 0), 0U);
-    EXPECT_EQ(GetModuleFileNameW(name.data(), name.data(), length), 0U);
+    EXPECT_TRUE(GetModuleFileNameW(nullptr, name.data(), length) == length && GetLastError() == 122);
+    EXPECT_EQ(name, expected.substr(0, length - 1) + L'\0' + L'\0');
+    EXPECT_EQ(GetModuleFileNameW(nullptr, name.data(), 0) + GetModuleFileNameW(&name, name.data(), length),
+              0U);
 }
 
 }  // namespace

@@ -18,12 +18,12 @@ class DebugOutput {
 public:
     DebugOutput() {
         s_pieces.clear();
-        m_before = basalt::platform::SetDebugOutputHandler([](const wchar_t* text) {
+        basalt::platform::SetDebugOutputHandler([](const wchar_t* text) {
             s_pieces.emplace_back(text);
             SetLastError(4711);  // a host's handler may call anything
         });
     }
-    ~DebugOutput() { basalt::platform::SetDebugOutputHandler(m_before); }
+    ~DebugOutput() { basalt::platform::SetDebugOutputHandler(nullptr); }
     DebugOutput(const DebugOutput&) = delete;
     DebugOutput& operator=(const DebugOutput&) = delete;
 
@@ -31,7 +31,6 @@ public:
     static Pieces take() { return std::exchange(s_pieces, {}); }
 
 private:
-    basalt::platform::DebugOutputHandler m_before;
     static inline Pieces s_pieces;
 };
 

@@ -16,11 +16,7 @@
 #include "tests/support/failing_new.h"
 #include "tests/support/scratch_folder.h"
 
-namespace {
-
-std::atomic<std::size_t> taken_at_once = SIZE_MAX;
-
-}  // namespace
+static std::atomic<std::size_t> taken_at_once = SIZE_MAX;
 
 // Linked in place of the system's (--wrap): may take only a part, and fail with EINTR every other time.
 extern "C" ssize_t __real_write(int file, const void* bytes, std::size_t count);
@@ -46,8 +42,7 @@ struct FileLog : testing::Test {
 std::string write_lines(FileLogger& log, int lines) {
     std::string all;
     for (int line = 0; line < lines; ++line) {
-        const std::string text =
-            std::to_string(line) + std::string(static_cast<std::size_t>(line % 400), 'x');
+        const std::string text(static_cast<std::size_t>(line % 400), static_cast<char>('A' + line % 30));
         log.Write(CString((text + '\n').c_str()));
         all += text + "\r\n";
     }
@@ -56,16 +51,15 @@ std::string write_lines(FileLogger& log, int lines) {
 
 TEST_F(FileLog, opening_closes_first_and_a_file_that_cannot_be_opened_leaves_it_closed) {
     ASSERT_EQ(mkfifo(other.c_str(), 0600), 0);
-    for (const char* const path :
-         {other.c_str(), "", "/none/log", "/tmp", static_cast<const char*>(nullptr)}) {
+    const char* const paths[] = {other.c_str(), "", "/none/log", "/tmp", nullptr};
+    for (const char* const path : paths) {
         FileLogger log(file.c_str());
         EXPECT_EQ(contents(), "") << "opening empties the file";
         log.Write(L"text");
         EXPECT_EQ(contents(), "") << "nothing is flushed";
         log.Open(path);
         EXPECT_EQ(contents(), "text");
-        log.Write(L"lost\n");
-        log.Close();
+        log.Write(L"lost\n"), log.Close();
         EXPECT_EQ(contents(), "text");
     }
 }
@@ -131,17 +125,15 @@ TEST_F(FileLog, keeps_whole_texts_however_its_process_ends) {
 
 TEST_F(FileLog, children_forked_while_a_thread_writes_neither_hang_nor_write_twice) {
     FileLogger log(other.c_str());
-    std::atomic<bool> over{false};
-    std::thread writing([&] {
-        while (!over) {
+    std::jthread writing([&](const std::stop_token& end) {
+        while (!end.stop_requested()) {
             log.Write(L"of the parent\n");
         }
     });
     for (int round = 0; round < 50; ++round) {
         in_child([&] { log.Write(L"child\n"), log.Close(); });
     }
-    over = true;
-    writing.join();
+    writing = {};
     log.Close();
     const std::string both = contents("other");
     EXPECT_EQ(std::count(both.begin(), both.end(), 'c'), 50);

@@ -6,6 +6,7 @@
 #include <netpacket/packet.h>
 
 #include <algorithm>
+#include <array>
 #include <cerrno>
 #include <span>
 #include <string>
@@ -17,37 +18,33 @@ namespace {
 struct Interface {
     int index;
     unsigned short type;
-    std::string address;
+    std::string address, name = "interface" + std::to_string(index);
+    sockaddr_ll link{};
+    ifaddrs entry{};
 };
-std::vector<Interface> s_interfaces;        // of the machine, named by their indexes
+std::vector<Interface> s_interfaces;        // of the machine
 std::size_t s_shown = 0, s_shown_more = 0;  // how many getifaddrs() reports, and how many more each time
 int s_refusal = 0;                          // its errno
-
-struct Entry {
-    ifaddrs entry{};
-    sockaddr_ll link{};
-    std::string name;
-};
 
 }  // namespace
 
 // Linked in place of the system's calls (--wrap).
 extern "C" int __wrap_getifaddrs(ifaddrs** list) {
     errno = s_refusal;
-    static std::vector<Entry> entries;
-    entries = std::vector<Entry>(std::min(s_shown, s_interfaces.size()) + 1);  // the first without an address
-    for (std::size_t i = 1; i < entries.size(); ++i) {
-        const auto& [index, type, address] = s_interfaces[i - 1];
-        Entry& next = entries[i];
-        next.link = {AF_PACKET, 0, index, type, 0, static_cast<unsigned char>(address.size()), {}};
-        address.copy(reinterpret_cast<char*>(next.link.sll_addr), 8);
-        next.name = "interface" + std::to_string(index);
-        next.entry.ifa_name = next.name.data();
-        next.entry.ifa_addr = reinterpret_cast<sockaddr*>(&next.link);
-        entries[i - 1].entry.ifa_next = &next.entry;
+    static ifaddrs without_address;
+    *list = &without_address;
+    ifaddrs** next = &without_address.ifa_next;
+    for (Interface& shown : std::span(s_interfaces).first(std::min(s_shown, s_interfaces.size()))) {
+        const auto length = static_cast<unsigned char>(shown.address.size());
+        shown.link = {AF_PACKET, 0, shown.index, shown.type, 0, length, {}};
+        shown.address.copy(reinterpret_cast<char*>(shown.link.sll_addr), 8);
+        shown.entry.ifa_name = shown.name.data();
+        shown.entry.ifa_addr = reinterpret_cast<sockaddr*>(&shown.link);
+        *next = &shown.entry;
+        next = &shown.entry.ifa_next;
     }
+    *next = nullptr;
     s_shown += s_shown_more;
-    *list = &entries[0].entry;
     return s_refusal == 0 ? 0 : -1;
 }
 extern "C" void __wrap_freeifaddrs(ifaddrs*) {}
@@ -110,14 +107,14 @@ TEST(HardwareAddresses, end_when_interfaces_come_and_go_or_the_system_refuses) {
         EXPECT_EQ(list.GetMACAddressesAsHexString().size(), addresses);
     }
     s_shown_more = 0;
-    const std::pair<int, DWORD> errors[] = {{EMFILE, 4}, {ENOMEM, 8}, {0, 2}};
-    for (const auto& [refusal, error] : errors) {
-        s_refusal = refusal;
+    const std::array<DWORD, 4> rows[] = {{EMFILE, 4, 4, 0}, {ENOMEM, 8, 8, 0}, {0, 2, 122, 1}};
+    for (const auto& [refusal, entry_error, table_error, is_created] : rows) {
+        s_refusal = static_cast<int>(refusal);
         DWORD size = 0;
         MIB_IFROW row{};
-        EXPECT_EQ(GetIfEntry(&row), error);
-        EXPECT_EQ(GetIfTable(nullptr, &size, 0), refusal != 0 ? error : 122U);
-        EXPECT_EQ(MACAddressFromMIBTable().Create(), refusal == 0);
+        EXPECT_TRUE(GetIfEntry(&row) == entry_error && GetIfTable(nullptr, &size, 0) == table_error)
+            << refusal;
+        EXPECT_EQ(MACAddressFromMIBTable().Create(), is_created == 1);
     }
 }
 

@@ -8,30 +8,20 @@
 #include "src/platform/clock.h"
 #include "tests/support/threads.h"
 
+static std::int64_t ticks = 0;
+static int queries = 0;
+
+// The linker's --wrap puts these in place of the platform's calls.
+extern "C" BOOL __wrap__Z23QueryPerformanceCounterP13LARGE_INTEGER(LARGE_INTEGER* count) {
+    return count->QuadPart = ticks, 1;
+}
+extern "C" BOOL __wrap__Z25QueryPerformanceFrequencyP13LARGE_INTEGER(LARGE_INTEGER* frequency) {
+    return frequency->QuadPart = 1'000'000'000, ++queries;
+}
+
 namespace {
 
 using namespace vex_util;
-
-constexpr std::int64_t SECOND = 1'000'000'000;  // ticks
-
-std::int64_t ticks = 0;
-int queries = 0;
-
-}  // namespace
-
-// The linker's --wrap puts these in place of the platform's calls.
-extern "C" {
-BOOL __wrap__Z23QueryPerformanceCounterP13LARGE_INTEGER(LARGE_INTEGER* count) {
-    count->QuadPart = ticks;
-    return 1;
-}
-BOOL __wrap__Z25QueryPerformanceFrequencyP13LARGE_INTEGER(LARGE_INTEGER* frequency) {
-    frequency->QuadPart = SECOND;
-    return ++queries;
-}
-}
-
-namespace {
 
 TEST(Timers, tick_length_is_determined_once_by_the_first_timers) {
     queries = 0;
@@ -51,7 +41,7 @@ TEST(Timers, stopwatch_counts_from_its_last_reset) {
     EXPECT_TRUE(timer.GetElapsedMs() == 1999 && timer.GetElapsedS() == 1.9999999F) << "truncated";
     HiResTimer copy = timer;
     timer.Reset();
-    ticks += SECOND / 4;
+    ticks += 250'000'000;
     EXPECT_TRUE(timer.GetElapsed() == 0.25F && copy.GetElapsed() == 2.25F) << "a copy keeps the start";
     timer.Reset();
     ticks += ((std::int64_t{1} << 32) + 12'345) * 1'000'000 + 999'999;
@@ -96,7 +86,7 @@ TEST(Timers, phase_holds_over_hours_of_late_polls) {
     const std::int64_t start = ticks;
     PeriodicTimer timer(1.0F, false);
     for (double reports = 0; reports < 36'000;) {
-        ticks += static_cast<std::int64_t>(random() % (SECOND / 20));
+        ticks += static_cast<std::int64_t>(random() % 50'000'000);
         if (timer.Update(false)) {
             const double lateness = static_cast<double>(ticks - start) * 1e-9 - ++reports;
             ASSERT_GE(lateness, -1.25e-7 * reports);

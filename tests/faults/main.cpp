@@ -9,10 +9,6 @@ int main() {
     using namespace basalt::faults;
     basalt::platform::SetDebugOutputHandler([](const wchar_t*) {});
     std::printf("%-44s %6s\n", "operation", "points");
-    check_memory();
-    check_sparse();
-    check_texts();
-    check_files();
-    check_graphics();
+    check_memory(), check_sparse(), check_texts(), check_files(), check_graphics();
     return report_totals() ? 0 : 1;
 }

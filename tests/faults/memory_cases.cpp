@@ -27,17 +27,11 @@ void walk(const char* operation, unsigned bits, int steps_before, int steps, Arg
         std::ranges::generate(bytes, [&] { return static_cast<std::uint8_t>(random() | bits); });
         test::Input input(bytes.data(), bytes.size());
         Model model(arguments...);
-        const auto do_steps = [&](int count, const test::MayFail& may_fail) {
-            for (int i = 0; i < count; ++i) {
-                model.step(input, may_fail);
-            }
-            model.inspect();
-        };
-        do_steps(steps_before, [] { return false; });
+        test::drive(model, input, steps_before);
         test::failures_are_paused = true;
-        trial.attempt([&] { do_steps(steps, [&] { return trial.strikes(); }); });
+        trial.attempt([&] { test::drive(model, input, steps, [&] { return trial.strikes(); }); });
         test::failures_are_paused = false;
-        do_steps(std::min(steps, 8), [] { return false; });
+        test::drive(model, input, std::min(steps, 8));
         for (const std::string& name : Trial::folder().names()) {
             // A segment's file that could not be opened again stays, empty.
             const bool is_left = trial.was_ever_struck() && std::filesystem::is_empty(Trial::folder() / name);
@@ -57,13 +51,12 @@ bool fills(void* block, std::size_t size) {
     return block != nullptr && std::memset(block, 'x', size) == block;
 }
 
-struct OnSharedHeap : vlSharedMemoryHeap {
-    char bytes[2 << 20];
-};
-
 struct OnSharedHeapRow {
-    std::unique_ptr<OnSharedHeap> object;
-    bool act() noexcept { return object.reset(new OnSharedHeap), object != nullptr; }
+    struct Object : vlSharedMemoryHeap {
+        char bytes[2 << 20];
+    };
+    std::unique_ptr<Object> object;
+    bool act() noexcept { return object.reset(new Object), object != nullptr; }
     bool holds(bool done) const { return !done || fills(object->bytes, sizeof object->bytes); }
 };
 
@@ -106,8 +99,7 @@ struct AbandonedRow {
     }
     std::wstring folder{Trial::path("")};
     bool act() noexcept {
-        platform::delete_abandoned_files(folder.c_str(), L"vma");
-        return count_files() == 0;
+        return platform::delete_abandoned_files(folder.c_str(), L"vma"), count_files() == 0;
     }
     bool holds(bool) const { return true; }
 };
@@ -118,15 +110,13 @@ struct MappedRow {
     bool act() noexcept {
         return (view = vlMMapFileAllocator::Alloc(nullptr, PAGE, 0x2000, &handle)) != nullptr;
     }
-    bool holds(bool done) const {
-        return done ? fills(view, PAGE) && vlMMapFileAllocator::Free(view, 0, 0x8000, handle) != 0
-                    : handle == 0;
-    }
+    bool free() const noexcept { return vlMMapFileAllocator::Free(view, 0, 0x8000, handle) != 0; }
+    bool holds(bool done) const { return done ? fills(view, PAGE) && free() : handle == 0; }
 };
 
 struct UnmappedRow : MappedRow {
     UnmappedRow() { MappedRow::act(); }
-    bool act() noexcept { return vlMMapFileAllocator::Free(view, 0, 0x8000, handle) != 0; }
+    bool act() noexcept { return free(); }
     bool holds(bool done) const { return done || fills(view, PAGE); }
 };
 

@@ -32,8 +32,7 @@ public:
 
     template <class Work>
     auto attempt(Work work) noexcept {
-        const EndOfFailure end{*this};
-        begin();
+        const Attempt failing{*this};
         return work();
     }
     // Whether the work throws.
@@ -44,8 +43,7 @@ public:
     // The result of the work, false if it throws.
     template <class Work>
     bool succeeds(Work work) {
-        const EndOfFailure end{*this};
-        begin();
+        const Attempt failing{*this};
         try {
             return m_done = work();
         } catch (const std::exception&) {
@@ -53,11 +51,7 @@ public:
         }
     }
 
-    void expect(bool holds, const char* what) {
-        if (!holds && m_fault.empty()) {
-            m_fault = what;
-        }
-    }
+    void expect(bool holds, const char* what) { m_fault = holds || !m_fault.empty() ? m_fault : what; }
 
     // Whether a call of the present attempt has been made to fail; of the last attempt; of any.
     bool strikes() const;
@@ -69,19 +63,17 @@ public:
     static CString path(const char* name) { return CString((folder() / name).c_str()); }
 
 private:
-    struct EndOfFailure {
+    struct Attempt {
         Trial& trial;
-        ~EndOfFailure() { trial.end(); }
+        explicit Attempt(Trial& failing) : trial(failing) { trial.begin(); }
+        ~Attempt() { trial.end(); }
     };
     void begin();
     void end();
-
     Failure m_failure;
     std::optional<FailAllocation> m_heap;
     std::optional<test::SystemFailure> m_system;
-    bool m_done = true;
-    bool m_struck = false;
-    bool m_was_ever_struck = false;
+    bool m_done = true, m_struck = false, m_was_ever_struck = false;
     std::string m_fault;
 };
 
@@ -114,11 +106,7 @@ void run(const char* operation, Handles handles = Handles::SERVE) {
 // Whether all lines so far were in order; prints the totals.
 bool report_totals();
 
-void check_memory();
-void check_sparse();
-void check_texts();
-void check_files();
-void check_graphics();
+void check_memory(), check_sparse(), check_texts(), check_files(), check_graphics();
 
 }  // namespace basalt::faults
 

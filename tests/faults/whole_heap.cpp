@@ -14,7 +14,7 @@ void* taken(const void* before, Take take) {
         return nullptr;
     }
     void* const block = take();
-    basalt::test::allocations.live += block != nullptr && before == nullptr ? 1 : 0;
+    basalt::test::live_blocks += block != nullptr && before == nullptr ? 1 : 0;
     return block;
 }
 
@@ -45,7 +45,7 @@ int posix_memalign(void** block, std::size_t alignment, std::size_t size) {
     return *block != nullptr ? 0 : ENOMEM;
 }
 void free(void* block) {
-    basalt::test::allocations.live -= block != nullptr ? 1 : 0;
+    basalt::test::live_blocks -= block != nullptr ? 1 : 0;
     __libc_free(block);
 }
 }

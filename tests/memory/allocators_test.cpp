@@ -14,30 +14,20 @@ namespace {
 using basalt::test::DebugOutput;
 using basalt::test::Pieces;
 using basalt::test::report_of;
-using basalt::test::SystemFailure;
 using vex_lib::vlSharedMemoryHeap;
 using vex_lib::vlWinHeapAllocator;
 
-TEST(Allocators, a_report_has_three_pieces_and_keeps_the_code) {
+TEST(Allocators, heaps_report_each_failure_but_that_of_realloc_and_keep_its_code) {
     const DebugOutput output;
-    for (const DWORD code : {ERROR_NOT_ENOUGH_MEMORY, ERROR_INVALID_HANDLE, DWORD{0x20001234}}) {
-        SetLastError(code);
-        vex_lib::ReportLastError();
+    const auto expect_report = [&](DWORD code) {
         EXPECT_EQ(GetLastError(), code);
         EXPECT_EQ(output.take(), report_of(code));
-    }
-}
-
-TEST(Allocators, heaps_report_each_failure_but_that_of_realloc) {
-    const DebugOutput output;
-    const auto expect_report = [&](DWORD code) { EXPECT_EQ(output.take(), report_of(code)); };
-    const auto expect_null = [&](const void* block, DWORD code) {
-        expect_report(code);
-        EXPECT_EQ(block, nullptr);
     };
     vlWinHeapAllocator heap(64 * 1024);
-    expect_null(heap.Alloc(64 * 1024), ERROR_NOT_ENOUGH_MEMORY);
-    expect_null(heap.ReAlloc(nullptr, std::size_t{1} << 60), ERROR_NOT_ENOUGH_MEMORY);
+    EXPECT_EQ(heap.Alloc(64 * 1024), nullptr);
+    expect_report(ERROR_NOT_ENOUGH_MEMORY);
+    EXPECT_EQ(heap.ReAlloc(nullptr, 1UL << 60), nullptr);
+    expect_report(ERROR_NOT_ENOUGH_MEMORY);
     auto* const block = static_cast<char*>(heap.Alloc(6));
     std::strcpy(block, "kept!");
     EXPECT_EQ(heap.ReAlloc(block, 64 * 1024), nullptr);
@@ -50,17 +40,12 @@ TEST(Allocators, heaps_report_each_failure_but_that_of_realloc) {
     while (full.Alloc(1) != nullptr) {
     }
     output.take(), full.Compact(), expect_report(ERROR_SUCCESS);
-    vlWinHeapAllocator high((1UL << 32) + 4096);  // a limit of 64 bits
-    EXPECT_NE(high.Alloc(10'000), nullptr);
+    EXPECT_NE(vlWinHeapAllocator((1UL << 32) + 4096).Alloc(10'000), nullptr) << "a limit of 64 bits";
 }
 
 TEST(Allocators, without_a_heap_every_call_fails_and_is_reported) {
     const DebugOutput output;
-    const auto make = [] {
-        const SystemFailure failure(1);
-        return vlWinHeapAllocator(0);
-    };
-    vlWinHeapAllocator none = make();
+    vlWinHeapAllocator none = (basalt::test::SystemFailure(1), vlWinHeapAllocator(0));
     EXPECT_EQ(output.take(), report_of(ERROR_NOT_ENOUGH_MEMORY));
     EXPECT_EQ(none.Handle(), nullptr);
     none.Free(nullptr), none.Compact();
@@ -81,27 +66,26 @@ TEST(Allocators, realloc_of_null_is_the_objects_own_alloc) {
     EXPECT_EQ(heap.calls, 1);
 }
 
+template <std::size_t SIZE>
+struct Record : vlSharedMemoryHeap {
+    char data[SIZE];
+};
+
 TEST(Allocators, the_shared_heap_holds_objects_of_derived_classes) {
-    struct Huge : vlSharedMemoryHeap {
-        char data[std::size_t{1} << 46];
-    };
-    struct Record : vlSharedMemoryHeap {
-        char data[100] = {};
-    };
     const auto live = [] {
         return basalt::platform::inspect_heap(vlSharedMemoryHeap::GetHeapHandle()).live_blocks;
     };
     const DebugOutput output;
     const std::size_t before = live();
-    auto* const plain = new Record;
-    auto* const traced = new (__FILE__, __LINE__) Record;
+    auto* const plain = new Record<100>;
+    auto* const traced = new (__FILE__, __LINE__) Record<100>;
     EXPECT_EQ(live(), before + 2);
     delete plain;
-    Record::operator delete(traced, __FILE__, __LINE__);
+    Record<100>::operator delete(traced, __FILE__, __LINE__);
     EXPECT_EQ(live(), before);
     vlSharedMemoryHeap::Compact();
     EXPECT_EQ(output.take(), Pieces{});
-    EXPECT_EQ(new Huge, nullptr) << "out of memory: null, no exception";
+    EXPECT_EQ(new Record<1UL << 46>, nullptr) << "out of memory: null, no exception";
     EXPECT_EQ(output.take(), report_of(ERROR_NOT_ENOUGH_MEMORY));
 }
 

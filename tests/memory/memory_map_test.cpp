@@ -17,7 +17,6 @@
 
 namespace {
 
-using basalt::test::open_descriptors;
 using basalt::test::ScratchFolder;
 using vex_util::CMemoryMap;
 using Names = std::set<std::string>;
@@ -28,7 +27,7 @@ char* bytes(const CMemoryMap& map) {
     return static_cast<char*>(static_cast<void*>(map));
 }
 
-bool is_zero_and_usable(const CMemoryMap& map, std::size_t size) {
+bool is_zero_and_usable(const CMemoryMap& map, std::size_t size = SIZE) {
     char* const data = bytes(map);
     return data != nullptr && std::count(data, data + size, 0) == static_cast<long>(size) &&
            std::fill_n(data, size, 'x') != nullptr;
@@ -36,13 +35,13 @@ bool is_zero_and_usable(const CMemoryMap& map, std::size_t size) {
 
 TEST(MemoryMap, is_a_hidden_file_while_it_lives) {
     const ScratchFolder folder;
-    const long descriptors = open_descriptors();
+    const long descriptors = basalt::test::open_descriptors();
     CMemoryMap map(SIZE);
-    EXPECT_TRUE(is_zero_and_usable(map, SIZE));
+    EXPECT_TRUE(is_zero_and_usable(map));
     const std::string name = *folder.names().begin();
     EXPECT_EQ(name.substr(0, 3) + name.substr(8), "~00.mem");
     EXPECT_EQ(std::filesystem::file_size(folder / name), SIZE);
-    EXPECT_EQ(open_descriptors(), descriptors);
+    EXPECT_EQ(basalt::test::open_descriptors(), descriptors);
     EXPECT_TRUE(map.Create(2 * SIZE) && is_zero_and_usable(map, 2 * SIZE));
     EXPECT_EQ(folder.names().size(), 1U) << "the first file is deleted";
     EXPECT_TRUE(map.Destroy() && map.Destroy());
@@ -54,22 +53,16 @@ TEST(MemoryMap, is_a_hidden_file_while_it_lives) {
 // 245 characters of the folder, a separator and 12 of the file's name (with its own) are 259, the most.
 TEST(MemoryMap, without_a_file_it_is_on_the_heap) {
     const ScratchFolder folder;
-    const auto long_folder = [&](std::size_t length) {
-        return folder / std::string(length - folder.path().size() - 1, 'd');
-    };
-    const std::pair<std::string, bool> ROWS[] = {{folder / "missing", false},
-                                                 {std::string(300, 'x'), false},
-                                                 {long_folder(246), false},
-                                                 {long_folder(245), true}};
-    for (const auto& [place, has_file] : ROWS) {
-        place.size() > 200 && place.size() < 300 ? std::filesystem::create_directory(place) : false;
+    std::string deep = folder / "";
+    deep.resize(245, 'd');
+    std::filesystem::create_directory(deep), std::filesystem::create_directory(deep + "d");
+    for (const std::string& place : {folder / "missing", std::string(300, 'x'), deep + "d", deep}) {
         ScratchFolder::set_temporary(place);
-        const CMemoryMap map(1024);
-        EXPECT_TRUE(is_zero_and_usable(map, 1024));
+        const CMemoryMap map(SIZE);
+        EXPECT_TRUE(is_zero_and_usable(map));
         CMemoryMap::CleanUp();
-        std::error_code missing;
-        EXPECT_EQ(std::filesystem::exists(place, missing) && !std::filesystem::is_empty(place), has_file)
-            << place.size();
+        EXPECT_EQ(std::filesystem::is_empty(deep), place != deep) << place;
+        EXPECT_TRUE(std::filesystem::is_empty(deep + "d"));
     }
     ScratchFolder::set_temporary(folder.path());
     EXPECT_NE(bytes(CMemoryMap(0)), nullptr);
@@ -81,17 +74,17 @@ TEST(MemoryMap, deletes_its_own_file_and_an_unheld_one_of_its_name_in_the_curren
     for (const bool is_held : {false, true}) {
         ScratchFolder::set_temporary(folder.path());
         CMemoryMap map(SIZE);
-        const std::string name = *folder.names().rbegin();
-        folder.write("other/" + name);
-        const std::wstring other = folder.wide(L"other/" + std::wstring(name.begin(), name.end()));
-        const HANDLE holder = is_held ? CreateFileW(other.c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr,
-                                                    OPEN_EXISTING, FILE_FLAG_DELETE_ON_CLOSE, nullptr)
-                                      : INVALID_HANDLE_VALUE;
+        const std::string other = "other/" + *folder.names().rbegin();
+        folder.write(other);
+        const HANDLE holder =
+            CreateFileW(folder.wide({other.begin(), other.end()}).c_str(), GENERIC_READ | GENERIC_WRITE, 0,
+                        nullptr, OPEN_EXISTING, 0, nullptr);
+        is_held ? 1 : CloseHandle(holder);
         ScratchFolder::set_temporary(folder / "other");
         map.Destroy();
         EXPECT_EQ(folder.names(), Names{"other"});
         EXPECT_EQ(std::filesystem::is_empty(folder / "other"), !is_held);
-        CloseHandle(holder);
+        is_held ? CloseHandle(holder) : 0;
     }
 }
 
@@ -106,53 +99,44 @@ TEST(MemoryMap, finds_the_last_free_number_or_takes_the_heap) {
     }
     const CMemoryMap map(SIZE);
     EXPECT_TRUE(std::filesystem::exists(folder / "~0054321.mem"));
-    EXPECT_TRUE(is_zero_and_usable(CMemoryMap(SIZE), SIZE));
+    EXPECT_TRUE(is_zero_and_usable(CMemoryMap(SIZE)));
 }
 
 TEST(MemoryMap, clean_up_deletes_what_no_process_holds) {
     const ScratchFolder folder;
-    const Names KEPT = {"x~0000001.mem", "~0000001.tmp", "~0000001.MEM",
-                        "vma1.tmp",      "~folder.mem",  "~within"};
-    std::filesystem::create_directory(folder / "~folder.mem");
     std::filesystem::create_directory(folder / "~within");
-    for (const char* name :
-         {"~0000001.mem", "~.mem", "~other~.mem", "~\xFF.mem", "x~0000001.mem", "~0000001.tmp",
-          "~0000001.MEM", "vma1.tmp", "~within/kept.mem", "~within\\kept.mem"}) {
+    const Names kept = {"x~0000001.mem", "~0000001.tmp", "~0000001.MEM", "~within/kept.mem"};
+    std::ranges::for_each(kept, [&](const std::string& name) { folder.write(name); });
+    for (const char* name : {"~.mem", "~other~.mem", "~\xFF.mem", "~within\\kept.mem"}) {
         folder.write(name);
     }
     const CMemoryMap map(SIZE);
     CMemoryMap::CleanUp();
-    EXPECT_TRUE(std::filesystem::exists(folder / "~within/kept.mem"))
-        << "a backslash in a name is no separator";
-    const Names left = folder.names();
-    EXPECT_TRUE(std::includes(left.begin(), left.end(), KEPT.begin(), KEPT.end()));
-    EXPECT_EQ(left.size(), KEPT.size() + 1);
+    EXPECT_EQ(folder.names().size(), kept.size() + 1) << "and the map's";
+    EXPECT_TRUE(
+        std::ranges::all_of(kept, [&](auto& name) { return std::filesystem::exists(folder / name); }));
 }
 
-// A child that makes blocks and is killed, or exits, once it has said so.
-pid_t child_with_blocks(int count, bool exits) {
-    int ready[2];
-    EXPECT_EQ(pipe(ready), 0);
+// A child that makes blocks and stops; when continued, it exits.
+pid_t child_with_blocks(int count) {
     const pid_t child = fork();
     if (child == 0) {
-        for (int i = 0; i < count; ++i) {
+        for (; count > 0; --count) {
             bytes(*new CMemoryMap(SIZE))[SIZE - 1] = 'x';
         }
-        EXPECT_EQ(write(ready[1], "!", 1), 1);
-        exits ? std::exit(0) : static_cast<void>(pause());
+        raise(SIGSTOP), std::exit(0);
     }
-    char byte;
-    EXPECT_EQ(read(ready[0], &byte, 1), 1);
-    close(ready[0]), close(ready[1]);
+    waitpid(child, nullptr, WUNTRACED);
     return child;
 }
 
 TEST(MemoryMap, files_of_killed_processes_are_deleted_and_those_of_living_ones_kept) {
     const ScratchFolder folder;
     const CMemoryMap ours(SIZE);
-    waitpid(child_with_blocks(3, true), nullptr, 0);
-    EXPECT_EQ(folder.names().size(), 1U) << "an exit takes its files along, and leaves the parent's";
-    const pid_t killed = child_with_blocks(40, false), living = child_with_blocks(20, false);
+    const pid_t killed = child_with_blocks(40), living = child_with_blocks(20),
+                exiting = child_with_blocks(3);
+    kill(exiting, SIGCONT), waitpid(exiting, nullptr, 0);
+    EXPECT_EQ(folder.names().size(), 61U) << "an exit takes its files along, and leaves the parent's";
     kill(killed, SIGKILL), waitpid(killed, nullptr, 0);
     EXPECT_EQ(folder.names().size(), 61U);
     CMemoryMap::CleanUp();
@@ -163,11 +147,10 @@ TEST(MemoryMap, files_of_killed_processes_are_deleted_and_those_of_living_ones_k
 }
 
 // Constructed before any file is made, and so destroyed after those that are left have been deleted.
-void (*at_the_end)() = nullptr;
+void (*at_the_end)() = [] {};
 const struct AtTheEnd {
-    AtTheEnd() {}
-    ~AtTheEnd() { at_the_end != nullptr ? at_the_end() : void(); }
-} the_end;
+    ~AtTheEnd() { at_the_end(); }
+} the_end{};
 
 TEST(MemoryMap, a_block_made_while_the_process_ends_leaves_no_file) {
     const ScratchFolder folder;

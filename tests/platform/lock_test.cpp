@@ -22,18 +22,14 @@ void expect_one_thread_inside(AnyLock& lock) {
     constexpr int THREADS = 4, ROUNDS = 20'000;
     int inside = 0, entered = 0;
     basalt::test::run_threads(THREADS, [&](int thread) {
-        for (int round = 0; round < ROUNDS;) {
+        for (int round = 0; round < ROUNDS; ++round) {
             std::unique_lock guard(lock, std::defer_lock);
-            if (thread % 2 == 0 || round % 4 == 0) {
-                guard.lock();
-            } else if (!guard.try_lock()) {
+            const bool waits = thread % 2 == 0 || round % 4 == 0;
+            for (waits ? guard.lock() : void(); !guard.owns_lock() && !guard.try_lock();) {
                 std::this_thread::yield();
-                continue;
             }
             ASSERT_EQ(++inside, 1);
-            if (round++ % 16 == 0) {
-                std::this_thread::yield();  // held for long: the others go to sleep
-            }
+            round % 16 == 0 ? std::this_thread::yield() : void();  // held for long: the others go to sleep
             --inside, ++entered;
         }
     });
@@ -48,13 +44,11 @@ TEST(Lock, admits_one_thread_at_a_time) {
 
 TEST(Lock, only_the_recursive_one_admits_its_owner_again) {
     RecursiveLock recursive;
-    for (int i = 0; i < 3; ++i) {
-        EXPECT_TRUE(recursive.try_lock());
-        recursive.lock();
-    }
+    recursive.lock(), recursive.lock();
+    EXPECT_TRUE(recursive.try_lock());
     const std::lock_guard guard(before_any_constructor);
     EXPECT_FALSE(before_any_constructor.try_lock());
-    for (int left = 6; left >= 0; --left) {
+    for (int left = 3; left >= 0; --left) {
         bool other_entered = false;
         std::thread([&] { other_entered = recursive.try_lock() && (recursive.unlock(), true); }).join();
         EXPECT_EQ(other_entered, left == 0) << left;
@@ -63,19 +57,16 @@ TEST(Lock, only_the_recursive_one_admits_its_owner_again) {
 }
 
 TEST(Lock, a_sleeping_waiter_is_woken_and_keeps_errno) {
-    const std::unique_lock<Lock> held(before_any_constructor);
+    std::unique_lock held(before_any_constructor);
     std::atomic<bool> entered{false};
     std::thread waiter([&] {
         errno = 17;
-        const std::lock_guard guard(before_any_constructor);
+        entered = (std::lock_guard(before_any_constructor), true);
         EXPECT_EQ(errno, 17);
-        entered = true;
     });
     std::this_thread::sleep_for(std::chrono::milliseconds(30));  // long past spinning
     EXPECT_FALSE(entered);
-    before_any_constructor.unlock();
-    waiter.join();
-    before_any_constructor.lock();
+    held.unlock(), waiter.join();
 }
 
 }  // namespace

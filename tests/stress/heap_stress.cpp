@@ -23,10 +23,10 @@ void mark(void* block, std::size_t size) {
 }
 
 void require_marked(const void* block) {
-    std::size_t size = 0, end = 0;
+    std::size_t size = 0;
     std::memcpy(&size, block, sizeof size);
-    std::memcpy(&end, static_cast<const char*>(block) + size - sizeof end, sizeof end);
-    require(end == size, "a block holds what was left in it");
+    require(std::memcmp(static_cast<const char*>(block) + size - sizeof size, &size, sizeof size) == 0,
+            "a block holds what was left in it");
 }
 
 std::size_t any_size(Random& random) {
@@ -36,21 +36,25 @@ std::size_t any_size(Random& random) {
 }
 
 struct Exchange {
-    void* (*take)(void* heap, std::size_t size);
-    void (*give)(void* heap, void* block);
-    void* heap;
+    void* heap;  // null: the shared heap by its own calls
     std::atomic<void*> slots[SLOTS] = {};
 
-    void step(Random& random) {
-        const std::size_t size = any_size(random);
-        void* const block = take(heap, size);
-        block != nullptr ? mark(block, size) : void();
-        if (void* const other = slots[random() % SLOTS].exchange(block)) {
+    // Puts a block into a slot, and frees the one that was there.
+    void put(std::size_t slot, void* block) {
+        if (void* const other = slots[slot].exchange(block)) {
             require_marked(other);
-            give(heap, other);
+            heap == nullptr ? vlSharedMemoryHeap::Free(other)
+                            : require(HeapFree(heap, 0, other) != 0, "freed");
         }
     }
-    void inspect() const { require(platform::inspect_heap(heap).fault == nullptr, "the heap is sound"); }
+    void step(Random& random) {
+        const std::size_t size = any_size(random);
+        void* const block = heap == nullptr ? vlSharedMemoryHeap::Alloc(size) : HeapAlloc(heap, 0, size);
+        block != nullptr ? mark(block, size) : void();
+        put(random() % SLOTS, block);
+    }
+    HANDLE handle() const { return heap == nullptr ? vlSharedMemoryHeap::GetHeapHandle() : heap; }
+    void inspect() const { require(platform::inspect_heap(handle()).fault == nullptr, "the heap is sound"); }
 };
 
 void use_page_sources() {
@@ -68,26 +72,19 @@ void use_page_sources() {
 }  // namespace
 
 long stress_heaps(double seconds) {
-    const auto take = [](void* heap, std::size_t size) { return HeapAlloc(heap, 0, size); };
-    const auto give = [](void* heap, void* block) { require(HeapFree(heap, 0, block) != 0, "freed"); };
-    Exchange heaps[] = {
-        {take, give, HeapCreate(0, 0, 4 << 20)},
-        {take, give, HeapCreate(0, 0, 0)},
-        {[](void*, std::size_t size) { return vlSharedMemoryHeap::Alloc(size); },
-         [](void*, void* block) { vlSharedMemoryHeap::Free(block); }, vlSharedMemoryHeap::GetHeapHandle()}};
+    Exchange heaps[] = {{HeapCreate(0, 0, 4 << 20)}, {HeapCreate(0, 0, 0)}, {nullptr}};
     const long rounds = run_threads(THREADS, seconds, [&](int thread, Random& random) {
         for (int i = 0; i < 100; ++i) {
             heaps[i % 3].step(random);
         }
         Exchange& any = heaps[draw(random, 3)];
         thread == 0   ? any.inspect()
-        : thread == 1 ? static_cast<void>(HeapCompact(any.heap, 0))
+        : thread == 1 ? static_cast<void>(HeapCompact(any.handle(), 0))
                       : use_page_sources();
     });
     for (Exchange& exchange : heaps) {
-        for (std::atomic<void*>& slot : exchange.slots) {
-            void* const block = slot.exchange(nullptr);
-            block != nullptr ? exchange.give(exchange.heap, block) : void();
+        for (std::size_t slot = 0; slot < SLOTS; ++slot) {
+            exchange.put(slot, nullptr);
         }
         exchange.inspect();
     }

@@ -9,6 +9,7 @@
 #include <cstdlib>
 #include <fstream>
 #include <string_view>
+#include <utility>
 
 #include "basalt/memory.h"
 #include "basalt/platform/error.h"
@@ -42,30 +43,28 @@ long run_threads(int count, double seconds, const Round& round) {
 
 namespace {
 
-struct Holdings {
-    double resident = 0;  // MiB
-    long descriptors = test::open_descriptors();
-    Holdings() {
-        malloc_trim(0);
-        vex_lib::vlSharedMemoryHeap::Compact();
-        std::ifstream("/proc/self/statm") >> resident >> resident;
-        resident *= static_cast<double>(sysconf(_SC_PAGESIZE)) / (1 << 20);
-    }
-};
+// Resident MiB.
+double resident() {
+    malloc_trim(0);
+    vex_lib::vlSharedMemoryHeap::Compact();
+    double pages = 0;
+    std::ifstream("/proc/self/statm") >> pages >> pages;
+    return pages * static_cast<double>(sysconf(_SC_PAGESIZE)) / (1 << 20);
+}
 
 // In ten parts; what is held after the second is compared with what is held at the end.
 void run(const char* name, long (*subject)(double), double seconds) {
     long rounds = subject(seconds / 10) + subject(seconds / 10);
-    const Holdings before;
+    const long descriptors = test::open_descriptors();
+    const double before = resident();
     for (int part = 2; part < 10; ++part) {
         rounds += subject(seconds / 10);
     }
-    const Holdings after;
-    std::printf("%-10s %9ld rounds, resident %.1f and %.1f MiB, descriptors %ld and %ld\n", name, rounds,
-                before.resident, after.resident, before.descriptors, after.descriptors);
+    const double after = resident();
+    std::printf("%-10s %9ld rounds, resident %.1f and %.1f MiB\n", name, rounds, before, after);
     std::fflush(stdout);
-    require(after.descriptors <= before.descriptors, "descriptors do not grow");
-    require(seconds < 60 || after.resident <= 1.05 * before.resident + 1, "memory does not grow");
+    require(test::open_descriptors() <= descriptors, "descriptors do not grow");
+    require(seconds < 60 || after <= 1.05 * before + 1, "memory does not grow");
 }
 
 }  // namespace
@@ -77,20 +76,18 @@ int main(int argc, char** argv) {
     const double seconds = argc > 1 ? std::atof(argv[1]) : 1;
     const std::string_view wanted = argc > 2 ? argv[2] : "all";
     if (wanted == "first_use") {
-        std::printf("first_use %ld\n", first_use());
-        return 0;
+        return std::printf("first_use %ld\n", first_use()) < 0;
     }
     basalt::platform::SetDebugOutputHandler([](const wchar_t*) {});
-    const std::pair<const char*, long (*)(double)> subjects[] = {{"sparse", stress_sparse},
-                                                                 {"heaps", stress_heaps},
-                                                                 {"files", stress_files},
-                                                                 {"graphics", stress_graphics}};
-    bool is_known = false;
-    for (const auto& [name, subject] : subjects) {
+    int result = 2;  // for no subject
+    for (const auto& [name, subject] : {std::pair<const char*, long (*)(double)>{"sparse", stress_sparse},
+                                        {"heaps", stress_heaps},
+                                        {"files", stress_files},
+                                        {"graphics", stress_graphics}}) {
         if (wanted == "all" || wanted == name) {
-            is_known = true;
             run(name, subject, seconds);
+            result = 0;
         }
     }
-    return is_known ? 0 : 2;
+    return result;
 }

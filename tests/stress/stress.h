@@ -25,10 +25,8 @@ using Round = std::function<void(int thread, Random& random)>;
 long run_threads(int count, double seconds, const Round& round);
 
 // Each for so many seconds; the answer is how often its threads went round.
-long stress_sparse(double seconds);
-long stress_heaps(double seconds);
-long stress_files(double seconds);
-long stress_graphics(double seconds);
+long stress_sparse(double seconds), stress_heaps(double seconds);
+long stress_files(double seconds), stress_graphics(double seconds);
 // What is made at its first use, by all threads at once: good for one try a process.
 long first_use();
 

@@ -19,7 +19,7 @@ void* take(size_t size, align_val_t alignment = PLAIN) noexcept {
     void* block = nullptr;
     const auto bytes = std::max(static_cast<size_t>(alignment), sizeof(void*));
     const bool taken = posix_memalign(&block, bytes, std::max(size, size_t{1})) == 0;
-    basalt::test::allocations.live += taken ? 1 : 0;
+    basalt::test::live_blocks += taken ? 1 : 0;
     return taken ? block : nullptr;
 }
 
@@ -29,7 +29,7 @@ void* take_or_throw(size_t size, align_val_t alignment = PLAIN) {
 }
 
 void give(void* block) noexcept {
-    basalt::test::allocations.live -= block != nullptr ? 1 : 0;
+    basalt::test::live_blocks -= block != nullptr ? 1 : 0;
     std::free(block);
 }
 

@@ -6,22 +6,22 @@ namespace basalt::test {
 
 inline constinit thread_local bool failures_are_paused = false;  // no call of any kind fails meanwhile
 
-// Of this thread.
-struct Allocations {
+// Which calls of a kind fail, on this thread.
+struct Countdown {
     long calls_left = 0;  // until one fails; 0: none will
-    bool failure_stays = false;
+    bool stays = false;   // every later call fails too
     bool has_failed = false;
-    long live = 0;
 
-    // Whether an allocation has to fail.
+    // Whether the present call has to fail.
     bool fails() {
-        if (failures_are_paused || !(has_failed ? failure_stays : calls_left > 0 && --calls_left == 0)) {
+        if (failures_are_paused || !(has_failed ? stays : calls_left > 0 && --calls_left == 0)) {
             return false;
         }
         return has_failed = true;
     }
 };
-inline constinit thread_local Allocations allocations;
+inline constinit thread_local Countdown allocations;
+inline constinit thread_local long live_blocks = 0;
 
 }  // namespace basalt::test
 
@@ -29,10 +29,8 @@ inline constinit thread_local Allocations allocations;
 // later one too. Every form counts: plain, array, aligned, nothrow. The guards do not nest. Assertions of the
 // test framework allocate, so end the guard before asserting.
 struct FailAllocation {
-    explicit FailAllocation(long nth, bool forever = false) {
-        basalt::test::allocations = {nth, forever, false, basalt::test::allocations.live};
-    }
-    ~FailAllocation() { basalt::test::allocations = {0, false, false, basalt::test::allocations.live}; }
+    explicit FailAllocation(long nth, bool forever = false) { basalt::test::allocations = {nth, forever}; }
+    ~FailAllocation() { basalt::test::allocations = {}; }
     FailAllocation(const FailAllocation&) = delete;
     FailAllocation& operator=(const FailAllocation&) = delete;
 
@@ -43,7 +41,7 @@ struct FailAllocation {
 // Blocks from operator new that this thread has taken and not given back (below zero when it gives back the
 // blocks of others). Two readings that agree say that nothing leaked in between.
 inline long live_allocations() {
-    return basalt::test::allocations.live;
+    return basalt::test::live_blocks;
 }
 
 #endif

@@ -2,7 +2,6 @@
 #ifndef BASALT_TESTS_SUPPORT_HEAP_INSPECTION_H
 #define BASALT_TESTS_SUPPORT_HEAP_INSPECTION_H
 
-#include <algorithm>
 #include <cstddef>
 #include <mutex>
 
@@ -11,37 +10,25 @@
 namespace basalt::platform {
 
 struct HeapReport {
-    const char* fault = nullptr;  // the first violated invariant; null when all hold
-    std::size_t regions = 0;
-    std::size_t mapped = 0;  // bytes
-    std::size_t live_blocks = 0;
-    std::size_t free_blocks = 0;
-    std::size_t quick_blocks = 0;
-    std::size_t largest_free = 0;  // bytes of the largest request it can serve
+    const char* fault = nullptr;                           // the first violated invariant; null when all hold
+    std::size_t regions = 0, mapped = 0, live_blocks = 0;  // mapped: bytes
 };
 
 // The friend of the heap's classes.
 class HeapInspection {
 public:
     static HeapReport inspect(PrivateHeap& heap) {
-        HeapReport report = HeapInspection(heap.m_first).m_report;
+        HeapReport report;
+        HeapInspection(heap.m_first, report);
         for (const std::atomic<HeapPart*>& further : heap.m_further) {
-            if (HeapPart* const part = further.load()) {
-                const HeapReport of_part = HeapInspection(*part).m_report;
-                report.fault = report.fault != nullptr ? report.fault : of_part.fault;
-                report.regions += of_part.regions;
-                report.mapped += of_part.mapped;
-                report.live_blocks += of_part.live_blocks;
-                report.free_blocks += of_part.free_blocks;
-                report.quick_blocks += of_part.quick_blocks;
-                report.largest_free = std::max(report.largest_free, of_part.largest_free);
-            }
+            HeapPart* const part = further.load();
+            part != nullptr ? static_cast<void>(HeapInspection(*part, report)) : void();
         }
         return report;
     }
 
 private:
-    explicit HeapInspection(HeapPart& heap) : m_heap(heap) {
+    HeapInspection(HeapPart& heap, HeapReport& report) : m_heap(heap), m_report(report) {
         const std::lock_guard guard(heap.m_lock);
         const std::byte* end_before = nullptr;
         for (const Region& region : heap.m_regions.all()) {
@@ -53,8 +40,7 @@ private:
             check_free_lists();
             check_quick_lists();
         }
-        expect(m_report.mapped == heap.m_mapped && m_shared == heap.m_mapped_shared,
-               "mapped bytes are counted");
+        expect(m_mapped == heap.m_mapped && m_shared == heap.m_mapped_shared, "mapped bytes are counted");
         expect(heap.m_mapped <= heap.m_maximum, "the maximum holds");
         expect(m_live_shared == heap.m_live_shared, "live bytes are counted");
         expect(m_idle == heap.m_idle, "bytes of idle regions are counted");
@@ -81,19 +67,14 @@ private:
             expect(!is_free(head) || at == end || size_before(block_at(at)) == size,
                    "a free block ends in its size");
             expect(is_free(head) || tag == QUICK_TAG || tag == m_heap.m_tag, "a block has its heap's tag");
-            ++(is_free(head)      ? m_report.free_blocks
-               : tag == QUICK_TAG ? m_report.quick_blocks
-                                  : m_report.live_blocks);
-            if (is_free(head)) {
-                m_report.largest_free = std::max(m_report.largest_free, size - HEAD_BYTES - GUARD_BYTES);
-            } else if (tag != QUICK_TAG) {
-                live += size;
-            }
             after_free = is_free(head);
+            ++(after_free ? m_free : tag == QUICK_TAG ? m_quick : m_report.live_blocks);
+            live += after_free || tag == QUICK_TAG ? 0 : size;
         }
         expect(!region.single || (blocks == 1 && live != 0), "a large block is alone in its region");
         ++m_report.regions;
         m_report.mapped += region.size;
+        m_mapped += region.size;
         m_shared += region.single ? 0 : region.size;
         m_live_shared += region.single ? 0 : live;
         m_idle += m_heap.is_idle_region(block_at(region.begin + HEAD_BYTES)) ? region.size : 0;
@@ -101,17 +82,15 @@ private:
 
     void check_free_lists() {
         const FreeLists& lists = m_heap.m_free;
-        std::size_t listed = 0;
         for (unsigned level = 0; level < FreeLists::LEVELS; ++level) {
             expect((lists.m_levels >> level & 1U) == (lists.m_lists[level] != 0 ? 1U : 0U),
                    "levels agree with lists");
             for (unsigned list = 0; list < FreeLists::LISTS; ++list) {
-                Block* const first = lists.first({level, list});
-                expect((lists.m_lists[level] >> list & 1U) == (first != nullptr ? 1U : 0U),
+                Block *block = lists.first({level, list}), *previous = nullptr;
+                expect((lists.m_lists[level] >> list & 1U) == (block != nullptr ? 1U : 0U),
                        "bits agree with lists");
-                Block* previous = nullptr;
-                for (Block* block = first; block != nullptr; previous = block, block = next_of(block)) {
-                    if (++listed > m_report.free_blocks || m_heap.m_regions.find(block) == nullptr) {
+                for (; block != nullptr; previous = block, block = next_of(block)) {
+                    if (m_free-- == 0 || m_heap.m_regions.find(block) == nullptr) {
                         return expect(false, "a free list stays within the regions");
                     }
                     const auto place = FreeLists::place_of(size_of(head_of(block)));
@@ -121,15 +100,15 @@ private:
                 }
             }
         }
-        expect(listed == m_report.free_blocks, "every free block is in a list");
+        expect(m_free == 0, "every free block is in a list");
     }
 
     void check_quick_lists() {
         const QuickLists& lists = m_heap.m_quick;
-        std::size_t listed = 0, bytes = 0;
+        std::size_t bytes = 0;
         for (std::size_t list = 0; list < QuickLists::LISTS; ++list) {
             for (Block* block = lists.first(list); block != nullptr; block = next_of(block)) {
-                if (++listed > m_report.quick_blocks || m_heap.m_regions.find(block) == nullptr) {
+                if (m_quick-- == 0 || m_heap.m_regions.find(block) == nullptr) {
                     return expect(false, "a quick list stays within the regions");
                 }
                 const std::uint64_t head = head_of(block);
@@ -138,12 +117,13 @@ private:
                 bytes += size_of(head);
             }
         }
-        expect(bytes == lists.bytes() && listed == m_report.quick_blocks, "quick lists are counted");
+        expect(bytes == lists.bytes() && m_quick == 0, "quick lists are counted");
     }
 
     HeapPart& m_heap;
-    HeapReport m_report;
-    std::size_t m_shared = 0, m_live_shared = 0, m_idle = 0;  // bytes
+    HeapReport& m_report;
+    std::size_t m_free = 0, m_quick = 0;                                    // blocks not yet met in a list
+    std::size_t m_mapped = 0, m_shared = 0, m_live_shared = 0, m_idle = 0;  // bytes
 };
 
 // Takes the heap's lock; time grows with the number of blocks. The handle must be valid.

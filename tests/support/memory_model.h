@@ -8,7 +8,6 @@
 #include <cstdint>
 #include <functional>
 #include <memory>
-#include <set>
 #include <utility>
 #include <vector>
 
@@ -37,27 +36,20 @@ auto in_library(Call call) {
 // A block with a pattern of its own at both ends, which no one else may overwrite.
 class Marked {
 public:
-    Marked(void* block, std::size_t size) : m_block(static_cast<unsigned char*>(block)), m_size(size) {
-        mark();
-    }
+    Marked(void* block, std::size_t size) { move(block, size); }
     // As far as it has been kept.
     void check(std::size_t kept = SIZE_MAX) const {
         for_ends([this, kept](std::size_t i) { require(i >= kept || m_block[i] == byte(i)); });
     }
     void move(void* block, std::size_t size) {
-        const std::size_t kept = std::min(m_size, size);
         m_block = static_cast<unsigned char*>(block);
-        check(kept);
-        m_size = size;
-        mark();
+        check(size);
+        m_size = size, m_seed = ++s_seeds;
+        for_ends([this](std::size_t i) { m_block[i] = byte(i); });
     }
     unsigned char* block() const { return m_block; }
 
 private:
-    void mark() {
-        m_seed = ++s_seeds;
-        for_ends([this](std::size_t i) { m_block[i] = byte(i); });
-    }
     template <class Work>
     void for_ends(Work work) const {
         for (std::size_t i = 0; i < std::min(std::size_t{64}, m_size); ++i) {
@@ -66,8 +58,8 @@ private:
     }
     unsigned char byte(std::size_t i) const { return static_cast<unsigned char>(m_seed * 7 + i); }
 
-    unsigned char* m_block;
-    std::size_t m_size;
+    unsigned char* m_block = nullptr;
+    std::size_t m_size = 0;
     unsigned m_seed = 0;
     static inline unsigned s_seeds = 0;
 };
@@ -77,6 +69,16 @@ inline std::size_t any_size(Input& input) {
     const std::size_t size = input.byte();
     const unsigned shift = input.byte() % 16;
     return size << (shift < 14 ? shift % 8 : shift);
+}
+
+// Steps while there is input, and a look at the whole state.
+template <class Model>
+void drive(
+    Model&& model, Input& input, int steps, const MayFail& may_fail = [] { return false; }) {
+    for (int i = 0; i < steps && !input.is_over(); ++i) {
+        model.step(input, may_fail);
+    }
+    model.inspect();
 }
 
 class HeapModel {
@@ -111,16 +113,16 @@ public:
             m_blocks.pop_back();
         } else {
             const std::size_t size = any_size(input);
-            const bool moves = choice < 9;
+            Marked* const moved = choice < 9 ? any : nullptr;
             void* const block = in_library([&] {
-                return moves ? HeapReAlloc(m_heap, 0, any->block(), size) : HeapAlloc(m_heap, 0, size);
+                return moved ? HeapReAlloc(m_heap, 0, moved->block(), size) : HeapAlloc(m_heap, 0, size);
             });
             require(reinterpret_cast<std::uintptr_t>(block) % 16 == 0);
             require(block != nullptr || may_fail() || m_limit != 0);
-            if (block == nullptr) {
-                moves ? any->check() : void();
-            } else {
-                moves ? any->move(block, size) : static_cast<void>(m_blocks.emplace_back(block, size));
+            if (moved != nullptr) {
+                block != nullptr ? moved->move(block, size) : moved->check();
+            } else if (block != nullptr) {
+                m_blocks.emplace_back(block, size);
             }
         }
     }
@@ -164,32 +166,35 @@ public:
 private:
     struct Segment {
         unsigned char* base;
-        std::vector<unsigned long> free = {};
-        std::set<unsigned long> used = {};
+        std::vector<unsigned char*> free = {};
+        int used = 0;
         unsigned long next = 0;  // offset of the first block never allocated
     };
 
     void alloc(const MayFail& may_fail) {
-        auto* const block =
-            static_cast<unsigned char*>(in_library([&] { return m_allocator.Alloc(m_size); }));
+        void* const taken = in_library([&] { return m_allocator.Alloc(m_size); });
+        auto* const block = static_cast<unsigned char*>(taken);
         if (block == nullptr) {
             return require(may_fail());
         }
         if (m_partial.empty() && m_empty.empty()) {
-            m_partial.push_back(m_segments.size());
+            m_empty.push_back(m_segments.size());
             m_segments.push_back({block});
             require(reinterpret_cast<std::uintptr_t>(block) % 4096 == 0);
-        } else if (m_partial.empty()) {
+        }
+        if (m_partial.empty()) {
             m_partial.push_back(m_empty.back());
             m_empty.pop_back();
         }
         Segment& segment = m_segments[m_partial.back()];
-        const bool is_new = segment.free.empty();
-        const unsigned long offset =
-            is_new ? std::exchange(segment.next, segment.next + m_size) : segment.free.back();
-        is_new ? void() : segment.free.pop_back();
-        require(block == segment.base + offset && segment.used.insert(offset).second);
-        require(!is_new || std::all_of(block, block + m_size, [](unsigned char byte) { return byte == 0; }));
+        ++segment.used;
+        if (!segment.free.empty()) {
+            require(block == segment.free.back());
+            segment.free.pop_back();
+        } else {
+            require(block == segment.base + std::exchange(segment.next, segment.next + m_size));
+            require(std::all_of(block, block + m_size, [](unsigned char byte) { return byte == 0; }));
+        }
         if (segment.free.empty() && segment.next + m_size > m_segment_size) {
             m_partial.pop_back();
         }
@@ -197,21 +202,19 @@ private:
     }
     void free(unsigned char* block) {
         m_allocator.Free(block);
-        const auto found = std::ranges::find_if(m_segments, [=, this](const Segment& segment) {
-            return block >= segment.base && block < segment.base + m_segment_size;
-        });
-        const auto number = static_cast<std::size_t>(found - m_segments.begin());
-        const bool was_full = std::ranges::count(m_partial, number) == 0;
-        const auto offset = static_cast<unsigned long>(block - found->base);
-        found->used.erase(offset);
-        found->free.push_back(offset);
-        if (was_full) {
+        std::erase_if(m_live, [=](const Marked& one) { return one.block() == block; });
+        std::size_t number = 0;
+        while (block < m_segments[number].base || block >= m_segments[number].base + m_segment_size) {
+            ++number;
+        }
+        m_segments[number].free.push_back(block);
+        const bool falls_empty = --m_segments[number].used == 0;
+        if (std::ranges::count(m_partial, number) == 0) {
             m_partial.push_back(number);
-        } else if (found->used.empty()) {
+        } else if (falls_empty) {
             std::erase(m_partial, number);
             m_empty.push_back(number);
         }
-        std::erase_if(m_live, [=](const Marked& one) { return one.block() == block; });
     }
     // An address in or just outside a view; ignored unless a live block begins there.
     void free_other(unsigned char* address) {

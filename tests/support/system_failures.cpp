@@ -1,35 +1,23 @@
 #include "tests/support/system_failures.h"
 
 #include <dirent.h>
-#include <fcntl.h>
 #include <ifaddrs.h>
 #include <locale.h>
 #include <sys/mman.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include <atomic>
 #include <cerrno>
-#include <cstdarg>
 
-#include "tests/support/failing_new.h"
+using namespace basalt::test;
 
 namespace {
 
-thread_local int calls_left = -1;  // until one fails; negative: none will
-thread_local bool failure_stays = false, has_struck = false;
-thread_local int chosen_number = 0;
-std::atomic<long> balance{0}, refused{0}, files_kept{0};
-
 // Whether a call has to fail; errno is set then.
 bool fails(int number) {
-    if (basalt::test::failures_are_paused || calls_left < 0 || (calls_left > 1 && calls_left-- > 1)) {
-        return false;
-    }
-    calls_left = failure_stays ? 1 : -1;
-    has_struck = true;
-    errno = chosen_number != 0 ? chosen_number : number;
-    return true;
+    const bool fails = system_calls.fails();
+    errno = !fails ? errno : system_error != 0 ? system_error : number;
+    return fails;
 }
 
 }  // namespace
@@ -52,7 +40,6 @@ FAILING(dirent*, readdir, (DIR * folder), (folder), EIO, nullptr)
 FAILING(int, statx, (int at, const char* path, int flags, unsigned mask, struct statx* to),
         (at, path, flags, mask, to), EIO, -1)
 
-#ifdef BASALT_FURTHER_FAILURES
 FAILING(int, access, (const char* path, int mode), (path, mode), EACCES, -1)
 FAILING(int, close, (int file), (file), EIO,
         (__real_close(file), -1))  // closes all the same, as the system does
@@ -67,79 +54,32 @@ FAILING(char*, realpath, (const char* path, char* to), (path, to), EIO, nullptr)
 FAILING(int, stat, (const char* path, struct stat* status), (path, status), EIO, (++files_kept, -1))
 FAILING(int, unlink, (const char* path), (path), EROFS, (++files_kept, -1))
 FAILING(ssize_t, write, (int file, const void* from, size_t size), (file, from, size), ENOSPC, -1)
-#endif
+// The optional last argument is passed on, given or not.
+FAILING(int, open, (const char* path, int flags, mode_t mode), (path, flags, mode), EMFILE, -1)
+FAILING(int, fcntl, (int file, int command, void* argument), (file, command, argument), ENOLCK, -1)
 
 void* __real_mmap(void*, size_t, int, int, int, off_t);
 void* __wrap_mmap(void* address, size_t size, int access, int flags, int file, off_t offset) {
     void* const pages = fails(ENOMEM) ? MAP_FAILED : __real_mmap(address, size, access, flags, file, offset);
     const bool is_new = pages != MAP_FAILED && (flags & MAP_FIXED) == 0;  // not in another's place
-    balance += is_new ? static_cast<long>(size) : 0;
+    bytes_mapped += is_new ? static_cast<long>(size) : 0;
     return pages;
 }
 
 void* __real_mremap(void*, size_t, size_t, int);
 void* __wrap_mremap(void* pages, size_t old_size, size_t new_size, int flags) {
     void* const moved = fails(ENOMEM) ? MAP_FAILED : __real_mremap(pages, old_size, new_size, flags);
-    balance += moved == MAP_FAILED ? 0 : static_cast<long>(new_size) - static_cast<long>(old_size);
+    bytes_mapped += moved == MAP_FAILED ? 0 : static_cast<long>(new_size) - static_cast<long>(old_size);
     return moved;
 }
 
 int __real_munmap(void*, size_t);
 int __wrap_munmap(void* pages, size_t size) {
-    const bool refuses = fails(ENOMEM);
-    const int result = refuses ? -1 : __real_munmap(pages, size);
-    (refuses ? refused : balance) += refuses       ? static_cast<long>(size)
-                                     : result == 0 ? -static_cast<long>(size)
-                                                   : 0;
+    if (fails(ENOMEM)) {
+        return bytes_kept += static_cast<long>(size), -1;
+    }
+    const int result = __real_munmap(pages, size);
+    bytes_mapped -= result == 0 ? static_cast<long>(size) : 0;
     return result;
 }
-
-int __real_open(const char*, int, ...);
-int __wrap_open(const char* path, int flags, ...) {
-    va_list rest;
-    va_start(rest, flags);
-    const mode_t mode = (flags & O_CREAT) != 0 ? va_arg(rest, mode_t) : 0;
-    va_end(rest);
-    return fails(EMFILE) ? -1 : __real_open(path, flags, mode);
 }
-
-int __real_fcntl(int, int, ...);
-int __wrap_fcntl(int file, int command, ...) {
-    va_list rest;
-    va_start(rest, command);
-    void* const argument = va_arg(rest, void*);
-    va_end(rest);
-    return fails(ENOLCK) ? -1 : __real_fcntl(file, command, argument);
-}
-}
-
-namespace basalt::test {
-
-SystemFailure::SystemFailure(int nth, Then then, int number) {
-    calls_left = nth;
-    failure_stays = then == Then::STAYS;
-    has_struck = false;
-    chosen_number = number;
-}
-
-SystemFailure::~SystemFailure() {
-    calls_left = -1;
-}
-
-bool SystemFailure::struck() {
-    return has_struck;
-}
-
-long refused_to_unmap() {
-    return refused;
-}
-
-long mapped_balance() {
-    return balance;
-}
-
-long files_made_to_stay() {
-    return files_kept;
-}
-
-}  // namespace basalt::test

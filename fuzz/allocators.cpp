@@ -1,4 +1,4 @@
-// Memory: sequences of calls on heaps, the block allocator, the buffer and page sources against their models.
+// Memory: sequences of calls on heaps and the block allocator against their models.
 #include "tests/support/memory_model.h"
 
 using namespace basalt::test;
@@ -10,10 +10,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     if (choice < 2) {
         const unsigned long block = input.byte() % 4 == 0 ? 1 + input.byte() : 4096;
         drive(BlockModel(block * (1 + input.byte() % 35) + input.byte() % block, block), input, 1000);
-    } else if (choice == 2) {
-        drive(BufferModel(input.byte() % 4 == 0 ? 0 : any_size(input)), input, 30);
-    } else if (choice == 3) {
-        drive(PagesModel(), input, 40);
     } else {
         drive(HeapModel(choice == 4 ? 1 + input.word() % 500'000 : 0), input, 500);
     }

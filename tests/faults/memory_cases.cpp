@@ -1,5 +1,4 @@
-// Heaps, the block allocator, the buffer and page sources by their models' steps; mapped blocks and the rest
-// by rows.
+// Heaps and the block allocator by their models' steps; the rest by rows.
 #include <chrono>
 #include <cstring>
 #include <memory>
@@ -16,7 +15,8 @@ namespace {
 using namespace vex_lib;
 using vex_util::CMemoryMap;
 
-constexpr unsigned long PAGE = 4096;
+using Pages = vlSharedMemoryAllocator;
+constexpr unsigned long PAGE = 4096, COMMIT = 0x1000, RESERVE = 0x2000, DECOMMIT = 0x4000, RELEASE = 0x8000;
 
 // Steps with failing calls between some without.
 template <class Model, class... Arguments>
@@ -104,13 +104,48 @@ struct AbandonedRow {
     bool holds(bool) const { return true; }
 };
 
+struct ResizeRow {
+    vlVmBuffer buffer{100, 0, 64};
+    ResizeRow() { std::strcpy(static_cast<char*>(buffer.GetData()), "kept"); }
+    bool act() noexcept { return buffer.ReSize(1 << 20) != nullptr; }
+    bool holds(bool done) const {
+        auto* const data = static_cast<char*>(buffer.GetData());
+        return std::strcmp(data, "kept") == 0 && (!done || fills(data + 5, (1 << 20) - 5));
+    }
+};
+
+struct ReserveRow {
+    void* base = nullptr;
+    bool act() noexcept { return (base = Pages::Alloc(nullptr, PAGE, RESERVE, nullptr)) != nullptr; }
+    bool holds(bool done) const { return !done || Pages::Free(base, 0, RELEASE, 0) != 0; }
+};
+
+// Drops the second of three pages, and commits all.
+struct PagesRow : ReserveRow {
+    char* page = nullptr;
+    bool is_dropped = false;
+    PagesRow() {
+        base = Pages::Alloc(nullptr, 3 * PAGE, RESERVE, nullptr);
+        page = static_cast<char*>(Pages::Alloc(static_cast<char*>(base) + PAGE, PAGE, COMMIT, nullptr));
+        page[0] = 'x';
+    }
+    ~PagesRow() { Pages::Free(base, 0, RELEASE, 0); }
+    bool act() noexcept {
+        is_dropped = is_dropped || Pages::Free(page, PAGE, DECOMMIT, 0) != 0;
+        return is_dropped && Pages::Alloc(base, 3 * PAGE, COMMIT, nullptr) == base;
+    }
+    bool holds(bool done) const {
+        return done ? *page == 0 && fills(base, 3 * PAGE) : is_dropped || *page == 'x';
+    }
+};
+
 struct MappedRow {
     void* view = nullptr;
     unsigned long handle = 0;
     bool act() noexcept {
-        return (view = vlMMapFileAllocator::Alloc(nullptr, PAGE, 0x2000, &handle)) != nullptr;
+        return (view = vlMMapFileAllocator::Alloc(nullptr, PAGE, RESERVE, &handle)) != nullptr;
     }
-    bool free() const noexcept { return vlMMapFileAllocator::Free(view, 0, 0x8000, handle) != 0; }
+    bool free() const noexcept { return vlMMapFileAllocator::Free(view, 0, RELEASE, handle) != 0; }
     bool holds(bool done) const { return done ? fills(view, PAGE) && free() : handle == 0; }
 };
 
@@ -127,15 +162,15 @@ void check_memory() {
     walk<test::HeapModel>("heap with a maximum", 0, 0, 60, 300'000UL);
     walk<test::BlockModel>("vlVmAllocator, a new file a block", 128, 16, 2, PAGE, PAGE);
     walk<test::BlockModel>("vlVmAllocator, several blocks a file", 0, 0, 20, 5 * PAGE, PAGE);
-    walk<test::BufferModel>("vlVmBuffer", 0, 0, 30, std::uint64_t{64});
-    walk<test::BufferModel>("vlVmBuffer without a step", 0, 0, 30, std::uint64_t{0});
-    walk<test::PagesModel>("vlSharedMemoryAllocator", 0, 0, 30);
     run<ManyRegionsRow>("heap with many regions");
     run<OnSharedHeapRow>("new of a class on the shared heap");
     run<CreateRow>("CMemoryMap::Create");
     run<DestroyRow>("CMemoryMap::Destroy");
     run<CleanUpRow>("CMemoryMap::CleanUp");
     run<AbandonedRow>("abandoned files");
+    run<ResizeRow>("vlVmBuffer::ReSize");
+    run<ReserveRow>("vlSharedMemoryAllocator, a reservation");
+    run<PagesRow>("vlSharedMemoryAllocator, pages");
     run<MappedRow>("vlMMapFileAllocator::Alloc");
     run<UnmappedRow>("vlMMapFileAllocator::Free");
     check("vlVmBuffer::Test", [](Trial& trial) { trial.attempt([] { vlVmBuffer::Test(); }); });

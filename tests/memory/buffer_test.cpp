@@ -27,11 +27,15 @@ TEST(Buffer, rounds_its_first_size_up_by_the_step) {
 
 TEST(Buffer, resizes_exactly_downwards_and_by_the_step_upwards_and_refuses_more_than_32_bits) {
     vlVmBuffer buffer(100, 0, 64);
+    static_cast<char*>(buffer.GetData())[49] = 'x';
+    bool is_kept = true;
     constexpr unsigned long ROWS[][2] = {{128, 128}, {129, 192}, {50, 50}, {51, 64}, {0, 0}, {64, 128}};
     for (const auto& [size, expected] : ROWS) {
         const void* const block = buffer.ReSize(size);
         EXPECT_EQ(block, buffer.GetData());
         EXPECT_EQ(usable(buffer, expected), expected) << size;
+        is_kept = is_kept && size != 0;
+        EXPECT_TRUE(!is_kept || static_cast<const char*>(block)[49] == 'x') << size;
     }
     for (const std::uint64_t size : {LARGEST - 62, LARGEST, LARGEST + 1, (LARGEST + 1) * 16 + 1, ~0UL}) {
         EXPECT_EQ(buffer.ReSize(size), nullptr) << size;

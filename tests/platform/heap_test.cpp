@@ -73,7 +73,7 @@ TEST(Heap, at_its_maximum_serves_what_fits_between_blocks) {
     EXPECT_EQ(heap.free(blocks[3]), 1);
     EXPECT_EQ(heap.take(5008), nullptr);
     EXPECT_EQ(heap.take(4990), blocks[3]);
-    for (const std::size_t size : {10, 4000, 10}) {
+    for (const std::size_t size : {10U, 4000U, 10U}) {
         EXPECT_EQ(heap.resize(blocks[3], size), blocks[3]) << "in place";
     }
     EXPECT_NE(heap.take(4900), nullptr) << "the rest is free";

@@ -48,12 +48,11 @@ TEST(VirtualMemory, pages_are_usable_from_commit_to_decommit) {
     }
     mlock(base + 2 * PAGE, 2 * PAGE);  // may fail; locked pages are zero after a decommit too
     std::fill(base + 2 * PAGE, base + 4 * PAGE, 'x');
-    EXPECT_EQ(commit(base, 10 * PAGE), base);
-    EXPECT_EQ(std::count(base, base + 10 * PAGE, 'x'), static_cast<long>(2 * PAGE)) << "contents stay";
     EXPECT_EQ(decommit(base + 3 * PAGE + 7, 1), 1);
     EXPECT_FALSE(is_readable(base + 3 * PAGE));
-    EXPECT_EQ(commit(base + 3 * PAGE, 1), base + 3 * PAGE);
-    EXPECT_EQ(std::count(base, base + 10 * PAGE, 'x'), static_cast<long>(PAGE));
+    EXPECT_EQ(commit(base, 10 * PAGE), base);
+    EXPECT_EQ(std::count(base, base + 10 * PAGE, 'x'), static_cast<long>(PAGE))
+        << "the other's contents stay";
     EXPECT_TRUE(decommit(base, 0) && decommit(base, 10 * PAGE)) << "all of it, and a second time";
     EXPECT_FALSE(is_readable(base + 2 * PAGE));
     EXPECT_EQ(release(base), 1);

@@ -1,13 +1,12 @@
-// Heaps, the block allocator, the buffer and page sources against plain models: what a block holds stays
-// until it is freed, no two overlap, and what is no block is refused. Each model takes its steps from an
-// input, for the fuzzer, and with failing calls for the fault walk.
+// Heaps and the block allocator against plain models: what a block holds stays until it is freed, no two
+// overlap, and what is no block is refused. Each model takes its steps from an input, for the fuzzer, and
+// with failing calls for the fault walk.
 #ifndef BASALT_TESTS_SUPPORT_MEMORY_MODEL_H
 #define BASALT_TESTS_SUPPORT_MEMORY_MODEL_H
 
 #include <algorithm>
 #include <cstdint>
 #include <functional>
-#include <memory>
 #include <utility>
 #include <vector>
 
@@ -218,9 +217,8 @@ private:
     }
     // An address in or just outside a view; ignored unless a live block begins there.
     void free_other(unsigned char* address) {
-        const bool is_live =
-            std::ranges::any_of(m_live, [=](const Marked& one) { return one.block() == address; });
-        is_live ? free(address) : m_allocator.Free(address);
+        const auto is_it = [=](const Marked& one) { return one.block() == address; };
+        std::ranges::any_of(m_live, is_it) ? free(address) : m_allocator.Free(address);
         m_allocator.Free(nullptr);
         require(m_allocator.Alloc(m_size + 1) == nullptr);
     }
@@ -230,83 +228,6 @@ private:
     std::vector<Segment> m_segments;
     std::vector<std::size_t> m_empty, m_partial;  // a segment in neither is full
     std::vector<Marked> m_live;
-};
-
-class BufferModel {
-public:
-    explicit BufferModel(std::uint64_t step) : m_step(step), m_buffer(0, 0, step) {
-        resized(m_buffer.GetData(), step);
-    }
-    void step(Input& input, const MayFail& may_fail) {
-        const std::uint64_t size = any_size(input);
-        const std::uint64_t next = size > m_size && m_step != 0 ? (size / m_step + 1) * m_step : size;
-        void* const block = in_library([&] { return m_buffer.ReSize(size); });
-        require(block != nullptr || next == 0 || may_fail());
-        if (block != nullptr || next == 0) {
-            resized(block, next);
-        }
-        inspect();
-        require(m_buffer.ReSize(std::uint64_t{1} << 32) == nullptr);
-    }
-    void inspect() const {
-        require((m_buffer.GetData() != nullptr) == (m_size != 0));
-        m_contents ? m_contents->check() : void();
-    }
-
-private:
-    void resized(void* block, std::uint64_t size) {
-        m_contents&& block != nullptr ? m_contents->move(block, size) : m_contents.reset();
-        if (block != nullptr && !m_contents) {
-            m_contents = std::make_unique<Marked>(block, size);
-        }
-        m_size = block != nullptr ? size : 0;
-    }
-    std::uint64_t m_step, m_size = 0;
-    vex_lib::vlVmBuffer m_buffer;
-    std::unique_ptr<Marked> m_contents;
-};
-
-class PagesModel {
-public:
-    PagesModel() { std::ranges::fill(m_held, -1); }
-    ~PagesModel() { require(m_base == nullptr || Source::Free(m_base, 0, RELEASE, 0) != 0); }
-    PagesModel(const PagesModel&) = delete;
-    PagesModel& operator=(const PagesModel&) = delete;
-
-    void step(Input& input, const MayFail& may_fail) {
-        if (m_base == nullptr) {
-            m_base = static_cast<unsigned char*>(
-                in_library([] { return Source::Alloc(nullptr, PAGES * PAGE, RESERVE, nullptr); }));
-            return require(m_base != nullptr || may_fail());
-        }
-        const std::size_t first = input.byte() % PAGES, count = 1 + input.byte() % (PAGES - first);
-        unsigned char* const at = m_base + first * PAGE;
-        if (input.byte() % 3 == 0) {
-            const bool done = in_library([&] { return Source::Free(at, count * PAGE, DECOMMIT, 0); }) != 0;
-            require(done || may_fail());
-            done ? std::fill_n(m_held + first, count, -1) : m_held;
-        } else if (in_library([&] { return Source::Alloc(at, count * PAGE, COMMIT, nullptr); }) == nullptr) {
-            require(may_fail());
-        } else {
-            for (std::size_t page = first; page < first + count; ++page) {
-                require(m_base[page * PAGE] == std::max(m_held[page], 0));
-                m_base[page * PAGE] = static_cast<unsigned char>(m_held[page] = input.byte());
-            }
-        }
-        require(Source::Alloc(m_base, (PAGES + 16) * PAGE, COMMIT, nullptr) == nullptr);
-    }
-    void inspect() const {
-        for (std::size_t page = 0; page < PAGES; ++page) {
-            require(m_held[page] < 0 || m_base[page * PAGE] == m_held[page]);
-        }
-    }
-
-private:
-    using Source = vex_lib::vlSharedMemoryAllocator;
-    static constexpr unsigned long COMMIT = 0x1000, RESERVE = 0x2000, DECOMMIT = 0x4000, RELEASE = 0x8000;
-    static constexpr std::size_t PAGE = 4096, PAGES = 24;
-    unsigned char* m_base = nullptr;
-    int m_held[PAGES];  // -1 without memory, else the first byte of the page
 };
 
 }  // namespace basalt::test

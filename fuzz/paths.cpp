@@ -75,25 +75,23 @@ std::wstring select(const Parts& parts, unsigned selector) {
 }
 
 // The members of a file path.
-struct FilePath {
-    std::wstring full, drive, directory, name, extension;
+struct FilePath : Parts {
+    std::wstring full;
 
     void set(const std::wstring& path) {
         full = path;
         if (path.empty()) {
             return;
         }
-        const Parts parts = split(path);
-        drive = parts.drive;
-        name = parts.name;
-        extension = parts.extension.substr(parts.extension.empty() ? 0 : 1);
-        const std::size_t size = parts.directory.size();
-        const std::size_t first = size > 1 && parts.directory.find_first_of(L"\\/") == 0 ? 1 : 0;
-        directory = size == 0 ? L"" : parts.directory.substr(first, size - 1 - first);
-        if (parts.valid && is_directory(path)) {
-            directory += L"\\" + name + parts.extension;
+        static_cast<Parts&>(*this) = split(path);
+        const std::size_t size = directory.size(),
+                          first = size > 1 && directory.find_first_of(L"\\/") == 0 ? 1 : 0;
+        directory = directory.substr(first, size == 0 ? 0 : size - 1 - first);
+        if (valid && is_directory(path)) {
+            directory += L"\\" + name + extension;
             name.clear();
         }
+        extension.erase(0, 1);
     }
     std::wstring folder() const { return drive + L"\\" + directory; }
     std::wstring file() const { return name.empty() || extension.empty() ? L"" : name + L"." + extension; }

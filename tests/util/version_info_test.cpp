@@ -33,9 +33,6 @@ namespace {
 
 using namespace basalt::test;
 
-bool same(char a, unsigned char b) {
-    return static_cast<unsigned char>(a) == b;
-}
 CString all(VersionInfo& info) {
     return info.GetVersionString() + L"|" + info.GetInternalName() + L"|" + info.GetCopyright() + L"|" +
            info.GetProductVersion() + L"|" + info.GetFileDescription() + L"|" + info.GetComment();
@@ -54,10 +51,9 @@ TEST(Version, is_that_of_this_program_whatever_the_instance_and_in_it_once) {
                 info.GetBuild() == 305);
     std::ifstream file("/proc/self/exe", std::ios::binary);
     const std::string program(std::istreambuf_iterator<char>(file), {});
-    const Bytes text = utf16({comment.begin(), comment.end()});
-    const auto first = std::search(program.begin(), program.end(), text.begin(), text.end(), same);
-    ASSERT_NE(first, program.end());
-    EXPECT_EQ(std::search(first + 1, program.end(), text.begin(), text.end(), same), program.end());
+    const Bytes units = utf16({comment.begin(), comment.end()});
+    const std::string text(units.begin(), units.end());
+    EXPECT_TRUE(program.find(text) < program.size() && program.find(text) == program.rfind(text));
 }
 
 TEST(Version, each_reading_replaces_what_it_finds) {

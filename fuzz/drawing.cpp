@@ -14,24 +14,25 @@ using basalt::fuzz::Input;
 using basalt::fuzz::require;
 using namespace drawing;
 
-constexpr int SIDE = 30;  // of the regions
+constexpr int SIDE = 16;  // of the regions
 const XFORM TRANSFORMS[] = {
     {1, 0, 0, 1, 0, 0},    turn_about(30, 12, 9),  turn_about(123.4, 5, 5),
     turn_about(90, 10, 8), {2, 0, 0, 2, -3, 1},    {-1, 0, 0, 1, 20, 0},
     {1, 0, 0, 1, 3, -4},   {0.25F, 0, 0, 4, 1, 1}, {1, 0.3F, -0.7F, 1.2F, 5.25F, -3.5F}};
 
-// A context with its bitmap, and the model of both. A few are wider than what copies take at a time.
-struct Surface {
-    std::minstd_rand random;
-    Picture picture;
-    Canvas canvas;
-    Settings settings;
+// A few are wider than what copies take at a time.
+Picture drawn_picture(Input& in) {
+    std::minstd_rand random(1 + in.byte());
+    const int kind = in.byte(), width = kind % 16 == 15 ? 520 : 1 + kind % 40, height = 1 + in.byte() % 20;
+    return random_picture(width, height, DEPTHS[in.byte() % 6], random);
+}
 
-    explicit Surface(Input& in)
-        : random(1 + in.byte()),
-          picture(random_picture(in.byte() % 16 == 15 ? 520 : 1 + in.byte() % 40, 1 + in.byte() % 20,
-                                 DEPTHS[in.byte() % 6], random)),
-          canvas(picture) {}
+// A context with its bitmap, and the model of both.
+struct Surface {
+    Picture picture;
+    Canvas canvas{picture};
+    Settings settings = {};
+
     int depth() const { return picture.depth; }
     // Whether the transform is a shift by whole pixels, and the shift.
     bool is_shift() const { return settings.world.eM11 == 1 && settings.world.eM12 == 0; }
@@ -42,7 +43,8 @@ struct Surface {
 
 struct World {
     Input& in;
-    std::array<Surface, 3> surfaces{Surface(in), Surface(in), Surface(in)};
+    std::array<Surface, 3> surfaces{Surface{drawn_picture(in)}, Surface{drawn_picture(in)},
+                                    Surface{drawn_picture(in)}};
     std::array<Picture, 3> sets{Picture(SIDE, SIDE, 1), Picture(SIDE, SIDE, 1), Picture(SIDE, SIDE, 1)};
     std::array<CRgn, 3> regions;
 
@@ -81,58 +83,50 @@ struct World {
         const bool is_rounded = in.byte() % 2 == 0;
         const int width = coordinate(), height = coordinate();
         HGDIOBJ const before = SelectObject(s.canvas, brush);
-        const int done = is_rounded ? RoundRect(s.canvas, r.left, r.top, r.right, r.bottom, width, height)
-                                    : FillRect(s.canvas, &r, brush);
+        require((is_rounded ? RoundRect(s.canvas, r.left, r.top, r.right, r.bottom, width, height)
+                            : FillRect(s.canvas, &r, brush)) == (s.is_shift() ? 1 : 0));
         SelectObject(s.canvas, before);
-        require(done == (s.is_shift() ? 1 : 0));
-        on(s.picture,
-           done == 0    ? RECT{}
-           : is_rounded ? box
-                        : s.moved(r),
-           [&](int x, int y, std::uint32_t& pixel) {
-               const bool is_in = !is_rounded || is_in_rounded(box, std::abs(width), std::abs(height), x, y);
-               pixel = is_in ? value : pixel;
-           });
+        on(s.picture, is_rounded ? box : s.moved(r), [&](int x, int y, std::uint32_t& pixel) {
+            const bool is_in = !is_rounded || is_in_rounded(box, std::abs(width), std::abs(height), x, y);
+            pixel = is_in && s.is_shift() ? value : pixel;
+        });
     }
 
     void gradients(Surface& s) {
-        TRIVERTEX ends[2];
-        for (TRIVERTEX& end : ends) {
+        const auto corner = [&] {
             const auto channel = [&] { return static_cast<WORD>(in.byte() << 8 | in.byte()); };
-            end = {coordinate(), coordinate(), channel(), channel(), channel(), 0};
-        }
+            return TRIVERTEX{coordinate(), coordinate(), channel(), channel(), channel(), 0};
+        };
+        TRIVERTEX ends[2] = {corner(), corner()};
         const GRADIENT_RECT mesh = {0, 1};
         const bool across = in.byte() % 2 == 0;
         require(GradientFill(s.canvas, ends, 2, &mesh, 1, across ? 0 : 1) == (s.is_shift() ? 1 : 0));
-        for (TRIVERTEX& end : ends) {
-            end.x += s.dx(), end.y += s.dy();
-        }
         if (s.is_shift()) {
+            ends[0].x += s.dx(), ends[0].y += s.dy(), ends[1].x += s.dx(), ends[1].y += s.dy();
             gradient(s.picture, ends[0], ends[1], across);
         }
     }
 
-    void copies(Surface& to, Surface& from) {
+    void copies(Surface& to) {
+        const Surface& from = surface();
         constexpr DWORD OPERATIONS[] = {SRCCOPY, NOTSRCCOPY, SRCAND, SRCPAINT, SRCINVERT};
         const RECT r = rectangle();
         const Block b = {r.left, r.top, r.right, r.bottom, coordinate(), coordinate()};
         const DWORD rop = OPERATIONS[in.byte() % 5];
         const XFORM& w = from.settings.world;
-        const bool is_moved = w.eDx != 0 || w.eM11 != 1 || w.eM12 != 0;
-        const bool done =
-            BitBlt(to.canvas, b.x, b.y, b.width, b.height, from.canvas, b.source_x, b.source_y, rop);
-        require(done == (w.eM12 == 0 && w.eM21 == 0));
-        if (!done) {
-            return;
-        }
+        require(BitBlt(to.canvas, b.x, b.y, b.width, b.height, from.canvas, b.source_x, b.source_y, rop) ==
+                (w.eM12 == 0 && w.eM21 == 0));
         const Picture result = to.canvas.picture();
         // A source's own transform is left to the tests.
-        require(is_moved || result == copied(to.picture, b, from.picture, rop, to.settings,
-                                             from.settings.background, &result, 1e-6));
-        to.picture = result;
+        if (w.eDx == 0 && w.eM11 == 1 && w.eM12 == 0) {
+            require(result == copied(to.picture, b, from.picture, rop, to.settings, from.settings.background,
+                                     &result, 1e-6));
+        }
+        to.picture = w.eM12 == 0 && w.eM21 == 0 ? result : to.picture;
     }
 
-    void keyed_copies(Surface& to, Surface& from) {
+    void keyed_copies(Surface& to) {
+        const Surface& from = surface();
         const RECT r = rectangle(), source = rectangle();
         const COLORREF key = colour(from);
         const bool is_drawn = r.right >= 0 && r.bottom >= 0 && source.right >= 0 && source.bottom >= 0 &&
@@ -170,54 +164,39 @@ struct World {
     }
 
     void settings(Surface& s) {
-        s.settings.text = in.word();
-        s.settings.background = in.word();
-        s.settings.world = TRANSFORMS[in.byte() % 9U];
+        s.settings = {in.word(), in.word(), TRANSFORMS[in.byte() % 9U]};
         SetTextColor(s.canvas, s.settings.text);
         SetBkColor(s.canvas, s.settings.background);
         SetGraphicsMode(s.canvas, GM_ADVANCED);
         require(SetWorldTransform(s.canvas, &s.settings.world) != 0);
     }
 
-    void combine() {
-        const std::size_t a = in.byte() % 3, b = in.byte() % 3, into = in.byte() % 3;
-        const int mode = RGN_AND + in.byte() % 5;
-        if (in.byte() % 2 == 0) {
-            const RECT r = {in.byte() % SIDE, in.byte() % SIDE, in.byte() % SIDE, in.byte() % SIDE};
-            require(regions[b].SetRectRgn(&r) != 0);
-            sets[b] = Picture(SIDE, SIDE, 1);
-            on(sets[b], ordered(r), [](int, int, std::uint32_t& value) { value = 1; });
+    void combine(Surface&) {
+        for (int more = in.byte() % 8; more >= 0; --more) {
+            const std::size_t a = in.byte() % 3, b = in.byte() % 3, into = in.byte() % 3;
+            const int mode = in.byte() % 5;
+            if (in.byte() % 2 == 0) {
+                const RECT r = {in.byte() % SIDE, in.byte() % SIDE, in.byte() % SIDE, in.byte() % SIDE};
+                require(regions[b].SetRectRgn(&r) != 0);
+                sets[b] = Picture(SIDE, SIDE, 1);
+                on(sets[b], ordered(r), [](int, int, std::uint32_t& value) { value = 1; });
+            }
+            require(EqualRgn(regions[a], regions[b]) == (sets[a] == sets[b]));
+            require(regions[into].CombineRgn(&regions[a], &regions[b], RGN_AND + mode) != RGN_ERROR);
+            for (std::size_t i = 0; i < sets[into].pixels.size(); ++i) {
+                const std::uint32_t x = sets[a].pixels[i], y = sets[b].pixels[i];
+                const std::uint32_t results[] = {x & y, x | y, x ^ y, x & ~y, x};
+                sets[into].pixels[i] = results[mode];
+            }
+            require(holds(regions[into], sets[into]));
         }
-        Picture result(SIDE, SIDE, 1);
-        for (std::size_t i = 0; i < result.pixels.size(); ++i) {
-            const std::uint32_t x = sets[a].pixels[i], y = sets[b].pixels[i];
-            const std::uint32_t results[] = {x & y, x | y, x ^ y, x & ~y, x};
-            result.pixels[i] = results[mode - RGN_AND];
-        }
-        require(regions[into].CombineRgn(&regions[a], &regions[b], mode) != RGN_ERROR);
-        sets[into] = result;
-        require(holds(regions[into], result));
     }
 
     void step(Surface& s) {
-        switch (in.byte() % 9) {
-            case 0:
-                return pixel(s);
-            case 1:
-                return fills(s);
-            case 2:
-                return gradients(s);
-            case 3:
-                return keyed_copies(s, surface());
-            case 4:
-                return settings(s);
-            case 5:
-                return rows(s);
-            case 6:
-                return combine();
-            default:
-                return copies(s, surface());
-        }
+        constexpr void (World::*STEPS[])(Surface&) = {&World::pixel,  &World::fills,    &World::gradients,
+                                                      &World::copies, &World::copies,   &World::keyed_copies,
+                                                      &World::rows,   &World::settings, &World::combine};
+        (this->*STEPS[in.byte() % 9])(s);
     }
 };
 

@@ -23,38 +23,44 @@ using namespace drawing;
 Picture drawn_picture(Input& in) {
     const std::uint32_t values[] = {0, ~0U, in.word(), in.word() & 0xFFFFFF};
     const auto next = [&] { return values[in.byte() % 4]; };
-    return random_picture(1 + in.byte() % 70, 1 + in.byte() % 40, DEPTHS[in.byte() % 6], next);
+    const int width = 1 + in.byte() % 70, height = 1 + in.byte() % 40;
+    return random_picture(width, height, DEPTHS[in.byte() % 6], next);
 }
 
-// The file holds what unpacks to the picture, bottom row first, without the unused byte.
-void check_file(Canvas& canvas, const Picture& picture) {
+// Memory holds the picture, top row first; the file bottom row first, without the unused byte.
+void check_rows(Canvas& canvas, const Picture& picture) {
     static const int file = memfd_create("picture", MFD_CLOEXEC);
+    const int width = picture.width, height = picture.height, depth = picture.depth;
+    const Bytes rows = packed(picture, 32);
+    DibHeader expected(width, -height, depth);
+    expected.header.biSizeImage = static_cast<DWORD>(rows.size());  // the platform's addition
+    BITMAPINFOHEADER header;
+    const std::unique_ptr<unsigned char[]> pixels(vex_util::mfc::GetDIBits(canvas.bitmap(), header));
+    require(std::memcmp(&header, &expected.header, sizeof header) == 0);
+    require(unpacked(pixels.get(), width, height, depth, 32) == picture);
     vex_util::mfc::DumpBitmap(canvas.bitmap(), CString(("/proc/self/fd/" + std::to_string(file)).c_str()));
-    const std::size_t start = 54 + (picture.depth <= 8 ? std::size_t{4} << picture.depth : 0);
-    Bytes bytes(start + packed(picture, 32).size() + 1);
-    require(pread(file, bytes.data(), bytes.size(), 0) == static_cast<ssize_t>(bytes.size()) - 1 &&
-            bytes[0] == 'B');
-    Picture rows = unpacked(&bytes[start], picture.width, picture.height, picture.depth, 32);
-    on(rows, {0, 0, picture.width, picture.height}, [&](int x, int y, std::uint32_t value) {
-        const std::uint32_t stored = picture.at(x, picture.height - 1 - y);
-        require(value == (picture.depth == 32 ? stored & 0xFFFFFF : stored));
+    const std::size_t start = 54 + (depth <= 8 ? std::size_t{4} << depth : 0), size = start + rows.size();
+    Bytes bytes(size + 1);
+    require(pread(file, bytes.data(), size + 1, 0) == static_cast<ssize_t>(size) && bytes[0] == 'B');
+    Picture stored = unpacked(&bytes[start], width, height, depth, 32);
+    on(stored, {0, 0, width, height}, [&](int x, int y, std::uint32_t value) {
+        require(value == (picture.at(x, height - 1 - y) & (depth == 32 ? 0xFFFFFF : ~0U)));
     });
 }
 
 void check_region(Canvas& canvas, const Picture& picture, COLORREF key) {
     CRgn region;
     require(vex_util::mfc::RegionFromBitmap(region, canvas.bitmap(), key));
-    const bool is_stored = picture.depth == 16 || picture.depth == 32;
-    const Picture words = is_stored ? picture : canvas.picture(32);
-    require(holds(region, words, value_of(picture.depth == 16 ? 16 : 32, key)));
+    const int depth = picture.depth == 16 ? 16 : 32;
+    require(holds(region, picture.depth == depth ? picture : canvas.picture(32), value_of(depth, key)));
 }
 
 void check_rotation(Canvas& canvas, const Picture& picture, float angle) {
     CDC dc;
     dc.CreateCompatibleDC(nullptr);
-    require(vex_util::mfc::RotateBitmap(&dc, &canvas.bitmap(), angle) ==
-            (std::isfinite(angle) && angle != 0));
-    if (!std::isfinite(angle) || angle == 0) {
+    const bool is_turned = std::isfinite(angle) && angle != 0;
+    require(vex_util::mfc::RotateBitmap(&dc, &canvas.bitmap(), angle) == is_turned);
+    if (!is_turned) {
         return require(canvas.picture() == picture);
     }
     Settings turned;
@@ -110,7 +116,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const Picture picture = drawn_picture(in);
     Canvas canvas(picture);
     canvas.deselect();
-    check_file(canvas, picture);
+    check_rows(canvas, picture);
     check_region(canvas, picture, key);
     check_region(canvas, picture, colour_of(picture.depth, picture.pixels[0]));
     check_rotation(canvas, picture, angle);

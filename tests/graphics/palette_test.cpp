@@ -15,23 +15,17 @@ using Colours = std::array<std::uint32_t, 256>;
 
 // The search as a scan from the first colour to the last.
 int plain_closest(const Colours& colours, std::uint32_t wanted) {
-    const auto channel = [](std::uint32_t colour, int shift) {
-        return static_cast<int>(colour >> shift & 0xFF);
-    };
-    int best = 300;
-    int candidate = 0;
+    int best = 300, candidate = 0;
     for (int i = 0; i < 256; ++i) {
         const std::uint32_t entry = colours[static_cast<std::size_t>(i)];
-        if (entry == wanted) {
-            return i;
-        }
-        int distance = 0;
+        int distance = entry == wanted ? -1 : 0;
         for (const int shift : {16, 8, 0}) {
-            distance += std::abs((channel(entry, shift) - channel(wanted, shift)) * 100 / 255);
+            const int levels =
+                static_cast<int>(entry >> shift & 0xFF) - static_cast<int>(wanted >> shift & 0xFF);
+            distance += std::abs(levels * 100 / 255);
         }
         if (distance < best) {
-            best = distance;
-            candidate = i;
+            best = distance, candidate = i;
         }
     }
     return candidate;
@@ -71,12 +65,12 @@ TEST(DefaultPalette, is_made_of_basic_colours_hues_and_greys) {
 
 TEST(Palette, has_fixed_ranges) {
     using P = ColorPalette;
-    const int bounds[] = {P::GetSecondPaletteStartIndex(), P::GetSecondPaletteEndIndex(),
-                          P::GetLargePaletteStartIndex(),  P::GetLargePaletteEndIndex(),
-                          P::GetThirdPaletteStartIndex(),  P::GetThirdPaletteEndIndex()};
-    const int expected[] = {0, 8, 9, 248, 249, 254};
-    EXPECT_TRUE(std::equal(bounds, bounds + 6, expected));
-    EXPECT_TRUE(P::GetSize() == 256 && P::GetWhiteColorIndex() == 6 && sizeof(P) == 1024);
+    const std::vector<int> bounds = {P::GetSecondPaletteStartIndex(), P::GetSecondPaletteEndIndex(),
+                                     P::GetLargePaletteStartIndex(),  P::GetLargePaletteEndIndex(),
+                                     P::GetThirdPaletteStartIndex(),  P::GetThirdPaletteEndIndex(),
+                                     P::GetWhiteColorIndex()};
+    EXPECT_TRUE(bounds == std::vector({0, 8, 9, 248, 249, 254, 6}) && P::GetSize() == 256 &&
+                sizeof(P) == 1024);
 }
 
 TEST(ClosestColour, is_that_of_the_scan) {

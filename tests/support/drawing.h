@@ -7,7 +7,6 @@
 #include <array>
 #include <cmath>
 #include <cstdint>
-#include <cstdlib>
 #include <cstring>
 #include <numbers>
 #include <vector>
@@ -22,6 +21,11 @@ using Bytes = std::vector<unsigned char>;
 constexpr std::uint32_t all_ones(int depth) {
     return depth == 32 ? 0xFFFFFFFFU : (1U << depth) - 1U;
 }
+// Whether each call returned zero or a null pointer.
+template <class... Results>
+bool refused(Results... results) {
+    return (... && (results == Results{}));
+}
 // Without the bits that mean nothing.
 constexpr std::uint32_t colour_bits(int depth, std::uint32_t value) {
     return value & (depth == 16 ? 0x7FFF : all_ones(depth) & 0xFFFFFF);
@@ -32,26 +36,19 @@ struct Picture {
     int width, height, depth;
     std::vector<std::uint32_t> pixels;
 
-    Picture(int its_width, int its_height, int its_depth, std::uint32_t value = 0)
-        : width(its_width),
-          height(its_height),
-          depth(its_depth),
-          pixels(static_cast<std::size_t>(its_width) * static_cast<std::size_t>(its_height), value) {}
+    Picture(int w, int h, int its_depth, std::uint32_t value = 0)
+        : width(w), height(h), depth(its_depth), pixels(std::size_t(w) * std::size_t(h), value) {}
     bool has(std::int64_t x, std::int64_t y) const { return x >= 0 && y >= 0 && x < width && y < height; }
-    std::size_t index(std::int64_t x, std::int64_t y) const {
-        return static_cast<std::size_t>(y * width + x);
-    }
-    std::uint32_t& at(std::int64_t x, std::int64_t y) { return pixels[index(x, y)]; }
-    std::uint32_t at(std::int64_t x, std::int64_t y) const { return pixels[index(x, y)]; }
+    std::uint32_t& at(std::int64_t x, std::int64_t y) { return pixels[std::size_t(y * width + x)]; }
+    std::uint32_t at(std::int64_t x, std::int64_t y) const { return pixels[std::size_t(y * width + x)]; }
     friend bool operator==(const Picture&, const Picture&) = default;
 };
 
 template <class Next>
 Picture random_picture(int width, int height, int depth, Next& next) {
     Picture picture(width, height, depth);
-    for (std::uint32_t& value : picture.pixels) {
-        value = static_cast<std::uint32_t>(next()) & all_ones(depth);
-    }
+    std::generate(picture.pixels.begin(), picture.pixels.end(),
+                  [&] { return static_cast<std::uint32_t>(next()) & all_ones(depth); });
     return picture;
 }
 
@@ -120,8 +117,7 @@ public:
     Picture picture(int depth) const {
         Bytes bytes(packed(Picture(m_like.width, m_like.height, depth), 32).size());
         DibHeader dib(m_like.width, -m_like.height, depth);
-        GetDIBits(m_dc, m_bitmap, 0, static_cast<UINT>(m_like.height), bytes.data(), dib.info(),
-                  DIB_RGB_COLORS);
+        GetDIBits(m_dc, m_bitmap, 0, static_cast<UINT>(m_like.height), bytes.data(), dib.info(), 0);
         return unpacked(bytes.data(), m_like.width, m_like.height, depth, 32);
     }
 
@@ -148,32 +144,28 @@ inline const std::vector<COLORREF>& table(int depth) {
 }
 
 inline COLORREF colour_of(int depth, std::uint32_t value) {
-    const auto eight = [value](int shift) {
-        const int five = static_cast<int>(value >> shift & 0x1F);
-        return five << 3 | five >> 2;
-    };
-    return depth <= 8 ? table(depth)[value]
-           : depth == 16
-               ? RGB(eight(10), eight(5), eight(0))
-               : RGB(static_cast<int>(value >> 16), static_cast<int>(value >> 8), static_cast<int>(value));
+    const int v = static_cast<int>(value & 0xFFFFFF);
+    const auto eight = [v](int shift) { return (v >> shift & 0x1F) << 3 | (v >> shift & 0x1F) >> 2; };
+    return depth <= 8    ? table(depth)[value]
+           : depth == 16 ? RGB(eight(10), eight(5), eight(0))
+                         : RGB(v >> 16, v >> 8, v);
 }
 
 // The nearest value of a depth.
 inline std::uint32_t value_of(int depth, COLORREF colour) {
     const int r = GetRValue(colour), g = GetGValue(colour), b = GetBValue(colour);
-    const auto five = [](int level) { return static_cast<std::uint32_t>(level * 31 / 255.0 + 0.5); };
+    const auto five = [](int level) { return static_cast<int>(level * 31 / 255.0 + 0.5); };
     if (depth > 8) {
-        return depth == 16 ? five(r) << 10 | five(g) << 5 | five(b)
-                           : static_cast<std::uint32_t>(r << 16 | g << 8 | b);
+        return static_cast<std::uint32_t>(depth == 16 ? five(r) << 10 | five(g) << 5 | five(b)
+                                                      : r << 16 | g << 8 | b);
     }
     const auto distance = [=](COLORREF c) {
         const int x = GetRValue(c) - r, y = GetGValue(c) - g, z = GetBValue(c) - b;
         return x * x + y * y + z * z;
     };
-    const auto& colours = table(depth);
-    const auto nearest = std::min_element(colours.begin(), colours.end(),
-                                          [&](COLORREF x, COLORREF y) { return distance(x) < distance(y); });
-    return static_cast<std::uint32_t>(nearest - colours.begin());
+    const auto& all = table(depth);
+    const auto is_nearer = [&](COLORREF x, COLORREF y) { return distance(x) < distance(y); };
+    return static_cast<std::uint32_t>(std::min_element(all.begin(), all.end(), is_nearer) - all.begin());
 }
 
 // What a context is set to.
@@ -257,14 +249,13 @@ inline Picture copied(const Picture& to, const Block& b, const Picture& from, DW
         const double px = x + 0.5 - t.eDx, py = y + 0.5 - t.eDy;
         const double u = (px * t.eM22 - py * t.eM21) / determinant,
                      v = (py * t.eM11 - px * t.eM12) / determinant;
-        const double i = std::floor(u) - b.x, j = std::floor(v) - b.y, column = b.source_x + i,
-                     row = b.source_y + j;
-        const bool is_in = i >= 0 && j >= 0 && i < b.width && j < b.height;
+        const double i = std::floor(u) - b.x, j = std::floor(v) - b.y;
+        const double column = b.source_x + i, row = b.source_y + j;
         if (std::min(std::fabs(u - std::round(u)), std::fabs(v - std::round(v))) < margin) {
             value = actual->at(x, y);
-        } else if (is_in && column >= 0 && row >= 0 && column < from.width && row < from.height) {
-            const std::uint32_t pixel = from.at(static_cast<int>(column), static_cast<int>(row)),
-                                before = value;
+        } else if (i >= 0 && j >= 0 && i < b.width && j < b.height && column >= 0 && row >= 0 &&
+                   column < from.width && row < from.height) {
+            const std::uint32_t pixel = from.at(int(column), int(row)), before = value;
             const std::uint32_t source = arriving(pixel, from.depth, to.depth, s, source_background);
             value = 0;
             for (int bit = 0; bit < to.depth; ++bit) {  // by the operation's table: source * 2 + destination
@@ -285,11 +276,10 @@ inline Picture keyed(const Picture& to, const Stretch& s, const Picture& from, C
     Picture result = to;
     on(result, {0, 0, to.width, to.height}, [&](int x, int y, std::uint32_t& value) {
         const std::int64_t i = std::int64_t{x} - s.x, j = std::int64_t{y} - s.y;
-        if (i < 0 || j < 0 || i >= s.width || j >= s.height || s.source_width <= 0 || s.source_height <= 0) {
-            return;
-        }
-        const std::int64_t column = s.source_x + (2 * i + 1) * s.source_width / (2LL * s.width);
-        const std::int64_t row = s.source_y + (2 * j + 1) * s.source_height / (2LL * s.height);
+        const bool is_in =
+            i >= 0 && j >= 0 && i < s.width && j < s.height && s.source_width > 0 && s.source_height > 0;
+        const std::int64_t column = is_in ? s.source_x + (2 * i + 1) * s.source_width / (2LL * s.width) : -1;
+        const std::int64_t row = is_in ? s.source_y + (2 * j + 1) * s.source_height / (2LL * s.height) : -1;
         if (from.has(column, row) &&
             colour_bits(from.depth, from.at(column, row)) != value_of(from.depth, key)) {
             value = arriving(from.at(column, row), from.depth, to.depth, settings, source_background);
@@ -301,28 +291,28 @@ inline Picture keyed(const Picture& to, const Stretch& s, const Picture& from, C
 // Whether a region holds the pixels that are not `out`, in its one form: runs of rows, joined where rows are
 // equal.
 inline bool holds(HRGN region, const Picture& picture, std::uint32_t out = 0) {
-    std::vector<CRect> rectangles, above, row;
+    const auto is_in = [&](int x, int y) { return picture.has(x, y) && picture.at(x, y) != out; };
+    std::vector<CRect> rectangles;
     CRect box, its_box(9, 9, 9, 9);
     bool is_same = true;
-    for (int y = -1; y <= picture.height; ++y, row.clear()) {
+    std::ptrdiff_t above = 0;  // the first rectangle of the row above
+    for (int y = -1; y <= picture.height; ++y) {
+        bool is_joined = true;
         for (int x = -1; x <= picture.width; ++x) {
-            const bool is_in = picture.has(x, y) && picture.at(x, y) != out;
-            is_same &= PtInRegion(region, x, y) == is_in;
-            if (is_in && (row.empty() || row.back().right != x)) {
-                row.emplace_back(x, y, x, y);
+            is_same &= PtInRegion(region, x, y) == is_in(x, y);
+            is_joined &= is_in(x, y) == is_in(x, y - 1);
+        }
+        above = is_joined ? above : std::ssize(rectangles);
+        for (int x = 0; x < picture.width && !is_joined; ++x) {
+            if (is_in(x, y) && !is_in(x - 1, y)) {
+                rectangles.emplace_back(x, y, x, y);
             }
-            if (is_in) {
-                row.back().right = x + 1;
+            if (is_in(x, y)) {
+                rectangles.back().right = x + 1;
             }
         }
-        const auto is_below = [](const CRect& a, const CRect& b) {
-            return a.left == b.left && a.right == b.right;
-        };
-        if (!std::equal(row.begin(), row.end(), above.begin(), above.end(), is_below)) {
-            rectangles.insert(rectangles.end(), above.begin(), above.end());
-            above = row;
-        }
-        std::for_each(above.begin(), above.end(), [&](CRect& r) { r.bottom = y + 1, box |= r; });
+        std::for_each(rectangles.begin() + above, rectangles.end(),
+                      [&](CRect& r) { r.bottom = y + 1, box |= r; });
     }
     const std::size_t bytes = rectangles.size() * sizeof(RECT);
     const int kind = rectangles.size() > 1 ? COMPLEXREGION : rectangles.empty() ? NULLREGION : SIMPLEREGION;

@@ -82,12 +82,14 @@ void check_drawing(Input& in) {
     Canvas canvas(to), source(from);
     const RECT r = {in.coordinate(), in.coordinate(), in.coordinate(), in.coordinate()};
     const int diameter = in.coordinate();
-    const COLORREF corner = in.word(), start = in.word();
+    const COLORREF corner = in.byte() % 4 == 0 ? 0x808080 : in.word(), start = in.word();
     const auto channel = [start](int shift) { return static_cast<WORD>((start >> shift & 0xFF) << 8); };
     const TRIVERTEX a = {r.left, r.top, channel(0), channel(8), channel(16), 0};
     const TRIVERTEX b = {r.right, r.bottom, WORD(a.Red / 2), WORD(a.Green / 2), WORD(a.Blue / 2), 0};
     const bool is_across = in.byte() % 2 == 0;
+    HGDIOBJ const brush = SelectObject(canvas, GetStockObject(GRAY_BRUSH));
     _gradientfill(canvas, r.left, r.top, r.right, r.bottom, diameter, corner, start, 2.0F, is_across ? 0 : 1);
+    require(SelectObject(canvas, brush) == GetStockObject(GRAY_BRUSH));
     if (code == 5) {
         gradient(to, a, b, is_across);
     }

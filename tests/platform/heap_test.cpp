@@ -53,7 +53,7 @@ TEST(Heap, maximum_bounds_what_is_mapped) {
         EXPECT_EQ(error_of(heap.take(pages)), ERROR_NOT_ENOUGH_MEMORY);
         Blocks blocks = heap.take_up_to(SIZE_MAX, 100);
         EXPECT_EQ(heap.report().mapped, pages);
-        EXPECT_GE(blocks.size(), pages / 120) << "most of it is usable";
+        EXPECT_GE(blocks.size(), pages / 130) << "most of it is usable";
         std::shuffle(blocks.begin(), blocks.end(), std::mt19937(1));
         EXPECT_TRUE(heap.free_all(blocks));
         void* const whole = heap.take(pages - 8 * (maximum < MIB ? 8 : KIB));
@@ -109,7 +109,9 @@ TEST(Heap, refuses_what_is_no_live_block) {
     EXPECT_TRUE(heap.free_all({nullptr, second, third, large}));
     // What looks like a head in a caller's data, at an address without the alignment of blocks.
     const auto copy_head = [first](int offset) __attribute__((no_sanitize("address"))) {
-        std::copy_n(first - 8, 8, first + 8 + offset);
+        for (int i = 8; i < 16; ++i) {  // no call that a sanitizer watches
+            first[offset + i] = first[i - 16];
+        }
         return first + 16 + offset;
     };
     for (void* wrong : Blocks{nullptr, second, third, large, other.take(100), &local}) {
@@ -117,9 +119,9 @@ TEST(Heap, refuses_what_is_no_live_block) {
         EXPECT_EQ(error_of(heap.resize(wrong, 10)), ERROR_INVALID_PARAMETER);
     }
     for (const int offset : {-32, -15, 0, 1, 2, 4, 8}) {
-        EXPECT_EQ(error_of(heap.free(offset > 0 ? copy_head(offset) : first + 16 + offset)),
-                  ERROR_INVALID_PARAMETER)
-            << offset;
+        void* const wrong = offset > 0 ? copy_head(offset) : first + 16 + offset;
+        EXPECT_EQ(error_of(heap.free(wrong)), ERROR_INVALID_PARAMETER) << offset;
+        EXPECT_EQ(error_of(heap.resize(wrong, 10)), ERROR_INVALID_PARAMETER) << offset;
     }
     EXPECT_EQ(heap.report().live_blocks, 1U);
 }

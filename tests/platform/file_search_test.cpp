@@ -5,14 +5,18 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
+#include <cerrno>
+
 #include "src/platform/disk/wildcard.h"
 #include "src/platform/ticks.h"
 #include "tests/platform/error_of.h"
 #include "tests/support/scratch_folder.h"
+#include "tests/support/system_failures.h"
 
 namespace {
 
 using namespace basalt::platform;
+using basalt::test::SystemFailure;
 using WideNames = std::set<std::wstring>;
 
 struct FileSearch : testing::Test {
@@ -93,6 +97,20 @@ TEST_F(FileSearch, describes_sizes_and_times) {
     EXPECT_TRUE(ticks_of(FIRST, 100) == 1 && ticks_of(FIRST - 1, 999'999'999) == 0);
     EXPECT_EQ(ticks_of(LAST + 1, 0), 9'223'372'036'840'000'000);
     EXPECT_EQ(ticks_of(INT64_MAX, 999'999'999), 9'223'372'036'849'999'999);
+}
+
+TEST_F(FileSearch, reports_being_out_of_memory_at_a_link_and_its_target) {
+    std::filesystem::create_symlink("nowhere", folder / "link");
+    for (const wchar_t* const pattern : {L"lin*", L"link"}) {
+        bool fails = true;
+        for (int n = 1; fails; ++n) {
+            WIN32_FIND_DATAW entry;
+            const SystemFailure failure(n, SystemFailure::Then::RECOVERS, ENOMEM);
+            const bool found = FindClose(FindFirstFileW(folder.wide(pattern).c_str(), &entry)) != 0;
+            fails = SystemFailure::struck();
+            EXPECT_NE(found, fails) << pattern << n;
+        }
+    }
 }
 
 }  // namespace

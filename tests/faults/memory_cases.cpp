@@ -120,6 +120,12 @@ struct ReserveRow {
     bool holds(bool done) const { return !done || Pages::Free(base, 0, RELEASE, 0) != 0; }
 };
 
+struct ReleaseRow : ReserveRow {
+    ReleaseRow() { ReserveRow::act(); }
+    bool act() noexcept { return Pages::Free(base, 0, RELEASE, 0) != 0; }
+    bool holds(bool) const { return true; }
+};
+
 // Drops the second of three pages, and commits all.
 struct PagesRow : ReserveRow {
     char* page = nullptr;
@@ -170,6 +176,7 @@ void check_memory() {
     run<AbandonedRow>("abandoned files");
     run<ResizeRow>("vlVmBuffer::ReSize");
     run<ReserveRow>("vlSharedMemoryAllocator, a reservation");
+    run<ReleaseRow>("vlSharedMemoryAllocator, a release");
     run<PagesRow>("vlSharedMemoryAllocator, pages");
     run<MappedRow>("vlMMapFileAllocator::Alloc");
     run<UnmappedRow>("vlMMapFileAllocator::Free");

@@ -17,12 +17,19 @@ using basalt::test::report_of;
 using vex_lib::vlSharedMemoryHeap;
 using vex_lib::vlWinHeapAllocator;
 
-TEST(Allocators, heaps_report_each_failure_but_that_of_realloc_and_keep_its_code) {
+TEST(Allocators, a_report_has_three_pieces_and_keeps_the_code) {
     const DebugOutput output;
-    const auto expect_report = [&](DWORD code) {
+    for (const DWORD code : {ERROR_INVALID_HANDLE, DWORD{0x20001234}}) {
+        SetLastError(code);
+        vex_lib::ReportLastError();
         EXPECT_EQ(GetLastError(), code);
         EXPECT_EQ(output.take(), report_of(code));
-    };
+    }
+}
+
+TEST(Allocators, heaps_report_each_failure_but_that_of_realloc) {
+    const DebugOutput output;
+    const auto expect_report = [&](DWORD code) { EXPECT_EQ(output.take(), report_of(code)); };
     vlWinHeapAllocator heap(64 * 1024);
     EXPECT_EQ(heap.Alloc(64 * 1024), nullptr);
     expect_report(ERROR_NOT_ENOUGH_MEMORY);

@@ -15,12 +15,10 @@ template <class Four, class One>
 std::size_t for_each(std::size_t count, const Four& four, const One& one) {
     std::size_t refused = 0;
     for (std::size_t i = 0; i < count;) {
-#if BASALT_HAS_FOUR_PLACES
-        if (count - i >= 4 && __builtin_cpu_supports("avx2") != 0 && four(i)) {
+        if (count - i >= 4 && geo::has_four_places() && four(i)) {
             i += 4;
             continue;
         }
-#endif
         for (const std::size_t end = count - i < 4 ? count : i + 4; i < end; ++i) {
             refused += one(i) ? 1 : 0;
         }

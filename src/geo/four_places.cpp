@@ -4,7 +4,7 @@
 
 #include "src/geo/four_places.h"
 
-#if BASALT_HAS_FOUR_PLACES
+#if defined(__x86_64__)
 
 #include <immintrin.h>
 
@@ -219,6 +219,24 @@ BASALT_INLINE bool direct(const geo_llh* starts, const double* azimuths, const d
 [[gnu::target("avx2")]] bool direct_four(const geo_llh* starts, const double* azimuths,
                                          const double* distances, geo_llh* ends, double* final_azimuths) {
     return direct(starts, azimuths, distances, ends, final_azimuths);
+}
+
+}  // namespace basalt::geo
+
+#else
+
+namespace basalt::geo {
+
+bool to_cartesian_four(const geo_llh*, geo_vector*) {
+    return false;
+}
+
+bool to_geodetic_four(const geo_vector*, geo_llh*, double) {
+    return false;
+}
+
+bool direct_four(const geo_llh*, const double*, const double*, geo_llh*, double*) {
+    return false;
 }
 
 }  // namespace basalt::geo

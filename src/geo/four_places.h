@@ -6,9 +6,6 @@
 
 #include "basalt/geo/records.h"
 
-#if defined(__x86_64__)
-#define BASALT_HAS_FOUR_PLACES 1
-
 namespace basalt::geo {
 
 bool to_cartesian_four(const geo_llh* in, geo_vector* out);
@@ -16,10 +13,15 @@ bool to_geodetic_four(const geo_vector* in, geo_llh* out, double tolerance);
 bool direct_four(const geo_llh* starts, const double* azimuths, const double* distances, geo_llh* ends,
                  double* final_azimuths);
 
-}  // namespace basalt::geo
-
+/// Whether this processor runs them; they must not be called elsewhere.
+inline bool has_four_places() {
+#if defined(__x86_64__)
+    return __builtin_cpu_supports("avx2") != 0;
 #else
-#define BASALT_HAS_FOUR_PLACES 0
+    return false;
 #endif
+}
+
+}  // namespace basalt::geo
 
 #endif

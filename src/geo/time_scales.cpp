@@ -62,9 +62,10 @@ void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std
     month = static_cast<std::uint16_t>(j + 2 - 12 * k);
     day = static_cast<std::uint16_t>(l - 2447 * j / 80);
     constexpr std::uint32_t WEEKDAY_OF_FIRST = 4;  // Thursday, the day that is counted as 0
-    dayOfWeek = static_cast<std::uint16_t>(whole_year >= 1 && whole_year <= 65535
-                                               ? (counted + WEEKDAY_OF_FIRST) % DAYS_PER_WEEK
-                                               : day_of_week_by_date(year, month, day));
+    dayOfWeek =
+        static_cast<std::uint16_t>(whole_year >= 1 && whole_year <= 65535
+                                       ? (counted + WEEKDAY_OF_FIRST) % DAYS_PER_WEEK
+                                       : static_cast<std::uint32_t>(day_of_week_by_date(year, month, day)));
 }
 
 void _mjd2gps(std::uint32_t mjd, double secondsOfDay, std::uint16_t& week, double& secondsOfWeek) {

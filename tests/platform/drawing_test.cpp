@@ -190,6 +190,9 @@ TEST(Rows, need_a_header_that_fits) {
     expected.header.biSizeImage = 24;
     EXPECT_EQ(std::memcmp(&question.header, &expected.header, sizeof expected.header), 0);
     EXPECT_EQ(sizes.header.biSizeImage, 24U) << "of all rows, each of 12 bytes";
+    SetLastError(0);
+    EXPECT_EQ(GetDIBits(canvas, canvas.bitmap(), 2, 1, bits, expected.info(), DIB_RGB_COLORS), 0);
+    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER) << "no such row";
 }
 
 }  // namespace

@@ -80,7 +80,8 @@ TEST(Codec, writes_a_bitmap_by_its_one_encoder_or_leaves_no_file) {
     EXPECT_TRUE(folder.names().empty());
     EXPECT_TRUE(refused(GdipGetImageEncodersSize(&count, nullptr), GdipGetImageEncoders(2, size, &encoder),
                         GdipCreateBitmapFromHBITMAP(nullptr, nullptr, &image),
-                        GdipCreateBitmapFromHBITMAP(bitmap, nullptr, nullptr), GdipDisposeImage(nullptr),
+                        GdipCreateBitmapFromHBITMAP(bitmap, nullptr, nullptr),
+                        GdipCreateBitmapFromHBITMAP(bitmap, &count, &image), GdipDisposeImage(nullptr),
                         GdipSaveImageToFile(image, name.c_str(), &ImageFormatBMP, nullptr),
                         GdipSaveImageToFile(image, nullptr, &BMP, nullptr),
                         GdipSaveImageToFile(nullptr, name.c_str(), &BMP, nullptr),

@@ -121,8 +121,10 @@ TEST(MemoryMap, clean_up_deletes_what_no_process_holds) {
 pid_t child_with_blocks(int count) {
     const pid_t child = fork();
     if (child == 0) {
+        static CMemoryMap* s_blocks[40];  // reachable for the leak search
         for (; count > 0; --count) {
-            bytes(*new CMemoryMap(SIZE))[SIZE - 1] = 'x';
+            s_blocks[count - 1] = new CMemoryMap(SIZE);
+            bytes(*s_blocks[count - 1])[SIZE - 1] = 'x';
         }
         raise(SIGSTOP), std::exit(0);
     }

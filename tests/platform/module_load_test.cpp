@@ -56,7 +56,7 @@ auto footprint() {
     return std::tuple(pages, maps, basalt::test::open_descriptors());
 }
 
-TEST(Module, a_thousand_loads_leave_nothing_behind) {
+TEST(ModuleLoad, a_thousand_loads_leave_nothing_behind) {
     auto before = footprint();
     for (int round = 0; round < 1010; ++round) {
         load_use_and_unload();
@@ -74,7 +74,7 @@ struct EarlyUser {
 };
 [[gnu::init_priority(1000)]] const EarlyUser early_user;
 
-TEST(Module, the_shared_heap_serves_the_hosts_own_statics) {
+TEST(ModuleLoad, the_shared_heap_serves_the_hosts_own_statics) {
     EXPECT_TRUE(early_user.heap == vlSharedMemoryHeap::GetHeapHandle() && early_user.block != nullptr);
     vlSharedMemoryHeap::Free(early_user.block);
     EXPECT_EQ(early_user.text, L"\u00e9 early");

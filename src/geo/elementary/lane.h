@@ -3,7 +3,6 @@
 #ifndef BASALT_SRC_GEO_ELEMENTARY_LANE_H
 #define BASALT_SRC_GEO_ELEMENTARY_LANE_H
 
-#include <bit>
 #include <cfloat>
 #include <cstdint>
 #include <type_traits>
@@ -27,14 +26,15 @@ using Integers = std::conditional_t<std::is_same_v<Lane, double>, std::int64_t,
 
 inline constexpr std::int64_t SIGN = INT64_MIN;
 
+/// The builtin is no call without optimisation, unlike std::bit_cast: vectors of 32 bytes never cross a call.
 template <typename Lane>
 BASALT_INLINE Integers<Lane> bits_of(const Lane& x) {
-    return std::bit_cast<Integers<Lane>>(x);
+    return __builtin_bit_cast(Integers<Lane>, x);
 }
 
 template <typename Lane>
 BASALT_INLINE Lane from_bits(const Integers<Lane>& bits) {
-    return std::bit_cast<Lane>(bits);
+    return __builtin_bit_cast(Lane, bits);
 }
 
 template <typename Lane>

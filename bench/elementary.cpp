@@ -97,14 +97,14 @@ void sizes(benchmark::internal::Benchmark* row) {
 
 BENCHMARK(sin_cos_basalt)->Name("sin_cos/basalt")->Apply(sizes);
 BENCHMARK(sin_cos_libc)->Name("sin_cos/libc")->Apply(sizes);
-BENCHMARK(sin_cos_two)->Name("sin_cos/basalt_two");
-BENCHMARK(sin_cos_four)->Name("sin_cos/basalt_four");
+BENCHMARK(sin_cos_two)->Name("sin_cos_of_two/basalt");
+BENCHMARK(sin_cos_four)->Name("sin_cos_of_four/basalt");
 BENCHMARK(tan_basalt)->Name("tan/basalt")->Apply(sizes);
 BENCHMARK(tan_libc)->Name("tan/libc")->Apply(sizes);
 BENCHMARK(atan2_basalt)->Name("atan2/basalt");
 BENCHMARK(atan2_libc)->Name("atan2/libc");
-BENCHMARK(atan2_two)->Name("atan2/basalt_two");
-BENCHMARK(atan2_four)->Name("atan2/basalt_four");
+BENCHMARK(atan2_two)->Name("atan2_of_two/basalt");
+BENCHMARK(atan2_four)->Name("atan2_of_four/basalt");
 
 }  // namespace
 

@@ -11,8 +11,11 @@
 #include <vector>
 
 #include "basalt/geo.h"
+#include "src/geo/elementary/elementary.h"
 
 namespace plain {
+
+namespace elementary = basalt::geo::elementary;  // ties within the last place follow its bits
 
 inline constexpr double PI = std::numbers::pi;
 inline constexpr double INF = std::numeric_limits<double>::infinity();
@@ -47,11 +50,11 @@ inline int point_on_line(const geo_nee& a, const geo_nee& b, const geo_nee& p, d
     const double pi = 3.141592653589793;
     const double theta = geo_normalised_bearing(geo_grid_bearing(a, b) - geo_grid_bearing(a, p));
     const double d = geo_horz_dist(a, p);
-    const double along = std::cos(theta > pi ? 6.283185307179586 - theta : theta) * d;
+    const double along = elementary::cos(theta > pi ? 6.283185307179586 - theta : theta) * d;
     if (along < -tolerance || along > geo_horz_dist(a, b) + tolerance) {
         return 0;
     }
-    const double offset = std::fabs(std::sin(theta > pi ? theta - 6.283185307179586 : theta) * d);
+    const double offset = std::fabs(elementary::sin(theta > pi ? theta - 6.283185307179586 : theta) * d);
     return offset <= tolerance ? 1 : 0;
 }
 

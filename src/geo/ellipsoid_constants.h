@@ -19,8 +19,8 @@ inline constexpr int MOST_PASSES = 10;
 inline constexpr double FLAT = 1.0 - ECCENTRICITY2;
 inline constexpr double AXIS_PULL = SEMI_MAJOR_AXIS * ECCENTRICITY2;
 
-/// Of Vincenty's series.
-inline constexpr double VINCENTY_FLATTENING = 0.0033528106647474805;
+/// Of the geodesics.
+inline constexpr double FLATTENING = 0.0033528106647474805;
 inline constexpr double ONE_LESS_FLATTENING = 0.9966471893352525;
 inline constexpr double SEMI_MINOR_AXIS = 6356752.3142;
 /// a^2 - b^2 and b^2, square metres.

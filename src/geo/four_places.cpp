@@ -195,10 +195,10 @@ BASALT_INLINE bool direct(const geo_llh* starts, const double* azimuths, const d
         !is_usual_direction(sin_alpha, -t)) {
         return false;
     }
-    const Four k = FLATTENING_16TH * cos2_alpha * (4.0 + VINCENTY_FLATTENING * (4.0 - 3.0 * cos2_alpha));
+    const Four k = FLATTENING_16TH * cos2_alpha * (4.0 + FLATTENING * (4.0 - 3.0 * cos2_alpha));
     const Four change =
-        arctangent(lambda_y, lambda_x) - (1.0 - k) * VINCENTY_FLATTENING * sin_alpha *
-                                             (sigma + k * sine * (c + k * cosine * (2.0 * c * c - 1.0)));
+        arctangent(lambda_y, lambda_x) -
+        (1.0 - k) * FLATTENING * sin_alpha * (sigma + k * sine * (c + k * cosine * (2.0 * c * c - 1.0)));
     scatter(arctangent(sin_alpha, -t), final_azimuths, 1);
     scatter(arctangent(end_y, end_x), &ends->latitude, 3);
     scatter(longitude + change, &ends->longitude, 3);

@@ -22,7 +22,8 @@ constexpr int MOST_PASSES = 60;
 /// the difference is 1e-10 m.
 constexpr double SHORT_ARC = 1.6e-5;
 
-/// The problem brought to start latitude <= 0, |end latitude| <= |start latitude|, longitude in [0, pi].
+/// The problem with signs and order changed so that start latitude <= 0, |end latitude| <= |start latitude|,
+/// longitude in [0, pi].
 struct Problem {
     Direction beta1, beta2;  ///< reduced latitudes
     double longitude;        ///< from start to end, radians
@@ -80,7 +81,7 @@ struct Trial {
         const double omega =
             angle_of(turn({sin_alpha0 * s1.sine, s1.cosine}, {sin_alpha0 * s2.sine, s2.cosine}));
         sigma = angle_of(arc);
-        const double k2 = SECOND_ECCENTRICITY_2 * cos2_alpha0;
+        const double k2 = SECOND_ECCENTRICITY2 * cos2_alpha0;
         epsilon = epsilon_of(k2);
         longitude =
             omega - FLATTENING * sin_alpha0 * longitude_series(epsilon).between(sigma1, sigma2, sigma);
@@ -116,7 +117,7 @@ Direction antipodal_azimuth(const Problem& p) {
 
 Solution along_meridian(const Problem& p, const Direction& azimuth1) {
     const Direction sigma1 = {p.beta1.sine, azimuth1.cosine < 0.0 ? -p.beta1.cosine : p.beta1.cosine};
-    const SineSeries<6> series = distance_series(epsilon_of(SECOND_ECCENTRICITY_2));
+    const SineSeries<6> series = distance_series(epsilon_of(SECOND_ECCENTRICITY2));
     const double sigma = angle_of(turn(sigma1, p.beta2));
     return {POLAR_RADIUS * series.between(sigma1, p.beta2, sigma), azimuth1, {0.0, 1.0}};
 }
@@ -125,11 +126,11 @@ Solution solve(const Problem& p) {
     const Direction& b1 = p.beta1;
     const Direction& b2 = p.beta2;
     if (b1.sine == 0.0 && b2.sine == 0.0 && p.longitude <= AXIS_RATIO * PI) {
-        return {EQUATORIAL_RADIUS * p.longitude, {1.0, 0.0}, {1.0, 0.0}};
+        return {SEMI_MAJOR_AXIS * p.longitude, {1.0, 0.0}, {1.0, 0.0}};
     }
     // The sphere with the curvature at the mean latitude, eq. 48 to 51; 1 - cos(omega) without cancellation.
     const double mean = (b1.cosine + b2.cosine) / 2.0;
-    const double scale = std::sqrt(1.0 - ECCENTRICITY_2 * mean * mean);
+    const double scale = std::sqrt(1.0 - EXACT_ECCENTRICITY2 * mean * mean);
     const elementary::SineCosine omega = elementary::sin_cos(std::min(p.longitude / scale, PI));
     const double versine =
         omega.cosine > 0.0 ? omega.sine * omega.sine / (1.0 + omega.cosine) : 1.0 - omega.cosine;
@@ -139,7 +140,7 @@ Solution solve(const Problem& p) {
     const Direction arc = {std::sqrt(z1.sine * z1.sine + z1.cosine * z1.cosine),
                            b1.sine * b2.sine + b1.cosine * b2.cosine * omega.cosine};
     if (arc.cosine > 0.0 && arc.sine < SHORT_ARC) {
-        return {EQUATORIAL_RADIUS * scale * angle_of(arc), z1, z2};
+        return {SEMI_MAJOR_AXIS * scale * angle_of(arc), z1, z2};
     }
     const bool is_opposite =
         arc.cosine < 0.0 && arc.sine < 6.0 * THIRD_FLATTENING * PI * b1.cosine * b1.cosine;
@@ -163,7 +164,7 @@ Solution solve(const Problem& p) {
             // What is missed of the longitude lengthens the line by its part along it.
             const double length =
                 distance_series(trial.epsilon).between(trial.sigma1, trial.sigma2, trial.sigma);
-            const double beyond = EQUATORIAL_RADIUS * b2.cosine * trial.azimuth2.sine * miss;
+            const double beyond = SEMI_MAJOR_AXIS * b2.cosine * trial.azimuth2.sine * miss;
             return {POLAR_RADIUS * length - beyond, azimuth, trial.azimuth2};
         }
         best = std::min(best, size);

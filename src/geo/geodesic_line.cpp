@@ -59,11 +59,10 @@ LineEnd GeodesicLine::at(double distance) const {
     const double t = m_sin_u * sine - m_cos_u * cosine * m_cos_azimuth;
     const double lambda =
         elementary::atan2(sine * m_sin_azimuth, m_cos_u * cosine - m_sin_u * sine * m_cos_azimuth);
-    const double k =
-        FLATTENING_16TH * m_cos2_alpha * (4.0 + VINCENTY_FLATTENING * (4.0 - 3.0 * m_cos2_alpha));
+    const double k = FLATTENING_16TH * m_cos2_alpha * (4.0 + FLATTENING * (4.0 - 3.0 * m_cos2_alpha));
     return {m_sin_alpha, -t, m_sin_u * cosine + m_cos_u * sine * m_cos_azimuth,
             ONE_LESS_FLATTENING * std::sqrt(m_sin_alpha * m_sin_alpha + t * t),
-            lambda - (1.0 - k) * VINCENTY_FLATTENING * m_sin_alpha *
+            lambda - (1.0 - k) * FLATTENING * m_sin_alpha *
                          (sigma + k * sine * (c + k * cosine * (2.0 * c * c - 1.0)))};
 }
 

@@ -7,14 +7,15 @@
 #include <array>
 #include <cmath>
 
+#include "src/geo/ellipsoid_constants.h"
+
 namespace basalt::geo {
 
-inline constexpr double EQUATORIAL_RADIUS = 6378137.0;       // metres
-inline constexpr double FLATTENING = 0.0033528106647474805;  // 1 / 298.257223563
-inline constexpr double AXIS_RATIO = 1.0 - FLATTENING;       // b / a
-inline constexpr double POLAR_RADIUS = EQUATORIAL_RADIUS * AXIS_RATIO;
-inline constexpr double ECCENTRICITY_2 = FLATTENING * (2.0 - FLATTENING);
-inline constexpr double SECOND_ECCENTRICITY_2 = ECCENTRICITY_2 / (AXIS_RATIO * AXIS_RATIO);
+/// Computed to the last place, unlike the rounded literals of the conversions.
+inline constexpr double AXIS_RATIO = 1.0 - FLATTENING;  // b / a
+inline constexpr double POLAR_RADIUS = SEMI_MAJOR_AXIS * AXIS_RATIO;
+inline constexpr double EXACT_ECCENTRICITY2 = FLATTENING * (2.0 - FLATTENING);
+inline constexpr double SECOND_ECCENTRICITY2 = EXACT_ECCENTRICITY2 / (AXIS_RATIO * AXIS_RATIO);
 inline constexpr double THIRD_FLATTENING = FLATTENING / (2.0 - FLATTENING);
 
 /// An angle by its sine and cosine.

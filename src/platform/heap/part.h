@@ -64,10 +64,6 @@ private:
     bool drop_free_region(Block* block);
     bool unmap_region(const Region& region);
 
-    // Idle regions, those without a live block, are kept up to this: page faults of new ones cost more than
-    // all the rest of an allocation.
-    static constexpr std::size_t MOST_IDLE = std::size_t{32} << 20;
-
     // The members that every allocation uses come first.
     std::uint64_t m_tag;  // of this heap's live blocks
     Lock m_lock;

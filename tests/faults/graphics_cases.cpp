@@ -60,11 +60,6 @@ struct ScaledCopyOntoItself : TransparentCopyOntoItself {
     }
 };
 
-struct RoundedGradient : Drawing {
-    StoredOsCode os{5};
-    bool act() noexcept { return _gradientfill(canvas, 0, 0, 30, 20, 8, 0xFF, 0x80FF80, 2.0F, 0), true; }
-};
-
 struct MaskCopy : Drawing {
     StoredOsCode os{2};
     bool act() noexcept {
@@ -104,7 +99,6 @@ void check_graphics() {
     run<Combination>("CombineRgn");
     run<TransparentCopyOntoItself>("TransparentBlt within a surface", Handles::FAIL);
     run<ScaledCopyOntoItself>("BitBlt within a surface", Handles::FAIL);
-    run<RoundedGradient>("_gradientfill", Handles::FAIL);
     run<MaskCopy>("_transparentblt by masks", Handles::FAIL);
     run<Rotation>("mfc::RotateBitmap", Handles::FAIL);
     run<RegionOfBitmap>("mfc::RegionFromBitmap", Handles::FAIL);

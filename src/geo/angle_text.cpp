@@ -86,15 +86,16 @@ std::optional<double> parse_angle(std::string_view text) noexcept {
         radians += *number / UNITS[part] * RADIANS_PER_DEGREE;
         const bool is_marked = (part == 0 && reader.take("\xC2\xB0")) || reader.take_any(MARKS[part]) != 0;
         const bool is_separated = !is_marked && reader.take_any("-:") != 0;
-        const bool is_spaced = reader.skip_spaces() || is_marked || is_separated;
+        bool may_continue = reader.skip_spaces() || is_marked || is_separated;
         if (letter == 0 && sign == 0 && !is_separated) {
             letter = reader.take_any(LETTERS);
             reader.skip_spaces();
+            may_continue = may_continue && letter == 0;
         }
         if (reader.is_over() && !is_separated) {
             break;
         }
-        if (part == 2 || has_point || !is_spaced) {
+        if (part == 2 || has_point || !may_continue) {
             return std::nullopt;
         }
     }

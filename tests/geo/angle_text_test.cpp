@@ -23,7 +23,7 @@ TEST(AngleText, ReadsDegreesMinutesSecondsWithSignOrHemisphere) {
     }
     for (const char* const text :
          {"359-59-60", "", "-", "12-30-", "12-60", "12.5-30", "90.001N", "180.5E", "360.1", "-5S",
-          "12-30-00x", "1e2", "12'30", "1..2", "NAN", "12-30-18-5", "1,5", "S12S"}) {
+          "12-30-00x", "1e2", "12'30", "1..2", "NAN", "12-30-18-5", "1,5", "S12S", "12 N 30"}) {
         EXPECT_EQ(parse_angle(text), std::nullopt) << text;
     }
 }

@@ -1,15 +1,9 @@
-#include "basalt/geo.h"
+#include "basalt/geo/plane.h"
 #include "src/geo/polygon_edges.h"
 
 using namespace basalt::geo;
 
 namespace {
-
-#if BASALT_HAS_AVX2_FORM
-bool can_use_avx2() {
-    return __builtin_cpu_supports("avx2") != 0;
-}
-#endif
 
 template <VertexTest TEST>
 int crossing_parity(int n, const geo_nee* polygon, const geo_nee& point) {

@@ -8,7 +8,7 @@
 #include <cmath>
 #include <cstddef>
 
-#include "basalt/geo.h"
+#include "basalt/geo/plane.h"
 
 #if defined(__x86_64__)
 #define BASALT_HAS_AVX2_FORM 1
@@ -92,6 +92,10 @@ inline bool is_in_a_band_portable(int n, const geo_nee* polygon, const geo_nee& 
 }
 
 #if BASALT_HAS_AVX2_FORM
+
+inline bool can_use_avx2() {
+    return __builtin_cpu_supports("avx2") != 0;
+}
 
 #define BASALT_AVX2 [[gnu::target("avx2")]]
 #define BASALT_AVX2_INLINE [[gnu::target("avx2"), gnu::always_inline]] inline

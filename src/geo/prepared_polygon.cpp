@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <limits>
+#include <stdexcept>
 
 #include "src/geo/polygon_edges.h"
 
@@ -113,7 +114,7 @@ struct PolygonQuads {
 
     static Found find(const Quad* begin, const Quad* end, const geo_nee& point) {
 #if BASALT_HAS_AVX2_FORM
-        if (__builtin_cpu_supports("avx2") != 0) {
+        if (can_use_avx2()) {
             return find_avx2(begin, end, point);
         }
 #endif
@@ -144,6 +145,10 @@ std::size_t PreparedPolygon::bucket_of(double north) const noexcept {
 PreparedPolygon::PreparedPolygon(const geo_nee* vertices, std::size_t count) {
     if (count == 0) {
         return;
+    }
+    // Positions of quads, fewer than twice the vertices, have 32 bits.
+    if (count > static_cast<std::size_t>(std::numeric_limits<int>::max())) {
+        throw std::length_error("too many vertices for a prepared polygon");
     }
     const Range range = range_of(vertices, count);
     double covered = 0.0;

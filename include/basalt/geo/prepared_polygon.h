@@ -24,8 +24,8 @@ namespace basalt {
 class PreparedPolygon {
 public:
     /// @param vertices in either order, without a repeated closing vertex; may be null when count is 0
-    /// @param count of vertices; 0 makes a polygon that contains nothing
-    /// Throws std::bad_alloc or std::length_error when out of memory.
+    /// @param count of vertices, at most 2^31 - 1; 0 makes a polygon that contains nothing
+    /// Throws std::bad_alloc when out of memory, std::length_error for a larger count.
     BASALT_API PreparedPolygon(const geo_nee* vertices, std::size_t count);
 
     /// From any contiguous container of geo_nee: std::vector, std::array, std::span.

@@ -6,11 +6,12 @@
 ///
 /// Bad input: unless a function says otherwise, NaN gives NaN (a measure) or 0 (a predicate), infinities and
 /// overflow follow IEEE arithmetic, and a field equal to #GEO_NULL counts as the number it is. Every call
-/// ends after a bounded number of steps; none throws or allocates.
+/// ends after a bounded number of steps. None throws or allocates but the constructor of
+/// basalt::PreparedPolygon and basalt::format_angle().
 ///
 /// Accuracy: results follow the stated formulas in double precision, operation by operation. On the ellipsoid
-/// (conversions, frames, geodesics, variances) shorter formulas may differ in the last digits. Results
-/// without trigonometry are the same bit for bit on every compiler and processor.
+/// (conversions, frames, geodesics, variances) shorter formulas may differ in the last digits. All results
+/// are the same bit for bit under every compiler, on every processor and with any C library.
 ///
 /// Threads: every function is reentrant.
 #ifndef BASALT_GEO_H

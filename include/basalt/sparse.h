@@ -34,8 +34,7 @@ public:
     /// An empty array.
     /// @param elementSize bytes per element; less than 8 counts as 8, and Insert then reads 8
     /// @param blockSide cells per side of a block; rounded up to a power of two, at least 1. If its blocks
-    /// are
-    ///     too large to be allocated, every Insert throws std::bad_alloc
+    /// are too large to be allocated, every Insert throws std::bad_alloc
     /// @param elementsPerChunk elements allocated from the shared heap at a time; 0 counts as 1
     Sparse2DArray(std::size_t elementSize, std::size_t blockSide, std::size_t elementsPerChunk);
 
@@ -81,7 +80,7 @@ public:
     /// Selects the blocks whose cells meet a rectangle, emptied blocks among them, in place of the old
     /// selection, and clears the selection-dirty flag.
     /// @param min,max two ints each, x then y: corner cells, both inclusive. Corners in the wrong order are
-    ///     applied as given: blocks with lowest x <= max x and highest x >= min x, and so for y
+    /// applied as given: blocks with lowest x <= max x and highest x >= min x, and so for y
     /// @return whether any block was selected
     bool Select(const int* const min, const int* const max);
 

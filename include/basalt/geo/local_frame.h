@@ -1,5 +1,5 @@
 /// @file
-/// The local frame of an origin, formed once for many points.
+/// The local frame of an origin, formed once for many points. Common rules (units, bad input): basalt/geo.h.
 #ifndef BASALT_GEO_LOCAL_FRAME_H
 #define BASALT_GEO_LOCAL_FRAME_H
 

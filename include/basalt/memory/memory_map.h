@@ -12,7 +12,7 @@ namespace vex_util {
 
 /// One block of memory that the system pages to a hidden file of its own in the temporary folder
 /// (_tempFilePath() of basalt/frame.h), "~" with a random number in seven digits and ".mem". Where no file
-/// can be made, for lack of disk space for instance, the block comes from the heap instead.
+/// can be made, on a full disk for instance, the block comes from the heap instead.
 ///
 /// Disk space is reserved at creation, so that a full disk is never a signal later. The file is opened
 /// exclusively and deleted with the block, when the process returns from main() or calls exit(), and by
@@ -36,7 +36,7 @@ public:
     /// Releases the object's block and makes another.
     /// @param size bytes, up to 2^32 - 1; 0 gives a block from the heap, of no bytes
     /// @return true with a block that reads as zero; false, without one, when neither a file nor the heap can
-    ///         provide it, and for a size out of range
+    /// provide it, and for a size out of range
     bool Create(unsigned long size);
 
     /// Releases the block and deletes its file, even if the temporary folder has changed; in the current one,

@@ -1,6 +1,7 @@
+#include "basalt/geo/curves.h"
+
 #include <cmath>
 
-#include "basalt/geo.h"
 #include "src/geo/constants.h"
 
 using basalt::is_null;

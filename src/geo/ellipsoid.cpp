@@ -18,7 +18,6 @@ constexpr double MERIDIAN_NUMERATOR = 6335439.327292829;
 
 /// From this tolerance on (radians) the first estimate of the latitude is kept.
 constexpr double NO_ITERATION = 10.0;
-constexpr double LOCAL_FRAME_TOLERANCE = 5e-10;
 
 /// Square root of 1 - e^2 sin^2 of the latitude.
 double curvature_factor(double sine) {

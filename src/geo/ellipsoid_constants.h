@@ -15,7 +15,7 @@ inline constexpr double Z_FACTOR = 0.9933056200098587;
 inline constexpr double POLAR_LATITUDE = 1.3962634015954636;
 inline constexpr int MOST_PASSES = 10;
 
-/// Of the passes without angles in _xyz2llh().
+/// 1 - e^2, and a e^2 in metres: of the passes without angles in _xyz2llh().
 inline constexpr double FLAT = 1.0 - ECCENTRICITY2;
 inline constexpr double AXIS_PULL = SEMI_MAJOR_AXIS * ECCENTRICITY2;
 

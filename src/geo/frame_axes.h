@@ -9,6 +9,9 @@
 
 namespace basalt::geo {
 
+/// Tolerance of an origin's conversion by _xyz2llh(), radians.
+inline constexpr double LOCAL_FRAME_TOLERANCE = 5e-10;
+
 struct FrameAxes {
     geo_vector north, east, up;
 

@@ -1,6 +1,6 @@
 #include <cmath>
 
-#include "basalt/geo.h"
+#include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
 #include "src/geo/elementary/elementary.h"
 

@@ -9,7 +9,6 @@ using geo::along;
 
 namespace {
 
-constexpr double TOLERANCE = 5e-10;  // radians, as in _xyz2nez()
 constexpr geo_nee NO_POINT = {GEO_NULL, GEO_NULL, GEO_NULL};
 constexpr geo_llh NO_PLACE = {GEO_NULL, GEO_NULL, GEO_NULL};
 constexpr geo_vector NO_VECTOR = {GEO_NULL, GEO_NULL, GEO_NULL};
@@ -78,7 +77,7 @@ geo_llh LocalFrame::to_geodetic(const geo_nee& point) const {
     const geo_vector xyz = to_cartesian(point);
     geo_llh llh = NO_PLACE;
     if (m_is_valid) {
-        _xyz2llh(&xyz, &llh, TOLERANCE);
+        _xyz2llh(&xyz, &llh, geo::LOCAL_FRAME_TOLERANCE);
     }
     return llh;
 }

@@ -1,6 +1,8 @@
+#include "basalt/geo/observations.h"
+
 #include <cmath>
 
-#include "basalt/geo.h"
+#include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
 #include "src/geo/elementary/elementary.h"
 

@@ -1,6 +1,7 @@
 #include "basalt/util/hardware_addresses.h"
 
 #include <algorithm>
+#include <iterator>
 
 #include "basalt/platform/error.h"
 #include "basalt/util/hex.h"

@@ -15,8 +15,7 @@ namespace basalt::util {
 // The same in both widths:
 //  - A nibble n becomes '0' + n, plus 'a' - '0' - 10 if n > 9.
 //  - A character's value is the smaller of its values as a decimal digit and as a letter. Saturating
-//  arithmetic
-//    makes each of them 16 or more for any other character.
+//    arithmetic makes each of them 16 or more for any other character.
 //  - A pair of values becomes a byte in 16-bit lanes, with the first character in the low half.
 // The last block overlaps the one before.
 

@@ -1,7 +1,5 @@
 // Observations both ways and spiral coordinates, beside the formulas written out plainly. Before a row is
-// timed, its results for all inputs are compared to the bit. The plain forms stand behind functions with the
-// library's arguments, as a user's own would: compiled into the loop they would have lost a call and had
-// their constants folded.
+// timed, its results for all inputs are compared with the library's.
 #include <benchmark/benchmark.h>
 
 #include <cmath>
@@ -105,7 +103,7 @@ void plain_deltas(double l, double k, double tolerance, double& x, double& y) {
     }
 }
 
-/// But for the last places: the plain forms use the C library's sine, cosine and arctangent.
+/// Equal but for the last places: the plain forms use the C library's sine, cosine and arctangent.
 bool same(double a, double b) {
     return std::fabs(a - b) <= 1e-14 * std::fabs(a);
 }

@@ -48,11 +48,11 @@ struct Places {
     }
 };
 
-/// Times `ask` over all places, one a turn; its results must be within `near` of `expected`'s.
-template <typename Ask, typename Expected>
-void run(benchmark::State& state, const Triple& near, const Ask& ask, const Expected& expected) {
+/// Times `call` over all places, one a turn; its results must be within `near` of `expected`'s.
+template <typename Call, typename Expected>
+void run(benchmark::State& state, const Triple& near, const Call& call, const Expected& expected) {
     for (std::size_t i = 0; i < COUNT; ++i) {
-        const Triple got = ask(i);
+        const Triple got = call(i);
         const Triple want = expected(i);
         for (std::size_t k = 0; k < got.size(); ++k) {
             if (!(std::abs(std::remainder(got[k] - want[k], k == 1 && near[k] < 1e-5 ? 2 * PI : 1e30)) <=
@@ -64,7 +64,7 @@ void run(benchmark::State& state, const Triple& near, const Ask& ask, const Expe
     }
     std::size_t at = 0;
     for ([[maybe_unused]] auto _ : state) {
-        Triple result = ask(at);
+        Triple result = call(at);
         benchmark::DoNotOptimize(result);
         at = (at + 1) % COUNT;
     }
@@ -76,11 +76,11 @@ const Places& places() {
 }
 
 /// Times what a formula cannot do without, over all places.
-template <typename Ask>
-void run_functions(benchmark::State& state, const Ask& ask) {
+template <typename Call>
+void run_functions(benchmark::State& state, const Call& call) {
     std::size_t at = 0;
     for ([[maybe_unused]] auto _ : state) {
-        benchmark::DoNotOptimize(ask(places().geodetic[at], places().azimuth[at]));
+        benchmark::DoNotOptimize(call(places().geodetic[at], places().azimuth[at]));
         at = (at + 1) % COUNT;
     }
 }
@@ -107,12 +107,12 @@ void to_cartesian_basalt(benchmark::State& state) {
 }
 
 void to_cartesian_plain(benchmark::State& state) {
-    const auto ask = [](std::size_t i) {
+    const auto call = [](std::size_t i) {
         geo_vector v = {};
         plain::llh2xyz(places().geodetic[i], v);
         return Triple{v.x, v.y, v.z};
     };
-    run(state, METRES, ask, to_cartesian);
+    run(state, METRES, call, to_cartesian);
 }
 
 void to_cartesian_functions(benchmark::State& state) {
@@ -142,13 +142,13 @@ void to_geodetic_basalt(benchmark::State& state) {
 }
 
 void to_geodetic_plain(benchmark::State& state) {
-    const auto ask = [](std::size_t i) {
+    const auto call = [](std::size_t i) {
         geo_llh g = {};
         int passes = 0;
         plain::xyz2llh(places().cartesian[i], g, TOLERANCE, passes);
         return Triple{g.latitude, g.longitude, g.height};
     };
-    run(state, LATITUDE_LONGITUDE_HEIGHT, ask, to_geodetic);
+    run(state, LATITUDE_LONGITUDE_HEIGHT, call, to_geodetic);
 }
 
 // The direct geodesic.
@@ -167,11 +167,11 @@ double metres(const benchmark::State& state) {
     return 1000.0 * static_cast<double>(state.range(0));
 }
 
-template <typename Ask>
-void run_direct(benchmark::State& state, const Ask& ask) {
+template <typename Call>
+void run_direct(benchmark::State& state, const Call& call) {
     const double distance = metres(state);
     run(
-        state, LATITUDE_LONGITUDE_AZIMUTH, [&](std::size_t i) { return ask(i, distance); },
+        state, LATITUDE_LONGITUDE_AZIMUTH, [&](std::size_t i) { return call(i, distance); },
         [&](std::size_t i) { return direct(i, distance); });
 }
 
@@ -200,10 +200,10 @@ void direct_plain(benchmark::State& state) {
 
 // Whole arrays; the time is that of one place.
 
-template <typename Ask>
-void run_arrays(benchmark::State& state, const Ask& ask) {
+template <typename Call>
+void run_arrays(benchmark::State& state, const Call& call) {
     for ([[maybe_unused]] auto _ : state) {
-        ask();
+        call();
         benchmark::ClobberMemory();
     }
     state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(COUNT));
@@ -233,20 +233,20 @@ void direct_arrays(benchmark::State& state) {
 
 void to_local_basalt(benchmark::State& state) {
     const basalt::LocalFrame frame(places().geodetic[0]);
-    const auto ask = [&](std::size_t i) {
+    const auto call = [&](std::size_t i) {
         const geo_nee local = frame.to_local(places().cartesian[i]);
         return Triple{local.north, local.east, local.elevation};
     };
-    run(state, {1e-300, 1, 1e-300}, ask, ask);
+    run(state, {1e-300, 1, 1e-300}, call, call);
 }
 
 void to_local_single_call(benchmark::State& state) {
-    const auto ask = [](std::size_t i) {
+    const auto call = [](std::size_t i) {
         geo_nee local = {};
         _xyz2nez(&places().cartesian[0], &places().cartesian[i], &local);
         return Triple{local.north, local.east, local.elevation};
     };
-    run(state, {1e-300, 1, 1e-300}, ask, ask);
+    run(state, {1e-300, 1, 1e-300}, call, call);
 }
 
 void to_local_arrays(benchmark::State& state) {
@@ -274,11 +274,11 @@ Triple inverse(const geo_llh& from, const geo_llh& to) {
     return {line.distance, line.azimuth_from, line.azimuth_to};
 }
 
-template <typename Ask>
-void run_inverse(benchmark::State& state, const Ask& ask) {
+template <typename Call>
+void run_inverse(benchmark::State& state, const Call& call) {
     const std::vector<geo_llh> to = ends(metres(state));
     run(
-        state, DISTANCE_AZIMUTHS, [&](std::size_t i) { return ask(places().geodetic[i], to[i]); },
+        state, DISTANCE_AZIMUTHS, [&](std::size_t i) { return call(places().geodetic[i], to[i]); },
         [&](std::size_t i) { return inverse(places().geodetic[i], to[i]); });
 }
 
@@ -337,24 +337,24 @@ void crosstrack_steps(benchmark::State& state) {
 
 void to_cartesian_geographiclib(benchmark::State& state) {
     const GeographicLib::Geocentric& earth = GeographicLib::Geocentric::WGS84();
-    const auto ask = [&](std::size_t i) {
+    const auto call = [&](std::size_t i) {
         const geo_llh& g = places().geodetic[i];
         Triple v = {};
         earth.Forward(g.latitude / DEGREE, g.longitude / DEGREE, g.height, v[0], v[1], v[2]);
         return v;
     };
-    run(state, METRES, ask, to_cartesian);
+    run(state, METRES, call, to_cartesian);
 }
 
 void to_geodetic_geographiclib(benchmark::State& state) {
     const GeographicLib::Geocentric& earth = GeographicLib::Geocentric::WGS84();
-    const auto ask = [&](std::size_t i) {
+    const auto call = [&](std::size_t i) {
         const geo_vector& v = places().cartesian[i];
         Triple g = {};
         earth.Reverse(v.x, v.y, v.z, g[0], g[1], g[2]);
         return Triple{g[0] * DEGREE, g[1] * DEGREE, g[2]};
     };
-    run(state, LATITUDE_LONGITUDE_HEIGHT, ask, to_geodetic);
+    run(state, LATITUDE_LONGITUDE_HEIGHT, call, to_geodetic);
 }
 
 void direct_geographiclib(benchmark::State& state) {
@@ -381,7 +381,7 @@ void inverse_geographiclib(benchmark::State& state) {
 /// The same search for the foot, by Napier's rule from pass to pass, on GeographicLib's line.
 void crosstrack_geographiclib(benchmark::State& state) {
     const GeographicLib::Geodesic& earth = GeographicLib::Geodesic::WGS84();
-    const auto ask = [&](std::size_t i) {
+    const auto call = [&](std::size_t i) {
         const geo_llh& a = lines().a[i];
         const geo_llh& p = lines().p[i];
         const double bearing = geo_vincenty_bearing(a, lines().b[i]);
@@ -405,7 +405,7 @@ void crosstrack_geographiclib(benchmark::State& state) {
         return Triple{};
     };
     // Without the tolerance's one side, see geo_vincenty_crosstrack().
-    run(state, {4e-6, 1, 1}, ask, crosstrack);
+    run(state, {4e-6, 1, 1}, call, crosstrack);
 }
 
 #endif
@@ -436,21 +436,21 @@ private:
 
 void to_cartesian_proj(benchmark::State& state) {
     const Cart cart;
-    const auto ask = [&](std::size_t i) {
+    const auto call = [&](std::size_t i) {
         const geo_llh& g = places().geodetic[i];
         return cart.convert(PJ_FWD, g.longitude, g.latitude, g.height);
     };
-    run(state, METRES, ask, to_cartesian);
+    run(state, METRES, call, to_cartesian);
 }
 
 void to_geodetic_proj(benchmark::State& state) {
     const Cart cart;
-    const auto ask = [&](std::size_t i) {
+    const auto call = [&](std::size_t i) {
         const geo_vector& v = places().cartesian[i];
         const Triple g = cart.convert(PJ_INV, v.x, v.y, v.z);
         return Triple{g[1], g[0], g[2]};
     };
-    run(state, LATITUDE_LONGITUDE_HEIGHT, ask, to_geodetic);
+    run(state, LATITUDE_LONGITUDE_HEIGHT, call, to_geodetic);
 }
 
 void direct_proj(benchmark::State& state) {

@@ -94,8 +94,7 @@ void picture_set(benchmark::State& state) {
     bench::setting(state, std::size_t{WIDTH} * HEIGHT * 4);
 }
 
-// Nearest colour
-// ----------------------------------------------------------------------------------------------
+// Nearest colour.
 
 std::vector<std::uint32_t> random_colours() {
     std::mt19937 random(1);
@@ -158,8 +157,7 @@ void nearest_colour_scan(benchmark::State& state) {
 BENCHMARK(nearest_colour_basalt)->Name("nearest_colour/basalt");
 BENCHMARK(nearest_colour_scan)->Name("nearest_colour/plain_scan");
 
-// Gradients
-// ---------------------------------------------------------------------------------------------------
+// Gradients.
 
 void draw_gradient(HDC dc, DWORD mode) {
     const TRIVERTEX corners[2] = {{0, 0, 0xFF00, 0x4000, 0, 0}, {WIDTH, HEIGHT, 0x7F00, 0x2000, 0xFF00, 0}};
@@ -222,8 +220,7 @@ BENCHMARK(picture_set)->Name("gradient_vertical/limit_memset");
 BENCHMARK_CAPTURE(gradient_cairo, down, GRADIENT_FILL_RECT_V)->Name("gradient_vertical/cairo");
 #endif
 
-// Copies that leave a colour out
-// ------------------------------------------------------------------------------
+// Copies that leave a colour out.
 
 /// Runs of the key and of other colours, of 1 to twice `mean` pixels.
 Pixels runs_of(int mean) {
@@ -268,8 +265,7 @@ BENCHMARK_CAPTURE(transparent_basalt, long_runs, 200)->Name("transparent_copy_of
 BENCHMARK_CAPTURE(transparent_plain_loop, long_runs, 200)->Name("transparent_copy_of_long_runs/plain_loop");
 BENCHMARK(picture_copied)->Name("transparent_copy_of_long_runs/limit_memcpy");
 
-// Rotation
-// ----------------------------------------------------------------------------------------------------
+// Rotation.
 
 Pixels noise() {
     std::mt19937 random(3);
@@ -325,7 +321,7 @@ void rotation_pixman(benchmark::State& state) {
     const auto draw = [&] {
         pixman_image_composite32(PIXMAN_OP_OVER, source, nullptr, screen, 0, 0, 0, 0, 0, 0, WIDTH, HEIGHT);
     };
-    // Its places have 16 bits behind the point: by the far edge, some pixels are their neighbours.
+    // Its positions have 16 fractional bits: near the far edge, some pixels are their neighbours.
     const Screen own_source(WIDTH, HEIGHT, noise().data());
     const Screen own(WIDTH, HEIGHT);
     SetGraphicsMode(own, GM_ADVANCED);
@@ -357,8 +353,7 @@ BENCHMARK(picture_copied)->Name("rotation/limit_memcpy")->ArgName("degrees")->Ar
 BENCHMARK(rotation_pixman)->Name("rotation/pixman")->ArgName("degrees")->Arg(5)->Arg(30)->Arg(90);
 #endif
 
-// Regions
-// -----------------------------------------------------------------------------------------------------
+// Regions.
 
 constexpr int SIDE = 2000;
 

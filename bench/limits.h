@@ -16,8 +16,8 @@
 
 namespace bench {
 
-/// The least a lock can be that any thread may take next: one locked operation and a store.
-class Floor {
+/// The cheapest lock: one locked operation and a store.
+class SpinLock {
 public:
     void lock() {
         while (m_word.exchange(1, std::memory_order_acquire) != 0) {
@@ -29,15 +29,15 @@ private:
     std::atomic<int> m_word{0};
 };
 
-/// `count` pairs of it a turn.
+/// Times `count` pairs of locking and unlocking.
 inline void lock_pairs(benchmark::State& state, int count) {
-    Floor floor;
+    SpinLock lock;
     long guarded = 0;
     for ([[maybe_unused]] auto _ : state) {
         for (int i = 0; i < count; ++i) {
-            floor.lock();
+            lock.lock();
             benchmark::DoNotOptimize(++guarded);
-            floor.unlock();
+            lock.unlock();
         }
     }
 }
@@ -62,7 +62,7 @@ struct Clear {
     void operator()(Item& item) { item = nullptr; }
 };
 
-/// One item's work a turn, the items in order or not.
+/// Times the work on one item, the items in order or shuffled.
 template <class Work>
 void each_of(benchmark::State& state, std::vector<typename Work::Item> items, bool in_order, Work work) {
     std::vector<std::uint32_t> order(items.size());

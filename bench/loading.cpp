@@ -1,5 +1,5 @@
-// What a program pays before its first call: the library opened and asked once, each time in a process of its
-// own, beside other libraries opened in the same way.
+// What a program pays before its first call: the library opened and called once, each time in a process of
+// its own, beside other libraries opened in the same way.
 #include <benchmark/benchmark.h>
 #include <dlfcn.h>
 #include <sys/wait.h>
@@ -12,7 +12,7 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-/// Seconds from before the library is opened until its function is found and `first_call` is back; below 0
+/// Seconds from before the library is opened until `first_call` of its function has returned; below 0
 /// when the library or its function is not there.
 template <typename FirstCall>
 double open_and_call(const char* library, const char* function, const FirstCall& first_call) {
@@ -77,7 +77,7 @@ void convert(void* function) {
     benchmark::DoNotOptimize(radians);
 }
 
-void ask_version(void* function) {
+void call_version(void* function) {
     const void* version = reinterpret_cast<const void* (*)()>(function)();
     benchmark::DoNotOptimize(version);
 }
@@ -90,9 +90,9 @@ void touch(void* address) {
 
 int main(int argc, char** argv) {
     row("basalt", BENCH_LIBRARY, "_Z9_degtoradd", convert);
-    row("geos", "libgeos_c.so.1", "GEOSversion", ask_version);
-    row("proj", "libproj.so.25", "proj_context_create", ask_version);
-    row("cairo", "libcairo.so.2", "cairo_version_string", ask_version);
+    row("geos", "libgeos_c.so.1", "GEOSversion", call_version);
+    row("proj", "libproj.so.25", "proj_context_create", call_version);
+    row("cairo", "libcairo.so.2", "cairo_version_string", call_version);
     row("limit_pixman_alone", "libpixman-1.so.0", "pixman_version_string", touch);
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();

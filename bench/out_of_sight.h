@@ -4,8 +4,8 @@
 
 namespace bench {
 
-/// The function, called as one of a library is: otherwise the compiler takes the call away, or makes a copy
-/// into which it folds what the loop always passes, and the row would compare that and not the work.
+/// Hides which function is called, as for one in a library: otherwise the compiler would inline it, or fold
+/// the loop's constant arguments into a copy of it.
 template <typename Function>
 Function* out_of_sight(Function* function) {
     asm("" : "+r"(function));

@@ -1,5 +1,5 @@
 // Point in polygon, with and without a tolerance band, beside the plain loop, Boost.Geometry and GEOS. Before
-// a row is timed, its answers for all points are compared with the library's.
+// a row is timed, its results for all points are compared with the library's.
 #include <benchmark/benchmark.h>
 
 #include <cmath>
@@ -46,18 +46,18 @@ struct Scene {
     int size() const { return static_cast<int>(polygon.size()); }
 };
 
-/// Times `ask` over the scene's points, one a turn; `expected` is the library's own answer.
-template <typename Ask, typename Expected>
-void run(benchmark::State& state, const Scene& scene, const Ask& ask, const Expected& expected) {
+/// Times `call` over the scene's points, one a turn; `expected` is the library's own result.
+template <typename Call, typename Expected>
+void run(benchmark::State& state, const Scene& scene, const Call& call, const Expected& expected) {
     for (const geo_nee& point : scene.points) {
-        if (ask(point) != expected(point)) {
-            state.SkipWithError("answers differ");
+        if (call(point) != expected(point)) {
+            state.SkipWithError("results differ");
             return;
         }
     }
     std::size_t at = 0;
     for ([[maybe_unused]] auto _ : state) {
-        benchmark::DoNotOptimize(ask(scene.points[at]));
+        benchmark::DoNotOptimize(call(scene.points[at]));
         at = (at + 1) % POINTS;
     }
 }
@@ -180,7 +180,7 @@ void in_polygon_geos_prepared(benchmark::State& state) {
     GEOSGeometry* ring = GEOSGeom_createLinearRing_r(context, outline);
     GEOSGeometry* polygon = GEOSGeom_createPolygon_r(context, ring, nullptr, 0);
     const GEOSPreparedGeometry* prepared = GEOSPrepare_r(context, polygon);
-    // Points are made ahead: only the question is timed.
+    // Points are made ahead: only the test is timed.
     std::vector<GEOSGeometry*> points;
     for (const geo_nee& p : scene.points) {
         points.push_back(GEOSGeom_createPointFromXY_r(context, p.east, p.north));

@@ -183,19 +183,19 @@ void limit_window(benchmark::State& state) {
         std::vector<std::pair<Rectangle, int>> hits;
     };
     const auto blocks = shuffled_blocks(STORED);
-    std::vector<Found> answers;
+    std::vector<Found> expected;
     std::vector<int> found;
     for (const Rectangle& q :
          windows(STORED, static_cast<int>(state.range(0)), static_cast<int>(state.range(1)))) {
         stored().Search(q.min, q.max, found);
-        answers.push_back({q, {}});
+        expected.push_back({q, {}});
         for (const int id : found) {
-            answers.back().hits.emplace_back(blocks[static_cast<std::size_t>(id)], id);
+            expected.back().hits.emplace_back(blocks[static_cast<std::size_t>(id)], id);
         }
     }
     std::size_t i = 0;
     for (auto _ : state) {
-        const auto& [q, hits] = answers[i++ % answers.size()];
+        const auto& [q, hits] = expected[i++ % expected.size()];
         found.resize(hits.size());
         std::size_t count = 0;
         for (const auto& [b, id] : hits) {

@@ -30,9 +30,9 @@ public:
             }
         }
     }
-    std::uint64_t Count() const { return m_count; }
+    std::uint64_t count() const { return m_count; }
     template <class Work>
-    void ForEach(Work work) const {
+    void for_each(Work work) const {
         std::uint64_t cell = 0;
         for (std::uint64_t i = 0; i < m_count; ++i) {
             work(static_cast<int>(cell % m_side), static_cast<int>(cell / m_side));
@@ -67,12 +67,12 @@ struct Figures {
     bool complete;
 };
 
-// One pass over the life of an array, or of so many small ones side by side that a clock can tell. Weighing
-// gives all pages back first that nobody uses.
+// One pass over the life of an array, or of as many small ones side by side as a clock can measure. Weighing
+// first returns unused pages to the system.
 Figures life(const Order& order, bool weighed) {
     constexpr std::uint64_t LEAST_CELLS = 100'000;
-    const std::uint64_t arrays = (LEAST_CELLS + order.Count() - 1) / order.Count();
-    const auto count = static_cast<double>(arrays * order.Count());
+    const std::uint64_t arrays = (LEAST_CELLS + order.count() - 1) / order.count();
+    const auto count = static_cast<double>(arrays * order.count());
     const double before = weighed ? bench::resident_bytes() : 0;
     std::vector<std::unique_ptr<Sparse2DArray>> all;
     const auto nanoseconds_per_cell = [&](auto work) {
@@ -88,7 +88,7 @@ Figures life(const Order& order, bool weighed) {
     }
     Figures figures{};
     figures.insert_ns = nanoseconds_per_cell([&](Sparse2DArray& array) {
-        order.ForEach([&](int x, int y) {
+        order.for_each([&](int x, int y) {
             const Record record = {static_cast<double>(x), static_cast<double>(y), 1.0, 0.0};
             array.Insert(x, y, record.data());
         });
@@ -96,25 +96,25 @@ Figures life(const Order& order, bool weighed) {
     figures.bytes = weighed ? (bench::resident_bytes() - before) / count : 0;
     double sum = 0;
     figures.find_ns = nanoseconds_per_cell([&](Sparse2DArray& array) {
-        order.ForEach([&](int x, int y) { sum += static_cast<const double*>(array.Find(x, y))[2]; });
+        order.for_each([&](int x, int y) { sum += static_cast<const double*>(array.Find(x, y))[2]; });
     });
     figures.visit_ns =
         nanoseconds_per_cell([&](Sparse2DArray& array) { array.IterateAll(add_element, &sum); });
     figures.complete = sum == 2 * count;
     figures.remove_ns = nanoseconds_per_cell(
-        [&](Sparse2DArray& array) { order.ForEach([&](int x, int y) { array.Remove(x, y); }); });
+        [&](Sparse2DArray& array) { order.for_each([&](int x, int y) { array.Remove(x, y); }); });
     return figures;
 }
 
-// The row's own time is the insertion's, the rest stand in counters. What the heap keeps of freed pages
-// serves small arrays in a long-lived process: they live twice, and times are the second life's.
+// The row's own time is the insertion's, the others are counters. In a long-lived process small arrays reuse
+// pages that the heap has kept: they live twice, and times are those of the second life.
 void lives(benchmark::State& state, std::uint64_t side, bool scattered) {
     constexpr std::uint64_t SMALL = 1'000'000;
     const Order order(side, scattered);
     for (auto _ : state) {
         Figures figures = life(order, true);
         state.counters["bytes_per_cell"] = figures.bytes;
-        if (order.Count() < SMALL) {
+        if (order.count() < SMALL) {
             figures = life(order, false);
         }
         if (!figures.complete) {

@@ -230,8 +230,8 @@ template <class Lock>
 void add_lock_row(const char* who) {
     benchmark::RegisterBenchmark((std::string("lock pair, uncontended/") + who).c_str(),
                                  [](benchmark::State& state) {
-                                     // A process that never had a second thread is spared locked
-                                     // instructions.
+                                     // The C library skips locked instructions in a process
+                                     // that never had a second thread.
                                      std::thread([] {}).join();
                                      Lock lock;
                                      long guarded = 0;
@@ -285,7 +285,7 @@ int main(int argc, char** argv) {
     add_store<bench::Volume<bench::NoMutex>>(rows, random, tenth);
 #endif
     add_lock_row<OurLock>("basalt");
-    add_lock_row<bench::Floor>("exchange_and_store");
+    add_lock_row<bench::SpinLock>("exchange_and_store");
     add_lock_row<std::recursive_mutex>("std_recursive_mutex");
     add_limits(rows.size());
     require_same_visits(64);

@@ -69,19 +69,19 @@ auto mjd_by(decltype(_greg2mjd)* convert) {
     };
 }
 
-/// Times `ask` over the inputs; `expected` returns the library's result.
-template <typename Input, typename Ask, typename Expected>
-void run(benchmark::State& state, const std::vector<Input>& inputs, const Ask& ask,
+/// Times `call` over the inputs; `expected` returns the library's result.
+template <typename Input, typename Call, typename Expected>
+void run(benchmark::State& state, const std::vector<Input>& inputs, const Call& call,
          const Expected& expected) {
     for (const Input& input : inputs) {
-        if (!(ask(input) == expected(input))) {
+        if (!(call(input) == expected(input))) {
             state.SkipWithError("results differ");
             return;
         }
     }
     std::size_t at = 0;
     for ([[maybe_unused]] auto _ : state) {
-        benchmark::DoNotOptimize(ask(inputs[at]));
+        benchmark::DoNotOptimize(call(inputs[at]));
         at = (at + 1) % COUNT;
     }
 }
@@ -103,9 +103,9 @@ std::vector<Date> dates() {
     return result;
 }
 
-template <typename Input, typename Ask, typename Expected>
-void row(const char* name, std::vector<Input> inputs, Ask ask, Expected expected) {
-    benchmark::RegisterBenchmark(name, [=](benchmark::State& state) { run(state, inputs, ask, expected); });
+template <typename Input, typename Call, typename Expected>
+void row(const char* name, std::vector<Input> inputs, Call call, Expected expected) {
+    benchmark::RegisterBenchmark(name, [=](benchmark::State& state) { run(state, inputs, call, expected); });
 }
 
 using Six = std::array<double, 6>;

@@ -48,7 +48,7 @@ ROWS = [  # subject, row of its table, what a reader calls it, and our form if i
 STYLE = ("text{font:13px sans-serif;fill:#222}.axis{stroke:#999}.fast{fill:#2a78b5}.slow{fill:#c4661f}"
          "@media(prefers-color-scheme:dark){text{fill:#ddd}.axis{stroke:#777}}")
 LEFT, WIDTH, LINE = 330, 330, 22  # of the bars; the lines' height
-LIMIT = 20.0  # longer bars are cut off
+LIMIT = 20.0  # longer bars are truncated
 
 
 def with_unit(value):

@@ -5,7 +5,7 @@ calling_script=$(realpath "$0")
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 mkdir -p build
 
-show_help() {  # prints the calling script's opening comment when the first argument asks for help
+show_help() {  # prints the calling script's opening comment when the first argument is --help or -h
     if [ "${1:-}" = --help ] || [ "${1:-}" = -h ]; then
         sed -n '2,/^[^#]/{/^#/s/^# \{0,1\}//p}' "$calling_script"
         exit 0

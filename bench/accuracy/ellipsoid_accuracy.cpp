@@ -43,12 +43,12 @@ void forward(const std::vector<ReferenceRow>& rows) {
     table.print("height");
 }
 
-void backward(const std::vector<ReferenceRow>& rows, double tolerance, const char* toleranceText) {
+void backward(const std::vector<ReferenceRow>& rows, double tolerance, const char* tolerance_text) {
     const std::vector<std::string> quantities = {"latitude, rad", "longitude, rad x cos latitude",
                                                  "horizontal, m", "height, m"};
-    ErrorTable byHeight(HEIGHT_BANDS, HEIGHT_BOUNDS, quantities);
-    ErrorTable byLatitude(LATITUDE_BANDS, LATITUDE_BOUNDS, quantities);
-    long double outermostRefused = 0.0L;
+    ErrorTable by_height(HEIGHT_BANDS, HEIGHT_BOUNDS, quantities);
+    ErrorTable by_latitude(LATITUDE_BANDS, LATITUDE_BOUNDS, quantities);
+    long double outermost_refused = 0.0L;
     for (const ReferenceRow& row : rows) {
         const geo_vector xyz = {static_cast<double>(row[3]), static_cast<double>(row[4]),
                                 static_cast<double>(row[5])};
@@ -56,34 +56,34 @@ void backward(const std::vector<ReferenceRow>& rows, double tolerance, const cha
         const auto latitude = static_cast<double>(std::abs(row[0]));
         geo_llh llh = {};
         if (_xyz2llh(&xyz, &llh, tolerance) == 0) {
-            byHeight.add_refusal(height);
-            outermostRefused = std::max(outermostRefused, std::hypot(row[3], row[4], row[5]));
+            by_height.add_refusal(height);
+            outermost_refused = std::max(outermost_refused, std::hypot(row[3], row[4], row[5]));
             if (height >= LOWEST) {
-                byLatitude.add_refusal(latitude);
+                by_latitude.add_refusal(latitude);
             }
             continue;
         }
         double meridian = 0.0;
-        double primeVertical = 0.0;
-        _wgs84curvature(llh.latitude, meridian, primeVertical);
+        double prime_vertical = 0.0;
+        _wgs84curvature(llh.latitude, meridian, prime_vertical);
         const long double north = llh.latitude - radians_of(row[0]);
-        // At a pole every longitude is the same place; the answer is atan2's of what rounding leaves of x and
-        // y.
+        // At a pole every longitude is the same place.
         const bool pole = latitude == 90.0;
         const long double east = pole ? 0.0L : angle_difference(llh.longitude, radians_of(row[1]));
-        const long double fromAxis = (primeVertical + row[2]) * std::cos(radians_of(row[0]));
+        const long double from_axis = (prime_vertical + row[2]) * std::cos(radians_of(row[0]));
         const std::vector<long double> errors = {
-            north, east, std::hypot(north * (meridian + row[2]), east * fromAxis), llh.height - row[2]};
-        byHeight.add(height, errors);
+            north, east, std::hypot(north * (meridian + row[2]), east * from_axis), llh.height - row[2]};
+        by_height.add(height, errors);
         if (height >= LOWEST) {
-            byLatitude.add(latitude, errors);
+            by_latitude.add(latitude, errors);
         }
     }
-    std::printf("### Cartesian to geodetic, `_xyz2llh`, tolerance %s\n", toleranceText);
-    byHeight.print("height");
-    std::printf("The outermost point refused lies %.0Lf km from the centre.\n\n", outermostRefused / 1000.0L);
+    std::printf("### Cartesian to geodetic, `_xyz2llh`, tolerance %s\n", tolerance_text);
+    by_height.print("height");
+    std::printf("The outermost point refused lies %.0Lf km from the centre.\n\n",
+                outermost_refused / 1000.0L);
     std::printf("By latitude, heights from -11 km to 20,000 km:\n");
-    byLatitude.print("latitude, either side");
+    by_latitude.print("latitude, either side");
 }
 
 }  // namespace

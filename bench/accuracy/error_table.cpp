@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 #include <cmath>
+#include <cstdio>
 #include <utility>
 
 namespace accuracy {
@@ -60,10 +61,10 @@ void ErrorTable::add_refusal(double value) {
     }
 }
 
-void ErrorTable::print(const char* bandTitle) const {
+void ErrorTable::print(const char* band_title) const {
     const bool refusing =
         std::any_of(m_bands.begin(), m_bands.end(), [](const Band& band) { return band.refusals != 0; });
-    std::printf("\n| %s | cases |%s", bandTitle, refusing ? " refused |" : "");
+    std::printf("\n| %s | cases |%s", band_title, refusing ? " refused |" : "");
     for (const std::string& quantity : m_quantities) {
         std::printf(" %s |", quantity.c_str());
     }

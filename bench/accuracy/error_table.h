@@ -2,7 +2,6 @@
 #ifndef BASALT_BENCH_ACCURACY_ERROR_TABLE_H
 #define BASALT_BENCH_ACCURACY_ERROR_TABLE_H
 
-#include <cstdio>
 #include <string>
 #include <vector>
 
@@ -31,7 +30,7 @@ public:
     void add(double value, const std::vector<long double>& errors);
     void add_refusal(double value);
     /// The column of refusals is left out when there are none.
-    void print(const char* bandTitle) const;
+    void print(const char* band_title) const;
 
 private:
     struct Band {

@@ -46,14 +46,13 @@ void measure_geodesic(const std::vector<ReferenceRow>& rows) {
         geo_llh end = {};
         geo_vincenty_direct(start, static_cast<double>(radians_of(row[2])), distance, azimuth, end);
         double meridian = 0.0;
-        double primeVertical = 0.0;
-        _wgs84curvature(end.latitude, meridian, primeVertical);
+        double prime_vertical = 0.0;
+        _wgs84curvature(end.latitude, meridian, prime_vertical);
         const long double cosine = std::cos(radians_of(row[4]));
         const long double north = end.latitude - radians_of(row[4]);
         const long double east = angle_difference(end.longitude, radians_of(row[5])) * cosine;
-        // Beside a pole the azimuth turns with the longitude; times the cosine it is what a place there
-        // feels.
-        direct.add(distance, {std::hypot(north * meridian, east * primeVertical), std::hypot(north, east),
+        // Beside a pole the azimuth turns with the longitude, which the cosine makes up for.
+        direct.add(distance, {std::hypot(north * meridian, east * prime_vertical), std::hypot(north, east),
                               angle_difference(azimuth, radians_of(row[6])) * cosine});
 
         const geo_llh there = {static_cast<double>(radians_of(row[4])),

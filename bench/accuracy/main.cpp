@@ -1,4 +1,4 @@
-// Input for the reference programs, and what our results differ from their answers; see scripts/accuracy.sh.
+// Input for the reference programs, and differences of our results from theirs; see scripts/accuracy.sh.
 #include <cstdio>
 #include <cstdlib>
 #include <exception>

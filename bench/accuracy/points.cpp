@@ -53,7 +53,7 @@ double longitude(Random& random) {
 }  // namespace
 
 void print_points(int count) {
-    // Each height band the tables tell apart is met equally often, the deep ones less.
+    // The height bands of the tables get equal shares, the deep ones smaller ones.
     constexpr std::array BOUNDS = {-6350e3, -6200e3, -6100e3, -6000e3, -1000e3, -11e3,
                                    0.0,     1e3,     10e3,    100e3,   1000e3,  20000e3};
     Random random;

@@ -37,7 +37,7 @@ long double integral(Function function, long double end) {
     return row[LEVELS - 1];
 }
 
-void measure_spiral(double tolerance, const char* toleranceText) {
+void measure_spiral(double tolerance, const char* tolerance_text) {
     ErrorTable table({"0 to 0.1 rad", "0.1 to 0.5 rad", "0.5 to 1 rad", "1 to 2 rad", "2 to 3 rad",
                       "3 to 4 rad", "4 to 5 rad", "5 to 6 rad"},
                      {0.0, 0.1, 0.5, 1.0, 2.0, 3.0, 4.0, 5.0, 6.0}, {"position, m"});
@@ -45,7 +45,7 @@ void measure_spiral(double tolerance, const char* toleranceText) {
     const auto random = [&engine] { return static_cast<double>(engine() >> 11) * 0x1p-53; };
     for (int i = 0; i < 8000; ++i) {
         const double length = 1.0 + 999.0 * random();
-        // Short deflections are met as often as long ones.
+        // A quarter of the deflections are small.
         const double deflection = i % 4 == 0 ? random() * 0.5 : random() * 6.0;
         const double constant = length * length / deflection;
         double x = 0.0;
@@ -56,12 +56,12 @@ void measure_spiral(double tolerance, const char* toleranceText) {
             continue;
         }
         const long double k = constant;
-        const long double trueX = integral([k](long double s) { return std::cos(s * s / k); }, length);
-        const long double trueY = integral([k](long double s) { return std::sin(s * s / k); }, length);
-        table.add(deflection, {std::hypot(x - trueX, y - trueY)});
+        const long double true_x = integral([k](long double s) { return std::cos(s * s / k); }, length);
+        const long double true_y = integral([k](long double s) { return std::sin(s * s / k); }, length);
+        table.add(deflection, {std::hypot(x - true_x, y - true_y)});
     }
     std::printf("### Transition spiral, `geo_spiral_deltas`, tolerance %s, lengths 1 to 1000 m\n",
-                toleranceText);
+                tolerance_text);
     table.print("deflection at its end");
 }
 

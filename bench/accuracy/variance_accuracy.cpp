@@ -22,8 +22,8 @@ Vector cartesian(const Vector& llh) {
     constexpr long double E2 = F * (2.0L - F);
     const long double sine = std::sin(llh[0]);
     const long double n = A / std::sqrt(1.0L - E2 * sine * sine);
-    const long double fromAxis = (n + llh[2]) * std::cos(llh[0]);
-    return {fromAxis * std::cos(llh[1]), fromAxis * std::sin(llh[1]), (n * (1.0L - E2) + llh[2]) * sine};
+    const long double from_axis = (n + llh[2]) * std::cos(llh[0]);
+    return {from_axis * std::cos(llh[1]), from_axis * std::sin(llh[1]), (n * (1.0L - E2) + llh[2]) * sine};
 }
 
 /// Derivative of the Cartesian coordinates by one geodetic one: central differences of fourth order.

@@ -2,6 +2,7 @@
 // library's, where the two draw the same picture.
 #include <benchmark/benchmark.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstdint>
 #include <cstdlib>

@@ -3,12 +3,10 @@
 #include <benchmark/benchmark.h>
 
 #include <algorithm>
-#include <cmath>
 #include <cstdio>
 #include <cstdlib>
 #include <map>
 #include <memory>
-#include <random>
 #include <vector>
 
 #include "bench/rtree_blocks.h"

@@ -1,7 +1,5 @@
 #include "basalt/memory/page_sources.h"
 
-#include <algorithm>
-#include <cstddef>
 #include <cstdint>
 
 #include "basalt/platform/error.h"

@@ -70,12 +70,11 @@ void encode_hex_sse2(const unsigned char* bytes, std::size_t count, char* digits
     };
     std::size_t done = 0;
     for (; count - done >= 16; done += 16) {
-        const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes + done));
+        const __m128i block = load_16(bytes + done);
         const __m128i high = to_digits(_mm_and_si128(_mm_srli_epi16(block, 4), nibble));
         const __m128i low = to_digits(_mm_and_si128(block, nibble));
-        auto* const out = reinterpret_cast<__m128i*>(digits + 2 * done);
-        _mm_storeu_si128(out, _mm_unpacklo_epi8(high, low));
-        _mm_storeu_si128(out + 1, _mm_unpackhi_epi8(high, low));
+        store_16(digits + 2 * done, _mm_unpacklo_epi8(high, low));
+        store_16(digits + 2 * done + 16, _mm_unpackhi_epi8(high, low));
     }
     encode_hex_portable(bytes + done, count - done, digits + 2 * done);
 }

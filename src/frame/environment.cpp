@@ -1,4 +1,6 @@
+#include <algorithm>
 #include <cstdlib>
+#include <initializer_list>
 
 #include "basalt/frame.h"
 #include "src/frame/environment_state.h"
@@ -12,6 +14,14 @@ namespace basalt::frame {
 constinit EnvironmentState environment;
 
 }  // namespace basalt::frame
+
+namespace {
+
+bool is_handheld(std::initializer_list<basalt_hh> codes) {
+    return std::find(codes.begin(), codes.end(), _handheldVersion()) != codes.end();
+}
+
+}  // namespace
 
 basalt_os _operatingsystem() {
     if (environment.os_code.load() == 0) {
@@ -36,53 +46,23 @@ basalt_hh _handheldVersion() {
 }
 
 bool _isNewLumoOS() {
-    switch (_handheldVersion()) {
-        case 6:
-        case 13:
-            return environment.new_generation.load();
-        default:
-            return false;
-    }
+    return is_handheld({6, 13}) && environment.new_generation.load();
 }
 
 bool _handheldCanHaveInBuildKV7Radio() {
-    switch (_handheldVersion()) {
-        case 5:
-        case 6:
-        case 8:
-            return true;
-        default:
-            return false;
-    }
+    return is_handheld({5, 6, 8});
 }
 
 bool _handheldCanHaveInBuildModem() {
-    switch (_handheldVersion()) {
-        case 3:
-        case 7:
-        case 10:
-        case 11:
-        case 14:
-            return true;
-        default:
-            return false;
-    }
+    return is_handheld({3, 7, 10, 11, 14});
 }
 
 bool _handheldCanHaveInBuildKestraRTK() {
-    switch (_handheldVersion()) {
-        case 7:
-            return true;
-        case 11:
-            return environment.rtk_option.load();
-        default:
-            return false;
-    }
+    return is_handheld({7}) || (is_handheld({11}) && environment.rtk_option.load());
 }
 
 bool _isDefaultFontSize() {
-    const basalt_hh code = _handheldVersion();
-    return code != 8 && code != 9;
+    return !is_handheld({8, 9});
 }
 
 double _checkForHighResolution() {

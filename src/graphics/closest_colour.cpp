@@ -3,10 +3,7 @@
 #include <algorithm>
 
 #if defined(__x86_64__)
-#define BASALT_HAS_AVX2_FORM 1
 #include <immintrin.h>
-#else
-#define BASALT_HAS_AVX2_FORM 0
 #endif
 
 namespace basalt::graphics {
@@ -43,7 +40,7 @@ unsigned char index_of(std::uint32_t rank) {
     return static_cast<unsigned char>(rank < NO_CANDIDATE ? rank : 0);
 }
 
-#if BASALT_HAS_AVX2_FORM
+#if defined(__x86_64__)
 
 /// Eight entries at once.
 [[gnu::target("avx2")]] unsigned char closest_colour_avx2(const std::uint32_t* colours,
@@ -94,7 +91,7 @@ unsigned char closest_colour_portable(const std::uint32_t* colours, std::uint32_
 }
 
 unsigned char closest_colour(const std::uint32_t* colours, std::uint32_t wanted) {
-#if BASALT_HAS_AVX2_FORM
+#if defined(__x86_64__)
     if (__builtin_cpu_supports("avx2") != 0) {
         return closest_colour_avx2(colours, wanted);
     }

@@ -37,7 +37,7 @@ std::optional<Affine> Affine::inverse() const {
     const double determinant = m11 * m22 - m12 * m21;
     Affine result = {m22 / determinant, -m12 / determinant, -m21 / determinant, m11 / determinant, 0, 0};
     result.dx = -result.x_of(dx, dy);
-    result.dy = -(dx * result.m12 + dy * result.m22);
+    result.dy = -result.y_of(dx, dy);
     for (const double value : {result.m11, result.m12, result.m21, result.m22, result.dx, result.dy}) {
         if (!std::isfinite(value)) {
             return std::nullopt;

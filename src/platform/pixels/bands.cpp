@@ -139,8 +139,8 @@ bool Bands::contains(LONG x, LONG y) const {
 }
 
 bool Bands::operator==(const Bands& other) const {
-    return m_rectangles.size() == other.m_rectangles.size() &&
-           std::equal(m_rectangles.begin(), m_rectangles.end(), other.m_rectangles.begin(),
+    return std::equal(m_rectangles.begin(), m_rectangles.end(), other.m_rectangles.begin(),
+                      other.m_rectangles.end(),
                       [](const RECT& a, const RECT& b) { return std::memcmp(&a, &b, sizeof a) == 0; });
 }
 

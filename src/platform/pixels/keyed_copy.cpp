@@ -41,20 +41,15 @@ namespace {
 
 }  // namespace
 
+#endif
+
 void copy_words_but_key(std::uint32_t* to, const std::uint32_t* from, std::size_t count, std::uint32_t key) {
+#if defined(__x86_64__)
     if (__builtin_cpu_supports("avx2") != 0) {
-        copy_words_but_key_avx2(to, from, count, key);
-    } else {
-        copy_words_but_key_portable(to, from, count, key);
+        return copy_words_but_key_avx2(to, from, count, key);
     }
-}
-
-#else
-
-void copy_words_but_key(std::uint32_t* to, const std::uint32_t* from, std::size_t count, std::uint32_t key) {
+#endif
     copy_words_but_key_portable(to, from, count, key);
 }
-
-#endif
 
 }  // namespace basalt::platform

@@ -18,14 +18,9 @@ constexpr bool is_depth(std::uint32_t bits) {
     return bits == 1 || bits == 4 || bits == 8 || bits == 16 || bits == 24 || bits == 32;
 }
 
-// The bits of a value that a surface stores.
-constexpr std::uint32_t stored_bits(int depth) {
-    return depth == 32 ? 0xFFFFFFFF : (std::uint32_t{1} << depth) - 1;
-}
-
 // The bits of a value that determine its colour.
 constexpr std::uint32_t colour_bits(int depth) {
-    return depth == 16 ? 0x7FFF : stored_bits(depth) & COLOUR_BITS;
+    return depth > 16 ? COLOUR_BITS : depth == 16 ? 0x7FFF : (std::uint32_t{1} << depth) - 1;
 }
 
 // Between a COLORREF and a word: red and blue are swapped.

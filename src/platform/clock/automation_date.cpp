@@ -5,8 +5,8 @@
 #include <limits>
 #include <optional>
 
-#include "basalt/platform/error.h"
 #include "src/platform/clock/date_fields.h"
+#include "src/platform/system/failure.h"
 
 namespace {
 
@@ -38,8 +38,7 @@ int part_of(const COleDateTime& date, WORD SYSTEMTIME::*part) {
 
 int SystemTimeToVariantTime(SYSTEMTIME* time, DATE* date) {
     if (!is_valid(*time, FIRST_YEAR, LAST_YEAR)) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const auto days = static_cast<double>((sys_days(date_of(*time)) - ZERO).count());
     const double time_of_day = second_of_day(*time) / static_cast<double>(SECONDS_PER_DAY);
@@ -60,8 +59,7 @@ int VariantTimeToSystemTime(DATE date, SYSTEMTIME* time) {
         second = 0;
     }
     if (!is_date || day > LAST) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     *time = system_time(day, static_cast<int>(second), 0);
     return 1;

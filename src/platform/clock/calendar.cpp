@@ -5,8 +5,8 @@
 #include <chrono>
 #include <cstdint>
 
-#include "basalt/platform/error.h"
 #include "src/platform/clock/date_fields.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/ticks.h"
 
 using namespace basalt::platform;
@@ -23,8 +23,7 @@ constexpr std::int64_t TICKS_PER_DAY = 86'400 * TICKS_PER_SECOND;
 
 BOOL SystemTimeToFileTime(const SYSTEMTIME* time, FILETIME* ticks) {
     if (!is_valid(*time, FIRST_YEAR, LAST_YEAR) || time->wMilliseconds > 999) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const std::int64_t day = (sys_days(date_of(*time)) - FIRST_DAY).count();
     *ticks = file_time(day * TICKS_PER_DAY + second_of_day(*time) * TICKS_PER_SECOND +
@@ -35,8 +34,7 @@ BOOL SystemTimeToFileTime(const SYSTEMTIME* time, FILETIME* ticks) {
 BOOL FileTimeToSystemTime(const FILETIME* ticks, SYSTEMTIME* time) {
     const std::int64_t count = tick_count(*ticks);
     if (count < 0) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const auto millisecond = static_cast<int>(count % TICKS_PER_DAY / TICKS_PER_MILLISECOND);
     *time = system_time(FIRST_DAY + std::chrono::days(count / TICKS_PER_DAY), millisecond / 1000,

@@ -6,9 +6,9 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/disk/open_file.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/forks.h"
 #include "src/platform/system/handle_table.h"
-#include "src/platform/system/out_of_memory.h"
 #include "src/platform/text/file_name.h"
 
 using basalt::platform::fail_with;
@@ -27,14 +27,14 @@ constexpr DWORD KNOWN_FLAGS = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_NORMAL | FI
 // table alone: its copy may be locked by a thread that does not exist.
 constinit std::atomic<ProcessMark> s_owner = 0;
 // The files have been deleted; one opened later is deleted by its opener.
-constinit std::atomic<bool> s_is_over = false;
+constinit std::atomic<bool> s_are_deleted = false;
 
 struct DeleteAtExit {
     ~DeleteAtExit() {
         if (s_owner.load() != this_process()) {
             return;
         }
-        s_is_over.store(true);
+        s_are_deleted.store(true);
         basalt::platform::for_each_object([](basalt::platform::HandleObject& object) {
             if (object.kind() == OpenFile::KIND) {
                 static_cast<OpenFile&>(object).delete_at_exit();
@@ -43,8 +43,8 @@ struct DeleteAtExit {
     }
 };
 
-void delete_at_exit() {
-    static const DeleteAtExit s_rest;
+void register_deletion_at_exit() {
+    static const DeleteAtExit s_at_exit;
     s_owner.store(this_process());
 }
 
@@ -66,7 +66,7 @@ HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_AT
         const auto file = std::make_shared<OpenFile>();
         basalt::platform::NewHandle handle(file);
         if (deletes) {
-            delete_at_exit();
+            register_deletion_at_exit();
         }
         const DWORD error = file->open(
             path, disposition == CREATE_NEW ? OpenFile::Mode::CREATE : OpenFile::Mode::EXISTING, deletes);
@@ -74,7 +74,7 @@ HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_AT
             return fail_with(error, INVALID_HANDLE_VALUE);
         }
         const HANDLE result = handle.give();
-        if (deletes && s_is_over.load()) {
+        if (deletes && s_are_deleted.load()) {
             file->delete_at_exit();
         }
         return result;

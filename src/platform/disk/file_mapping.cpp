@@ -7,9 +7,9 @@
 #include "basalt/platform/error.h"
 #include "src/platform/disk/open_file.h"
 #include "src/platform/pages.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/handle_table.h"
 #include "src/platform/system/no_destructor.h"
-#include "src/platform/system/out_of_memory.h"
 #include "src/platform/system/registry.h"
 
 namespace basalt::platform {

@@ -16,8 +16,8 @@
 #include "src/platform/disk/wildcard.h"
 #include "src/platform/errors/error_from_errno.h"
 #include "src/platform/path_split.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/handle_table.h"
-#include "src/platform/system/out_of_memory.h"
 #include "src/platform/text/file_name.h"
 #include "src/platform/ticks.h"
 
@@ -72,13 +72,12 @@ FILETIME file_time(const statx_timestamp& time) {
     return basalt::platform::file_time(basalt::platform::ticks_of(time.tv_sec, time.tv_nsec));
 }
 
-DWORD attributes_of(mode_t mode) {
-    return S_ISDIR(mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
-}
+// The fields of a status that describe() reads.
+constexpr unsigned ALL_FIELDS = STATX_BASIC_STATS | STATX_BTIME;
 
 void describe(std::wstring_view name, mode_t mode, WIN32_FIND_DATAW& entry) {
     entry = {};
-    entry.dwFileAttributes = attributes_of(mode);
+    entry.dwFileAttributes = S_ISDIR(mode) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL;
     name.copy(entry.cFileName, std::size(entry.cFileName) - 1);
 }
 
@@ -93,33 +92,15 @@ void describe(std::wstring_view name, const struct statx& status, WIN32_FIND_DAT
 }
 
 // The status of a link's target, or of the link itself if that is missing. Links are rare, so they are not
-// followed at first: one call does for everything else, missing files included.
-bool query(int folder, const char* name, struct statx& status) {
-    constexpr unsigned WANTED = STATX_BASIC_STATS | STATX_BTIME;
-    if (statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, WANTED, &status) != 0) {
+// followed at first: one call is enough for everything else, missing files included.
+bool query(int folder, const char* name, unsigned fields, struct statx& status) {
+    if (statx(folder, name, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW, fields, &status) != 0) {
         return false;
     }
     if (S_ISLNK(status.stx_mode)) {
         struct statx target = {};
-        if (statx(folder, name, AT_NO_AUTOMOUNT, WANTED, &target) == 0) {
+        if (statx(folder, name, AT_NO_AUTOMOUNT, fields, &target) == 0) {
             status = target;
-        } else if (errno == ENOMEM) {
-            return false;
-        }
-    }
-    return true;
-}
-
-// The same for the mode alone, by the cheapest call.
-bool query_mode(const char* name, mode_t& mode) {
-    struct stat status;
-    if (fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT | AT_SYMLINK_NOFOLLOW) != 0) {
-        return false;
-    }
-    mode = status.st_mode;
-    if (S_ISLNK(mode)) {
-        if (fstatat(AT_FDCWD, name, &status, AT_NO_AUTOMOUNT) == 0) {
-            mode = status.st_mode;
         } else if (errno == ENOMEM) {
             return false;
         }
@@ -149,7 +130,7 @@ DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
             return error;
         }
         struct statx status = {};
-        if (query(dirfd(m_folder), m_found->d_name, status)) {
+        if (query(dirfd(m_folder), m_found->d_name, ALL_FIELDS, status)) {
             describe(m_name, status, entry);
         } else if (errno == ENOENT) {
             continue;  // deleted in the meantime
@@ -164,11 +145,11 @@ DWORD FileSearch::next(WIN32_FIND_DATAW& entry) {
 }
 
 // The parts of a search path.
-struct Sought {
+struct SearchPath {
     std::wstring_view folder, last;  // the last element is empty behind a separator
     bool has_wildcards = false;      // in the last element
 
-    explicit Sought(std::wstring_view path) {
+    explicit SearchPath(std::wstring_view path) {
         std::size_t start = path.size();
         for (; start > 0 && !basalt::platform::is_separator(path[start - 1]); --start) {
             has_wildcards |= path[start - 1] == L'*' || path[start - 1] == L'?';
@@ -178,40 +159,30 @@ struct Sought {
     }
 };
 
-// Calls query_name for the path. ERROR_SUCCESS or an error.
-template <class Query>
-DWORD query_path(std::wstring_view path, Query query_name) {
-    basalt::platform::FileName name;
-    if (!name.set(path)) {
-        return ERROR_INVALID_NAME;
-    }
-    return query_name(name.c_str()) ? ERROR_SUCCESS : basalt::platform::error_of_path(name.c_str(), errno);
-}
-
-DWORD query_mode_of_path(std::wstring_view path, mode_t& mode) {
-    return query_path(path, [&](const char* name) { return query_mode(name, mode); });
-}
-
 // Opens the folder of a search with wildcards. ERROR_SUCCESS or an error.
-DWORD open_folder(const Sought& sought, FileSearch& search) {
+DWORD open_folder(const SearchPath& sought, FileSearch& search) {
     basalt::platform::FileName name;
     return name.set(sought.folder.empty() ? L"." : sought.folder) ? search.open(name.c_str(), sought.last)
                                                                   : ERROR_INVALID_NAME;
 }
 
-// Begins a search and describes its first entry.
-DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& entry) {
-    const Sought sought(path);
+// Begins a search and describes its first entry by at least these fields. ERROR_SUCCESS or an error.
+DWORD find_first(const wchar_t* path, unsigned fields, FileSearch& search, WIN32_FIND_DATAW& entry) {
+    const SearchPath sought(path);
     if (sought.last.empty()) {
         return ERROR_FILE_NOT_FOUND;
     }
     if (!sought.has_wildcards) {
-        struct statx status = {};
-        const DWORD error = query_path(path, [&](const char* name) { return query(AT_FDCWD, name, status); });
-        if (error == ERROR_SUCCESS) {
-            describe(sought.last, status, entry);
+        basalt::platform::FileName name;
+        if (!name.set(path)) {
+            return ERROR_INVALID_NAME;
         }
-        return error;
+        struct statx status = {};
+        if (!query(AT_FDCWD, name.c_str(), fields, status)) {
+            return basalt::platform::error_of_path(name.c_str(), errno);
+        }
+        describe(sought.last, status, entry);
+        return ERROR_SUCCESS;
     }
     const DWORD error = open_folder(sought, search);
     if (error != ERROR_SUCCESS) {
@@ -225,37 +196,30 @@ DWORD find_first(std::wstring_view path, FileSearch& search, WIN32_FIND_DATAW& e
 
 DWORD basalt::platform::first_match_attributes(const wchar_t* path) noexcept {
     return or_out_of_memory(DWORD{0}, [&] {
-        const std::wstring_view whole = path != nullptr ? path : L"";
-        const Sought sought(whole);
-        if (sought.last.empty() || sought.has_wildcards) {
-            FileSearch search;
-            WIN32_FIND_DATAW entry;
-            const DWORD error = find_first(whole, search, entry);
-            return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
-        }
-        mode_t mode = 0;
-        const DWORD error = query_mode_of_path(whole, mode);
-        return error == ERROR_SUCCESS ? attributes_of(mode) : fail_with(error, DWORD{0});
+        FileSearch search;
+        WIN32_FIND_DATAW entry;
+        const DWORD error = find_first(path != nullptr ? path : L"", STATX_TYPE, search, entry);
+        return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
     });
 }
 
 void basalt::platform::for_each_match(const wchar_t* path, const std::function<void(const wchar_t*)>& visit) {
-    const Sought sought(path);
+    const SearchPath sought(path);
+    FileSearch search;
     DWORD error = ERROR_SUCCESS;
     if (sought.has_wildcards) {
-        FileSearch search;
         error = open_folder(sought, search);
         while (error == ERROR_SUCCESS && (error = search.advance()) == ERROR_SUCCESS) {
             visit(search.name());
         }
-    } else if (!sought.last.empty()) {
-        mode_t mode = 0;
-        error = query_mode_of_path(path, mode);
+    } else {
+        WIN32_FIND_DATAW entry;
+        error = find_first(path, STATX_TYPE, search, entry);
         if (error == ERROR_SUCCESS) {
             visit(sought.last.data());
         }
     }
-    // An incomplete list must not pass for the whole.
+    // An incomplete list is a failure.
     if (error == ERROR_NOT_ENOUGH_MEMORY) {
         throw std::bad_alloc();
     }
@@ -265,7 +229,7 @@ HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry) {
     return or_out_of_memory(INVALID_HANDLE_VALUE, [&] {
         const auto search = std::make_shared<FileSearch>();
         NewHandle handle(search);
-        const DWORD error = find_first(path != nullptr ? path : L"", *search, *entry);
+        const DWORD error = find_first(path != nullptr ? path : L"", ALL_FIELDS, *search, *entry);
         return error == ERROR_SUCCESS ? handle.give() : fail_with(error, INVALID_HANDLE_VALUE);
     });
 }

@@ -54,7 +54,7 @@ private:
 
     Lock m_guard;                      // handle and view may be closed by different threads
     int m_descriptor = -1;             // until it is mapped
-    std::byte* m_lock_page = nullptr;  // the last page of the view
+    std::byte* m_lock_page = nullptr;  // the page that is left of an unmapped view
     bool m_is_open = false;            // the handle
     std::string m_delete_path;         // absolute; empty when the file is to stay
     std::uint64_t m_device = 0;

@@ -11,7 +11,7 @@
 #include "src/platform/disk/open_file.h"
 #include "src/platform/file.h"
 #include "src/platform/path_split.h"
-#include "src/platform/system/out_of_memory.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/text/file_name.h"
 
 using basalt::platform::fail_with;

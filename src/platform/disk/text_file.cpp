@@ -11,8 +11,8 @@
 #include <string>
 
 #include "src/platform/code_page.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/forks.h"
-#include "src/platform/system/out_of_memory.h"
 #include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"
 

@@ -6,11 +6,11 @@
 #include <cstring>
 #include <new>
 
-#include "basalt/platform/error.h"
 #include "src/platform/drawing/objects.h"
 #include "src/platform/pixels/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
 #include "src/platform/raster_extras.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/no_destructor.h"
 
 namespace {
@@ -39,11 +39,6 @@ void take_rows(Surface& surface, const void* bits) {
     for (int y = 0; y < surface.height; ++y, from += row_bytes) {
         copy_pixels(surface.depth, surface.row(y), 0, from, 0, surface.width);
     }
-}
-
-int refuse() {
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return 0;
 }
 
 bool fits(const BITMAPINFOHEADER& header, const Surface& surface) {
@@ -87,8 +82,7 @@ HBITMAP CreateCompatibleBitmap(HDC dc, int width, int height) {
 
 HBITMAP CreateBitmap(int width, int height, UINT planes, UINT bits_per_pixel, const void* bits) {
     if (planes != 1 || !is_depth(bits_per_pixel)) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return nullptr;
+        return fail_with(ERROR_INVALID_PARAMETER, nullptr);
     }
     std::unique_ptr<Bitmap> bitmap = make_bitmap(width, height, static_cast<int>(bits_per_pixel));
     if (bitmap != nullptr && bits != nullptr && width != 0 && height != 0) {
@@ -103,7 +97,7 @@ int GetDIBits(HDC dc, HBITMAP bitmap, UINT first, UINT count, void* bits, BITMAP
         return 0;
     }
     if (info == nullptr || usage != DIB_RGB_COLORS || info->bmiHeader.biSize != sizeof(BITMAPINFOHEADER)) {
-        return refuse();
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const Surface& surface = source->surface;
     BITMAPINFOHEADER& header = info->bmiHeader;
@@ -117,7 +111,7 @@ int GetDIBits(HDC dc, HBITMAP bitmap, UINT first, UINT count, void* bits, BITMAP
         return 1;
     }
     if (!fits(header, surface)) {
-        return refuse();
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const int depth = header.biBitCount;
     const std::int64_t row_bytes = image_row_bytes(surface.width, depth);
@@ -126,7 +120,7 @@ int GetDIBits(HDC dc, HBITMAP bitmap, UINT first, UINT count, void* bits, BITMAP
         query ? surface.height : std::min<std::int64_t>(surface.height, std::int64_t{first} + count);
     const std::int64_t rows = query ? last : std::max<std::int64_t>(last - first, 0);
     if (rows * row_bytes > UINT32_MAX || rows == 0) {
-        return refuse();
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     header.biSizeImage = static_cast<DWORD>(rows * row_bytes);
     write_table(info, depth);
@@ -162,21 +156,13 @@ std::uint32_t basalt::platform::row_value(int depth, COLORREF colour) {
 CBitmap* CBitmap::FromHandle(HBITMAP bitmap) {
     if (bitmap == stock_bitmap()) {
         // Never destroyed: a host's static objects may still use it while the library unloads.
-        static CBitmap* const lent = [bitmap] {
-            static NoDestructor<CBitmap> wrapper;
-            wrapper->Attach(bitmap);
-            return &*wrapper;
-        }();
-        // DeleteObject of the wrapper detaches the handle. Written only then: threads share the wrapper.
-        if (lent->m_hObject != bitmap) {
-            lent->m_hObject = bitmap;
-        }
-        return lent;
+        struct Wrapper {
+            CBitmap lent;
+            Wrapper() { lent.Attach(stock_bitmap()); }
+        };
+        static NoDestructor<Wrapper> wrapper;
+        return lend(wrapper->lent, bitmap);
     }
     auto* const object = object_of<Bitmap>(bitmap);
-    if (object == nullptr) {
-        return nullptr;
-    }
-    object->lent.m_hObject = bitmap;
-    return &object->lent;
+    return object != nullptr ? lend(object->lent, bitmap) : nullptr;
 }

@@ -4,8 +4,8 @@
 #include <optional>
 
 #include "basalt/platform/drawing.h"
-#include "basalt/platform/error.h"
 #include "src/platform/pixels/pixel_rows.h"
+#include "src/platform/system/failure.h"
 
 namespace basalt::platform {
 
@@ -21,8 +21,7 @@ std::optional<DWORD> operation_of(DWORD rop) {
             return operation;
         }
     }
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return std::nullopt;
+    return fail_with(ERROR_INVALID_PARAMETER, std::nullopt);
 }
 
 // Replaces source values by their combination with those present.

@@ -9,10 +9,10 @@
 #include <climits>
 #include <cstring>
 
-#include "basalt/platform/error.h"
 #include "src/platform/errors/error_from_errno.h"
 #include "src/platform/pixels/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"
 
@@ -138,13 +138,11 @@ void delete_begun(const char* name, const struct stat& begun) {
 bool write_bmp_file(const Surface& surface, const wchar_t* name) {
     FileName file_name;
     if (!file_name.set(name)) {
-        SetLastError(ERROR_INVALID_NAME);
-        return false;
+        return fail_with(ERROR_INVALID_NAME, false);
     }
     const int file = open_output(file_name.c_str(), 0);
     if (file < 0) {
-        set_last_error_from_errno();
-        return false;
+        return fail_with(error_from_errno(errno), false);
     }
     struct stat begun = {};
     (void)::fstat(file, &begun);  // if it fails, the file stays, empty
@@ -170,10 +168,7 @@ bool write_bmp_file(const Surface& surface, const wchar_t* name) {
     if (::close(open) != 0 && error == 0 && last < 0) {
         error = errno;
     }
-    if (error != 0) {
-        SetLastError(error_from_errno(error));
-    }
-    return error == 0;
+    return error == 0 || fail_with(error_from_errno(error), false);
 }
 
 }  // namespace basalt::platform

@@ -3,14 +3,15 @@
 #include <new>
 #include <utility>
 
-#include "basalt/platform/error.h"
 #include "src/platform/drawing/objects.h"
+#include "src/platform/system/failure.h"
 
 namespace {
 
 using basalt::platform::Bitmap;
 using basalt::platform::Brush;
 using basalt::platform::Context;
+using basalt::platform::fail_with;
 using basalt::platform::object_of;
 
 HDC keep_context(bool is_screen) {
@@ -46,12 +47,10 @@ HGDIOBJ exchange_bitmap(Context& context, HGDIOBJ next) {
         return nullptr;
     }
     if (context.is_screen) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return nullptr;
+        return fail_with(ERROR_INVALID_PARAMETER, nullptr);
     }
     if (bitmap != nullptr && bitmap != context.bitmap && bitmap->is_selected) {
-        SetLastError(ERROR_BUSY);
-        return nullptr;
+        return fail_with(ERROR_BUSY, nullptr);
     }
     if (context.bitmap != nullptr) {
         context.bitmap->is_selected = false;
@@ -70,8 +69,7 @@ BOOL end_context(HDC dc, bool is_screen) {
         return 0;
     }
     if (context->is_screen != is_screen) {
-        SetLastError(ERROR_INVALID_HANDLE);
-        return 0;
+        return fail_with(ERROR_INVALID_HANDLE, 0);
     }
     return basalt::platform::release_graphics_object(dc) != nullptr;
 }
@@ -104,16 +102,14 @@ BOOL DeleteDC(HDC dc) {
 
 HDC GetDC(HWND window) {
     if (window != nullptr) {
-        SetLastError(ERROR_INVALID_HANDLE);
-        return nullptr;
+        return fail_with(ERROR_INVALID_HANDLE, nullptr);
     }
     return keep_context(true);
 }
 
 int ReleaseDC(HWND window, HDC dc) {
     if (window != nullptr) {
-        SetLastError(ERROR_INVALID_HANDLE);
-        return 0;
+        return fail_with(ERROR_INVALID_HANDLE, 0);
     }
     return end_context(dc, true);
 }

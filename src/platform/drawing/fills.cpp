@@ -5,11 +5,11 @@
 #include <optional>
 
 #include "basalt/platform/drawing.h"
-#include "basalt/platform/error.h"
 #include "src/platform/drawing/objects.h"
 #include "src/platform/pixels/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
 #include "src/platform/raster_extras.h"
+#include "src/platform/system/failure.h"
 
 namespace {
 
@@ -140,8 +140,7 @@ int FillRect(HDC dc, const RECT* rectangle, HBRUSH brush) {
         return 0;
     }
     if (rectangle == nullptr) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const std::optional<Paint> paint = paint_of(brush);
     const std::optional<PixelShift> shift = paint ? context->required_shift() : std::nullopt;

@@ -1,14 +1,14 @@
 // Rectangles filled with a gradient.
 #include <algorithm>
-#include <cstring>
 #include <optional>
+#include <span>
 #include <utility>
 
 #include "basalt/platform/drawing.h"
-#include "basalt/platform/error.h"
 #include "src/platform/drawing/objects.h"
 #include "src/platform/pixels/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
+#include "src/platform/system/failure.h"
 
 namespace {
 
@@ -129,8 +129,7 @@ BOOL GradientFill(HDC dc, const TRIVERTEX* vertices, DWORD vertex_count, const v
     };
     if (vertices == nullptr || mesh == nullptr || mode > GRADIENT_FILL_RECT_V ||
         !std::all_of(rectangles, rectangles + mesh_count, is_drawable)) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const std::optional<PixelShift> shift = context->required_shift();
     if (!shift) {

@@ -3,7 +3,7 @@
 #include <atomic>
 #include <mutex>
 
-#include "basalt/platform/error.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/lock.h"
 
 namespace basalt::platform {
@@ -39,8 +39,7 @@ Slot& slot_of(const void* handle) {
 
 void* keep_graphics_object(std::unique_ptr<GraphicsObject> object) {
     if (object == nullptr) {
-        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-        return nullptr;
+        return fail_with(ERROR_NOT_ENOUGH_MEMORY, nullptr);
     }
     const std::lock_guard hold(slots_lock);
     std::uint32_t number = slots_used;
@@ -50,8 +49,7 @@ void* keep_graphics_object(std::unique_ptr<GraphicsObject> object) {
     } else if (slots_used < SLOTS) {
         ++slots_used;
     } else {
-        SetLastError(ERROR_NO_SYSTEM_RESOURCES);
-        return nullptr;
+        return fail_with(ERROR_NO_SYSTEM_RESOURCES, nullptr);
     }
     Slot& slot = slots[number];
     slot.object.store(object.release(), std::memory_order_release);
@@ -82,8 +80,7 @@ std::unique_ptr<GraphicsObject> release_graphics_object(const void* handle) {
 GraphicsObject* object_of_kind(const void* handle, GraphicsKind kind) {
     GraphicsObject* const object = find_graphics_object(handle);
     if (object == nullptr || object->kind != kind) {
-        SetLastError(ERROR_INVALID_HANDLE);
-        return nullptr;
+        return fail_with(ERROR_INVALID_HANDLE, nullptr);
     }
     return object;
 }

@@ -5,13 +5,14 @@
 #include <cstring>
 #include <new>
 
-#include "basalt/platform/error.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/no_destructor.h"
 
 namespace {
 
 using basalt::platform::Bitmap;
 using basalt::platform::Brush;
+using basalt::platform::fail_with;
 using basalt::platform::GraphicsKind;
 using basalt::platform::GraphicsObject;
 using basalt::platform::Paint;
@@ -102,8 +103,7 @@ BOOL DeleteObject(HGDIOBJ object) {
     const GraphicsObject* const found = basalt::platform::find_graphics_object(object);
     const DWORD error = found != nullptr ? deletion_error(*found) : ERROR_INVALID_HANDLE;
     if (error != ERROR_SUCCESS) {
-        SetLastError(error);
-        return 0;
+        return fail_with(error, 0);
     }
     return basalt::platform::release_graphics_object(object) != nullptr;
 }
@@ -127,8 +127,7 @@ int GetObjectW(HGDIOBJ object, int size, void* record) {
         return RECORD_SIZE;
     }
     if (size < RECORD_SIZE) {
-        SetLastError(ERROR_INSUFFICIENT_BUFFER);
-        return 0;
+        return fail_with(ERROR_INSUFFICIENT_BUFFER, 0);
     }
     std::memcpy(record, &description, sizeof description);
     return RECORD_SIZE;
@@ -136,8 +135,7 @@ int GetObjectW(HGDIOBJ object, int size, void* record) {
 
 HGDIOBJ GetStockObject(int number) {
     if (number < WHITE_BRUSH || number > NULL_PEN) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return nullptr;
+        return fail_with(ERROR_INVALID_PARAMETER, nullptr);
     }
     return stock_handle(static_cast<std::uintptr_t>(number));
 }
@@ -159,20 +157,8 @@ CBrush* CBrush::FromHandle(HBRUSH brush) {
             }
         };
         static basalt::platform::NoDestructor<Wrappers> wrappers;
-        CBrush& wrapper = wrappers->lent[stock_number(brush)];
-        // DeleteObject of the wrapper detaches the handle. Written only then: threads share the wrapper.
-        if (wrapper.m_hObject != brush) {
-            wrapper.m_hObject = brush;
-        }
-        return &wrapper;
+        return basalt::platform::lend(wrappers->lent[stock_number(brush)], brush);
     }
     auto* const object = basalt::platform::object_of<Brush>(brush);
-    if (object == nullptr) {
-        return nullptr;
-    }
-    // Written once: threads may share the brush.
-    if (object->lent.m_hObject != brush) {
-        object->lent.m_hObject = brush;
-    }
-    return &object->lent;
+    return object != nullptr ? basalt::platform::lend(object->lent, brush) : nullptr;
 }

@@ -25,6 +25,16 @@ HGDIOBJ stock_bitmap();
 bool is_stock_object(const void* handle);
 bool is_stock_pen(const void* handle);
 
+// The wrapper that FromHandle returns. Its DeleteObject takes the handle out; written only after that, since
+// threads share the wrappers of brushes and stock objects.
+template <typename Wrapper>
+Wrapper* lend(Wrapper& wrapper, HGDIOBJ handle) {
+    if (wrapper.m_hObject != handle) {
+        wrapper.m_hObject = handle;
+    }
+    return &wrapper;
+}
+
 // The paint of a brush; nothing, and ERROR_INVALID_HANDLE, for another handle.
 std::optional<Paint> paint_of(const void* brush);
 bool is_brush(const void* handle);

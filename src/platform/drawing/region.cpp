@@ -6,18 +6,20 @@
 #include <new>
 #include <utility>
 
-#include "basalt/platform/error.h"
-#include "src/platform/drawing/handles.h"
+#include "src/platform/drawing/objects.h"
 #include "src/platform/pixels/bands.h"
 #include "src/platform/raster_extras.h"
+#include "src/platform/system/failure.h"
 
 namespace {
 
 using basalt::platform::Bands;
+using basalt::platform::fail_with;
 using basalt::platform::GraphicsKind;
 using basalt::platform::GraphicsObject;
 using basalt::platform::Keep;
 using basalt::platform::object_of;
+using basalt::platform::or_out_of_memory;
 
 struct DrawingRegion : GraphicsObject {
     static constexpr GraphicsKind KIND = GraphicsKind::REGION;
@@ -33,25 +35,8 @@ struct DrawingRegion : GraphicsObject {
     CRgn lent;  // what CRgn::FromHandle lends
 };
 
-int refuse(DWORD error) {
-    SetLastError(error);
-    return RGN_ERROR;
-}
-
-Bands combined(const Bands& a, const Bands& b, int mode) {
-    switch (mode) {
-        case RGN_AND:
-            return basalt::platform::combined(a, b, Keep::AND);
-        case RGN_OR:
-            return basalt::platform::combined(a, b, Keep::OR);
-        case RGN_XOR:
-            return basalt::platform::combined(a, b, Keep::XOR);
-        case RGN_DIFF:
-            return basalt::platform::combined(a, b, Keep::DIFF);
-        default:
-            return a;
-    }
-}
+// By mode, from RGN_AND to RGN_DIFF.
+constexpr Keep KEPT[] = {Keep::AND, Keep::OR, Keep::XOR, Keep::DIFF};
 
 }  // namespace
 
@@ -63,16 +48,11 @@ HRGN basalt::platform::create_region(std::vector<RECT> rectangles) {
 HRGN CreateRectRgn(int left, int top, int right, int bottom) {
     const auto [first_column, end_column] = std::minmax(left, right);
     const auto [first_row, end_row] = std::minmax(top, bottom);
-    try {
-        std::vector<RECT> rectangles;
-        if (left != right && top != bottom) {
-            rectangles.push_back({first_column, first_row, end_column, end_row});
-        }
-        return basalt::platform::create_region(std::move(rectangles));
-    } catch (const std::bad_alloc&) {
-        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-        return nullptr;
-    }
+    const RECT rectangle = {first_column, first_row, end_column, end_row};
+    const bool is_empty = left == right || top == bottom;
+    return or_out_of_memory(HRGN{nullptr}, [&] {
+        return basalt::platform::create_region(std::vector<RECT>(is_empty ? 0 : 1, rectangle));
+    });
 }
 
 int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {
@@ -83,14 +63,13 @@ int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {
         return RGN_ERROR;
     }
     if (mode < RGN_AND || mode > RGN_COPY) {
-        return refuse(ERROR_INVALID_PARAMETER);
+        return fail_with(ERROR_INVALID_PARAMETER, RGN_ERROR);
     }
-    try {
-        result->bands = combined(first->bands, second->bands, mode);
-    } catch (const std::bad_alloc&) {
-        return refuse(ERROR_NOT_ENOUGH_MEMORY);
-    }
-    return result->complexity();
+    return or_out_of_memory(RGN_ERROR, [&] {
+        result->bands =
+            mode == RGN_COPY ? first->bands : combined(first->bands, second->bands, KEPT[mode - RGN_AND]);
+        return result->complexity();
+    });
 }
 
 int OffsetRgn(HRGN region, int x, int y) {
@@ -98,7 +77,7 @@ int OffsetRgn(HRGN region, int x, int y) {
     if (found == nullptr) {
         return RGN_ERROR;
     }
-    return found->bands.shift(x, y) ? found->complexity() : refuse(ERROR_INVALID_PARAMETER);
+    return found->bands.shift(x, y) ? found->complexity() : fail_with(ERROR_INVALID_PARAMETER, RGN_ERROR);
 }
 
 BOOL PtInRegion(HRGN region, int x, int y) {
@@ -112,7 +91,7 @@ int GetRgnBox(HRGN region, RECT* box) {
         return RGN_ERROR;
     }
     if (box == nullptr) {
-        return refuse(ERROR_INVALID_PARAMETER);
+        return fail_with(ERROR_INVALID_PARAMETER, RGN_ERROR);
     }
     *box = found->bands.box();
     return found->complexity();
@@ -127,8 +106,7 @@ DWORD GetRegionData(HRGN region, DWORD size, RGNDATA* data) {
     const std::size_t bytes = rectangles.size() * sizeof(RECT);
     const std::size_t needed = sizeof(RGNDATAHEADER) + bytes;
     if (needed > std::numeric_limits<DWORD>::max() || (data != nullptr && size < needed)) {
-        SetLastError(ERROR_INSUFFICIENT_BUFFER);
-        return 0;
+        return fail_with(ERROR_INSUFFICIENT_BUFFER, DWORD{0});
     }
     if (data != nullptr) {
         const RGNDATAHEADER header = {sizeof(RGNDATAHEADER), RDH_RECTANGLES,
@@ -152,9 +130,5 @@ BOOL EqualRgn(HRGN a, HRGN b) {
 
 CRgn* CRgn::FromHandle(HRGN region) {
     auto* const object = object_of<DrawingRegion>(region);
-    if (object == nullptr) {
-        return nullptr;
-    }
-    object->lent.m_hObject = region;
-    return &object->lent;
+    return object != nullptr ? basalt::platform::lend(object->lent, region) : nullptr;
 }

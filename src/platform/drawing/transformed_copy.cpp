@@ -3,9 +3,9 @@
 #include <cstddef>
 #include <optional>
 
-#include "basalt/platform/error.h"
 #include "src/platform/drawing/block_copy.h"
 #include "src/platform/pixels/pixel_rows.h"
+#include "src/platform/system/failure.h"
 
 namespace basalt::platform {
 
@@ -49,8 +49,7 @@ bool copy_transformed(Context& destination, const Box& target, const Context& so
                       std::int64_t source_y, const RowWriter& writer) {
     const Affine& world = source.world;
     if (world.m12 != 0 || world.m21 != 0) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return false;
+        return fail_with(ERROR_INVALID_PARAMETER, false);
     }
     if (target.is_empty()) {
         return true;
@@ -81,8 +80,7 @@ bool copy_transformed(Context& destination, const Box& target, const Context& so
                            std::min(x_limit, static_cast<double>(from->width)),
                            std::min(y_limit, static_cast<double>(from->height)));
     if (!rows) {
-        SetLastError(ERROR_ARITHMETIC_OVERFLOW);
-        return false;
+        return fail_with(ERROR_ARITHMETIC_OVERFLOW, false);
     }
     const bool words = writer.is_plain_copy() && surface.depth == 32;
     for (int y = 0; y < surface.height; ++y) {

@@ -5,13 +5,14 @@
 #include <utility>
 
 #include "basalt/platform/device_context.h"
-#include "basalt/platform/error.h"
 #include "src/platform/drawing/objects.h"
+#include "src/platform/system/failure.h"
 
 namespace {
 
 using basalt::platform::Affine;
 using basalt::platform::Context;
+using basalt::platform::fail_with;
 using basalt::platform::object_of;
 
 bool fits(double value) {
@@ -29,8 +30,7 @@ std::optional<Affine> affine_of(const XFORM* transform) {
 // Sets a transform where the mode permits one and it can be undone.
 BOOL set_world(Context& context, const std::optional<Affine>& world) {
     if (context.graphics_mode != GM_ADVANCED || !world || !world->inverse()) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     context.world = *world;
     return 1;
@@ -44,8 +44,7 @@ int SetMapMode(HDC dc, int mode) {
         return 0;
     }
     if (mode != MM_TEXT && mode != MM_ANISOTROPIC) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     return std::exchange(context->map_mode, mode);
 }
@@ -61,8 +60,7 @@ BOOL DPtoLP(HDC dc, POINT* points, int count) {
         return 0;
     }
     if (count < 0 || (points == nullptr && count > 0)) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     if (context->world == Affine()) {
         return 1;
@@ -75,8 +73,7 @@ BOOL DPtoLP(HDC dc, POINT* points, int count) {
     for (int i = 0; i < count; ++i) {
         const auto [x, y] = logical(points[i]);
         if (!fits(x) || !fits(y)) {
-            SetLastError(ERROR_ARITHMETIC_OVERFLOW);
-            return 0;
+            return fail_with(ERROR_ARITHMETIC_OVERFLOW, 0);
         }
     }
     for (int i = 0; i < count; ++i) {
@@ -91,10 +88,9 @@ int SetGraphicsMode(HDC dc, int mode) {
     if (context == nullptr) {
         return 0;
     }
-    const bool stays_possible = mode == GM_COMPATIBLE ? context->world == Affine() : mode == GM_ADVANCED;
-    if (!stays_possible) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+    const bool is_allowed = mode == GM_COMPATIBLE ? context->world == Affine() : mode == GM_ADVANCED;
+    if (!is_allowed) {
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     return std::exchange(context->graphics_mode, mode);
 }

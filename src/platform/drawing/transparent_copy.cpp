@@ -1,13 +1,13 @@
 // A copy, stretched where the sizes differ, that leaves out the pixels of one colour.
-#include <algorithm>
-#include <cstring>
+#include <optional>
+#include <span>
 
 #include "basalt/platform/drawing.h"
-#include "basalt/platform/error.h"
 #include "src/platform/drawing/objects.h"
 #include "src/platform/pixels/keyed_copy.h"
 #include "src/platform/pixels/pixel_format.h"
 #include "src/platform/pixels/pixel_rows.h"
+#include "src/platform/system/failure.h"
 
 namespace {
 
@@ -100,8 +100,7 @@ BOOL TransparentBlt(HDC dc, int x, int y, int width, int height, HDC source, int
         return 0;
     }
     if (width < 0 || height < 0 || source_width < 0 || source_height < 0) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const std::optional<PixelShift> shift = to->required_shift();
     const std::optional<PixelShift> source_shift = from->required_shift();

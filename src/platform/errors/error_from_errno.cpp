@@ -61,10 +61,6 @@ DWORD error_from_errno(int number) {
     return row != std::end(ROWS) ? row->code : ERROR_GEN_FAILURE;
 }
 
-void set_last_error_from_errno() {
-    SetLastError(error_from_errno(errno));
-}
-
 DWORD error_of_path(std::string_view path, int number) {
     if (number != ENOENT) {
         return error_from_errno(number);

@@ -12,9 +12,6 @@ namespace basalt::platform {
 // callers for which a number means something else (EAGAIN of a lock) set the code themselves.
 DWORD error_from_errno(int number);
 
-// Sets the calling thread's last error from errno, directly after the failed call.
-void set_last_error_from_errno();
-
 // The code for an errno value of a call with a path; distinguishes a missing file from a missing folder.
 DWORD error_of_path(std::string_view path, int number);
 

@@ -6,7 +6,7 @@
 #include <iterator>
 #include <string_view>
 
-#include "basalt/platform/error.h"
+#include "src/platform/system/failure.h"
 
 namespace {
 
@@ -69,8 +69,7 @@ DWORD FormatMessageW(DWORD flags, const void* /*source*/, DWORD code, DWORD lang
         *buffer = nullptr;
     }
     if (flags != SUPPORTED_FLAGS || language != 0 || buffer == nullptr) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return 0;
+        return basalt::platform::fail_with(ERROR_INVALID_PARAMETER, DWORD{0});
     }
     const auto* known = std::lower_bound(std::begin(MESSAGES), std::end(MESSAGES), code,
                                          [](const Message& m, DWORD wanted) { return m.code < wanted; });
@@ -81,8 +80,7 @@ DWORD FormatMessageW(DWORD flags, const void* /*source*/, DWORD code, DWORD lang
     const std::size_t capacity = std::max<std::size_t>(size, text.size() + MAX_DIGITS + 1);
     auto* const message = static_cast<wchar_t*>(std::malloc(capacity * sizeof(wchar_t)));
     if (message == nullptr) {
-        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-        return 0;
+        return basalt::platform::fail_with(ERROR_NOT_ENOUGH_MEMORY, DWORD{0});
     }
     wchar_t* const end = std::copy(digits, digits_end, std::copy(text.begin(), text.end(), message));
     *end = L'\0';

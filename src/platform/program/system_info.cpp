@@ -4,11 +4,12 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <string>
 
 #include "basalt/platform/error.h"
 #include "src/platform/errors/error_from_errno.h"
-#include "src/platform/system/out_of_memory.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/text/file_name.h"
 
 using basalt::platform::fail_with;
@@ -36,8 +37,7 @@ DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
     char link[PATH_MAX];
     const ssize_t length = ::readlink("/proc/self/exe", link, sizeof link);
     if (length < 0) {
-        basalt::platform::set_last_error_from_errno();
-        return 0;
+        return fail_with(basalt::platform::error_from_errno(errno), DWORD{0});
     }
     return basalt::platform::or_out_of_memory(DWORD{0}, [&] {
         std::wstring wide;

@@ -14,7 +14,7 @@
 
 #include "basalt/platform/error.h"
 #include "src/platform/errors/error_from_errno.h"
-#include "src/platform/system/out_of_memory.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"
 
@@ -135,14 +135,10 @@ std::optional<Range> find_block(const BoundedFile& file) {
 
 std::optional<Range> open_block(const BoundedFile& file) {
     if (!file.is_open()) {
-        basalt::platform::set_last_error_from_errno();
-        return std::nullopt;
+        return fail_with(basalt::platform::error_from_errno(errno), std::nullopt);
     }
     const std::optional<Range> block = find_block(file);
-    if (!block) {
-        SetLastError(ERROR_RESOURCE_DATA_NOT_FOUND);
-    }
-    return block;
+    return block ? block : fail_with(ERROR_RESOURCE_DATA_NOT_FOUND, std::nullopt);
 }
 
 // Empty, which opens nothing, for a name that is not a valid one.

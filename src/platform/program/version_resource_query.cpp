@@ -3,7 +3,7 @@
 #include <optional>
 #include <string_view>
 
-#include "basalt/platform/error.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system_info.h"
 #include "src/platform/text/utf8.h"
 
@@ -134,8 +134,7 @@ BOOL VerQueryValueW(const void* block, const wchar_t* path, void** value, UINT* 
     const bool wants_root = keys.empty() || keys == L"\\";
     const std::optional<Node> node = find(nodes, keys);
     if (!node || (wants_root && !is_fixed_information(nodes, *node))) {
-        SetLastError(ERROR_RESOURCE_TYPE_NOT_FOUND);
-        return 0;
+        return basalt::platform::fail_with(ERROR_RESOURCE_TYPE_NOT_FOUND, 0);
     }
     *value = const_cast<unsigned char*>(nodes.at(node->value));
     // Its place decides whether it is a text: the caller would read too far if the node's own word did.

@@ -7,8 +7,8 @@
 
 namespace basalt::platform {
 
-// Tells a forked child from its parent: the number of forks since counting began. A process id would not do:
-// a child in a namespace of its own may have its parent's.
+// Distinguishes a forked child from its parent: the number of forks since counting began. A process id would
+// not do: a child in a namespace of its own may have its parent's.
 using ProcessMark = std::uint32_t;
 
 // Starts counting; called before the first mark is taken. False when out of memory.

@@ -3,8 +3,9 @@
 #include <atomic>
 #include <utility>
 
+#include "src/platform/file.h"
+#include "src/platform/system/failure.h"
 #include "src/platform/system/no_destructor.h"
-#include "src/platform/system/out_of_memory.h"
 
 namespace basalt::platform {
 namespace {

@@ -8,7 +8,6 @@
 #include <memory>
 
 #include "basalt/platform/types.h"
-#include "src/platform/file.h"
 #include "src/platform/system/registry.h"
 
 namespace basalt::platform {

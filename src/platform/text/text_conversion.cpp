@@ -9,17 +9,13 @@
 #include <iterator>
 #include <string_view>
 
-#include "basalt/platform/error.h"
 #include "src/platform/code_page.h"
+#include "src/platform/system/failure.h"
 
 using basalt::platform::active_code_page;
+using basalt::platform::fail_with;
 
 namespace {
-
-int fail(DWORD code) {
-    SetLastError(code);
-    return 0;
-}
 
 template <class Source, class Destination>
 bool are_valid(const Source* source, int length, const Destination* destination, int capacity) {
@@ -36,7 +32,7 @@ std::basic_string_view<Character> view_of(const Character* source, int length) {
 
 int result_of(std::size_t needed, int capacity) {
     if (needed > INT_MAX || (capacity != 0 && needed > static_cast<std::size_t>(capacity))) {
-        return fail(ERROR_INSUFFICIENT_BUFFER);
+        return fail_with(ERROR_INSUFFICIENT_BUFFER, 0);
     }
     return static_cast<int>(needed);
 }
@@ -63,7 +59,7 @@ int MultiByteToWideChar(UINT code_page, DWORD flags, const char* source, int len
                         int capacity) {
     if (code_page != CP_ACP || (flags & ~MB_PRECOMPOSED) != 0 ||
         !are_valid(source, length, destination, capacity)) {
-        return fail(ERROR_INVALID_PARAMETER);
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     const std::size_t needed =
         active_code_page().widen_to(view_of(source, length), destination, static_cast<std::size_t>(capacity));
@@ -76,7 +72,7 @@ int WideCharToMultiByte(UINT code_page, DWORD flags, const wchar_t* source, int 
     // NOLINTEND(readability-non-const-parameter)
     if (code_page != CP_ACP || flags != 0 || default_character != nullptr || used_default != nullptr ||
         !are_valid(source, length, destination, capacity)) {
-        return fail(ERROR_INVALID_PARAMETER);
+        return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
     return result_of(narrow_to(view_of(source, length), destination, static_cast<std::size_t>(capacity)),
                      capacity);

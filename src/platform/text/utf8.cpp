@@ -171,10 +171,4 @@ std::size_t write_wide(std::string_view text, wchar_t* characters, std::size_t c
     return count;
 }
 
-std::wstring wide_from_utf8(std::string_view text) {
-    std::wstring result(text.size(), L'\0');
-    result.resize(write_wide(text, result.data(), result.size()));
-    return result;
-}
-
 }  // namespace basalt::platform

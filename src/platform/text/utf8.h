@@ -35,7 +35,6 @@ std::string utf8_from_wide(std::wstring_view text);
 // overlong forms, surrogates, values beyond 0x10FFFF and truncated characters. Writes up to `capacity`
 // characters and returns the number in the whole text, at most one per byte.
 std::size_t write_wide(std::string_view text, wchar_t* characters, std::size_t capacity);
-std::wstring wide_from_utf8(std::string_view text);
 
 }  // namespace basalt::platform
 

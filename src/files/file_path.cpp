@@ -13,8 +13,8 @@ using basalt::platform::first_match_attributes;
 using basalt::platform::is_separator;
 using SearchScoper = HANDLEScoperBase<FindFileHandleCloser>;
 
-// After a failed search: out of memory must not pass for "no entry".
-void require_memory() {
+// After a failed search: being out of memory is not the same as finding no entry.
+void throw_if_out_of_memory() {
     if (GetLastError() == ERROR_NOT_ENOUGH_MEMORY) {
         throw std::bad_alloc();
     }
@@ -24,7 +24,7 @@ void require_memory() {
 DWORD entry_attributes(const CString& path) {
     const DWORD attributes = first_match_attributes(path);
     if (attributes == 0) {
-        require_memory();
+        throw_if_out_of_memory();
     }
     return attributes;
 }
@@ -32,7 +32,7 @@ DWORD entry_attributes(const CString& path) {
 HANDLE find_first(const CString& path, WIN32_FIND_DATAW& entry) {
     const HANDLE search = FindFirstFileW(path, &entry);
     if (search == INVALID_HANDLE_VALUE) {
-        require_memory();
+        throw_if_out_of_memory();
         return nullptr;
     }
     return search;
@@ -46,7 +46,7 @@ bool find_time(const CString& path, FILETIME WIN32_FIND_DATAW::*which, FILETIME&
         return false;
     }
     if (FindNextFileW(search.get(), &entry) == 0) {
-        require_memory();
+        throw_if_out_of_memory();
     }
     time = entry.*which;
     return true;

@@ -71,7 +71,8 @@ static_assert(sizeof(VS_FIXEDFILEINFO) == 52);
 
 // Bytes of a file's version resource. `handle` is set to 0 when it is not null. 0 on failure:
 // ERROR_RESOURCE_DATA_NOT_FOUND for a file that is not a program of this system, has no such section or is
-// shorter than it claims, and for a block longer than its section; ERROR_NOT_ENOUGH_MEMORY.
+// shorter than it claims, and for a block longer than its section; the system's error for a file that cannot
+// be opened; ERROR_NOT_ENOUGH_MEMORY.
 // Threads: thread-safe.
 DWORD GetFileVersionInfoSizeW(const wchar_t* file, DWORD* handle);
 

@@ -15,9 +15,8 @@ public:
     constexpr CSize(SIZE size) : SIZE(size) {}                         ///< a copy
 
     constexpr bool operator==(SIZE b) const { return cx == b.cx && cy == b.cy; }  ///< both are equal
-    constexpr bool operator==(const CSize& b) const {
-        return *this == static_cast<const SIZE&>(b);
-    }                                                                           ///< as above
+    /// The same for two objects: C++20 finds the one above ambiguous.
+    constexpr bool operator==(const CSize& b) const { return *this == static_cast<const SIZE&>(b); }
     constexpr bool operator!=(SIZE b) const { return !(*this == b); }           ///< one differs
     constexpr CSize operator+(SIZE b) const { return {cx + b.cx, cy + b.cy}; }  ///< sum
     constexpr CSize operator-(SIZE b) const { return {cx - b.cx, cy - b.cy}; }  ///< difference
@@ -37,9 +36,8 @@ public:
     constexpr void Offset(LONG dx, LONG dy) { x += dx, y += dy; }              ///< moves
     constexpr void Offset(SIZE by) { Offset(by.cx, by.cy); }                   ///< moves
     constexpr bool operator==(POINT b) const { return x == b.x && y == b.y; }  ///< the same point
-    constexpr bool operator==(const CPoint& b) const {
-        return *this == static_cast<const POINT&>(b);
-    }                                                                             ///< as above
+    /// The same for two objects: C++20 finds the one above ambiguous.
+    constexpr bool operator==(const CPoint& b) const { return *this == static_cast<const POINT&>(b); }
     constexpr bool operator!=(POINT b) const { return !(*this == b); }            ///< another point
     constexpr CPoint operator+(SIZE by) const { return {x + by.cx, y + by.cy}; }  ///< the point moved
     constexpr CPoint operator-(SIZE by) const { return {x - by.cx, y - by.cy}; }  ///< the point moved back
@@ -92,9 +90,8 @@ public:
     constexpr void OffsetRect(LONG x, LONG y) { *this = CRect(left + x, top + y, right + x, bottom + y); }
     constexpr void OffsetRect(POINT by) { OffsetRect(by.x, by.y); }   ///< moves
     constexpr void OffsetRect(SIZE by) { OffsetRect(by.cx, by.cy); }  ///< moves
-    constexpr void MoveToXY(LONG x, LONG y) {
-        OffsetRect(x - left, y - top);
-    }  ///< moves the upper left corner there
+    /// Moves the upper left corner there.
+    constexpr void MoveToXY(LONG x, LONG y) { OffsetRect(x - left, y - top); }
     /// Moves the sides outwards by x and y.
     constexpr void InflateRect(LONG x, LONG y) { *this = CRect(left - x, top - y, right + x, bottom + y); }
     constexpr void DeflateRect(LONG x, LONG y) { InflateRect(-x, -y); }  ///< moves the sides inwards
@@ -131,9 +128,8 @@ public:
     constexpr bool operator!=(const RECT& r) const { return !(*this == r); }           ///< another side
     constexpr CRect& operator+=(POINT by) { return OffsetRect(by), *this; }            ///< moves
     constexpr CRect& operator-=(POINT by) { return OffsetRect(-by.x, -by.y), *this; }  ///< moves back
-    constexpr CRect& operator&=(const RECT& r) {
-        return IntersectRect(this, &r), *this;
-    }                                                                                  ///< as IntersectRect
+    /// As IntersectRect.
+    constexpr CRect& operator&=(const RECT& r) { return IntersectRect(this, &r), *this; }
     constexpr CRect& operator|=(const RECT& r) { return UnionRect(this, &r), *this; }  ///< as UnionRect
     /// The rectangle moved.
     constexpr CRect operator+(POINT by) const { return CRect(*this) += by; }

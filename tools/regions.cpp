@@ -81,7 +81,7 @@ const Command AREA = {
     "metres,\n"
     "and the number of vertices. The first vertex need not be repeated.",
     {CSV, PRECISION},
-    {{"printf '0 0\\n10 0\\n10 20\\n\\n0 0\\n0 5\\n5 5\\n5 0\\n' | basalt area --precision 2",
+    {{R"(printf '0 0\n10 0\n10 20\n\n0 0\n0 5\n5 5\n5 0\n' | basalt area --precision 2)",
       "100.00 52.36 3\n-25.00 20.00 4"}},
     make_area};
 

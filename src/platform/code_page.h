@@ -53,7 +53,7 @@ private:
     char* encode(std::wstring_view& text, std::size_t most, char* bytes, bool as_lines) const;
 
     locale_t m_locale;  // null: closed, or no UTF-8 locale is installed; ASCII classes
-    bool m_is_utf8;
+    bool m_is_utf8 = true;
 };
 
 // The environment's, opened at the first use and closed when the library is unloaded.

@@ -102,7 +102,7 @@ wchar_t replacement(char) {
 }  // namespace
 
 CodePage::CodePage(const char* locale_name)
-    : m_locale(locale_name != nullptr ? open_locale(locale_name) : nullptr), m_is_utf8(true) {
+    : m_locale(locale_name != nullptr ? open_locale(locale_name) : nullptr) {
     if (m_locale != nullptr && is_stateless(m_locale)) {
         m_is_utf8 = std::string_view(nl_langinfo_l(CODESET, m_locale)) == "UTF-8";
         return;

@@ -111,7 +111,7 @@ struct World {
         const Surface& from = surface();
         constexpr DWORD OPERATIONS[] = {SRCCOPY, NOTSRCCOPY, SRCAND, SRCPAINT, SRCINVERT};
         const RECT r = rectangle();
-        const Block b = {r.left, r.top, r.right, r.bottom, coordinate(), coordinate()};
+        const Stretch b = {r.left, r.top, r.right, r.bottom, coordinate(), coordinate()};
         const DWORD rop = OPERATIONS[in.byte() % 5];
         const XFORM& w = from.settings.world;
         require(BitBlt(to.canvas, b.x, b.y, b.width, b.height, from.canvas, b.source_x, b.source_y, rop) ==

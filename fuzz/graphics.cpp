@@ -67,7 +67,7 @@ void check_rotation(Canvas& canvas, const Picture& picture, float angle) {
     turned.world = turn_about(static_cast<double>(angle), picture.width / 2, picture.height / 2);
     const Picture ground(picture.width, picture.height, picture.depth, value_of(picture.depth, 0x008080));
     const Picture result = canvas.picture();
-    const Block all = {0, 0, picture.width, picture.height, 0, 0};
+    const Stretch all = {0, 0, picture.width, picture.height, 0, 0};
     // In single precision a turn of thousands of degrees is another one.
     require(std::fabs(angle) > 3600 ||
             result == copied(ground, all, picture, SRCCOPY, turned, 0, &result, 1e-3));
@@ -104,7 +104,7 @@ void check_drawing(Input& in) {
                        in.coordinate(), in.coordinate(), in.byte(), in.byte()};
     require(_transparentblt(canvas, s.x, s.y, s.width, s.height, source, s.source_x, s.source_y,
                             s.source_width, s.source_height, start) == 1);
-    const Block all = {s.x, s.y, s.width, s.height, 0, 0};
+    const Stretch all = {s.x, s.y, s.width, s.height, 0, 0};
     require(canvas.picture() == (code == 5 ? keyed(to, s, from, start) : copied(to, all, from, SRCAND)));
 }
 

@@ -31,27 +31,15 @@ void query_all(const Bytes& block) {
     }
 }
 
-// As a block whose first word is its size, as VerQueryValueW requires.
-void check_block(Bytes block) {
-    if (block.size() < 2) {
-        return;
-    }
-    const std::size_t size =
-        std::min<std::size_t>(block.size(), static_cast<std::size_t>(block[0] | block[1] << 8));
-    if (size < 2) {
-        return;
-    }
-    block.resize(size);
-    block.shrink_to_fit();
-    block[0] = static_cast<unsigned char>(size & 0xFF);
-    block[1] = static_cast<unsigned char>(size >> 8);
-    query_all(block);
-}
-
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    check_block(Bytes(data, data + size));
+    if (size >= 2) {  // a block, whose first word is its size
+        Bytes block(data, data + std::clamp<std::size_t>(data[0] | std::size_t{data[1]} << 8, 2, size));
+        block[0] = static_cast<unsigned char>(block.size() & 0xFF);
+        block[1] = static_cast<unsigned char>(block.size() >> 8);
+        query_all(block);
+    }
     static const int file = memfd_create("program", MFD_CLOEXEC);
     static const std::wstring name = L"/proc/self/fd/" + std::to_wstring(file);
     require(ftruncate(file, 0) == 0 && pwrite(file, data, size, 0) == static_cast<ssize_t>(size));

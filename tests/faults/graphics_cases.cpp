@@ -1,5 +1,7 @@
-// Drawing objects and everything that draws.
+// Drawing objects and everything that draws: each call does all of its work or nothing.
 #include <memory>
+#include <tuple>
+#include <utility>
 
 #include "basalt/graphics.h"
 #include "tests/faults/trial.h"
@@ -13,96 +15,82 @@ namespace {
 using namespace drawing;
 using namespace vex_util::mfc;
 
-struct Objects {
-    bool act() noexcept {
+struct World {
+    StoredOsCode os{2};  // copies by masks
+    Canvas canvas{Picture(30, 20, 32, 0x112233)}, other{Picture(30, 20, 32, 0x445566)};
+    CRgn square, combined, empty;
+    CDC dc;
+
+    World() {
+        SetPixel(canvas, 3, 4, 0);
+        square.CreateRectRgn(0, 0, 10, 10), combined.CreateRectRgn(5, 5, 15, 15),
+            dc.CreateCompatibleDC(nullptr);
+    }
+    auto state() const {
+        Bytes bytes(200);
+        const auto size = GetRegionData(combined, 200, reinterpret_cast<RGNDATA*>(bytes.data()));
+        return std::tuple(canvas.picture(), size, bytes,
+                          empty.m_hObject != nullptr && holds(empty, canvas.picture()));
+    }
+
+    bool create() noexcept {
         CBrush brush(0x102030);
         CBitmap bitmap, compatible;
         CRgn region;
-        CDC dc;
+        CDC another;
         return brush.m_hObject != nullptr && bitmap.CreateBitmap(100, 100, 1, 24, nullptr) != 0 &&
-               region.CreateRectRgn(1, 2, 3, 4) != 0 && dc.CreateCompatibleDC(nullptr) != 0 &&
-               compatible.CreateCompatibleBitmap(&dc, 10, 10) != 0;
+               region.CreateRectRgn(1, 2, 3, 4) != 0 && another.CreateCompatibleDC(nullptr) != 0 &&
+               compatible.CreateCompatibleBitmap(&another, 10, 10) != 0;
     }
-    bool holds(bool) const { return true; }
-};
-
-struct Combination {
-    CRgn a, b, both;
-    Combination() {
-        a.CreateRectRgn(0, 0, 10, 10);
-        b.CreateRectRgn(5, 5, 15, 15);
-        both.CreateRectRgn(7, 7, 8, 8);
+    bool combine() noexcept { return combined.CombineRgn(&square, &combined, RGN_XOR) != RGN_ERROR; }
+    bool keyed_copy() noexcept {
+        return TransparentBlt(canvas, 1, 1, 20, 10, canvas, 0, 0, 10, 5, 0xFFFFFF) != 0;
     }
-    bool act() noexcept { return both.CombineRgn(&a, &b, RGN_XOR) != RGN_ERROR; }
-    bool holds(bool done) const {
-        return (both.PtInRegion(7, 7) == 0) == done && both.PtInRegion(1, 1) == done;
-    }
-};
-
-// Each changes a canvas as a whole or not at all.
-struct Drawing {
-    Picture before = Picture(30, 20, 32, 0x112233);
-    Canvas canvas{before}, other{Picture(30, 20, 32, 0x445566)};
-    bool holds(bool done) const { return (canvas.picture() == before) != done; }
-};
-
-struct TransparentCopyOntoItself : Drawing {
-    TransparentCopyOntoItself() { SetPixel(canvas, 0, 0, 0xFF), before = canvas.picture(); }
-    bool act() noexcept { return TransparentBlt(canvas, 1, 1, 20, 10, canvas, 0, 0, 10, 5, 0xFFFFFF) != 0; }
-};
-
-struct ScaledCopyOntoItself : TransparentCopyOntoItself {
-    bool act() noexcept {
+    bool scaled_copy() noexcept {
         const XFORM twice = {2, 0, 0, 2, 0, 0};
         SetGraphicsMode(canvas, GM_ADVANCED);
         return SetWorldTransform(canvas, &twice) != 0 &&
                BitBlt(canvas, 5, 5, 5, 5, canvas, 0, 0, SRCCOPY) != 0;
     }
-};
-
-struct MaskCopy : Drawing {
-    StoredOsCode os{2};
-    bool act() noexcept {
+    bool mask_copy() noexcept {
         _transparentblt(canvas, 0, 0, 0, 0, other, 0, 0, 12, 12, 0xFFFFFF);
         return GetPixel(canvas, 5, 5) == 0x665544;
     }
-};
-
-struct Rotation : Drawing {
-    CDC dc;
-    Rotation() { dc.CreateCompatibleDC(nullptr), canvas.deselect(); }
-    ~Rotation() { canvas.select(); }
-    Rotation(const Rotation&) = delete;
-    Rotation& operator=(const Rotation&) = delete;
-    bool act() noexcept { return RotateBitmap(&dc, &canvas.bitmap(), 45.0F); }
-};
-
-struct RegionOfBitmap : Drawing {
-    CRgn region;
-    RegionOfBitmap() { SetPixel(canvas, 3, 4, 0), before = canvas.picture(); }
-    bool act() { return RegionFromBitmap(region, canvas.bitmap(), 0); }
-    bool holds(bool done) const {
-        return done ? drawing::holds(region, before) : region.m_hObject == nullptr;
+    bool rotate() noexcept {
+        canvas.deselect();
+        const bool is_rotated = RotateBitmap(&dc, &canvas.bitmap(), 45.0F);
+        return canvas.select(), is_rotated;
     }
-};
-
-struct Rows : Drawing {
-    BITMAPINFOHEADER header;
-    bool act() { return std::unique_ptr<unsigned char[]>(GetDIBits(canvas.bitmap(), header)) != nullptr; }
-    bool holds(bool done) const { return !done || header.biHeight == -20; }
+    bool find_region() { return RegionFromBitmap(empty, canvas.bitmap(), 0); }
+    bool read_rows() {
+        BITMAPINFOHEADER header;
+        const std::unique_ptr<unsigned char[]> pixels(GetDIBits(canvas.bitmap(), header));
+        return pixels != nullptr && header.biHeight == -20;
+    }
 };
 
 }  // namespace
 
 void check_graphics() {
-    run<Objects>("CreateSolidBrush, CreateBitmap, CreateRectRgn, CreateCompatibleDC", Handles::FAIL);
-    run<Combination>("CombineRgn");
-    run<TransparentCopyOntoItself>("TransparentBlt within a surface", Handles::FAIL);
-    run<ScaledCopyOntoItself>("BitBlt within a surface", Handles::FAIL);
-    run<MaskCopy>("_transparentblt by masks", Handles::FAIL);
-    run<Rotation>("mfc::RotateBitmap", Handles::FAIL);
-    run<RegionOfBitmap>("mfc::RegionFromBitmap", Handles::FAIL);
-    run<Rows>("mfc::GetDIBits", Handles::FAIL);
+    constexpr std::pair<const char*, bool (World::*)()> ROWS[] = {
+        {"objects' creation", &World::create},
+        {"CombineRgn", &World::combine},
+        {"TransparentBlt within a surface", &World::keyed_copy},
+        {"BitBlt within a surface", &World::scaled_copy},
+        {"_transparentblt by masks", &World::mask_copy},
+        {"mfc::RotateBitmap", &World::rotate},
+        {"mfc::RegionFromBitmap", &World::find_region},
+        {"mfc::GetDIBits", &World::read_rows}};
+    for (const auto& [operation, act] : ROWS) {
+        check(operation, [act = act](Trial& t) {
+            World world, finished;
+            const auto before = world.state();
+            const bool done = t.succeeds([&] { return (world.*act)(); });
+            t.expect((finished.*act)() && (done || t.struck()), "fails only for a reason");
+            t.expect(world.state() == (done ? finished.state() : before), "done as a whole or not at all");
+            t.expect(done || ((world.*act)() && world.state() == finished.state()), "done afterwards");
+        });
+    }
     check("mfc::DumpBitmap", [](Trial& t) {
         Canvas canvas(Picture(200, 100, 24));
         const auto size = [&] {

@@ -1,19 +1,26 @@
-// Environment, texts, timers, log, hexadecimal text, hardware addresses, version information.
+// Environment, texts, timers, log, hexadecimal text, hardware addresses, version information, paths and
+// files.
 #include <cstdlib>
 #include <filesystem>
 #include <new>
 #include <string>
 #include <tuple>
 
+#include "basalt/files.h"
 #include "basalt/frame.h"
 #include "basalt/platform.h"
 #include "basalt/util.h"
 #include "src/platform/error_message.h"
+#include "src/platform/file.h"
+#include "src/platform/file_search.h"
 #include "tests/faults/trial.h"
 
 namespace basalt::faults {
 
 namespace {
+
+using vex_util::CFilePath;
+using vex_util::Path;
 
 std::string utf8(const CString& text) {
     return std::filesystem::path(text.GetString()).string();
@@ -112,6 +119,40 @@ void check_texts() {
         });
     }
     check("FileLogger", check_log);
+}
+
+void check_files() {
+    check("CFilePath and Path", [](Trial& t) {
+        t.folder().write("1.txt"), t.folder().write("2.txt"), t.folder().write("a name of some length.doc");
+        const CString full = t.path("a name of some length.doc");
+        CFilePath path;
+        std::vector<CString> found;
+        FILETIME time = {};
+        const bool all_found = t.succeeds([&] {
+            path = CFilePath(full);
+            path.SetExtension(L"a longer extension than before");
+            path.Combine(path.Directory(), Path::GetPath(full, 12));
+            CFilePath::GetFileCreationTime(t.path("*.txt"), time);
+            path.GetLastAccessTime();
+            found = path.GetFilesInDirectory(L"*.txt");
+            return path.FileExists() && !path.IsDirectory() && CFilePath::FileExists(t.path("*.txt"));
+        });
+        t.expect((all_found && found.size() == 2) || t.struck(), "throws and denies only for a failure");
+        path = CFilePath(full);
+        t.expect(path.Extension() == L"doc" && path.FileExists(), "set afterwards");
+        t.expect(path.GetFilesInDirectory(L"*.txt").size() == 2, "found afterwards");
+    });
+    // Out of memory at a link or its target must not pass for a file or for no entry.
+    check("FindFirstFileW", [](Trial& t) {
+        const CString name = t.path("a link");
+        std::filesystem::create_directory_symlink("/", t.folder() / "a link");
+        for (const CString& pattern : {name, name + L"*"}) {
+            WIN32_FIND_DATAW entry;
+            const BOOL found = t.attempt([&] { return FindClose(FindFirstFileW(pattern, &entry)); });
+            t.expect(found != 0 ? entry.dwFileAttributes == FILE_ATTRIBUTE_DIRECTORY : t.struck(),
+                     "its kind");
+        }
+    });
 }
 
 }  // namespace basalt::faults

@@ -1,10 +1,12 @@
+// Makes every call that an operation makes to the heap or the system fail in turn, once and for good, and
+// prints a line for each: the documented answer, nothing left behind, everything usable afterwards.
 #include "tests/faults/trial.h"
 
 #include <unistd.h>
 
 #include <algorithm>
 #include <cstdio>
-#include <set>
+#include <utility>
 #include <vector>
 
 #include "basalt/memory.h"
@@ -25,7 +27,7 @@ std::vector<HBRUSH> taken_handles;
 
 // What the process holds, and what was made to stay. The library's own files count; the others are a case's.
 struct Holdings {
-    long blocks = live_allocations(), mapped = test::mapped_balance(), mapped_kept = test::bytes_kept;
+    long blocks = live_allocations(), mapped = test::bytes_mapped, mapped_kept = test::bytes_kept;
     long descriptors = test::open_descriptors(), files_kept = test::files_kept;
     std::size_t shared_blocks =
         platform::inspect_heap(vex_lib::vlSharedMemoryHeap::GetHeapHandle()).live_blocks;
@@ -36,31 +38,16 @@ struct Holdings {
     // What stayed behind since, though nothing was made to stay; empty when nothing did.
     std::string leak(const Holdings& before) const {
         const bool unmaps = mapped_kept == before.mapped_kept;
-        return unmaps && blocks != before.blocks ? std::to_string(blocks - before.blocks) + " blocks leaked"
-               : unmaps && mapped != before.mapped
-                   ? std::to_string(mapped - before.mapped) + " mapped bytes leaked"
-               : descriptors != before.descriptors                     ? "a descriptor leaked"
-               : shared_blocks != before.shared_blocks                 ? "a block of the shared heap leaked"
-               : files - before.files > files_kept - before.files_kept ? "a temporary file stayed"
-                                                                       : "";
+        const std::pair<bool, std::string> leaks[] = {
+            {unmaps && blocks != before.blocks, std::to_string(blocks - before.blocks) + " blocks"},
+            {unmaps && mapped != before.mapped, std::to_string(mapped - before.mapped) + " mapped bytes"},
+            {descriptors != before.descriptors, "a descriptor"},
+            {shared_blocks != before.shared_blocks, "a block of the shared heap"},
+            {files - before.files > files_kept - before.files_kept, "a temporary file"}};
+        const auto* const leak = std::ranges::find(leaks, true, &std::pair<bool, std::string>::first);
+        return leak != std::end(leaks) ? leak->second + " leaked" : "";
     }
 };
-
-// The fault found; whether a call was made to fail.
-std::pair<std::string, bool> run_once(const Case& run, const Failure& failure) {
-    const Holdings before;
-    std::pair<std::string, bool> result;
-    {
-        Trial trial(failure);
-        run(trial);
-        result = {trial.fault(), trial.was_ever_struck()};
-    }
-    result.first = result.first.empty() ? Holdings().leak(before) : result.first;
-    for (const std::string& name : Trial::folder().names()) {
-        std::filesystem::remove(Trial::folder() / name);
-    }
-    return result;
-}
 
 }  // namespace
 
@@ -100,43 +87,58 @@ void Trial::end() {
     m_heap.reset(), m_system.reset();
 }
 
-void check(const char* operation, const Case& run, Handles handles) {
+void check(const char* operation, const std::function<void(Trial&)>& run) {
     const test::ScratchFolder folder;
     current_folder = &folder;
     alarm(SECONDS_AN_OPERATION);
     int tried = 0;
-    std::set<std::string> found;
-    const auto run_with = [&](Source source, bool stays, int nth) {
+    std::string found;
+    // Whether a call was made to fail.
+    const auto run_once = [&](const Failure& failure) {
+        for (const std::string& name : folder.names()) {
+            std::filesystem::remove(folder / name);
+        }
+        const Holdings before;
+        std::string fault;
+        bool struck = false;
+        {
+            Trial trial(failure);
+            run(trial);
+            fault = trial.fault(), struck = trial.was_ever_struck();
+        }
+        fault = fault.empty() ? Holdings().leak(before) : fault;
         constexpr const char* NAMES[] = {"heap", "system", "handles"};
-        const auto [fault, struck] = run_once(run, {source, stays, nth});
         if (!fault.empty()) {
-            found.insert(fault + " [" + NAMES[static_cast<int>(source)] + " call " + std::to_string(nth) +
-                         (stays ? " and later" : "") + "]");
+            ++faults;
+            found += "    " + fault + " [" + NAMES[static_cast<int>(failure.source)] + " call " +
+                     std::to_string(failure.nth) + (failure.stays ? " and later]\n" : "]\n");
         }
         return struck;
     };
-    run_once(run, {Source::HEAP, false, 0});  // tables are made once, and regions of the shared heap kept
-    run_with(Source::HEAP, false, 0);
-    for (const Source source : {Source::HEAP, Source::SYSTEM, Source::HANDLES}) {
-        for (const bool stays : {false, true}) {
-            const bool applies = source != Source::HANDLES || (handles == Handles::FAIL && stays);
-            for (int nth = 1; applies && nth <= MOST_CALLS && run_with(source, stays, nth); ++nth) {
-                ++tried;
-            }
+    Trial warm_up({});  // tables are made once, and regions of the shared heap kept
+    run(warm_up), run_once({});
+    for (const auto& [source, stays] : {std::pair(Source::HEAP, false),
+                                        {Source::HEAP, true},
+                                        {Source::SYSTEM, false},
+                                        {Source::SYSTEM, true},
+                                        {Source::HANDLES, true}}) {
+        for (int nth = 1; nth <= MOST_CALLS && run_once({source, stays, nth}); ++nth) {
+            ++tried;
         }
     }
     alarm(0);
-    std::printf("%-44s %6d  %s\n", operation, tried, found.empty() ? "ok" : "FAULTS");
-    for (const std::string& fault : found) {
-        std::printf("    %s\n", fault.c_str());
-    }
+    std::printf("%-44s %6d  %s\n%s", operation, tried, found.empty() ? "ok" : "FAULTS", found.c_str());
     std::fflush(stdout);
-    ++operations, points += tried, faults += static_cast<int>(found.size());
-}
-
-bool report_totals() {
-    std::printf("%d operations, %d failure points, %d faults\n", operations, points, faults);
-    return faults == 0;
+    ++operations, points += tried;
 }
 
 }  // namespace basalt::faults
+
+int main() {
+    using namespace basalt::faults;
+    basalt::platform::SetDebugOutputHandler([](const wchar_t*) {});
+    std::printf("%-44s %6s\n", "operation", "points");
+    check_memory(), check_sparse(), check_texts(), check_files(), check_graphics();
+    std::printf("%d operations, %d failure points, %d faults\n", operations, points, faults);
+    return faults == 0 ? 0 : 1;
+}

@@ -4,7 +4,6 @@
 
 #include <exception>
 #include <functional>
-#include <memory>
 #include <optional>
 #include <string>
 
@@ -20,9 +19,9 @@ namespace basalt::faults {
 enum class Source { HEAP, SYSTEM, HANDLES };
 
 struct Failure {
-    Source source;
-    bool stays;  // every later call fails too
-    int nth;     // from 1; 0: none fails
+    Source source = Source::HEAP;
+    bool stays = false;  // every later call fails too
+    int nth = 0;         // from 1; 0: none fails
 };
 
 // One run of an operation. Only calls within attempt(), throws() and succeeds() fail.
@@ -77,12 +76,9 @@ private:
     std::string m_fault;
 };
 
-using Case = std::function<void(Trial&)>;
-enum class Handles { SERVE, FAIL };
-
 // Runs a case with every failure there is and prints a line of the table. Nothing may stay behind: no block,
 // no page, no descriptor, no file.
-void check(const char* operation, const Case& run, Handles handles = Handles::SERVE);
+void check(const char* operation, const std::function<void(Trial&)>& run);
 
 // The common form: a row is a type.
 //   Row()         makes the object on trial; nothing fails here
@@ -90,21 +86,15 @@ void check(const char* operation, const Case& run, Handles handles = Handles::SE
 //   holds(done)   whether the object is as promised after an act that did its work, or that did not
 // An act fails only for a reason, and succeeds when it is repeated without one.
 template <class Row>
-void run(const char* operation, Handles handles = Handles::SERVE) {
-    check(
-        operation,
-        [](Trial& trial) {
-            Row row;
-            const bool done = trial.succeeds([&] { return row.act(); });
-            trial.expect(done || trial.struck(), "fails for no reason");
-            trial.expect(row.holds(done), done ? "not as promised" : "not as promised after a failure");
-            trial.expect(done || (row.act() && row.holds(true)), "not usable after a failure");
-        },
-        handles);
+void run(const char* operation) {
+    check(operation, [](Trial& trial) {
+        Row row;
+        const bool done = trial.succeeds([&] { return row.act(); });
+        trial.expect(done || trial.struck(), "fails for no reason");
+        trial.expect(row.holds(done), done ? "not as promised" : "not as promised after a failure");
+        trial.expect(done || (row.act() && row.holds(true)), "not usable after a failure");
+    });
 }
-
-// Whether all lines so far were in order; prints the totals.
-bool report_totals();
 
 void check_memory(), check_sparse(), check_texts(), check_files(), check_graphics();
 

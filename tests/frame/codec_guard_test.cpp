@@ -7,8 +7,7 @@
 namespace {
 
 bool works = true;
-std::uintptr_t starts = 0;
-std::uintptr_t running = 0;
+std::uintptr_t starts = 0, running = 0;
 int faults = 0;  // runs within another and wrong tokens
 
 }  // namespace
@@ -32,8 +31,7 @@ TEST(CodecGuard, one_run_lasts_from_the_first_start_to_the_last_image) {
     {
         basalt::frame::CodecGuard guard;
         for (const std::uintptr_t run : {1U, 2U}) {
-            guard.AddImage();
-            guard.AddImage();
+            guard.AddImage(), guard.AddImage();
             EXPECT_EQ(running, 0U) << "an image alone starts nothing";
             EXPECT_TRUE(guard.Start() && guard.Start() && running == run);
             for (const std::uintptr_t left : {run, std::uintptr_t{0}, std::uintptr_t{0}}) {

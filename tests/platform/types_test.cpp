@@ -9,6 +9,7 @@ using HINSTANCE = void*;
 using HWND = void*;
 using TCHAR = char;
 using LPSTR = char*;
+enum HostLevel { INFO, WARNING, ERROR };  // hosts name levels of logging so
 #include "basalt/basalt.h"
 #include "basalt/platform.h"
 

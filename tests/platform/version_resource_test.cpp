@@ -72,24 +72,6 @@ TEST(VersionQuery, a_text_ends_at_its_terminator_or_its_length_in_units) {
     EXPECT_EQ(place(patched(last, FIRST + 4, 0), L"\\StringFileInfo\\Key"), Place(92, 7)) << "in bytes";
 }
 
-TEST(VersionQuery, nodes_that_do_not_fit_end_the_search) {
-    const Bytes good = resource({}, {text_node(u"A", u"first"), text_node(u"B", u"second")}, {});
-    const std::size_t length = good[FIRST], rest = good[40] - (FIRST - 40);
-    const std::tuple<std::size_t, const wchar_t*, const wchar_t*> rows[] = {{length, L"first", L"second"},
-                                                                            {0, L"none", L"none"},
-                                                                            {5, L"none", L"none"},
-                                                                            {9, L"none", L"none"},
-                                                                            {length - 1, L"first", L"second"},
-                                                                            {length - 3, L"firs", L"second"},
-                                                                            {rest, L"first", L"none"},
-                                                                            {rest + 1, L"none", L"none"},
-                                                                            {0xFFFF, L"none", L"none"}};
-    for (const auto& [claimed, a, b] : rows) {
-        const Bytes block = patched(good, FIRST, claimed);
-        EXPECT_EQ(text_at(block, L"A") + L' ' + text_at(block, L"B"), std::wstring(a) + L' ' + b) << claimed;
-    }
-}
-
 TEST(VersionResourceFile, is_read_from_its_section_or_refused) {
     const ScratchFolder folder;
     const std::wstring path = folder.wide(L"program");

@@ -16,19 +16,6 @@ using namespace vex_lib;
 constexpr int THREADS = 8;
 constexpr std::size_t SLOTS = 64;
 
-// Both ends of a block hold its size.
-void mark(void* block, std::size_t size) {
-    std::memcpy(block, &size, sizeof size);
-    std::memcpy(static_cast<char*>(block) + size - sizeof size, &size, sizeof size);
-}
-
-void require_marked(const void* block) {
-    std::size_t size = 0;
-    std::memcpy(&size, block, sizeof size);
-    require(std::memcmp(static_cast<const char*>(block) + size - sizeof size, &size, sizeof size) == 0,
-            "a block holds what was left in it");
-}
-
 std::size_t any_size(Random& random) {
     const auto size = 2 * sizeof(std::size_t) + static_cast<std::size_t>(draw(random, 400));
     const int kind = draw(random, 200);
@@ -42,31 +29,35 @@ struct Exchange {
     // Puts a block into a slot, and frees the one that was there.
     void put(std::size_t slot, void* block) {
         if (void* const other = slots[slot].exchange(block)) {
-            require_marked(other);
-            heap == nullptr ? vlSharedMemoryHeap::Free(other)
-                            : require(HeapFree(heap, 0, other) != 0, "freed");
+            std::size_t size = 0;
+            std::memcpy(&size, other, sizeof size);
+            require(std::memcmp(static_cast<char*>(other) + size - sizeof size, &size, sizeof size) == 0);
+            heap == nullptr ? vlSharedMemoryHeap::Free(other) : require(HeapFree(heap, 0, other) != 0);
         }
     }
+    // Both ends of a block hold its size.
     void step(Random& random) {
         const std::size_t size = any_size(random);
         void* const block = heap == nullptr ? vlSharedMemoryHeap::Alloc(size) : HeapAlloc(heap, 0, size);
-        block != nullptr ? mark(block, size) : void();
+        if (block != nullptr) {
+            std::memcpy(block, &size, sizeof size);
+            std::memcpy(static_cast<char*>(block) + size - sizeof size, &size, sizeof size);
+        }
         put(random() % SLOTS, block);
     }
     HANDLE handle() const { return heap == nullptr ? vlSharedMemoryHeap::GetHeapHandle() : heap; }
-    void inspect() const { require(platform::inspect_heap(handle()).fault == nullptr, "the heap is sound"); }
+    void inspect() const { require(platform::inspect_heap(handle()).fault == nullptr); }
 };
 
 void use_page_sources() {
     constexpr unsigned long SIZE = 1 << 20, COMMIT = 0x1000, RESERVE = 0x2000, RELEASE = 0x8000;
     void* const range = vlSharedMemoryAllocator::Alloc(nullptr, SIZE, RESERVE, nullptr);
-    require(range != nullptr && vlSharedMemoryAllocator::Alloc(range, SIZE, COMMIT, nullptr) == range,
-            "a range");
+    require(range != nullptr && vlSharedMemoryAllocator::Alloc(range, SIZE, COMMIT, nullptr) == range);
     std::memset(range, 1, 4096);
-    require(vlSharedMemoryAllocator::Free(range, 0, RELEASE, 0) != 0, "a range released");
+    require(vlSharedMemoryAllocator::Free(range, 0, RELEASE, 0) != 0);
     unsigned long handle = 0;
     void* const view = vlMMapFileAllocator::Alloc(nullptr, SIZE, RESERVE, &handle);
-    require(view != nullptr && vlMMapFileAllocator::Free(view, 0, RELEASE, handle) != 0, "a view");
+    require(view != nullptr && vlMMapFileAllocator::Free(view, 0, RELEASE, handle) != 0);
 }
 
 }  // namespace

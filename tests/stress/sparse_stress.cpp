@@ -31,7 +31,7 @@ struct Context {
 
 bool visit(int x, int y, const void* element, const void* context) {
     const auto& [thread, random, array, other] = *static_cast<const Context*>(context);
-    require(static_cast<const Element*>(element)->is_at(x, y), "a cell holds its own element");
+    require(static_cast<const Element*>(element)->is_at(x, y));
     const int choice = draw(random, 400);
     if (choice < SIDE) {
         const Element added{choice, y, 31 * choice + y};
@@ -67,7 +67,7 @@ void change(const Context& context) {
     } else if (choice < 170) {
         SparseCells::copy_row(array, x, y, row, sizeof(Element), filled, ROW);
         for (int i = 0; i < ROW; ++i) {
-            require(!filled[i] || row[i].is_at(x + i, y), "a copied row holds its own elements");
+            require(!filled[i] || row[i].is_at(x + i, y));
         }
     } else if (choice < 180) {
         array.Select(min, max);

@@ -6,10 +6,11 @@
 #include <functional>
 #include <random>
 
+#include "fuzz/input.h"
+
 namespace basalt::stress {
 
-// Ends the program, saying what does not hold.
-void require(bool holds, const char* what);
+using fuzz::require;
 
 // What a thread draws its choices from; no two threads the same, and every run the same.
 using Random = std::mt19937;
@@ -21,14 +22,13 @@ inline int draw(Random& random, int below) {
 // The thread's number and its choices. Called over and over, in every thread, until the time is up.
 using Round = std::function<void(int thread, Random& random)>;
 
-// How often all threads together went round.
+// The number of rounds of all threads together.
 long run_threads(int count, double seconds, const Round& round);
 
-// Each for so many seconds; the answer is how often its threads went round.
-long stress_sparse(double seconds), stress_heaps(double seconds);
-long stress_files(double seconds), stress_graphics(double seconds);
+// Each for so many seconds; the result is its number of rounds.
+long stress_sparse(double seconds), stress_heaps(double seconds), stress_files(double seconds);
 // What is made at its first use, by all threads at once: good for one try a process.
-long first_use();
+long first_use(double);
 
 }  // namespace basalt::stress
 

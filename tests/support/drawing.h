@@ -184,9 +184,8 @@ inline std::uint32_t arriving(std::uint32_t value, int from, int to, const Setti
                        : value_of(to, colour_of(from, value));
 }
 
-inline RECT ordered(const RECT& r) {
-    return {std::min(r.left, r.right), std::min(r.top, r.bottom), std::max(r.left, r.right),
-            std::max(r.top, r.bottom)};
+inline CRect ordered(CRect r) {
+    return r.NormalizeRect(), r;
 }
 
 // Calls paint(x, y, value&) for the pixels of a rectangle that exist.
@@ -234,13 +233,15 @@ inline XFORM turn_about(double degrees, double x, double y) {
     return {f(c), f(s), f(-s), f(c), f(x - x * c + y * s), f(y - x * s - y * c)};
 }
 
-struct Block {
+// Where a copy goes, and which part of a source it takes.
+struct Stretch {
     int x, y, width, height, source_x, source_y;
+    int source_width = width, source_height = height;
 };
 
 // A copy, through the destination's transform. Pixels whose middle comes from within `margin` of a pixel's
 // border, which rounding decides, are taken from `actual`.
-inline Picture copied(const Picture& to, const Block& b, const Picture& from, DWORD rop,
+inline Picture copied(const Picture& to, const Stretch& b, const Picture& from, DWORD rop,
                       const Settings& s = {}, COLORREF source_background = 0xFFFFFF,
                       const Picture* actual = nullptr, double margin = 0) {
     const XFORM& t = s.world;
@@ -267,11 +268,7 @@ inline Picture copied(const Picture& to, const Block& b, const Picture& from, DW
     return result;
 }
 
-// Where a copy goes, and which part of a source it takes.
-struct Stretch {
-    int x, y, width, height, source_x, source_y, source_width, source_height;
-};
-
+// A copy without the source's pixels of a colour.
 inline Picture keyed(const Picture& to, const Stretch& s, const Picture& from, COLORREF key,
                      const Settings& settings = {}, COLORREF source_background = 0xFFFFFF) {
     Picture result = to;

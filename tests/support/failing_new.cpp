@@ -35,7 +35,7 @@ void give(void* block) noexcept {
 
 }  // namespace
 
-// Every form: the library's own would call a sanitizer's.
+// Every form in use: the standard library's own would call a sanitizer's.
 // clang-format off
 void* operator new(size_t n) { return take_or_throw(n); }
 void* operator new[](size_t n) { return take_or_throw(n); }
@@ -43,8 +43,6 @@ void* operator new(size_t n, align_val_t a) { return take_or_throw(n, a); }
 void* operator new[](size_t n, align_val_t a) { return take_or_throw(n, a); }
 void* operator new(size_t n, const nothrow_t&) noexcept { return take(n); }
 void* operator new[](size_t n, const nothrow_t&) noexcept { return take(n); }
-void* operator new(size_t n, align_val_t a, const nothrow_t&) noexcept { return take(n, a); }
-void* operator new[](size_t n, align_val_t a, const nothrow_t&) noexcept { return take(n, a); }
 void operator delete(void* p) noexcept { give(p); }
 void operator delete[](void* p) noexcept { give(p); }
 void operator delete(void* p, size_t) noexcept { give(p); }
@@ -55,6 +53,4 @@ void operator delete(void* p, size_t, align_val_t) noexcept { give(p); }
 void operator delete[](void* p, size_t, align_val_t) noexcept { give(p); }
 void operator delete(void* p, const nothrow_t&) noexcept { give(p); }
 void operator delete[](void* p, const nothrow_t&) noexcept { give(p); }
-void operator delete(void* p, align_val_t, const nothrow_t&) noexcept { give(p); }
-void operator delete[](void* p, align_val_t, const nothrow_t&) noexcept { give(p); }
 // clang-format on

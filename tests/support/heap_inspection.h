@@ -37,8 +37,7 @@ private:
             check_region(region);
         }
         if (m_report.fault == nullptr) {
-            check_free_lists();
-            check_quick_lists();
+            check_lists();
         }
         expect(m_mapped == heap.m_mapped && m_shared == heap.m_mapped_shared, "mapped bytes are counted");
         expect(heap.m_mapped <= heap.m_maximum, "the maximum holds");
@@ -64,8 +63,7 @@ private:
             expect(is_last(head) == (at == end), "the last block of a region is marked");
             expect(((head & PREVIOUS_FREE) != 0) == after_free, "the successor of a free block is marked");
             expect(!is_free(head) || !after_free, "no two neighbours are free");
-            expect(!is_free(head) || at == end || size_before(block_at(at)) == size,
-                   "a free block ends in its size");
+            expect(!is_free(head) || at == end || size_before(block_at(at)) == size, "its end has its size");
             expect(is_free(head) || tag == QUICK_TAG || tag == m_heap.m_tag, "a block has its heap's tag");
             after_free = is_free(head);
             ++(after_free ? m_free : tag == QUICK_TAG ? m_quick : m_report.live_blocks);
@@ -80,44 +78,33 @@ private:
         m_idle += m_heap.is_idle_region(block_at(region.begin + HEAD_BYTES)) ? region.size : 0;
     }
 
-    void check_free_lists() {
+    void check_lists() {
         const FreeLists& lists = m_heap.m_free;
-        for (unsigned level = 0; level < FreeLists::LEVELS; ++level) {
-            expect((lists.m_levels >> level & 1U) == (lists.m_lists[level] != 0 ? 1U : 0U),
-                   "levels agree with lists");
-            for (unsigned list = 0; list < FreeLists::LISTS; ++list) {
-                Block *block = lists.first({level, list}), *previous = nullptr;
-                expect((lists.m_lists[level] >> list & 1U) == (block != nullptr ? 1U : 0U),
-                       "bits agree with lists");
-                for (; block != nullptr; previous = block, block = next_of(block)) {
-                    if (m_free-- == 0 || m_heap.m_regions.find(block) == nullptr) {
-                        return expect(false, "a free list stays within the regions");
-                    }
-                    const auto place = FreeLists::place_of(size_of(head_of(block)));
-                    expect(is_free(head_of(block)) && place.level == level && place.list == list,
-                           "a block's list");
-                    expect(prev_of(block) == previous, "a free list's backward links");
-                }
+        for (unsigned i = 0; i < FreeLists::LEVELS * FreeLists::LISTS; ++i) {
+            const unsigned level = i / FreeLists::LISTS, list = i % FreeLists::LISTS,
+                           bits = lists.m_lists[level];
+            Block *block = lists.first({level, list}), *previous = nullptr;
+            expect((lists.m_levels >> level & 1) == (bits != 0), "a level is marked if it has a block");
+            expect((bits >> list & 1) == (block != nullptr), "a list is marked if it has a block");
+            for (; block != nullptr && m_report.fault == nullptr; previous = block, block = next_of(block)) {
+                const auto place = FreeLists::place_of(size_of(head_of(block)));
+                expect(m_free-- > 0 && is_free(head_of(block)) && prev_of(block) == previous &&
+                           place.level == level && place.list == list,
+                       "a free list holds free blocks of its sizes");
             }
         }
-        expect(m_free == 0, "every free block is in a list");
-    }
-
-    void check_quick_lists() {
-        const QuickLists& lists = m_heap.m_quick;
         std::size_t bytes = 0;
         for (std::size_t list = 0; list < QuickLists::LISTS; ++list) {
-            for (Block* block = lists.first(list); block != nullptr; block = next_of(block)) {
-                if (m_quick-- == 0 || m_heap.m_regions.find(block) == nullptr) {
-                    return expect(false, "a quick list stays within the regions");
-                }
-                const std::uint64_t head = head_of(block);
-                expect((head & TAG_BITS) == QUICK_TAG && QuickLists::list_of(size_of(head)) == list,
-                       "a quick list");
-                bytes += size_of(head);
+            Block* block = m_heap.m_quick.first(list);
+            for (; block != nullptr && m_report.fault == nullptr; block = next_of(block)) {
+                const std::size_t head = head_of(block), size = size_of(head);
+                expect(m_quick-- > 0 && (head & TAG_BITS) == QUICK_TAG && QuickLists::list_of(size) == list,
+                       "a quick list holds quick blocks of its sizes");
+                bytes += size;
             }
         }
-        expect(bytes == lists.bytes() && m_quick == 0, "quick lists are counted");
+        expect(m_free == 0 && m_quick == 0, "every free block is in a list");
+        expect(bytes == m_heap.m_quick.bytes(), "bytes in quick lists are counted");
     }
 
     HeapPart& m_heap;

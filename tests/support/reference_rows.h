@@ -2,6 +2,7 @@
 #ifndef BASALT_TESTS_SUPPORT_REFERENCE_ROWS_H
 #define BASALT_TESTS_SUPPORT_REFERENCE_ROWS_H
 
+#include <cmath>
 #include <fstream>
 #include <numbers>
 #include <sstream>
@@ -38,10 +39,7 @@ inline long double radians_of(long double degrees) {
 
 /// Difference of two angles in radians, folded into half a turn either way.
 inline long double angle_difference(long double a, long double b) {
-    constexpr long double TURN = 2.0L * std::numbers::pi_v<long double>;
-    const long double difference = a - b;
-    return difference - TURN * static_cast<long double>(static_cast<long long>(
-                                   difference / TURN + (difference < 0 ? -0.5L : 0.5L)));
+    return std::remainder(a - b, 2.0L * std::numbers::pi_v<long double>);
 }
 
 #endif

@@ -34,23 +34,22 @@ extern "C" {
 FAILING(int, fstat, (int file, struct stat* status), (file, status), EIO, -1)
 FAILING(int, madvise, (void* pages, size_t size, int advice), (pages, size, advice), ENOMEM, -1)
 FAILING(int, mprotect, (void* pages, size_t size, int access), (pages, size, access), ENOMEM, -1)
-FAILING(DIR*, opendir, (const char* path), (path), EMFILE, nullptr)
 FAILING(int, posix_fallocate, (int file, off_t offset, off_t size), (file, offset, size), ENOSPC, errno)
 FAILING(dirent*, readdir, (DIR * folder), (folder), EIO, nullptr)
 FAILING(int, statx, (int at, const char* path, int flags, unsigned mask, struct statx* to),
-        (at, path, flags, mask, to), EIO, -1)
+        (at, path, flags, mask, to), ENOMEM, -1)
 
 FAILING(int, access, (const char* path, int mode), (path, mode), EACCES, -1)
 FAILING(int, close, (int file), (file), EIO,
         (__real_close(file), -1))  // closes all the same, as the system does
-FAILING(int, fstatat, (int at, const char* path, struct stat* to, int flags), (at, path, to, flags), EIO, -1)
+FAILING(int, fstatat, (int at, const char* path, struct stat* to, int flags), (at, path, to, flags), ENOMEM,
+        -1)
 FAILING(int, ftruncate, (int file, off_t size), (file, size), EIO, -1)
 FAILING(int, getifaddrs, (ifaddrs * *list), (list), ENOMEM, -1)
 FAILING(int, lstat, (const char* path, struct stat* status), (path, status), EIO, -1)
 FAILING(locale_t, newlocale, (int mask, const char* name, locale_t base), (mask, name, base), ENOMEM, nullptr)
 FAILING(ssize_t, pread, (int file, void* to, size_t size, off_t at), (file, to, size, at), EIO, -1)
 FAILING(ssize_t, readlink, (const char* path, char* to, size_t size), (path, to, size), EACCES, -1)
-FAILING(char*, realpath, (const char* path, char* to), (path, to), EIO, nullptr)
 FAILING(int, stat, (const char* path, struct stat* status), (path, status), EIO, (++files_kept, -1))
 FAILING(int, unlink, (const char* path), (path), EROFS, (++files_kept, -1))
 FAILING(ssize_t, write, (int file, const void* from, size_t size), (file, from, size), ENOSPC, -1)

@@ -30,10 +30,6 @@ inline std::atomic<long> bytes_mapped{0};  // less those unmapped
 inline std::atomic<long> bytes_kept{0};    // made to stay mapped
 inline std::atomic<long> files_kept{0};    // made to stay: calls of stat and unlink that failed
 
-inline long mapped_balance() {
-    return bytes_mapped;
-}
-
 }  // namespace basalt::test
 
 #endif

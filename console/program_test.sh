@@ -44,37 +44,50 @@ refused() { ends_with 2 "$@"; }
 # fails MESSAGE ARGUMENT...: for what the system did
 fails() { ends_with 1 "$@"; }
 
-# facts FILE: checks each line of a facts file, which says what its lines are: the program's output for an input line
-# (=>), its error for that line (=> error:), or its error for the arguments alone
-facts() {
-    local fact left want arguments line
+# checks_each FACTS [KIND]: each line of the file is [KIND: ]INPUT => WANT, for a function check_KIND INPUT WANT
+checks_each() {
+    local fact kind input
     while IFS= read -r fact; do
         [[ $fact = *' => '* && $fact != '#'* ]] || continue
-        left=${fact%% => *} want=${fact#* => } line=/dev/null
-        [[ $left != *' < '* ]] || { printf '%b\n' "${left#* < }" >line && line=line; }
-        eval "arguments=(${left%% < *})"
-        run "${arguments[@]}" <$line
-        case $line,$want in
-            line,error:*) want="1,$(basename "$program") ${arguments[0]}: line 1: ${want#error: }," ;;
-            line,*) want=0,,$(printf '%b' "$want") ;;
-            *) want="2,$(basename "$program") ${arguments[0]}: ${want#error: }," ;;
-        esac
-        [ "$code,$(cat err),$(cat out)" = "$want" ] || fail "$fact: $code,$(head -c 300 err),$(head -c 300 out)"
+        kind=${2:-${fact%%: *}} input=${fact%% => *}
+        "check_$kind" "${input#"$kind: "}" "${fact#* => }"
     done <"$1"
+}
+# Of a command line: its refusal; a line of its report
+check_options() { eval "refused \"\$2\" $1"; }
+check_report() { eval "succeeds $1" && shows "$2"; }
+
+# shows LINE: the report has this line, runs of blanks counting as one
+shows() { sed 's/  */ /g; s/^ //; s/ $//' out | grep -qxF -- "$1" || fail "no line '$1' in: $(head -c 900 out)"; }
+
+# figure LABEL: what the report says behind a label, without separators of thousands
+figure() { sed -n "s/^  $1  *//p" out | sed 's/\([0-9]\),\([0-9]\)/\1\2/g'; }
+
+# is LABEL EXPECTED: the figure, units aside
+is() { [[ "$(figure "$1") " = "$2 "* ]] || fail "$1: $(figure "$1"), expected $2"; }
+
+# size BITMAP, pixels BITMAP X Y COUNT: WIDTHxHEIGHT, and RRGGBB of pixels of 32 bits in a row, one a line
+size() { od -An -v -td4 -j18 -N8 "$1" | sed 's/^ *//; s/  */x/'; }
+pixels() {
+    local header=($(od -An -v -td4 -j18 -N8 "$1"))
+    od -An -v -tx4 -w4 -j$((54 + 4 * ((header[1] - 1 - $3) * header[0] + $2))) -N$((4 * $4)) "$1" | cut -c4- | tr a-f A-F
 }
 
-# refuses_each FACTS: each line of the file is KIND: INPUT => MESSAGE, for a function refuse_KIND INPUT MESSAGE
-refuses_each() {
-    local fact input
-    while IFS= read -r fact; do
-        input=${fact#*: } input=${input%% => *}
-        [[ $fact != *' => '* || $fact = '#'* ]] || "refuse_${fact%%: *}" "$input" "${fact#* => }"
-    done <"$1"
-}
-refuse_options() {
-    local arguments
-    eval "arguments=($1)"
-    refused "$2" "${arguments[@]}"
+# survives FILE ARGUMENT...: 150 damaged copies of the file, named damaged, are read or refused by name
+survives() {
+    local seed
+    for seed in $(seq 150); do
+        awk -v seed="$seed" 'function below(n) { return int(rand() * n) }
+            BEGIN { srand(seed); n = split("0 9 - . e , inf nan # \t \r \377 1e99 \1", bad, " ") }
+            rand() > .15 { print; next }
+            { at = below(length + 1); kind = below(5) }
+            kind < 3 { print substr($0, 1, at) bad[1 + below(n)] substr($0, at + 1 + kind) }
+            kind == 3 { print $0 "\n" $0 }' "$1" >damaged
+        code=0
+        timeout 20 "$program" "${@:2}" >out 2>err || code=$?
+        [ $code -eq 0 ] && ! grep -qwiE 'nan|inf' out || [ "$code $(grep -c "^${program##*/}: damaged" err)" = "2 1" ] ||
+            fail "exit $code from $1 damaged by seed $seed: $(head -n 3 err)"
+    done
 }
 
 # close_to WHAT ACTUAL EXPECTED TOLERANCE

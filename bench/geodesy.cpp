@@ -8,8 +8,8 @@
 #include <vector>
 
 #include "basalt/geo.h"
+#include "bench/plain_geodesy.h"
 #include "tests/geo/plain_forms.h"
-#include "tests/geo/plain_geodesy.h"
 
 #ifdef BENCH_HAS_GEOGRAPHICLIB
 #include <GeographicLib/Geocentric.hpp>

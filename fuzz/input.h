@@ -2,11 +2,13 @@
 #ifndef BASALT_FUZZ_INPUT_H
 #define BASALT_FUZZ_INPUT_H
 
+#include <algorithm>
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
-#include <cstring>
+#include <iterator>
 
 namespace basalt::fuzz {
 
@@ -26,43 +28,27 @@ public:
     std::size_t left() const { return m_size; }
     const std::uint8_t* data() const { return m_data; }
 
-    std::uint8_t byte() {
-        if (m_size == 0) {
-            return 0;
-        }
-        --m_size;
-        return *m_data++;
-    }
-    std::uint32_t word() {
-        const std::uint32_t low = byte();
-        const std::uint32_t middle = byte();
-        const std::uint32_t high = byte();
-        return low | middle << 8 | high << 16 | std::uint32_t{byte()} << 24;
-    }
-    std::uint64_t double_word() {
-        const std::uint64_t low = word();
-        return low | std::uint64_t{word()} << 32;
-    }
+    std::uint8_t byte() { return m_size == 0 ? std::uint8_t{0} : (--m_size, *m_data++); }
+    std::uint32_t word() { return number<std::uint32_t>(); }
+    std::uint64_t double_word() { return number<std::uint64_t>(); }
     // Near 0 mostly, now and then anywhere.
     int coordinate() {
         const int first = byte();
-        if (first < 240) {
-            return first - 100;
-        }
-        return static_cast<int>(word());
+        return first < 240 ? first - 100 : number<int>();
     }
     float factor() {
         const std::uint8_t first = byte();
-        if (first < 240) {
-            return (static_cast<float>(first) - 100.0F) / 32.0F;
-        }
-        const std::uint32_t bits = word();
-        float value = 0;
-        std::memcpy(&value, &bits, sizeof value);
-        return value;
+        return first < 240 ? (static_cast<float>(first) - 100.0F) / 32.0F : number<float>();
     }
 
 private:
+    template <class Number>
+    Number number() {
+        std::uint8_t bytes[sizeof(Number)];
+        std::generate(std::begin(bytes), std::end(bytes), [this] { return byte(); });
+        return std::bit_cast<Number>(bytes);
+    }
+
     const std::uint8_t* m_data;
     std::size_t m_size;
 };

@@ -69,6 +69,24 @@ TEST(CrossTrack, TakesAFewPassesAnywhere) {
     }
 }
 
+// Distances on the sphere and on the ellipsoid differ by up to 0.7 %.
+TEST(CrossTrack, IsTheDistanceFromTheLinePositiveToTheLeft) {
+    Random random(34);
+    for (int i = 0; i < 5000; ++i) {
+        const geo_llh a = {random.real(-1.5, 1.5), random.real(-PI, PI), 0};
+        const double length = std::pow(10.0, random.real(1, 5.5));
+        const double right = std::pow(10.0, random.real(-5.5, 3)) * (i % 2 == 0 ? 1 : -1);
+        geo_llh b = {}, p = {};
+        double azimuth = 0;
+        geo_vincenty_direct(a, random.real(0, 2 * PI), length, azimuth, b);
+        geo_vincenty_direct(a, geo_vincenty_bearing(a, b), length * random.real(-0.5, 1.5), azimuth, p);
+        geo_vincenty_direct(p, azimuth + PI / 2, right, azimuth, p);
+        int passes = 0;
+        ASSERT_NEAR(cross_track(a, b, p, passes), -right, 0.007 * std::abs(right) + 5e-9);
+        ASSERT_LE(passes, 8);
+    }
+}
+
 // The covariance d d^T of an error along one direction d becomes that of the error's own components, and
 // these are the moves along circles of the radii of curvature.
 TEST(GeometryLaws, VariancesFollowAnErrorAlongADirection) {

@@ -3,9 +3,9 @@
 #include <chrono>
 #include <cstdint>
 #include <cstring>
+#include <utility>
 
 #include "basalt/geo.h"
-#include "tests/geo/plain_forms.h"
 
 namespace {
 
@@ -53,31 +53,28 @@ TEST(ModifiedJulianDate, FollowsTheCalendarAndTruncatesFarYears) {
 }
 
 TEST(JavaTime, GoesThroughTheCalendarRecord) {
-    SYSTEMTIME time = {2000, 1, 0, 1, 0, 0, 0, 0};
-    EXPECT_EQ(_systime2javatime(&time), 946684800000U);
-    const SYSTEMTIME leap_day = {2000, 2, 2, 29, 23, 59, 59, 987};
-    SYSTEMTIME back = {};
-    EXPECT_EQ(_javatime2systemtime(951868799987, &back), &back);
-    EXPECT_EQ(std::memcmp(&back, &leap_day, sizeof back), 0);
-    EXPECT_EQ(_systime2javatime(&back), 951868799987U);
-    // Before 1970 the count wraps, and returns within a millisecond.
-    time = {1969, 12, 0, 31, 23, 59, 59, 999};
-    EXPECT_EQ(_systime2javatime(&time), (0U - std::uint64_t{10000}) / 10000);
-    _javatime2systemtime(_systime2javatime(&time), &back);
-    EXPECT_TRUE(back.wYear == 1969 && back.wMilliseconds == 998);
-    // No time, and beyond the last one.
-    SYSTEMTIME no_day = {2023, 2, 0, 29, 0, 0, 0, 0};
-    EXPECT_EQ(_systime2javatime(&no_day), ~std::uint64_t{0});
-    const SYSTEMTIME zeros = {};
-    _javatime2systemtime((0x8000000000000000U - 116444736000000000U) / 10000 + 1, &back);
-    EXPECT_EQ(std::memcmp(&back, &zeros, sizeof back), 0);
+    constexpr std::uint64_t BEFORE_1970 = (0U - std::uint64_t{10000}) / 10000;  // the count wraps
+    constexpr std::uint64_t BEYOND = (0x8000000000000000U - 116444736000000000U) / 10000 + 1;
+    constexpr SYSTEMTIME LEAP_DAY = {2000, 2, 2, 29, 23, 59, 59, 987};
+    const std::pair<SYSTEMTIME, std::uint64_t> counts[] = {{{2000, 1, 0, 1, 0, 0, 0, 0}, 946684800000U},
+                                                           {LEAP_DAY, 951868799987U},
+                                                           {{1969, 12, 0, 31, 23, 59, 59, 999}, BEFORE_1970},
+                                                           {{2023, 2, 0, 29, 0, 0, 0, 0}, ~std::uint64_t{0}}};
+    for (auto [time, count] : counts) {
+        EXPECT_EQ(_systime2javatime(&time), count) << time.wYear;
+    }
+    const std::pair<std::uint64_t, SYSTEMTIME> times[] = {
+        {951868799987, LEAP_DAY}, {BEFORE_1970, {1969, 12, 3, 31, 23, 59, 59, 998}}, {BEYOND, {}}};
+    for (const auto& [count, time] : times) {
+        SYSTEMTIME back;
+        EXPECT_EQ(_javatime2systemtime(count, &back), &back);
+        EXPECT_EQ(std::memcmp(&back, &time, sizeof back), 0) << count;
+    }
     const auto now = [] {
         const auto since_1970 = std::chrono::system_clock::now().time_since_epoch();
-        return static_cast<std::uint64_t>(
-            std::chrono::duration_cast<std::chrono::milliseconds>(since_1970).count());
+        return static_cast<std::uint64_t>(since_1970 / std::chrono::milliseconds(1));
     };
-    const std::uint64_t before = now();
-    const std::uint64_t ours = _currentjavatime();
+    const std::uint64_t before = now(), ours = _currentjavatime();
     EXPECT_TRUE(before <= ours && ours <= now());
 }
 

@@ -1,7 +1,7 @@
-// The conversions and geodesics step by step, one library call for each sine, root and power, to compare the
+// The conversions and geodesics step by step, one library call for each sine, root and power, to time
 // fast forms with.
-#ifndef BASALT_TESTS_GEO_PLAIN_GEODESY_H
-#define BASALT_TESTS_GEO_PLAIN_GEODESY_H
+#ifndef BASALT_BENCH_PLAIN_GEODESY_H
+#define BASALT_BENCH_PLAIN_GEODESY_H
 
 #include <cmath>
 

@@ -1,33 +1,29 @@
-// Private heaps and the block allocator against malloc and pools. A second thread is kept alive, since the C
-// library takes no locks in single-threaded programs.
+// Private heaps beside malloc and the standard library's pools.
 #include <benchmark/benchmark.h>
 #include <malloc.h>
 #include <sys/mman.h>
-#if __has_include(<boost/pool/pool.hpp>)
-#include <boost/pool/pool.hpp>
-#endif
 
-#include <algorithm>
-#include <condition_variable>
 #include <cstddef>
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
-#include <ctime>
-#include <memory_resource>
 #include <mutex>
 #include <random>
-#include <stop_token>
-#include <thread>
 #include <utility>
 #include <vector>
 
 #include "basalt/memory.h"
+#include "bench/allocation.h"
 #include "bench/limits.h"
 #include "src/platform/heap.h"
 #include "src/platform/system/lock.h"
 
 namespace {
+
+using bench::Malloc;
+using bench::SynchronizedPool;
+using bench::timed;
+using bench::UnsynchronizedPool;
 
 struct PrivateHeap {
     HANDLE heap = HeapCreate(0, 0, 0);
@@ -35,20 +31,6 @@ struct PrivateHeap {
     void* take(std::size_t size) const { return HeapAlloc(heap, 0, size); }
     void free(void* block, std::size_t) const { HeapFree(heap, 0, block); }
 };
-
-struct Malloc {
-    static void* take(std::size_t size) { return std::malloc(size); }
-    static void free(void* block, std::size_t) { std::free(block); }
-};
-
-template <class Resource>
-struct Pool {
-    Resource resource;
-    void* take(std::size_t size) { return resource.allocate(size); }
-    void free(void* block, std::size_t size) { resource.deallocate(block, size); }
-};
-using UnsynchronizedPool = Pool<std::pmr::unsynchronized_pool_resource>;
-using SynchronizedPool = Pool<std::pmr::synchronized_pool_resource>;
 
 constexpr std::size_t CHUNK = 2048;
 constexpr std::size_t LIVE_CHUNKS = 100'000;
@@ -124,15 +106,6 @@ void small_mix(benchmark::State& state) {
             allocator.free(block, size);
         }
     }
-}
-
-// Seconds of processor time of an action; the other thread sleeps. Wall time would include other processes,
-// which short phases do not average out.
-template <class Action>
-double timed(Action action) {
-    const std::clock_t start = std::clock();
-    action();
-    return static_cast<double>(std::clock() - start) / CLOCKS_PER_SEC;
 }
 
 constexpr std::size_t FRESH_BLOCKS = 1'000'000;
@@ -215,93 +188,6 @@ void grow_buffer(std::size_t step, std::size_t steps) {
     }
 }
 
-constexpr std::size_t BLOCK = 4096;
-constexpr std::size_t LIVE_BLOCKS = 100'000;
-
-struct BlockAllocator {
-    vex_lib::vlVmAllocator allocator{16 << 20, BLOCK};
-    void* take(std::size_t size) { return allocator.Alloc(size); }
-    void free(void* block, std::size_t) { allocator.Free(block); }
-};
-
-#if __has_include(<boost/pool/pool.hpp>)
-struct BoostPool {
-    boost::pool<> pool{BLOCK};
-    void* take(std::size_t) { return pool.malloc(); }
-    void free(void* block, std::size_t) { pool.free(block); }
-};
-#define BASALT_COMPARE_BOOST(...) __VA_ARGS__
-#else
-#define BASALT_COMPARE_BOOST(...)
-#endif
-
-enum class Order { NEWEST_FIRST, OLDEST_FIRST, RANDOM };
-enum class Timed { ALLOCATE, FREE };
-
-// Fills or empties an allocator that has been full before: time per block.
-template <class Allocator, Order ORDER, Timed TIMED>
-void blocks(benchmark::State& state) {
-    Allocator allocator;
-    std::vector<void*> live(LIVE_BLOCKS);
-    std::vector<void*> freed(LIVE_BLOCKS);
-    std::mt19937 random(3);
-    const auto round = [&] {
-        const double taking = timed([&] {
-            for (void*& block : live) {
-                block = allocator.take(BLOCK);
-            }
-        });
-        freed = live;
-        if (ORDER == Order::NEWEST_FIRST) {
-            std::reverse(freed.begin(), freed.end());
-        } else if (ORDER == Order::RANDOM) {
-            std::shuffle(freed.begin(), freed.end(), random);
-        }
-        const double freeing = timed([&] {
-            for (void* block : freed) {
-                allocator.free(block, BLOCK);
-            }
-        });
-        return TIMED == Timed::ALLOCATE ? taking : freeing;
-    };
-    round();
-    std::sort(freed.begin(), freed.end());
-    if (freed.front() == nullptr || std::adjacent_find(freed.begin(), freed.end()) != freed.end()) {
-        state.SkipWithError("a block is missing, or handed out twice");
-        return;
-    }
-    while (state.KeepRunningBatch(LIVE_BLOCKS)) {
-        state.SetIterationTime(round());
-    }
-}
-
-// A full allocator whose blocks are freed and allocated in random order.
-template <class Allocator>
-void block_churn(benchmark::State& state) {
-    Allocator allocator;
-    std::vector<void*> live(LIVE_BLOCKS);
-    for (void*& block : live) {
-        block = allocator.take(BLOCK);
-    }
-    std::mt19937 random(4);
-    std::shuffle(live.begin(), live.end(), random);
-    // All blocks of a window are freed before any is allocated, so that none is reused at once.
-    constexpr std::size_t WINDOW = 10'000;
-    std::size_t first = 0;
-    while (state.KeepRunningBatch(WINDOW)) {
-        first = (first + WINDOW) % LIVE_BLOCKS;
-        for (std::size_t i = first; i < first + WINDOW; ++i) {
-            allocator.free(live[i], BLOCK);
-        }
-        for (std::size_t i = first; i < first + WINDOW; ++i) {
-            live[i] = allocator.take(BLOCK);
-        }
-    }
-    for (void* block : live) {
-        allocator.free(block, BLOCK);
-    }
-}
-
 template <class Mutex>
 void lock_pair(benchmark::State& state) {
     Mutex mutex;
@@ -345,43 +231,11 @@ BENCHMARK_CAPTURE(grow, malloc, grow_malloc_block)->Name("grow_heap_block/reallo
 BENCHMARK_CAPTURE(grow, buffer, grow_buffer)->Name("grow_buffer/basalt");
 BENCHMARK_CAPTURE(grow, malloc, grow_malloc_block)->Name("grow_buffer/realloc");
 
-#define BASALT_COMPARE_BLOCKS(who, Allocator)                                   \
-    BENCHMARK_TEMPLATE(blocks, Allocator, Order::NEWEST_FIRST, Timed::ALLOCATE) \
-        ->Name("blocks_allocate_after_newest_first/" who)                       \
-        ->UseManualTime();                                                      \
-    BENCHMARK_TEMPLATE(blocks, Allocator, Order::OLDEST_FIRST, Timed::ALLOCATE) \
-        ->Name("blocks_allocate_after_oldest_first/" who)                       \
-        ->UseManualTime();                                                      \
-    BENCHMARK_TEMPLATE(blocks, Allocator, Order::NEWEST_FIRST, Timed::FREE)     \
-        ->Name("blocks_free_newest_first/" who)                                 \
-        ->UseManualTime();                                                      \
-    BENCHMARK_TEMPLATE(blocks, Allocator, Order::OLDEST_FIRST, Timed::FREE)     \
-        ->Name("blocks_free_oldest_first/" who)                                 \
-        ->UseManualTime();                                                      \
-    BENCHMARK_TEMPLATE(blocks, Allocator, Order::RANDOM, Timed::FREE)           \
-        ->Name("blocks_free_random/" who)                                       \
-        ->UseManualTime();                                                      \
-    BENCHMARK_TEMPLATE(block_churn, Allocator)->Name("blocks_churn_random/" who)
-
-BASALT_COMPARE_BLOCKS("basalt", BlockAllocator);
-BASALT_COMPARE_BLOCKS("pmr_pool", UnsynchronizedPool);
-BASALT_COMPARE_BLOCKS("malloc", Malloc);
-BASALT_COMPARE_BOOST(BASALT_COMPARE_BLOCKS("boost_pool", BoostPool);)
-
 BENCHMARK_TEMPLATE(lock_pair, basalt::platform::Lock)->Name("lock_pair/basalt");
 BENCHMARK_TEMPLATE(lock_pair, std::mutex)->Name("lock_pair/std_mutex");
 
 }  // namespace
 
 int main(int argc, char** argv) {
-    const std::jthread second([](const std::stop_token& stop) {
-        std::mutex mutex;
-        std::condition_variable_any asleep;
-        std::unique_lock lock(mutex);
-        asleep.wait(lock, stop, [] { return false; });
-    });
-    // Let the C library's heap keep its freed memory too.
-    mallopt(M_TRIM_THRESHOLD, 1 << 30);
-    benchmark::Initialize(&argc, argv);
-    benchmark::RunSpecifiedBenchmarks();
+    bench::run_with_a_second_thread(argc, argv);
 }

@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <stdexcept>
 #include <utility>
 #include <vector>
 
@@ -18,6 +19,7 @@ TEST(PreparedPolygon, IsCopiedMovedAndEmptied) {
     const basalt::PreparedPolygon copy = polygon;
     const basalt::PreparedPolygon moved = std::move(polygon);
     polygon = basalt::PreparedPolygon(nullptr, 0);
+    EXPECT_THROW(basalt::PreparedPolygon(square.data(), std::size_t{1} << 31), std::length_error);
     EXPECT_FALSE(polygon.contains({5, 5, 0}) || polygon.contains({5, 5, 0}, 100.0));
     const std::vector<geo_nee> points = {{5, 5, 0}, {11, 5, 0}, {NOT_A_NUMBER, 5, 0}, {10, 10, 0}};
     bool inside[5] = {false, true, true, false, true};

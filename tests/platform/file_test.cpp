@@ -96,6 +96,11 @@ TEST_F(File, a_new_temporary_file_is_reopened_or_nothing) {
         EXPECT_EQ(folder.read("victim"), "kept");
         EXPECT_EQ(open_error(name, OPEN_EXISTING), error == 0 ? 2U : 0U) << "only the first time";
     }
+    wchar_t name[MAX_PATH] = {};
+    ASSERT_NE(make_temporary(here, L"vma", name), 0U);
+    fs::rename(name, folder / "old");
+    EXPECT_EQ(open_error(name, CREATE_NEW), 0U);
+    EXPECT_EQ(open_error(name, OPEN_EXISTING), 0U) << "a new file of that name";
 }
 
 TEST_F(File, mappings_have_disk_space_and_keep_the_files_lock_without_a_descriptor) {

@@ -93,8 +93,8 @@ DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
         return ERROR_NOT_ENOUGH_MEMORY;
     }
     const bool creates = mode == Mode::CREATE;
-    const bool is_expected =
-        !creates && s_expected.inode != 0 && s_expected.path_hash == std::hash<std::string>{}(path);
+    const bool is_named = s_expected.inode != 0 && s_expected.path_hash == std::hash<std::string>{}(path);
+    const bool is_expected = is_named && !creates;
     const ExpectedFile expected = is_expected ? std::exchange(s_expected, {}) : ExpectedFile{};
     const int flags = creates ? O_RDWR | O_CREAT | O_EXCL : is_expected ? O_RDWR | O_NOFOLLOW : O_RDWR;
     for (int attempt = 0; attempt < MAX_ATTEMPTS; ++attempt) {
@@ -109,6 +109,9 @@ DWORD OpenFile::open(const std::string& path, Mode mode, bool delete_on_close) {
             error = ERROR_ACCESS_DENIED;
         }
         if (error == ERROR_SUCCESS) {
+            if (is_named) {
+                s_expected = {};  // the name may belong to a new file now
+            }
             m_descriptor = descriptor;
             m_delete_path = delete_on_close ? std::move(absolute) : std::string();
             m_device = status.st_dev;

@@ -14,27 +14,16 @@ inline constexpr basalt_language DEFAULT_LANGUAGE = 15;
 // Marks the resolution factor as not determined, by exact comparison.
 inline constexpr double RESOLUTION_NOT_DETERMINED = 2e-308;
 
-// Read and written by any thread, unordered: two threads that make the first query both store the same value.
-template <class T>
-class Setting {
-public:
-    constexpr explicit Setting(T start) : m_value(start) {}
-    T load() const { return m_value.load(std::memory_order_relaxed); }
-    void store(T value) { m_value.store(value, std::memory_order_relaxed); }
-
-private:
-    std::atomic<T> m_value;
-};
-
+// Read and written by any thread: two threads that make the first query both store the same value.
 struct EnvironmentState {
-    Setting<basalt_os> os_code{0};               // 0: not determined
-    Setting<std::int32_t> os_version_number{0};  // no detection of this library sets it
-    Setting<basalt_hh> handheld_code{0};         // 0: not determined
-    Setting<bool> new_generation{false};         // no detection of this library sets it
-    Setting<bool> rtk_option{false};             // no detection of this library sets it
-    Setting<basalt_language> language{DEFAULT_LANGUAGE};
-    Setting<double> resolution_factor{RESOLUTION_NOT_DETERMINED};
-    Setting<std::uint32_t> last_random_seed{0};  // tick count last given to the random generator
+    std::atomic<basalt_os> os_code{0};               // 0: not determined
+    std::atomic<std::int32_t> os_version_number{0};  // no detection of this library sets it
+    std::atomic<basalt_hh> handheld_code{0};         // 0: not determined
+    std::atomic<bool> new_generation{false};         // no detection of this library sets it
+    std::atomic<bool> rtk_option{false};             // no detection of this library sets it
+    std::atomic<basalt_language> language{DEFAULT_LANGUAGE};
+    std::atomic<double> resolution_factor{RESOLUTION_NOT_DETERMINED};
+    std::atomic<std::uint32_t> last_random_seed{0};  // tick count last given to the random generator
 };
 
 // Constant-initialised: nothing to do at load and unload.

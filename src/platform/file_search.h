@@ -19,7 +19,7 @@ struct WIN32_FIND_DATAW {
     DWORD nFileSizeLow;
     DWORD dwReserved0;  // 0
     DWORD dwReserved1;  // 0
-    wchar_t cFileName[260];
+    wchar_t cFileName[MAX_PATH];
     wchar_t cAlternateFileName[14];  // empty
 };
 

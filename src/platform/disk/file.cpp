@@ -11,12 +11,7 @@
 #include "src/platform/system/handle_table.h"
 #include "src/platform/text/file_name.h"
 
-using basalt::platform::fail_with;
-using basalt::platform::file_name_from_wide;
-using basalt::platform::OpenFile;
-using basalt::platform::or_out_of_memory;
-using basalt::platform::ProcessMark;
-using basalt::platform::this_process;
+using namespace basalt::platform;
 
 namespace {
 
@@ -35,7 +30,7 @@ struct DeleteAtExit {
             return;
         }
         s_are_deleted.store(true);
-        basalt::platform::for_each_object([](basalt::platform::HandleObject& object) {
+        for_each_object([](HandleObject& object) {
             if (object.kind() == OpenFile::KIND) {
                 static_cast<OpenFile&>(object).delete_at_exit();
             }
@@ -64,7 +59,7 @@ HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_AT
         }
         const bool deletes = (flags & FILE_FLAG_DELETE_ON_CLOSE) != 0;
         const auto file = std::make_shared<OpenFile>();
-        basalt::platform::NewHandle handle(file);
+        NewHandle handle(file);
         if (deletes) {
             register_deletion_at_exit();
         }
@@ -81,13 +76,23 @@ HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_AT
     });
 }
 
+BOOL CloseHandle(HANDLE handle) {
+    const auto object = find_object(handle);
+    if (object == nullptr || object->kind() == HandleObject::Kind::SEARCH) {
+        return fail_with(ERROR_INVALID_HANDLE, 0);
+    }
+    drop_handle(handle);
+    object->close();
+    return 1;
+}
+
 BOOL DeleteFileW(const wchar_t* name) {
     return or_out_of_memory(0, [&] {
         std::string path;
         if (!file_name_from_wide(name != nullptr ? name : L"", path)) {
             return fail_with(ERROR_INVALID_NAME, 0);
         }
-        const DWORD error = basalt::platform::delete_file(path);
+        const DWORD error = delete_file(path);
         return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
     });
 }

@@ -15,21 +15,14 @@
 namespace basalt::platform {
 namespace {
 
-class FileMapping final : public HandleObject {
-public:
+struct FileMapping final : HandleObject {
     static constexpr Kind KIND = Kind::MAPPING;
+    FileMapping(std::shared_ptr<OpenFile> mapped, std::size_t bytes) noexcept
+        : HandleObject(KIND), file(std::move(mapped)), size(bytes) {}
 
-    FileMapping(std::shared_ptr<OpenFile> file, std::size_t size) noexcept
-        : HandleObject(KIND), m_file(std::move(file)), m_size(size) {}
-
-    const std::shared_ptr<OpenFile>& file() const noexcept { return m_file; }  // null for anonymous pages
-    std::size_t size() const noexcept { return m_size; }
-
+    const std::shared_ptr<OpenFile> file;  // null for anonymous pages
+    const std::size_t size;
     bool is_used = false;  // its one view has been made
-
-private:
-    const std::shared_ptr<OpenFile> m_file;
-    const std::size_t m_size;
 };
 
 struct View {
@@ -45,22 +38,17 @@ ViewRegistry& views() noexcept {
 }
 
 DWORD map(FileMapping& mapping, std::byte*& address) noexcept {
-    if (mapping.file() != nullptr) {
-        return mapping.file()->map(mapping.size(), address);
+    if (mapping.file != nullptr) {
+        return mapping.file->map(mapping.size, address);
     }
-    address = map_pages(whole_pages(mapping.size()), page_size());
+    address = map_pages(whole_pages(mapping.size), page_size());
     return address != nullptr ? ERROR_SUCCESS : ERROR_NOT_ENOUGH_MEMORY;
 }
 
 }  // namespace
 }  // namespace basalt::platform
 
-using basalt::platform::fail_with;
-using basalt::platform::FileMapping;
-using basalt::platform::OpenFile;
-using basalt::platform::or_out_of_memory;
-using basalt::platform::ViewRegistry;
-using basalt::platform::views;
+using namespace basalt::platform;
 
 HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD protection, DWORD size_high,
                           DWORD size_low, const wchar_t* name) {
@@ -73,7 +61,7 @@ HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD prot
     return or_out_of_memory(HANDLE{nullptr}, [&] {
         std::shared_ptr<OpenFile> open;
         if (!is_anonymous) {
-            open = basalt::platform::find_object_of<OpenFile>(file);
+            open = find_object_of<OpenFile>(file);
             if (open == nullptr) {
                 return fail_with(ERROR_INVALID_HANDLE, HANDLE{nullptr});
             }
@@ -81,7 +69,7 @@ HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD prot
                 return fail_with(ERROR_FILE_INVALID, HANDLE{nullptr});
             }
         }
-        basalt::platform::NewHandle handle(std::make_shared<FileMapping>(open, size));
+        NewHandle handle(std::make_shared<FileMapping>(open, size));
         const DWORD error = is_anonymous ? ERROR_SUCCESS : open->reserve(size);
         return error == ERROR_SUCCESS ? handle.give() : fail_with(error, HANDLE{nullptr});
     });
@@ -89,21 +77,21 @@ HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD prot
 
 void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offset_low, std::size_t size) {
     using Address = void*;
-    const auto object = basalt::platform::find_object_of<FileMapping>(mapping);
+    const auto object = find_object_of<FileMapping>(mapping);
     if (object == nullptr) {
         return fail_with(ERROR_INVALID_HANDLE, Address{});
     }
     if (access != FILE_MAP_ALL_ACCESS || offset_high != 0 || offset_low != 0 ||
-        (size != 0 && size != object->size())) {
+        (size != 0 && size != object->size)) {
         return fail_with(ERROR_INVALID_PARAMETER, Address{});
     }
     if (object->is_used) {
         return fail_with(ERROR_NOT_SUPPORTED, Address{});
     }
     return or_out_of_memory(Address{}, [&] {
-        auto view = ViewRegistry::make_entry({object->file(), object->size()});
+        auto view = ViewRegistry::make_entry({object->file, object->size});
         std::byte* address = nullptr;
-        const DWORD error = basalt::platform::map(*object, address);
+        const DWORD error = map(*object, address);
         if (error != ERROR_SUCCESS) {
             return fail_with(error, Address{});
         }
@@ -121,9 +109,8 @@ BOOL UnmapViewOfFile(const void* address) {
     }
     auto* const pages = static_cast<std::byte*>(const_cast<void*>(address));
     const auto& [file, size] = view.mapped();
-    const bool is_unmapped = file != nullptr
-                                 ? file->unmap(pages, size)
-                                 : basalt::platform::unmap_pages(pages, basalt::platform::whole_pages(size));
+    const bool is_unmapped =
+        file != nullptr ? file->unmap(pages, size) : unmap_pages(pages, whole_pages(size));
     if (!is_unmapped) {
         views().add(address, view);
         return fail_with(ERROR_NOT_ENOUGH_MEMORY, 0);

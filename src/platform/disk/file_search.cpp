@@ -21,12 +21,7 @@
 #include "src/platform/text/file_name.h"
 #include "src/platform/ticks.h"
 
-using basalt::platform::error_from_errno;
-using basalt::platform::fail_with;
-using basalt::platform::HandleObject;
-using basalt::platform::matches_wildcards;
-using basalt::platform::NewHandle;
-using basalt::platform::or_out_of_memory;
+using namespace basalt::platform;
 
 namespace {
 
@@ -47,7 +42,7 @@ public:
     // Begins a search of a folder. ERROR_SUCCESS or an error.
     DWORD open(const char* folder, std::wstring_view pattern) {
         m_pattern = pattern;
-        m_folder = basalt::platform::open_folder(folder);
+        m_folder = open_folder(folder);
         if (m_folder != nullptr) {
             return ERROR_SUCCESS;
         }
@@ -68,8 +63,8 @@ private:
     std::wstring m_pattern;
 };
 
-FILETIME file_time(const statx_timestamp& time) {
-    return basalt::platform::file_time(basalt::platform::ticks_of(time.tv_sec, time.tv_nsec));
+FILETIME file_time_of(const statx_timestamp& time) {
+    return file_time(ticks_of(time.tv_sec, time.tv_nsec));
 }
 
 // The fields of a status that describe() reads.
@@ -84,9 +79,9 @@ void describe(std::wstring_view name, mode_t mode, WIN32_FIND_DATAW& entry) {
 void describe(std::wstring_view name, const struct statx& status, WIN32_FIND_DATAW& entry) {
     describe(name, status.stx_mode, entry);
     const bool knows_creation = (status.stx_mask & STATX_BTIME) != 0;
-    entry.ftCreationTime = file_time(knows_creation ? status.stx_btime : status.stx_ctime);
-    entry.ftLastAccessTime = file_time(status.stx_atime);
-    entry.ftLastWriteTime = file_time(status.stx_mtime);
+    entry.ftCreationTime = file_time_of(knows_creation ? status.stx_btime : status.stx_ctime);
+    entry.ftLastAccessTime = file_time_of(status.stx_atime);
+    entry.ftLastWriteTime = file_time_of(status.stx_mtime);
     entry.nFileSizeHigh = static_cast<DWORD>(status.stx_size >> 32);
     entry.nFileSizeLow = static_cast<DWORD>(status.stx_size & 0xFFFFFFFF);
 }
@@ -118,7 +113,7 @@ DWORD FileSearch::advance() {
         if (m_found == nullptr) {
             return errno == 0 ? ERROR_NO_MORE_FILES : error_from_errno(errno);
         }
-        basalt::platform::wide_from_system_name(m_found->d_name, m_name);
+        wide_from_system_name(m_found->d_name, m_name);
     } while (!matches_wildcards(m_name, m_pattern));
     return ERROR_SUCCESS;
 }
@@ -151,7 +146,7 @@ struct SearchPath {
 
     explicit SearchPath(std::wstring_view path) {
         std::size_t start = path.size();
-        for (; start > 0 && !basalt::platform::is_separator(path[start - 1]); --start) {
+        for (; start > 0 && !is_separator(path[start - 1]); --start) {
             has_wildcards |= path[start - 1] == L'*' || path[start - 1] == L'?';
         }
         folder = path.substr(0, start);
@@ -161,7 +156,7 @@ struct SearchPath {
 
 // Opens the folder of a search with wildcards. ERROR_SUCCESS or an error.
 DWORD open_folder(const SearchPath& sought, FileSearch& search) {
-    basalt::platform::FileName name;
+    FileName name;
     return name.set(sought.folder.empty() ? L"." : sought.folder) ? search.open(name.c_str(), sought.last)
                                                                   : ERROR_INVALID_NAME;
 }
@@ -173,13 +168,13 @@ DWORD find_first(const wchar_t* path, unsigned fields, FileSearch& search, WIN32
         return ERROR_FILE_NOT_FOUND;
     }
     if (!sought.has_wildcards) {
-        basalt::platform::FileName name;
+        FileName name;
         if (!name.set(path)) {
             return ERROR_INVALID_NAME;
         }
         struct statx status = {};
         if (!query(AT_FDCWD, name.c_str(), fields, status)) {
-            return basalt::platform::error_of_path(name.c_str(), errno);
+            return error_of_path(name.c_str(), errno);
         }
         describe(sought.last, status, entry);
         return ERROR_SUCCESS;
@@ -236,16 +231,16 @@ HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry) {
 
 BOOL FindNextFileW(HANDLE search, WIN32_FIND_DATAW* entry) {
     return or_out_of_memory(0, [&] {
-        const auto open = basalt::platform::find_object_of<FileSearch>(search);
+        const auto open = find_object_of<FileSearch>(search);
         const DWORD error = open != nullptr ? open->next(*entry) : ERROR_INVALID_HANDLE;
         return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
     });
 }
 
 BOOL FindClose(HANDLE search) {
-    if (basalt::platform::find_object_of<FileSearch>(search) == nullptr) {
+    if (find_object_of<FileSearch>(search) == nullptr) {
         return fail_with(ERROR_INVALID_HANDLE, 0);
     }
-    basalt::platform::drop_handle(search);
+    drop_handle(search);
     return 1;
 }

@@ -14,9 +14,7 @@
 #include "src/platform/system/failure.h"
 #include "src/platform/text/file_name.h"
 
-using basalt::platform::fail_with;
-using basalt::platform::is_separator;
-using basalt::platform::or_out_of_memory;
+using namespace basalt::platform;
 
 namespace {
 
@@ -42,7 +40,7 @@ DWORD GetTempPathW(DWORD length, wchar_t* buffer) {
     return or_out_of_memory(DWORD{0}, [&] {
         const char* const configured = std::getenv("TMPDIR");
         const bool is_set = configured != nullptr && *configured != '\0';
-        std::wstring folder = basalt::platform::wide_from_file_name(is_set ? configured : "/tmp");
+        std::wstring folder = wide_from_file_name(is_set ? configured : "/tmp");
         if (!is_separator(folder.back())) {
             folder += L'/';
         }
@@ -74,11 +72,11 @@ UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique,
             std::swprintf(digits, 9, L"%X.tmp", number);
             const std::wstring full = stem + digits;
             std::string path;
-            if (!basalt::platform::file_name_from_wide(full, path)) {
+            if (!file_name_from_wide(full, path)) {
                 return fail_with(ERROR_INVALID_NAME, UINT{0});
             }
-            basalt::platform::OpenFile file;
-            const DWORD error = file.open(path, basalt::platform::OpenFile::Mode::CREATE, false);
+            OpenFile file;
+            const DWORD error = file.open(path, OpenFile::Mode::CREATE, false);
             if (error == ERROR_SUCCESS) {
                 file.expect_at(path);
                 std::wmemcpy(name, full.c_str(), full.size() + 1);

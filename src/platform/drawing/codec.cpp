@@ -6,6 +6,7 @@
 
 #include "src/platform/drawing/bmp_file.h"
 #include "src/platform/drawing/objects.h"
+#include "src/platform/system/failure.h"
 
 struct GpImage {
     HBITMAP bitmap;
@@ -13,8 +14,7 @@ struct GpImage {
 
 namespace {
 
-using basalt::platform::Bitmap;
-using basalt::platform::object_of;
+using namespace basalt::platform;
 
 constexpr CLSID BMP_ENCODER = {0x557CF400, 0x1A04, 0x11D3, {0x9A, 0x73, 0x00, 0x00, 0xF8, 0x1E, 0xF3, 0x2E}};
 constexpr BYTE BMP_SIGNATURE[] = {'B', 'M'};
@@ -103,11 +103,9 @@ Gdiplus::Status GdipSaveImageToFile(GpImage* image, const wchar_t* name, const C
     if (bitmap == nullptr) {
         return Gdiplus::InvalidParameter;
     }
-    try {
-        return basalt::platform::write_bmp_file(bitmap->surface, name) ? Gdiplus::Ok : Gdiplus::Win32Error;
-    } catch (const std::bad_alloc&) {
-        return Gdiplus::OutOfMemory;
-    }
+    return or_out_of_memory(Gdiplus::OutOfMemory, [&] {
+        return write_bmp_file(bitmap->surface, name) ? Gdiplus::Ok : Gdiplus::Win32Error;
+    });
 }
 
 Gdiplus::Status GdipDisposeImage(GpImage* image) {

@@ -8,11 +8,7 @@
 
 namespace {
 
-using basalt::platform::Bitmap;
-using basalt::platform::Brush;
-using basalt::platform::Context;
-using basalt::platform::fail_with;
-using basalt::platform::object_of;
+using namespace basalt::platform;
 
 HDC keep_context(bool is_screen) {
     std::unique_ptr<Context> context(new (std::nothrow) Context);
@@ -23,25 +19,25 @@ HDC keep_context(bool is_screen) {
             return nullptr;
         }
     }
-    return static_cast<HDC>(basalt::platform::keep_graphics_object(std::move(context)));
+    return static_cast<HDC>(keep_graphics_object(std::move(context)));
 }
 
 void count_selection(HGDIOBJ brush, int change) {
-    if (!basalt::platform::is_stock_object(brush)) {
+    if (!is_stock_object(brush)) {
         // A counted brush cannot be deleted, so a handle that was selected is still valid.
-        static_cast<Brush*>(basalt::platform::find_graphics_object(brush))->selections += change;
+        static_cast<Brush*>(find_graphics_object(brush))->selections += change;
     }
 }
 
 HGDIOBJ exchange_brush(Context& context, HGDIOBJ next) {
-    context.brush = *basalt::platform::paint_of(next);
+    context.brush = *paint_of(next);
     count_selection(next, 1);
     count_selection(context.brush_handle, -1);
     return std::exchange(context.brush_handle, next);
 }
 
 HGDIOBJ exchange_bitmap(Context& context, HGDIOBJ next) {
-    const bool to_stock = next == basalt::platform::stock_bitmap();
+    const bool to_stock = next == stock_bitmap();
     auto* const bitmap = to_stock ? nullptr : object_of<Bitmap>(next);
     if (!to_stock && bitmap == nullptr) {
         return nullptr;
@@ -71,7 +67,7 @@ BOOL end_context(HDC dc, bool is_screen) {
     if (context->is_screen != is_screen) {
         return fail_with(ERROR_INVALID_HANDLE, 0);
     }
-    return basalt::platform::release_graphics_object(dc) != nullptr;
+    return release_graphics_object(dc) != nullptr;
 }
 
 COLORREF exchange_colour(HDC dc, COLORREF Context::*member, COLORREF colour) {
@@ -119,10 +115,10 @@ HGDIOBJ SelectObject(HDC dc, HGDIOBJ object) {
     if (context == nullptr) {
         return nullptr;
     }
-    if (basalt::platform::is_brush(object)) {
+    if (is_brush(object)) {
         return exchange_brush(*context, object);
     }
-    if (basalt::platform::is_stock_pen(object)) {
+    if (is_stock_pen(object)) {
         return std::exchange(context->pen_handle, object);
     }
     return exchange_bitmap(*context, object);

@@ -10,12 +10,7 @@
 
 namespace {
 
-using basalt::platform::Bitmap;
-using basalt::platform::Brush;
-using basalt::platform::fail_with;
-using basalt::platform::GraphicsKind;
-using basalt::platform::GraphicsObject;
-using basalt::platform::Paint;
+using namespace basalt::platform;
 
 constexpr std::uintptr_t FIRST_STOCK_HANDLE = 0x8000;
 constexpr std::uintptr_t STOCK_BITMAP = NULL_PEN + 1;
@@ -97,30 +92,29 @@ std::optional<PixelShift> Context::required_shift() const {
 }  // namespace basalt::platform
 
 BOOL DeleteObject(HGDIOBJ object) {
-    if (basalt::platform::is_stock_object(object)) {
+    if (is_stock_object(object)) {
         return 1;
     }
-    const GraphicsObject* const found = basalt::platform::find_graphics_object(object);
+    const GraphicsObject* const found = find_graphics_object(object);
     const DWORD error = found != nullptr ? deletion_error(*found) : ERROR_INVALID_HANDLE;
     if (error != ERROR_SUCCESS) {
         return fail_with(error, 0);
     }
-    return basalt::platform::release_graphics_object(object) != nullptr;
+    return release_graphics_object(object) != nullptr;
 }
 
 int GetObjectW(HGDIOBJ object, int size, void* record) {
     constexpr int RECORD_SIZE = sizeof(BITMAP);
     BITMAP description = {0, 1, 1, 2, 1, 1, nullptr};
-    if (object != basalt::platform::stock_bitmap()) {
-        const auto* const bitmap = basalt::platform::object_of<Bitmap>(object);
+    if (object != stock_bitmap()) {
+        const auto* const bitmap = object_of<Bitmap>(object);
         if (bitmap == nullptr) {
             return 0;
         }
-        const basalt::platform::Surface& surface = bitmap->surface;
+        const Surface& surface = bitmap->surface;
         description.bmWidth = surface.width;
         description.bmHeight = surface.height;
-        description.bmWidthBytes =
-            static_cast<LONG>(basalt::platform::bitmap_row_bytes(surface.width, surface.depth));
+        description.bmWidthBytes = static_cast<LONG>(bitmap_row_bytes(surface.width, surface.depth));
         description.bmBitsPixel = static_cast<WORD>(surface.depth);
     }
     if (record == nullptr) {
@@ -141,8 +135,8 @@ HGDIOBJ GetStockObject(int number) {
 }
 
 HBRUSH CreateSolidBrush(COLORREF colour) {
-    return static_cast<HBRUSH>(basalt::platform::keep_graphics_object(
-        std::unique_ptr<GraphicsObject>(new (std::nothrow) Brush(colour))));
+    return static_cast<HBRUSH>(
+        keep_graphics_object(std::unique_ptr<GraphicsObject>(new (std::nothrow) Brush(colour))));
 }
 
 CBrush* CBrush::FromHandle(HBRUSH brush) {
@@ -156,9 +150,9 @@ CBrush* CBrush::FromHandle(HBRUSH brush) {
                 }
             }
         };
-        static basalt::platform::NoDestructor<Wrappers> wrappers;
-        return basalt::platform::lend(wrappers->lent[stock_number(brush)], brush);
+        static NoDestructor<Wrappers> wrappers;
+        return lend(wrappers->lent[stock_number(brush)], brush);
     }
-    auto* const object = basalt::platform::object_of<Brush>(brush);
-    return object != nullptr ? basalt::platform::lend(object->lent, brush) : nullptr;
+    auto* const object = object_of<Brush>(brush);
+    return object != nullptr ? lend(object->lent, brush) : nullptr;
 }

@@ -13,13 +13,7 @@
 
 namespace {
 
-using basalt::platform::Bands;
-using basalt::platform::fail_with;
-using basalt::platform::GraphicsKind;
-using basalt::platform::GraphicsObject;
-using basalt::platform::Keep;
-using basalt::platform::object_of;
-using basalt::platform::or_out_of_memory;
+using namespace basalt::platform;
 
 struct DrawingRegion : GraphicsObject {
     static constexpr GraphicsKind KIND = GraphicsKind::REGION;
@@ -50,9 +44,8 @@ HRGN CreateRectRgn(int left, int top, int right, int bottom) {
     const auto [first_row, end_row] = std::minmax(top, bottom);
     const RECT rectangle = {first_column, first_row, end_column, end_row};
     const bool is_empty = left == right || top == bottom;
-    return or_out_of_memory(HRGN{nullptr}, [&] {
-        return basalt::platform::create_region(std::vector<RECT>(is_empty ? 0 : 1, rectangle));
-    });
+    return or_out_of_memory(HRGN{nullptr},
+                            [&] { return create_region(std::vector<RECT>(is_empty ? 0 : 1, rectangle)); });
 }
 
 int CombineRgn(HRGN destination, HRGN a, HRGN b, int mode) {
@@ -130,5 +123,5 @@ BOOL EqualRgn(HRGN a, HRGN b) {
 
 CRgn* CRgn::FromHandle(HRGN region) {
     auto* const object = object_of<DrawingRegion>(region);
-    return object != nullptr ? basalt::platform::lend(object->lent, region) : nullptr;
+    return object != nullptr ? lend(object->lent, region) : nullptr;
 }

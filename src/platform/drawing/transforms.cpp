@@ -10,10 +10,7 @@
 
 namespace {
 
-using basalt::platform::Affine;
-using basalt::platform::Context;
-using basalt::platform::fail_with;
-using basalt::platform::object_of;
+using namespace basalt::platform;
 
 bool fits(double value) {
     return value >= std::numeric_limits<LONG>::min() && value <= std::numeric_limits<LONG>::max();

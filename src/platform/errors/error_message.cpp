@@ -8,6 +8,8 @@
 
 #include "src/platform/system/failure.h"
 
+using namespace basalt::platform;
+
 namespace {
 
 constexpr DWORD SUPPORTED_FLAGS =
@@ -69,7 +71,7 @@ DWORD FormatMessageW(DWORD flags, const void* /*source*/, DWORD code, DWORD lang
         *buffer = nullptr;
     }
     if (flags != SUPPORTED_FLAGS || language != 0 || buffer == nullptr) {
-        return basalt::platform::fail_with(ERROR_INVALID_PARAMETER, DWORD{0});
+        return fail_with(ERROR_INVALID_PARAMETER, DWORD{0});
     }
     const auto* known = std::lower_bound(std::begin(MESSAGES), std::end(MESSAGES), code,
                                          [](const Message& m, DWORD wanted) { return m.code < wanted; });
@@ -80,7 +82,7 @@ DWORD FormatMessageW(DWORD flags, const void* /*source*/, DWORD code, DWORD lang
     const std::size_t capacity = std::max<std::size_t>(size, text.size() + MAX_DIGITS + 1);
     auto* const message = static_cast<wchar_t*>(std::malloc(capacity * sizeof(wchar_t)));
     if (message == nullptr) {
-        return basalt::platform::fail_with(ERROR_NOT_ENOUGH_MEMORY, DWORD{0});
+        return fail_with(ERROR_NOT_ENOUGH_MEMORY, DWORD{0});
     }
     wchar_t* const end = std::copy(digits, digits_end, std::copy(text.begin(), text.end(), message));
     *end = L'\0';

@@ -17,6 +17,8 @@
 #include "basalt/platform/error.h"
 #include "src/platform/errors/error_from_errno.h"
 
+using namespace basalt::platform;
+
 namespace {
 
 // Used for nothing else: /sys shows the network namespace it was mounted in.
@@ -59,7 +61,7 @@ template <class Wanted, class Visit>
 DWORD visit_interfaces(const Wanted& wanted, const Visit& visit) {
     ifaddrs* first = nullptr;
     if (::getifaddrs(&first) != 0) {
-        return basalt::platform::error_from_errno(errno);
+        return error_from_errno(errno);
     }
     const std::unique_ptr<ifaddrs, decltype(&::freeifaddrs)> list(first, ::freeifaddrs);
     for (const ifaddrs* entry = first; entry != nullptr; entry = entry->ifa_next) {

@@ -12,7 +12,7 @@
 #include "src/platform/system/failure.h"
 #include "src/platform/text/file_name.h"
 
-using basalt::platform::fail_with;
+using namespace basalt::platform;
 
 BOOL GetVersionExW(OSVERSIONINFOW* information) {
     if (information == nullptr || information->dwOSVersionInfoSize != sizeof(OSVERSIONINFOW)) {
@@ -37,11 +37,11 @@ DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
     char link[PATH_MAX];
     const ssize_t length = ::readlink("/proc/self/exe", link, sizeof link);
     if (length < 0) {
-        return fail_with(basalt::platform::error_from_errno(errno), DWORD{0});
+        return fail_with(error_from_errno(errno), DWORD{0});
     }
-    return basalt::platform::or_out_of_memory(DWORD{0}, [&] {
+    return or_out_of_memory(DWORD{0}, [&] {
         std::wstring wide;
-        basalt::platform::wide_from_system_name({link, static_cast<std::size_t>(length)}, wide);
+        wide_from_system_name({link, static_cast<std::size_t>(length)}, wide);
         const std::size_t copied = std::min<std::size_t>(wide.size(), size - 1);
         std::copy_n(wide.data(), copied, name);
         name[copied] = L'\0';

@@ -18,8 +18,7 @@
 #include "src/platform/system/output.h"
 #include "src/platform/text/file_name.h"
 
-using basalt::platform::fail_with;
-using basalt::platform::or_out_of_memory;
+using namespace basalt::platform;
 
 namespace {
 
@@ -35,8 +34,7 @@ class BoundedFile {
 public:
     explicit BoundedFile(const std::string& name)
         // Non-blocking: the name may be a pipe's.
-        : m_descriptor(
-              basalt::platform::above_standard(::open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK))) {
+        : m_descriptor(above_standard(::open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK))) {
         struct stat status {};
         if (m_descriptor >= 0 && ::fstat(m_descriptor, &status) == 0 && S_ISREG(status.st_mode)) {
             m_size = static_cast<std::uint64_t>(status.st_size);
@@ -135,7 +133,7 @@ std::optional<Range> find_block(const BoundedFile& file) {
 
 std::optional<Range> open_block(const BoundedFile& file) {
     if (!file.is_open()) {
-        return fail_with(basalt::platform::error_from_errno(errno), std::nullopt);
+        return fail_with(error_from_errno(errno), std::nullopt);
     }
     const std::optional<Range> block = find_block(file);
     return block ? block : fail_with(ERROR_RESOURCE_DATA_NOT_FOUND, std::nullopt);
@@ -144,7 +142,7 @@ std::optional<Range> open_block(const BoundedFile& file) {
 // Empty, which opens nothing, for a name that is not a valid one.
 std::string system_name(const wchar_t* file_name) {
     std::string name;
-    return basalt::platform::file_name_from_wide(file_name, name) ? name : std::string();
+    return file_name_from_wide(file_name, name) ? name : std::string();
 }
 
 }  // namespace

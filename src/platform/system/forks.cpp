@@ -10,7 +10,7 @@ namespace basalt::platform {
 namespace {
 
 constinit Lock s_registering;
-constinit std::atomic<bool> s_counts = false;
+constinit std::atomic<bool> s_is_counting = false;
 constinit std::atomic<ProcessMark> s_forks = 0;
 
 }  // namespace
@@ -28,7 +28,7 @@ bool register_fork_handlers(std::atomic<bool>& are_registered, const ForkHandler
 }
 
 bool count_forks() noexcept {
-    return register_fork_handlers(s_counts, {nullptr, nullptr, [] { ++s_forks; }});
+    return register_fork_handlers(s_is_counting, {nullptr, nullptr, [] { ++s_forks; }});
 }
 
 ProcessMark this_process() noexcept {

@@ -3,8 +3,6 @@
 #include <atomic>
 #include <utility>
 
-#include "src/platform/file.h"
-#include "src/platform/system/failure.h"
 #include "src/platform/system/no_destructor.h"
 
 namespace basalt::platform {
@@ -52,14 +50,3 @@ void for_each_object(void (*visit)(HandleObject&)) noexcept {
 }
 
 }  // namespace basalt::platform
-
-BOOL CloseHandle(HANDLE handle) {
-    using basalt::platform::HandleObject;
-    const std::shared_ptr<HandleObject> object = basalt::platform::find_object(handle);
-    if (object == nullptr || object->kind() == HandleObject::Kind::SEARCH) {
-        return basalt::platform::fail_with(ERROR_INVALID_HANDLE, 0);
-    }
-    basalt::platform::drop_handle(handle);
-    object->close();
-    return 1;
-}

@@ -7,8 +7,7 @@
 
 #include "src/platform/code_page.h"
 
-using basalt::platform::active_code_page;
-using basalt::platform::CodePage;
+using namespace basalt::platform;
 
 namespace {
 
@@ -55,22 +54,21 @@ CString::CString(const wchar_t* text, int length) {
 
 CString::CString(const char* text) {
     if (text != nullptr) {
-        const std::wstring wide = basalt::platform::widen(text);
+        const std::wstring wide = widen(text);
         append(wide.data(), wide.size());
     }
 }
 
 CString::CString(const char* text, int length) {
     if (text != nullptr && length > 0) {
-        m_text = basalt::platform::widen({text, static_cast<std::size_t>(length)});
+        m_text = widen({text, static_cast<std::size_t>(length)});
     }
 }
 
 CString::CString(wchar_t character, int repeat)
     : m_text(static_cast<std::size_t>(std::max(repeat, 0)), character) {}
 
-CString::CString(char character, int repeat)
-    : CString(basalt::platform::widen({&character, 1}).front(), repeat) {}
+CString::CString(char character, int repeat) : CString(widen({&character, 1}).front(), repeat) {}
 
 CString& CString::operator=(wchar_t character) {
     m_text.assign(1, character);

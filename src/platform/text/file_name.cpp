@@ -8,11 +8,21 @@
 namespace basalt::platform {
 namespace {
 
-// Low surrogates, which UTF-8 does not contain, encode single bytes.
-constexpr wchar_t BYTES = 0xDC00;
-
 constexpr bool stands_for_byte(wchar_t ch) {
-    return ch == BYTES + L'\\' || (ch >= BYTES + 0x80 && ch <= BYTES + 0xFF);
+    return ch == BYTE_VALUES + L'\\' || (ch >= BYTE_VALUES + 0x80 && ch <= BYTE_VALUES + 0xFF);
+}
+
+void set_wide(std::string_view name, std::wstring& result) {
+    result.resize(name.size());
+    result.resize(write_wide(name, result.data(), result.size()));
+    // The name itself may contain the replacement character.
+    if (result.find(REPLACEMENT_CHARACTER) == std::wstring::npos || utf8_from_wide(result) == name) {
+        return;
+    }
+    result.clear();
+    for (const char byte : name) {
+        result.push_back(wide_from_byte(byte));
+    }
 }
 
 }  // namespace
@@ -50,27 +60,14 @@ bool FileName::set(std::wstring_view name) {
     return is_name;
 }
 
-void wide_from_file_name(std::string_view name, std::wstring& result) {
-    result.resize(name.size());
-    result.resize(write_wide(name, result.data(), result.size()));
-    // The name itself may contain the replacement character.
-    if (result.find(REPLACEMENT_CHARACTER) == std::wstring::npos || utf8_from_wide(result) == name) {
-        return;
-    }
-    result.clear();
-    for (const char byte : name) {
-        result.push_back(wide_from_byte(byte));
-    }
-}
-
 void wide_from_system_name(std::string_view name, std::wstring& result) {
-    wide_from_file_name(name, result);
-    std::replace(result.begin(), result.end(), L'\\', static_cast<wchar_t>(BYTES + L'\\'));
+    set_wide(name, result);
+    std::replace(result.begin(), result.end(), L'\\', static_cast<wchar_t>(BYTE_VALUES + L'\\'));
 }
 
 std::wstring wide_from_file_name(std::string_view name) {
     std::wstring wide;
-    wide_from_file_name(name, wide);
+    set_wide(name, wide);
     return wide;
 }
 

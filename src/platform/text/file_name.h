@@ -27,18 +27,19 @@ private:
     char m_short[512];
 };
 
+// Low surrogates, which UTF-8 does not contain, encode single bytes.
+inline constexpr wchar_t BYTE_VALUES = 0xDC00;
+
 // The value for a byte that is not part of a character.
 constexpr wchar_t wide_from_byte(char byte) {
     const auto value = static_cast<unsigned char>(byte);
-    return static_cast<wchar_t>(value < 0x80 ? value : 0xDC00 + value);
+    return static_cast<wchar_t>(value < 0x80 ? value : BYTE_VALUES + value);
 }
 
 // The wide text that file_name_from_wide() converts back to the same bytes. If a name is not UTF-8, each of
 // its bytes from 0x80 becomes a value from 0xDC80.
 std::wstring wide_from_file_name(std::string_view name);
-// The same, reusing the result's storage.
-void wide_from_file_name(std::string_view name, std::wstring& result);
-// The same for a name returned by the system, in which '\' is not a separator.
+// The same for a name returned by the system, in which '\' is not a separator; reuses the result's storage.
 void wide_from_system_name(std::string_view name, std::wstring& result);
 
 }  // namespace basalt::platform

@@ -12,8 +12,7 @@
 #include "src/platform/code_page.h"
 #include "src/platform/system/failure.h"
 
-using basalt::platform::active_code_page;
-using basalt::platform::fail_with;
+using namespace basalt::platform;
 
 namespace {
 

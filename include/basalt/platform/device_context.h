@@ -199,7 +199,7 @@ public:
         const CBrush brush(colour);
         FillRect(rectangle, &brush);
     }
-    /// Fills a rectangle with a colour.
+    /// Fills a rectangle with a colour; its right and bottom must fit 32 bits.
     void FillSolidRect(int x, int y, int width, int height, COLORREF colour) const {
         const RECT rectangle = {x, y, x + width, y + height};
         FillSolidRect(&rectangle, colour);

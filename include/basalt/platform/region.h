@@ -145,7 +145,7 @@ public:
     BOOL PtInRegion(POINT point) const { return ::PtInRegion(*this, point.x, point.y); }
     /// Writes the region's rectangles, as ::GetRegionData does.
     int GetRegionData(RGNDATA* data, int size) const {
-        return static_cast<int>(::GetRegionData(*this, static_cast<DWORD>(size), data));
+        return static_cast<int>(::GetRegionData(*this, size > 0 ? static_cast<DWORD>(size) : 0, data));
     }
     /// The smallest rectangle around the region, as ::GetRgnBox returns it.
     int GetRgnBox(RECT* box) const { return ::GetRgnBox(*this, box); }

@@ -1,13 +1,15 @@
 #!/usr/bin/env python3
-"""Checks the links inside the project: of each Markdown page, and within the reference.
+"""Checks the links inside the project: of each Markdown page, and within the reference. Checks that the files that pages
+name in `code` exist.
 
-Usage: check_links.py HTML_FOLDER       prints each dead link
+Usage: check_links.py HTML_FOLDER       prints each dead link and missing file
 """
 import pathlib
 import re
 import sys
 import urllib.parse
 
+NAMED_FILE = re.compile(r"`((?:bench|cmake|docs|fuzz|include|scripts|src|tests)/[\w/.]*)`")
 ELSEWHERE = re.compile(r"^(https?:|mailto:|javascript:|#|@ref )")
 
 
@@ -38,6 +40,8 @@ def main():
              if page.relative_to(root).parts[0] != "build"]
     html = sorted(pathlib.Path(sys.argv[1]).glob("**/*.html"))
     errors = [*dead_links(pages, targets_of_markdown), *dead_links(html, targets_of_html)]
+    errors += [f"{page}: no such file: {name}" for page in pages for name in NAMED_FILE.findall(page.read_text("utf-8"))
+               if not (root / name).exists()]
     if not html:
         errors.append(f"{sys.argv[1]}: no reference there")
     sys.exit("\n".join(errors) if errors else 0)

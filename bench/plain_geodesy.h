@@ -1,5 +1,4 @@
-// The conversions and geodesics step by step, one library call for each sine, root and power, to time
-// fast forms with.
+// The conversions and geodesics step by step, with one call of the C library for each sine, root and power.
 #ifndef BASALT_BENCH_PLAIN_GEODESY_H
 #define BASALT_BENCH_PLAIN_GEODESY_H
 

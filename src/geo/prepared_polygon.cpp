@@ -48,6 +48,17 @@ bool is_nan(const geo_nee& vertex) {
     return std::isnan(vertex.north) || std::isnan(vertex.east);
 }
 
+/// Calls visit(i, j) for each edge from j to i whose end i is not NaN: another one neither crosses nor
+/// matches.
+template <class Visit>
+void for_each_edge(const geo_nee* vertices, std::size_t count, const Visit& visit) {
+    for (std::size_t i = 0; i < count; ++i) {
+        if (!is_nan(vertices[i])) {
+            visit(vertices[i], vertices[i > 0 ? i - 1 : count - 1]);
+        }
+    }
+}
+
 /// Extent of an edge as may_be_in_band() forms it; infinite or NaN where it has no bounds.
 double extent_of(const geo_nee& a, const geo_nee& b) {
     return std::abs(a.north - b.north) + std::abs(a.east - b.east);
@@ -142,25 +153,10 @@ std::size_t PreparedPolygon::bucket_of(double north) const noexcept {
     return static_cast<std::size_t>(std::min(at > 0.0 ? at : 0.0, static_cast<double>(m_first.size() - 2)));
 }
 
-PreparedPolygon::PreparedPolygon(const geo_nee* vertices, std::size_t count) {
-    if (count == 0) {
-        return;
-    }
-    // Positions of quads, fewer than twice the vertices, have 32 bits.
-    if (count > static_cast<std::size_t>(std::numeric_limits<int>::max())) {
-        throw std::length_error("too many vertices for a prepared polygon");
-    }
+std::size_t PreparedPolygon::choose_buckets(const geo_nee* vertices, std::size_t count) {
     const Range range = range_of(vertices, count);
     double covered = 0.0;
-    // Visits each edge whose vertex is a number: another one neither crosses nor matches.
-    const auto for_each_edge = [=](const auto& visit) {
-        for (std::size_t i = 0; i < count; ++i) {
-            if (!is_nan(vertices[i])) {
-                visit(vertices[i], vertices[i > 0 ? i - 1 : count - 1]);
-            }
-        }
-    };
-    for_each_edge([&](const geo_nee& i, const geo_nee& j) {
+    for_each_edge(vertices, count, [&](const geo_nee& i, const geo_nee& j) {
         const double from = std::clamp(j.north, range.low, range.high);
         const double to = std::clamp(i.north, range.low, range.high);
         covered += std::isnan(from) ? 0.0 : std::abs(to - from);
@@ -174,42 +170,50 @@ PreparedPolygon::PreparedPolygon(const geo_nee* vertices, std::size_t count) {
     // As many buckets as make each edge stand in some two of them.
     const double height = range.high - range.low;
     const double crossed = covered / height;
-    std::size_t buckets = 1;
-    if (crossed > 0.0 && std::isfinite(crossed)) {
-        buckets = std::max(std::size_t{1},
-                           static_cast<std::size_t>(static_cast<double>(count) / std::max(crossed, 1.0)));
-        m_low = range.low;
-        m_scale = static_cast<double>(buckets) / height;
+    if (!(crossed > 0.0 && std::isfinite(crossed))) {
+        return 1;
     }
+    const auto buckets = std::max(
+        std::size_t{1}, static_cast<std::size_t>(static_cast<double>(count) / std::max(crossed, 1.0)));
+    m_low = range.low;
+    m_scale = static_cast<double>(buckets) / height;
+    return buckets;
+}
+
+PreparedPolygon::PreparedPolygon(const geo_nee* vertices, std::size_t count) {
+    if (count == 0) {
+        return;
+    }
+    // Positions of quads, fewer than twice the vertices, have 32 bits.
+    if (count > static_cast<std::size_t>(std::numeric_limits<int>::max())) {
+        throw std::length_error("too many vertices for a prepared polygon");
+    }
+    const std::size_t buckets = choose_buckets(vertices, count);
     m_first.assign(buckets + 1, 0);
-    // Buckets of an edge, from the lower to the higher.
-    const auto buckets_of = [this](const geo_nee& i, const geo_nee& j) {
-        const std::size_t to = bucket_of(i.north);
-        const std::size_t from = std::isnan(j.north) ? to : bucket_of(j.north);
-        return std::minmax({to, from});
+    // Calls visit(bucket, i, j) for each bucket of each edge.
+    const auto for_each_place = [&](const auto& visit) {
+        for_each_edge(vertices, count, [&](const geo_nee& i, const geo_nee& j) {
+            const std::size_t own = bucket_of(i.north);
+            const auto [first, last] = std::minmax({own, std::isnan(j.north) ? own : bucket_of(j.north)});
+            for (std::size_t bucket = first; bucket <= last; ++bucket) {
+                visit(bucket, i, j);
+            }
+        });
     };
-    for_each_edge([&](const geo_nee& i, const geo_nee& j) {
-        const auto [from, to] = buckets_of(i, j);
-        for (std::size_t bucket = from; bucket <= to; ++bucket) {
-            ++m_first[bucket + 1];
-        }
-    });
+    for_each_place([&](std::size_t bucket, const geo_nee&, const geo_nee&) { ++m_first[bucket + 1]; });
     for (std::size_t bucket = 0; bucket < buckets; ++bucket) {
         m_first[bucket + 1] = m_first[bucket] + (m_first[bucket + 1] + 3) / 4;
     }
     const Quad nothing = {{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER}, {}, {}, {}};
     m_quads.assign(m_first.back(), nothing);
     std::vector<std::uint32_t> filled(buckets, 0);
-    for_each_edge([&](const geo_nee& i, const geo_nee& j) {
-        const auto [from, to] = buckets_of(i, j);
-        for (std::size_t bucket = from; bucket <= to; ++bucket) {
-            const std::size_t at = filled[bucket]++;
-            Quad& quad = m_quads[m_first[bucket] + at / 4];
-            quad.north[at % 4] = i.north;
-            quad.east[at % 4] = i.east;
-            quad.previous_north[at % 4] = j.north;
-            quad.previous_east[at % 4] = j.east;
-        }
+    for_each_place([&](std::size_t bucket, const geo_nee& i, const geo_nee& j) {
+        const std::size_t at = filled[bucket]++;
+        Quad& quad = m_quads[m_first[bucket] + at / 4];
+        quad.north[at % 4] = i.north;
+        quad.east[at % 4] = i.east;
+        quad.previous_north[at % 4] = j.north;
+        quad.previous_east[at % 4] = j.east;
     });
 }
 

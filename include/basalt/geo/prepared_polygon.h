@@ -51,6 +51,7 @@ private:
     };
     friend struct PolygonQuads;
 
+    std::size_t choose_buckets(const geo_nee* vertices, std::size_t count);
     std::size_t bucket_of(double north) const noexcept;
 
     double m_low = 0.0, m_scale = 0.0;   ///< bucket = (north - low) * scale, clamped

@@ -214,7 +214,7 @@ BASALT_AVX2 inline bool is_in_a_band_avx2(int n, const geo_nee* polygon, const g
                                           double tolerance) {
     const Quad p = {_mm256_set1_pd(point.north), _mm256_set1_pd(point.east)};
     const double reach = band_reach(tolerance);
-    for (int i = 1; i < n; i += 4) {
+    for (std::ptrdiff_t i = 1; i < n; i += 4) {
         // The last quad may overlap the one before; testing an edge twice changes nothing.
         const geo_nee* first = polygon + (i <= n - 4 ? i : n - 4);
         for (unsigned ends = may_be_in_bands(first, p, reach); ends != 0; ends &= ends - 1) {

@@ -92,7 +92,7 @@ void atan2_four(benchmark::State& state) {
 }
 
 void sizes(benchmark::internal::Benchmark* row) {
-    row->Arg(700)->Arg(3142)->Arg(1000000);  // thousandths of a radian
+    row->ArgName("milliradians")->Arg(700)->Arg(3142)->Arg(1000000);
 }
 
 BENCHMARK(sin_cos_basalt)->Name("sin_cos/basalt")->Apply(sizes);

@@ -104,11 +104,10 @@ void direct_plain(benchmark::State& state) {
 
 template <typename Call>
 void run_arrays(benchmark::State& state, const Call& call) {
-    for ([[maybe_unused]] auto _ : state) {
+    while (state.KeepRunningBatch(COUNT)) {
         call();
         benchmark::ClobberMemory();
     }
-    state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(COUNT));
 }
 
 void to_cartesian_arrays(benchmark::State& state) {

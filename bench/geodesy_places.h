@@ -165,7 +165,7 @@ inline Triple crosstrack(std::size_t i) {
 }
 
 inline void distances(benchmark::internal::Benchmark* row) {
-    row->Arg(100)->Arg(10000);  // kilometres
+    row->ArgName("km")->Arg(100)->Arg(10000);
 }
 
 }  // namespace bench

@@ -23,8 +23,8 @@ ROWS = [  # subject, row of its table, what a reader calls it, and our form if i
     ("plane", "in polygon, 100000", "point in a prepared polygon, 100,000 vertices", "prepared"),
     ("geodesy", "to cartesian", "geodetic to Cartesian"),
     ("geodesy", "to geodetic", "Cartesian to geodetic"),
-    ("geodesy", "direct, 10000", "direct geodesic, 10 km"),
-    ("geodesy", "inverse", "inverse geodesic"),
+    ("geodesy", "direct, km 10000", "direct geodesic, 10,000 km"),
+    ("geodesy", "inverse, km 10000", "inverse geodesic, 10,000 km"),
     ("geodesy", "crosstrack", "distance from a geodesic"),
     ("sparse", "insert row by row", "grid: insert, row by row"),
     ("sparse", "insert row by row", "grid: insert whole rows, a cell", "basalt rows"),
@@ -59,7 +59,7 @@ def with_unit(value):
 
 
 def is_ours(who):
-    return who.startswith("basalt") or who in ("prepared", "preparing", "arrays")
+    return who.startswith("basalt") or who in ("prepared", "preparing", "arrays", "single call")
 
 
 def best_peer(page, subject, wanted, who="basalt"):
@@ -110,6 +110,9 @@ def chart(results):
 def main():
     page = PAGE.read_text(encoding="utf-8")
     results = [(name, best_peer(page, subject, row, *form)) for subject, row, name, *form in ROWS]
+    for name, result in results:
+        if not result:
+            print(f"{PAGE}: no row with a peer for: {name}", file=sys.stderr)
     results = [(name, result) for name, result in results if result]
     if not results:
         sys.exit(f"{PAGE}: no tables")

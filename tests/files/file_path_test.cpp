@@ -48,7 +48,9 @@ TEST_F(Files, are_files_or_directories_or_neither) {
     const std::pair<int, std::vector<const wchar_t*>> kinds[] = {
         {1, {L"file.txt", L"to_file", L"dangling", L"circle", L"pipe", L"dir\\..\\file.txt", L"f*"}},
         {2, {L"dir", L"to_dir", L".", L"di?"}},
-        {0, {L"none", L"dir/", L"dir\\", L"file.txt/", L"file.txt/x", L"FILE.TXT", L"di??", L"*\\file.txt"}}};
+        {0,
+         {L"none", L"dir/", L"dir\\", L"file.txt/", L"file.txt/x", L"FILE.TXT", L"di??", L"*\\file.txt",
+          L"none/*", L"file.txt/*", L"\xD800"}}};
     for (const auto& [kind, names] : kinds) {
         for (const wchar_t* const name : names) {
             const CFilePath path(at(name));
@@ -56,6 +58,7 @@ TEST_F(Files, are_files_or_directories_or_neither) {
             EXPECT_EQ(path.IsDirectory(), kind == 2) << name;
         }
     }
+    EXPECT_TRUE(CFilePath::FileExists(at(std::wstring(4000, L'\\') + L"file.txt"))) << "separators join";
     for (const wchar_t* const name : {L"", L"/", L"\\", L"C:", L"C:\\", L"C:\\x"}) {
         EXPECT_FALSE(CFilePath::FileExists(name) || CFilePath::IsDirectory(name)) << name;
     }

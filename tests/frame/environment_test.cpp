@@ -1,3 +1,4 @@
+// The platform queries, random numbers, reversed bytes and the guard of the codec.
 #include <gtest/gtest.h>
 #include <time.h>
 
@@ -7,8 +8,10 @@
 #include <tuple>
 #include <vector>
 
+#include "src/frame/codec_guard.h"
 #include "src/frame/environment_state.h"
 #include "src/frame/os_detection.h"
+#include "src/platform/codec.h"
 
 namespace {
 
@@ -18,14 +21,30 @@ DWORD fake_major = 6, fake_minor = 2;  // beyond 99: the query fails
 int queries = 0;
 std::uint64_t milliseconds = 0;
 
+bool codec_works = true;
+std::uintptr_t starts = 0, running = 0;
+int codec_faults = 0;  // runs within another and wrong tokens
+
 }  // namespace
 
-// The linker's --wrap puts these in place of the version query and the system's clock.
+// The linker's --wrap puts these in place of the version query, the system's clock and the codec's start and
+// end.
 extern "C" {
 int __wrap_clock_gettime(clockid_t, timespec* time) {
     *time = {static_cast<time_t>(milliseconds / 1000),
              static_cast<long>(milliseconds % 1000) * 1'000'000 + 999'999};
     return 0;
+}
+Gdiplus::Status __wrap__Z14GdiplusStartupPmPK19GdiplusStartupInputP20GdiplusStartupOutput(
+    std::uintptr_t* token, const GdiplusStartupInput* input, GdiplusStartupOutput*) {
+    codec_faults += running != 0 || input->GdiplusVersion != 1;
+    *token = ++starts;
+    running = codec_works ? *token : 0;
+    return codec_works ? Gdiplus::Ok : Gdiplus::GenericError;
+}
+void __wrap__Z15GdiplusShutdownm(std::uintptr_t token) {
+    codec_faults += token == 0 || token != running;
+    running = 0;
 }
 BOOL __wrap__Z13GetVersionExWP14OSVERSIONINFOW(OSVERSIONINFOW* version) {
     ++queries;
@@ -114,6 +133,29 @@ TEST(Environment, reverses_bytes_of_any_number_and_alignment) {
         _reversebytes(&bytes[offset], count);
         ASSERT_EQ(bytes, expected) << count << " bytes at " << offset;
     }
+}
+
+TEST(CodecGuard, one_run_lasts_from_the_first_start_to_the_last_image) {
+    {
+        basalt::frame::CodecGuard guard;
+        for (const std::uintptr_t run : {1U, 2U}) {
+            guard.AddImage(), guard.AddImage();
+            EXPECT_EQ(running, 0U) << "an image alone starts nothing";
+            EXPECT_TRUE(guard.Start() && guard.Start() && running == run);
+            for (const std::uintptr_t left : {run, std::uintptr_t{0}, std::uintptr_t{0}}) {
+                guard.ReleaseImage();  // the third time, none is alive
+                EXPECT_EQ(running, left);
+            }
+        }
+        codec_works = false;
+        EXPECT_FALSE(guard.Start() || guard.Start());
+        codec_works = true;
+        EXPECT_TRUE(guard.Start() && starts == 5) << "a start that failed is repeated";
+    }
+    basalt::frame::CodecGuard without_lock(ERROR_NOT_ENOUGH_MEMORY);
+    EXPECT_EQ(static_cast<std::uint32_t>(without_lock.LastError()), 0x80070008U);
+    EXPECT_TRUE(!without_lock.Start() && running == 0 && codec_faults == 0)
+        << "the guard's end is the codec's";
 }
 
 }  // namespace

@@ -39,11 +39,9 @@ TEST(Context, starts_as_one_monochrome_pixel_or_as_the_screen_with_none) {
 
 TEST(Selection, holds_a_bitmap_in_one_context_and_objects_from_deletion) {
     CDC a, b;
-    a.CreateCompatibleDC(nullptr);
-    b.CreateCompatibleDC(&a);
+    a.CreateCompatibleDC(nullptr), b.CreateCompatibleDC(&a);
     CBitmap first, second;
-    first.CreateBitmap(4, 4, 1, 24, nullptr);
-    second.CreateBitmap(4, 4, 1, 8, nullptr);
+    first.CreateBitmap(4, 4, 1, 24, nullptr), second.CreateBitmap(4, 4, 1, 8, nullptr);
     CBrush brush(0x123456);
     CBitmap* const stock = a.SelectObject(&first);
     EXPECT_TRUE(b.SelectObject(&first) == nullptr && GetLastError() == ERROR_BUSY);
@@ -58,11 +56,9 @@ TEST(Selection, holds_a_bitmap_in_one_context_and_objects_from_deletion) {
     a.SetPixel(0, 0, 0xFFFFFF);
     DibHeader dib(0, 0, 0);
     EXPECT_TRUE(refused(b.GetPixel(0, 0), GetDIBits(a, *stock, 0, 0, nullptr, dib.info(), DIB_RGB_COLORS)));
-    EXPECT_EQ(description(*stock).bmWidth, 1);
-    EXPECT_TRUE(stock->DeleteObject() && a.SelectObject(&first)->GetSafeHandle() != nullptr) << "it stays";
-    EXPECT_TRUE(b.DeleteDC() && a.DeleteDC() && first.DeleteObject() && second.DeleteObject() &&
-                brush.DeleteObject())
-        << "free again";
+    EXPECT_TRUE(description(*stock).bmWidth == 1 && stock->DeleteObject() &&
+                a.SelectObject(&first)->GetSafeHandle());
+    EXPECT_TRUE(b.DeleteDC() && a.DeleteDC() && first.DeleteObject() && brush.DeleteObject()) << "free again";
     EXPECT_FALSE(first.DeleteObject());
 }
 

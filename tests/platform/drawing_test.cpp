@@ -5,6 +5,7 @@
 #include <climits>
 #include <cmath>
 
+#include "src/platform/pixels/keyed_copy.h"
 #include "tests/support/drawing.h"
 
 namespace {
@@ -81,6 +82,21 @@ TEST(Copy, goes_to_any_coordinates_by_five_operations) {
     EXPECT_NE(TransparentBlt(canvas, 0, 0, HIGH, HIGH, source, 0, 0, HIGH, HIGH, 0xFF000000), 0);
     EXPECT_NE(BitBlt(canvas, -1000, -1000, HIGH, HIGH, source, -1000, -1001, SRCPAINT), 0);
     EXPECT_EQ(canvas.picture(), source.picture());
+}
+
+TEST(Copy, kernels_leave_out_the_key_whatever_the_unused_byte) {
+    for (std::size_t count = 0; count < 70; ++count) {
+        std::vector<std::uint32_t> from(count), to(count + 1, 0x55), portable = to;
+        for (std::size_t i = 0; i < count; ++i) {
+            from[i] = static_cast<std::uint32_t>((i * i % 7) << 24 | i * count % 3);
+        }
+        basalt::platform::copy_words_but_key(to.data(), from.data(), count, 0xFF000001);
+        basalt::platform::copy_words_but_key_portable(portable.data(), from.data(), count, 0xFF000001);
+        std::ranges::replace_if(
+            from, [](std::uint32_t word) { return (word & 0xFFFFFF) == 1; }, 0x55);
+        from.push_back(0x55);
+        EXPECT_TRUE(to == from && portable == from) << count;
+    }
 }
 
 constexpr XFORM QUARTER = {0, 1, -1, 0, 8, 0}, TWICE = {2, 0, 0, 2, 0, 0},

@@ -1,9 +1,10 @@
-// What files of the library's own promise beyond what the tests of mapped blocks, allocators and logs see.
+// Wildcards, and what files of the library's own promise beyond what the tests of mapped blocks, allocators
+// and logs see.
 #include "src/platform/file.h"
 
 #include <fcntl.h>
+#include <fnmatch.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 #include <sys/stat.h>
 
 #include <algorithm>
@@ -11,8 +12,10 @@
 #include <csignal>
 
 #include "basalt/util/file_logger.h"
+#include "src/platform/disk/wildcard.h"
 #include "src/platform/file_mapping.h"
 #include "src/platform/file_search.h"
+#include "src/platform/ticks.h"
 #include "tests/platform/error_of.h"
 #include "tests/support/child.h"
 #include "tests/support/open_descriptors.h"
@@ -21,6 +24,7 @@
 
 namespace {
 
+using namespace basalt::platform;
 using namespace basalt::test;
 namespace fs = std::filesystem;
 
@@ -143,7 +147,7 @@ TEST_F(File, descriptors_are_above_standard_error) {
     });
 }
 
-// Standard error may be a full pipe, one without a reader, or a file at the limit on sizes.
+// Standard error may be a full pipe, or one without a reader.
 TEST_F(File, reports_raise_no_signal_and_do_not_block) {
     const auto report = [](int error) {
         dup2(error, STDERR_FILENO);
@@ -160,11 +164,43 @@ TEST_F(File, reports_raise_no_signal_and_do_not_block) {
         sigprocmask(SIG_BLOCK, &signals, nullptr), raise(SIGPIPE);
         report(ends[1]);
         EXPECT_TRUE(sigpending(&signals) == 0 && sigismember(&signals, SIGPIPE) == 1) << "as before";
-        const rlimit limit = {1000, RLIM_INFINITY};
-        setrlimit(RLIMIT_FSIZE, &limit);
-        report(::open((folder / "errors").c_str(), O_CREAT | O_WRONLY, 0600));
     });
-    EXPECT_EQ(folder.read("errors"), std::string(1000, 'x'));
+}
+
+TEST(Wildcards, match_as_the_systems_own_do) {
+    std::vector<std::string> texts = {""};  // every one of up to four of these characters
+    for (std::size_t i = 0; texts[i].size() < 4; ++i) {
+        for (const char ch : {'a', 'b', '.', '*', '?'}) {
+            texts.push_back(texts[i] + ch);
+        }
+    }
+    const auto wide = [](const std::string& text) { return std::wstring(text.begin(), text.end()); };
+    for (const std::string& name : texts) {
+        for (const std::string& pattern : texts) {
+            const bool expected = pattern == "*.*" || fnmatch(pattern.c_str(), name.c_str(), 0) == 0;
+            ASSERT_EQ(matches_wildcards(wide(name), wide(pattern)), expected) << name << ' ' << pattern;
+        }
+    }
+    EXPECT_TRUE(matches_wildcards(L"[\\]", L"[\\*"));
+}
+
+TEST_F(File, searches_describe_sizes_and_times) {
+    folder.write("file");
+    // A second before 1970 and 700 ns; from 1601 to 1970 are 116444736000000000 ticks.
+    const timespec times[] = {{-1, 700}, {1'000'000'000, 0}};
+    ASSERT_EQ(truncate((folder / "file").c_str(), (off_t{3} << 32) + 7), 0);
+    ASSERT_EQ(utimensat(AT_FDCWD, (folder / "file").c_str(), times, 0), 0);
+    WIN32_FIND_DATAW file;
+    FindClose(FindFirstFileW(folder.wide(L"file").c_str(), &file));
+    EXPECT_EQ(tick_count(file.ftLastAccessTime), 116'444'735'990'000'007);
+    EXPECT_EQ(tick_count(file.ftLastWriteTime), 126'444'736'000'000'000);
+    EXPECT_TRUE(file.nFileSizeHigh == 3 && file.nFileSizeLow == 7 &&
+                file.dwReserved0 + file.dwReserved1 == 0);
+    constexpr std::int64_t FIRST = -11'644'473'600;  // 1601, in seconds from 1970
+    constexpr std::int64_t LAST = 910'692'730'084;   // the last one that 2^63 - 1 ticks hold whole
+    EXPECT_TRUE(ticks_of(FIRST, 100) == 1 && ticks_of(FIRST - 1, 999'999'999) == 0);
+    EXPECT_EQ(ticks_of(LAST + 1, 0), 9'223'372'036'840'000'000);
+    EXPECT_EQ(ticks_of(INT64_MAX, 999'999'999), 9'223'372'036'849'999'999);
 }
 
 }  // namespace

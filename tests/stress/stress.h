@@ -27,8 +27,6 @@ long run_threads(int count, double seconds, const Round& round);
 
 // Each for so many seconds; the result is its number of rounds.
 long stress_sparse(double seconds), stress_heaps(double seconds), stress_files(double seconds);
-// What is made at its first use, by all threads at once: good for one try a process.
-long first_use(double);
 
 }  // namespace basalt::stress
 

@@ -100,8 +100,7 @@ TEST_F(File, a_new_temporary_file_is_reopened_or_nothing) {
         EXPECT_EQ(folder.read("victim"), "kept");
         EXPECT_EQ(open_error(name, OPEN_EXISTING), error == 0 ? 2U : 0U) << "only the first time";
     }
-    wchar_t name[MAX_PATH] = {};
-    ASSERT_NE(make_temporary(here, L"vma", name), 0U);
+    ASSERT_NE(make_temporary(here), 0U);
     fs::rename(name, folder / "old");
     EXPECT_EQ(open_error(name, CREATE_NEW), 0U);
     EXPECT_EQ(open_error(name, OPEN_EXISTING), 0U) << "a new file of that name";

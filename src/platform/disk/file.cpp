@@ -60,13 +60,13 @@ HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_AT
         const bool deletes = (flags & FILE_FLAG_DELETE_ON_CLOSE) != 0;
         const auto file = std::make_shared<OpenFile>();
         NewHandle handle(file);
-        if (deletes) {
-            register_deletion_at_exit();
-        }
         const DWORD error = file->open(
             path, disposition == CREATE_NEW ? OpenFile::Mode::CREATE : OpenFile::Mode::EXISTING, deletes);
         if (error != ERROR_SUCCESS) {
             return fail_with(error, INVALID_HANDLE_VALUE);
+        }
+        if (deletes) {
+            register_deletion_at_exit();  // after opening, which counts forks first
         }
         const HANDLE result = handle.give();
         if (deletes && s_are_deleted.load()) {

@@ -4,7 +4,7 @@
 /// Both split at `\` and `/` alike and compose with `\`; the system gets `/` for either. A drive letter is a
 /// name like any other here. File names are UTF-8 on the disk whatever the locale; bytes that are not are
 /// listed as the values 0xDC80 to 0xDCFF, a `\` within a name as 0xDC5C, and lead back to the same file.
-/// Only std::bad_alloc and std::length_error are thrown, when out of memory or length.
+/// Only std::bad_alloc and std::length_error (more than 2^31 - 1 characters) are thrown.
 #ifndef BASALT_FILES_H
 #define BASALT_FILES_H
 

@@ -42,7 +42,7 @@ private:
     const HRESULT m_last_error;
 };
 
-// The module's own.
+// The guard of all image objects, constructed at load.
 extern CodecGuard codec_guard;
 
 }  // namespace basalt::frame

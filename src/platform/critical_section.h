@@ -2,7 +2,7 @@
 //
 // Any thread may enter; the owner may enter again and must leave as often. Entering and leaving cannot fail.
 // Initialisation acquires nothing from the system. Deleting a section that a thread holds is undefined, as
-// it is there.
+// in Win32.
 #ifndef BASALT_SRC_PLATFORM_CRITICAL_SECTION_H
 #define BASALT_SRC_PLATFORM_CRITICAL_SECTION_H
 

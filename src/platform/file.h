@@ -69,11 +69,11 @@ DWORD GetTempPathW(DWORD length, wchar_t* buffer);
 
 // Creates a new, empty file of mode 0600 and closes it. Its name is the folder, a separator where that has
 // none, up to three characters of the prefix, a number of up to four hexadecimal digits and ".tmp". `unique`
-// is 0. When the same thread opens that name next, it gets this very file: a link or another file in its
-// place is refused. Returns the number, never 0, and the full name in `name` (MAX_PATH characters); 0 on
-// failure, buffer unchanged: ERROR_FILE_EXISTS when all 65,535 numbers are taken, ERROR_FILENAME_EXCED_RANGE
-// for a folder of more than MAX_PATH - 14 characters, and as for CreateFileW. Threads: thread-safe; files
-// made at the same time have different names.
+// is 0. When the same thread opens its last such name next, it gets this very file: a link or another file
+// in its place is refused, unless the thread has created it. Returns the number, never 0, and the full name
+// in `name` (MAX_PATH characters); 0 on failure, buffer unchanged: ERROR_FILE_EXISTS when all 65,535 numbers
+// are taken, ERROR_FILENAME_EXCED_RANGE for a folder of more than MAX_PATH - 14 characters, and as for
+// CreateFileW. Threads: thread-safe; files made at the same time have different names.
 UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique, wchar_t* name);
 
 namespace basalt::platform {

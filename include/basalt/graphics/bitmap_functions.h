@@ -51,8 +51,8 @@ BASALT_API bool RotateBitmap(CDC* dc, CBitmap* bitmap, float angle);
 /// @param[out] region owns no region yet; takes the new one, which is empty when all pixels are of the colour
 /// @param bitmap the bitmap
 /// @param transparentColour 0x00BBGGRR, the high byte is ignored. At 32 bits a pixel whose unused byte is not
-/// 0 is of no colour; at 16 the colour is rounded to 5 bits a channel first, as drawing in it does, and a
-/// pixel whose unused bit is set is of no colour; at other depths the colours of the pixels are compared.
+/// 0 equals no colour; at 16 the colour is rounded to 5 bits a channel first, as drawing in it does, and a
+/// pixel whose unused bit is set equals no colour; at other depths the colours of the pixels are compared.
 /// @return false, and the region is unchanged, when it owns one already, the colour exceeds 32 bits, the
 /// bitmap cannot be read or no region can be made
 ///

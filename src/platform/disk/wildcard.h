@@ -1,4 +1,4 @@
-// Wildcards.
+// Matching a name against wildcards.
 #ifndef BASALT_SRC_PLATFORM_DISK_WILDCARD_H
 #define BASALT_SRC_PLATFORM_DISK_WILDCARD_H
 

@@ -22,12 +22,12 @@ HGDIOBJ stock_handle(std::uintptr_t number) {
     return reinterpret_cast<HGDIOBJ>(FIRST_STOCK_HANDLE + number);  // NOLINT(performance-no-int-to-ptr)
 }
 
-// Too large for a stock object for any other handle.
+// Larger than any stock object's for another handle.
 std::uintptr_t stock_number(const void* handle) {
     return reinterpret_cast<std::uintptr_t>(handle) - FIRST_STOCK_HANDLE;
 }
 
-// Why an object cannot be deleted, if so. A context is no object in that sense.
+// Why DeleteObject fails, or ERROR_SUCCESS. Contexts are deleted by other calls.
 DWORD deletion_error(const GraphicsObject& object) {
     switch (object.kind) {
         case GraphicsKind::CONTEXT:

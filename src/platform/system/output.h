@@ -34,7 +34,8 @@ int open_output(const char* path, int further_flags) noexcept;
 // does.
 bool write_output(int file, const char* bytes, std::size_t count) noexcept;
 
-// Writes to standard error, which is the host's; dropped where that is closed, broken or would block.
+// Writes to standard error, which is the host's; dropped where that is closed, broken or would block. Blocks
+// only if another writer fills the pipe between the check and the writing.
 void write_report(const char* bytes, std::size_t count) noexcept;
 
 }  // namespace basalt::platform

@@ -30,12 +30,8 @@ succeeds() {
 
 # ends_with CODE MESSAGE ARGUMENT...: one line that says so, nothing on standard output
 ends_with() {
-    local expected=$1 message=$2
-    shift 2
-    run "$@"
-    [ $code -eq "$expected" ] || fail "exit $code, not $expected, from $*"
-    [ ! -s out ] || fail "output from $*"
-    [ "$(cat err)" = "$(basename "$program"): $message" ] || fail "$*: $(cat err); expected: $message"
+    run "${@:3}"
+    [ "$code,$(cat err),$(cat out)" = "$1,${program##*/}: $2," ] || fail "${*:3}: exit $code, $(cat err); expected $1, $2"
 }
 
 # refused MESSAGE ARGUMENT...: for what the user did
@@ -98,8 +94,7 @@ close_to() {
 
 # answers_to_everyone ARGUMENT...: usage, version, and with these arguments a full disk
 answers_to_everyone() {
-    local name
-    name=$(basename "$program")
+    local name=${program##*/}
     succeeds --help
     grep -q "^Usage: $name" out || fail "--help shows no usage"
     succeeds --version
@@ -109,9 +104,8 @@ answers_to_everyone() {
     [ -w /dev/full ] || return
     "$program" "$@" >/dev/full 2>err
     code=$?
-    [ $code -eq 1 ] || fail "exit $code, not 1, on a full disk"
-    [ "$(cat err)" = "$name: cannot write to standard output: No space left on device" ] ||
-        fail "on a full disk: $(cat err)"
+    [ "$code,$(cat err)" = "1,$name: cannot write to standard output: No space left on device" ] ||
+        fail "exit $code on a full disk: $(cat err)"
 }
 
 finish() {

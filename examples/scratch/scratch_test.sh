@@ -83,14 +83,13 @@ interrupt() {
     wait $job
     code=$?
     [ $code -eq $((128 + $(kill -l "$1"))) ] || fail "exit $code after SIG$1"
+    leaves_nothing "SIG$1"
 }
 for delay in 0 0.3; do
     interrupt INT $delay
     [ "$(cat err)" = "scratch: interrupted, nothing is left behind" ] || fail "after SIGINT: $(cat err)"
-    leaves_nothing "SIGINT"
 done
 interrupt TERM 0.1
-leaves_nothing "SIGTERM"
 
 # Cells are opened ahead of the job, and what is there already stays until they are written.
 interrupt INT 0.1 --cells new.csv
@@ -98,7 +97,6 @@ interrupt INT 0.1 --cells new.csv
 cp cells.csv old.csv
 interrupt INT 0.1 --cells old.csv
 cmp -s cells.csv old.csv || fail "an interrupted job took the cells of another"
-leaves_nothing "SIGINT with cells"
 TMPDIR=$work/nowhere fails "cannot write to nowhere/cells.csv: No such file or directory" --cells nowhere/cells.csv
 TMPDIR=$work/nowhere fails "cannot write to .: Is a directory" --cells .
 [ ! -w /dev/full ] || fails "cannot write to /dev/full: No space left on device" --points 10 --cells /dev/full

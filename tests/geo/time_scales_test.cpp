@@ -1,43 +1,42 @@
 #include <gtest/gtest.h>
 
+#include <array>
 #include <chrono>
 #include <cstdint>
 #include <cstring>
 #include <utility>
 
 #include "basalt/geo.h"
+#include "tests/geo/calls.h"
 
 namespace {
 
+using geo_calls::results;
 using std::chrono::sys_days;
 
 constexpr sys_days MJD_0 = std::chrono::year(1858) / std::chrono::November / 17;
 constexpr std::uint32_t DAYS_OF_400_YEARS = 146097;
 
-struct Day {
-    std::uint16_t year = 0, month = 0, day = 0, day_of_week = 0;
-    bool operator==(const Day&) const = default;
-};
+using Day = std::array<int, 4>;  // year, month, day, day of the week
 
 Day date_of(std::uint32_t mjd) {
-    Day d;
-    _mjd2greg(mjd, d.year, d.month, d.day, d.day_of_week);
-    return d;
+    std::uint16_t year = 0, month = 0, day = 0, day_of_week = 0;
+    _mjd2greg(mjd, year, month, day, day_of_week);
+    return {year, month, day, day_of_week};
 }
 
 /// By the calendar, which repeats after 400 years. The day of the week is that of the truncated year, and its
 /// rule takes the year 0 to begin a day late.
 Day expected_date(std::int64_t mjd) {
-    const std::int64_t cycles = (mjd + 20LL * DAYS_OF_400_YEARS) / DAYS_OF_400_YEARS - 20;
-    const std::chrono::year_month_day date = MJD_0 + std::chrono::days(mjd - cycles * DAYS_OF_400_YEARS);
-    Day d;
-    d.year = static_cast<std::uint16_t>(static_cast<int>(date.year()) + cycles * 400);
-    d.month = static_cast<std::uint16_t>(static_cast<unsigned>(date.month()));
-    d.day = static_cast<std::uint16_t>(static_cast<unsigned>(date.day()));
-    const sys_days first = std::chrono::year(2000 + d.year % 400) / date.month() / 1;
-    const std::chrono::weekday weekday = first + std::chrono::days(d.day - (d.year == 0 ? 0 : 1));
-    d.day_of_week = static_cast<std::uint16_t>(weekday.c_encoding());
-    return d;
+    const auto cycles = static_cast<int>((mjd + 20LL * DAYS_OF_400_YEARS) / DAYS_OF_400_YEARS - 20);
+    const std::int64_t days = mjd - std::int64_t{cycles} * DAYS_OF_400_YEARS;
+    const std::chrono::year_month_day date = MJD_0 + std::chrono::days(days);
+    const int year = (static_cast<int>(date.year()) + cycles * 400) & 0xFFFF;
+    const auto month = static_cast<int>(static_cast<unsigned>(date.month()));
+    const auto day = static_cast<int>(static_cast<unsigned>(date.day()));
+    const sys_days first = std::chrono::year(2000 + year % 400) / date.month() / 1;
+    const std::chrono::weekday weekday = first + std::chrono::days(day - (year == 0 ? 0 : 1));
+    return {year, month, day, static_cast<int>(weekday.c_encoding())};
 }
 
 TEST(ModifiedJulianDate, FollowsTheCalendarAndTruncatesFarYears) {
@@ -45,7 +44,8 @@ TEST(ModifiedJulianDate, FollowsTheCalendarAndTruncatesFarYears) {
         const Day expected = expected_date(mjd);
         const auto count = static_cast<std::uint32_t>(mjd);
         ASSERT_EQ(date_of(count), expected) << mjd;
-        ASSERT_EQ(_greg2mjd(expected.year, expected.month, expected.day), count);
+        const auto [year, month, day, day_of_week] = expected;
+        ASSERT_EQ(results<_greg2mjd>({1.0 * year, 1.0 * month, 1.0 * day})[0], count);
     }
     for (std::int64_t mjd = -2468570; mjd <= 534402341; mjd += 2609) {
         ASSERT_EQ(date_of(static_cast<std::uint32_t>(mjd)), expected_date(mjd)) << mjd;

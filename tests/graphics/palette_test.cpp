@@ -64,12 +64,12 @@ TEST(DefaultPalette, is_made_of_basic_colours_hues_and_greys) {
 
 TEST(Palette, has_fixed_ranges) {
     using P = ColorPalette;
-    const std::vector<int> bounds = {P::GetSecondPaletteStartIndex(), P::GetSecondPaletteEndIndex(),
-                                     P::GetLargePaletteStartIndex(),  P::GetLargePaletteEndIndex(),
-                                     P::GetThirdPaletteStartIndex(),  P::GetThirdPaletteEndIndex(),
-                                     P::GetWhiteColorIndex()};
-    EXPECT_TRUE(bounds == std::vector({0, 8, 9, 248, 249, 254, 6}) && P::GetSize() == 256 &&
-                sizeof(P) == 1024);
+    EXPECT_EQ((std::vector<int>{P::GetSecondPaletteStartIndex(), P::GetSecondPaletteEndIndex(),
+                                P::GetLargePaletteStartIndex(), P::GetLargePaletteEndIndex(),
+                                P::GetThirdPaletteStartIndex(), P::GetThirdPaletteEndIndex(),
+                                P::GetWhiteColorIndex()}),
+              (std::vector<int>{0, 8, 9, 248, 249, 254, 6}));
+    EXPECT_TRUE(P::GetSize() == 256 && sizeof(P) == 1024);
 }
 
 TEST(ClosestColour, is_that_of_the_scan) {

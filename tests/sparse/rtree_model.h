@@ -75,18 +75,12 @@ private:
         return r;
     }
 
+    // The first of those that grow least, of them the smallest.
     static Entry& choose(Node& node, const Rect& rect) {
-        std::size_t best = 0;
-        std::pair<float, float> least;  // increase, then volume
-        for (std::size_t i = 0; i < node.entries.size(); ++i) {
-            const float own = volume(node.entries[i].rect);
-            const std::pair measure(volume(combine(rect, node.entries[i].rect)) - own, own);
-            if (i == 0 || measure < least) {
-                best = i;
-                least = measure;
-            }
-        }
-        return node.entries[best];
+        return *std::ranges::min_element(node.entries, {}, [&](const Entry& e) {
+            const float own = volume(e.rect);
+            return std::pair(volume(combine(rect, e.rect)) - own, own);
+        });
     }
 
     // The new sibling if the node was split.

@@ -1,9 +1,6 @@
 // Facts about the R-tree and its memory; random trees against the model are fuzz/rtree.
 #include <gtest/gtest.h>
 
-#include <bit>
-
-#include "src/sparse/rtree_volume.h"
 #include "tests/sparse/rtree_model.h"
 #include "tests/support/failing_new.h"
 
@@ -16,14 +13,6 @@ void fill(slRTree& tree, int from, int to) {
         const int min[2] = {x, y}, max[2] = {x + 15, y + 15};
         tree.Insert(min, max, i);
     }
-}
-
-TEST(RTree, VolumesOfKnownRectangles) {
-    const auto volume = [](const rtree::Rect& r) { return rtree::spherical_volume(rtree::all4(r))[0]; };
-    EXPECT_NEAR(volume({0, 0, 15, 15}), 353.4292, 5e-5);
-    EXPECT_NEAR(volume({0, 0, 31, 15}), 931.4823, 5e-5);
-    EXPECT_EQ(volume({7, -9, 7, -9}), 0);
-    EXPECT_EQ(std::bit_cast<unsigned>(rtree::UNIT_SPHERE_VOLUME), 0x40490FDCU);
 }
 
 TEST(RTree, ReservedInsertionsAllocateNothing) {
@@ -46,16 +35,6 @@ TEST(RTree, RootSplitReservesEnoughNodes) {
         fill(tree, i, i + 1);
     }
     EXPECT_EQ(RTreeInspector::dump(tree), RTreeInspector::dump(plain));
-}
-
-TEST(RTree, ClearingReleasesAllNodesButTheFirst) {
-    slRTree tree;
-    const long live = live_allocations();
-    fill(tree, 0, 4000);
-    EXPECT_GT(live_allocations(), live);
-    tree.RemoveAll();
-    EXPECT_EQ(live_allocations(), live);
-    EXPECT_EQ(RTreeInspector::dump(tree), "L0{}");
 }
 
 TEST(Slab, FillsLargePagesIfLittleOfThemIsLost) {

@@ -49,10 +49,8 @@ extern "C" int __wrap_getifaddrs(ifaddrs** list) {
 }
 extern "C" void __wrap_freeifaddrs(ifaddrs*) {}
 extern "C" int __wrap_access(const char* path, int) {
-    const std::string file = path;
-    const bool is_wireless =
-        file == "/sys/class/net/interface5/phy80211" || file == "/sys/class/net/interface6/wireless";
-    return is_wireless ? 0 : -1;
+    const std::string file = path, devices = "/sys/class/net/interface";
+    return file == devices + "5/phy80211" || file == devices + "6/wireless" ? 0 : -1;
 }
 
 namespace {

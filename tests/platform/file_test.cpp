@@ -158,6 +158,8 @@ TEST_F(File, reports_raise_no_signal_and_do_not_block) {
         int ends[2];
         ASSERT_EQ(pipe(ends), 0);
         report(ends[1]), close(ends[0]), report(ends[1]);
+        ASSERT_EQ(pipe(ends), 0);
+        close(ends[0]), report(ends[1]);
         sigset_t signals;
         sigemptyset(&signals), sigaddset(&signals, SIGPIPE);
         sigprocmask(SIG_BLOCK, &signals, nullptr), raise(SIGPIPE);

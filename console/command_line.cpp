@@ -74,28 +74,18 @@ CommandLine parse_command_line(const std::vector<std::string>& arguments, const 
     return Parser(arguments, syntax).parse();
 }
 
-std::string file_operand(const CommandLine& line, const std::string& what) {
-    if (line.operands.empty()) {
-        return {};
+std::string Columns::text() const {
+    std::size_t width = 0;
+    for (const auto& [name, text] : m_lines) {
+        width = std::max(width, name.size());
     }
-    if (line.operands[0].empty()) {
-        throw InputError("the " + what + "'s name is empty");
+    std::string all;
+    for (const auto& [name, text] : m_lines) {
+        all.append("  ").append(name).append(width - name.size() + 2, ' ');
+        for (const char c : text) {
+            all.append(1, c).append(c == '\n' ? width + 4 : 0, ' ');
+        }
+        all += '\n';
     }
-    if (line.operands.size() > 1) {
-        throw InputError("one " + what + " only, but " + quoted(line.operands[1]) + " is a second one");
-    }
-    return line.operands[0];
-}
-
-const std::string& file_value(const std::pair<std::string, std::string>& option) {
-    if (option.second.empty()) {
-        throw InputError(option.first + " takes a file name, not ''");
-    }
-    return option.second;
-}
-
-void refuse_operands(const CommandLine& line) {
-    if (!line.operands.empty()) {
-        throw InputError("unexpected argument " + quoted(line.operands[0]) + " (--help shows what is taken)");
-    }
+    return all;
 }

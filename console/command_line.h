@@ -17,7 +17,6 @@ struct CommandLine {
 
 /// What a program takes.
 struct Syntax {
-    const char* usage;                    ///< what --help prints
     std::vector<std::string_view> names;  ///< options with a value
     std::vector<std::string_view> flags;  ///< options without one, besides --help and --version
 };
@@ -27,14 +26,14 @@ struct Syntax {
 /// --version are ignored. InputError for all else.
 CommandLine parse_command_line(const std::vector<std::string>& arguments, const Syntax& syntax);
 
-/// The one operand of a program that takes a file at most, empty when there is none. InputError for a second
-/// one and for an empty name; `what` names the file in it.
-std::string file_operand(const CommandLine& line, const std::string& what);
+/// Lines of two columns, for a help text: names, and their texts aligned.
+class Columns {
+public:
+    void add(std::string name, std::string text) { m_lines.emplace_back(std::move(name), std::move(text)); }
+    std::string text() const;
 
-/// The value of an option that takes a file. InputError for an empty one.
-const std::string& file_value(const std::pair<std::string, std::string>& option);
-
-/// For a program that takes none: InputError if there is an operand.
-void refuse_operands(const CommandLine& line);
+private:
+    std::vector<std::pair<std::string, std::string>> m_lines;
+};
 
 #endif

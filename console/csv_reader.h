@@ -31,6 +31,13 @@ public:
     /// Goes to the next record; false at the end of the file.
     bool next();
 
+    /// Line of the record, or the last line at the end of the file.
+    std::size_t line() const { return m_line; }
+    /// The record as a whole, without its comment.
+    std::string_view record() const { return m_record; }
+    std::size_t fields() const { return m_fields.size(); }
+    /// A field that there is, empty or not.
+    std::string_view field(std::size_t index) const { return m_fields[index].text; }
     /// Position of a field, or of the line's end after the last field.
     FilePlace place(std::size_t index) const;
     /// A required field; `expected` describes it for the error.
@@ -38,10 +45,10 @@ public:
     /// A finite number from `low` to `high`.
     double number(std::size_t index, const char* expected, double low, double high) const;
     /// Refuses fields beyond the first `count`.
-    void expect_end(std::size_t count) const;
+    void expect_end(std::size_t count) const { require(m_fields.size() <= count, count, "the line to end"); }
 
-    /// Throws `expected ..., not 'field'`, or `... but the line ends here`.
-    [[noreturn]] void fail(std::size_t index, const std::string& expected) const;
+    /// Throws `expected ..., not 'field'`, or `... but the line ends here`, unless the field is as expected.
+    void require(bool is_so, std::size_t index, std::string_view expected) const;
     /// Throws a message about an earlier place.
     [[noreturn]] void fail_at(const FilePlace& place, const std::string& message) const;
 
@@ -60,8 +67,9 @@ private:
     std::string m_path;
     std::unique_ptr<std::FILE, CloseFile> m_file;
     std::string m_text;
+    std::string_view m_record;
     std::size_t m_line = 0;
-    std::size_t m_end_column = 1;
+    bool m_line_ended = true;
     std::vector<Field> m_fields;
 };
 

@@ -27,7 +27,7 @@ step_tidy() {
 
 # The programs' tests under the address sanitizer.
 step_programs() {
-    need_packages clang libclang-rt-14-dev llvm
+    need_packages clang libclang-rt-14-dev llvm "${EXAMPLE_PACKAGES[@]}"
     cmake --preset asan -B build/asan-programs -DBASALT_BUILD_TESTS=ON -DBASALT_BUILD_FUZZERS=OFF \
         -DBASALT_BUILD_EXAMPLES=ON -DBASALT_BUILD_TOOLS=ON
     for folder in examples tools; do cmake --build build/asan-programs --target $folder/all; done

@@ -10,7 +10,7 @@ set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
 
-need_packages "${BUILD_PACKAGES[@]}"
+need_packages "${BUILD_PACKAGES[@]}" "${EXAMPLE_PACKAGES[@]}"
 cmake -S . -B build/demo -G Ninja -DCMAKE_BUILD_TYPE=Release -DBASALT_BUILD_TESTS=OFF >build/demo.log 2>&1 ||
     { cat build/demo.log >&2; exit 1; }
 program=workarea

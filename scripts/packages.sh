@@ -46,7 +46,8 @@ build_with_progress() {  # what is built, arguments of cmake --build; one line o
 }
 
 BUILD_PACKAGES=(g++ cmake ninja-build pkg-config)
-TEST_PACKAGES=(libgtest-dev locales)
+EXAMPLE_PACKAGES=(libfmt-dev nlohmann-json3-dev)
+TEST_PACKAGES=(libgtest-dev locales "${EXAMPLE_PACKAGES[@]}")
 PEER_PACKAGES=(libbenchmark-dev libabsl-dev libopenvdb-dev libtbb-dev libboost1.81-dev libgeos-dev
     libspatialindex-dev libgeographiclib-dev libproj-dev libspdlog-dev libcairo2-dev
     libpixman-1-dev)

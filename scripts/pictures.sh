@@ -5,7 +5,7 @@ set -euo pipefail
 . "$(dirname "$0")/packages.sh"
 show_help "$@"
 
-need_packages "${BUILD_PACKAGES[@]}" imagemagick
+need_packages "${BUILD_PACKAGES[@]}" "${EXAMPLE_PACKAGES[@]}" imagemagick
 mkdir -p docs/pictures
 cmake -S . -B build/demo -G Ninja -DCMAKE_BUILD_TYPE=Release -DBASALT_BUILD_TESTS=OFF >build/pictures.log
 cmake --build build/demo --target workarea palette >>build/pictures.log || { cat build/pictures.log; exit 1; }

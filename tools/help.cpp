@@ -2,8 +2,7 @@
 
 #include <basalt/version.h>
 
-#include <algorithm>
-
+#include "command_line.h"
 #include "commands.h"
 
 namespace {
@@ -45,26 +44,6 @@ std::string with_value(const Option& option) {
     }
     return text;
 }
-
-/// Two columns: names, and their texts aligned.
-class List {
-public:
-    void add(std::string name, const char* text) { m_lines.emplace_back(std::move(name), text); }
-    std::string text() const {
-        std::size_t width = 0;
-        for (const auto& [name, text] : m_lines) {
-            width = std::max(width, name.size());
-        }
-        std::string all;
-        for (const auto& [name, text] : m_lines) {
-            all.append("  ").append(name).append(width - name.size() + 2, ' ').append(text).append("\n");
-        }
-        return all;
-    }
-
-private:
-    std::vector<std::pair<std::string, const char*>> m_lines;
-};
 
 std::string invocation(const Command& command) {
     std::string text = command.name;
@@ -111,11 +90,11 @@ std::string words_of(const Command& command) {
 }  // namespace
 
 std::string help_text() {
-    List names;
+    Columns names;
     for (const Command* command : commands()) {
         names.add(invocation(*command), command->summary);
     }
-    List options;
+    Columns options;
     for (const Option& option : PROGRAM_OPTIONS) {
         options.add(option.name, option.help);
     }
@@ -135,7 +114,7 @@ std::string help_text() {
 std::string help_text(const Command& command) {
     std::string text = "Usage: basalt " + invocation(command) + " [OPTION]... [FILE]...\n\n";
     text.append("Gives ").append(command.summary).append(".\n\n").append(command.fields).append("\n\n");
-    List options;
+    Columns options;
     for (const Option& option : command.options) {
         options.add(with_value(option), option.help);
     }

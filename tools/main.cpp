@@ -14,7 +14,7 @@
 namespace {
 
 int run_itself(const std::vector<std::string>& arguments) {
-    const CommandLine line = parse_command_line(arguments, {"", {}, {"--man", "--completion"}});
+    const CommandLine line = parse_command_line(arguments, {{}, {"--man", "--completion"}});
     if (line.help) {
         print(help_text());
     } else if (line.version) {

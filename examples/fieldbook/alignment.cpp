@@ -57,17 +57,13 @@ AxisPoint along_arc(const Element& arc, const AxisPoint& start, double length, d
 
 /// Smallest radius between two lengths along an element.
 double smallest_radius(const Element& element, double from, double to) {
-    switch (element.kind) {
-        case ElementKind::STRAIGHT:
-            return GEO_INFINITY;
-        case ElementKind::ARC:
-            return element.radius;
-        case ElementKind::SPIRAL_IN:
-            return element.radius * element.length / to;
-        case ElementKind::SPIRAL_OUT:
-            return element.radius * element.length / (element.length - from);
+    if (element.kind == ElementKind::SPIRAL_IN) {
+        return element.radius * element.length / to;
     }
-    return element.radius;
+    if (element.kind == ElementKind::SPIRAL_OUT) {
+        return element.radius * element.length / (element.length - from);
+    }
+    return element.radius;  // infinite for a straight
 }
 
 /// Number of chords that keep the sagitta.
@@ -89,19 +85,8 @@ double stand_off(double radius, double arc) {
                                   : radius * (1.0 - sine_cosine(0.5 * std::min(arc / radius, PI)).cosine);
 }
 
-const char* name_of(ElementKind kind) {
-    switch (kind) {
-        case ElementKind::STRAIGHT:
-            return "straight";
-        case ElementKind::SPIRAL_IN:
-            return "spiral in";
-        case ElementKind::ARC:
-            return "arc";
-        case ElementKind::SPIRAL_OUT:
-            return "spiral out";
-    }
-    return "";
-}
+constexpr const char* NAMES[] = {"straight", "spiral in", "arc",
+                                 "spiral out"};  // in the order of ElementKind
 
 /// Lengths along an element at which the chainage is a whole multiple of the interval, and its two ends.
 std::vector<double> stops(double chainage, double length, double interval) {
@@ -146,7 +131,7 @@ std::vector<ChainagePoint> set_out_axis(const Alignment& alignment, double inter
     double chainage = alignment.chainage;
     double last_stand_off = 0.0;
     for (const Element& element : alignment.elements) {
-        points.push_back({chainage, start, name_of(element.kind), last_stand_off});
+        points.push_back({chainage, start, NAMES[static_cast<int>(element.kind)], last_stand_off});
         const std::vector<double> at = stops(chainage, element.length, interval);
         for (std::size_t i = 1; i < at.size(); ++i) {
             const double gap = at[i] - at[i - 1];

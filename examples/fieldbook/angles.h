@@ -2,9 +2,10 @@
 #ifndef FIELDBOOK_ANGLES_H
 #define FIELDBOOK_ANGLES_H
 
-#include <optional>
+#include <cstddef>
 #include <string>
-#include <string_view>
+
+#include "csv_reader.h"
 
 inline constexpr double PI = 3.141592653589793;
 inline constexpr double RADIANS_PER_DEGREE = PI / 180.0;
@@ -17,14 +18,11 @@ struct SineCosine {
 /// Sine and cosine by way of the library, whose results are the same on every processor.
 SineCosine sine_cosine(double radians);
 
-/// Radians from decimal degrees (`123.5`) or degrees, minutes and seconds (`123-30-00.0`) in [0, 360);
-/// nothing if the text is neither. Minutes and seconds are below 60.
-std::optional<double> parse_angle(std::string_view text);
+/// A field in radians: decimal degrees (`123.5`) or degrees, minutes and seconds (`123-30-00.0`) in [0, 360).
+/// InputError for anything else; `what` names it there.
+double read_angle(const CsvReader& csv, std::size_t index, const std::string& what);
 
-/// `123-30-00.0` with so many decimals of a second; 60 seconds carry, and 360 degrees become 0.
+/// `123-30-00.0` of an angle from 0 to 360 degrees, with so many decimals of a second; 360 degrees become 0.
 std::string dms_text(double radians, int decimals);
-
-/// Seconds of arc with one decimal.
-std::string seconds_text(double radians);
 
 #endif

@@ -9,8 +9,6 @@
 #include <string_view>
 #include <vector>
 
-#include "csv_reader.h"
-
 struct NamedPoint {
     std::string name;
     geo_nee at;
@@ -54,7 +52,7 @@ struct Book {
 ///     station,NAME,INSTRUMENT_HEIGHT
 ///     back|fore|side,NAME,TARGET_HEIGHT,HORIZONTAL,ZENITH,SLOPE_DISTANCE,FACE
 ///
-/// metres and degrees; see parse_angle() for the latter and CsvReader for the rest.
+/// metres and degrees; see read_angle() for the latter and CsvReader for the rest.
 Book read_book(const std::string& path);
 
 #endif

@@ -1,10 +1,11 @@
 #include "results.h"
 
+#include <algorithm>
 #include <cmath>
 
 #include "input_error.h"
 #include "number_parsing.h"
-#include "number_text.h"
+#include "text.h"
 
 namespace {
 
@@ -29,13 +30,29 @@ void add_surveyed_points(Results& results, const Precision& precision) {
     }
 }
 
+/// The observation of a point from the nearest station, with the instrument as high as it stood there.
+SettingOut set_out(const Results& results, const geo_nee& point) {
+    const std::vector<NamedPoint>& stations = results.traverse.stations;
+    const auto nearest =
+        std::min_element(stations.begin(), stations.end(), [&](const auto& a, const auto& b) {
+            return geo_horz_distSq(a.at, point) < geo_horz_distSq(b.at, point);
+        });
+    SettingOut result = {};
+    result.setup = static_cast<std::size_t>(nearest - stations.begin());
+    // The field is larger than the grid by the reciprocal of the scale.
+    geo_calc_obs(nearest->at, results.book.setups[result.setup].height, point, results.options.target_height,
+                 result.observation, 1.0 / results.options.scale);
+    result.turn =
+        geo_normalised_bearing(result.observation.horizontal - results.traverse.back_bearing[result.setup]);
+    return result;
+}
+
 void add_axis_points(Results& results, const Alignment& alignment, const Precision& precision) {
     const Options& options = results.options;
     const std::vector<ChainagePoint> axis = set_out_axis(alignment, options.interval, options.sagitta);
     for (const ChainagePoint& point : axis) {
         const geo_nee& at = point.axis.at;
-        const SettingOut out =
-            set_out(results.book, results.traverse, at, options.target_height, options.scale);
+        const SettingOut out = set_out(results, at);
         results.points.push_back({PointKind::AXIS, fixed_text(point.chainage, 3), at,
                                   precision.seen_from(out.setup, out.observation, at), point, out,
                                   std::nullopt});

@@ -7,11 +7,36 @@
 #include <vector>
 
 #include "alignment.h"
+#include "angles.h"
 #include "book_reader.h"
 #include "earth.h"
-#include "options.h"
-#include "setting_out.h"
+#include "precision.h"
 #include "traverse.h"
+
+/// A control point and where it lies on the earth.
+struct EarthAnchor {
+    std::string name;
+    geo_llh position;
+};
+
+struct Options {
+    std::string book;                      ///< path
+    std::optional<std::string> alignment;  ///< path
+    std::optional<std::string> csv;        ///< path
+    double interval = 20.0;                ///< metres
+    double sagitta = 0.01;                 ///< metres
+    double target_height = 1.5;            ///< metres
+    double scale = 1.0;                    ///< grid over ground
+    std::optional<EarthAnchor> wgs84;
+    InstrumentPrecision precision = {3.0 * RADIANS_PER_SECOND, 0.002, 2e-6};
+};
+
+/// Setting-out values: the angle to turn and the distance to measure.
+struct SettingOut {
+    std::size_t setup;    ///< index of the station
+    geo_hvd observation;  ///< with a grid bearing
+    double turn;          ///< clockwise from the back sight, radians in [0, 2 pi)
+};
 
 enum class PointKind { CONTROL, STATION, SIDE, AXIS };
 

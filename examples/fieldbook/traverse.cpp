@@ -3,7 +3,6 @@
 #include <cmath>
 
 #include "angles.h"
-#include "faces.h"
 
 namespace {
 
@@ -71,6 +70,25 @@ geo_nee less(const geo_nee& point, const Closure& misclosure, double part) {
 }
 
 }  // namespace
+
+geo_hvd mean_of_faces(const Sight& sight) {
+    geo_hvd a = sight.face1 ? *sight.face1 : *sight.face2;
+    if (!sight.face1 || !sight.face2) {
+        return geo_normalise_obs(a);
+    }
+    geo_hvd b = *sight.face2;
+    geo_normalise_obs(b);
+    return {geo_bisected_bearing(a.horizontal, b.horizontal), 0.5 * (a.vertical + b.vertical),
+            0.5 * (a.distance + b.distance)};
+}
+
+FaceDifference face_difference(const Sight& sight) {
+    const geo_hvd a = *sight.face1;
+    geo_hvd b = *sight.face2;
+    geo_normalise_obs(b);
+    return {0.5 * std::remainder(a.horizontal - b.horizontal, 2.0 * PI), 0.5 * (a.vertical - b.vertical),
+            a.distance - b.distance};
+}
 
 Traverse compute_traverse(const Book& book, double scale) {
     Traverse traverse;

@@ -12,10 +12,7 @@ namespace {
 using vex_util::CFilePath;
 using vex_util::Path;
 
-constexpr unsigned char DRIVE = 1;
-constexpr unsigned char DIRECTORY = 2;
-constexpr unsigned char NAME = 4;
-constexpr unsigned char EXTENSION = 8;
+enum Part : unsigned char { DRIVE = 1, DIRECTORY = 2, NAME = 4, EXTENSION = 8 };
 
 std::string own_file() {
     std::error_code unknown;

@@ -4,11 +4,16 @@
 
 #include <basalt/platform.h>
 
+#include <optional>
 #include <string>
 #include <variant>
 #include <vector>
 
-#include "options.h"
+struct Options {
+    std::optional<std::string> root;     ///< folder
+    std::optional<std::string> product;  ///< folder
+    std::optional<std::string> path;     ///< to be taken apart; the program's own otherwise
+};
 
 struct Fact {
     std::string name;

@@ -5,9 +5,11 @@
 
 #include <fcntl.h>
 #include <unistd.h>
+#include <nlohmann/json.hpp>
 
 #include <algorithm>
-#include <filesystem>
+#include <iterator>
+#include <optional>
 #include <stdexcept>
 
 namespace {
@@ -22,40 +24,19 @@ CString one_line(CString text) {
     return text;
 }
 
-void append_unit(CString& json, unsigned unit) {
-    json.AppendFormat(L"\\u%04x", unit);
-}
-
-/// A string literal. What is no character, as in a name that is not UTF-8, becomes U+FFFD.
-CString literal(const CString& text) {
-    CString json = L"\"";
+/// As UTF-8. What is no character, as in a name that is not UTF-8, becomes U+FFFD.
+std::string utf8(const CString& text) {
+    std::u32string characters;
     for (int i = 0; i < text.GetLength(); ++i) {
-        auto ch = static_cast<unsigned>(text[i]);
-        if ((ch >= 0xD800 && ch < 0xE000) || ch > 0x10FFFF) {
-            ch = 0xFFFD;
-        }
-        if (ch >= 0x10000) {
-            append_unit(json, 0xD7C0 + (ch >> 10));
-            append_unit(json, 0xDC00 + (ch & 0x3FF));
-        } else if (ch < 0x20 || ch >= 0x7F) {
-            append_unit(json, ch);
-        } else {
-            json += ch == L'"' || ch == L'\\' ? L"\\" : L"";
-            json += static_cast<wchar_t>(ch);
-        }
+        const auto ch = static_cast<char32_t>(text[i]);
+        characters += (ch >= 0xD800 && ch < 0xE000) || ch > 0x10FFFF ? U'\xFFFD' : ch;
     }
-    return json + L'"';
-}
-
-CString number_text(long number) {
-    CString text;
-    text.Format(L"%ld", number);
-    return text;
+    return std::filesystem::path(characters).string();
 }
 
 struct AsText {
     CString operator()(const CString& text) const { return one_line(text); }
-    CString operator()(long number) const { return number_text(number); }
+    CString operator()(long number) const { return std::to_string(number).c_str(); }
     CString operator()(bool yes) const { return yes ? L"yes" : L"no"; }
     CString operator()(const std::vector<CString>& texts) const {
         CString all;
@@ -67,15 +48,14 @@ struct AsText {
 };
 
 struct AsJson {
-    CString operator()(const CString& text) const { return literal(text); }
-    CString operator()(long number) const { return number_text(number); }
-    CString operator()(bool yes) const { return yes ? L"true" : L"false"; }
-    CString operator()(const std::vector<CString>& texts) const {
-        CString all = L"[";
-        for (const CString& text : texts) {
-            all += (all.GetLength() == 1 ? L"" : L", ") + literal(text);
-        }
-        return all + L"]";
+    using Json = nlohmann::ordered_json;
+    Json operator()(const CString& text) const { return utf8(text); }
+    Json operator()(long number) const { return number; }
+    Json operator()(bool yes) const { return yes; }
+    Json operator()(const std::vector<CString>& texts) const {
+        Json all = Json::array();
+        std::transform(texts.begin(), texts.end(), std::back_inserter(all), utf8);
+        return all;
     }
 };
 
@@ -100,26 +80,6 @@ private:
     int m_file;
 };
 
-void log_text(const std::string& path, const CString& text) {
-    vex_util::FileLogger log(path.c_str());
-    log.Write(text);
-}
-
-/// Logs into a file, device or pipe. False when the text did not arrive.
-bool has_logged(const std::string& path, const CString& text) {
-    const std::filesystem::path file = system_path(path);
-    std::error_code unknown;
-    if (std::filesystem::is_other(file, unknown)) {
-        const Device device(file);
-        log_text(path, text);
-        return device.takes_text();
-    }
-    log_text(path, text);
-    const std::string bytes = narrow(text);
-    const auto carriage_returns = static_cast<std::uintmax_t>(std::count(bytes.begin(), bytes.end(), '\n'));
-    return std::filesystem::file_size(file, unknown) == bytes.size() + carriage_returns;
-}
-
 }  // namespace
 
 CString text_report(const std::vector<Section>& sections) {
@@ -136,21 +96,14 @@ CString text_report(const std::vector<Section>& sections) {
     return text;
 }
 
-CString json_report(const std::vector<Section>& sections) {
-    CString json = L"{";
-    const wchar_t* section_end = L"\n";
+std::string json_report(const std::vector<Section>& sections) {
+    nlohmann::ordered_json report;
     for (const Section& section : sections) {
-        json += section_end + (L"  " + literal(section.name.c_str())) + L": {";
-        const wchar_t* fact_end = L"\n";
         for (const Fact& fact : section.facts) {
-            json +=
-                fact_end + (L"    " + literal(fact.name.c_str())) + L": " + std::visit(AsJson(), fact.value);
-            fact_end = L",\n";
+            report[section.name][fact.name] = std::visit(AsJson(), fact.value);
         }
-        json += L"\n  }";
-        section_end = L",\n";
     }
-    return json + L"\n}\n";
+    return report.dump(2, ' ', true) + "\n";  // escaped to ASCII
 }
 
 std::string narrow(const CString& text) {
@@ -173,22 +126,28 @@ std::string narrow(const CString& text) {
 }
 
 std::filesystem::path system_path(std::string path) {
+    std::replace(path.begin(), path.end(), '\\', '/');
     const CString text(path.c_str());
-    if (text.Find(L'\xFFFD') >= 0) {
-        // Bytes that are not UTF-8 pass through unchanged.
-        std::replace(path.begin(), path.end(), '\\', '/');
-        return path;
-    }
-    std::u32string name;
-    for (int i = 0; i < text.GetLength(); ++i) {
-        name += text[i] == L'\\' ? U'/' : static_cast<char32_t>(text[i]);
-    }
-    return name;
+    // Bytes that are not UTF-8 pass through unchanged.
+    return text.Find(L'\xFFFD') >= 0 ? path : utf8(text);
 }
 
 void write_log(const std::string& path, const CString& text) {
-    // The log itself reports no errors.
-    if (!has_logged(path, text)) {
+    // The log itself reports no errors. A device is open for as long as the log writes to it.
+    const std::filesystem::path file = system_path(path);
+    std::error_code unknown;
+    std::optional<Device> device;
+    if (std::filesystem::is_other(file, unknown)) {
+        device.emplace(file);
+    }
+    {
+        vex_util::FileLogger log(path.c_str());
+        log.Write(text);
+    }
+    const std::string bytes = narrow(text);
+    const auto carriage_returns = static_cast<std::uintmax_t>(std::count(bytes.begin(), bytes.end(), '\n'));
+    if (device ? !device->takes_text()
+               : std::filesystem::file_size(file, unknown) != bytes.size() + carriage_returns) {
         throw std::runtime_error("cannot write the log " + path);
     }
 }

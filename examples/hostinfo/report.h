@@ -12,7 +12,7 @@
 CString text_report(const std::vector<Section>& sections);
 
 /// An object of objects, in ASCII whatever the locale.
-CString json_report(const std::vector<Section>& sections);
+std::string json_report(const std::vector<Section>& sections);
 
 /// A text in the encoding of the environment's locale.
 std::string narrow(const CString& text);

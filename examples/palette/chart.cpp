@@ -2,8 +2,7 @@
 
 #include <basalt/frame.h>
 
-#include "drawing.h"
-#include "number_text.h"
+#include "text.h"
 
 namespace {
 

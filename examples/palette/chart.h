@@ -6,8 +6,7 @@
 
 #include <string>
 
-#include "canvas.h"
-#include "nearest.h"
+#include "scene.h"
 
 inline constexpr int SCENE_WIDTH = 448;
 inline constexpr int SCENE_HEIGHT = 300;

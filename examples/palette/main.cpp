@@ -1,57 +1,70 @@
 // The palette's ranges, its colours nearest to others, and a chart of them all.
 
 #include <basalt/graphics.h>
+#include <fmt/format.h>
 
-#include <cstddef>
+#include <charconv>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "chart.h"
-#include "nearest.h"
-#include "number_text.h"
-#include "options.h"
-#include "program.h"
+#include "input_error.h"
+#include "program_options.h"
 #include "scene.h"
-#include "text_table.h"
+#include "text.h"
 
 namespace {
 
-std::string hexadecimal(COLORREF colour) {
-    constexpr char DIGITS[] = "0123456789ABCDEF";
-    std::string text = "#";
-    for (const BYTE channel : {GetRValue(colour), GetGValue(colour), GetBValue(colour)}) {
-        text += DIGITS[channel >> 4];
-        text += DIGITS[channel & 15];
+COLORREF parse_colour(std::string_view given) {
+    const std::string_view digits = given.substr(given.starts_with('#') ? 1 : 0);
+    unsigned value = 0;
+    const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), value, 16);
+    if (digits.size() != 6 || error != std::errc() || end != digits.data() + digits.size()) {
+        throw InputError("a colour is six hexadecimal digits RRGGBB, not " + quoted(given));
     }
-    return text;
+    return RGB(static_cast<int>(value >> 16), static_cast<int>(value >> 8), static_cast<int>(value));
 }
 
-std::string range_of(int number) {
-    if (number <= ColorPalette::GetSecondPaletteEndIndex()) {
-        return "second";
+std::string hexadecimal(COLORREF colour) {
+    return fmt::format("#{:02X}{:02X}{:02X}", GetRValue(colour), GetGValue(colour), GetBValue(colour));
+}
+
+struct Range {
+    const char* name;
+    int first;
+    int last;
+    const char* holds;
+};
+
+const Range RANGES[] = {
+    {"second", ColorPalette::GetSecondPaletteStartIndex(), ColorPalette::GetSecondPaletteEndIndex(),
+     "basic colours"},
+    {"large", ColorPalette::GetLargePaletteStartIndex(), ColorPalette::GetLargePaletteEndIndex(),
+     "hues and shades"},
+    {"third", ColorPalette::GetThirdPaletteStartIndex(), ColorPalette::GetThirdPaletteEndIndex(), "greys"}};
+
+const char* range_of(int number) {
+    for (const Range& range : RANGES) {
+        if (number >= range.first && number <= range.last) {
+            return range.name;
+        }
     }
-    if (number <= ColorPalette::GetLargePaletteEndIndex()) {
-        return "large";
-    }
-    return number <= ColorPalette::GetThirdPaletteEndIndex() ? "third" : "none";
+    return "none";
 }
 
 std::string list_ranges() {
     TextTable table({"range", "first", "last", "holds"});
-    const auto add = [&table](const char* name, int first, int last, const char* holds) {
-        table.add({name, std::to_string(first), std::to_string(last), holds});
-    };
-    add("second", ColorPalette::GetSecondPaletteStartIndex(), ColorPalette::GetSecondPaletteEndIndex(),
-        "basic colours");
-    add("large", ColorPalette::GetLargePaletteStartIndex(), ColorPalette::GetLargePaletteEndIndex(),
-        "hues and shades");
-    add("third", ColorPalette::GetThirdPaletteStartIndex(), ColorPalette::GetThirdPaletteEndIndex(), "greys");
+    for (const Range& range : RANGES) {
+        table.add({range.name, std::to_string(range.first), std::to_string(range.last), range.holds});
+    }
     return "Ranges\n" + table.text();
 }
 
-std::string list_nearest(const ColorPalette& palette, const std::vector<COLORREF>& colours) {
+std::string list_nearest(const ColorPalette& palette, const std::vector<std::string>& colours) {
     TextTable table({"colour", "number", "nearest", "range", "text over it"});
-    for (const COLORREF colour : colours) {
+    for (const std::string& text : colours) {
+        const COLORREF colour = parse_colour(text);
         const unsigned char number = palette.FindClosestColor(colour);
         table.add({hexadecimal(colour), std::to_string(number), hexadecimal(palette[number]),
                    range_of(number), hexadecimal(_complementarycolor(palette[number]))});
@@ -68,21 +81,28 @@ std::string draw_chart(const ColorPalette& palette, const std::string& file) {
     table.add({"colours used", std::to_string(matched.colours_used)});
     table.add({"mean difference of a channel", number_text(matched.mean_difference, 3)});
     table.add({"largest difference of a channel", std::to_string(matched.largest_difference)});
-    return "Picture\n" + table.text();
-}
-
-std::string run(const CommandLine& line) {
-    const Options options = parse_options(line);
-    const ColorPalette palette;
-    std::string report = options.colours.empty() ? list_ranges() : list_nearest(palette, options.colours);
-    if (options.picture) {
-        report.append("\n").append(draw_chart(palette, *options.picture));
-    }
-    return report;
+    return "\nPicture\n" + table.text();
 }
 
 }  // namespace
 
 int main(int count, char** arguments) {
-    return run_program({"palette", SYNTAX, run}, count, arguments);
+    std::optional<std::string> picture;
+    return run_program(
+        {"palette",
+         "Usage: palette [COLOUR]... [--picture FILE]\n\n"
+         "Finds the palette's colours nearest to others, given as RRGGBB or #RRGGBB, and the colour for text "
+         "over\nthem. Without a colour: lists the palette's ranges.\n",
+         "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad "
+         "arguments.\n",
+         {{"--picture", "FILE",
+           "draw all colours with their numbers, and a scene beside its nearest colours, "
+           "as a BMP\nfile",
+           file_into(picture)}},
+         [&picture](const std::vector<std::string>& colours) {
+             const ColorPalette palette;
+             const std::string report = colours.empty() ? list_ranges() : list_nearest(palette, colours);
+             return report + (picture ? draw_chart(palette, *picture) : "");
+         }},
+        count, arguments);
 }

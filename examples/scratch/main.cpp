@@ -1,40 +1,41 @@
 // An external-memory job: sorts a laser scan on temporary files and grids it.
 
-#include <basalt/memory.h>
+#include <fmt/format.h>
+#include <sys/resource.h>
 
 #include <algorithm>
-#include <chrono>
 #include <cstdint>
-#include <memory>
 #include <optional>
 #include <stdexcept>
 #include <string>
 
-#include "cell_reader.h"
+#include "input_error.h"
 #include "interrupt.h"
-#include "number_text.h"
-#include "options.h"
-#include "point_runs.h"
-#include "point_store.h"
-#include "process.h"
-#include "program.h"
+#include "output_file.h"
+#include "point_files.h"
+#include "program_options.h"
 #include "progress.h"
-#include "report.h"
 #include "scan.h"
+#include "text.h"
 
 namespace {
-
-constexpr std::int64_t DEFAULT_POINTS = 24'000'000;
 
 /// Points between two looks at the clock.
 constexpr std::int64_t STRIDE = 1 << 14;
 
-template <typename Work>
-double seconds_for(Work work) {
-    const auto start = std::chrono::steady_clock::now();
-    work();
-    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
-}
+struct Options {
+    std::int64_t points = 24'000'000;
+    std::optional<std::string> cells;  ///< path
+};
+
+/// Heights in millimetres.
+struct Ground {
+    std::int64_t cells = 0;        ///< with points
+    std::int64_t most_points = 0;  ///< in one cell
+    std::int32_t lowest = INT32_MAX;
+    std::int32_t highest = INT32_MIN;
+    double sum_of_medians = 0;
+};
 
 /// The scan in sorted runs; gives the points' fingerprint.
 std::uint64_t scan_into(PointRuns& runs, Scan scan) {
@@ -52,8 +53,8 @@ std::uint64_t scan_into(PointRuns& runs, Scan scan) {
 }
 
 /// The runs merged into one row of points, which is checked on the way.
-void merge_into(PointStore& store, PointRuns& runs, std::uint64_t expected) {
-    Progress progress("Merging", runs.points());
+void merge_into(PointStore& store, PointRuns& runs, std::int64_t points, std::uint64_t expected) {
+    Progress progress("Merging", points);
     std::uint64_t sum = 0;
     Point last = {};
     runs.take_in_order([&](const Point& point) {
@@ -71,41 +72,56 @@ void merge_into(PointStore& store, PointRuns& runs, std::uint64_t expected) {
     }
 }
 
-std::string line_of(const Cell& cell) {
-    const auto metres = [](std::int32_t millimetres) {
-        return std::string(1, ',').append(fixed_text(millimetres / 1000.0, 3));
-    };
-    return std::to_string(cell.row) + "," + std::to_string(cell.column) + "," + std::to_string(cell.points) +
-           metres(cell.lowest) + metres(cell.median) + metres(cell.highest) + "\n";
-}
-
-/// Sums up the cells, and formats them if requested.
-std::string read_cells(const PointStore& store, bool wants_text, Outcome& outcome) {
+/// Sums the cells up, and lists them if there is a text to append to.
+Ground read_cells(const PointStore& store, std::string* text) {
     Progress progress("Reading cells", store.points());
-    std::string text = wants_text ? "row,column,points,lowest,median,highest\n" : "";
-    CellReader reader(store);
-    double sum = 0;
-    std::int64_t done = 0;
-    for (Cell cell; reader.next(cell);) {
-        outcome.lowest = outcome.cells == 0 ? cell.lowest : std::min(outcome.lowest, cell.lowest);
-        outcome.highest = outcome.cells == 0 ? cell.highest : std::max(outcome.highest, cell.highest);
-        outcome.most_points = std::max(outcome.most_points, cell.points);
-        sum += cell.median;
-        done += cell.points;
-        if (++outcome.cells % STRIDE == 0) {
+    Ground ground;
+    for (std::int64_t first = 0, next = 0; first < store.points(); first = next) {
+        const Point& lowest = store.at(first);
+        do {
+            ++next;
+        } while (next < store.points() && store.at(next).row == lowest.row &&
+                 store.at(next).column == lowest.column);
+        const std::int64_t points = next - first;
+        const std::int32_t median = store.at(first + (points - 1) / 2).up;  // the lower of two
+        const std::int32_t highest = store.at(next - 1).up;
+        ground.lowest = std::min(ground.lowest, lowest.up);
+        ground.highest = std::max(ground.highest, highest);
+        ground.most_points = std::max(ground.most_points, points);
+        ground.sum_of_medians += median;
+        if (++ground.cells % STRIDE == 0) {
             stop_if_interrupted();
-            progress.update(done);
+            progress.update(next);
         }
-        if (wants_text) {
-            text += line_of(cell);
+        if (text != nullptr) {
+            *text += fmt::format("{},{},{},{:.3f},{:.3f},{:.3f}\n", lowest.row, lowest.column, points,
+                                 lowest.up / 1000.0, median / 1000.0, highest / 1000.0);
         }
     }
-    outcome.mean_median = sum / static_cast<double>(outcome.cells);
-    return text;
+    return ground;
 }
 
-std::string sort_and_grid(const CommandLine& line) {
-    const Options options = parse_options(line);
+std::string line(const char* label, const std::string& value) {
+    return fmt::format("  {:<24}{}\n", label, value);
+}
+
+std::string metres(double millimetres) {
+    return number_text(millimetres / 1000, 3) + " m";
+}
+
+std::string megabytes(std::int64_t bytes) {
+    return number_text(static_cast<double>(bytes) / (1 << 20), 1) + " MiB";
+}
+
+std::string files(std::int64_t count, std::int64_t bytes_each) {
+    return number_text(count) + ", " + megabytes(count * bytes_each);
+}
+
+std::string seconds(double value) {
+    return number_text(value, 2) + " s";
+}
+
+std::string sort_and_grid(const Options& options) {
     // Ahead of the job, which may take an hour.
     std::optional<OutputFile> cells_file;
     if (options.cells) {
@@ -115,36 +131,70 @@ std::string sort_and_grid(const CommandLine& line) {
     // Files left in the folder by a killed run.
     vex_util::CMemoryMap::CleanUp();
 
-    const Scan scan(options.points.value_or(DEFAULT_POINTS));
-    Outcome outcome;
-    outcome.points = scan.points();
-    outcome.cells_of_site = std::int64_t{scan.side()} * scan.side();
-    outcome.memory_limit = private_memory_limit();
-
+    const Scan scan(options.points);
     PointStore store;
+    std::string job =
+        "\nJob\n" + line("Bytes sorted", megabytes(scan.points() * std::int64_t{sizeof(Point)}));
+    std::string times;
     {
         PointRuns runs;
         std::uint64_t expected = 0;
-        outcome.scan_seconds = seconds_for([&] { expected = scan_into(runs, scan); });
-        outcome.merge_seconds = seconds_for([&] { merge_into(store, runs, expected); });
-        outcome.run_files = runs.files();
-        outcome.run_file_bytes = PointRuns::FILE_BYTES;
-        outcome.private_memory = private_memory();
+        times +=
+            line("Scanning, sorting runs", seconds(seconds_for([&] { expected = scan_into(runs, scan); })));
+        times +=
+            line("Merging", seconds(seconds_for([&] { merge_into(store, runs, scan.points(), expected); })));
+        job += line("Files of runs", files(runs.files(), PointRuns::FILE_BYTES));
+        job += line("Files of sorted points", files(store.files(), PointStore::FILE_BYTES));
+        if (const std::optional<std::int64_t> memory = private_memory()) {
+            job += line("Memory beside files", megabytes(*memory));
+        }
     }
-    outcome.store_files = store.files();
-    outcome.store_file_bytes = PointStore::MAP_BYTES;
-    std::string cells;
-    outcome.read_seconds = seconds_for([&] { cells = read_cells(store, cells_file.has_value(), outcome); });
+    rlimit limit = {};
+    const bool limited = getrlimit(RLIMIT_DATA, &limit) == 0 && limit.rlim_cur != RLIM_INFINITY;
+    job += line("Memory limit", limited ? megabytes(static_cast<std::int64_t>(limit.rlim_cur)) : "none");
+
+    std::string cells = "row,column,points,lowest,median,highest\n";
+    Ground ground;
+    times += line("Reading cells",
+                  seconds(seconds_for([&] { ground = read_cells(store, cells_file ? &cells : nullptr); })));
     if (cells_file) {
         cells_file->write(cells);
     }
-    return write_report(outcome);
+    const std::int64_t cells_of_site = std::int64_t{scan.side()} * scan.side();
+    return "Ground\n" + line("Points", number_text(scan.points())) +
+           line("Cells with points", number_text(ground.cells) + " of " + number_text(cells_of_site)) +
+           line("Most points in a cell", number_text(ground.most_points)) +
+           line("Lowest", metres(ground.lowest)) + line("Highest", metres(ground.highest)) +
+           line("Mean of medians", metres(ground.sum_of_medians / static_cast<double>(ground.cells))) + job +
+           times;
 }
 
 }  // namespace
 
 int main(int count, char** arguments) {
-    const int code = run_program({"scratch", SYNTAX, sort_and_grid}, count, arguments);
+    Options options;
+    const Program program = {
+        "scratch",
+        "Usage: scratch [OPTION]...\n\n"
+        "Generates a laser scan, sorts it into cells of one metre on temporary files, and reports the "
+        "ground's\n"
+        "heights and what the job took. The points never need to fit into memory.\n",
+        "Files are made in the folder that TMPDIR names, else in /tmp. Ctrl-C ends the job and leaves none.\n"
+        "Exit status: 0 success, 1 a file could not be written or room ran out, 2 bad arguments.\n",
+        {{"--points", "N", "points of the scan, 16 bytes each, at most 400000000 (default: 24000000)",
+          number_into(options.points, std::int64_t{1}, Scan::MOST_POINTS,
+                      "a whole number from 1 to " + std::to_string(Scan::MOST_POINTS))},
+         {"--cells", "FILE",
+          "also write row,column,points,lowest,median,highest of every cell, heights in metres",
+          file_into(options.cells)}},
+        [&options](const std::vector<std::string>& operands) {
+            if (!operands.empty()) {
+                throw InputError("unexpected argument " + quoted(operands[0]) +
+                                 " (--help shows what is taken)");
+            }
+            return sort_and_grid(options);
+        }};
+    const int code = run_program(program, count, arguments);
     end_as_interrupted();
     return code;
 }

@@ -2,18 +2,42 @@
 
 #include <basalt/graphics.h>
 
-#include <cerrno>
-#include <cstdint>
+#include <algorithm>
+#include <cmath>
 #include <cstdio>
 #include <filesystem>
 #include <stdexcept>
+#include <string_view>
 #include <system_error>
 
-#include "pixel_font.h"
+#include "program.h"
 
 namespace {
 
+constexpr int GLYPH_WIDTH = 5;
+constexpr int GLYPH_HEIGHT = 7;
 constexpr int ADVANCE = GLYPH_WIDTH + 1;
+
+/// The characters of the font, and for each its rows, top first, from the highest of 35 bits on.
+constexpr std::string_view CHARACTERS = " 0123456789ABCDEFGHIJKLMNOPQRSTUVWXYZ.,-+:/%";
+constexpr std::uint64_t GLYPHS[] = {
+    0x000000000, 0x3A33AE62E, 0x11842108E, 0x3A213221F, 0x3A213062E, 0x08CA97C42, 0x7E1E0862E, 0x1910F462E,
+    0x7C2222108, 0x3A317462E, 0x3A317844C, 0x3A31FC631, 0x7A31F463E, 0x3A308422E, 0x7A318C63E, 0x7E10F421F,
+    0x7E10F4210, 0x3A30BC62F, 0x4631FC631, 0x38842108E, 0x1C4210A4C, 0x4654C5251, 0x42108421F, 0x4775AC631,
+    0x47359C631, 0x3A318C62E, 0x7A31F4210, 0x3A318D64D, 0x7A31F5251, 0x3E107043E, 0x7C8421084, 0x46318C62E,
+    0x46318C544, 0x4631AD771, 0x462A22A31, 0x462A21084, 0x7C222221F, 0x00000018C, 0x000003088, 0x0000F8000,
+    0x0084F9080, 0x018C03180, 0x042222210, 0x632222263};
+
+std::uint64_t glyph(char character) {
+    const bool small = character >= 'a' && character <= 'z';
+    const std::size_t at = CHARACTERS.find(small ? static_cast<char>(character - 'a' + 'A') : character);
+    return GLYPHS[at == std::string_view::npos ? 0 : at];
+}
+
+/// Words hold red high, colours blue: the same exchange both ways.
+std::uint32_t exchanged(std::uint32_t colour) {
+    return (colour & 0xFF) << 16 | (colour & 0xFF00) | (colour >> 16 & 0xFF);
+}
 
 class Brush {
 public:
@@ -27,16 +51,48 @@ private:
     HBRUSH m_brush;
 };
 
-/// DumpBitmap reports no failure to write the file: check first.
-void expect_writable(const std::string& path) {
-    std::FILE* file = std::fopen(path.c_str(), "ab");
-    if (file == nullptr) {
-        throw std::runtime_error("cannot write to " + path + ": " + std::generic_category().message(errno));
-    }
-    std::fclose(file);
+}  // namespace
+
+COLORREF mixed(COLORREF from, COLORREF to, double part) {
+    const auto channel = [part](int a, int b) { return static_cast<int>(std::lround(a + (b - a) * part)); };
+    return RGB(channel(GetRValue(from), GetRValue(to)), channel(GetGValue(from), GetGValue(to)),
+               channel(GetBValue(from), GetBValue(to)));
 }
 
-}  // namespace
+Canvas::Canvas(int width, int height, COLORREF ground)
+    : m_width(width), m_height(height), m_words(index(0, height), exchanged(ground)) {}
+
+COLORREF Canvas::get(int x, int y) const {
+    return has(x, y) ? exchanged(m_words[index(x, y)]) : CLR_INVALID;
+}
+
+void Canvas::set(int x, int y, COLORREF colour) {
+    if (has(x, y)) {
+        m_words[index(x, y)] = exchanged(colour);
+    }
+}
+
+void Canvas::line(CanvasPoint from, CanvasPoint to, double thickness, COLORREF colour, double opacity) {
+    // A pixel's share falls from 1 to 0 within half a pixel on either side of the line's edge.
+    const double reach = thickness / 2 + 0.5;
+    const double dx = to.x - from.x;
+    const double dy = to.y - from.y;
+    const double length2 = dx * dx + dy * dy;
+    const auto pixel = [](double place, int size) {
+        return static_cast<int>(std::clamp(std::floor(place), -1.0, static_cast<double>(size)));
+    };
+    const int last_x = pixel(std::max(from.x, to.x) + reach, m_width);
+    const int last_y = pixel(std::max(from.y, to.y) + reach, m_height);
+    for (int y = pixel(std::min(from.y, to.y) - reach, m_height); y <= last_y; ++y) {
+        for (int x = pixel(std::min(from.x, to.x) - reach, m_width); x <= last_x; ++x) {
+            const double px = x + 0.5 - from.x;
+            const double py = y + 0.5 - from.y;
+            const double along = length2 > 0 ? std::clamp((px * dx + py * dy) / length2, 0.0, 1.0) : 0.0;
+            const double distance = std::hypot(px - along * dx, py - along * dy);
+            set(x, y, mixed(get(x, y), colour, opacity * std::clamp(reach - distance, 0.0, 1.0)));
+        }
+    }
+}
 
 Drawing::Drawing(const Canvas& canvas) {
     m_bitmap.CreateBitmap(canvas.width(), canvas.height(), 1, 32, canvas.words());
@@ -48,35 +104,30 @@ Drawing::Drawing(const Canvas& canvas) {
     }
 }
 
-Drawing::~Drawing() {
-    m_dc.SelectObject(m_before);
-}
-
 void Drawing::fill(const RECT& rectangle, COLORREF colour) {
     FillRect(m_dc, &rectangle, Brush(colour));
 }
 
 void Drawing::outline(const RECT& r, COLORREF colour) {
-    fill({r.left, r.top, r.right, r.top + 1}, colour);
-    fill({r.left, r.bottom - 1, r.right, r.bottom}, colour);
-    fill({r.left, r.top, r.left + 1, r.bottom}, colour);
-    fill({r.right - 1, r.top, r.right, r.bottom}, colour);
+    for (const RECT& side :
+         {RECT{r.left, r.top, r.right, r.top + 1}, RECT{r.left, r.bottom - 1, r.right, r.bottom},
+          RECT{r.left, r.top, r.left + 1, r.bottom}, RECT{r.right - 1, r.top, r.right, r.bottom}}) {
+        fill(side, colour);
+    }
 }
 
 void Drawing::text(int x, int y, const std::string& line, COLORREF colour, int scale, Align align) {
     const Brush brush(colour);
-    x -= align == Align::RIGHT    ? text_width(line, scale)
-         : align == Align::CENTRE ? text_width(line, scale) / 2
-                                  : 0;
+    const int width = text_width(line, scale);
+    x -= align == Align::RIGHT ? width : align == Align::CENTRE ? width / 2 : 0;
     for (const char character : line) {
-        const Glyph& rows = glyph(character);
-        for (int row = 0; row < GLYPH_HEIGHT; ++row) {
-            for (int column = 0; column < GLYPH_WIDTH; ++column) {
-                if ((rows[static_cast<std::size_t>(row)] >> (GLYPH_WIDTH - 1 - column) & 1) != 0) {
-                    const RECT dot = {x + column * scale, y + row * scale, x + (column + 1) * scale,
-                                      y + (row + 1) * scale};
-                    FillRect(m_dc, &dot, brush);
-                }
+        const std::uint64_t bits = glyph(character);
+        for (int i = 0; i < GLYPH_WIDTH * GLYPH_HEIGHT; ++i) {
+            if ((bits >> (GLYPH_WIDTH * GLYPH_HEIGHT - 1 - i) & 1) != 0) {
+                const int left = x + i % GLYPH_WIDTH * scale;
+                const int top = y + i / GLYPH_WIDTH * scale;
+                const RECT dot = {left, top, left + scale, top + scale};
+                FillRect(m_dc, &dot, brush);
             }
         }
         x += ADVANCE * scale;
@@ -93,15 +144,19 @@ int Drawing::text_height(int scale) {
 
 void Drawing::save(const std::string& path) {
     m_dc.SelectObject(m_before);  // the codec takes a bitmap that no context holds
-    expect_writable(path);
+    // DumpBitmap reports no failure to write the file: check first, and its size afterwards.
+    std::FILE* file = std::fopen(path.c_str(), "ab");
+    if (file == nullptr) {
+        fail_to_write(path);
+    }
+    std::fclose(file);
     vex_util::mfc::DumpBitmap(m_bitmap, CString(path.c_str()));
     constexpr std::uintmax_t HEADERS = 54;
     BITMAP record = {};
     m_bitmap.GetBitmap(&record);
+    const std::int64_t pixels = std::int64_t{record.bmWidthBytes} * record.bmHeight;
     std::error_code error;
-    const std::uintmax_t size = std::filesystem::file_size(path, error);
-    if (error || size != HEADERS + static_cast<std::uintmax_t>(record.bmWidthBytes) *
-                                       static_cast<std::uintmax_t>(record.bmHeight)) {
+    if (std::filesystem::file_size(path, error) != HEADERS + static_cast<std::uintmax_t>(pixels) || error) {
         throw std::runtime_error("cannot write all of " + path);
     }
 }

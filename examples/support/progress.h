@@ -1,9 +1,10 @@
-// A progress bar for work that takes its time.
+// What a long job shows and takes: a bar, its time, its memory.
 #ifndef EXAMPLES_PROGRESS_H
 #define EXAMPLES_PROGRESS_H
 
 #include <chrono>
 #include <cstdint>
+#include <optional>
 #include <string>
 
 /// Shows how far a step has come as a bar and per cent, on standard error, when that is a terminal and the
@@ -27,5 +28,22 @@ private:
     bool m_shown = false;
     Clock::time_point m_next;
 };
+
+/// How long a piece of work takes.
+template <typename Work>
+double seconds_for(Work work) {
+    const auto start = std::chrono::steady_clock::now();
+    work();
+    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+}
+
+/// @name Memory of this process, bytes. Nothing where the system does not report it.
+/// @{
+/// Held in RAM now, and the largest amount so far.
+std::optional<std::int64_t> resident_memory();
+std::optional<std::int64_t> peak_resident_memory();
+/// Of what is held in RAM, the part that is not on a file.
+std::optional<std::int64_t> private_memory();
+/// @}
 
 #endif

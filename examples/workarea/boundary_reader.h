@@ -9,6 +9,8 @@
 struct Place {
     double longitude;
     double latitude;
+
+    bool operator==(const Place&) const = default;
 };
 
 /// The vertices of a boundary, in order and without a repeated closing vertex; at least three, not all in one

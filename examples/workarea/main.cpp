@@ -1,25 +1,20 @@
 // Area, elevations, slope and earthwork of a work area, computed over a sparse array of terrain cells.
 
-#include <chrono>
-#include <filesystem>
 #include <memory>
 #include <string>
-#include <system_error>
+#include <tuple>
 #include <vector>
 
 #include "boundary_reader.h"
 #include "esri_grid_reader.h"
 #include "input_error.h"
-#include "options.h"
+#include "output_file.h"
 #include "picture.h"
-#include "process.h"
-#include "program.h"
+#include "program_options.h"
+#include "progress.h"
 #include "report.h"
 #include "survey.h"
-#include "synthetic_terrain.h"
 #include "terrain_loader.h"
-#include "view.h"
-#include "work_area.h"
 
 namespace {
 
@@ -39,13 +34,6 @@ std::vector<geo_nee> in_plane(const std::vector<Place>& places, const LocalPlane
     return points;
 }
 
-template <typename Work>
-double seconds_for(Work work) {
-    const auto start = std::chrono::steady_clock::now();
-    work();
-    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
-}
-
 /// Why no cell counts, for the message.
 std::string nothing_found(const Options& options, const Survey& survey) {
     if (survey.in_view > 0) {
@@ -54,21 +42,10 @@ std::string nothing_found(const Options& options, const Survey& survey) {
     return options.terrain + ": no cell " + (options.view ? "of the view " : "") + "has an elevation";
 }
 
-/// A slip of the fingers should not cost a terrain.
-void spare_inputs(const Options& options) {
-    for (const std::string& input : {options.terrain, options.boundary.value_or("")}) {
-        std::error_code no_such_file;
-        if (std::filesystem::equivalent(*options.picture, input, no_such_file)) {
-            throw InputError("--picture would overwrite " + input);
-        }
-    }
-}
-
-std::string measure(const CommandLine& line) {
-    const Options options = parse_options(line);
+std::string measure(const Options& options) {
     // Small inputs first: report a mistake in them before reading a large terrain.
     if (options.picture) {
-        spare_inputs(options);
+        spare_inputs("--picture", *options.picture, {options.terrain, options.boundary.value_or("")});
     }
     const std::vector<Place> places =
         options.boundary ? read_boundary(*options.boundary) : std::vector<Place>();
@@ -99,8 +76,64 @@ std::string measure(const CommandLine& line) {
     return write_report(outcome);
 }
 
+/// W,S,E,N
+Target view_into(std::optional<DegreeBox>& view) {
+    return {"four numbers W,S,E,N", [&view](const std::string& text) {
+                double edges[4] = {};
+                if (!read_numbers(text, edges)) {
+                    return false;
+                }
+                view = {edges[0], edges[1], edges[2], edges[3]};
+                for (const auto& [low, high, order] :
+                     {std::tuple(view->west, view->east, "W must be less than E"),
+                      std::tuple(view->south, view->north, "S must be less than N")}) {
+                    if (!(low < high)) {
+                        throw InputError("--view " + quoted(text) + ": " + order);
+                    }
+                }
+                return true;
+            }};
+}
+
 }  // namespace
 
 int main(int count, char** arguments) {
-    return run_program({"workarea", SYNTAX, measure}, count, arguments);
+    Options o;
+    const Program program = {
+        "workarea",
+        "Usage: workarea TERRAIN.asc [OPTION]...\n"
+        "       workarea --synthetic N [OPTION]...\n\n"
+        "Reads a terrain (an ESRI ASCII grid in geographic degrees), keeps its cells in a sparse array, and "
+        "reports\narea, elevations, slope and earthwork of the cells inside a view and a boundary.\n",
+        "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad arguments "
+        "or "
+        "input.\n",
+        {{"--boundary", "FILE",
+          "count only cells whose centre lies inside this polygon; one longitude,latitude a line",
+          file_into(o.boundary)},
+         {"--view", "W,S,E,N",
+          "count only cells whose centre lies in this rectangle, edges included, in degrees\n"
+          "(default: the whole grid)",
+          view_into(o.view)},
+         {"--grade", "ELEVATION",
+          "cut and fill against this elevation in metres (default: the mean elevation)",
+          number_into(o.grade, -LARGEST_ELEVATION, LARGEST_ELEVATION, "an elevation in metres")},
+         {"--picture", "FILE", "draw the terrain with boundary, view, cut and fill, as a BMP file",
+          file_into(o.picture)},
+         {"--legend", "", "with --picture: what its colours and lines mean, degrees, scale and north",
+          flag_into(o.legend), "--picture"},
+         {"--synthetic", "N", "a generated terrain of N cells, at most 100000000, instead of a file",
+          number_into(o.synthetic, std::int64_t{1}, SyntheticTerrain::LARGEST,
+                      "a whole number from 1 to " + std::to_string(SyntheticTerrain::LARGEST))}},
+        [&o](const std::vector<std::string>& operands) {
+            o.terrain = only_operand(operands, "terrain file").value_or("");
+            if (o.terrain.empty() && !o.synthetic) {
+                throw InputError("no terrain file given (--help shows how)");
+            }
+            if (!o.terrain.empty() && o.synthetic) {
+                throw InputError("--synthetic replaces the terrain file; both are given");
+            }
+            return measure(o);
+        }};
+    return run_program(program, count, arguments);
 }

@@ -1,13 +1,41 @@
 #include "map.h"
 
+#include <basalt/graphics.h>
+
 #include <algorithm>
 #include <cmath>
 #include <cstddef>
-#include <utility>
-
-#include "map_colours.h"
 
 namespace {
+
+/// Number of a hue's pale colour in the palette's large range: ten entries a hue, 15 degrees apart, of which
+/// every second is pale, from the brightest of five levels to the darkest.
+unsigned char pale(int degrees, int level) {
+    return static_cast<unsigned char>(ColorPalette::GetLargePaletteStartIndex() + degrees / 15 * 10 +
+                                      2 * level + 1);
+}
+
+/// Between two of the stops; `part` 0 is the first, 1 the last.
+COLORREF between_stops(const std::vector<COLORREF>& stops, double part) {
+    const double place = std::clamp(part, 0.0, 1.0) * static_cast<double>(stops.size() - 1);
+    const std::size_t first = std::min(static_cast<std::size_t>(place), stops.size() - 2);
+    return mixed(stops[first], stops[first + 1], place - static_cast<double>(first));
+}
+
+/// A hue a part of the way down to the largest depth.
+COLORREF darkened(COLORREF hue, double part) {
+    return mixed(0, hue, 1.0 / static_cast<double>(darkening_at(std::clamp(part, 0.0, 1.0))));
+}
+
+/// A colour under some light: 1 leaves it as it is.
+COLORREF lit(COLORREF colour, double light) {
+    constexpr double SHADOW = 0.35;  // what the sky gives where the sun does not reach
+    constexpr double GLARE = 0.55;
+    if (light < 1.0) {
+        return mixed(0, colour, SHADOW + (1.0 - SHADOW) * light);
+    }
+    return mixed(colour, PAPER, std::min(1.0, GLARE * (light - 1.0)));
+}
 
 /// Place of a point of the local plane on the map.
 CanvasPoint on_map(const Map& map, const geo_nee& point) {
@@ -117,6 +145,22 @@ void draw_view(const Map& map, Canvas& canvas) {
 }
 
 }  // namespace
+
+std::vector<COLORREF> elevation_stops() {
+    const ColorPalette palette;
+    const auto grey = static_cast<unsigned char>(ColorPalette::GetThirdPaletteEndIndex());
+    std::vector<COLORREF> stops;
+    for (const unsigned char number : {pale(150, 2), pale(105, 1), pale(60, 0), pale(45, 1), pale(30, 2),
+                                       grey, ColorPalette::GetWhiteColorIndex()}) {
+        stops.push_back(mixed(palette[number], PAPER, 0.25));
+    }
+    return stops;
+}
+
+float darkening_at(double part) {
+    // Channels go in a straight line from the whole to 1 / DARKENING.
+    return static_cast<float>(1.0 / (1.0 - part + part / static_cast<double>(DARKENING)));
+}
 
 Map lay_out_map(const Outcome& outcome, const Relief& relief, int longer_side) {
     const GridFrame& frame = outcome.area.frame();

@@ -2,11 +2,28 @@
 #ifndef WORKAREA_MAP_H
 #define WORKAREA_MAP_H
 
+#include <basalt/platform.h>
+
 #include <vector>
 
-#include "canvas.h"
+#include "drawing.h"
 #include "relief.h"
 #include "report.h"
+
+inline constexpr COLORREF PAPER = RGB(255, 255, 255);
+inline constexpr COLORREF INK = RGB(38, 38, 38);
+inline constexpr COLORREF NO_DATA = RGB(222, 222, 222);
+
+/// Where cut and fill begin; their colours darken with the depth, down to a part of this at the largest.
+inline constexpr COLORREF CUT = RGB(255, 138, 92);
+inline constexpr COLORREF FILL = RGB(120, 178, 255);
+inline constexpr float DARKENING = 2.6F;
+
+/// Colours for elevations from the lowest to the highest, at equal distances, from the library's palette.
+std::vector<COLORREF> elevation_stops();
+
+/// By what a hue is divided a part of the way down to the largest depth, where it is DARKENING.
+float darkening_at(double part);
 
 /// What a map shows, and to what scale.
 struct Map {

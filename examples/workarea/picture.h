@@ -4,7 +4,7 @@
 
 #include "report.h"
 
-/// Draws the whole grid, in options.picture, with a legend if options.legend asks for it. Selects the grid.
+/// Draws the whole grid into options.picture, with options.legend beside a legend. Selects the grid.
 /// std::runtime_error when the file cannot be written.
 PictureSize write_picture(const Outcome& outcome, WorkArea& area);
 

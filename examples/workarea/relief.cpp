@@ -5,8 +5,6 @@
 #include <cstdint>
 #include <limits>
 
-#include "view.h"
-
 namespace {
 
 int sampled(int cells, int cells_per_sample) {

@@ -7,10 +7,19 @@
 #include <string>
 #include <vector>
 
-#include "boundary_reader.h"
-#include "options.h"
 #include "survey.h"
 #include "terrain_loader.h"
+#include "work_area.h"
+
+struct Options {
+    std::string terrain;  ///< path; empty with synthetic
+    std::optional<std::int64_t> synthetic;
+    std::optional<std::string> boundary;
+    std::optional<DegreeBox> view;
+    std::optional<double> grade;  ///< metres
+    std::optional<std::string> picture;
+    bool legend = false;
+};
 
 /// A picture that was drawn.
 struct PictureSize {

@@ -1,5 +1,65 @@
 #include "work_area.h"
 
+#include "input_error.h"
+
+namespace {
+
+constexpr double SEMI_MAJOR_AXIS = 6378137.0;  // WGS84, metres
+
+geo_llh on_ellipsoid(double longitude, double latitude) {
+    // The library refuses the all-zero record. This height vanishes in the rounding of a coordinate.
+    constexpr double NO_HEIGHT = 1e-10;
+    return {_degtorad(latitude), _degtorad(longitude), latitude == 0 && longitude == 0 ? NO_HEIGHT : 0.0};
+}
+
+}  // namespace
+
+LocalPlane::LocalPlane(double longitude, double latitude) : m_frame(on_ellipsoid(longitude, latitude)) {}
+
+geo_nee LocalPlane::local(double longitude, double latitude) const {
+    return m_frame.to_local(on_ellipsoid(longitude, latitude));
+}
+
+geo_nee LocalPlane::to_grid(double longitude, double latitude, double elevation) const {
+    geo_nee point = local(longitude, latitude);
+    point.elevation = elevation;
+    return point;
+}
+
+double LocalPlane::shortening(double longitude, double latitude) const {
+    // The plumb lines of place and origin meet at an angle; 1 less its cosine is the drop over the radius.
+    return -local(longitude, latitude).elevation / SEMI_MAJOR_AXIS;
+}
+
+CellBox cells_in_view(const GridFrame& frame, const DegreeBox& view) {
+    if (view.west >= frame.east() || view.east <= frame.west || view.south >= frame.north() ||
+        view.north <= frame.south) {
+        throw InputError("--view lies outside the grid, which is " + std::to_string(frame.west) + "," +
+                         std::to_string(frame.south) + "," + std::to_string(frame.east()) + "," +
+                         std::to_string(frame.north()));
+    }
+    // First of `count` cells that does not lie before an edge; count if all do.
+    const auto first_not = [](int count, auto before) {
+        int first = 0;
+        while (count > 0) {
+            const int half = count / 2;
+            const bool is_behind = before(first + half);
+            first += is_behind ? half + 1 : 0;
+            count = is_behind ? count - half - 1 : half;
+        }
+        return first;
+    };
+    const CellBox box = {
+        first_not(frame.columns, [&](int x) { return frame.centre_longitude(x) < view.west; }),
+        first_not(frame.rows, [&](int y) { return frame.centre_latitude(y) < view.south; }),
+        first_not(frame.columns, [&](int x) { return frame.centre_longitude(x) <= view.east; }) - 1,
+        first_not(frame.rows, [&](int y) { return frame.centre_latitude(y) <= view.north; }) - 1};
+    if (box.west > box.east || box.south > box.north) {
+        throw InputError("--view is too small: no cell centre lies in it");
+    }
+    return box;
+}
+
 WorkArea::WorkArea(const GridFrame& frame)
     : m_frame(frame),
       m_plane(0.5 * (frame.west + frame.east()), 0.5 * (frame.south + frame.north())),

@@ -8,8 +8,32 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "local_plane.h"
 #include "terrain_source.h"
+
+/// A plane of metres north and east that touches the WGS84 ellipsoid at an origin, all other places dropped
+/// on it along the origin's plumb line.
+///
+/// Lengths at the origin are true. Towards or away from it they come out short by about d^2 / 2 R^2 at a
+/// distance d: 1 ppm at 9 km, 120 ppm at 100 km; lengths across that direction stay true to the second order.
+/// Lengths are those on the ellipsoid: 500 m above it the ground is 78 ppm longer.
+class LocalPlane {
+public:
+    /// Origin in degrees.
+    LocalPlane(double longitude, double latitude);
+
+    /// Grid point of a place in degrees. Its elevation is the place's own, in metres, not what is left above
+    /// the plane: that falls away with the earth's curvature, 8 cm at 1 km, and heights are what earthwork
+    /// counts.
+    geo_nee to_grid(double longitude, double latitude, double elevation) const;
+
+    /// How much too short lengths towards the origin are at a place in degrees: 0 at the origin.
+    double shortening(double longitude, double latitude) const;
+
+private:
+    geo_nee local(double longitude, double latitude) const;
+
+    basalt::LocalFrame m_frame;
+};
 
 /// What is kept of a cell.
 struct CellRecord {
@@ -34,6 +58,23 @@ struct CellBox {
     bool contains(int x, int y) const { return x >= west && x <= east && y >= south && y <= north; }
     std::int64_t cells() const { return (std::int64_t{east} - west + 1) * (std::int64_t{north} - south + 1); }
 };
+
+/// A rectangle in the terrain's own coordinates, degrees.
+struct DegreeBox {
+    double west;
+    double south;
+    double east;
+    double north;
+};
+
+/// All cells of the grid.
+inline CellBox whole_grid(const GridFrame& frame) {
+    return {0, 0, frame.columns - 1, frame.rows - 1};
+}
+
+/// The cells whose centres lie in the view, its edges included, cut to the grid. InputError when there is
+/// none.
+CellBox cells_in_view(const GridFrame& frame, const DegreeBox& view);
 
 class WorkArea {
 public:
@@ -63,16 +104,14 @@ public:
     /// Calls visit(x, y, const CellRecord&) for every cell of the selected blocks, inside the box or not.
     template <typename Visit>
     void visit_selected(Visit visit) {
-        struct Context {
-            Visit* visit;
-        };
-        const Context context = {&visit};
+        Visit* const at = &visit;
         m_array.IterateSelected(
             [](int x, int y, const void* element, const void* given) {
-                (*static_cast<const Context*>(given)->visit)(x, y, *static_cast<const CellRecord*>(element));
+                Visit* const target = *static_cast<Visit* const*>(given);
+                (*target)(x, y, *static_cast<const CellRecord*>(element));
                 return true;
             },
-            &context);
+            &at);
     }
 
 private:

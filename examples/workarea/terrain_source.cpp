@@ -1,4 +1,4 @@
-#include "synthetic_terrain.h"
+#include "terrain_source.h"
 
 #include <algorithm>
 #include <cmath>

@@ -1,4 +1,4 @@
-#include "point_runs.h"
+#include "point_files.h"
 
 #include <algorithm>
 #include <stdexcept>
@@ -6,7 +6,7 @@
 #include "interrupt.h"
 
 void PointRuns::add(const Point& point) {
-    if (m_runs.empty() || m_runs.back().end == m_runs.back().block + POINTS_IN_BLOCK) {
+    if (m_runs.empty() || m_runs.back().end == m_runs.back().block + BLOCK_BYTES / sizeof(Point)) {
         close_run();
         auto* const block = static_cast<Point*>(m_allocator.Alloc(BLOCK_BYTES));
         if (block == nullptr) {
@@ -16,7 +16,6 @@ void PointRuns::add(const Point& point) {
         m_most_runs = std::max(m_most_runs, m_runs.size());
     }
     *m_runs.back().end++ = point;
-    ++m_points;
 }
 
 void PointRuns::close_run() {
@@ -43,10 +42,21 @@ void PointRuns::take_in_order(const std::function<void(const Point&)>& visit) {
             stop_if_interrupted();
         }
     }
-    m_points = 0;
 }
 
 std::int64_t PointRuns::files() const {
     constexpr std::size_t BLOCKS_IN_FILE = FILE_BYTES / BLOCK_BYTES;
     return static_cast<std::int64_t>((m_most_runs + BLOCKS_IN_FILE - 1) / BLOCKS_IN_FILE);
+}
+
+void PointStore::add(const Point& point) {
+    if (m_points == files() * POINTS_IN_MAP) {
+        stop_if_interrupted();
+        auto map = std::make_unique<vex_util::CMemoryMap>();
+        if (!map->Create(FILE_BYTES)) {
+            throw std::runtime_error("no room for 64 MiB of points, in the temporary folder or in memory");
+        }
+        m_maps.push_back(std::move(map));
+    }
+    points_of(*m_maps.back())[m_points++ % POINTS_IN_MAP] = point;
 }

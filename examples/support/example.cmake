@@ -1,0 +1,32 @@
+# What all example programs are built of, and how. Needs two Debian packages: libfmt-dev, nlohmann-json3-dev.
+if(NOT TARGET basalt::basalt)
+  find_package(basalt REQUIRED)
+  option(BASALT_BUILD_TESTS "Register the tests" ON)
+  if(BASALT_BUILD_TESTS)
+    enable_testing()
+  endif()
+endif()
+find_package(fmt REQUIRED)
+find_package(nlohmann_json REQUIRED)
+
+if(NOT TARGET example_support)
+  set(support ${CMAKE_CURRENT_LIST_DIR})
+  set(console ${support}/../../console)
+  add_library(example_support STATIC
+    ${support}/drawing.cpp ${support}/output_file.cpp ${support}/program_options.cpp ${support}/progress.cpp
+    ${support}/text.cpp ${console}/command_line.cpp ${console}/csv_reader.cpp ${console}/program.cpp)
+  target_include_directories(example_support PUBLIC ${support} ${console})
+  target_compile_features(example_support PUBLIC cxx_std_20)
+  target_link_libraries(example_support PUBLIC
+    basalt::basalt fmt::fmt nlohmann_json::nlohmann_json $<TARGET_NAME_IF_EXISTS:basalt_options>)
+endif()
+
+# example_program(<name> <source>...): the program and its test.
+function(example_program name)
+  add_executable(${name} ${ARGN})
+  target_link_libraries(${name} PRIVATE example_support)
+  if(BASALT_BUILD_TESTS)
+    add_test(NAME ${name}_command_line COMMAND bash ${CMAKE_CURRENT_SOURCE_DIR}/${name}_test.sh
+      $<TARGET_FILE:${name}> ${CMAKE_CURRENT_FUNCTION_LIST_DIR}/../data)
+  endif()
+endfunction()

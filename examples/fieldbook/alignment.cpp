@@ -107,19 +107,14 @@ std::vector<double> stops(double chainage, double length, double interval) {
 AxisPoint along(const Element& element, const AxisPoint& start, double grade, double length) {
     AxisPoint point = start;
     const double rise = grade * length;
-    switch (element.kind) {
-        case ElementKind::STRAIGHT:
-            geo_grid_follow2(start.at, start.bearing, length, grade, point.at);
-            break;
-        case ElementKind::SPIRAL_IN:
-            point = along_spiral_in(element, start, length, rise);
-            break;
-        case ElementKind::ARC:
-            point = along_arc(element, start, length, rise);
-            break;
-        case ElementKind::SPIRAL_OUT:
-            point = along_spiral_out(element, start, length, rise);
-            break;
+    if (element.kind == ElementKind::STRAIGHT) {
+        geo_grid_follow2(start.at, start.bearing, length, grade, point.at);
+    } else if (element.kind == ElementKind::SPIRAL_IN) {
+        point = along_spiral_in(element, start, length, rise);
+    } else if (element.kind == ElementKind::ARC) {
+        point = along_arc(element, start, length, rise);
+    } else {
+        point = along_spiral_out(element, start, length, rise);
     }
     point.bearing = geo_normalised_bearing(point.bearing);
     return point;

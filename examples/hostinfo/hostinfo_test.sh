@@ -29,7 +29,7 @@ for option in root product; do # 259 characters, which are more bytes
     long=$(printf '\303\251%0258d' 0)
     succeeds --$option "$long"
     shows "$option $long"
-    refused "option --$option takes a path of at most 259 characters, not '??$(printf '%038d' 0)...'" --$option "${long}1"
+    refused "--$option takes a path of 1 to 259 characters, not '??$(printf '%038d' 0)...'" --$option "${long}1"
 done
 
 # JSON, read back by whoever can

@@ -63,8 +63,7 @@ struct Program {
     std::function<std::string(const std::vector<std::string>& operands)> run;
 };
 
-/// Runs a program and prints its text, its usage or its version. Exit status as exit_status_of(); the
-/// program's own InputErrors too.
+/// Runs a program and prints its text, its usage or its version. Errors and exit status as exit_status_of().
 int run_program(const Program& program, int count, char** arguments);
 
 /// The one operand of a program that takes one at most; nothing without it. InputError for a second one;

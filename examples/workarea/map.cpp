@@ -45,14 +45,18 @@ CanvasPoint on_map(const Map& map, const geo_nee& point) {
             (corner.north - point.north) / map.metres_per_pixel};
 }
 
+std::vector<CanvasPoint> boundary_on(const Map& map) {
+    std::vector<CanvasPoint> points;
+    for (const geo_nee& point : map.outcome.boundary) {
+        points.push_back(on_map(map, point));
+    }
+    return points;
+}
+
 /// Which pixels count, row by row: inside the view, and inside the boundary by the even-odd rule.
 class CountedPixels {
 public:
-    explicit CountedPixels(const Map& map) : m_map(map) {
-        for (const geo_nee& point : map.outcome.boundary) {
-            m_boundary.push_back(on_map(map, point));
-        }
-    }
+    explicit CountedPixels(const Map& map) : m_map(map), m_boundary(boundary_on(map)) {}
     /// Must come before `counts` for the pixels of a row.
     void go_to_row(int y) {
         m_crossings.clear();
@@ -105,10 +109,7 @@ void draw_polygon(Canvas& canvas, const std::vector<CanvasPoint>& points, double
 }
 
 void draw_boundary(const Map& map, Canvas& canvas) {
-    std::vector<CanvasPoint> points;
-    for (const geo_nee& point : map.outcome.boundary) {
-        points.push_back(on_map(map, point));
-    }
+    const std::vector<CanvasPoint> points = boundary_on(map);
     draw_polygon(canvas, points, 4.5, PAPER, 0.8);
     draw_polygon(canvas, points, 2.0, INK, 1.0);
 }
@@ -122,10 +123,14 @@ void draw_view(const Map& map, Canvas& canvas) {
         return CanvasPoint{std::clamp(point.x, -BEYOND, map.width + BEYOND),
                            std::clamp(point.y, -BEYOND, map.height + BEYOND)};
     };
-    const CanvasPoint upper_left = near_map(on_map(map, plane.to_grid(view.west, view.north, 0.0)));
-    const CanvasPoint lower_right = near_map(on_map(map, plane.to_grid(view.east, view.south, 0.0)));
-    const auto dashed = [&](CanvasPoint from, CanvasPoint to) {
+    const CanvasPoint a = near_map(on_map(map, plane.to_grid(view.west, view.north, 0.0)));
+    const CanvasPoint c = near_map(on_map(map, plane.to_grid(view.east, view.south, 0.0)));
+    const std::vector<CanvasPoint> corners = {a, {c.x, a.y}, c, {a.x, c.y}};
+    draw_polygon(canvas, corners, 4.0, PAPER, 0.7);
+    for (std::size_t i = 0; i < corners.size(); ++i) {
         constexpr double DASH = 9.0;
+        const CanvasPoint from = corners[i];
+        const CanvasPoint to = corners[(i + 1) % corners.size()];
         const double length = std::hypot(to.x - from.x, to.y - from.y);
         const auto at = [&](double along) {
             const double part = std::min(1.0, along / length);
@@ -134,14 +139,7 @@ void draw_view(const Map& map, Canvas& canvas) {
         for (double along = 0.0; along < length; along += 2.0 * DASH) {
             canvas.line(at(along), at(along + DASH), 2.0, INK);
         }
-    };
-    const CanvasPoint upper_right = {lower_right.x, upper_left.y};
-    const CanvasPoint lower_left = {upper_left.x, lower_right.y};
-    draw_polygon(canvas, {upper_left, upper_right, lower_right, lower_left}, 4.0, PAPER, 0.7);
-    dashed(upper_left, upper_right);
-    dashed(upper_right, lower_right);
-    dashed(lower_right, lower_left);
-    dashed(lower_left, upper_left);
+    }
 }
 
 }  // namespace

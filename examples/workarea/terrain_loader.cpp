@@ -24,16 +24,12 @@ struct Gradient {
 
 /// Rise per metre along one axis at `here`, from its neighbours a step before and a step after it.
 Gradient gradient(double before, double here, double after, double step) {
-    if (has_elevation(before) && has_elevation(after)) {
-        return {(after - before) / (2.0 * step), 0};
+    const int steps = (has_elevation(before) ? 1 : 0) + (has_elevation(after) ? 1 : 0);
+    if (steps == 0) {
+        return {0.0, CellRecord::SLOPE_UNKNOWN};
     }
-    if (has_elevation(after)) {
-        return {(after - here) / step, CellRecord::SLOPE_ONE_SIDED};
-    }
-    if (has_elevation(before)) {
-        return {(here - before) / step, CellRecord::SLOPE_ONE_SIDED};
-    }
-    return {0.0, CellRecord::SLOPE_UNKNOWN};
+    const double rise = (has_elevation(after) ? after : here) - (has_elevation(before) ? before : here);
+    return {rise / (steps * step), steps == 2 ? 0U : CellRecord::SLOPE_ONE_SIDED};
 }
 
 void store_row(WorkArea& area, int y, const std::vector<double>& north, const std::vector<double>& row,

@@ -49,7 +49,12 @@ void* HeapPart::allocate(std::size_t size) {
         return nullptr;
     }
     const std::lock_guard guard(m_lock);
-    Block* block = need < m_single_from ? allocate_shared(need) : allocate_single(need);
+    Block* block = need < QuickLists::SIZE_LIMIT ? m_quick.take(need, m_tag) : nullptr;
+    if (block != nullptr) {
+        m_live_shared += need;
+    } else {
+        block = need < m_single_from ? allocate_shared(need) : allocate_single(need);
+    }
     if (block == nullptr) {
         return nullptr;
     }
@@ -58,6 +63,8 @@ void* HeapPart::allocate(std::size_t size) {
 }
 
 DWORD HeapPart::release(void* payload) {
+    // The head is often not in the cache: its miss overlaps with the lock and the search.
+    __builtin_prefetch(static_cast<std::byte*>(payload) - HEAD_BYTES);
     const std::lock_guard guard(m_lock);
     const Region* region = region_of_live(payload);
     if (region == nullptr) {
@@ -137,13 +144,8 @@ Block* HeapPart::find_free(std::size_t need) {
     return block != nullptr ? block : m_free.find_in_own_list(need, ATTEMPTS_BEFORE_GROWTH);
 }
 
+// A block of a shared region that is in no quick list.
 Block* HeapPart::allocate_shared(std::size_t need) {
-    if (need < QuickLists::SIZE_LIMIT) {
-        if (Block* block = m_quick.take(need, m_tag)) {
-            m_live_shared += need;
-            return block;
-        }
-    }
     Block* block = find_free(need);
     if (block == nullptr && m_quick.bytes() != 0) {
         empty_quick_lists(0);
@@ -177,9 +179,13 @@ void HeapPart::free_shared(Block* block) {
         }
     }
     m_quick.insert(block, size);
-    // Blocks in quick lists hide idle regions: no more of them than may be kept.
-    const std::size_t spare = m_mapped_shared - m_live_shared;
-    empty_quick_lists(spare <= m_most_idle ? MOST_QUICK : 0);
+    // Blocks in quick lists hide idle regions: no more of them than may be kept. One region is not idle
+    // before its last block is freed.
+    const bool hide_none = has_one_region() && m_live_shared != 0;
+    const std::size_t most = hide_none || m_mapped_shared - m_live_shared <= m_most_idle ? MOST_QUICK : 0;
+    if (m_quick.bytes() > most) {
+        empty_quick_lists(most);
+    }
 }
 
 // Coalesces blocks of the quick lists until they hold at most so many bytes.

@@ -43,9 +43,13 @@ private:
 
     const Region* region_of_live(void* payload) const;
 
-    Block* allocate_shared(std::size_t need);
+    // Not inlined: the usual calls end in the quick lists and stay short.
+    [[gnu::noinline]] Block* allocate_shared(std::size_t need);
+    [[gnu::noinline]] Block* allocate_single(std::size_t need);
+    [[gnu::noinline]] void empty_quick_lists(std::size_t most);
+    [[gnu::noinline]] void coalesce(Block* block);
+    [[gnu::noinline]] bool unmap_region(const Region& region);
     Block* add_shared_region(std::size_t need);
-    Block* allocate_single(std::size_t need);
     bool make_room(std::size_t bytes);
     bool has_one_region() const { return m_single_from == ~std::size_t{0}; }
     Block* add_region(std::byte* begin, std::size_t size, bool single);
@@ -53,8 +57,6 @@ private:
     Block* find_free(std::size_t need);
     void split(Block* block, std::size_t need);
     void free_shared(Block* block);
-    void empty_quick_lists(std::size_t most);
-    void coalesce(Block* block);
     bool resize_in_place(Block* block, std::size_t need);
     bool resize_single(Block*& block, std::size_t need, const Region& region);
 
@@ -62,7 +64,6 @@ private:
     void keep_idle_region(Block* block, std::size_t bytes);
     bool drop_idle_regions();
     bool drop_free_region(Block* block);
-    bool unmap_region(const Region& region);
 
     // The members that every allocation uses come first.
     std::uint64_t m_tag;  // of this heap's live blocks

@@ -13,24 +13,6 @@ RegionTable::~RegionTable() {
     }
 }
 
-const Region* RegionTable::search(const std::byte* address) const {
-    if (m_count == 0) {
-        return nullptr;
-    }
-    // Branchless binary search: the branches would be unpredictable.
-    const Region* last_before = m_regions;
-    for (std::size_t rest = m_count; rest > 1;) {
-        const std::size_t half = rest / 2;
-        last_before = last_before[half].begin <= address ? last_before + half : last_before;
-        rest -= half;
-    }
-    if (address < last_before->begin || address >= last_before->begin + last_before->size) {
-        return nullptr;
-    }
-    m_recent = static_cast<std::size_t>(last_before - m_regions);
-    return last_before;
-}
-
 bool RegionTable::reserve_one() {
     if (m_count < m_capacity) {
         return true;
@@ -58,7 +40,6 @@ void RegionTable::insert(const Region& region) {
     std::move_backward(place, end, end + 1);
     *place = region;
     ++m_count;
-    m_recent = static_cast<std::size_t>(place - m_regions);
 }
 
 void RegionTable::erase(const std::byte* begin) {

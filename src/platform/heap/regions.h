@@ -23,14 +23,20 @@ public:
 
     std::span<const Region> all() const { return {m_regions, m_count}; }
 
-    // The region that holds a pointer, or null. Consecutive calls mostly look for the same region.
+    // The region that holds a pointer, or null.
     const Region* find(const void* pointer) const {
-        const auto* address = static_cast<const std::byte*>(pointer);
-        const Region& recent = m_regions[m_recent];
-        if (m_recent < m_count && address >= recent.begin && address < recent.begin + recent.size) {
-            return &recent;
+        if (m_count == 0) {
+            return nullptr;
         }
-        return search(address);
+        // Binary search without branches, which blocks freed in random order would mispredict.
+        const auto* const address = static_cast<const std::byte*>(pointer);
+        const Region* region = m_regions;
+        for (std::size_t rest = m_count; rest > 1;) {
+            const std::size_t half = rest / 2;
+            region = region[half].begin <= address ? region + half : region;
+            rest -= half;
+        }
+        return address >= region->begin && address < region->begin + region->size ? region : nullptr;
     }
 
     // Makes space for the next insert(); false when out of memory.
@@ -39,15 +45,12 @@ public:
     void erase(const std::byte* begin);
 
 private:
-    const Region* search(const std::byte* address) const;
-
     static constexpr std::size_t INLINE_REGIONS = 32;  // heaps up to about 750 MiB need no further pages
 
     std::array<Region, INLINE_REGIONS> m_inline{};
     Region* m_regions = m_inline.data();
     std::size_t m_count = 0;
     std::size_t m_capacity = INLINE_REGIONS;
-    mutable std::size_t m_recent = 0;
 };
 
 }  // namespace basalt::platform

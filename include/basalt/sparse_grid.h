@@ -50,7 +50,9 @@ public:
         if constexpr (sizeof(T) >= sizeof(void*)) {
             array().Insert(x, y, &value);
         } else {
-            SparseCells::insert_row(array(), x, y, &value, sizeof(T), 1);
+            unsigned char slot[SLOT] = {};
+            std::memcpy(slot, &value, sizeof(T));
+            array().Insert(x, y, slot);
         }
     }
 

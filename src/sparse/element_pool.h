@@ -2,6 +2,7 @@
 #ifndef BASALT_SRC_SPARSE_ELEMENT_POOL_H
 #define BASALT_SRC_SPARSE_ELEMENT_POOL_H
 
+#include <algorithm>
 #include <cstddef>
 #include <cstring>
 #include <utility>
@@ -53,6 +54,13 @@ public:
 
     // The list has space for every slot of the pool.
     void Give(void* slot) noexcept { m_free[m_freeCount++] = slot; }
+
+    // Gives those that are not null, by ascending index.
+    void GiveRow(void* const* slots, std::size_t count) noexcept {
+        void** const end = std::copy_if(slots, slots + count, m_free + m_freeCount,
+                                        [](void* slot) { return slot != nullptr; });
+        m_freeCount = static_cast<std::size_t>(end - m_free);
+    }
 
     // Returns every chunk to the shared heap, in the order of allocation.
     void Clear() noexcept;

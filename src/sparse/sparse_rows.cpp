@@ -177,13 +177,8 @@ std::size_t SparseContents::RemoveRow(int x, int y, std::size_t count) noexcept 
         if (!piece.block) {
             return;
         }
-        for (std::size_t i = 0; i < piece.count; ++i) {
-            void*& slot = piece.Slots()[i];
-            if (slot != nullptr) {
-                m_elements.Give(slot);
-                slot = nullptr;
-            }
-        }
+        m_elements.GiveRow(piece.Slots(), piece.count);
+        std::fill_n(piece.Slots(), piece.count, nullptr);
         Word(piece.block, piece.cell) &= ~piece.Mask();
     });
     return before - m_elements.Size();

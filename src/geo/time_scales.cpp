@@ -40,8 +40,8 @@ int day_of_week_by_date(int year, int month, int day) {
 std::uint32_t _greg2mjd(std::uint16_t year, std::uint16_t month, std::uint16_t day) {
     const int a = (month - 14) / 12;  // -1 for January and February
     const auto y = static_cast<std::uint32_t>(year + a);
-    const auto days = static_cast<std::uint32_t>(367 * (month - 2 - 12 * a) / 12);
-    return day + days - DATE_TO_MJD - 3 * ((y + 4900) / 100) / 4 + 1461 * (y + 4800) / 4;
+    const auto m = static_cast<std::uint32_t>(month - 2 - 12 * a);  // 1 for March
+    return day + 367 * m / 12 - DATE_TO_MJD - 3 * ((y + 4900) / 100) / 4 + 1461 * (y + 4800) / 4;
 }
 
 void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std::uint16_t& day,
@@ -51,16 +51,16 @@ void _mjd2greg(std::uint32_t mjd, std::uint16_t& year, std::uint16_t& month, std
         year = month = day = dayOfWeek = 0;
         return;
     }
-    const std::uint32_t n = 4 * counted / 146097;
-    std::uint32_t l = counted - (146097 * n + 3) / 4;
-    const std::uint32_t i = 4000 * (l + 1) / 1461001;
-    l = l - 1461 * i / 4 + 31;
-    const std::uint32_t j = 80 * l / 2447;
-    const std::uint32_t k = j / 11;
-    const int whole_year = static_cast<int>(100 * n + i + k) - 4900;
+    // Years begin in March. A century has 146097 quarters of a day, a year 1461, five months 153 days.
+    const std::uint32_t century = 4 * counted / 146097;
+    const std::uint32_t quarter = 4 * counted % 146097 | 3;  // the last one of the day
+    const std::uint32_t fifth = 5 * (quarter % 1461 / 4) + 2;
+    const std::uint32_t m = fifth / 153;  // 0 for March
+    const std::uint32_t next = m >= 10;   // January and February
+    const int whole_year = static_cast<int>(100 * century + quarter / 1461 + next) - 4900;
     year = static_cast<std::uint16_t>(whole_year);
-    month = static_cast<std::uint16_t>(j + 2 - 12 * k);
-    day = static_cast<std::uint16_t>(l - 2447 * j / 80);
+    month = static_cast<std::uint16_t>(m + 3 - 12 * next);
+    day = static_cast<std::uint16_t>(fifth % 153 / 5 + 1);
     constexpr std::uint32_t WEEKDAY_OF_FIRST = 4;  // Thursday, the day that is counted as 0
     dayOfWeek =
         static_cast<std::uint16_t>(whole_year >= 1 && whole_year <= 65535

@@ -1,6 +1,6 @@
 // The elementary functions beside the C library's, over angles up to a whole turn and directions all round: a
 // call for each argument, and for two and four arguments at a time.
-#include "src/geo/elementary/elementary.h"
+#include "src/geo/elementary/four.h"
 
 #include <benchmark/benchmark.h>
 
@@ -60,16 +60,6 @@ void sin_cos_two(benchmark::State& state) {
     const std::vector<double> a = drawn(1, std::numbers::pi);
     run(state, 2, [&](std::size_t i) { return elementary::sin_cos_two(a[i], a[i + 1]); });
 }
-void sin_cos_four(benchmark::State& state) {
-    const std::vector<double> a = drawn(1, std::numbers::pi);
-    double sines[4];
-    double cosines[4];
-    run(state, 4, [&](std::size_t i) {
-        elementary::sin_cos_four(&a[i], sines, cosines);
-        return sines[0] + cosines[3];
-    });
-}
-
 void atan2_basalt(benchmark::State& state) {
     const std::vector<double> y = drawn(1, 1.0), x = drawn(2, 1.0);
     run(state, 1, [&](std::size_t i) { return elementary::atan2(y[i], x[i]); });
@@ -82,15 +72,6 @@ void atan2_two(benchmark::State& state) {
     const std::vector<double> y = drawn(1, 1.0), x = drawn(2, 1.0);
     run(state, 2, [&](std::size_t i) { return elementary::atan2_two(y[i], x[i], y[i + 1], x[i + 1]); });
 }
-void atan2_four(benchmark::State& state) {
-    const std::vector<double> y = drawn(1, 1.0), x = drawn(2, 1.0);
-    double all[4];
-    run(state, 4, [&](std::size_t i) {
-        elementary::atan2_four(&y[i], &x[i], all);
-        return all[0] + all[3];
-    });
-}
-
 void sizes(benchmark::internal::Benchmark* row) {
     row->ArgName("milliradians")->Arg(700)->Arg(3142)->Arg(1000000);
 }
@@ -98,13 +79,34 @@ void sizes(benchmark::internal::Benchmark* row) {
 BENCHMARK(sin_cos_basalt)->Name("sin_cos/basalt")->Apply(sizes);
 BENCHMARK(sin_cos_libc)->Name("sin_cos/libc")->Apply(sizes);
 BENCHMARK(sin_cos_two)->Name("sin_cos_of_two/basalt");
-BENCHMARK(sin_cos_four)->Name("sin_cos_of_four/basalt");
 BENCHMARK(tan_basalt)->Name("tan/basalt")->Apply(sizes);
 BENCHMARK(tan_libc)->Name("tan/libc")->Apply(sizes);
 BENCHMARK(atan2_basalt)->Name("atan2/basalt");
 BENCHMARK(atan2_libc)->Name("atan2/libc");
 BENCHMARK(atan2_two)->Name("atan2_of_two/basalt");
+
+#if defined(__x86_64__)
+[[gnu::target("avx2")]] double sin_cos_avx2(const double* angles) {
+    const elementary::SineCosineFour of = elementary::sin_cos(elementary::load_four(angles));
+    return of.sine[0] + of.sine[1] + of.cosine[2] + of.cosine[3];
+}
+void sin_cos_four(benchmark::State& state) {
+    const std::vector<double> a = drawn(1, std::numbers::pi);
+    run(state, 4, [&](std::size_t i) { return sin_cos_avx2(&a[i]); });
+}
+
+[[gnu::target("avx2")]] double atan2_avx2(const double* y, const double* x) {
+    const elementary::Four of = elementary::atan2(elementary::load_four(y), elementary::load_four(x));
+    return of[0] + of[3];
+}
+void atan2_four(benchmark::State& state) {
+    const std::vector<double> y = drawn(1, 1.0), x = drawn(2, 1.0);
+    run(state, 4, [&](std::size_t i) { return atan2_avx2(&y[i], &x[i]); });
+}
+
+BENCHMARK(sin_cos_four)->Name("sin_cos_of_four/basalt");
 BENCHMARK(atan2_four)->Name("atan2_of_four/basalt");
+#endif
 
 }  // namespace
 

@@ -80,12 +80,15 @@ void arrays(Input& input) {
     require(basalt::to_cartesian(llh, xyz, COUNT) == refused);
     require(basalt::to_geodetic(xyz_of_one, geodetic, COUNT, tolerance) == not_settled);
     basalt::direct(llh, azimuths, distances, ends, at_ends, COUNT);
+    basalt::GeodesicInverse lines[COUNT] = {};
+    basalt::inverse(llh, ends, lines, COUNT);
     for (std::size_t i = 0; i < COUNT; ++i) {
         double at_end = 0;
         geo_llh end = {};
         geo_vincenty_direct(llh[i], azimuths[i], distances[i], at_end, end);
         require(same(xyz[i], xyz_of_one[i]) && same(geodetic[i], llh_of_one[i]));
         require(same(ends[i], end) && same(at_ends[i], at_end));
+        require(same(lines[i], basalt::geodesic_inverse(llh[i], end)));
     }
 }
 

@@ -5,8 +5,7 @@
 
 #include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
-#include "src/geo/elementary/elementary.h"
-#include "src/geo/ellipsoid_constants.h"
+#include "src/geo/ellipsoid_formulas.h"
 #include "src/geo/frame_axes.h"
 
 using namespace basalt::geo;
@@ -19,21 +18,9 @@ constexpr double MERIDIAN_NUMERATOR = 6335439.327292829;
 /// From this tolerance on (radians) the first estimate of the latitude is kept.
 constexpr double NO_ITERATION = 10.0;
 
-/// Square root of 1 - e^2 sin^2 of the latitude.
-double curvature_factor(double sine) {
-    return std::sqrt(1.0 - sine * ECCENTRICITY2 * sine);
-}
-
-double prime_vertical_radius(double sine) {
-    return SEMI_MAJOR_AXIS / curvature_factor(sine);
-}
-
 geo_vector cartesian(const geo_llh& llh) {
-    const auto [latitude, longitude] = elementary::sin_cos_two(llh.latitude, llh.longitude);
-    const double n = prime_vertical_radius(latitude.sine);
-    const double from_axis = (n + llh.height) * latitude.cosine;
-    return {longitude.cosine * from_axis, longitude.sine * from_axis,
-            latitude.sine * (n * Z_FACTOR + llh.height)};
+    const Cartesian<double> of(llh.latitude, llh.longitude, llh.height);
+    return {of.x, of.y, of.z};
 }
 
 /// Latitude and height by the textbook iteration; p is the distance from the axis.
@@ -59,54 +46,6 @@ bool convert_plainly(double p, double z, double tolerance, geo_llh& llh) {
     llh.height = std::abs(latitude) <= POLAR_LATITUDE ? p / elementary::cos(latitude) - n
                                                       : z / sine - n + n * ECCENTRICITY2;
     return true;
-}
-
-/// The same passes without angles: the latitude is the direction of (p, q), and a pass maps q to
-/// z + N e^2 sin = z + a e^2 q / sqrt(p^2 + (1 - e^2) q^2). Two latitudes differ by the angle of tangent
-/// p (q - q') / (p^2 + q q'). False where convert_plainly() might decide otherwise: a tolerance or point out
-/// of range, or a change within rounding of the tolerance.
-bool settle_quickly(double p, double z, double tolerance, double& q) {
-    const double p2 = p * p;
-    const double distance2 = p2 + z * z;
-    if (!(tolerance >= 1e-12 && tolerance <= 0.01 && distance2 > 1e12 && distance2 < 1e300)) {
-        return false;
-    }
-    const double margin = tolerance * 1e-4 + 1e-14;
-    const double base = p * FIRST_ESTIMATE_FACTOR;
-    // The first pass never settles.
-    q = z + AXIS_PULL * z / std::sqrt(base * base + FLAT * (z * z));
-    int passes = 1;
-    for (;;) {
-        const double previous = q;
-        q = z + AXIS_PULL * q / std::sqrt(p2 + FLAT * (q * q));
-        if (++passes > MOST_PASSES) {
-            return false;
-        }
-        const double change = std::abs(q - previous) * p;
-        const double unit = p2 + q * previous;
-        if (change <= (tolerance - margin) * unit) {
-            return true;
-        }
-        if (!(change > (tolerance + margin) * unit)) {
-            return false;
-        }
-    }
-}
-
-/// Latitude and height after settle_quickly(); false within rounding of the latitude where the height's
-/// formula changes.
-bool convert_quickly(double p, double z, double tolerance, geo_llh& llh) {
-    double q = 0.0;
-    if (!settle_quickly(p, z, tolerance, q)) {
-        return false;
-    }
-    llh.latitude = elementary::atan2(q, p);
-    const double length = std::sqrt(p * p + q * q);  // p over the cosine
-    // The divisor is 1 to the bit on the equator, so that heights there are exact.
-    const double n = SEMI_MAJOR_AXIS / (std::sqrt(p * p + FLAT * (q * q)) / length);
-    const double beyond = std::abs(llh.latitude) - POLAR_LATITUDE;
-    llh.height = beyond <= 0.0 ? length - n : z / (q / length) - n + n * ECCENTRICITY2;
-    return std::abs(beyond) > 1e-14;
 }
 
 }  // namespace
@@ -141,7 +80,8 @@ int _xyz2llh(const geo_vector* xyz, geo_llh* llh, double tolerance) {
     geo_llh result = {};
     // First: it overlaps with the dependent roots and divisions of the latitude.
     result.longitude = elementary::atan2(xyz->y, xyz->x);
-    if (!convert_quickly(p, xyz->z, tolerance, result) && !convert_plainly(p, xyz->z, tolerance, result)) {
+    if (!convert_quickly(p, xyz->z, tolerance, result.latitude, result.height) &&
+        !convert_plainly(p, xyz->z, tolerance, result)) {
         return 0;
     }
     *llh = result;

@@ -4,9 +4,7 @@
 #ifndef BASALT_SRC_GEO_GEODESIC_SERIES_H
 #define BASALT_SRC_GEO_GEODESIC_SERIES_H
 
-#include <array>
-#include <cmath>
-
+#include "src/geo/elementary/four.h"
 #include "src/geo/ellipsoid_constants.h"
 
 namespace basalt::geo {
@@ -18,49 +16,53 @@ inline constexpr double EXACT_ECCENTRICITY2 = FLATTENING * (2.0 - FLATTENING);
 inline constexpr double SECOND_ECCENTRICITY2 = EXACT_ECCENTRICITY2 / (AXIS_RATIO * AXIS_RATIO);
 inline constexpr double THIRD_FLATTENING = FLATTENING / (2.0 - FLATTENING);
 
-/// An angle by its sine and cosine.
+/// An angle by its sine and cosine, or four.
+template <typename Lane>
 struct Direction {
-    double sine, cosine;
+    Lane sine, cosine;
 
-    Direction normalised() const {
-        const double length = std::sqrt(sine * sine + cosine * cosine);
+    BASALT_INLINE Direction normalised() const {
+        const Lane length = elementary::root(sine * sine + cosine * cosine);
         return {sine / length, cosine / length};
     }
 };
 
 /// Angle from one direction to another, as a direction. Its sine is not negative.
-inline Direction turn(const Direction& from, const Direction& to) {
-    const double sine = from.cosine * to.sine - from.sine * to.cosine;
-    return {sine > 0.0 ? sine : 0.0, from.cosine * to.cosine + from.sine * to.sine};
+template <typename Lane>
+BASALT_INLINE Direction<Lane> turn(const Direction<Lane>& from, const Direction<Lane>& to) {
+    const Lane sine = from.cosine * to.sine - from.sine * to.cosine;
+    return {sine > 0.0 ? sine : Lane{}, from.cosine * to.cosine + from.sine * to.sine};
 }
 
 /// (1 + excess) (angle + sum over l of coefficients[l - 1] sin(2 l angle)).
-template <std::size_t N>
+template <typename Lane, int N>
 struct SineSeries {
-    double excess;  ///< small, so that the angle itself is not rounded by it
-    std::array<double, N> coefficients;
+    Lane excess;  ///< small, so that the angle itself is not rounded by it
+    Lane coefficients[N];
 
     /// The sum at an angle, by Clenshaw's recurrence.
-    double sum(const Direction& angle) const {
-        const double twice_cosine = 2.0 * (angle.cosine - angle.sine) * (angle.cosine + angle.sine);
-        double next = 0.0;
-        double last = 0.0;
-        for (std::size_t l = N; l-- > 0;) {
-            const double here = coefficients[l] + twice_cosine * next - last;
+    BASALT_INLINE Lane sum(const Direction<Lane>& angle) const {
+        const Lane twice_cosine = 2.0 * (angle.cosine - angle.sine) * (angle.cosine + angle.sine);
+        Lane next = {};
+        Lane last = {};
+        for (int l = N; l-- > 0;) {
+            const Lane here = coefficients[l] + twice_cosine * next - last;
             last = next;
             next = here;
         }
         return 2.0 * angle.sine * angle.cosine * next;
     }
     /// Difference of the series at two angles that are `arc` apart.
-    double between(const Direction& from, const Direction& to, double arc) const {
+    BASALT_INLINE Lane between(const Direction<Lane>& from, const Direction<Lane>& to,
+                               const Lane& arc) const {
         return arc + (excess * arc + (1.0 + excess) * (sum(to) - sum(from)));
     }
 };
 
 /// I1, the distance over the polar radius; eq. 17, 18.
-inline SineSeries<6> distance_series(double e) {
-    const double e2 = e * e;
+template <typename Lane>
+BASALT_INLINE SineSeries<Lane, 6> distance_series(const Lane& e) {
+    const Lane e2 = e * e;
     return {(e + e2 * (1.0 / 4 + e2 * (1.0 / 64 + e2 / 256))) / (1.0 - e),
             {e * (-1.0 / 2 + e2 * (3.0 / 16 - e2 / 32)), e2 * (-1.0 / 16 + e2 * (1.0 / 32 - e2 * 9.0 / 2048)),
              e * e2 * (-1.0 / 48 + e2 * 3.0 / 256), e2 * e2 * (-5.0 / 512 + e2 * 3.0 / 512),
@@ -68,11 +70,12 @@ inline SineSeries<6> distance_series(double e) {
 }
 
 /// I3, the longitude less the one on the sphere, over -f sin(alpha0); eq. 24, 25.
-inline SineSeries<5> longitude_series(double e) {
+template <typename Lane>
+BASALT_INLINE SineSeries<Lane, 5> longitude_series(const Lane& e) {
     constexpr double n = THIRD_FLATTENING;
     constexpr double n2 = n * n;
-    const double e2 = e * e;
-    const double e3 = e2 * e;
+    const Lane e2 = e * e;
+    const Lane e3 = e2 * e;
     return {-e * ((1.0 / 2 - n / 2) +
                   e * ((1.0 / 4 + n / 8 - n2 * 3 / 8) +
                        e * ((1.0 / 16 + n * 3 / 16 + n2 / 16) + e * ((3.0 / 64 + n / 32) + e * 3.0 / 128)))),

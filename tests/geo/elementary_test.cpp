@@ -1,6 +1,6 @@
 // Results are compared with MPFR-quality rows at hard arguments and with the C library's extended precision
 // at random ones.
-#include "src/geo/elementary/elementary.h"
+#include "src/geo/elementary/four.h"
 
 #include <gtest/gtest.h>
 
@@ -93,7 +93,7 @@ TEST(Elementary, SpecialArgumentsGiveWhatCDefines) {
 
 TEST(Elementary, RandomArgumentsStayWithinTheBoundsInOneLaneTwoAndFour) {
     plain::Random random(3);
-    double y[4] = {}, x[4] = {}, sines[4] = {}, cosines[4] = {}, angles[4] = {};
+    double y[4] = {}, x[4] = {};
     for (int round = 0; round < 200'000; ++round) {
         // Angles of every size, often near multiples of pi/4; directions of every slope, often near 1/4.
         const double size = std::exp2(random.real(-30.0, round % 64 == 3 ? 1000.0 : 17.0));
@@ -112,18 +112,16 @@ TEST(Elementary, RandomArgumentsStayWithinTheBoundsInOneLaneTwoAndFour) {
         const double quarter = std::remainder(a, 1.5);
         EXPECT_LE(elementary::sin(quarter), elementary::sin(std::nextafter(quarter, INF)));
         EXPECT_LE(elementary::atan(a), elementary::atan(std::nextafter(a, INF)));
-        if (round % 4 == 3) {
-            elementary::sin_cos_four(y, sines, cosines);
-            elementary::atan2_four(y, x, angles);
-        }
+        const elementary::SineCosineFour of = elementary::sin_cos(elementary::load_four(y));
+        const elementary::Four angles = elementary::atan2(elementary::load_four(y), elementary::load_four(x));
         for (int i = 0; i < 4 && round % 4 == 3; ++i) {
             const int other = (i + 1) % 4;
             const elementary::SineCosineTwo two = elementary::sin_cos_two(y[other], y[i]);
-            expect_same(elementary::sin(y[i]), sines[i]);
-            expect_same(elementary::cos(y[i]), cosines[i]);
+            expect_same(elementary::sin(y[i]), of.sine[i]);
+            expect_same(elementary::cos(y[i]), of.cosine[i]);
             expect_same(elementary::atan2(y[i], x[i]), angles[i]);
-            expect_same(two.second.sine, sines[i]);
-            expect_same(two.second.cosine, cosines[i]);
+            expect_same(two.second.sine, of.sine[i]);
+            expect_same(two.second.cosine, of.cosine[i]);
             expect_same(elementary::atan2_two(y[other], x[other], y[i], x[i]).second, angles[i]);
         }
         ASSERT_FALSE(HasFailure());

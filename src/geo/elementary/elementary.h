@@ -26,8 +26,7 @@ double atan(double slope);
 /// Angle of the direction (x, y) from the x axis, in [-pi, pi].
 double atan2(double y, double x);
 
-// Several at a time, each with the bits of the single function. Two take little more time than one, and so do
-// four with AVX2.
+// Two at a time, each with the bits of the single function, in little more time than one. Four are in four.h.
 
 struct SineCosineTwo {
     SineCosine first, second;
@@ -38,10 +37,6 @@ struct AngleTwo {
 
 SineCosineTwo sin_cos_two(double first, double second);
 AngleTwo atan2_two(double first_y, double first_x, double second_y, double second_x);
-
-/// Arrays of four, which may be the same.
-void sin_cos_four(const double* angles, double* sines, double* cosines);
-void atan2_four(const double* y, const double* x, double* angles);
 
 }  // namespace basalt::geo::elementary
 

@@ -64,15 +64,21 @@ double extent_of(const geo_nee& a, const geo_nee& b) {
     return std::abs(a.north - b.north) + std::abs(a.east - b.east);
 }
 
-/// Crossings by the even-odd rule over some quads, and whether the point is a vertex of them.
-struct Found {
-    unsigned crossings = 0;  ///< parity, spread over four bits
-    bool is_vertex = false;
-};
-
 }  // namespace
 
-/// The quads' tests, in a portable form and with AVX2.
+[[gnu::always_inline]] inline std::size_t PreparedPolygon::bucket_of(double north) const noexcept {
+    // NaN goes to the first bucket; otherwise the function is monotone, whatever is rounded. A signed number
+    // takes one instruction to convert.
+    const double at = std::min(std::max(0.0, (north - m_low) * m_scale), m_last);
+    return static_cast<std::size_t>(static_cast<std::ptrdiff_t>(at));
+}
+
+[[gnu::always_inline]] inline const PreparedPolygon::Quad* PreparedPolygon::quads_of(
+    std::size_t bucket) const noexcept {
+    return m_quads.data() + m_first[bucket];
+}
+
+/// The quads' tests, in a portable form and with AVX2. Every bucket has a quad.
 struct PolygonQuads {
     using Quad = PreparedPolygon::Quad;
 
@@ -81,33 +87,42 @@ struct PolygonQuads {
         return {quad.previous_north[k], quad.previous_east[k], 0.0};
     }
 
-    static Found find_portable(const Quad* begin, const Quad* end, const geo_nee& point) {
-        Found found;
-        for (const Quad* quad = begin; quad != end; ++quad) {
+    /// Whether an odd number of edges crosses east of the point or, with VertexTest::YES, the point is a
+    /// vertex.
+    template <VertexTest TEST>
+    static bool contains_portable(const PreparedPolygon& polygon, const geo_nee& point) {
+        const std::size_t bucket = polygon.bucket_of(point.north);
+        const Quad* const end = polygon.quads_of(bucket + 1);
+        bool is_inside = false;
+        for (const Quad* quad = polygon.quads_of(bucket); quad != end; ++quad) {
             for (std::size_t k = 0; k < 4; ++k) {
                 const geo_nee v = vertex(*quad, k);
-                found.crossings ^= crosses_east_of(previous(*quad, k), v, point) ? 1U : 0U;
-                found.is_vertex = found.is_vertex || (v.north == point.north && v.east == point.east);
+                if (TEST == VertexTest::YES && v.north == point.north && v.east == point.east) {
+                    return true;
+                }
+                is_inside ^= crosses_east_of(previous(*quad, k), v, point);
             }
         }
-        return found;
+        return is_inside;
     }
 
 #if BASALT_HAS_AVX2_FORM
-    [[gnu::target("avx2")]] static Found find_avx2(const Quad* begin, const Quad* end, const geo_nee& point) {
+    template <VertexTest TEST>
+    [[gnu::target("avx2")]] static bool contains_avx2(const PreparedPolygon& polygon, const geo_nee& point) {
         const __m256d north = _mm256_set1_pd(point.north);
         const __m256d east = _mm256_set1_pd(point.east);
         __m256d crossings = _mm256_setzero_pd();
         __m256d same = _mm256_setzero_pd();
-        for (const Quad* quad = begin; quad != end; ++quad) {
+        const std::size_t bucket = polygon.bucket_of(point.north);
+        const Quad* const end = polygon.quads_of(bucket + 1);
+        const Quad* quad = polygon.quads_of(bucket);
+        do {
             const __m256d ni = _mm256_loadu_pd(quad->north);
             const __m256d nj = _mm256_loadu_pd(quad->previous_north);
             const __m256d ei = _mm256_loadu_pd(quad->east);
-            const __m256d not_above_i = _mm256_cmp_pd(ni, north, _CMP_LE_OQ);
-            const __m256d not_above_j = _mm256_cmp_pd(nj, north, _CMP_LE_OQ);
+            // With NaN among the northings the crossing is NaN, which is not east of the point.
             const __m256d straddles =
-                _mm256_or_pd(_mm256_and_pd(not_above_i, _mm256_cmp_pd(north, nj, _CMP_LT_OQ)),
-                             _mm256_and_pd(not_above_j, _mm256_cmp_pd(north, ni, _CMP_LT_OQ)));
+                _mm256_xor_pd(_mm256_cmp_pd(ni, north, _CMP_LE_OQ), _mm256_cmp_pd(nj, north, _CMP_LE_OQ));
             // Nothing is divided by the 0 of a level edge, which a host may trap.
             const __m256d rise =
                 _mm256_blendv_pd(_mm256_set1_pd(LEVEL_EDGE_RISE), _mm256_sub_pd(nj, ni), straddles);
@@ -116,20 +131,24 @@ struct PolygonQuads {
             const __m256d crossing = _mm256_add_pd(_mm256_div_pd(run, rise), ei);
             crossings =
                 _mm256_xor_pd(crossings, _mm256_and_pd(straddles, _mm256_cmp_pd(crossing, east, _CMP_GT_OQ)));
-            same = _mm256_or_pd(same, _mm256_and_pd(_mm256_cmp_pd(ni, north, _CMP_EQ_OQ),
-                                                    _mm256_cmp_pd(ei, east, _CMP_EQ_OQ)));
-        }
-        return {static_cast<unsigned>(_mm256_movemask_pd(crossings)), _mm256_movemask_pd(same) != 0};
+            if (TEST == VertexTest::YES) {
+                same = _mm256_or_pd(same, _mm256_and_pd(_mm256_cmp_pd(ni, north, _CMP_EQ_OQ),
+                                                        _mm256_cmp_pd(ei, east, _CMP_EQ_OQ)));
+            }
+        } while (++quad != end);
+        return (__builtin_parity(static_cast<unsigned>(_mm256_movemask_pd(crossings))) |
+                _mm256_movemask_pd(same)) != 0;
     }
 #endif
 
-    static Found find(const Quad* begin, const Quad* end, const geo_nee& point) {
+    template <VertexTest TEST>
+    [[gnu::always_inline]] static bool contains(const PreparedPolygon& polygon, const geo_nee& point) {
 #if BASALT_HAS_AVX2_FORM
         if (can_use_avx2()) {
-            return find_avx2(begin, end, point);
+            return contains_avx2<TEST>(polygon, point);
         }
 #endif
-        return find_portable(begin, end, point);
+        return contains_portable<TEST>(polygon, point);
     }
 
     static bool is_in_a_band(const Quad* begin, const Quad* end, const geo_nee& point, double tolerance) {
@@ -146,12 +165,6 @@ struct PolygonQuads {
         return false;
     }
 };
-
-std::size_t PreparedPolygon::bucket_of(double north) const noexcept {
-    const double at = (north - m_low) * m_scale;
-    // NaN goes to the first bucket; otherwise the function is monotone, whatever is rounded.
-    return static_cast<std::size_t>(std::min(at > 0.0 ? at : 0.0, static_cast<double>(m_first.size() - 2)));
-}
 
 std::size_t PreparedPolygon::choose_buckets(const geo_nee* vertices, std::size_t count) {
     const Range range = range_of(vertices, count);
@@ -189,6 +202,7 @@ PreparedPolygon::PreparedPolygon(const geo_nee* vertices, std::size_t count) {
         throw std::length_error("too many vertices for a prepared polygon");
     }
     const std::size_t buckets = choose_buckets(vertices, count);
+    m_last = static_cast<double>(buckets - 1);
     m_first.assign(buckets + 1, 0);
     // Calls visit(bucket, i, j) for each bucket of each edge.
     const auto for_each_place = [&](const auto& visit) {
@@ -202,7 +216,7 @@ PreparedPolygon::PreparedPolygon(const geo_nee* vertices, std::size_t count) {
     };
     for_each_place([&](std::size_t bucket, const geo_nee&, const geo_nee&) { ++m_first[bucket + 1]; });
     for (std::size_t bucket = 0; bucket < buckets; ++bucket) {
-        m_first[bucket + 1] = m_first[bucket] + (m_first[bucket + 1] + 3) / 4;
+        m_first[bucket + 1] = m_first[bucket] + std::max((m_first[bucket + 1] + 3) / 4, 1U);
     }
     const Quad nothing = {{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER}, {}, {}, {}};
     m_quads.assign(m_first.back(), nothing);
@@ -218,13 +232,7 @@ PreparedPolygon::PreparedPolygon(const geo_nee* vertices, std::size_t count) {
 }
 
 bool PreparedPolygon::contains(const geo_nee& point) const noexcept {
-    if (m_first.empty()) {
-        return false;
-    }
-    const std::size_t bucket = bucket_of(point.north);
-    const Found found =
-        PolygonQuads::find(m_quads.data() + m_first[bucket], m_quads.data() + m_first[bucket + 1], point);
-    return found.is_vertex || __builtin_parity(found.crossings) != 0;
+    return !m_first.empty() && PolygonQuads::contains<VertexTest::YES>(*this, point);
 }
 
 void PreparedPolygon::contains(const geo_nee* points, std::size_t count, bool* inside) const noexcept {
@@ -241,8 +249,8 @@ bool PreparedPolygon::contains(const geo_nee& point, double tolerance) const noe
         // The largest margin of may_be_in_band(), and more than what is rounded here.
         const double margin = band_reach(tolerance) + BAND_ROUNDING * m_extent;
         const double reach = margin * (1.0 + 1e-9) + std::abs(point.north) * 1e-15;
-        const Quad* const begin = m_quads.data() + m_first[bucket_of(point.north - reach)];
-        const Quad* const end = m_quads.data() + m_first[bucket_of(point.north + reach) + 1];
+        const Quad* const begin = quads_of(bucket_of(point.north - reach));
+        const Quad* const end = quads_of(bucket_of(point.north + reach) + 1);
         if (PolygonQuads::is_in_a_band(begin, end, point, tolerance)) {
             return true;
         }
@@ -252,10 +260,7 @@ bool PreparedPolygon::contains(const geo_nee& point, double tolerance) const noe
             }
         }
     }
-    const std::size_t bucket = bucket_of(point.north);
-    const Found found =
-        PolygonQuads::find(m_quads.data() + m_first[bucket], m_quads.data() + m_first[bucket + 1], point);
-    return __builtin_parity(found.crossings) != 0;
+    return PolygonQuads::contains<VertexTest::NO>(*this, point);
 }
 
 }  // namespace basalt

@@ -53,8 +53,10 @@ private:
 
     std::size_t choose_buckets(const geo_nee* vertices, std::size_t count);
     std::size_t bucket_of(double north) const noexcept;
+    const Quad* quads_of(std::size_t bucket) const noexcept;  ///< the first; they end at the next bucket's
 
-    double m_low = 0.0, m_scale = 0.0;   ///< bucket = (north - low) * scale, clamped
+    double m_low = 0.0, m_scale = 0.0;  ///< bucket = (north - low) * scale, in [0, last]
+    double m_last = 0.0;
     double m_extent = 0.0;               ///< largest finite extent of an edge, metres
     std::vector<std::uint32_t> m_first;  ///< first quad of each bucket, and the end of the last
     std::vector<Quad> m_quads;

@@ -1,4 +1,4 @@
-# What all example programs are built of, and how. Needs two Debian packages: libfmt-dev, nlohmann-json3-dev.
+# What all example programs are built of, and how. Needs the Debian package libfmt-dev.
 if(NOT TARGET basalt::basalt)
   find_package(basalt REQUIRED)
   option(BASALT_BUILD_TESTS "Register the tests" ON)
@@ -7,7 +7,6 @@ if(NOT TARGET basalt::basalt)
   endif()
 endif()
 find_package(fmt REQUIRED)
-find_package(nlohmann_json REQUIRED)
 
 if(NOT TARGET example_support)
   set(support ${CMAKE_CURRENT_LIST_DIR})
@@ -18,7 +17,7 @@ if(NOT TARGET example_support)
   target_include_directories(example_support PUBLIC ${support} ${console})
   target_compile_features(example_support PUBLIC cxx_std_20)
   target_link_libraries(example_support PUBLIC
-    basalt::basalt fmt::fmt nlohmann_json::nlohmann_json $<TARGET_NAME_IF_EXISTS:basalt_options>)
+    basalt::basalt fmt::fmt $<TARGET_NAME_IF_EXISTS:basalt_options>)
 endif()
 
 # example_program(<name> <source>...): the program and its test.

@@ -44,7 +44,7 @@ set(CPACK_DEBIAN_DOCUMENTATION_PACKAGE_ARCHITECTURE all)
 set(CPACK_COMPONENT_DOCUMENTATION_DESCRIPTION "Reference and guides of basalt
  The reference pages and guides of the basalt runtime library, for a browser.")
 
-# Licence, changes and examples, where Debian looks for them.
+# Licence, changes, and the examples with the sources they share, where Debian looks for them.
 option(BASALT_PACKAGE_DOCS "Install what Debian packages carry as documentation" OFF)
 if(BASALT_PACKAGE_DOCS)
   execute_process(COMMAND gzip -9nc ${PROJECT_SOURCE_DIR}/CHANGELOG.md OUTPUT_FILE ${PROJECT_BINARY_DIR}/changelog.gz)
@@ -53,7 +53,7 @@ if(BASALT_PACKAGE_DOCS)
     install(FILES ${PROJECT_SOURCE_DIR}/cmake/copyright ${PROJECT_BINARY_DIR}/changelog.gz
       DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/${CPACK_DEBIAN_${component}_PACKAGE_NAME} COMPONENT ${name})
   endforeach()
-  install(DIRECTORY ${PROJECT_SOURCE_DIR}/examples
+  install(DIRECTORY ${PROJECT_SOURCE_DIR}/examples ${PROJECT_SOURCE_DIR}/console
     DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/${CPACK_DEBIAN_DOCUMENTATION_PACKAGE_NAME} COMPONENT documentation
     PATTERN "*test*" EXCLUDE)
 endif()

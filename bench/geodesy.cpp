@@ -162,6 +162,12 @@ void inverse_basalt(benchmark::State& state) {
     run_inverse(state, inverse);
 }
 
+void inverse_arrays(benchmark::State& state) {
+    const std::vector<geo_llh> to = ends(metres(state));
+    std::vector<basalt::GeodesicInverse> out(COUNT);
+    run_arrays(state, [&] { basalt::inverse(places().geodetic.data(), to.data(), out.data(), COUNT); });
+}
+
 // Cross-track: points some 600 m beside a line of 60 km.
 
 void crosstrack_basalt(benchmark::State& state) {
@@ -192,6 +198,7 @@ BENCHMARK(to_local_basalt)->Name("to_local/basalt");
 BENCHMARK(to_local_arrays)->Name("to_local/arrays");
 BENCHMARK(to_local_single_call)->Name("to_local/single_call");
 BENCHMARK(inverse_basalt)->Name("inverse/basalt")->Apply(distances);
+BENCHMARK(inverse_arrays)->Name("inverse/arrays")->Apply(distances);
 BENCHMARK(crosstrack_basalt)->Name("crosstrack/basalt");
 BENCHMARK(crosstrack_steps)->Name("crosstrack/metre_steps");
 #ifdef BENCH_HAS_GEOGRAPHICLIB

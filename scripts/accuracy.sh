@@ -41,24 +41,42 @@ write_lines() {  # count, file
     } >"$2"
 }
 
+# Pairs of places, and the shortest line between them.
+write_pairs() {  # count, file
+    "$accuracy" pairs "$1" >"$build/pairs.txt"
+    {
+        echo "# Made by GeodSolve -E -i -p 10 ($geographiclib, WGS84). Of every eight rows: anywhere, near, nearly opposite,"
+        echo "# along a meridian, along the equator, from a pole, up to 1400 km, nearly opposite beside the equator."
+        echo "# Columns: start latitude, longitude, end latitude, longitude (degrees), azimuth at start and end (degrees),"
+        echo "# distance (metres)."
+        paste -d' ' "$build/pairs.txt" <(GeodSolve -E -i -p 10 <"$build/pairs.txt") | columns
+    } >"$2"
+}
+
 if [ "${1:-}" = --data ]; then
     write_points "${COUNT:-240}" tests/data/cartesian_geodetic.csv
     write_lines "${COUNT:-240}" tests/data/geodesics.csv
+    write_pairs "${COUNT:-280}" tests/data/geodesic_inverse.csv
     exit 0
 fi
 
 write_points "${COUNT:-40000}" "$build/points.csv"
 write_lines "${COUNT:-40000}" "$build/lines.csv"
+write_pairs "${COUNT:-40000}" "$build/pairs.csv"
 # A second program, in case the first is wrong.
 apart=$(awk '{ print $2, $1, $3, 0 }' "$build/points.txt" | cct -d 12 +proj=cart +ellps=WGS84 |
     paste -d' ' - <(grep -v '^#' "$build/points.csv" | tr , ' ') |
     awk '{ d = sqrt(($1-$8)^2 + ($2-$9)^2 + ($3-$10)^2); if (d > most) most = d } END { printf "%.1e", most }')
+series=$(paste -d' ' <(GeodSolve -i -p 10 <"$build/pairs.txt") <(grep -v '^#' "$build/pairs.csv" | tr , ' ') |
+    awk '{ d = $3 > $10 ? $3 - $10 : $10 - $3; if (d > most) most = d } END { printf "%.1e", most }')
 {
     echo "References: $geographiclib (\`CartConvert\`, \`GeodSolve -E\`). $proj (\`cct +proj=cart\`) puts the same"
-    echo "points at most $apart m elsewhere. ${COUNT:-40000} points, ${COUNT:-40000} lines. Each cell: median / RMS / largest."
+    echo "points at most $apart m elsewhere; \`GeodSolve\` without \`-E\` finds distances at most $series m different."
+    echo "${COUNT:-40000} points, lines and pairs each. Each cell: median / RMS / largest."
     echo
     "$accuracy" ellipsoid "$build/points.csv"
     "$accuracy" geodesic "$build/lines.csv"
+    "$accuracy" inverse "$build/pairs.csv"
     "$accuracy" variance "$build/points.csv"
     "$accuracy" spiral
 } >"$build/tables.md"
@@ -69,3 +87,4 @@ before, rest = page.split("<!-- tables -->\n")
 after = rest.split("<!-- end of tables -->\n")[1]
 open(sys.argv[2], "w").write(before + "<!-- tables -->\n" + tables.rstrip() + "\n<!-- end of tables -->\n" + after)
 PYTHON
+python3 scripts/accuracy_chart.py

@@ -12,6 +12,9 @@ namespace accuracy {
 void print_points(int count);
 /// Latitude, longitude, azimuth (degrees), distance.
 void print_lines(int count);
+/// Latitudes and longitudes (degrees) of pairs; of every eight: anywhere, near, nearly opposite, along a
+/// meridian, along the equator, from a pole, up to 1400 km, nearly opposite beside the equator.
+void print_pairs(int count);
 
 /// Rows: latitude, longitude (degrees), height, x, y, z (metres).
 void measure_ellipsoid(const std::vector<ReferenceRow>& rows);
@@ -19,6 +22,8 @@ void measure_variance(const std::vector<ReferenceRow>& rows);
 /// Rows: start latitude, longitude, azimuth (degrees), distance (metres), end latitude, longitude, azimuth;
 /// then azimuth at the start and distance of the shortest line to that end.
 void measure_geodesic(const std::vector<ReferenceRow>& rows);
+/// Rows: both latitudes and longitudes, azimuths at both (degrees), distance (metres).
+void measure_inverse(const std::vector<ReferenceRow>& rows);
 /// Needs no rows: the clothoid's integrals are taken here.
 void measure_spiral();
 

@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <numbers>
@@ -15,6 +16,8 @@ const std::vector<std::string> DISTANCE_BANDS = {
     "1 to 10 m",      "10 to 100 m",       "100 m to 1 km",       "1 to 10 km",         "10 to 100 km",
     "100 to 1000 km", "1000 to 10,000 km", "10,000 to 19,000 km", "19,000 to 20,004 km"};
 const std::vector<double> DISTANCE_BOUNDS = {1.0, 10.0, 100.0, 1e3, 1e4, 1e5, 1e6, 1e7, 1.9e7, 2.0004e7};
+
+constexpr long double SEMI_MAJOR = 6378137.0L;  // metres
 
 /// A point whose foot and distance are known: from the middle of the line, a tenth of its length to the
 /// right.
@@ -72,6 +75,36 @@ void measure_geodesic(const std::vector<ReferenceRow>& rows) {
         "### Cross-track distance, `geo_vincenty_crosstrack`, of a point a tenth of the line's length beside "
         "its middle\n");
     across.print("length of the line");
+}
+
+void measure_inverse(const std::vector<ReferenceRow>& rows) {
+    std::vector<std::string> bands = DISTANCE_BANDS;
+    std::vector<double> bounds = DISTANCE_BOUNDS;
+    bands.insert(bands.begin(), "below 1 m");
+    bounds.insert(bounds.begin(), 0.0);
+    ErrorTable table(bands, bounds, {"distance, m", "azimuths, m aside"});
+    for (const ReferenceRow& row : rows) {
+        double angles[6];
+        for (std::size_t i = 0; i < 6; ++i) {
+            angles[i] = static_cast<double>(radians_of(row[i]));
+        }
+        const basalt::GeodesicInverse line =
+            basalt::geodesic_inverse({angles[0], angles[1], 0.0}, {angles[2], angles[3], 0.0});
+        // What an azimuth's error moves the other end, nearly. On the equator two lines may be as short.
+        const long double lever =
+            SEMI_MAJOR * std::sin(std::min(row[6] / SEMI_MAJOR, std::numbers::pi_v<long double>));
+        const bool is_mirrored = row[0] == 0.0L && row[2] == 0.0L &&
+                                 std::cos(line.azimuth_from) * std::cos(radians_of(row[4])) < 0.0L;
+        const auto turned = [=](double azimuth) {
+            return is_mirrored ? std::numbers::pi - azimuth : azimuth;
+        };
+        const long double from = std::abs(angle_difference(turned(line.azimuth_from), radians_of(row[4])));
+        const long double to = std::abs(angle_difference(turned(line.azimuth_to), radians_of(row[5])));
+        table.add(static_cast<double>(row[6]),
+                  {line.distance - row[6], std::max(from, to) * std::abs(lever)});
+    }
+    std::printf("### Inverse geodesic, `geodesic_inverse`\n");
+    table.print("distance");
 }
 
 }  // namespace accuracy

@@ -23,6 +23,10 @@ int run(int argc, char** argv) {
         accuracy::print_points(std::stoi(argv[2]));
     } else if (what == "lines" && argc == 3) {
         accuracy::print_lines(std::stoi(argv[2]));
+    } else if (what == "pairs" && argc == 3) {
+        accuracy::print_pairs(std::stoi(argv[2]));
+    } else if (what == "inverse" && argc == 3) {
+        accuracy::measure_inverse(rows_of(argv[2], 7));
     } else if (what == "ellipsoid" && argc == 3) {
         accuracy::measure_ellipsoid(rows_of(argv[2], 6));
     } else if (what == "variance" && argc == 3) {
@@ -33,8 +37,8 @@ int run(int argc, char** argv) {
         accuracy::measure_spiral();
     } else {
         std::fprintf(stderr,
-                     "usage: accuracy points|lines COUNT\n"
-                     "       accuracy ellipsoid|variance|geodesic ROWS.csv\n"
+                     "usage: accuracy points|lines|pairs COUNT\n"
+                     "       accuracy ellipsoid|variance|geodesic|inverse ROWS.csv\n"
                      "       accuracy spiral\n");
         return 2;
     }

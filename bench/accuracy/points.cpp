@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <cstdio>
@@ -74,6 +75,30 @@ void print_lines(int count) {
         const double distance = 2.0 * std::pow(10.0, random.between(-0.30103, 7.0));
         const double lat = latitude(random);
         std::printf("%.14f %.14f %.14f %.9f\n", lat, longitude(random), azimuth, distance);
+    }
+}
+
+void print_pairs(int count) {
+    Random random;
+    for (int i = 0; i < count; ++i) {
+        const double lat = latitude(random);
+        const double lon = longitude(random);
+        const double other = latitude(random);
+        const double apart = random.between(-180.0, 180.0);
+        // Degrees: 0.1 mm to 300 km.
+        const double size = std::pow(10.0, random.between(-9.0, 0.5));
+        const double north = random.between(-size, size);
+        const double east = random.between(-size, size);
+        const double pairs[][4] = {{lat, lon, other, lon + apart},
+                                   {lat, lon, lat + north, lon + east},
+                                   {lat, lon, -lat + north, lon + 180.0 + east},
+                                   {lat, lon, other, lon},
+                                   {0.0, lon, 0.0, lon + apart},
+                                   {std::copysign(90.0, lat), lon, other, lon + apart},
+                                   {lat, lon, lat + apart / 20.0, lon + other / 10.0},
+                                   {0.0, lon, north * 1e-3, lon + 180.0 + east}};
+        const auto& [lat1, lon1, lat2, lon2] = pairs[i % 8];
+        std::printf("%.14f %.14f %.14f %.14f\n", lat1, lon1, std::clamp(lat2, -90.0, 90.0), lon2);
     }
 }
 

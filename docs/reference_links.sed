@@ -3,6 +3,3 @@ s#\]\((\.\./)*include/(basalt/[a-z_/]+\.h)\)#](@ref \2)#g
 s#\]\(((\.\./)*(examples|tools|bindings/python|src/platform)/([a-z]+/)?)\)#](\1README.md)#g
 s#\[([^]]*)\]\([a-z/_]*\.py\)#\1#g
 s#\]\((\.\./)+docs/pictures/([a-z]+\.png)\)#](\2)#g
-s#`(geo_(nee|llh|vector|hvd))`#`@\1`#g
-s#`(geo_[a-zA-Z0-9_]+|_[a-z][a-z0-9]+|Varxyz2var[a-z]+|llh_equal|nee_equal|[A-Z][a-z]+FromBitmap|DumpBitmap|RotateBitmap)`#`\1()`#g
-s#`@(geo_[a-z]+)`#`\1`#g

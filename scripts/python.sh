@@ -1,7 +1,9 @@
 #!/usr/bin/env bash
-# Builds the Python package into an environment below build/python, and runs its tests.
+# Builds the Python package into an environment below build/python, runs its tests, and compares its help with the
+# reference in docs/python.md.
 # Usage: scripts/python.sh [pytest options]
 #        scripts/python.sh bench                 measures batch calls beside NumPy, pyproj and shapely
+#        scripts/python.sh reference             writes docs/python.md
 #        scripts/python.sh plot [GRID [PICTURE]]  draws the sample terrain, or another, into build/python/terrain.png
 set -euo pipefail
 . "$(dirname "$0")/packages.sh"
@@ -24,5 +26,9 @@ case ${1:-} in
         "$python" bindings/python/examples/plot_terrain.py "${1:-examples/data/jacksboro.asc}" \
             "${2:-$work/terrain.png}"
         ;;
-    *) "$python" -B -m pytest -q -p no:cacheprovider bindings/python/tests "$@" ;;
+    reference) "$python" bindings/python/reference.py >docs/python.md ;;
+    *)
+        "$python" bindings/python/reference.py docs/python.md
+        "$python" -B -m pytest -q -p no:cacheprovider bindings/python/tests "$@"
+        ;;
 esac

@@ -19,6 +19,7 @@ namespace basalt_python {
 namespace {
 
 namespace py = pybind11;
+using pybind11::literals::operator""_a;
 
 // A path of Python: a text or what has __fspath__. Bytes of a name that are no UTF-8 stand in it as the
 // values 0xDC80 to 0xDCFF, which is what the library makes of them too; pybind11's own conversions refuse
@@ -91,16 +92,20 @@ void add_text(pybind11::module_& module) {
         return names;
     });
 
-    module.def("bytes_to_hex", [](const py::bytes& bytes) {
-        return basalt::StringToHexString(static_cast<std::string>(bytes));
-    });
-    module.def("hex_to_bytes", [](const std::string& text) {
-        if (text.size() % 2 != 0 || !basalt::IsHexString(text)) {
-            throw std::invalid_argument("pairs of hexadecimal digits are wanted");
-        }
-        const std::vector<unsigned char> bytes = basalt::HexStringToVector(text);
-        return py::bytes(reinterpret_cast<const char*>(bytes.data()), bytes.size());
-    });
+    module.def(
+        "bytes_to_hex",
+        [](const py::bytes& bytes) { return basalt::StringToHexString(static_cast<std::string>(bytes)); },
+        "bytes"_a, "Two lower-case digits a byte (basalt::StringToHexString).");
+    module.def(
+        "hex_to_bytes",
+        [](const std::string& text) {
+            if (text.size() % 2 != 0 || !basalt::IsHexString(text)) {
+                throw std::invalid_argument("pairs of hexadecimal digits are wanted");
+            }
+            const std::vector<unsigned char> bytes = basalt::HexStringToVector(text);
+            return py::bytes(reinterpret_cast<const char*>(bytes.data()), bytes.size());
+        },
+        "text"_a, "Bytes of digits in either case; ValueError for other text (basalt::HexStringToVector).");
 }
 
 }  // namespace basalt_python

@@ -18,7 +18,7 @@ def test_hexadecimal_text_there_and_back():
 
 def test_paths_are_taken_apart_and_put_together(tmp_path):
     assert files.split("/site/day 1/lev\u00e9.tar.gz") == ("", "site/day 1", "lev\u00e9.tar", "gz")
-    assert files.combine("/site", "levels.csv") == "/site/levels.csv"
+    assert files.combine("/site", "levels.csv") == files.combine("/site\\", "levels.csv") == "/site/levels.csv"
     assert files.set_extension("/site/levels.csv", "txt") == "/site/levels.txt"
     with pytest.raises(ValueError):
         files.split("a\0b")

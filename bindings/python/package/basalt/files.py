@@ -33,8 +33,9 @@ def split(path: _Path) -> Parts:
 
 
 def combine(first: _Path, second: _Path) -> str:
-    """Both in one path, with a slash between them (vex_util::CFilePath::Combine)."""
-    return _slashes(_basalt.combine_path(first, second))
+    """Both in one path, with one slash between them (vex_util::CFilePath::Combine)."""
+    first = os.fspath(first)
+    return _slashes(_basalt.combine_path(first[:-1] if first.endswith(("/", "\\")) else first, second))
 
 
 def set_extension(path: _Path, extension: str) -> str:

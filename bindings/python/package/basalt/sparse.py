@@ -80,6 +80,7 @@ class Sparse2DArray:
 
     @property
     def dtype(self) -> np.dtype:
+        """Of an element."""
         return self._dtype
 
     def __repr__(self) -> str:

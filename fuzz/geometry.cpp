@@ -82,6 +82,14 @@ void arrays(Input& input) {
     basalt::direct(llh, azimuths, distances, ends, at_ends, COUNT);
     basalt::GeodesicInverse lines[COUNT] = {};
     basalt::inverse(llh, ends, lines, COUNT);
+    double sphere[2][COUNT], plane[COUNT];
+    geo_nee points[COUNT];
+    std::transform(llh, llh + COUNT, points, [](const geo_llh& at) {
+        return geo_nee{at.latitude, at.longitude, at.height};
+    });
+    basalt::distances(llh, ends, sphere[0], COUNT);
+    basalt::bearings(llh, ends, sphere[1], COUNT);
+    basalt::bearings(points, points + 1, plane, COUNT - 1);
     for (std::size_t i = 0; i < COUNT; ++i) {
         double at_end = 0;
         geo_llh end = {};
@@ -89,6 +97,9 @@ void arrays(Input& input) {
         require(same(xyz[i], xyz_of_one[i]) && same(geodetic[i], llh_of_one[i]));
         require(same(ends[i], end) && same(at_ends[i], at_end));
         require(same(lines[i], basalt::geodesic_inverse(llh[i], end)));
+        require(same(sphere[0][i], geo_vincenty_distance(llh[i], end)));
+        require(same(sphere[1][i], geo_vincenty_bearing(llh[i], end)));
+        require(i == 0 || same(plane[i - 1], geo_grid_bearing(points[i - 1], points[i])));
     }
 }
 

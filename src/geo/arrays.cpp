@@ -72,20 +72,23 @@ std::size_t inverse(const geo_llh* from, const geo_llh* to, GeodesicInverse* out
 }
 
 std::size_t bearings(const geo_nee* from, const geo_nee* to, double* out, std::size_t count) {
-    return for_each(count,
-                    [=](std::size_t i) { return std::isnan(out[i] = geo_grid_bearing(from[i], to[i])); });
+    return for_each_four(
+        count, [=](std::size_t i) { return geo::bearings_four(from + i, to + i, out + i); },
+        [=](std::size_t i) { return std::isnan(out[i] = geo_grid_bearing(from[i], to[i])); });
 }
 std::size_t bearings(const geo_llh* from, const geo_llh* to, double* out, std::size_t count) {
-    return for_each(count,
-                    [=](std::size_t i) { return std::isnan(out[i] = geo_vincenty_bearing(from[i], to[i])); });
+    return for_each_four(
+        count, [=](std::size_t i) { return geo::bearings_four(from + i, to + i, out + i); },
+        [=](std::size_t i) { return std::isnan(out[i] = geo_vincenty_bearing(from[i], to[i])); });
 }
 
 std::size_t distances(const geo_nee* from, const geo_nee* to, double* out, std::size_t count) {
     return for_each(count, [=](std::size_t i) { return std::isnan(out[i] = geo_horz_dist(from[i], to[i])); });
 }
 std::size_t distances(const geo_llh* from, const geo_llh* to, double* out, std::size_t count) {
-    return for_each(
-        count, [=](std::size_t i) { return std::isnan(out[i] = geo_vincenty_distance(from[i], to[i])); });
+    return for_each_four(
+        count, [=](std::size_t i) { return geo::distances_four(from + i, to + i, out + i); },
+        [=](std::size_t i) { return std::isnan(out[i] = geo_vincenty_distance(from[i], to[i])); });
 }
 
 }  // namespace basalt

@@ -4,6 +4,7 @@
 
 #include <cstddef>
 
+#include "src/geo/directions.h"
 #include "src/geo/ellipsoid_formulas.h"
 #include "src/geo/geodesic_inverse.h"
 #include "src/geo/geodesic_line.h"
@@ -97,6 +98,34 @@ BASALT_INLINE unsigned inverse(const geo_llh* from, const geo_llh* to, GeodesicI
     return left;
 }
 
+/// Where one is NaN, the single calls say which.
+BASALT_INLINE unsigned written(const Four& results, double* out) {
+    store(results, out);
+    return is_any(results != results) ? ALL_FOUR : 0;
+}
+
+BASALT_INLINE unsigned bearings(const geo_nee* from, const geo_nee* to, double* out) {
+    return written(grid_bearing<Four>(gather(&to->north, 3) - gather(&from->north, 3),
+                                      gather(&to->east, 3) - gather(&from->east, 3)),
+                   out);
+}
+
+BASALT_INLINE unsigned bearings(const geo_llh* from, const geo_llh* to, double* out) {
+    const Four change = gather(&to->longitude, 3) - gather(&from->longitude, 3);
+    return written(sphere_bearing<Four>(sin_cos(gather(&from->latitude, 3)),
+                                        sin_cos(gather(&to->latitude, 3)), sin_cos(change)),
+                   out);
+}
+
+BASALT_INLINE unsigned distances(const geo_llh* from, const geo_llh* to, double* out) {
+    const Four start = gather(&from->latitude, 3);
+    const Four end = gather(&to->latitude, 3);
+    const Four change = gather(&to->longitude, 3) - gather(&from->longitude, 3);
+    return written(sphere_distance<Four>(sin_cos((end - start) / 2.0).sine, sin_cos(change / 2.0).sine,
+                                         sin_cos(start).cosine, sin_cos(end).cosine),
+                   out);
+}
+
 }  // namespace
 
 [[gnu::target("avx2")]] unsigned to_cartesian_four(const geo_llh* in, geo_vector* out) {
@@ -116,6 +145,18 @@ BASALT_INLINE unsigned inverse(const geo_llh* from, const geo_llh* to, GeodesicI
     return inverse(from, to, out);
 }
 
+[[gnu::target("avx2")]] unsigned bearings_four(const geo_nee* from, const geo_nee* to, double* out) {
+    return bearings(from, to, out);
+}
+
+[[gnu::target("avx2")]] unsigned bearings_four(const geo_llh* from, const geo_llh* to, double* out) {
+    return bearings(from, to, out);
+}
+
+[[gnu::target("avx2")]] unsigned distances_four(const geo_llh* from, const geo_llh* to, double* out) {
+    return distances(from, to, out);
+}
+
 }  // namespace basalt::geo
 
 #else
@@ -132,6 +173,15 @@ unsigned direct_four(const geo_llh*, const double*, const double*, geo_llh*, dou
     return ALL_FOUR;
 }
 unsigned inverse_four(const geo_llh*, const geo_llh*, GeodesicInverse*) {
+    return ALL_FOUR;
+}
+unsigned bearings_four(const geo_nee*, const geo_nee*, double*) {
+    return ALL_FOUR;
+}
+unsigned bearings_four(const geo_llh*, const geo_llh*, double*) {
+    return ALL_FOUR;
+}
+unsigned distances_four(const geo_llh*, const geo_llh*, double*) {
     return ALL_FOUR;
 }
 

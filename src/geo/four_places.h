@@ -16,6 +16,9 @@ unsigned to_geodetic_four(const geo_vector* in, geo_llh* out, double tolerance);
 unsigned direct_four(const geo_llh* starts, const double* azimuths, const double* distances, geo_llh* ends,
                      double* final_azimuths);
 unsigned inverse_four(const geo_llh* from, const geo_llh* to, GeodesicInverse* out);
+unsigned bearings_four(const geo_nee* from, const geo_nee* to, double* out);
+unsigned bearings_four(const geo_llh* from, const geo_llh* to, double* out);
+unsigned distances_four(const geo_llh* from, const geo_llh* to, double* out);
 
 /// Whether this processor runs them; they must not be called elsewhere.
 inline bool has_four_places() {

@@ -2,8 +2,8 @@
 
 #include "basalt/geo/plane.h"
 #include "src/geo/constants.h"
+#include "src/geo/directions.h"
 #include "src/geo/elementary/elementary.h"
-#include "src/geo/one_turn.h"
 
 using basalt::is_null;
 using namespace basalt::geo;
@@ -47,10 +47,7 @@ bool geo_dist_equal(double a, double b) {
 }
 
 double geo_grid_bearing(const geo_nee& from, const geo_nee& to) {
-    // + 0.0: a difference of -0 would reverse the bearing of coincident points.
-    const double east = to.east - from.east + 0.0;
-    const double north = to.north - from.north + 0.0;
-    return geo_normalised_bearing(elementary::atan2(east, north));
+    return grid_bearing(to.north - from.north, to.east - from.east);
 }
 
 double geo_gradient(const geo_nee& from, const geo_nee& to) {
@@ -103,7 +100,7 @@ double geo_vector_len(geo_vector& v) {
 }
 
 double geo_vector_direction(geo_vector& v) {
-    return geo_normalised_bearing(elementary::atan2(v.x, v.y));
+    return bearing_of(v.y, v.x);
 }
 
 namespace {

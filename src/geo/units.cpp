@@ -5,7 +5,7 @@
 #include <limits>
 
 #include "src/geo/constants.h"
-#include "src/geo/one_turn.h"
+#include "src/geo/directions.h"
 
 using namespace basalt::geo;
 

@@ -7,6 +7,7 @@ import os
 import pathlib
 import shutil
 import subprocess
+import sysconfig
 
 import numpy
 import pybind11
@@ -20,6 +21,10 @@ ROOT = HERE / "library" if (HERE / "library").exists() else HERE.parent.parent
 LIBRARY = pathlib.Path(os.environ.get("BASALT_LIBRARY", ROOT / "build" / "python" / "library"))
 
 
+# One compiler for both: the library's functions are inlined into the loops over arrays, as far as GCC makes them.
+CXX = (os.environ.get("CXX") or sysconfig.get_config_var("CXX") or "c++").split()[0]
+INLINED = [] if "clang" in CXX else ["-flto=auto"]
+
 WORK = LIBRARY / "python"  # what setuptools makes: beside the library that it is made of
 WORK.mkdir(parents=True, exist_ok=True)
 
@@ -29,7 +34,8 @@ class BuildWithLibrary(build_ext):
         if "BASALT_LIBRARY" not in os.environ:
             subprocess.run(["cmake", "-S", ROOT, "-B", LIBRARY, "-DCMAKE_BUILD_TYPE=Release", "-DBUILD_SHARED_LIBS=OFF",
                             "-DBASALT_BUILD_TESTS=OFF", "-DBASALT_BUILD_EXAMPLES=OFF", "-DBASALT_BUILD_TOOLS=OFF",
-                            "-DBASALT_INSTALL=OFF"], check=True)
+                            "-DBASALT_INSTALL=OFF", f"-DCMAKE_CXX_COMPILER={CXX}",
+                            f"-DCMAKE_INTERPROCEDURAL_OPTIMIZATION={'ON' if INLINED else 'OFF'}"], check=True)
             subprocess.run(["cmake", "--build", LIBRARY, "--target", "basalt", "--parallel", str(os.cpu_count())],
                            check=True)
         super().run()
@@ -55,9 +61,11 @@ setup(
                  str(LIBRARY / "src" / "libbasalt.a")],
         include_dirs=[str(HERE / "src"), str(ROOT / "include"), str(LIBRARY / "include"), pybind11.get_include(),
                       numpy.get_include()],
-        extra_compile_args=["-std=c++20", "-O3", "-g0", "-ffp-contract=off", "-fvisibility=hidden", "-Wall", "-Wextra"],
+        extra_compile_args=["-std=c++20", "-O3", *INLINED, "-g0", "-ffp-contract=off", "-fvisibility=hidden",
+                            "-Wall", "-Wextra"],
         # The library's own symbols stay inside: a host that has loaded another basalt would otherwise lend its own.
-        extra_link_args=["-Wl,--strip-all", f"-Wl,--version-script={HERE / 'src' / 'exported.map'}",
+        extra_link_args=["-O3", *INLINED, "-Wl,--strip-all",
+                         f"-Wl,--version-script={HERE / 'src' / 'exported.map'}",
                          str(LIBRARY / "src" / "libbasalt.a")],
     )],
     cmdclass={"build_ext": BuildWithLibrary, "sdist": SourcesWithLibrary},

@@ -1,8 +1,6 @@
 """Batch calls at a million items beside plain NumPy, pyproj and shapely: milliseconds of each, the least of interleaved
 rounds, and their ratio (above 1: this package is faster).
 """
-import pathlib
-import sys
 import time
 
 import numpy as np
@@ -10,10 +8,9 @@ import pyproj
 import shapely
 from shapely.geometry import Polygon
 
-sys.path.insert(0, str(pathlib.Path(__file__).resolve().parent.parent / "tests"))
-from plain_forms import FUNCTIONS, arguments, columns  # noqa: E402
+from plain_forms import FUNCTIONS, arguments, columns
 
-from basalt import geo, time_scales, units  # noqa: E402
+from basalt import geo, time_scales, units
 
 COUNT = 1_000_000
 ROUNDS = 5

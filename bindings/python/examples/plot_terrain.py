@@ -46,12 +46,11 @@ print(f"{len(records)} cells of {side_east:.1f} m by {side_north:.1f} m")
 
 # %% A window: what is looked at, which may be a part of what there is.
 least, greatest = (columns // 4, rows // 4), (3 * columns // 4, 3 * rows // 4)
-x, y, found = terrain.select(least, greatest)
-window = np.full((greatest[1] - least[1] + 1, greatest[0] - least[0] + 1), np.nan)
-window[y - least[1], x - least[0]] = found["height"]
-steepest = found["slope"].argmax()
-print(f"{len(found)} cells in the window, {found['height'].min():.0f} to {found['height'].max():.0f} m, "
-      f"steepest {found['slope'][steepest]:.0%} at cell {x[steepest]}, {y[steepest]}")
+cells, found = terrain.window(least, greatest)
+window = np.where(found, cells["height"], np.nan)
+y, x = np.unravel_index(cells["slope"].argmax(), found.shape)
+print(f"{found.sum()} cells in the window, {np.nanmin(window):.0f} to {np.nanmax(window):.0f} m, "
+      f"steepest {cells['slope'][y, x]:.0%} at cell {x + least[0]}, {y + least[1]}")
 
 # %% The picture: lit from the north-west, with contours every fifty metres.
 extent = np.array([0, window.shape[1] * side_east, 0, window.shape[0] * side_north]) / 1000

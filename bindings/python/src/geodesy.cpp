@@ -59,6 +59,28 @@ void add_frame(pybind11::module_& m, const char* name) {
     });
 }
 
+// Of the places whose latitudes and longitudes are the first columns.
+template <auto MEASURE, class Result>
+void between_places(const Column* columns, Result* results, std::size_t count) {
+    geo_llh from[BLOCK], to[BLOCK];
+    for (std::size_t i = 0; i < count; ++i) {
+        from[i] = {columns[0][i], columns[1][i], 0};
+        to[i] = {columns[2][i], columns[3][i], 0};
+    }
+    MEASURE(from, to, results, count);
+}
+
+using Measure = std::size_t (*)(const geo_llh*, const geo_llh*, double*, std::size_t);
+
+template <Measure MEASURE>
+void write_between_places(const Column* columns, std::size_t count) {
+    double measured[BLOCK];
+    between_places<MEASURE>(columns, measured, count);
+    for (std::size_t i = 0; i < count; ++i) {
+        columns[4][i] = measured[i];
+    }
+}
+
 }  // namespace
 
 void add_geodesy(pybind11::module_& m) {
@@ -107,11 +129,22 @@ void add_geodesy(pybind11::module_& m) {
             _wgs84curvature(latitude, meridian, prime_vertical);
             return std::tuple{meridian, prime_vertical};
         });
-    add(m, "llh_equal",
+    add_blocks<6, 1, bool>(
+        m, "llh_equal",
         "llh_equal(latitude1, longitude1, height1, latitude2, longitude2, height2): whether the points are "
         "less than 0.5 mm apart in space (llh_equal).",
-        [](double lat1, double lon1, double h1, double lat2, double lon2, double h2) {
-            return llh_equal({lat1, lon1, h1}, {lat2, lon2, h2}) != 0;
+        [](const Column* columns, std::size_t count) {
+            geo_llh llh[2][BLOCK];
+            geo_vector xyz[2][BLOCK];
+            for (std::size_t k = 0; k < 2; ++k) {
+                read_records(columns + 3 * k, llh[k], count);
+                // What to_cartesian() leaves untouched are three zeros, a place on the equator here.
+                std::fill_n(xyz[k], count, geo_vector{6378137.0, 0.0, 0.0});
+                basalt::to_cartesian(llh[k], xyz[k], count);
+            }
+            for (std::size_t i = 0; i < count; ++i) {
+                columns[6].at<bool>(i) = geo_dist_equal(geo_vector_length(xyz[0][i], xyz[1][i]), 0.0);
+            }
         });
     add_frame<geo_llh, geo_nee, &basalt::LocalFrame::to_local>(m, "_frame_llh_to_local");
     add_frame<geo_vector, geo_nee, &basalt::LocalFrame::to_local>(m, "_frame_xyz_to_local");
@@ -139,26 +172,30 @@ void add_geodesy(pybind11::module_& m) {
                 columns[6][i] = at_ends[i];
             }
         });
-    add(m, "geodesic_inverse",
+    add_blocks<4, 3>(
+        m, "geodesic_inverse",
         "geodesic_inverse(latitude1, longitude1, latitude2, longitude2): (distance, azimuth_from, "
         "azimuth_to) "
         "of the shortest line on the ellipsoid, metres and radians in [-pi, pi]; exact to 1.5e-8 m for every "
         "pair of places, NaN for a latitude beyond a pole (basalt::geodesic_inverse).",
-        [](double lat1, double lon1, double lat2, double lon2) {
-            const auto line = basalt::geodesic_inverse({lat1, lon1, 0}, {lat2, lon2, 0});
-            return std::tuple{line.distance, line.azimuth_from, line.azimuth_to};
+        [](const Column* columns, std::size_t count) {
+            basalt::GeodesicInverse lines[BLOCK];
+            between_places<&basalt::inverse>(columns, lines, count);
+            write_records(columns + 4, lines, count);
         });
-    add(m, "great_circle_distance",
+    add_blocks<4, 1>(
+        m, "great_circle_distance",
         "great_circle_distance(latitude1, longitude1, latitude2, longitude2): metres on a sphere of 6371 "
         "km, up to 0.6 % off; geodesic_inverse is exact (geo_vincenty_distance).",
-        [](double lat1, double lon1, double lat2, double lon2) {
-            return geo_vincenty_distance({lat1, lon1, 0}, {lat2, lon2, 0});
+        [](const Column* columns, std::size_t count) {
+            write_between_places<&basalt::distances>(columns, count);
         });
-    add(m, "great_circle_bearing",
+    add_blocks<4, 1>(
+        m, "great_circle_bearing",
         "great_circle_bearing(latitude1, longitude1, latitude2, longitude2): radians in [0, 2 pi) on a "
         "sphere; geodesic_inverse is exact (geo_vincenty_bearing).",
-        [](double lat1, double lon1, double lat2, double lon2) {
-            return geo_vincenty_bearing({lat1, lon1, 0}, {lat2, lon2, 0});
+        [](const Column* columns, std::size_t count) {
+            write_between_places<&basalt::bearings>(columns, count);
         });
     add(m, "cross_track",
         "cross_track(latitude1, longitude1, latitude2, longitude2, latitude, longitude): metres from the "

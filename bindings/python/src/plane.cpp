@@ -1,7 +1,9 @@
 // Measures of the plane, curves and the intersection of bearings.
+#include <cstddef>
 #include <limits>
 
 #include "basalt/geo.h"
+#include "basalt/geo/arrays.h"
 #include "universal.h"
 
 namespace basalt_python {
@@ -13,6 +15,16 @@ using Point = std::tuple<double, double, double>;
 
 geo_nee flat(double north, double east) {
     return {north, east, 0};
+}
+
+// Bearings from the points of the first two columns to those of the next.
+void read_bearings(const Column* columns, double* bearings, std::size_t count) {
+    geo_nee from[BLOCK], to[BLOCK];
+    for (std::size_t i = 0; i < count; ++i) {
+        from[i] = flat(columns[0][i], columns[1][i]);
+        to[i] = flat(columns[2][i], columns[3][i]);
+    }
+    basalt::bearings(from, to, bearings, count);
 }
 
 }  // namespace
@@ -55,12 +67,16 @@ void add_plane(pybind11::module_& m) {
         [](double n1, double e1, double h1, double n2, double e2, double h2) {
             return geo_slope_dist({n1, e1, h1}, {n2, e2, h2});
         });
-    add(m, "grid_bearing",
-        "grid_bearing(north1, east1, north2, east2): radians in [0, 2 pi), 0 for equal points "
-        "(geo_grid_bearing).",
-        [](double n1, double e1, double n2, double e2) {
-            return geo_grid_bearing(flat(n1, e1), flat(n2, e2));
-        });
+    add_blocks<4, 1>(m, "grid_bearing",
+                     "grid_bearing(north1, east1, north2, east2): radians in [0, 2 pi), 0 for equal points "
+                     "(geo_grid_bearing).",
+                     [](const Column* columns, std::size_t count) {
+                         double all[BLOCK];
+                         read_bearings(columns, all, count);
+                         for (std::size_t i = 0; i < count; ++i) {
+                             columns[4][i] = all[i];
+                         }
+                     });
     add(m, "slope_angle",
         "slope_angle(north1, east1, elevation1, north2, east2, elevation2): radians from the level, "
         "positive uphill (geo_gradient).",
@@ -78,11 +94,17 @@ void add_plane(pybind11::module_& m) {
     add(m, "divergence",
         "divergence(bearing1, bearing2): the turn from the one to the other, radians (geo_grid_divergence).",
         [](double b1, double b2) { return geo_grid_divergence(b1, b2); });
-    add(m, "divergence_of_lines",
+    add_blocks<8, 1>(
+        m, "divergence_of_lines",
         "divergence_of_lines(a_north1, a_east1, a_north2, a_east2, b_north1, b_east1, b_north2, b_east2): "
         "the angle between two directions, each from one point to another, radians (geo_grid_divergence).",
-        [](double an1, double ae1, double an2, double ae2, double bn1, double be1, double bn2, double be2) {
-            return geo_grid_divergence(flat(an1, ae1), flat(an2, ae2), flat(bn1, be1), flat(bn2, be2));
+        [](const Column* columns, std::size_t count) {
+            double a[BLOCK], b[BLOCK];
+            read_bearings(columns, a, count);
+            read_bearings(columns + 4, b, count);
+            for (std::size_t i = 0; i < count; ++i) {
+                columns[8][i] = geo_grid_divergence(a[i], b[i]);
+            }
         });
     add(m, "bisected_bearing", "bisected_bearing(bearing1, bearing2): radians (geo_bisected_bearing).",
         [](double b1, double b2) { return geo_bisected_bearing(b1, b2); });

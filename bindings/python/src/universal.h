@@ -95,11 +95,22 @@ struct Universal<Kernel, Out (Kernel::*)(In...) const> {
     template <std::size_t... I, std::size_t... O>
     static void step_through(char** arguments, npy_intp count, const npy_intp* steps,
                              std::index_sequence<I...>, std::index_sequence<O...>) {
-        for (npy_intp i = 0; i < count; ++i) {
-            const Tuple results{Kernel{}(*reinterpret_cast<const In*>(arguments[I] + i * steps[I])...)};
-            ((*reinterpret_cast<std::tuple_element_t<O, Tuple>*>(
-                  arguments[INPUTS + O] + i * steps[INPUTS + O]) = std::get<O>(results)),
-             ...);
+        const auto loop = [&](const auto& step) {
+            for (npy_intp i = 0; i < count; ++i) {
+                const Tuple results{
+                    Kernel{}(*reinterpret_cast<const In*>(arguments[I] + i * step(I, sizeof(In)))...)};
+                ((*reinterpret_cast<std::tuple_element_t<O, Tuple>*>(
+                      arguments[INPUTS + O] + i * step(INPUTS + O, sizeof(std::tuple_element_t<O, Tuple>))) =
+                      std::get<O>(results)),
+                 ...);
+            }
+        };
+        const bool is_contiguous = ((steps[I] == sizeof(In)) && ...) &&
+                                   ((steps[INPUTS + O] == sizeof(std::tuple_element_t<O, Tuple>)) && ...);
+        if (is_contiguous) {  // a loop of its own, with four numbers at a time where the compiler can
+            loop([](std::size_t, std::size_t size) { return static_cast<npy_intp>(size); });
+        } else {
+            loop([&](std::size_t argument, std::size_t) { return steps[argument]; });
         }
     }
 
@@ -136,9 +147,11 @@ struct Column {
     char* first;
     npy_intp step;
 
-    double& operator[](std::size_t i) const {
-        return *reinterpret_cast<double*>(first + static_cast<npy_intp>(i) * step);
+    template <class T>
+    T& at(std::size_t i) const {
+        return *reinterpret_cast<T*>(first + static_cast<npy_intp>(i) * step);
     }
+    double& operator[](std::size_t i) const { return at<double>(i); }
 };
 
 template <class Record>
@@ -182,12 +195,13 @@ void each_block(char** arguments, const npy_intp* sizes, const npy_intp* steps, 
 
 // Adds a universal function over the library's array calls. The kernel takes the columns, inputs first, and
 // a count of items; it reads all of them before it writes, since an output may be an input.
-template <int INPUTS, int OUTPUTS, class Kernel>
+template <int INPUTS, int OUTPUTS, class Out = double, class Kernel>
 void add_blocks(pybind11::module_& module, const char* name, const char* text, Kernel) {
     static PyUFuncGenericFunction loop = &each_block<INPUTS + OUTPUTS, Kernel>;
     static void* nothing = nullptr;
     static std::array<char, INPUTS + OUTPUTS> types;
     types.fill(NPY_DOUBLE);
+    std::fill_n(types.begin() + INPUTS, OUTPUTS, type_number<Out>());
     PyObject* made = PyUFunc_FromFuncAndData(&loop, &nothing, types.data(), 1, INPUTS, OUTPUTS, PyUFunc_None,
                                              name, with_units(text), 0);
     if (made == nullptr) {

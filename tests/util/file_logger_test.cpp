@@ -152,7 +152,9 @@ TEST_F(FileLog, drops_what_the_system_does_not_take) {
         EXPECT_TRUE(read(reader, start, 1000) == 1000 && all.starts_with(std::string(start, 1000)));
         close(reader);
         write_lines(log, 1000);
-        const rlimit limit = {20'000, RLIM_INFINITY};
+        rlimit limit;
+        getrlimit(RLIMIT_FSIZE, &limit);
+        limit.rlim_cur = 20'000;
         setrlimit(RLIMIT_FSIZE, &limit);
         log.Open(file.c_str());
         write_lines(log, 1000);

@@ -44,12 +44,10 @@ CString text(const std::wstring& characters) {
 
 bool is_directory(const std::wstring& path) {
     const std::wstring last = path.substr(path.find_last_of(L"\\/") + 1);
-    std::string name;
     std::error_code error;
     return last.find_first_of(L"*?") != std::wstring::npos
                ? CFilePath::IsDirectory(text(path))
-               : !last.empty() && basalt::platform::file_name_from_wide(path, name) &&
-                     fs::is_directory(name, error);
+               : !last.empty() && fs::is_directory(basalt::platform::file_name_from_wide(path), error);
 }
 
 struct Parts {

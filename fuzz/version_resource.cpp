@@ -19,7 +19,7 @@ using Bytes = std::vector<unsigned char>;
 void query_all(const Bytes& block) {
     for (const wchar_t* const path :
          {L"\\", L"\\VarFileInfo\\Translation", L"\\StringFileInfo\\040904b0\\ProductName",
-          L"\\StringFileInfo\\040904b0\\Comment", L"\\StringFileInfo\\\\"}) {
+          L"\\StringFileInfo\\040904b0\\Comment"}) {
         void* value = nullptr;
         UINT length = 0;
         if (VerQueryValueW(block.data(), path, &value, &length) != 0) {
@@ -43,7 +43,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     static const int file = memfd_create("program", MFD_CLOEXEC);
     static const std::wstring name = L"/proc/self/fd/" + std::to_wstring(file);
     require(ftruncate(file, 0) == 0 && pwrite(file, data, size, 0) == static_cast<ssize_t>(size));
-    const DWORD needed = GetFileVersionInfoSizeW(name.c_str(), nullptr);
+    DWORD handle = 0;
+    const DWORD needed = GetFileVersionInfoSizeW(name.c_str(), &handle);
     require(needed <= size);
     if (needed > 0) {
         Bytes block(needed);

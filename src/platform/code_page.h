@@ -34,10 +34,9 @@ public:
     // The same for a file name, with values that file_name_from_wide() converts back to the same bytes.
     std::wstring widen_name(std::string_view name) const;
 
-    // Wide to narrow, with '?' for each character that the encoding lacks.
-    std::string narrow(std::wstring_view text) const;
-    // The same in pieces: removes up to `most` characters from the front of the text, writes them into a
-    // buffer of MB_LEN_MAX bytes per character and returns the end of the output.
+    // Wide to narrow in pieces, with '?' for each character that the encoding lacks: removes up to `most`
+    // characters from the front of the text, writes them into a buffer of MB_LEN_MAX bytes per character and
+    // returns the end of the output.
     char* narrow_piece(std::wstring_view& text, std::size_t most, char* bytes) const;
     // The same in text mode: CR LF for each LF, and the text ends at its first zero.
     char* narrow_line_piece(std::wstring_view& text, std::size_t most, char* bytes) const;
@@ -61,9 +60,6 @@ const CodePage& active_code_page();
 
 inline std::wstring widen(std::string_view text) {
     return active_code_page().widen(text);
-}
-inline std::string narrow(std::wstring_view text) {
-    return active_code_page().narrow(text);
 }
 
 }  // namespace basalt::platform

@@ -34,19 +34,18 @@ inline constexpr DWORD MAX_PATH = 260;  // characters, the terminator included
 // FindFirstFileW return this on failure, other calls null.
 inline const HANDLE INVALID_HANDLE_VALUE = reinterpret_cast<HANDLE>(~std::uintptr_t{0});
 
-// Only null, the default, is supported.
+// Always null, the default.
 struct SECURITY_ATTRIBUTES;
 
 // Opens a file for reading and writing, not shared. `access` is GENERIC_READ | GENERIC_WRITE, `sharing` 0,
 // `security` and `pattern` null, `disposition` CREATE_NEW (mode 0600) or OPEN_EXISTING, `flags` any of the
-// above but FILE_ATTRIBUTE_DIRECTORY: anything else is ERROR_INVALID_PARAMETER. Delete-on-close deletes the
-// name the file was opened by, if it still is this file, when the handle is closed, or when the process
-// returns from main or exits or the library is unloaded. A killed process leaves the file, unlocked.
+// above but FILE_ATTRIBUTE_DIRECTORY. Delete-on-close deletes the name the file was opened by, if it still is
+// this file, when the handle is closed, or when the process returns from main or exits or the library is
+// unloaded. A killed process leaves the file, unlocked.
 // INVALID_HANDLE_VALUE on failure, and nothing stays on the disk: ERROR_FILE_EXISTS for CREATE_NEW,
 // ERROR_SHARING_VIOLATION for a file that is open, ERROR_FILE_NOT_FOUND, ERROR_PATH_NOT_FOUND when the folder
-// is missing or the name empty, ERROR_INVALID_NAME for a name with values that are not characters,
-// ERROR_ACCESS_DENIED also for what is not a regular file, ERROR_TOO_MANY_OPEN_FILES, ERROR_NOT_ENOUGH_MEMORY
-// and other errors of the system.
+// is missing or the name empty or with values that are not characters, ERROR_ACCESS_DENIED also for what is
+// not a regular file, ERROR_TOO_MANY_OPEN_FILES, ERROR_NOT_ENOUGH_MEMORY and other errors of the system.
 HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_ATTRIBUTES* security,
                    DWORD disposition, DWORD flags, HANDLE pattern);
 

@@ -15,19 +15,17 @@
 
 inline constexpr DWORD FILE_MAP_ALL_ACCESS = 0xF001F;
 
-// A mapping of the first size_high * 2^32 + size_low bytes of a file, which grows to that length if it is
+// A mapping of the first `size_low` bytes of a file that has none yet, which grows to that length if it is
 // shorter (new bytes are zero), or of that many zero bytes of memory for INVALID_HANDLE_VALUE. `security` and
-// `name` are null and `protection` is PAGE_READWRITE, else ERROR_INVALID_PARAMETER. Null on failure:
-// ERROR_INVALID_PARAMETER for anonymous pages of size 0, ERROR_FILE_INVALID for a file and size 0 or a file
-// that has been mapped before, ERROR_INVALID_HANDLE, ERROR_DISK_FULL, ERROR_FILE_TOO_LARGE,
-// ERROR_NOT_ENOUGH_MEMORY. The file may have grown.
+// `name` are null, `protection` is PAGE_READWRITE and `size_high` 0. Null on failure: ERROR_INVALID_PARAMETER
+// for anonymous pages of size 0, ERROR_FILE_INVALID for a file and size 0, ERROR_INVALID_HANDLE,
+// ERROR_DISK_FULL, ERROR_FILE_TOO_LARGE, ERROR_NOT_ENOUGH_MEMORY. The file may have grown.
 HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD protection, DWORD size_high,
                           DWORD size_low, const wchar_t* name);
 
-// Maps the whole of a mapping: `access` is FILE_MAP_ALL_ACCESS, the offset 0, `size` the mapping's or 0, else
-// ERROR_INVALID_PARAMETER. Returns a page-aligned address; the rest of the last page reads as zero and is not
-// written to the file. Null on failure: ERROR_INVALID_HANDLE, ERROR_NOT_ENOUGH_MEMORY, ERROR_NOT_SUPPORTED
-// for a second view.
+// Maps the whole of a mapping, once: `access` is FILE_MAP_ALL_ACCESS, the offset 0, `size` the mapping's.
+// Returns a page-aligned address; the rest of the last page reads as zero and is not written to the file.
+// Null on failure: ERROR_INVALID_HANDLE, ERROR_NOT_ENOUGH_MEMORY.
 void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offset_low, std::size_t size);
 
 // Unmaps a view by its address, even when its mapping and file are closed. 1, or 0: ERROR_INVALID_ADDRESS

@@ -8,19 +8,14 @@
 #include "basalt/platform/types.h"
 #include "src/platform/file.h"
 
-// An entry. For a link it describes the target, or the link itself if that is missing.
+// An entry, with the fields of Win32's that are used. For a link it describes the target, or the link itself
+// if that is missing.
 struct WIN32_FIND_DATAW {
     DWORD dwFileAttributes;  // FILE_ATTRIBUTE_DIRECTORY, or FILE_ATTRIBUTE_NORMAL for everything else
-    // Times and size are 0 in a folder that may be read but not entered.
+    // Times are 0 in a folder that may be read but not entered.
     FILETIME ftCreationTime;  // time of the last change where the file system keeps no creation time
     FILETIME ftLastAccessTime;
-    FILETIME ftLastWriteTime;
-    DWORD nFileSizeHigh;
-    DWORD nFileSizeLow;
-    DWORD dwReserved0;  // 0
-    DWORD dwReserved1;  // 0
     wchar_t cFileName[MAX_PATH];
-    wchar_t cAlternateFileName[14];  // empty
 };
 
 // Begins a search and describes its first entry. Without a wildcard in the last element of the path that is
@@ -33,10 +28,10 @@ struct WIN32_FIND_DATAW {
 HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry);
 
 // Describes the next entry. 1, or 0 with the record unchanged: ERROR_NO_MORE_FILES after the last,
-// ERROR_INVALID_HANDLE, ERROR_NOT_ENOUGH_MEMORY, or an error of the system.
+// ERROR_NOT_ENOUGH_MEMORY, or an error of the system.
 BOOL FindNextFileW(HANDLE search, WIN32_FIND_DATAW* entry);
 
-// Ends a search. 1, or 0 for any other handle (ERROR_INVALID_HANDLE).
+// Ends a search. 1.
 BOOL FindClose(HANDLE search);
 
 namespace basalt::platform {

@@ -4,10 +4,10 @@
 // take constant time; a block of 1 MiB or more has a mapping of its own, unmapped when it is freed. An unused
 // heap costs one page.
 //
-// All calls: flags and options must be 0, else ERROR_INVALID_PARAMETER. A null handle, or one that is plainly
-// no heap, is ERROR_INVALID_HANDLE; a handle must not be used after HeapDestroy. The last error is set on
-// failure only. Threads: thread-safe, and threads that allocate from a heap without a limit do not wait for
-// each other; HeapDestroy must be the last call on its heap.
+// All calls: flags and options are 0. A null handle, or one that is plainly no heap, is ERROR_INVALID_HANDLE;
+// a handle must not be used after HeapDestroy. The last error is set on failure only. Threads: thread-safe,
+// and threads that allocate from a heap without a limit do not wait for each other; HeapDestroy must be the
+// last call on its heap.
 #ifndef BASALT_SRC_PLATFORM_HEAP_H
 #define BASALT_SRC_PLATFORM_HEAP_H
 
@@ -16,8 +16,7 @@
 #include "basalt/platform/types.h"
 
 // A new heap, or null (ERROR_NOT_ENOUGH_MEMORY). maximumSize in bytes, rounded up to whole pages, limits what
-// is mapped for blocks and their overhead; 0 sets no limit. initialSize is not allocated in advance; it must
-// not exceed a limit (ERROR_INVALID_PARAMETER).
+// is mapped for blocks and their overhead; 0 sets no limit. initialSize is 0.
 // Other systems refuse single blocks near and above 1 MiB from a heap with a limit; this one does not.
 HANDLE HeapCreate(DWORD options, std::size_t initialSize, std::size_t maximumSize);
 
@@ -29,8 +28,8 @@ BOOL HeapDestroy(HANDLE heap);
 void* HeapAlloc(HANDLE heap, DWORD flags, std::size_t size);
 
 // Resizes a block, perhaps to another address, contents kept up to the smaller size. Null on failure, with
-// the block unchanged: ERROR_NOT_ENOUGH_MEMORY, or ERROR_INVALID_PARAMETER when it is null or no live block
-// of this heap.
+// the block unchanged: ERROR_NOT_ENOUGH_MEMORY, or ERROR_INVALID_PARAMETER when it is no live block of this
+// heap.
 void* HeapReAlloc(HANDLE heap, DWORD flags, void* block, std::size_t size);
 
 // 1 when the block is freed or null; 0 when it is no live block of this heap, freed twice for instance

@@ -25,17 +25,16 @@ inline constexpr DWORD VER_PLATFORM_WIN32_WINDOWS = 1;
 inline constexpr DWORD VER_PLATFORM_WIN32_NT = 2;
 
 // Fills the version record, whose size field the caller has set to 276: release 6.2 of the NT family, the
-// highest that the library distinguishes. 0 with ERROR_INVALID_PARAMETER for a null record or another size,
-// record unchanged. Threads: reentrant.
+// highest that the library distinguishes. 1. Threads: reentrant.
 BOOL GetVersionExW(OSVERSIONINFOW* information);
 
 // ---- Executable ----
 
 // Full name of the file that the running program was started from; " (deleted)" follows if that was replaced
-// or deleted since. `module` is null; `name` has space for `size` characters, the terminator included.
-// Returns the length without the terminator. A longer name is truncated to `size` - 1 characters and the
-// result is `size` with ERROR_INSUFFICIENT_BUFFER. 0 on failure: ERROR_INVALID_HANDLE for another module,
-// ERROR_INVALID_PARAMETER for an empty buffer, ERROR_NOT_ENOUGH_MEMORY. Threads: thread-safe.
+// or deleted since. `module` is null; `name` has space for `size` characters, the terminator included, at
+// least one. Returns the length without the terminator. A longer name is truncated to `size` - 1 characters
+// and the result is `size` with ERROR_INSUFFICIENT_BUFFER. 0 on failure: ERROR_NOT_ENOUGH_MEMORY and other
+// errors of the system. Threads: thread-safe.
 DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size);
 
 // ---- Version resource ----
@@ -69,11 +68,10 @@ struct VS_FIXEDFILEINFO {
 };
 static_assert(sizeof(VS_FIXEDFILEINFO) == 52);
 
-// Bytes of a file's version resource. `handle` is set to 0 when it is not null. 0 on failure:
-// ERROR_RESOURCE_DATA_NOT_FOUND for a file that is not a program of this system, has no such section or is
-// shorter than it claims, and for a block longer than its section; the system's error for a file that cannot
-// be opened; ERROR_NOT_ENOUGH_MEMORY.
-// Threads: thread-safe.
+// Bytes of a file's version resource. `handle` is set to 0. 0 on failure: ERROR_RESOURCE_DATA_NOT_FOUND for
+// a file that is not a program of this system, has no such section or is shorter than it claims, and for a
+// block longer than its section; the system's error for a file that cannot be opened;
+// ERROR_NOT_ENOUGH_MEMORY. Threads: thread-safe.
 DWORD GetFileVersionInfoSizeW(const wchar_t* file, DWORD* handle);
 
 // Reads a file's version resource into a buffer of `length` bytes. `handle` is ignored. 0 on failure:
@@ -81,11 +79,11 @@ DWORD GetFileVersionInfoSizeW(const wchar_t* file, DWORD* handle);
 BOOL GetFileVersionInfoW(const wchar_t* file, DWORD handle, DWORD length, void* data);
 
 // Finds a value in a version resource, which has at least as many bytes as its first word says. `path` is a
-// backslash for the fixed information, or the keys on the way, each after a backslash, case-insensitive; the
-// first of several nodes of one name counts. `value` is set to its place in the block, at any alignment, and
-// `length` to its size: in bytes, or in 16-bit units for a text, which may end before. 0 with
-// ERROR_RESOURCE_TYPE_NOT_FOUND, value and length unchanged, when there is no such node within its parent, or
-// the root's value is not the fixed information. Threads: reentrant.
+// backslash for the fixed information, or the keys on the way, each after a backslash, as above; the block's
+// may differ in case, and the first of several nodes of one name counts. `value` is set to its place in the
+// block, at any alignment, and `length` to its size: in bytes, or in 16-bit units for a text, which may end
+// before. 0 with ERROR_RESOURCE_TYPE_NOT_FOUND, value and length unchanged, when there is no such node within
+// its parent, or the root's value is not the fixed information. Threads: reentrant.
 BOOL VerQueryValueW(const void* block, const wchar_t* path, void** value, UINT* length);
 
 // ---- Network interfaces ----
@@ -95,48 +93,25 @@ inline constexpr DWORD IF_TYPE_ETHERNET_CSMACD = 6;
 inline constexpr DWORD IF_TYPE_SOFTWARE_LOOPBACK = 24;
 inline constexpr DWORD IF_TYPE_IEEE80211 = 71;
 
-// As in Win32; the name has 16-bit characters on every system.
+// With the fields of Win32's that are used.
 struct MIB_IFROW {
-    char16_t wszName[256];
     DWORD dwIndex;
     DWORD dwType;
-    DWORD dwMtu;
-    DWORD dwSpeed;
     DWORD dwPhysAddrLen;
     BYTE bPhysAddr[8];
-    DWORD dwAdminStatus;
-    DWORD dwOperStatus;
-    DWORD dwLastChange;
-    DWORD dwInOctets;
-    DWORD dwInUcastPkts;
-    DWORD dwInNUcastPkts;
-    DWORD dwInDiscards;
-    DWORD dwInErrors;
-    DWORD dwInUnknownProtos;
-    DWORD dwOutOctets;
-    DWORD dwOutUcastPkts;
-    DWORD dwOutNUcastPkts;
-    DWORD dwOutDiscards;
-    DWORD dwOutErrors;
-    DWORD dwOutQLen;
-    DWORD dwDescrLen;
-    BYTE bDescr[256];
 };
-static_assert(sizeof(MIB_IFROW) == 860);
 
 // Followed by further rows: dwNumEntries in all.
 struct MIB_IFTABLE {
     DWORD dwNumEntries;
     MIB_IFROW table[1];
 };
-static_assert(sizeof(MIB_IFTABLE) == 864);
 
-// Every interface, up or down, with or without an IP address: index, type, hardware address (its first 8
-// bytes) and, as description, its name; other fields are 0. Ethernet is what the system reports as such and
-// is not wireless, virtual interfaces included. `size` is the buffer's size in bytes, `sorted` selects
-// ascending indexes instead of the system's order. 0, or ERROR_INSUFFICIENT_BUFFER with the size needed in
-// `size` and an undefined table, or the system's error. Interfaces may come and go between two calls.
-// Threads: thread-safe.
+// Every interface, up or down, with or without an IP address: index, type and hardware address (its first 8
+// bytes). Ethernet is what the system reports as such and is not wireless, virtual interfaces included.
+// `size` is the buffer's size in bytes, `sorted` selects ascending indexes instead of the system's order. 0,
+// or ERROR_INSUFFICIENT_BUFFER with the size needed in `size` and an undefined table, or the system's error.
+// Interfaces may come and go between two calls. Threads: thread-safe.
 DWORD GetIfTable(MIB_IFTABLE* table, DWORD* size, BOOL sorted);
 
 // The row of the interface whose index the caller has set in it. 0, or with the row unchanged

@@ -138,8 +138,10 @@ void check_files() {
         std::filesystem::create_directory_symlink("/", t.folder() / "a link");
         for (const CString& pattern : {name, name + L"*"}) {
             WIN32_FIND_DATAW entry;
-            const BOOL found = t.attempt([&] { return FindClose(FindFirstFileW(pattern, &entry)); });
-            t.expect(found != 0 ? entry.dwFileAttributes == FILE_ATTRIBUTE_DIRECTORY : t.struck(),
+            const HANDLE found = t.attempt([&] { return FindFirstFileW(pattern, &entry); });
+            FindClose(found);
+            t.expect(found != INVALID_HANDLE_VALUE ? entry.dwFileAttributes == FILE_ATTRIBUTE_DIRECTORY
+                                                   : t.struck(),
                      "its kind");
         }
     });

@@ -40,7 +40,7 @@ Gdiplus::Status __wrap__Z14GdiplusStartupPmPK19GdiplusStartupInputP20GdiplusStar
     codec_faults += running != 0 || input->GdiplusVersion != 1;
     *token = ++starts;
     running = codec_works ? *token : 0;
-    return codec_works ? Gdiplus::Ok : Gdiplus::GenericError;
+    return codec_works ? Gdiplus::Ok : Gdiplus::Win32Error;
 }
 void __wrap__Z15GdiplusShutdownm(std::uintptr_t token) {
     codec_faults += token == 0 || token != running;

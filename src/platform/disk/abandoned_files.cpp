@@ -33,11 +33,8 @@ bool is_old_file_of_this_user(DIR* folder, const char* name) noexcept {
 
 void delete_abandoned_files(const wchar_t* folder, const wchar_t* prefix) noexcept {
     try {
-        std::string path;
-        std::string start;
-        if (!file_name_from_wide(folder, path) || !file_name_from_wide(prefix, start)) {
-            return;
-        }
+        const std::string path = file_name_from_wide(folder);
+        const std::string start = file_name_from_wide(prefix);
         const std::unique_ptr<DIR, CloseFolder> entries(open_folder(path.c_str()));
         for (int i = 0; entries != nullptr && i < MOST_ENTRIES; ++i) {
             const dirent* const entry = ::readdir(entries.get());

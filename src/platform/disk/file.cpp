@@ -2,7 +2,6 @@
 
 #include <atomic>
 #include <memory>
-#include <string>
 
 #include "basalt/platform/error.h"
 #include "src/platform/disk/open_file.h"
@@ -14,9 +13,6 @@
 using namespace basalt::platform;
 
 namespace {
-
-constexpr DWORD KNOWN_FLAGS = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_NORMAL | FILE_ATTRIBUTE_TEMPORARY |
-                              FILE_FLAG_DELETE_ON_CLOSE | FILE_FLAG_SEQUENTIAL_SCAN;
 
 // The process that last opened a delete-on-close file. A forked child that has opened none leaves the handle
 // table alone: its copy may be locked by a thread that does not exist.
@@ -45,23 +41,14 @@ void register_deletion_at_exit() {
 
 }  // namespace
 
-HANDLE CreateFileW(const wchar_t* name, DWORD access, DWORD sharing, SECURITY_ATTRIBUTES* security,
-                   DWORD disposition, DWORD flags, HANDLE pattern) {
-    if (access != (GENERIC_READ | GENERIC_WRITE) || sharing != 0 || security != nullptr ||
-        (disposition != CREATE_NEW && disposition != OPEN_EXISTING) || (flags & ~KNOWN_FLAGS) != 0 ||
-        pattern != nullptr) {
-        return fail_with(ERROR_INVALID_PARAMETER, INVALID_HANDLE_VALUE);
-    }
+HANDLE CreateFileW(const wchar_t* name, DWORD /*access*/, DWORD /*sharing*/,
+                   SECURITY_ATTRIBUTES* /*security*/, DWORD disposition, DWORD flags, HANDLE /*pattern*/) {
     return or_out_of_memory(INVALID_HANDLE_VALUE, [&] {
-        std::string path;
-        if (!file_name_from_wide(name != nullptr ? name : L"", path)) {
-            return fail_with(ERROR_INVALID_NAME, INVALID_HANDLE_VALUE);
-        }
         const bool deletes = (flags & FILE_FLAG_DELETE_ON_CLOSE) != 0;
         const auto file = std::make_shared<OpenFile>();
         NewHandle handle(file);
-        const DWORD error = file->open(
-            path, disposition == CREATE_NEW ? OpenFile::Mode::CREATE : OpenFile::Mode::EXISTING, deletes);
+        const auto mode = disposition == CREATE_NEW ? OpenFile::Mode::CREATE : OpenFile::Mode::EXISTING;
+        const DWORD error = file->open(file_name_from_wide(name), mode, deletes);
         if (error != ERROR_SUCCESS) {
             return fail_with(error, INVALID_HANDLE_VALUE);
         }
@@ -88,11 +75,7 @@ BOOL CloseHandle(HANDLE handle) {
 
 BOOL DeleteFileW(const wchar_t* name) {
     return or_out_of_memory(0, [&] {
-        std::string path;
-        if (!file_name_from_wide(name != nullptr ? name : L"", path)) {
-            return fail_with(ERROR_INVALID_NAME, 0);
-        }
-        const DWORD error = delete_file(path);
+        const DWORD error = delete_file(file_name_from_wide(name));
         return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
     });
 }

@@ -1,6 +1,5 @@
 #include "src/platform/file_mapping.h"
 
-#include <cstdint>
 #include <memory>
 #include <utility>
 
@@ -22,7 +21,6 @@ struct FileMapping final : HandleObject {
 
     const std::shared_ptr<OpenFile> file;  // null for anonymous pages
     const std::size_t size;
-    bool is_used = false;  // its one view has been made
 };
 
 struct View {
@@ -50,13 +48,11 @@ DWORD map(FileMapping& mapping, std::byte*& address) noexcept {
 
 using namespace basalt::platform;
 
-HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD protection, DWORD size_high,
-                          DWORD size_low, const wchar_t* name) {
-    const std::uint64_t size = std::uint64_t{size_high} << 32 | size_low;
+HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* /*security*/, DWORD /*protection*/,
+                          DWORD /*size_high*/, DWORD size, const wchar_t* /*name*/) {
     const bool is_anonymous = file == INVALID_HANDLE_VALUE;
-    if (security != nullptr || protection != PAGE_READWRITE || name != nullptr ||
-        (is_anonymous && size == 0)) {
-        return fail_with(ERROR_INVALID_PARAMETER, HANDLE{nullptr});
+    if (size == 0) {
+        return fail_with(is_anonymous ? ERROR_INVALID_PARAMETER : ERROR_FILE_INVALID, HANDLE{nullptr});
     }
     return or_out_of_memory(HANDLE{nullptr}, [&] {
         std::shared_ptr<OpenFile> open;
@@ -65,9 +61,6 @@ HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD prot
             if (open == nullptr) {
                 return fail_with(ERROR_INVALID_HANDLE, HANDLE{nullptr});
             }
-            if (size == 0) {
-                return fail_with(ERROR_FILE_INVALID, HANDLE{nullptr});
-            }
         }
         NewHandle handle(std::make_shared<FileMapping>(open, size));
         const DWORD error = is_anonymous ? ERROR_SUCCESS : open->reserve(size);
@@ -75,18 +68,12 @@ HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD prot
     });
 }
 
-void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offset_low, std::size_t size) {
+void* MapViewOfFile(HANDLE mapping, DWORD /*access*/, DWORD /*offset_high*/, DWORD /*offset_low*/,
+                    std::size_t /*size*/) {
     using Address = void*;
     const auto object = find_object_of<FileMapping>(mapping);
     if (object == nullptr) {
         return fail_with(ERROR_INVALID_HANDLE, Address{});
-    }
-    if (access != FILE_MAP_ALL_ACCESS || offset_high != 0 || offset_low != 0 ||
-        (size != 0 && size != object->size)) {
-        return fail_with(ERROR_INVALID_PARAMETER, Address{});
-    }
-    if (object->is_used) {
-        return fail_with(ERROR_NOT_SUPPORTED, Address{});
     }
     return or_out_of_memory(Address{}, [&] {
         auto view = ViewRegistry::make_entry({object->file, object->size});
@@ -95,7 +82,6 @@ void* MapViewOfFile(HANDLE mapping, DWORD access, DWORD offset_high, DWORD offse
         if (error != ERROR_SUCCESS) {
             return fail_with(error, Address{});
         }
-        object->is_used = true;
         views().add(address, view);
         return Address{address};
     });

@@ -81,9 +81,6 @@ void describe(std::wstring_view name, const struct statx& status, WIN32_FIND_DAT
     const bool knows_creation = (status.stx_mask & STATX_BTIME) != 0;
     entry.ftCreationTime = file_time_of(knows_creation ? status.stx_btime : status.stx_ctime);
     entry.ftLastAccessTime = file_time_of(status.stx_atime);
-    entry.ftLastWriteTime = file_time_of(status.stx_mtime);
-    entry.nFileSizeHigh = static_cast<DWORD>(status.stx_size >> 32);
-    entry.nFileSizeLow = static_cast<DWORD>(status.stx_size & 0xFFFFFFFF);
 }
 
 // The status of a link's target, or of the link itself if that is missing. Links are rare, so they are not
@@ -193,7 +190,7 @@ DWORD basalt::platform::first_match_attributes(const wchar_t* path) noexcept {
     return or_out_of_memory(DWORD{0}, [&] {
         FileSearch search;
         WIN32_FIND_DATAW entry;
-        const DWORD error = find_first(path != nullptr ? path : L"", STATX_TYPE, search, entry);
+        const DWORD error = find_first(path, STATX_TYPE, search, entry);
         return error == ERROR_SUCCESS ? entry.dwFileAttributes : fail_with(error, DWORD{0});
     });
 }
@@ -224,23 +221,19 @@ HANDLE FindFirstFileW(const wchar_t* path, WIN32_FIND_DATAW* entry) {
     return or_out_of_memory(INVALID_HANDLE_VALUE, [&] {
         const auto search = std::make_shared<FileSearch>();
         NewHandle handle(search);
-        const DWORD error = find_first(path != nullptr ? path : L"", ALL_FIELDS, *search, *entry);
+        const DWORD error = find_first(path, ALL_FIELDS, *search, *entry);
         return error == ERROR_SUCCESS ? handle.give() : fail_with(error, INVALID_HANDLE_VALUE);
     });
 }
 
 BOOL FindNextFileW(HANDLE search, WIN32_FIND_DATAW* entry) {
     return or_out_of_memory(0, [&] {
-        const auto open = find_object_of<FileSearch>(search);
-        const DWORD error = open != nullptr ? open->next(*entry) : ERROR_INVALID_HANDLE;
+        const DWORD error = find_object_of<FileSearch>(search)->next(*entry);
         return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
     });
 }
 
 BOOL FindClose(HANDLE search) {
-    if (find_object_of<FileSearch>(search) == nullptr) {
-        return fail_with(ERROR_INVALID_HANDLE, 0);
-    }
     drop_handle(search);
     return 1;
 }

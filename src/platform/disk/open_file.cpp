@@ -138,14 +138,8 @@ void OpenFile::expect_at(const std::string& path) const noexcept {
     s_expected = {std::hash<std::string>{}(path), m_device, m_inode};
 }
 
-DWORD OpenFile::reserve(std::uint64_t size) noexcept {
+DWORD OpenFile::reserve(std::size_t size) noexcept {
     const std::lock_guard<Lock> guard(m_guard);
-    if (m_descriptor < 0) {
-        return ERROR_FILE_INVALID;
-    }
-    if (size > static_cast<std::uint64_t>(INT64_MAX)) {
-        return ERROR_FILE_TOO_LARGE;
-    }
     const OutputSignalBlocker blocker;
     // In pieces: tmpfs undoes an interrupted fallocate, so a periodic signal would keep a large one from
     // finishing.
@@ -163,9 +157,6 @@ DWORD OpenFile::reserve(std::uint64_t size) noexcept {
 
 DWORD OpenFile::map(std::size_t size, std::byte*& view) noexcept {
     const std::lock_guard<Lock> guard(m_guard);
-    if (m_descriptor < 0) {
-        return ERROR_FILE_INVALID;
-    }
     void* pages = mmap(nullptr, whole_pages(size), PROT_READ | PROT_WRITE, MAP_SHARED, m_descriptor, 0);
     if (pages == MAP_FAILED) {
         return error_from_errno(errno);

@@ -34,8 +34,9 @@ public:
     // When this thread opens the path next, it has to be this file.
     void expect_at(const std::string& path) const noexcept;
 
-    // Makes the file at least this long, with disk space for all of it. ERROR_SUCCESS or an error.
-    DWORD reserve(std::uint64_t size) noexcept;
+    // Makes a file that is not mapped at least this long, with disk space for all of it. ERROR_SUCCESS or an
+    // error.
+    DWORD reserve(std::size_t size) noexcept;
 
     // Maps the start of the file and closes the descriptor; once. ERROR_SUCCESS or an error.
     DWORD map(std::size_t size, std::byte*& view) noexcept;

@@ -53,10 +53,7 @@ DWORD GetTempPathW(DWORD length, wchar_t* buffer) {
     });
 }
 
-UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique, wchar_t* name) {
-    if (folder == nullptr || prefix == nullptr || unique != 0 || name == nullptr) {
-        return fail_with(ERROR_INVALID_PARAMETER, UINT{0});
-    }
+UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT /*unique*/, wchar_t* name) {
     return or_out_of_memory(UINT{0}, [&] {
         std::wstring stem = folder;
         if (stem.size() > LONGEST_FOLDER) {
@@ -71,10 +68,7 @@ UINT GetTempFileNameW(const wchar_t* folder, const wchar_t* prefix, UINT unique,
             wchar_t digits[9];
             std::swprintf(digits, 9, L"%X.tmp", number);
             const std::wstring full = stem + digits;
-            std::string path;
-            if (!file_name_from_wide(full, path)) {
-                return fail_with(ERROR_INVALID_NAME, UINT{0});
-            }
+            const std::string path = file_name_from_wide(full);
             OpenFile file;
             const DWORD error = file.open(path, OpenFile::Mode::CREATE, false);
             if (error == ERROR_SUCCESS) {

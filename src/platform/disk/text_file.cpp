@@ -20,12 +20,6 @@ namespace basalt::platform {
 
 namespace {
 
-std::string system_name(const char* path) {
-    std::string name;
-    file_name_from_wide(active_code_page().widen_name(path), name);
-    return name;
-}
-
 // The open files, newest first.
 constinit Lock s_files_lock;
 constinit TextFile* s_files = nullptr;
@@ -47,7 +41,8 @@ std::unique_ptr<TextFile> TextFile::open(const char* path) noexcept {
                                     {before_fork, after_fork_in_parent, after_fork_in_child})) {
             return std::unique_ptr<TextFile>();
         }
-        file->m_file = open_output(system_name(path).c_str(), O_APPEND);
+        const std::string name = file_name_from_wide(active_code_page().widen_name(path));
+        file->m_file = open_output(name.c_str(), O_APPEND);
         if (file->m_file < 0) {
             return std::unique_ptr<TextFile>();
         }

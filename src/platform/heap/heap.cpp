@@ -8,27 +8,18 @@ using basalt::platform::whole_pages;
 
 namespace {
 
-// The heap, or null with the last error set for an invalid handle or flags.
-PrivateHeap* checked(HANDLE handle, DWORD flags) {
+// The heap, or null with the last error set for an invalid handle.
+PrivateHeap* checked(HANDLE handle) {
     PrivateHeap* heap = PrivateHeap::from_handle(handle);
     if (heap == nullptr) {
         SetLastError(ERROR_INVALID_HANDLE);
-        return nullptr;
-    }
-    if (flags != 0) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return nullptr;
     }
     return heap;
 }
 
 }  // namespace
 
-HANDLE HeapCreate(DWORD options, std::size_t initialSize, std::size_t maximumSize) {
-    if (options != 0 || (maximumSize != 0 && initialSize > maximumSize)) {
-        SetLastError(ERROR_INVALID_PARAMETER);
-        return nullptr;
-    }
+HANDLE HeapCreate(DWORD /*options*/, std::size_t /*initialSize*/, std::size_t maximumSize) {
     // Within a page of 2^64 this is 0: no limit, which is as good.
     PrivateHeap* heap = PrivateHeap::create(whole_pages(maximumSize));
     if (heap == nullptr) {
@@ -38,7 +29,7 @@ HANDLE HeapCreate(DWORD options, std::size_t initialSize, std::size_t maximumSiz
 }
 
 BOOL HeapDestroy(HANDLE heap) {
-    PrivateHeap* valid = checked(heap, 0);
+    PrivateHeap* valid = checked(heap);
     if (valid == nullptr) {
         return 0;
     }
@@ -46,8 +37,8 @@ BOOL HeapDestroy(HANDLE heap) {
     return 1;
 }
 
-void* HeapAlloc(HANDLE heap, DWORD flags, std::size_t size) {
-    PrivateHeap* valid = checked(heap, flags);
+void* HeapAlloc(HANDLE heap, DWORD /*flags*/, std::size_t size) {
+    PrivateHeap* valid = checked(heap);
     if (valid == nullptr) {
         return nullptr;
     }
@@ -58,8 +49,8 @@ void* HeapAlloc(HANDLE heap, DWORD flags, std::size_t size) {
     return block;
 }
 
-void* HeapReAlloc(HANDLE heap, DWORD flags, void* block, std::size_t size) {
-    PrivateHeap* valid = checked(heap, flags);
+void* HeapReAlloc(HANDLE heap, DWORD /*flags*/, void* block, std::size_t size) {
+    PrivateHeap* valid = checked(heap);
     if (valid == nullptr) {
         return nullptr;
     }
@@ -71,8 +62,8 @@ void* HeapReAlloc(HANDLE heap, DWORD flags, void* block, std::size_t size) {
     return resized;
 }
 
-BOOL HeapFree(HANDLE heap, DWORD flags, void* block) {
-    PrivateHeap* valid = checked(heap, flags);
+BOOL HeapFree(HANDLE heap, DWORD /*flags*/, void* block) {
+    PrivateHeap* valid = checked(heap);
     if (valid == nullptr) {
         return 0;
     }
@@ -84,8 +75,8 @@ BOOL HeapFree(HANDLE heap, DWORD flags, void* block) {
     return 1;
 }
 
-std::size_t HeapCompact(HANDLE heap, DWORD flags) {
-    PrivateHeap* valid = checked(heap, flags);
+std::size_t HeapCompact(HANDLE heap, DWORD /*flags*/) {
+    PrivateHeap* valid = checked(heap);
     if (valid == nullptr) {
         return 0;
     }

@@ -103,9 +103,6 @@ DWORD PrivateHeap::release(void* payload) {
 
 void* PrivateHeap::resize(void* payload, std::size_t size, DWORD& error) {
     error = ERROR_INVALID_PARAMETER;
-    if (payload == nullptr) {
-        return nullptr;
-    }
     void* moved = nullptr;
     std::size_t old_size = 0;
     HeapPart* owner = nullptr;

@@ -47,9 +47,6 @@ bool round_out(const void* address, std::size_t size, std::uintptr_t front, Rang
 DWORD reserve(void* address, std::size_t size, Range& range) {
     Reservations::Entry reservation = Reservations::make_entry({});
     if (address == nullptr) {
-        if (size > SIZE_MAX / 2) {
-            return ERROR_NOT_ENOUGH_MEMORY;
-        }
         std::byte* const pages = reserve_pages(whole_pages(size), GRANULARITY);
         if (pages == nullptr) {
             return ERROR_NOT_ENOUGH_MEMORY;
@@ -91,12 +88,7 @@ DWORD commit(const void* address, std::size_t size, Range& range) noexcept {
 
 DWORD decommit(const void* address, std::size_t size) noexcept {
     Range range;
-    if (size == 0) {
-        range = reservations().find(reinterpret_cast<std::uintptr_t>(address));
-        if (range.size() == 0) {
-            return ERROR_INVALID_ADDRESS;
-        }
-    } else if (!find_reserved(address, size, range)) {
+    if (!find_reserved(address, size, range)) {
         return ERROR_INVALID_ADDRESS;
     }
     // New pages in one step: madvise() refuses to drop locked pages.
@@ -126,17 +118,16 @@ using basalt::platform::fail_with;
 using basalt::platform::or_out_of_memory;
 using basalt::platform::Range;
 
-void* VirtualAlloc(void* address, std::size_t size, DWORD type, DWORD protection) {
+void* VirtualAlloc(void* address, std::size_t size, DWORD type, DWORD /*protection*/) {
     using Address = void*;
-    const bool reserves = type == MEM_RESERVE && protection == PAGE_NOACCESS;
-    const bool commits = type == MEM_COMMIT && protection == PAGE_READWRITE;
-    if (size == 0 || (!reserves && !commits)) {
+    const bool commits = type == MEM_COMMIT;
+    if (size == 0) {
         return fail_with(ERROR_INVALID_PARAMETER, Address{});
     }
     return or_out_of_memory(Address{}, [&] {
         Range range;
         DWORD error = ERROR_SUCCESS;
-        if (reserves || address == nullptr) {
+        if (!commits || address == nullptr) {
             error = basalt::platform::reserve(address, size, range);
         }
         const bool is_new = error == ERROR_SUCCESS && address == nullptr;
@@ -151,11 +142,7 @@ void* VirtualAlloc(void* address, std::size_t size, DWORD type, DWORD protection
 }
 
 BOOL VirtualFree(void* address, std::size_t size, DWORD type) {
-    DWORD error = ERROR_INVALID_PARAMETER;
-    if (type == MEM_DECOMMIT) {
-        error = basalt::platform::decommit(address, size);
-    } else if (type == MEM_RELEASE && size == 0) {
-        error = basalt::platform::release(address);
-    }
+    const DWORD error =
+        type == MEM_DECOMMIT ? basalt::platform::decommit(address, size) : basalt::platform::release(address);
     return error == ERROR_SUCCESS ? 1 : fail_with(error, 0);
 }

@@ -50,8 +50,6 @@ MIB_IFROW row_of(const sockaddr_ll& link, const char* name) {
     row.dwType = type_of(link, name);
     row.dwPhysAddrLen = std::min<DWORD>(link.sll_halen, sizeof row.bPhysAddr);
     std::copy_n(link.sll_addr, row.dwPhysAddrLen, row.bPhysAddr);
-    row.dwDescrLen = static_cast<DWORD>(std::min(std::strlen(name), sizeof row.bDescr));
-    std::copy_n(name, row.dwDescrLen, row.bDescr);
     return row;
 }
 

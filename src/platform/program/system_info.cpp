@@ -15,9 +15,6 @@
 using namespace basalt::platform;
 
 BOOL GetVersionExW(OSVERSIONINFOW* information) {
-    if (information == nullptr || information->dwOSVersionInfoSize != sizeof(OSVERSIONINFOW)) {
-        return fail_with(ERROR_INVALID_PARAMETER, 0);
-    }
     *information = {.dwOSVersionInfoSize = sizeof(OSVERSIONINFOW),
                     .dwMajorVersion = 6,
                     .dwMinorVersion = 2,
@@ -27,13 +24,7 @@ BOOL GetVersionExW(OSVERSIONINFOW* information) {
     return 1;
 }
 
-DWORD GetModuleFileNameW(HINSTANCE module, wchar_t* name, DWORD size) {
-    if (module != nullptr) {
-        return fail_with(ERROR_INVALID_HANDLE, DWORD{0});
-    }
-    if (name == nullptr || size == 0) {
-        return fail_with(ERROR_INVALID_PARAMETER, DWORD{0});
-    }
+DWORD GetModuleFileNameW(HINSTANCE /*module*/, wchar_t* name, DWORD size) {
     char link[PATH_MAX];
     const ssize_t length = ::readlink("/proc/self/exe", link, sizeof link);
     if (length < 0) {

@@ -139,20 +139,12 @@ std::optional<Range> open_block(const BoundedFile& file) {
     return block ? block : fail_with(ERROR_RESOURCE_DATA_NOT_FOUND, std::nullopt);
 }
 
-// Empty, which opens nothing, for a name that is not a valid one.
-std::string system_name(const wchar_t* file_name) {
-    std::string name;
-    return file_name_from_wide(file_name, name) ? name : std::string();
-}
-
 }  // namespace
 
 DWORD GetFileVersionInfoSizeW(const wchar_t* file_name, DWORD* handle) {
-    if (handle != nullptr) {
-        *handle = 0;
-    }
+    *handle = 0;
     return or_out_of_memory(DWORD{0}, [&] {
-        const BoundedFile file(system_name(file_name));
+        const BoundedFile file(file_name_from_wide(file_name));
         const std::optional<Range> block = open_block(file);
         return block ? static_cast<DWORD>(block->size) : 0;
     });
@@ -160,7 +152,7 @@ DWORD GetFileVersionInfoSizeW(const wchar_t* file_name, DWORD* handle) {
 
 BOOL GetFileVersionInfoW(const wchar_t* file_name, DWORD, DWORD length, void* data) {
     return or_out_of_memory(0, [&] {
-        const BoundedFile file(system_name(file_name));
+        const BoundedFile file(file_name_from_wide(file_name));
         const std::optional<Range> block = open_block(file);
         if (!block) {
             return 0;

@@ -22,11 +22,6 @@ constexpr wchar_t lower(wchar_t ch) {
     return ch >= L'A' && ch <= L'Z' ? ch - L'A' + L'a' : ch;
 }
 
-bool is_same_key(std::wstring_view a, std::wstring_view b) {
-    return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                      [](wchar_t x, wchar_t y) { return lower(x) == lower(y); });
-}
-
 // A node by its offsets from the block's start.
 struct Node {
     std::size_t key;
@@ -110,12 +105,9 @@ private:
 std::optional<Node> find(const Block& block, std::wstring_view path) {
     std::optional<Node> node = block.root();
     while (node && !path.empty()) {
-        path.remove_prefix(path.front() == L'\\' ? 1 : 0);
+        path.remove_prefix(1);
         const std::wstring_view key = path.substr(0, path.find(L'\\'));
-        if (key.empty() && path.empty()) {
-            break;
-        }
-        node = block.child(*node, key);
+        node = key.empty() ? node : block.child(*node, key);
         path.remove_prefix(key.size());
     }
     return node;
@@ -131,14 +123,14 @@ bool is_fixed_information(const Block& block, const Node& root) {
 BOOL VerQueryValueW(const void* block, const wchar_t* path, void** value, UINT* length) {
     const Block nodes(block);
     const std::wstring_view keys = path;
-    const bool wants_root = keys.empty() || keys == L"\\";
+    const bool wants_root = keys == L"\\";
     const std::optional<Node> node = find(nodes, keys);
     if (!node || (wants_root && !is_fixed_information(nodes, *node))) {
         return basalt::platform::fail_with(ERROR_RESOURCE_TYPE_NOT_FOUND, 0);
     }
     *value = const_cast<unsigned char*>(nodes.at(node->value));
     // Its place decides whether it is a text: the caller would read too far if the node's own word did.
-    const std::size_t unit = is_same_key(keys.substr(0, STRINGS.size()), STRINGS) ? 2 : 1;
+    const std::size_t unit = keys.starts_with(STRINGS) ? 2 : 1;
     *length = static_cast<UINT>(node->value_size / unit);
     return 1;
 }

@@ -23,9 +23,6 @@ std::byte* map_aligned(std::size_t size, std::size_t alignment, int protection) 
         return pages;
     }
     unmap_pages(pages, size);
-    if (size > SIZE_MAX - alignment) {
-        return nullptr;
-    }
     const std::size_t padded = size + alignment;
     pages = map_anywhere(padded, protection);
     if (pages == nullptr) {

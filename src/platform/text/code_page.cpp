@@ -169,17 +169,6 @@ char* CodePage::narrow_line_piece(std::wstring_view& text, std::size_t most, cha
     return encode(text, most, bytes, true);
 }
 
-std::string CodePage::narrow(std::wstring_view text) const {
-    constexpr std::size_t PIECE = 64;
-    char bytes[PIECE * MB_LEN_MAX];
-    std::string result;
-    result.reserve(text.size());
-    while (!text.empty()) {
-        result.append(bytes, narrow_piece(text, PIECE, bytes));
-    }
-    return result;
-}
-
 wchar_t CodePage::to_lower(wchar_t ch) const {
     if (m_locale != nullptr) {
         return static_cast<wchar_t>(towlower_l(static_cast<wint_t>(ch), m_locale));

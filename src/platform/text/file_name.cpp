@@ -27,8 +27,8 @@ void set_wide(std::string_view name, std::wstring& result) {
 
 }  // namespace
 
-bool file_name_from_wide(std::wstring_view name, std::string& result) {
-    result.clear();
+std::string file_name_from_wide(std::wstring_view name) {
+    std::string result;
     result.reserve(name.size());
     for (const wchar_t ch : name) {
         if (ch == L'\\') {
@@ -39,10 +39,10 @@ bool file_name_from_wide(std::wstring_view name, std::string& result) {
             char bytes[MAX_UTF8_BYTES];
             result.append(bytes, encode_utf8(ch, bytes));
         } else {
-            return false;
+            return {};
         }
     }
-    return true;
+    return result;
 }
 
 bool FileName::set(std::wstring_view name) {
@@ -55,9 +55,9 @@ bool FileName::set(std::wstring_view name) {
         m_name = m_short;
         return true;
     }
-    const bool is_name = file_name_from_wide(name, m_long);
+    m_long = file_name_from_wide(name);
     m_name = m_long.c_str();
-    return is_name;
+    return !m_long.empty() || name.empty();
 }
 
 void wide_from_system_name(std::string_view name, std::wstring& result) {

@@ -8,8 +8,8 @@
 namespace basalt::platform {
 
 // The system's name: UTF-8, with '/' for each '\'. Values from 0xDC80 to 0xDCFF and 0xDC5C are single bytes,
-// the last a '\' that is part of a name. False for any other value that is not a character.
-bool file_name_from_wide(std::wstring_view name, std::string& result);
+// the last a '\' that is part of a name. Empty if there is any other value that is not a character.
+std::string file_name_from_wide(std::wstring_view name);
 
 // The same for the duration of a call. Names in ASCII of usual length need no allocation.
 class FileName {
@@ -18,6 +18,7 @@ public:
     FileName(const FileName&) = delete;
     FileName& operator=(const FileName&) = delete;
 
+    // False if there is a value that is not a character.
     bool set(std::wstring_view name);
     const char* c_str() const { return m_name; }
 

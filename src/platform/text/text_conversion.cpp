@@ -16,26 +16,6 @@ using namespace basalt::platform;
 
 namespace {
 
-template <class Source, class Destination>
-bool are_valid(const Source* source, int length, const Destination* destination, int capacity) {
-    const bool has_destination = capacity == 0 || (capacity > 0 && destination != nullptr);
-    return source != nullptr && (length > 0 || length == -1) && has_destination;
-}
-
-template <class Character>
-std::basic_string_view<Character> view_of(const Character* source, int length) {
-    return length > 0
-               ? std::basic_string_view<Character>(source, static_cast<std::size_t>(length))
-               : std::basic_string_view<Character>(source, std::char_traits<Character>::length(source) + 1);
-}
-
-int result_of(std::size_t needed, int capacity) {
-    if (needed > INT_MAX || (capacity != 0 && needed > static_cast<std::size_t>(capacity))) {
-        return fail_with(ERROR_INSUFFICIENT_BUFFER, 0);
-    }
-    return static_cast<int>(needed);
-}
-
 // Writes the leading pieces that fit and returns the number of bytes in the whole text.
 std::size_t narrow_to(std::wstring_view text, char* destination, std::size_t capacity) {
     constexpr std::size_t PIECE = 64;
@@ -54,31 +34,32 @@ std::size_t narrow_to(std::wstring_view text, char* destination, std::size_t cap
 
 }  // namespace
 
-int MultiByteToWideChar(UINT code_page, DWORD flags, const char* source, int length, wchar_t* destination,
-                        int capacity) {
-    if (code_page != CP_ACP || (flags & ~MB_PRECOMPOSED) != 0 ||
-        !are_valid(source, length, destination, capacity)) {
+int MultiByteToWideChar(UINT /*code_page*/, DWORD /*flags*/, const char* source, int length,
+                        wchar_t* destination, int capacity) {
+    if (length <= 0) {
         return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
-    const std::size_t needed =
-        active_code_page().widen_to(view_of(source, length), destination, static_cast<std::size_t>(capacity));
-    return result_of(needed, capacity);
+    const std::string_view text(source, static_cast<std::size_t>(length));
+    return static_cast<int>(
+        active_code_page().widen_to(text, destination, static_cast<std::size_t>(capacity)));
 }
 
 // NOLINTBEGIN(readability-non-const-parameter): the Win32 signature
-int WideCharToMultiByte(UINT code_page, DWORD flags, const wchar_t* source, int length, char* destination,
-                        int capacity, const char* default_character, BOOL* used_default) {
+int WideCharToMultiByte(UINT /*code_page*/, DWORD /*flags*/, const wchar_t* source, int length,
+                        char* destination, int capacity, const char* /*default_character*/,
+                        BOOL* /*used_default*/) {
     // NOLINTEND(readability-non-const-parameter)
-    if (code_page != CP_ACP || flags != 0 || default_character != nullptr || used_default != nullptr ||
-        !are_valid(source, length, destination, capacity)) {
+    if (length <= 0) {
         return fail_with(ERROR_INVALID_PARAMETER, 0);
     }
-    return result_of(narrow_to(view_of(source, length), destination, static_cast<std::size_t>(capacity)),
-                     capacity);
+    const std::wstring_view text(source, static_cast<std::size_t>(length));
+    const std::size_t needed = narrow_to(text, destination, static_cast<std::size_t>(capacity));
+    return needed <= static_cast<std::size_t>(capacity) ? static_cast<int>(needed)
+                                                        : fail_with(ERROR_INSUFFICIENT_BUFFER, 0);
 }
 
 errno_t _itow_s(int value, wchar_t* text, std::size_t size, int radix) {
-    if (text == nullptr || size == 0) {
+    if (size == 0) {
         return EINVAL;
     }
     text[0] = L'\0';

@@ -1,10 +1,7 @@
 # What all example programs are built of, and how. Needs the Debian package libfmt-dev.
 if(NOT TARGET basalt::basalt)
   find_package(basalt REQUIRED)
-  option(BASALT_BUILD_TESTS "Register the tests" ON)
-  if(BASALT_BUILD_TESTS)
-    enable_testing()
-  endif()
+  enable_testing()
 endif()
 find_package(fmt REQUIRED)
 
@@ -20,11 +17,11 @@ if(NOT TARGET example_support)
     basalt::basalt fmt::fmt $<TARGET_NAME_IF_EXISTS:basalt_options>)
 endif()
 
-# example_program(<name> <source>...): the program and its test.
+# example_program(<name> <source>...): the program, and its test where that is shipped.
 function(example_program name)
   add_executable(${name} ${ARGN})
   target_link_libraries(${name} PRIVATE example_support)
-  if(BASALT_BUILD_TESTS)
+  if(EXISTS ${CMAKE_CURRENT_SOURCE_DIR}/${name}_test.sh)
     add_test(NAME ${name}_command_line COMMAND bash ${CMAKE_CURRENT_SOURCE_DIR}/${name}_test.sh
       $<TARGET_FILE:${name}> ${CMAKE_CURRENT_FUNCTION_LIST_DIR}/../data)
   endif()

@@ -1,4 +1,4 @@
-// Numbers from text the same way in every locale.
+// Numbers and colours from text, the same in every locale.
 #ifndef CONSOLE_NUMBER_PARSING_H
 #define CONSOLE_NUMBER_PARSING_H
 
@@ -13,7 +13,7 @@
 /// or one outside the range of the type.
 template <typename Number>
 std::optional<Number> parse_any_number(std::string_view text) {
-    // from_chars knows no leading plus, which surveying exports like to write.
+    // from_chars rejects a leading plus, which exports of surveying programs contain.
     if (text.size() > 1 && text[0] == '+' && text[1] != '-' && text[1] != '+') {
         text.remove_prefix(1);
     }
@@ -33,6 +33,15 @@ inline std::optional<double> parse_number(std::string_view text) {
 
 inline std::optional<std::int64_t> parse_integer(std::string_view text) {
     return parse_any_number<std::int64_t>(text);
+}
+
+/// The colour that `RRGGBB` or `#RRGGBB` spells, as 0xRRGGBB; nothing for any other text.
+inline std::optional<unsigned> parse_rgb(std::string_view text) {
+    text.remove_prefix(text.starts_with('#') ? 1 : 0);
+    unsigned value = 0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value, 16);
+    const bool is_whole = text.size() == 6 && error == std::errc() && end == text.data() + text.size();
+    return is_whole ? std::optional(value) : std::nullopt;
 }
 
 /// Whether a word begins as numbers do, with a digit, a sign or a point, or is `nan` or `inf`. A name does

@@ -39,6 +39,7 @@ check_line() {
 printf '5 15\n' >outside
 checks_each "$here/basalt.facts" line
 refused "no command given (--help lists them)"
+refused "unexpected argument 'x' (--help shows what is taken)" help dms x
 refused "unknown command 'ab' (--help lists them)" ab
 refused "unknown command 'llh2xzy': did you mean llh2xyz? (--help lists them)" llh2xzy
 BASALT_ANGLES=degrees gives "0.0000" distance <<<"90 2 90 4"

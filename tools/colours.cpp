@@ -1,7 +1,7 @@
 // The colour palette.
 #include <basalt/graphics.h>
 
-#include <charconv>
+#include <optional>
 
 #include "commands.h"
 #include "input_error.h"
@@ -11,13 +11,11 @@ namespace {
 
 COLORREF read_colour(Fields& fields) {
     const std::string_view field = fields.text("a colour RRGGBB");
-    const std::string_view digits = field.substr(!field.empty() && field[0] == '#' ? 1 : 0);
-    unsigned value = 0;
-    const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), value, 16);
-    if (digits.size() != 6 || error != std::errc() || end != digits.data() + digits.size()) {
+    const std::optional<unsigned> rgb = parse_rgb(field);
+    if (!rgb) {
         throw InputError("expected a colour RRGGBB or #RRGGBB, not " + quoted(field));
     }
-    return RGB(static_cast<int>(value >> 16), static_cast<int>(value >> 8), static_cast<int>(value));
+    return RGB(static_cast<int>(*rgb >> 16), static_cast<int>(*rgb >> 8), static_cast<int>(*rgb));
 }
 
 void write_colour(COLORREF colour, Row& row) {
@@ -60,4 +58,4 @@ const Command PALETTE = {
     {{"echo 'fe0000 roof' | basalt palette nearest", "0 #FF0000 roof"},
      {"echo '6' | basalt palette colour", "#FFFFFF"}},
     make_palette,
-    Lines::UNMARKED};
+    Lines::WITHOUT_COMMENTS};

@@ -39,17 +39,18 @@ struct Example {
 
 /// Which lines are parsed.
 enum class Lines {
-    MARKED,    ///< all but blank lines and comments (#), which are copied
-    UNMARKED,  ///< all lines
-    WHOLE      ///< all lines, each as one field
+    WITH_COMMENTS,     ///< all but blank lines and comments (#), which are copied
+    WITHOUT_COMMENTS,  ///< all lines
+    ONE_FIELD          ///< all lines, each as one field
 };
 
 /// Reads a line's fields and writes its results. InputError, which may come after some were written, refuses
 /// the line.
 using Filter = std::function<void(Fields&, Row&)>;
 
-/// What a command does: a filter, and for one whose results are those of several lines, what writes them when
-/// a blank line or the input ends these; false for no result. Such a command writes nothing for a line.
+/// What a command does with lines: `line` filters each. A command with results for groups of lines writes
+/// them in `end`, called when a blank line or the end of the input ends a group; false means no result. Such
+/// a command writes nothing in `line`.
 struct Work {
     template <typename F>
     Work(F filter) : line(std::move(filter)) {}
@@ -70,7 +71,7 @@ struct Command {
     /// Takes the operands, as many as there are words, and the options of its own. InputError for those that
     /// cannot be used.
     Work (*make)(const CommandLine& line, const Format& format);
-    Lines lines = Lines::MARKED;
+    Lines lines = Lines::WITH_COMMENTS;
     char separator = ' ';  ///< between the fields it writes, unless --csv says otherwise
 };
 

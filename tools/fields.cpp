@@ -29,14 +29,10 @@ std::string_view trimmed(std::string_view text) {
 
 }  // namespace
 
-void Fields::skip_blanks() {
+std::string_view Fields::text(const char* what) {
     while (m_at < m_line.size() && is_blank(m_line[m_at])) {
         ++m_at;
     }
-}
-
-std::string_view Fields::text(const char* what) {
-    skip_blanks();
     if (m_ended || (m_at == m_line.size() && !m_format.csv)) {
         throw InputError("expected " + std::string(what) + ", but the line ends before it");
     }
@@ -57,15 +53,6 @@ void Fields::fail(const char* what, std::string_view found) const {
     const bool commas = !m_format.csv && found.find(',') != std::string_view::npos;
     throw InputError("expected " + std::string(what) + ", not " + quoted(found) +
                      (commas ? " (--csv reads commas)" : ""));
-}
-
-double Fields::number(const char* what) {
-    const std::string_view field = text(what);
-    const std::optional<double> value = parse_number(field);
-    if (!value) {
-        fail(what, field);
-    }
-    return *value;
 }
 
 double Fields::number(const char* what, double low, double high) {

@@ -2,6 +2,7 @@
 #ifndef TOOLS_FIELDS_H
 #define TOOLS_FIELDS_H
 
+#include <cfloat>
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
@@ -15,10 +16,8 @@ public:
     Fields(std::string_view line, const Format& format) : m_format(format), m_line(line) {}
 
     std::string_view text(const char* what);
-    /// A finite number.
-    double number(const char* what);
     /// A finite number from `low` to `high`.
-    double number(const char* what, double low, double high);
+    double number(const char* what, double low = -DBL_MAX, double high = DBL_MAX);
     std::int64_t whole(const char* what, std::int64_t low, std::int64_t high);
     /// @name Angles as the options say, in radians
     /// @{
@@ -38,7 +37,6 @@ public:
 
 private:
     [[noreturn]] void fail(const char* what, std::string_view found) const;
-    void skip_blanks();
 
     const Format& m_format;
     std::string_view m_line;

@@ -20,18 +20,18 @@ bool is_copied(std::string_view line) {
 /// Of many bad lines, as where a whole file has another format, these are reported one by one.
 constexpr std::size_t MOST_REPORTED = 20;
 
-class Run {
+class FilterRun {
 public:
-    Run(const Command& command, const CommandLine& line)
+    FilterRun(const Command& command, const CommandLine& line)
         : m_command(command), m_format(format_of(command, line)), m_work(command.make(line, m_format)) {}
 
-    int all(const std::vector<std::string>& files) {
+    int run(const std::vector<std::string>& files) {
         for (const std::string& path : files) {
             LineReader reader(path, [this] { m_writer.flush(); });
             while (reader.next()) {
                 const std::size_t kept = m_writer.text().size();
                 try {
-                    if (m_work.end ? grouped(reader) : one(reader)) {
+                    if (m_work.end ? collect(reader) : convert(reader)) {
                         m_writer.end_of_line();
                     }
                 } catch (const InputError& error) {
@@ -55,14 +55,15 @@ private:
             throw InputError("the line is longer than " + std::to_string(LineReader::LONGEST) + " bytes");
         }
         std::string_view line = reader.line();
-        if (m_command.lines == Lines::MARKED && reader.number() == 1 && line.substr(0, 3) == "\xEF\xBB\xBF") {
+        if (m_command.lines == Lines::WITH_COMMENTS && reader.number() == 1 &&
+            line.substr(0, 3) == "\xEF\xBB\xBF") {
             line.remove_prefix(3);
         }
         return line;
     }
 
     /// Whether a line of output was made.
-    bool grouped(const LineReader& reader) {
+    bool collect(const LineReader& reader) {
         const std::string_view line = line_of(reader);
         if (is_copied(line)) {
             return line.find('#') == std::string_view::npos && end_of_group();
@@ -84,16 +85,16 @@ private:
         }
     }
 
-    bool one(const LineReader& reader) {
+    bool convert(const LineReader& reader) {
         const std::string_view line = line_of(reader);
         std::string& text = m_writer.text();
-        if (m_command.lines == Lines::MARKED && is_copied(line)) {
+        if (m_command.lines == Lines::WITH_COMMENTS && is_copied(line)) {
             text += line;
             return true;
         }
         Fields fields(line, m_format);
         Row row(text, m_format);
-        if (m_format.keep && m_command.lines == Lines::WHOLE) {
+        if (m_format.keep && m_command.lines == Lines::ONE_FIELD) {
             row.any_text(line);
         } else if (m_format.keep) {
             row.text(line);
@@ -126,5 +127,5 @@ private:
 }  // namespace
 
 int run_filter(const Command& command, const CommandLine& line, const std::vector<std::string>& files) {
-    return Run(command, line).all(files.empty() ? std::vector<std::string>{"-"} : files);
+    return FilterRun(command, line).run(files.empty() ? std::vector<std::string>{"-"} : files);
 }

@@ -2,6 +2,7 @@
 #include <basalt/geo.h>
 
 #include "commands.h"
+#include "input_error.h"
 #include "points.h"
 
 namespace {
@@ -47,6 +48,9 @@ Work make_bearing(const CommandLine&, const Format&) {
 Work make_crosstrack(const CommandLine& line, const Format& format) {
     const geo_llh a = read_operand(line.operands[0], "A", format, read_place);
     const geo_llh b = read_operand(line.operands[1], "B", format, read_place);
+    if (a.latitude == b.latitude && a.longitude == b.longitude) {
+        throw InputError("A and B are the same place, which has no line");
+    }
     return
         [a, b](Fields& fields, Row& row) { row.metres(geo_vincenty_crosstrack(a, b, read_place(fields))); };
 }
@@ -70,9 +74,8 @@ const Command INVERSE_GEODESIC = {
     "",
     "azimuths and length of the shortest line between two places",
     "Reads LATITUDE LONGITUDE LATITUDE LONGITUDE. Writes AZIMUTH AZIMUTH DISTANCE of the geodesic on the\n"
-    "WGS84 ellipsoid: of leaving the first place and of going on at the second, clockwise from north, from "
-    "0\n"
-    "to a turn; metres.",
+    "WGS84 ellipsoid: of leaving the first place and of going on at the second, clockwise from north,\n"
+    "from 0 to a turn; metres.",
     {DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '36.12 -86.67 33.94 -118.40' | basalt inverse --degrees --precision 1",
       "274.615580 256.080667 2892777.0"}},

@@ -9,24 +9,20 @@ namespace {
 
 constexpr const char* LINES =
     "Each command is a filter: it reads lines from files or standard input (-) and writes a line for each\n"
-    "to standard output. Fields are separated by blanks, with --csv by commas; what follows the fields that "
-    "a command\n"
-    "needs is copied behind its results. Blank lines and lines that begin with # are copied, except where\n"
-    "every line is a text (hex, unhex, path, palette). Lines end with LF or CRLF, the last one with or\n"
-    "without, and are written with LF. Numbers have a point in every locale.";
+    "to standard output. Fields are separated by blanks, with --csv by commas; what follows the fields\n"
+    "that a command needs is copied behind its results. Blank lines and lines that begin with # are\n"
+    "copied, except where every line is a text (hex, unhex, path, palette). Lines end with LF or CRLF, the\n"
+    "last one with or without, and are written with LF. Numbers have a point in every locale.";
 
 constexpr const char* NUMBERS =
-    "Angles are radians, with --degrees degrees; 12-30-00.5, 12:30 and 12d30'S are read with either. "
-    "BASALT_ANGLES=degrees in the environment makes degrees the\n"
-    "default. Metres and seconds have --precision decimals, degrees five more, radians seven more, seconds "
-    "of arc two more, days five more.";
+    "Angles are radians, with --degrees degrees; 12-30-00.5, 12:30 and 12d30'S are read with either.\n"
+    "BASALT_ANGLES=degrees in the environment makes degrees the default. Metres and seconds have\n"
+    "--precision decimals, degrees five more, radians seven more, seconds of arc two more, days five more.";
 
 constexpr const char* STATUS =
-    "A line that cannot be used is reported on standard error with its number and reason, and skipped, as "
-    "is\n"
-    "a line of more than 1048576 bytes; after 20 of them only their count is reported. Exit status: 0 "
-    "success, 1 a line was skipped, or input or output\n"
-    "failed, 2 bad arguments.";
+    "A line that cannot be used, or of more than 1048576 bytes, is reported on standard error with its\n"
+    "number and the reason, and skipped; after 20 of them only their count is reported. Exit status:\n"
+    "0 success, 1 a line was skipped, or input or output failed, 2 bad arguments.";
 
 constexpr Option PROGRAM_OPTIONS[] = {
     {"--help", "", "or -h: print this and exit; after a command, what it takes"},
@@ -124,7 +120,7 @@ std::string help_text(const Command& command) {
         text.append("  $ ").append(example.shell).append("\n");
         text.append(example.output).append("\n");
     }
-    return text.append("\nWhat all commands have in common is said by basalt --help.\n");
+    return text.append("\nWhat all commands have in common: basalt --help.\n");
 }
 
 std::string man_page() {

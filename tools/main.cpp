@@ -9,12 +9,21 @@
 #include "filter.h"
 #include "help.h"
 #include "input_error.h"
+#include "number_parsing.h"
 #include "program.h"
 
 namespace {
 
+[[noreturn]] void fail_at(const std::string& argument) {
+    throw InputError("unexpected argument " + quoted(argument) + " (--help shows what is taken)");
+}
+
+/// The tool without a command.
 int run_itself(const std::vector<std::string>& arguments) {
     const CommandLine line = parse_command_line(arguments, {{}, {"--man", "--completion"}});
+    if (!line.operands.empty() && !line.flags.empty()) {
+        fail_at(line.operands[0]);
+    }
     if (line.help) {
         print(help_text());
     } else if (line.version) {
@@ -54,7 +63,10 @@ int main(int count, char** arguments) {
             return run_itself(words);
         }
         if (words[0] == "help") {
-            print(words.size() > 1 ? help_text(command_named(words[1])) : help_text());
+            if (words.size() > 2) {
+                fail_at(words[2]);
+            }
+            print(words.size() == 1 || words[1] == "help" ? help_text() : help_text(command_named(words[1])));
             return 0;
         }
         const Command& command = command_named(words[0]);

@@ -82,10 +82,9 @@ const Command REDUCE = {
     "STATION",
     "points from bearings, zenith angles and slope distances",
     "Reads BEARING ZENITH DISTANCE; STATION is NORTH,EAST,ELEVATION in metres. Bearings run clockwise from\n"
-    "north, zenith angles from 0 at the zenith, beyond half a turn on the second face; the slope distance "
-    "is\n"
-    "in metres. Writes NORTH EAST ELEVATION of the target's foot in the plane, without curvature or\n"
-    "refraction.",
+    "north, zenith angles from 0 at the zenith, beyond half a turn on the second face; the slope\n"
+    "distance is in metres. Writes NORTH EAST ELEVATION of the target's foot in the plane, without\n"
+    "curvature or refraction.",
     {INSTRUMENT, TARGET, SCALE, DEGREES, RADIANS, CSV, KEEP, PRECISION},
     {{"echo '30 88 100 P1' | basalt reduce 1000,2000,50 --instrument 1.6 --target 1.5 --degrees",
       "1086.5498 2049.9695 53.5899 P1"}},

@@ -77,9 +77,8 @@ const Command AREA = {
     "",
     "area and perimeter of polygons in the plane",
     "Reads a vertex NORTH EAST in metres on each line; a blank line or the input's end completes a polygon.\n"
-    "Writes AREA PERIMETER COUNT for each: square metres, positive where the vertices run clockwise, "
-    "metres,\n"
-    "and the number of vertices. The first vertex need not be repeated.",
+    "Writes AREA PERIMETER COUNT for each: square metres, positive where the vertices run clockwise;\n"
+    "metres; and the number of vertices. The first vertex need not be repeated.",
     {CSV, PRECISION},
     {{R"(printf '0 0\n10 0\n10 20\n\n0 0\n0 5\n5 5\n5 0\n' | basalt area --precision 2)",
       "100.00 52.36 3\n-25.00 20.00 4"}},
@@ -92,7 +91,7 @@ const Command CONTAINS = {
     "Reads NORTH EAST in metres. Writes 1 for a point inside or on a vertex, else 0. POLYGON.csv has a\n"
     "vertex NORTH,EAST on each line, in either order; more fields, blank lines and what follows a # are\n"
     "passed over, and the first vertex may be repeated at the end. A point on an edge may be either;\n"
-    "--tolerance brings the outline in.",
+    "with --tolerance it is inside.",
     {TOLERANCE, CSV, KEEP},
     {{"printf '0,0\\n0,10\\n10,10\\n10,0\\n' >site.csv; printf '5 5\\n5 15\\n' | basalt contains site.csv "
       "--keep",

@@ -78,7 +78,7 @@ const Command HEX = {
     {},
     {{"echo 'P1 ok' | basalt hex", "5031206f6b"}},
     make_hex,
-    Lines::WHOLE};
+    Lines::ONE_FIELD};
 
 const Command UNHEX = {
     "unhex",
@@ -89,7 +89,7 @@ const Command UNHEX = {
     {},
     {{"echo '5031206F6B' | basalt unhex", "P1 ok"}},
     make_unhex,
-    Lines::WHOLE};
+    Lines::ONE_FIELD};
 
 const Command PATH = {
     "path",
@@ -101,5 +101,5 @@ const Command PATH = {
     {CSV, KEEP},
     {{"echo '/data/job.tar.gz' | basalt path --csv", ",/data/,job.tar,.gz"}},
     make_path,
-    Lines::WHOLE,
+    Lines::ONE_FIELD,
     '\t'};

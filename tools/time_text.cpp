@@ -83,7 +83,7 @@ Moment parse_moment(std::string_view text) {
         moment.seconds = 3600 * hour + 60 * minute + second;
     }
     if (!scanner.good || !scanner.left.empty()) {
-        fail("a time like 2024-02-29 or 2024-02-29T23:59:59.5");
+        fail(A_TIME);
     }
     if (year > 65535 || month < 1 || month > 12 || day < 1) {
         fail("a date from 1858-11-17 to 65535-12-31");

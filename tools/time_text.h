@@ -12,6 +12,9 @@ inline constexpr int SECONDS_OF_DAY = 86400;
 /// Last MJD whose year has five digits and fits its record.
 inline constexpr std::uint32_t LAST_MJD = 23'257'590;
 
+/// What parse_moment() reads, for messages.
+inline constexpr const char* A_TIME = "a time like 2024-02-29 or 2024-02-29T23:59:59.5";
+
 struct Moment {
     std::uint32_t mjd;              ///< whole days since 1858-11-17
     std::optional<double> seconds;  ///< of the day; none for a date alone

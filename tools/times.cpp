@@ -12,8 +12,6 @@
 
 namespace {
 
-constexpr const char* A_TIME = "a time like 2024-02-29 or 2024-02-29T23:59:59.5";
-
 constexpr std::uint32_t GPS_EPOCH = 44244;
 /// The library keeps 16 bits of the days since 1980-01-06.
 constexpr std::uint32_t LAST_GPS_DAY = GPS_EPOCH + 65535;
@@ -181,7 +179,7 @@ const Command JAVATIME = {
     "javatime",
     "",
     "milliseconds since 1970 of a calendar time",
-    "Reads TIME as mjd does, UTC, from 1970 to 30827; what is below a millisecond is cut. Writes\n"
+    "Reads TIME as mjd does, UTC, from 1970 to 30827; fractions of a millisecond are dropped. Writes\n"
     "MILLISECONDS since 1970-01-01T00:00:00Z. With --inverse reads those and writes TIME.",
     {INVERSE, CSV, KEEP},
     {{"echo '2001-09-09T01:46:40Z' | basalt javatime", "1000000000000"},

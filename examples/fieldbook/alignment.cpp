@@ -50,8 +50,8 @@ AxisPoint along_spiral_out(const Element& spiral, const AxisPoint& start, double
 AxisPoint along_arc(const Element& arc, const AxisPoint& start, double length, double rise) {
     const double angle = geo_arc_length_to_angle(length, arc.radius);
     AxisPoint point = {{}, start.bearing + arc.hand * angle};
-    geo_grid_follow3(start.at, start.bearing + arc.hand * 0.5 * angle,
-                     2.0 * arc.radius * sine_cosine(0.5 * angle).sine, rise, point.at);
+    const double chord = 2.0 * arc.radius * std::sin(0.5 * angle);
+    geo_grid_follow3(start.at, start.bearing + arc.hand * 0.5 * angle, chord, rise, point.at);
     return point;
 }
 
@@ -72,21 +72,16 @@ double pieces_within(double sagitta, double radius, double length) {
         return 1.0;
     }
     // At a sagitta of the radius or more, half the chord is the radius.
-    const double half = sagitta < radius ? geo_arc_to_chord(radius, sagitta) : radius;
-    const double half_angle =
-        geo_grid_bearing({0.0, 0.0, 0.0}, {std::sqrt(radius * radius - half * half), half, 0.0});
-    const double piece = geo_arc_angle_to_length(2.0 * half_angle, radius);
+    const double half_chord = sagitta < radius ? geo_arc_to_chord(radius, sagitta) : radius;
+    const double piece = geo_arc_angle_to_length(2.0 * std::asin(half_chord / radius), radius);
     constexpr double ROUNDING = 1e-9;
     return std::max(1.0, std::ceil(length / piece - ROUNDING));
 }
 
+/// Sagitta of the chord over a length of arc.
 double stand_off(double radius, double arc) {
-    return radius == GEO_INFINITY ? 0.0
-                                  : radius * (1.0 - sine_cosine(0.5 * std::min(arc / radius, PI)).cosine);
+    return radius == GEO_INFINITY ? 0.0 : radius * (1.0 - std::cos(0.5 * std::min(arc / radius, PI)));
 }
-
-constexpr const char* NAMES[] = {"straight", "spiral in", "arc",
-                                 "spiral out"};  // in the order of ElementKind
 
 /// Lengths along an element at which the chainage is a whole multiple of the interval, and its two ends.
 std::vector<double> stops(double chainage, double length, double interval) {
@@ -121,6 +116,7 @@ AxisPoint along(const Element& element, const AxisPoint& start, double grade, do
 }
 
 std::vector<ChainagePoint> set_out_axis(const Alignment& alignment, double interval, double sagitta) {
+    constexpr const char* NAMES[] = {"straight", "spiral in", "arc", "spiral out"};  // as ElementKind
     std::vector<ChainagePoint> points;
     AxisPoint start = alignment.start;
     double chainage = alignment.chainage;

@@ -8,7 +8,6 @@
 
 namespace {
 
-constexpr double LARGEST_COORDINATE = 1e8;
 constexpr double LONGEST_ELEMENT = 10000.0;
 constexpr std::array<std::string_view, 4> NAMES = {"straight", "spiral_in", "arc", "spiral_out"};
 constexpr const char* KINDS = "straight, spiral_in, arc, spiral_out or end";
@@ -49,9 +48,7 @@ private:
 
     void read_start() {
         m_alignment.chainage = m_csv.number(1, "a chainage in metres", -1e7, 1e7);
-        m_alignment.start.at.north = coordinate(2, "a north coordinate in metres");
-        m_alignment.start.at.east = coordinate(3, "an east coordinate in metres");
-        m_alignment.start.at.elevation = m_csv.number(4, "an elevation in metres", -1e5, 1e5);
+        m_alignment.start.at = read_coordinates(m_csv, 2);
         m_alignment.start.bearing = read_angle(m_csv, 5, "a bearing");
         m_alignment.grade = m_csv.number(6, "a grade as rise over run, -1 to 1", -1.0, 1.0);
         m_csv.expect_end(7);

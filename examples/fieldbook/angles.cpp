@@ -1,15 +1,7 @@
 #include "angles.h"
 
-#include <basalt/geo.h>
-
 #include <algorithm>
 #include <optional>
-
-SineCosine sine_cosine(double radians) {
-    geo_nee unit = {};
-    geo_grid_follow3({0.0, 0.0, 0.0}, radians, 1.0, 0.0, unit);
-    return {unit.east, unit.north};
-}
 
 double read_angle(const CsvReader& csv, std::size_t index, const std::string& what) {
     const std::string expected = what + " from 0 to below 360 degrees, as 12.5 or 12-30-00";
@@ -21,6 +13,16 @@ double read_angle(const CsvReader& csv, std::size_t index, const std::string& wh
     const double radians = angle.value_or(2.0 * PI);
     csv.require(radians < 2.0 * PI, index, expected);
     return radians;
+}
+
+geo_nee read_coordinates(const CsvReader& csv, std::size_t index) {
+    constexpr double LARGEST_ELEVATION = 1e5;
+    geo_nee point = {};
+    point.north = csv.number(index, "a north coordinate in metres", -LARGEST_COORDINATE, LARGEST_COORDINATE);
+    point.east =
+        csv.number(index + 1, "an east coordinate in metres", -LARGEST_COORDINATE, LARGEST_COORDINATE);
+    point.elevation = csv.number(index + 2, "an elevation in metres", -LARGEST_ELEVATION, LARGEST_ELEVATION);
+    return point;
 }
 
 std::string dms_text(double radians, int decimals) {

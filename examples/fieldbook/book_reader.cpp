@@ -4,18 +4,13 @@
 #include <array>
 
 #include "angles.h"
+#include "number_parsing.h"
 
 namespace {
 
-constexpr double LARGEST_COORDINATE = 1e8;
-constexpr double LARGEST_ELEVATION = 1e5;
 constexpr double LARGEST_HEIGHT = 100.0;
 constexpr double LONGEST_SIGHT = 1e5;
 constexpr std::array<std::string_view, 3> SIGHTS = {"back", "fore", "side"};  // in the order of SightKind
-
-std::string in_quotes(const std::string& name) {
-    return "'" + name + "'";
-}
 
 class BookReader {
 public:
@@ -56,11 +51,7 @@ private:
         NamedPoint point = {name(1, "the name of a control point"), {}};
         m_csv.require(m_book.find_control(point.name) == nullptr, 1, "a control point not given before");
         m_csv.require(m_book.setups.empty(), 0, "control points ahead of the first station");
-        point.at.north =
-            m_csv.number(2, "a north coordinate in metres", -LARGEST_COORDINATE, LARGEST_COORDINATE);
-        point.at.east =
-            m_csv.number(3, "an east coordinate in metres", -LARGEST_COORDINATE, LARGEST_COORDINATE);
-        point.at.elevation = m_csv.number(4, "an elevation in metres", -LARGEST_ELEVATION, LARGEST_ELEVATION);
+        point.at = read_coordinates(m_csv, 2);
         m_csv.expect_end(5);
         m_book.control.push_back(std::move(point));
     }
@@ -77,10 +68,10 @@ private:
             const Setup& previous = m_book.setups.back();
             const Sight* fore = previous.find(SightKind::FORE);
             m_csv.require(m_book.setups.size() == 1 || m_book.find_control(previous.name) == nullptr, 0,
-                          "the traverse to end at control point " + in_quotes(previous.name));
-            m_csv.require(fore != nullptr, 0, "a fore sight at " + in_quotes(previous.name) + " first");
+                          "the traverse to end at control point " + quoted(previous.name));
+            m_csv.require(fore != nullptr, 0, "a fore sight at " + quoted(previous.name) + " first");
             m_csv.require(setup.name == fore->name, 1,
-                          "station " + in_quotes(fore->name) + ", the fore sight before");
+                          "station " + quoted(fore->name) + ", the fore sight before");
         }
         m_setup_place = m_csv.place(0);
         m_book.setups.push_back(std::move(setup));
@@ -89,7 +80,7 @@ private:
     void require_back_sight() const {
         if (m_book.setups.back().find(SightKind::BACK) == nullptr) {
             m_csv.fail_at(m_setup_place,
-                          "expected a back sight at station " + in_quotes(m_book.setups.back().name));
+                          "expected a back sight at station " + quoted(m_book.setups.back().name));
         }
     }
 
@@ -105,17 +96,17 @@ private:
         const NamedPoint* to = m_book.find_control(target);
         m_csv.require(from == nullptr || to == nullptr || from->at.north != to->at.north ||
                           from->at.east != to->at.east,
-                      1, "a control point at another place than " + in_quotes(setup.name));
+                      1, "a control point at another place than " + quoted(setup.name));
         if (kind == SightKind::BACK) {
             const std::size_t count = m_book.setups.size();
             m_csv.require(count > 1 || to != nullptr, 1, "a control point as first back sight");
             const std::string& before = m_book.setups[std::max<std::size_t>(count, 2) - 2].name;
-            m_csv.require(count == 1 || target == before, 1, "a back sight to " + in_quotes(before));
+            m_csv.require(count == 1 || target == before, 1, "a back sight to " + quoted(before));
         }
         if (const Sight* other = setup.find(kind)) {
             m_csv.require(other->name == target, 1,
                           "no second " + std::string(SIGHTS[static_cast<std::size_t>(kind)]) +
-                              " sight beside " + in_quotes(other->name));
+                              " sight beside " + quoted(other->name));
         }
     }
 
@@ -149,10 +140,10 @@ private:
         if (sight == sights.end()) {
             sight = sights.insert(sights.end(), {kind, target, height, std::nullopt, std::nullopt});
         }
-        m_csv.require(sight->kind == kind, 0, "the same kind of sight as before to " + in_quotes(target));
+        m_csv.require(sight->kind == kind, 0, "the same kind of sight as before to " + quoted(target));
         m_csv.require(sight->height == height, 2, "the same target height as on the other face");
         std::optional<geo_hvd>& slot = second_face ? sight->face2 : sight->face1;
-        m_csv.require(!slot, 6, "one reading a face to " + in_quotes(target));
+        m_csv.require(!slot, 6, "one reading a face to " + quoted(target));
         slot = obs;
     }
 

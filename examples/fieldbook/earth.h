@@ -18,17 +18,17 @@ struct EarthPoint {
 /// for true north there, and elevation differences for distances from that plane.
 class Earth {
 public:
-    /// A grid point and its geodetic position. InputError when the position has no Cartesian counterpart in
-    /// the library.
+    /// A grid point and its geodetic position. InputError for the position that the library does not take.
     Earth(const geo_nee& anchor, const geo_llh& position, double scale);
 
     EarthPoint locate(const geo_nee& point, const Covariance& covariance) const;
 
 private:
+    geo_vector axis(const geo_nee& unit) const;
+
     geo_nee m_anchor;
     double m_scale;
-    geo_vector m_origin;
-    geo_vector m_axes[3];  // of north, east and up, earth-centred
+    basalt::LocalFrame m_frame;
 };
 
 #endif

@@ -83,7 +83,6 @@ refused "bad.csv:1:1: the line is longer than 4096 bytes: '?????????????????????
 { printf '# %04094d\n' 0; cat book.csv; } >long.csv # the longest
 succeeds long.csv
 refused "no field book given (--help shows how)"
-succeeds book.csv --precision 3,2,2 --wgs84 K1,47.5,8.5,450
 cmp -s book.csv "$data"/fieldbook.csv || fail "the book was overwritten"
 cp book.csv -- -odd.csv
 succeeds -- -odd.csv

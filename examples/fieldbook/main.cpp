@@ -23,20 +23,12 @@ Target wgs84_into(std::optional<EarthAnchor>& anchor) {
             }};
 }
 
-Target precision_into(InstrumentPrecision& precision) {
-    return {"SECONDS,MM,PPM", [&precision](const std::string& text) {
-                double value[3] = {};
-                const bool is_list = read_numbers(text, value);
-                precision = {value[0] * RADIANS_PER_SECOND, value[1] * 1e-3, value[2] * 1e-6};
-                return is_list && value[0] >= 0.0 && value[0] <= 3600.0 && value[1] >= 0.0 &&
-                       value[1] <= 1e4 && value[2] >= 0.0 && value[2] <= 1e4;
-            }};
-}
-
 std::string reduce(const Options& options) {
-    const Results results = compute(options);
     if (options.csv) {
         spare_inputs("--csv", *options.csv, {options.book, options.alignment.value_or(options.book)});
+    }
+    const Results results = compute(options);
+    if (options.csv) {
         OutputFile(*options.csv).write(write_csv(results));
     }
     return write_report(results);
@@ -49,17 +41,16 @@ int main(int count, char** arguments) {
     const Program program = {
         "fieldbook",
         "Usage: fieldbook BOOK.csv [OPTION]...\n\n"
-        "Reads a total station's field book, brings the two faces together, computes and balances the "
-        "traverse,\n"
-        "reduces the side sights to grid points, and sets out an alignment.\n",
-        "Exit status: 0 success, 1 the results could not be written or memory ran out, 2 bad arguments or "
-        "input.\n",
-        {{"--alignment", "FILE",
-          "set this axis of straights, spirals and arcs out from the traverse's stations",
+        "Reads a total station's field book, means the two faces, computes and balances the traverse, "
+        "reduces\n"
+        "the side sights to grid points, and sets out an alignment.\n",
+        "Exit status: 0 success, 1 the results could not be written or memory ran out, 2 bad arguments\n"
+        "or input.\n",
+        {{"--alignment", "FILE", "axis to set out from the traverse's stations: straights, spirals, arcs",
           file_into(o.alignment)},
          {"--interval", "M", "at every multiple of this chainage, 0.1 to 10000 metres (default: 20)",
           number_into(o.interval, 0.1, 1e4, "metres from 0.1 to 10000"), "--alignment"},
-         {"--sagitta", "M", "chords stand off the axis by this at most, 0.0001 to 10 metres (default: 0.01)",
+         {"--sagitta", "M", "largest distance of a chord from the axis, 0.0001 to 10 m (default: 0.01)",
           number_into(o.sagitta, 1e-4, 10.0, "metres from 0.0001 to 10"), "--alignment"},
          {"--target-height", "M", "height of the target when setting out, -100 to 100 metres (default: 1.5)",
           number_into(o.target_height, -100.0, 100.0, "metres from -100 to 100"), "--alignment"},
@@ -69,9 +60,6 @@ int main(int count, char** arguments) {
           "degrees and metres of a control point: earth-centred and geodetic\n"
           "coordinates of all points, and their standard deviations",
           wgs84_into(o.wgs84)},
-         {"--precision", "SECONDS,MM,PPM",
-          "with --wgs84: standard deviations of an angle and of a distance (default: 3,2,2)",
-          precision_into(o.precision), "--wgs84"},
          {"--csv", "FILE", "write all points into this file too", file_into(o.csv)}},
         [&o](const std::vector<std::string>& operands) {
             o.book = only_operand(operands, "field book").value_or("");

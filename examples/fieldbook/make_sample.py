@@ -8,12 +8,13 @@ import sys
 
 CONTROL = {"K1": (5000.0, 2000.0, 100.0), "K2": (5312.5, 1804.25, 112.3),
            "K3": (5110.0, 2560.0, 96.4), "K4": (4896.75, 2731.5, 91.85)}
-STATIONS = {"K1": (5000.0, 2000.0, 100.0), "T1": (5048.0, 2136.0, 103.25), "T2": (5138.0, 2256.0, 98.6),
-            "T3": (5086.0, 2404.0, 101.95), "K3": (5110.0, 2560.0, 96.4)}
-HEIGHTS = {"K1": 1.562, "T1": 1.487, "T2": 1.605, "T3": 1.534, "K3": 1.578}
-CIRCLE = {"K1": 0.0, "T1": 41.37, "T2": 203.9, "T3": 117.25, "K3": 355.11}  # degrees at grid north
+NEW = {"T1": (5048.0, 2136.0, 103.25), "T2": (5138.0, 2256.0, 98.6), "T3": (5086.0, 2404.0, 101.95)}
 SIDES = {"K1": {"P1": (5061.2, 2018.4, 101.33)}, "T2": {"P2": (5171.45, 2301.1, 97.02), "P3": (5102.9, 2233.75, 99.4)},
          "K3": {"P4": (5144.6, 2588.8, 95.15)}}
+POINTS = {**CONTROL, **NEW}
+ROUTE = ["K2", "K1", "T1", "T2", "T3", "K3", "K4"]  # the first and the last are only sighted
+HEIGHTS = {"K1": 1.562, "T1": 1.487, "T2": 1.605, "T3": 1.534, "K3": 1.578}
+CIRCLE = {"K1": 0.0, "T1": 41.37, "T2": 203.9, "T3": 117.25, "K3": 355.11}  # degrees at grid north
 ONE_FACE = {"P3"}
 SECOND = math.pi / 648000
 
@@ -29,12 +30,9 @@ def dms(angle):
 
 
 def sight(kind, station, name, target, height):
-    at = STATIONS[station]
-    north, east = target[0] - at[0], target[1] - at[1]
-    rise = target[2] + height - at[2] - HEIGHTS[station]
-    run = math.hypot(north, east)
-    if {station, name} == {"T1", "T2"}:
-        run += DISTANCE
+    north, east, rise = (b - a for a, b in zip(POINTS[station], target))
+    rise += height - HEIGHTS[station]
+    run = math.hypot(north, east) + (DISTANCE if {station, name} == {"T1", "T2"} else 0.0)
     horizontal = math.atan2(east, north) - math.radians(CIRCLE[station]) + (ANGLE if kind == "fore" else 0.0)
     zenith, slope = math.atan2(run, rise), math.hypot(run, rise)
     booked = height - TARGET if (kind, station) == ("fore", "T2") else height
@@ -50,58 +48,44 @@ def field_book():
     lines += [f"point,{name},{n:.3f},{e:.3f},{h:.3f}" for name, (n, e, h) in CONTROL.items()]
     lines += ["# station,NAME,INSTRUMENT_HEIGHT",
               "# back|fore|side,NAME,TARGET_HEIGHT,HORIZONTAL,ZENITH,SLOPE_DISTANCE,FACE"]
-    route = list(STATIONS)
-    for i, name in enumerate(route):
-        back = "K2" if i == 0 else route[i - 1]
-        fore = "K4" if i + 1 == len(route) else route[i + 1]
+    for back, name, fore in zip(ROUTE, ROUTE[1:], ROUTE[2:]):
         lines.append(f"station,{name},{HEIGHTS[name]:.3f}")
-        lines += sight("back", name, back, {**CONTROL, **STATIONS}[back], 1.6)
-        lines += sight("fore", name, fore, {**CONTROL, **STATIONS}[fore], 1.55)
+        lines += sight("back", name, back, POINTS[back], 1.6) + sight("fore", name, fore, POINTS[fore], 1.55)
         for side, at in SIDES.get(name, {}).items():
             lines += sight("side", name, side, at, 2.0)
     return lines
 
 
-def integrate(curvature, length, pose, steps=2000):
-    """North, east and bearing after a length of a curve, by Simpson's rule on its turning tangent."""
+def follow(pose, length, curvature, steps=20000):
+    """North, east and bearing after a length of a curve, by the midpoint rule; curvature at a part of the length."""
     north, east, bearing = pose
-    turn = [bearing]
-    step = length / steps
-    for i in range(steps):  # curvature is linear in length, so the trapezium is exact
-        turn.append(turn[-1] + 0.5 * step * (curvature(i * step) + curvature((i + 1) * step)))
-    weight = [1 if i in (0, steps) else 4 if i % 2 else 2 for i in range(steps + 1)]
-    north += step / 3 * sum(w * math.cos(t) for w, t in zip(weight, turn))
-    east += step / 3 * sum(w * math.sin(t) for w, t in zip(weight, turn))
-    return north, east, turn[-1]
+    for i in range(steps):
+        turn = curvature((i + 0.5) / steps) * length / steps
+        north += math.cos(bearing + 0.5 * turn) * length / steps
+        east += math.sin(bearing + 0.5 * turn) * length / steps
+        bearing += turn
+    return north, east, bearing
 
 
 def alignment():
-    radius, spiral, arc = 180.0, 60.0, 120.0
     pose = (5030.0, 2030.0, math.radians(48.5))
-    pose = integrate(lambda l: 0.0, 95.0, pose)
-    pose = integrate(lambda l: l / (radius * spiral), spiral, pose)
-    pose = integrate(lambda l: 1 / radius, arc, pose)
-    pose = integrate(lambda l: (spiral - l) / (radius * spiral), spiral, pose)
-    north, east, bearing = integrate(lambda l: 0.0, 110.0, pose)
+    for length, curvature in ((95, lambda part: 0), (60, lambda part: part / 180), (120, lambda part: 1 / 180),
+                              (60, lambda part: (1 - part) / 180), (110, lambda part: 0)):
+        pose = follow(pose, length, curvature)
     return ["# An axis through the traverse. The end is stated 9 mm too far south and 12 mm too far west.",
             "# start,CHAINAGE,NORTH,EAST,ELEVATION,BEARING,GRADE", "start,1005,5030,2030,101.2,48-30-00,-0.004",
-            "straight,95", f"spiral_in,{spiral:g},{radius:g},right", f"arc,{arc:g},{radius:g},right",
-            f"spiral_out,{spiral:g},{radius:g},right", "straight,110", "# end,NORTH,EAST,BEARING",
-            f"end,{north - 0.009:.4f},{east - 0.012:.4f},{dms(bearing)}"]
+            "straight,95", "spiral_in,60,180,right", "arc,120,180,right", "spiral_out,60,180,right", "straight,110",
+            "# end,NORTH,EAST,BEARING", f"end,{pose[0] - 0.009:.4f},{pose[1] - 0.012:.4f},{dms(pose[2])}"]
 
 
 def truth():
-    points = {**CONTROL, **STATIONS, **{k: v for side in SIDES.values() for k, v in side.items()}}
-    return ["name,north,east,elevation"] + [f"{k},{n:.4f},{e:.4f},{h:.4f}" for k, (n, e, h) in points.items()]
+    sides = {name: at for side in SIDES.values() for name, at in side.items()}
+    return ["name,north,east,elevation"] + [f"{name},{n:.4f},{e:.4f},{h:.4f}"
+                                            for name, (n, e, h) in {**POINTS, **sides}.items()]
 
 
-def main():
-    if len(sys.argv) != 2 or sys.argv[1].startswith("-"):
-        sys.exit(__doc__)
-    for name, lines in (("fieldbook", field_book()), ("axis", alignment()), ("fieldbook_truth", truth())):
-        with open(f"{sys.argv[1]}/{name}.csv", "w", encoding="ascii", newline="\n") as file:
-            file.write("\n".join(lines) + "\n")
-
-
-if __name__ == "__main__":
-    main()
+if len(sys.argv) != 2 or sys.argv[1].startswith("-"):
+    sys.exit(__doc__)
+for file_name, text in (("fieldbook", field_book()), ("axis", alignment()), ("fieldbook_truth", truth())):
+    with open(f"{sys.argv[1]}/{file_name}.csv", "w", encoding="ascii", newline="\n") as file:
+        file.write("\n".join(text) + "\n")

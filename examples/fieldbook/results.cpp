@@ -9,24 +9,23 @@
 
 namespace {
 
-ResultPoint plain_point(PointKind kind, const NamedPoint& point, const Covariance& covariance) {
-    return {kind, point.name, point.at, covariance, std::nullopt, std::nullopt, std::nullopt};
-}
-
-void add_surveyed_points(Results& results, const Precision& precision) {
-    const double scale = results.options.scale;
+void add_surveyed_points(Results& results) {
+    const auto add = [&results](PointKind kind, const NamedPoint& point, const Covariance& covariance) {
+        results.points.push_back({kind, point.name, point.at, covariance, {}, {}, {}});
+    };
     for (const NamedPoint& point : results.book.control) {
-        results.points.push_back(plain_point(PointKind::CONTROL, point, {}));
+        add(PointKind::CONTROL, point, {});
     }
-    for (std::size_t i = 0; i < results.traverse.stations.size(); ++i) {
-        const NamedPoint& station = results.traverse.stations[i];
+    const Traverse& traverse = results.traverse;
+    for (std::size_t i = 0; i < traverse.stations.size(); ++i) {
+        const NamedPoint& station = traverse.stations[i];
         if (results.book.find_control(station.name) == nullptr) {
-            results.points.push_back(plain_point(PointKind::STATION, station, precision.station(i)));
+            add(PointKind::STATION, station, station_covariance(traverse, i));
         }
     }
-    for (const SidePoint& side : reduce_side_sights(results.book, results.traverse, scale)) {
-        results.points.push_back(plain_point(
-            PointKind::SIDE, side.point, precision.seen_from(side.setup, side.observation, side.point.at)));
+    for (const SidePoint& side : reduce_side_sights(results.book, traverse, results.options.scale)) {
+        add(PointKind::SIDE, side.point,
+            target_covariance(traverse, side.setup, side.observation, side.point.at));
     }
 }
 
@@ -47,15 +46,15 @@ SettingOut set_out(const Results& results, const geo_nee& point) {
     return result;
 }
 
-void add_axis_points(Results& results, const Alignment& alignment, const Precision& precision) {
+void add_axis_points(Results& results, const Alignment& alignment) {
     const Options& options = results.options;
     const std::vector<ChainagePoint> axis = set_out_axis(alignment, options.interval, options.sagitta);
     for (const ChainagePoint& point : axis) {
         const geo_nee& at = point.axis.at;
         const SettingOut out = set_out(results, at);
         results.points.push_back({PointKind::AXIS, fixed_text(point.chainage, 3), at,
-                                  precision.seen_from(out.setup, out.observation, at), point, out,
-                                  std::nullopt});
+                                  target_covariance(results.traverse, out.setup, out.observation, at), point,
+                                  out, std::nullopt});
     }
     if (alignment.end) {
         const AxisPoint& end = axis.back().axis;
@@ -83,10 +82,9 @@ Results compute(const Options& options) {
     const std::optional<Alignment> alignment =
         options.alignment ? std::optional(read_alignment(*options.alignment)) : std::nullopt;
     results.traverse = compute_traverse(results.book, options.scale);
-    const Precision precision(results.traverse, options.precision);
-    add_surveyed_points(results, precision);
+    add_surveyed_points(results);
     if (alignment) {
-        add_axis_points(results, *alignment, precision);
+        add_axis_points(results, *alignment);
     }
     if (options.wgs84) {
         place_on_earth(results, *options.wgs84);

@@ -28,7 +28,6 @@ struct Options {
     double target_height = 1.5;            ///< metres
     double scale = 1.0;                    ///< grid over ground
     std::optional<EarthAnchor> wgs84;
-    InstrumentPrecision precision = {3.0 * RADIANS_PER_SECOND, 0.002, 2e-6};
 };
 
 /// Setting-out values: the angle to turn and the distance to measure.

@@ -17,15 +17,15 @@ geo_hvd mean_of_faces(const Sight& sight);
 /// Instrument errors and reading spread from the two faces of one sight.
 struct FaceDifference {
     double collimation;  ///< half the difference of the horizontal readings, face 1 less face 2, radians
-    double index;        ///< half of what the zenith readings lack to or exceed 360 degrees, radians
+    double index;        ///< half the excess of the two zenith readings over 360 degrees, radians
     double distance;     ///< face 1 less face 2, metres
 };
 
 /// Only for a sight with both faces.
 FaceDifference face_difference(const Sight& sight);
 
-/// From one station to the next, the mean of fore sight and back sight: what both ends measure wrong in the
-/// same way, as by the earth's curvature and refraction, leaves the height.
+/// From one station to the next, the mean of fore sight and back sight: errors that both ends share, such as
+/// curvature and refraction, cancel in the rise.
 struct Leg {
     double bearing;     ///< with the angular misclosure taken out, radians
     double horizontal;  ///< on the grid, metres

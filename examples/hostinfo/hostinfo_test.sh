@@ -55,16 +55,16 @@ grep -q '^  handheld  *1' host.log || fail "the log is not text beside JSON"
 mkdir logs
 succeeds --log "logs\\été $(printf '\351').log" "$work/data.d"
 logs "logs/été $(printf '\351').log"
-succeeds --log /dev/null "$work/data.d"
+for log in nowhere/host.log data.d; do fails "cannot write the log $log" --log "$log"; done
+long=$(printf %0259d 0)
+(
+    ulimit -f 1 # KiB, as a full disk
+    fails "cannot write the log full.log" --log full.log --root "$long" --product "$long"
+    exit $failures
+)
+failures=$?
 mkfifo pipe
-for log in nowhere/host.log pipe data.d $([ ! -w /dev/full ] || echo /dev/full); do
-    fails "cannot write the log $log" --log "$log"
-done
-exec 3<>pipe 4<pipe 3>&- # a reader that waits for nobody
-succeeds --log pipe "$work/data.d"
-cat <&4 >piped
-exec 4<&-
-logs piped
+for log in pipe /dev/null; do refused "--log takes a file, not a device or a pipe: $log" --log "$log"; done
 
 # The file that is asked about is no log, by whatever name, and stays.
 printf x >asked.txt

@@ -3,14 +3,13 @@
 #include <basalt/frame.h>
 #include <basalt/util.h>
 
-#include <fcntl.h>
-#include <unistd.h>
 #include <nlohmann/json.hpp>
 
 #include <algorithm>
 #include <iterator>
-#include <optional>
 #include <stdexcept>
+
+#include "input_error.h"
 
 namespace {
 
@@ -59,27 +58,6 @@ struct AsJson {
     }
 };
 
-/// A device or a pipe, open for writing for as long as a log writes to it: it holds nothing to look at
-/// afterwards, but poll() and write() report whether it takes text.
-class Device {
-public:
-    explicit Device(const std::filesystem::path& path)
-        : m_file(open(path.c_str(), O_WRONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC)) {}
-    ~Device() {
-        if (m_file >= 0) {
-            close(m_file);
-        }
-    }
-    Device(const Device&) = delete;
-    Device& operator=(const Device&) = delete;
-
-    /// A full device refuses even an empty write; a pipe without a reader was not opened.
-    bool takes_text() const { return m_file >= 0 && write(m_file, "", 0) == 0; }
-
-private:
-    int m_file;
-};
-
 }  // namespace
 
 CString text_report(const std::vector<Section>& sections) {
@@ -107,22 +85,11 @@ std::string json_report(const std::vector<Section>& sections) {
 }
 
 std::string narrow(const CString& text) {
-    // In pieces, since the conversion is for short texts; they end with a line, since a combining mark may
-    // belong to the letter before it.
-    constexpr int PIECE = 1000;
-    constexpr int LONGEST_CHARACTER = 16;
-    std::string all;
-    for (int start = 0; start < text.GetLength();) {
-        CString piece = text.Mid(start, PIECE);
-        if (const int line_end = piece.ReverseFind(L'\n'); line_end >= 0) {
-            piece = piece.Left(line_end + 1);
-        }
-        start += piece.GetLength();
-        char bytes[PIECE * LONGEST_CHARACTER + 1];
-        _tchar2char(piece, bytes, PIECE * LONGEST_CHARACTER);
-        all += bytes;
-    }
-    return all;
+    constexpr int LONGEST_CHARACTER = 16;  // bytes
+    const int size = text.GetLength() * LONGEST_CHARACTER;
+    std::string bytes(static_cast<std::size_t>(size) + 1, '\0');
+    _tchar2char(text, bytes.data(), size);
+    return bytes.c_str();
 }
 
 std::filesystem::path system_path(std::string path) {
@@ -133,21 +100,19 @@ std::filesystem::path system_path(std::string path) {
 }
 
 void write_log(const std::string& path, const CString& text) {
-    // The log itself reports no errors. A device is open for as long as the log writes to it.
     const std::filesystem::path file = system_path(path);
     std::error_code unknown;
-    std::optional<Device> device;
     if (std::filesystem::is_other(file, unknown)) {
-        device.emplace(file);
+        throw InputError("--log takes a file, not a device or a pipe: " + path);
     }
     {
         vex_util::FileLogger log(path.c_str());
         log.Write(text);
     }
+    // The log itself reports no errors.
     const std::string bytes = narrow(text);
     const auto carriage_returns = static_cast<std::uintmax_t>(std::count(bytes.begin(), bytes.end(), '\n'));
-    if (device ? !device->takes_text()
-               : std::filesystem::file_size(file, unknown) != bytes.size() + carriage_returns) {
+    if (std::filesystem::file_size(file, unknown) != bytes.size() + carriage_returns) {
         throw std::runtime_error("cannot write the log " + path);
     }
 }

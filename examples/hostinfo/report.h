@@ -20,8 +20,8 @@ std::string narrow(const CString& text);
 /// The name under which the library has a file of a path: in UTF-8, `/` for either separator.
 std::filesystem::path system_path(std::string path);
 
-/// Writes a text into a log file, device or pipe. std::runtime_error, naming it, when it does not arrive
-/// there.
+/// Writes a text into a log file. InputError for a device or a pipe, std::runtime_error when the file does
+/// not hold the text afterwards.
 void write_log(const std::string& path, const CString& text);
 
 #endif

@@ -3,9 +3,8 @@
 #include <basalt/graphics.h>
 #include <fmt/format.h>
 
-#include <charconv>
+#include <optional>
 #include <string>
-#include <string_view>
 #include <vector>
 
 #include "chart.h"
@@ -16,14 +15,12 @@
 
 namespace {
 
-COLORREF parse_colour(std::string_view given) {
-    const std::string_view digits = given.substr(given.starts_with('#') ? 1 : 0);
-    unsigned value = 0;
-    const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), value, 16);
-    if (digits.size() != 6 || error != std::errc() || end != digits.data() + digits.size()) {
+COLORREF parse_colour(const std::string& given) {
+    const std::optional<unsigned> rgb = parse_rgb(given);
+    if (!rgb) {
         throw InputError("a colour is six hexadecimal digits RRGGBB, not " + quoted(given));
     }
-    return RGB(static_cast<int>(value >> 16), static_cast<int>(value >> 8), static_cast<int>(value));
+    return RGB(static_cast<int>(*rgb >> 16), static_cast<int>(*rgb >> 8), static_cast<int>(*rgb));
 }
 
 std::string hexadecimal(COLORREF colour) {
@@ -80,7 +77,6 @@ std::string draw_chart(const ColorPalette& palette, const std::string& file) {
     table.add({"pixels of the scene", number_text(matched.pixels)});
     table.add({"colours used", std::to_string(matched.colours_used)});
     table.add({"mean difference of a channel", number_text(matched.mean_difference, 3)});
-    table.add({"largest difference of a channel", std::to_string(matched.largest_difference)});
     return "\nPicture\n" + table.text();
 }
 
@@ -91,13 +87,12 @@ int main(int count, char** arguments) {
     return run_program(
         {"palette",
          "Usage: palette [COLOUR]... [--picture FILE]\n\n"
-         "Finds the palette's colours nearest to others, given as RRGGBB or #RRGGBB, and the colour for text "
-         "over\nthem. Without a colour: lists the palette's ranges.\n",
-         "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad "
+         "Finds the palette's colours nearest to others, given as RRGGBB or #RRGGBB, and the colour for\n"
+         "text over them. Without a colour: lists the palette's ranges.\n",
+         "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad\n"
          "arguments.\n",
          {{"--picture", "FILE",
-           "draw all colours with their numbers, and a scene beside its nearest colours, "
-           "as a BMP\nfile",
+           "draw all colours with their numbers, and a scene in its nearest colours, as a BMP file",
            file_into(picture)}},
          [&picture](const std::vector<std::string>& colours) {
              const ColorPalette palette;

@@ -10,15 +10,12 @@ namespace {
 // Places in the scene: x from 0 (left) to 1, y from 0 (top) to 1.
 constexpr double SUN_X = 0.68;
 constexpr double SUN_Y = 0.40;
-constexpr double SHORE = 0.66;
+constexpr double HORIZON = 0.66;
 constexpr int RIDGES = 4;
 
 COLORREF sky(double x, double y) {
-    const double down = std::clamp(y / SHORE, 0.0, 1.0);
-    const COLORREF high = RGB(30, 74, 172);
-    const COLORREF middle = RGB(112, 156, 216);
-    const COLORREF low = RGB(255, 168, 92);
-    const COLORREF air = down < 0.5 ? mixed(high, middle, 2.0 * down) : mixed(middle, low, 2.0 * down - 1.0);
+    const double down = std::clamp(y / HORIZON, 0.0, 1.0);
+    const COLORREF air = mixed(RGB(30, 74, 172), RGB(255, 168, 92), down * down);
     const double from_sun = std::hypot((x - SUN_X) * 1.6, y - SUN_Y);
     const COLORREF glow = mixed(air, RGB(255, 214, 96), 0.85 * std::exp(-7.0 * from_sun));
     return from_sun < 0.035 ? RGB(255, 250, 228) : glow;
@@ -27,38 +24,21 @@ COLORREF sky(double x, double y) {
 /// Top of a ridge, the farthest first.
 double ridge(int number, double x) {
     const double n = number;
-    return 0.46 + 0.05 * n - 0.055 * std::sin(5.1 * x + 1.9 * n) - 0.028 * std::sin(13.7 * x + 4.1 * n * n) -
+    return 0.46 + 0.11 * n - 0.055 * std::sin(5.1 * x + 1.9 * n) - 0.028 * std::sin(13.7 * x + 4.1 * n * n) -
            0.008 * std::sin(61.0 * x + 9.0 * n) - 0.004 * std::sin(149.0 * x + 2.0 * n);
 }
 
-COLORREF land(double x, double y) {
+/// Sky, and before it ridges with haze at the foot of each.
+COLORREF scene_at(double x, double y) {
     COLORREF colour = sky(x, y);
     for (int number = 0; number < RIDGES; ++number) {
         const double below = y - ridge(number, x);
         if (below > 0.0) {
-            const COLORREF far = RGB(158, 98, 140);
-            const COLORREF near = RGB(16, 62, 30);
-            const COLORREF ground = mixed(far, near, number / (RIDGES - 1.0));
-            // Haze gathers at the foot of each ridge.
-            colour = mixed(ground, sky(x, SHORE), std::min(0.45, 2.2 * below * (RIDGES - number) / RIDGES));
+            const COLORREF ground = mixed(RGB(158, 98, 140), RGB(16, 62, 30), number / (RIDGES - 1.0));
+            colour = mixed(ground, sky(x, HORIZON), std::min(0.45, 2.2 * below * (RIDGES - number) / RIDGES));
         }
     }
     return colour;
-}
-
-COLORREF lake(double x, double y) {
-    const double depth = (y - SHORE) / (1.0 - SHORE);
-    const double ripple = 0.006 * depth * std::sin(420.0 * std::sqrt(depth + 0.02) + 9.0 * std::sin(7.0 * x));
-    const COLORREF mirrored = land(x + ripple, SHORE - (y - SHORE) * 1.4);
-    return mixed(mixed(mirrored, RGB(30, 58, 92), 0.25), RGB(14, 30, 52), 0.6 * depth);
-}
-
-/// Film grain: -1 to 1 for a pixel.
-double grain(int x, int y) {
-    std::uint32_t h =
-        static_cast<std::uint32_t>(x) * 0x9E3779B1U ^ static_cast<std::uint32_t>(y) * 0x85EBCA77U;
-    h = (h ^ h >> 15) * 0xC2B2AE3DU;
-    return static_cast<double>(h >> 16) / 32767.5 - 1.0;
 }
 
 }  // namespace
@@ -67,11 +47,7 @@ Canvas make_scene(int width, int height) {
     Canvas canvas(width, height, 0);
     for (int row = 0; row < height; ++row) {
         for (int column = 0; column < width; ++column) {
-            const double x = (column + 0.5) / width;
-            const double y = (row + 0.5) / height;
-            const double light = 0.02 * grain(column, row);
-            const COLORREF clean = y < SHORE ? land(x, y) : lake(x, y);
-            canvas.set(column, row, mixed(clean, light > 0.0 ? RGB(255, 255, 255) : 0, std::abs(light)));
+            canvas.set(column, row, scene_at((column + 0.5) / width, (row + 0.5) / height));
         }
     }
     return canvas;
@@ -79,7 +55,7 @@ Canvas make_scene(int width, int height) {
 
 Matched match(const Canvas& picture, const ColorPalette& palette) {
     Matched matched = {Canvas(picture.width(), picture.height(), 0),
-                       std::int64_t{picture.width()} * picture.height(), 0, 0.0, 0};
+                       std::int64_t{picture.width()} * picture.height(), 0, 0.0};
     std::array<bool, 256> used = {};
     std::int64_t sum = 0;
     for (int y = 0; y < picture.height(); ++y) {
@@ -90,10 +66,8 @@ Matched match(const Canvas& picture, const ColorPalette& palette) {
             used[number] = true;
             matched.picture.set(x, y, given);
             for (const int shift : {0, 8, 16}) {
-                const int difference = std::abs(static_cast<int>(wanted >> shift & 0xFF) -
-                                                static_cast<int>(given >> shift & 0xFF));
-                sum += difference;
-                matched.largest_difference = std::max(matched.largest_difference, difference);
+                sum += std::abs(static_cast<int>(wanted >> shift & 0xFF) -
+                                static_cast<int>(given >> shift & 0xFF));
             }
         }
     }

@@ -8,7 +8,7 @@
 
 #include "drawing.h"
 
-/// Evening sky, hills in haze and a lake, the same on every run.
+/// Evening sky and hills in haze, the same on every run.
 Canvas make_scene(int width, int height);
 
 struct Matched {
@@ -16,7 +16,6 @@ struct Matched {
     std::int64_t pixels;
     int colours_used;
     double mean_difference;  ///< over pixels and channels, of 255
-    int largest_difference;  ///< in one channel, of 255
 };
 
 /// The picture with each pixel's colour replaced by the palette's nearest.

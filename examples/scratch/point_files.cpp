@@ -54,7 +54,7 @@ void PointStore::add(const Point& point) {
         stop_if_interrupted();
         auto map = std::make_unique<vex_util::CMemoryMap>();
         if (!map->Create(FILE_BYTES)) {
-            throw std::runtime_error("no room for 64 MiB of points, in the temporary folder or in memory");
+            throw std::runtime_error("no space for 64 MiB of points, in the temporary folder or in memory");
         }
         m_maps.push_back(std::move(map));
     }

@@ -17,9 +17,6 @@ struct Point {
 };
 static_assert(sizeof(Point) == 16);
 
-/// An order-independent checksum of points is the sum of these.
-std::uint64_t fingerprint(const Point& point);
-
 /// Points scattered over a square site of about four points a square metre, on ground that rises by one in
 /// fifty to the north with up to two metres of growth on it. The same points in every run, drawn with the
 /// minimal standard generator (Park and Miller, 1988), so that other programs can draw them too.

@@ -34,8 +34,8 @@ std::uint64_t glyph(char character) {
     return GLYPHS[at == std::string_view::npos ? 0 : at];
 }
 
-/// Words hold red high, colours blue: the same exchange both ways.
-std::uint32_t exchanged(std::uint32_t colour) {
+/// Swaps red and blue: words are 0x00RRGGBB, colours 0x00BBGGRR.
+std::uint32_t swapped(std::uint32_t colour) {
     return (colour & 0xFF) << 16 | (colour & 0xFF00) | (colour >> 16 & 0xFF);
 }
 
@@ -60,15 +60,15 @@ COLORREF mixed(COLORREF from, COLORREF to, double part) {
 }
 
 Canvas::Canvas(int width, int height, COLORREF ground)
-    : m_width(width), m_height(height), m_words(index(0, height), exchanged(ground)) {}
+    : m_width(width), m_height(height), m_words(index(0, height), swapped(ground)) {}
 
 COLORREF Canvas::get(int x, int y) const {
-    return has(x, y) ? exchanged(m_words[index(x, y)]) : CLR_INVALID;
+    return has(x, y) ? swapped(m_words[index(x, y)]) : CLR_INVALID;
 }
 
 void Canvas::set(int x, int y, COLORREF colour) {
     if (has(x, y)) {
-        m_words[index(x, y)] = exchanged(colour);
+        m_words[index(x, y)] = swapped(colour);
     }
 }
 

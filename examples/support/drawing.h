@@ -18,7 +18,7 @@ struct CanvasPoint {
     double y;
 };
 
-/// Pixels outside are left out.
+/// An array of pixels. Outside it set() does nothing, and get() returns CLR_INVALID.
 class Canvas {
 public:
     Canvas(int width, int height, COLORREF ground);
@@ -30,7 +30,7 @@ public:
 
     COLORREF get(int x, int y) const;
     void set(int x, int y, COLORREF colour);
-    /// A straight line with round ends and smooth edges, so opaque (0 to 1).
+    /// A straight line with round ends and smooth edges. opacity: 0 to 1.
     void line(CanvasPoint from, CanvasPoint to, double thickness, COLORREF colour, double opacity = 1.0);
 
 private:
@@ -64,7 +64,7 @@ public:
     static int text_width(const std::string& line, int scale = 2);
     static int text_height(int scale = 2);
 
-    /// Writes a BMP file; nothing can be drawn any more. std::runtime_error, naming the file and, where it is
+    /// Writes a BMP file; the drawing cannot be used afterwards. std::runtime_error, naming the file and, if
     /// known, the system's reason, when that fails.
     void save(const std::string& path);
 

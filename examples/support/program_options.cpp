@@ -4,7 +4,7 @@
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <set>
+#include <map>
 
 #include "command_line.h"
 #include "input_error.h"
@@ -23,22 +23,20 @@ std::string usage_of(const Program& program) {
     return fmt::format("{}\n{}\n{}", program.usage, columns.text(), program.ending);
 }
 
-/// Hands the values out; gives the operands.
+/// Passes each option's value to its target.
 void take_options(const Program& program, const CommandLine& line) {
-    std::set<std::string_view> given(line.flags.begin(), line.flags.end());
-    for (const auto& [name, value] : line.options) {
-        given.insert(name);
+    std::map<std::string_view, std::string> given(line.options.begin(), line.options.end());
+    for (const std::string& flag : line.flags) {
+        given[flag];
     }
     for (const ProgramOption& option : program.options) {
-        if (given.count(option.name) == 0) {
+        const auto at = given.find(option.name);
+        if (at == given.end()) {
             continue;
         }
-        const auto at = std::find_if(line.options.begin(), line.options.end(),
-                                     [&](const auto& pair) { return pair.first == option.name; });
-        const std::string value = at == line.options.end() ? "" : at->second;
-        if (!option.target.take(value)) {
+        if (!option.target.take(at->second)) {
             throw InputError(std::string(option.name) + " takes " + option.target.expected + ", not " +
-                             quoted(value));
+                             quoted(at->second));
         }
         if (*option.with != '\0' && given.count(option.with) == 0) {
             throw InputError(std::string(option.name) + " goes with " + option.with);

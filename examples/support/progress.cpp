@@ -55,10 +55,6 @@ std::optional<std::int64_t> resident_memory() {
     return exact ? exact : memory_line("/proc/self/status", "VmRSS:");
 }
 
-std::optional<std::int64_t> peak_resident_memory() {
-    return memory_line("/proc/self/status", "VmHWM:");
-}
-
 std::optional<std::int64_t> private_memory() {
     return memory_line("/proc/self/status", "RssAnon:");
 }

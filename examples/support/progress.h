@@ -1,4 +1,4 @@
-// What a long job shows and takes: a bar, its time, its memory.
+// What a long job shows and uses: a bar, its time, its memory.
 #ifndef EXAMPLES_PROGRESS_H
 #define EXAMPLES_PROGRESS_H
 
@@ -39,9 +39,8 @@ double seconds_for(Work work) {
 
 /// @name Memory of this process, bytes. Nothing where the system does not report it.
 /// @{
-/// Held in RAM now, and the largest amount so far.
+/// Held in RAM now.
 std::optional<std::int64_t> resident_memory();
-std::optional<std::int64_t> peak_resident_memory();
 /// Of what is held in RAM, the part that is not on a file.
 std::optional<std::int64_t> private_memory();
 /// @}

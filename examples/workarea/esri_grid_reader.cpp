@@ -17,7 +17,7 @@ namespace {
 
 enum Key : std::size_t { COLUMNS, ROWS, X_CORNER, X_CENTRE, Y_CORNER, Y_CENTRE, CELL_SIZE, NO_DATA };
 const std::array<std::string, 8> KEYS = {"ncols",     "nrows",     "xllcorner", "xllcenter",
-                                         "yllcorner", "yllcenter", "cellsize",  "nodata_value"};
+                                         "yllcorner", "yllcenter", "cellsize",  "nodata_value"};  // as Key
 
 bool is_blank(int c) {
     return c == ' ' || c == '\t' || c == '\r' || c == '\v' || c == '\f';
@@ -105,7 +105,7 @@ double EsriGridReader::header_value(std::size_t key) const {
 }
 
 void EsriGridReader::read_header() {
-    std::array<std::optional<double>, KEYS.size()> header;
+    Header header;
     for (; m_token != Token::FILE_END; advance()) {
         if (m_token == Token::LINE_END) {
             continue;
@@ -125,6 +125,11 @@ void EsriGridReader::read_header() {
         advance();
         require(m_token != Token::WORD, "header key " + name + " has more than one value");
     }
+    place_grid(header);
+}
+
+/// Place and size of the grid from the header's values.
+void EsriGridReader::place_grid(const Header& header) {
     for (const Key key : {COLUMNS, ROWS, CELL_SIZE}) {
         require_in_line(header[key].has_value(), "the header lacks " + KEYS[key]);
     }

@@ -2,9 +2,11 @@
 #ifndef WORKAREA_ESRI_GRID_READER_H
 #define WORKAREA_ESRI_GRID_READER_H
 
+#include <array>
 #include <cstddef>
 #include <cstdio>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -31,9 +33,12 @@ private:
         void operator()(std::FILE* file) const { std::fclose(file); }
     };
 
+    using Header = std::array<std::optional<double>, 8>;  ///< values by key
+
     int get();
     void advance();
     void read_header();
+    void place_grid(const Header& header);
     double header_value(std::size_t key) const;
     double elevation() const;
     void require(bool is_so, const std::string& message) const;

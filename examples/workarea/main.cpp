@@ -1,8 +1,9 @@
 // Area, elevations, slope and earthwork of a work area, computed over a sparse array of terrain cells.
 
+#include <algorithm>
+#include <cmath>
 #include <memory>
 #include <string>
-#include <tuple>
 #include <vector>
 
 #include "boundary_reader.h"
@@ -14,7 +15,6 @@
 #include "progress.h"
 #include "report.h"
 #include "survey.h"
-#include "terrain_loader.h"
 
 namespace {
 
@@ -55,21 +55,20 @@ std::string measure(const Options& options) {
 
     WorkArea area(terrain->frame());
     const std::vector<geo_nee> boundary = in_plane(places, area.plane());
-    Outcome outcome{options, area, boundary, view, {}, {}, 0.0, 0.0, {}, {}, {}};
+    Outcome outcome{options, area, boundary, view, {}, 0.0, 0.0, {}, {}};
     const std::optional<std::int64_t> memory_before = resident_memory();
-    outcome.load = load_terrain(*terrain, area);
+    outcome.load_seconds = seconds_for([&] { load_terrain(*terrain, area); });
     const std::optional<std::int64_t> memory_after = resident_memory();
     if (memory_before && memory_after) {
         outcome.memory_grown = *memory_after - *memory_before;
     }
 
-    outcome.select_seconds = seconds_for([&] { area.select(view); });
+    area.select(view);
     outcome.visit_seconds =
         seconds_for([&] { outcome.survey = survey_cells(area, view, boundary, options.grade); });
     if (outcome.survey.inside == 0) {
         throw InputError(nothing_found(options, outcome.survey));
     }
-    outcome.memory_peak = peak_resident_memory();
     if (options.picture) {
         outcome.picture = write_picture(outcome, area);
     }
@@ -83,13 +82,15 @@ Target view_into(std::optional<DegreeBox>& view) {
                 if (!read_numbers(text, edges)) {
                     return false;
                 }
+                if (std::any_of(edges, edges + 4, [](double edge) { return std::abs(edge) > 360.0; })) {
+                    throw InputError("--view " + quoted(text) + " is not in degrees");
+                }
                 view = {edges[0], edges[1], edges[2], edges[3]};
-                for (const auto& [low, high, order] :
-                     {std::tuple(view->west, view->east, "W must be less than E"),
-                      std::tuple(view->south, view->north, "S must be less than N")}) {
-                    if (!(low < high)) {
-                        throw InputError("--view " + quoted(text) + ": " + order);
-                    }
+                if (view->west >= view->east) {
+                    throw InputError("--view " + quoted(text) + ": W must be less than E");
+                }
+                if (view->south >= view->north) {
+                    throw InputError("--view " + quoted(text) + ": S must be less than N");
                 }
                 return true;
             }};
@@ -103,13 +104,12 @@ int main(int count, char** arguments) {
         "workarea",
         "Usage: workarea TERRAIN.asc [OPTION]...\n"
         "       workarea --synthetic N [OPTION]...\n\n"
-        "Reads a terrain (an ESRI ASCII grid in geographic degrees), keeps its cells in a sparse array, and "
-        "reports\narea, elevations, slope and earthwork of the cells inside a view and a boundary.\n",
-        "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad arguments "
-        "or "
-        "input.\n",
+        "Reads a terrain (an ESRI ASCII grid in geographic degrees), keeps its cells in a sparse array, and\n"
+        "reports area, elevations, slope and earthwork of the cells inside a view and a boundary.\n",
+        "Exit status: 0 success, 1 report or picture could not be written or memory ran out, 2 bad\n"
+        "arguments or input.\n",
         {{"--boundary", "FILE",
-          "count only cells whose centre lies inside this polygon; one longitude,latitude a line",
+          "count only cells whose centre lies in this polygon; longitude,latitude on each line",
           file_into(o.boundary)},
          {"--view", "W,S,E,N",
           "count only cells whose centre lies in this rectangle, edges included, in degrees\n"
@@ -120,7 +120,7 @@ int main(int count, char** arguments) {
           number_into(o.grade, -LARGEST_ELEVATION, LARGEST_ELEVATION, "an elevation in metres")},
          {"--picture", "FILE", "draw the terrain with boundary, view, cut and fill, as a BMP file",
           file_into(o.picture)},
-         {"--legend", "", "with --picture: what its colours and lines mean, degrees, scale and north",
+         {"--legend", "", "with --picture: what its colours and lines mean, degrees and scale",
           flag_into(o.legend), "--picture"},
          {"--synthetic", "N", "a generated terrain of N cells, at most 100000000, instead of a file",
           number_into(o.synthetic, std::int64_t{1}, SyntheticTerrain::LARGEST,

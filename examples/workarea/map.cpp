@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstddef>
+#include <limits>
 
 namespace {
 
@@ -45,101 +46,74 @@ CanvasPoint on_map(const Map& map, const geo_nee& point) {
             (corner.north - point.north) / map.metres_per_pixel};
 }
 
-std::vector<CanvasPoint> boundary_on(const Map& map) {
-    std::vector<CanvasPoint> points;
-    for (const geo_nee& point : map.outcome.boundary) {
-        points.push_back(on_map(map, point));
-    }
-    return points;
-}
-
-/// Which pixels count, row by row: inside the view, and inside the boundary by the even-odd rule.
-class CountedPixels {
-public:
-    explicit CountedPixels(const Map& map) : m_map(map), m_boundary(boundary_on(map)) {}
-    /// Must come before `counts` for the pixels of a row.
-    void go_to_row(int y) {
-        m_crossings.clear();
-        const double middle = y + 0.5;
-        for (std::size_t i = 0; i < m_boundary.size(); ++i) {
-            const CanvasPoint& a = m_boundary[i];
-            const CanvasPoint& b = m_boundary[(i + 1) % m_boundary.size()];
-            if ((a.y <= middle) != (b.y <= middle)) {
-                m_crossings.push_back(a.x + (b.x - a.x) * (middle - a.y) / (b.y - a.y));
-            }
-        }
-        std::sort(m_crossings.begin(), m_crossings.end());
-    }
-    bool counts(int x, int cell_x, int cell_y) const {
-        if (!m_map.outcome.view.contains(cell_x, cell_y)) {
-            return false;
-        }
-        const double middle = x + 0.5;
-        const auto before = std::lower_bound(m_crossings.begin(), m_crossings.end(), middle);
-        return m_boundary.empty() || (before - m_crossings.begin()) % 2 != 0;
-    }
-
-private:
-    const Map& m_map;
-    std::vector<CanvasPoint> m_boundary;
-    std::vector<double> m_crossings;
+struct Pixel {
+    int x;
+    int y;
+    double cell_x;  ///< its centre's place in cells from the grid's south-west corner
+    double cell_y;
+    bool counts;  ///< inside the view and the boundary
 };
 
-/// Calls visit(x, y, place in cells east, north, counts) for every pixel of the map.
+/// Calls visit(Pixel) for every pixel of the map.
 template <typename Visit>
 void visit_pixels(const Map& map, Visit visit) {
-    const GridFrame& frame = map.outcome.area.frame();
-    CountedPixels counted(map);
+    const Outcome& outcome = map.outcome;
+    const GridFrame& frame = outcome.area.frame();
+    const geo_nee corner = outcome.area.plane().to_grid(frame.west, frame.north(), 0.0);
+    const basalt::PreparedPolygon boundary(outcome.boundary);
     for (int y = 0; y < map.height; ++y) {
-        counted.go_to_row(y);
-        const double cell_y = (map.height - y - 0.5) / map.height * frame.rows;
         for (int x = 0; x < map.width; ++x) {
             const double cell_x = (x + 0.5) / map.width * frame.columns;
-            visit(x, y, cell_x, cell_y,
-                  counted.counts(x, static_cast<int>(cell_x), static_cast<int>(cell_y)));
+            const double cell_y = (map.height - y - 0.5) / map.height * frame.rows;
+            const geo_nee point = {corner.north - (y + 0.5) * map.metres_per_pixel,
+                                   corner.east + (x + 0.5) * map.metres_per_pixel, 0.0};
+            const bool counts = outcome.view.contains(static_cast<int>(cell_x), static_cast<int>(cell_y)) &&
+                                (outcome.boundary.empty() || boundary.contains(point));
+            visit(Pixel{x, y, cell_x, cell_y, counts});
         }
     }
 }
 
-void draw_polygon(Canvas& canvas, const std::vector<CanvasPoint>& points, double thickness, COLORREF colour,
-                  double opacity) {
-    for (std::size_t i = 0; i < points.size(); ++i) {
-        canvas.line(points[i], points[(i + 1) % points.size()], thickness, colour, opacity);
+/// A closed line on a light ground, in dashes of about a length.
+void draw_outline(Canvas& canvas, const std::vector<CanvasPoint>& corners, double dash) {
+    for (std::size_t i = 0; i < corners.size(); ++i) {
+        canvas.line(corners[i], corners[(i + 1) % corners.size()], 4.0, PAPER, 0.7);
+    }
+    for (std::size_t i = 0; i < corners.size(); ++i) {
+        const CanvasPoint& from = corners[i];
+        const CanvasPoint& to = corners[(i + 1) % corners.size()];
+        const double length = std::hypot(to.x - from.x, to.y - from.y);
+        const double pieces = 2.0 * std::floor(length / dash / 2.0) + 1.0;  // dashes and gaps by turns
+        const auto at = [&](double piece) {
+            return CanvasPoint{from.x + piece / pieces * (to.x - from.x),
+                               from.y + piece / pieces * (to.y - from.y)};
+        };
+        for (double piece = 0.0; piece < pieces; piece += 2.0) {
+            canvas.line(at(piece), at(piece + 1.0), 2.0, INK);
+        }
     }
 }
 
 void draw_boundary(const Map& map, Canvas& canvas) {
-    const std::vector<CanvasPoint> points = boundary_on(map);
-    draw_polygon(canvas, points, 4.5, PAPER, 0.8);
-    draw_polygon(canvas, points, 2.0, INK, 1.0);
+    std::vector<CanvasPoint> points;
+    for (const geo_nee& point : map.outcome.boundary) {
+        points.push_back(on_map(map, point));
+    }
+    draw_outline(canvas, points, std::numeric_limits<double>::infinity());
 }
 
 void draw_view(const Map& map, Canvas& canvas) {
     const DegreeBox& view = *map.outcome.options.view;
-    const LocalPlane& plane = map.outcome.area.plane();
-    // A view may be the whole earth: what lies far outside the map needs no dashes.
-    const auto near_map = [&map](CanvasPoint point) {
+    const auto corner = [&map](double longitude, double latitude) {
+        const CanvasPoint point = on_map(map, map.outcome.area.plane().to_grid(longitude, latitude, 0.0));
+        // A view may be the whole earth: what lies far outside the map needs no dashes.
         constexpr double BEYOND = 20.0;
         return CanvasPoint{std::clamp(point.x, -BEYOND, map.width + BEYOND),
                            std::clamp(point.y, -BEYOND, map.height + BEYOND)};
     };
-    const CanvasPoint a = near_map(on_map(map, plane.to_grid(view.west, view.north, 0.0)));
-    const CanvasPoint c = near_map(on_map(map, plane.to_grid(view.east, view.south, 0.0)));
-    const std::vector<CanvasPoint> corners = {a, {c.x, a.y}, c, {a.x, c.y}};
-    draw_polygon(canvas, corners, 4.0, PAPER, 0.7);
-    for (std::size_t i = 0; i < corners.size(); ++i) {
-        constexpr double DASH = 9.0;
-        const CanvasPoint from = corners[i];
-        const CanvasPoint to = corners[(i + 1) % corners.size()];
-        const double length = std::hypot(to.x - from.x, to.y - from.y);
-        const auto at = [&](double along) {
-            const double part = std::min(1.0, along / length);
-            return CanvasPoint{from.x + part * (to.x - from.x), from.y + part * (to.y - from.y)};
-        };
-        for (double along = 0.0; along < length; along += 2.0 * DASH) {
-            canvas.line(at(along), at(along + DASH), 2.0, INK);
-        }
-    }
+    const CanvasPoint a = corner(view.west, view.north);
+    const CanvasPoint c = corner(view.east, view.south);
+    draw_outline(canvas, {a, {c.x, a.y}, c, {a.x, c.y}}, 9.0);
 }
 
 }  // namespace
@@ -156,8 +130,9 @@ std::vector<COLORREF> elevation_stops() {
 }
 
 float darkening_at(double part) {
-    // Channels go in a straight line from the whole to 1 / DARKENING.
-    return static_cast<float>(1.0 / (1.0 - part + part / static_cast<double>(DARKENING)));
+    constexpr double LARGEST = 2.6;
+    // Channels go in a straight line from the whole to 1 / LARGEST.
+    return static_cast<float>(1.0 / (1.0 - part + part / LARGEST));
 }
 
 Map lay_out_map(const Outcome& outcome, const Relief& relief, int longer_side) {
@@ -167,16 +142,11 @@ Map lay_out_map(const Outcome& outcome, const Relief& relief, int longer_side) {
     const double east = north_east.east - south_west.east;
     const double north = north_east.north - south_west.north;
     const double scale = std::max(east, north) / longer_side;
-    Map map = {outcome,
-               relief,
-               std::max(1, static_cast<int>(std::lround(east / scale))),
-               std::max(1, static_cast<int>(std::lround(north / scale))),
-               scale,
-               0.0,
-               0.0};
-    visit_pixels(map, [&](int, int, double cell_x, double cell_y, bool counts) {
-        const double above = relief.elevation(cell_x, cell_y) - outcome.survey.grade;
-        if (counts && !std::isnan(above)) {
+    Map map = {outcome, relief, std::max(1, static_cast<int>(std::lround(east / scale))),
+               std::max(1, static_cast<int>(std::lround(north / scale))), scale};
+    visit_pixels(map, [&](const Pixel& pixel) {
+        const double above = relief.elevation(pixel.cell_x, pixel.cell_y) - outcome.survey.grade;
+        if (pixel.counts && has_elevation(above)) {
             map.largest_cut = std::max(map.largest_cut, above);
             map.largest_fill = std::max(map.largest_fill, -above);
         }
@@ -185,20 +155,20 @@ Map lay_out_map(const Outcome& outcome, const Relief& relief, int longer_side) {
 }
 
 Canvas draw_map(const Map& map) {
-    Canvas canvas(map.width, map.height, PAPER);
+    constexpr COLORREF NO_DATA = RGB(222, 222, 222);
+    Canvas canvas(map.width, map.height, NO_DATA);
     const std::vector<COLORREF> stops = elevation_stops();
     const double range = std::max(map.relief.highest() - map.relief.lowest(), 1e-3);
     const double depth = std::max({map.largest_cut, map.largest_fill, 1e-3});
-    visit_pixels(map, [&](int x, int y, double cell_x, double cell_y, bool counts) {
-        const double elevation = map.relief.elevation(cell_x, cell_y);
-        COLORREF colour = NO_DATA;
-        if (!std::isnan(elevation)) {
+    visit_pixels(map, [&](const Pixel& pixel) {
+        const double elevation = map.relief.elevation(pixel.cell_x, pixel.cell_y);
+        if (has_elevation(elevation)) {
             const double above = elevation - map.outcome.survey.grade;
-            colour = counts ? darkened(above > 0.0 ? CUT : FILL, std::abs(above) / depth)
-                            : between_stops(stops, (elevation - map.relief.lowest()) / range);
-            colour = lit(colour, map.relief.light(cell_x, cell_y));
+            const COLORREF colour = pixel.counts
+                                        ? darkened(above > 0.0 ? CUT : FILL, std::abs(above) / depth)
+                                        : between_stops(stops, (elevation - map.relief.lowest()) / range);
+            canvas.set(pixel.x, pixel.y, lit(colour, map.relief.light(pixel.cell_x, pixel.cell_y)));
         }
-        canvas.set(x, y, colour);
     });
     if (!map.outcome.boundary.empty()) {
         draw_boundary(map, canvas);

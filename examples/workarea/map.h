@@ -12,17 +12,15 @@
 
 inline constexpr COLORREF PAPER = RGB(255, 255, 255);
 inline constexpr COLORREF INK = RGB(38, 38, 38);
-inline constexpr COLORREF NO_DATA = RGB(222, 222, 222);
 
-/// Where cut and fill begin; their colours darken with the depth, down to a part of this at the largest.
+/// Where cut and fill begin; their colours darken with the depth.
 inline constexpr COLORREF CUT = RGB(255, 138, 92);
 inline constexpr COLORREF FILL = RGB(120, 178, 255);
-inline constexpr float DARKENING = 2.6F;
 
 /// Colours for elevations from the lowest to the highest, at equal distances, from the library's palette.
 std::vector<COLORREF> elevation_stops();
 
-/// By what a hue is divided a part of the way down to the largest depth, where it is DARKENING.
+/// By what the channels of a hue are divided a part of the way down to the largest depth.
 float darkening_at(double part);
 
 /// What a map shows, and to what scale.
@@ -32,8 +30,8 @@ struct Map {
     int width;  ///< pixels
     int height;
     double metres_per_pixel;
-    double largest_cut;   ///< metres above the grade among the pixels that count; 0 when there is none
-    double largest_fill;  ///< metres below it
+    double largest_cut = 0.0;   ///< metres above the grade among the pixels that count; 0 when there is none
+    double largest_fill = 0.0;  ///< metres below it
 };
 
 /// A map whose longer side has so many pixels.

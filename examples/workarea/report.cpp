@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <numbers>
 
 #include "text.h"
 
@@ -38,8 +39,7 @@ std::string box(double west, double south, double east, double north) {
 }
 
 std::string slope_angle(double slope) {
-    constexpr double DEGREES_PER_RADIAN = 180.0 / 3.141592653589793;
-    return "% (" + number_text(std::atan(slope) * DEGREES_PER_RADIAN, 2) + " deg)";
+    return "% (" + number_text(std::atan(slope) * 180.0 / std::numbers::pi, 2) + " deg)";
 }
 
 std::string at_cell(const GridFrame& frame, const Extreme& cell) {
@@ -73,26 +73,6 @@ std::string terrain_section(const Outcome& o) {
            line("Lengths too short by", number_text(shortest * MEGA, 1), "ppm at most, at the corners");
 }
 
-/// Area by the cross products of neighbouring vertices, taken from the first vertex.
-double polygon_area(const std::vector<geo_nee>& polygon) {
-    double twice = 0.0;
-    const geo_nee& a = polygon[0];
-    for (std::size_t i = 2; i < polygon.size(); ++i) {
-        const geo_nee& b = polygon[i - 1];
-        const geo_nee& c = polygon[i];
-        twice += (b.east - a.east) * (c.north - a.north) - (c.east - a.east) * (b.north - a.north);
-    }
-    return 0.5 * std::abs(twice);
-}
-
-double perimeter(const std::vector<geo_nee>& polygon) {
-    double sum = geo_horz_dist(polygon.back(), polygon.front());
-    for (std::size_t i = 1; i < polygon.size(); ++i) {
-        sum += geo_horz_dist(polygon[i - 1], polygon[i]);
-    }
-    return sum;
-}
-
 std::string view_section(const Outcome& o) {
     const GridFrame& frame = o.area.frame();
     const Survey& s = o.survey;
@@ -103,9 +83,11 @@ std::string view_section(const Outcome& o) {
     text += line("Cells in view", number_text(s.in_view));
     if (!o.boundary.empty()) {
         text += words("Boundary", *o.options.boundary);
-        text += line("Boundary vertices", number_text(static_cast<std::int64_t>(o.boundary.size())),
-                     fmt::format("({} m2, perimeter {} m)", number_text(polygon_area(o.boundary), 0),
-                                 number_text(perimeter(o.boundary), 1)));
+        const std::size_t count = o.boundary.size();
+        const double area = std::abs(basalt::polygon_area(o.boundary.data(), count));
+        const double perimeter = basalt::polygon_perimeter(o.boundary.data(), count);
+        text += line("Boundary vertices", number_text(static_cast<std::int64_t>(count)),
+                     fmt::format("({} m2, perimeter {} m)", number_text(area, 0), number_text(perimeter, 1)));
     }
     constexpr double SQUARE_METRES_PER_HECTARE = 1e4;
     text += line("Cells counted", number_text(s.inside));
@@ -124,10 +106,11 @@ std::string view_section(const Outcome& o) {
     return text;
 }
 
-std::string earthwork_section(const Survey& s) {
+std::string earthwork_section(const Outcome& o) {
+    const Survey& s = o.survey;
     return section("Earthwork") +
            line("Grade", number_text(s.grade, 3),
-                s.grade_given ? "m" : "m  the mean elevation (no --grade given)") +
+                o.options.grade ? "m" : "m  the mean elevation (no --grade given)") +
            line("Cut", number_text(s.cut, 0), "m3") + line("Fill", number_text(s.fill, 0), "m3") +
            line("Cut less fill", number_text(s.cut - s.fill, 0), "m3");
 }
@@ -139,47 +122,27 @@ std::string picture_section(const std::string& file, const PictureSize& picture)
            line("Scale", number_text(picture.metres_per_pixel, 3), "m a pixel");
 }
 
+std::string time_line(const char* step, double seconds, std::int64_t cells) {
+    const double speed = seconds > 0.0 ? static_cast<double>(cells) / seconds / MEGA : 0.0;
+    return line(step, number_text(seconds * 1e3, 3),
+                fmt::format("ms  {} million cells a second", number_text(speed, 1)));
+}
+
 std::string store_section(const Outcome& o) {
-    const auto cells = static_cast<double>(o.area.cells());
-    const auto blocks = static_cast<double>(o.area.blocks());
     std::string text = section("Store");
-    text += line("Blocks selected", number_text(o.survey.blocks),
-                 fmt::format("of {} ({} x {} cells each)", number_text(o.area.blocks()),
-                             int{WorkArea::BLOCK_SIDE}, int{WorkArea::BLOCK_SIDE}));
-    text += line("Cells visited", number_text(o.survey.visited), "in these blocks");
-    text += line("Record", number_text(std::int64_t{sizeof(CellRecord)}), "bytes: grid point, slope, flags");
-    text += line("By arithmetic", number_text(sizeof(CellRecord) + blocks * WorkArea::BLOCK_BYTES / cells, 1),
-                 "bytes a cell: record and its share of the blocks");
+    text += line("Cells visited", number_text(o.survey.visited), "in the selected blocks");
     if (o.memory_grown) {
         const auto grown = static_cast<double>(*o.memory_grown);
-        text += line("By measurement", number_text(grown / cells, 1),
+        text += line("Memory", number_text(grown / static_cast<double>(o.area.cells()), 1),
                      fmt::format("bytes a cell: memory grew by {} MB", number_text(grown / MEGA, 2)));
     }
-    if (o.memory_peak) {
-        text +=
-            line("Peak memory", number_text(static_cast<double>(*o.memory_peak) / MEGA, 2), "MB resident");
-    }
-    return text;
-}
-
-std::string time_line(const char* step, double seconds, std::int64_t cells) {
-    const double speed = cells > 0 && seconds > 0.0 ? static_cast<double>(cells) / seconds / MEGA : 0.0;
-    return line(step, number_text(seconds * 1e3, 3),
-                speed > 0.0 ? fmt::format("ms  {} million cells a second", number_text(speed, 1)) : "ms");
-}
-
-std::string time_section(const Outcome& o) {
-    const double together = o.load.read + o.load.store + o.select_seconds + o.visit_seconds;
-    return section("Time") +
-           time_line(o.options.synthetic ? "Generate" : "Read", o.load.read, o.area.frame().cells()) +
-           time_line("Store", o.load.store, o.area.cells()) + time_line("Select", o.select_seconds, 0) +
-           time_line("Visit", o.visit_seconds, o.survey.visited) + time_line("Together", together, 0);
+    return text + time_line("Load", o.load_seconds, o.area.cells()) +
+           time_line("Visit", o.visit_seconds, o.survey.visited);
 }
 
 }  // namespace
 
 std::string write_report(const Outcome& o) {
-    return terrain_section(o) + view_section(o) + earthwork_section(o.survey) +
-           (o.picture ? picture_section(*o.options.picture, *o.picture) : "") + store_section(o) +
-           time_section(o);
+    return terrain_section(o) + view_section(o) + earthwork_section(o) +
+           (o.picture ? picture_section(*o.options.picture, *o.picture) : "") + store_section(o);
 }

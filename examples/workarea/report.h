@@ -8,7 +8,6 @@
 #include <vector>
 
 #include "survey.h"
-#include "terrain_loader.h"
 #include "work_area.h"
 
 struct Options {
@@ -35,11 +34,9 @@ struct Outcome {
     const std::vector<geo_nee>& boundary;  ///< in the local plane; empty without one
     CellBox view;
     Survey survey;
-    LoadTimes load;
-    double select_seconds;
+    double load_seconds;
     double visit_seconds;
     std::optional<std::int64_t> memory_grown;  ///< resident bytes, by loading
-    std::optional<std::int64_t> memory_peak;   ///< resident bytes
     std::optional<PictureSize> picture;
 };
 

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <cmath>
 #include <tuple>
-#include <utility>
 
 #include "progress.h"
 
@@ -47,13 +46,9 @@ Survey survey_cells(WorkArea& area, const CellBox& view, const std::vector<geo_n
     ExactSum elevations;
     ExactSum slope_areas;
     ExactSum slopes;
-    std::pair<int, int> block;  // blocks come whole, one after the other
     Progress progress("Visiting", std::min(area.cells(), view.cells()));
     area.visit_selected([&](int x, int y, const CellRecord& record) {
-        const std::pair<int, int> cell_block(x / WorkArea::BLOCK_SIDE, y / WorkArea::BLOCK_SIDE);
-        if (survey.visited++ == 0 || cell_block != block) {
-            block = cell_block;
-            ++survey.blocks;
+        if (++survey.visited % 4096 == 0) {
             progress.update(survey.in_view);
         }
         // Selections consist of whole blocks.
@@ -78,8 +73,8 @@ Survey survey_cells(WorkArea& area, const CellBox& view, const std::vector<geo_n
                             std::tie(elevation, survey.highest.y, survey.highest.x)) {
             survey.highest = {elevation, x, y};
         }
-        if ((record.flags & CellRecord::SLOPE_UNKNOWN) == 0) {
-            const auto slope = static_cast<double>(record.slope);
+        const auto slope = static_cast<double>(record.slope);
+        if (!std::isnan(slope)) {
             ++survey.with_slope;
             slope_areas.add(cell_area);
             slopes.add(slope * cell_area);
@@ -92,7 +87,6 @@ Survey survey_cells(WorkArea& area, const CellBox& view, const std::vector<geo_n
     survey.area = areas.value();
     survey.mean_elevation = survey.inside > 0 ? elevations.value() / survey.area : 0.0;
     survey.mean_slope = survey.with_slope > 0 ? slopes.value() / slope_areas.value() : 0.0;
-    survey.grade_given = grade.has_value();
     survey.grade = grade.value_or(survey.mean_elevation);
     if (!grade && survey.inside > 0) {
         area.visit_selected([&](int x, int y, const CellRecord& record) {

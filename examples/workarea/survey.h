@@ -17,8 +17,7 @@ struct Extreme {
 
 /// Measures in metres, square metres and cubic metres. Means are over the area.
 struct Survey {
-    std::int64_t blocks = 0;      ///< selected blocks
-    std::int64_t visited = 0;     ///< cells of these blocks
+    std::int64_t visited = 0;     ///< cells of the selected blocks
     std::int64_t in_view = 0;     ///< of them in the view
     std::int64_t inside = 0;      ///< of them inside the boundary; everything below is about these
     std::int64_t with_slope = 0;  ///< of them with a slope
@@ -29,7 +28,6 @@ struct Survey {
     double mean_slope = 0.0;  ///< rise over run
     double steepest = 0.0;    ///< rise over run
     double grade = 0.0;
-    bool grade_given = false;
     double cut = 0.0;   ///< volume above the grade
     double fill = 0.0;  ///< volume missing below it
 };

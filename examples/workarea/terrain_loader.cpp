@@ -1,35 +1,22 @@
-#include "terrain_loader.h"
-
-#include <chrono>
 #include <cmath>
 #include <cstddef>
-#include <utility>
+#include <limits>
 #include <vector>
 
 #include "progress.h"
+#include "work_area.h"
 
 namespace {
 
-using Clock = std::chrono::steady_clock;
-
-double seconds_since(Clock::time_point& start) {
-    const Clock::time_point now = Clock::now();
-    return std::chrono::duration<double>(now - std::exchange(start, now)).count();
-}
-
-struct Gradient {
-    double rise = 0.0;  // per metre
-    std::uint32_t flags = 0;
-};
-
-/// Rise per metre along one axis at `here`, from its neighbours a step before and a step after it.
-Gradient gradient(double before, double here, double after, double step) {
+/// Rise per metre along one axis at `here`, from its neighbours a step before and a step after it; NaN when
+/// both are missing.
+double gradient(double before, double here, double after, double step) {
     const int steps = (has_elevation(before) ? 1 : 0) + (has_elevation(after) ? 1 : 0);
     if (steps == 0) {
-        return {0.0, CellRecord::SLOPE_UNKNOWN};
+        return std::numeric_limits<double>::quiet_NaN();
     }
     const double rise = (has_elevation(after) ? after : here) - (has_elevation(before) ? before : here);
-    return {rise / (steps * step), steps == 2 ? 0U : CellRecord::SLOPE_ONE_SIDED};
+    return rise / (steps * step);
 }
 
 void store_row(WorkArea& area, int y, const std::vector<double>& north, const std::vector<double>& row,
@@ -43,27 +30,19 @@ void store_row(WorkArea& area, int y, const std::vector<double>& north, const st
         if (!has_elevation(row[i])) {
             continue;
         }
-        const Gradient east = gradient(i > 0 ? row[i - 1] : NO_ELEVATION, row[i],
-                                       i + 1 < columns ? row[i + 1] : NO_ELEVATION, step_east);
-        const Gradient up = gradient(south[i], row[i], north[i], step_north);
-        CellRecord record = {};
+        const double east = gradient(i > 0 ? row[i - 1] : NO_ELEVATION, row[i],
+                                     i + 1 < columns ? row[i + 1] : NO_ELEVATION, step_east);
+        const double up = gradient(south[i], row[i], north[i], step_north);
         const int x = static_cast<int>(i);
-        record.point = area.centre(x, y, row[i]);
-        record.flags = east.flags | up.flags;
-        if ((record.flags & CellRecord::SLOPE_UNKNOWN) == 0) {
-            record.slope = static_cast<float>(std::sqrt(east.rise * east.rise + up.rise * up.rise));
-        }
-        area.insert(x, y, record);
+        area.insert(x, y, {area.centre(x, y, row[i]), static_cast<float>(std::sqrt(east * east + up * up))});
     }
 }
 
 }  // namespace
 
-LoadTimes load_terrain(TerrainSource& source, WorkArea& area) {
-    LoadTimes times;
+void load_terrain(TerrainSource& source, WorkArea& area) {
     const int rows = source.frame().rows;
     Progress progress("Loading", rows);
-    Clock::time_point start = Clock::now();
     std::vector<double> row;
     source.next_row(row);
     std::vector<double> north(row.size(), NO_ELEVATION);
@@ -72,12 +51,9 @@ LoadTimes load_terrain(TerrainSource& source, WorkArea& area) {
         if (!source.next_row(south)) {
             south.assign(row.size(), NO_ELEVATION);
         }
-        times.read += seconds_since(start);
         store_row(area, y, north, row, south);
-        times.store += seconds_since(start);
         north.swap(row);
         row.swap(south);
         progress.update(rows - y);
     }
-    return times;
 }

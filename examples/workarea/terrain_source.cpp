@@ -2,13 +2,13 @@
 
 #include <algorithm>
 #include <cmath>
+#include <numbers>
 
 namespace {
 
 /// One wave over so many cells. Columns and rows take different lengths, so no two hills are alike.
 double wave(int cell, double length) {
-    constexpr double TWO_PI = 6.283185307179586;
-    return std::sin(TWO_PI * (cell + 0.5) / length);
+    return std::sin(2.0 * std::numbers::pi * (cell + 0.5) / length);
 }
 
 }  // namespace
@@ -21,8 +21,7 @@ SyntheticTerrain::SyntheticTerrain(std::int64_t cells) : m_cells_left(cells) {
     m_frame.south = 36.5;
     m_frame.cell_size = 1e-5;
     for (int x = 0; x < m_frame.columns; ++x) {
-        m_ridges.push_back(60.0 * wave(x, 1370.0));
-        m_knolls.push_back(6.0 * wave(x, 211.0));
+        m_ridges.push_back(66.0 * wave(x, 1370.0));
     }
 }
 
@@ -31,12 +30,11 @@ bool SyntheticTerrain::next_row(std::vector<double>& elevations) {
         return false;
     }
     const double ridge = wave(m_rows_made, 1130.0);
-    const double knoll = wave(m_rows_made, 173.0);
     ++m_rows_made;
     elevations.assign(m_ridges.size(), NO_ELEVATION);
     const std::int64_t filled = std::min<std::int64_t>(m_cells_left, m_frame.columns);
     for (std::size_t x = 0; x < static_cast<std::size_t>(filled); ++x) {
-        elevations[x] = 300.0 + m_ridges[x] * ridge + m_knolls[x] * knoll;
+        elevations[x] = 300.0 + m_ridges[x] * ridge;
     }
     m_cells_left -= filled;
     return true;

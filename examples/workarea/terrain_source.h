@@ -57,8 +57,7 @@ private:
     GridFrame m_frame;
     std::int64_t m_cells_left;
     int m_rows_made = 0;
-    std::vector<double> m_ridges;  // the hills' east-west profiles, one value a column
-    std::vector<double> m_knolls;
+    std::vector<double> m_ridges;  // the hills' east-west profile, one value a column
 };
 
 #endif

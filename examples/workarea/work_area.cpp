@@ -1,10 +1,15 @@
 #include "work_area.h"
 
+#include <cstddef>
+#include <iterator>
+
 #include "input_error.h"
 
 namespace {
 
 constexpr double SEMI_MAJOR_AXIS = 6378137.0;  // WGS84, metres
+constexpr int BLOCK_SIDE = 16;                 // cells
+constexpr std::size_t CELLS_PER_CHUNK = 64;
 
 geo_llh on_ellipsoid(double longitude, double latitude) {
     // The library refuses the all-zero record. This height vanishes in the rounding of a coordinate.
@@ -40,14 +45,16 @@ CellBox cells_in_view(const GridFrame& frame, const DegreeBox& view) {
     }
     // First of `count` cells that does not lie before an edge; count if all do.
     const auto first_not = [](int count, auto before) {
-        int first = 0;
-        while (count > 0) {
-            const int half = count / 2;
-            const bool is_behind = before(first + half);
-            first += is_behind ? half + 1 : 0;
-            count = is_behind ? count - half - 1 : half;
+        int low = 0;
+        while (low < count) {
+            const int middle = low + (count - low) / 2;
+            if (before(middle)) {
+                low = middle + 1;
+            } else {
+                count = middle;
+            }
         }
-        return first;
+        return low;
     };
     const CellBox box = {
         first_not(frame.columns, [&](int x) { return frame.centre_longitude(x) < view.west; }),
@@ -75,22 +82,14 @@ double WorkArea::cell_area(int y) const {
     // The row's cells are equal on the ellipsoid; in the plane the middle one is the least shortened.
     const double west = m_frame.west + (m_frame.columns / 2) * m_frame.cell_size;
     const double east = m_frame.west + (m_frame.columns / 2 + 1) * m_frame.cell_size;
-    const geo_nee south_west = m_plane.to_grid(west, south, 0.0);
-    const geo_nee south_east = m_plane.to_grid(east, south, 0.0);
-    const geo_nee north_west = m_plane.to_grid(west, north, 0.0);
-    const geo_nee north_east = m_plane.to_grid(east, north, 0.0);
-    return geo_triangle_area(south_west, south_east, north_east) +
-           geo_triangle_area(south_west, north_east, north_west);
+    const geo_nee corners[] = {m_plane.to_grid(west, south, 0.0), m_plane.to_grid(west, north, 0.0),
+                               m_plane.to_grid(east, north, 0.0), m_plane.to_grid(east, south, 0.0)};
+    return basalt::polygon_area(corners, std::size(corners));
 }
 
 void WorkArea::insert(int x, int y, const CellRecord& record) {
     m_array.Insert(x, y, &record);
     ++m_cells;
-    // The array raises this flag whenever it makes a block, which counts them without a table of our own.
-    if (m_array.IsSelectionDirty()) {
-        ++m_blocks;
-        m_array.SetSelectionDirty(false);
-    }
 }
 
 bool WorkArea::select(const CellBox& box) {

@@ -5,7 +5,6 @@
 #include <basalt/geo.h>
 #include <basalt/sparse.h>
 
-#include <cstddef>
 #include <cstdint>
 
 #include "terrain_source.h"
@@ -37,16 +36,9 @@ private:
 
 /// What is kept of a cell.
 struct CellRecord {
-    enum Flag : std::uint32_t {
-        SLOPE_ONE_SIDED = 1,  ///< a neighbour is missing: the difference was taken to one side
-        SLOPE_UNKNOWN = 2     ///< neighbours are missing on both sides: slope is 0 and means nothing
-    };
-
     geo_nee point;  ///< cell centre in the local plane
-    float slope;    ///< steepest rise over run, 0 upwards
-    std::uint32_t flags;
+    float slope;    ///< steepest rise over run; NaN where neighbours are missing on both sides
 };
-static_assert(sizeof(CellRecord) == 32);
 
 /// Cells from (west, south) to (east, north), both included.
 struct CellBox {
@@ -72,23 +64,17 @@ inline CellBox whole_grid(const GridFrame& frame) {
     return {0, 0, frame.columns - 1, frame.rows - 1};
 }
 
-/// The cells whose centres lie in the view, its edges included, cut to the grid. InputError when there is
-/// none.
+/// The cells of the grid whose centres lie in the view, its edges included. InputError when there is none.
 CellBox cells_in_view(const GridFrame& frame, const DegreeBox& view);
 
 class WorkArea {
 public:
-    static constexpr int BLOCK_SIDE = 16;
-    static constexpr std::size_t CELLS_PER_CHUNK = 64;
-    static constexpr std::size_t BLOCK_BYTES = sizeof(void*) * BLOCK_SIDE * BLOCK_SIDE;
-
     /// An empty work area on the grid's frame; its plane has its origin in the middle of the grid.
     explicit WorkArea(const GridFrame& frame);
 
     const GridFrame& frame() const { return m_frame; }
     const LocalPlane& plane() const { return m_plane; }
     std::int64_t cells() const { return m_cells; }
-    std::int64_t blocks() const { return m_blocks; }
 
     /// Centre of cell (x, y) in the local plane.
     geo_nee centre(int x, int y, double elevation) const;
@@ -119,7 +105,13 @@ private:
     LocalPlane m_plane;
     vex_util::Sparse2DArray m_array;
     std::int64_t m_cells = 0;
-    std::int64_t m_blocks = 0;
 };
+
+/// Stores every cell of the source that has an elevation. Three rows are held at a time, so beyond the work
+/// area itself memory does not depend on the number of rows.
+///
+/// Slopes are central differences over the four neighbours, the scheme of Fleming and Hoffer (1979) and of
+/// Zevenbergen and Thorne (1987); at an edge or beside a missing cell the difference is taken to one side.
+void load_terrain(TerrainSource& source, WorkArea& area);
 
 #endif

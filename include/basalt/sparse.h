@@ -73,8 +73,9 @@ public:
     /// @return whether the cell held an element
     bool Remove(int x, int y);
 
-    /// Returns the array to its new state with the same parameters: all memory is released, the selection is
-    /// empty and the flag false. A visit in progress ends when its callback returns. Cannot fail.
+    /// Returns the array to its new state with the same parameters: blocks and elements are released, the
+    /// selection is empty and the flag false. A visit in progress ends when its callback returns. Cannot
+    /// fail.
     void RemoveAll();
 
     /// Selects the blocks whose cells meet a rectangle, emptied blocks among them, in place of the old

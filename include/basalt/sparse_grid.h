@@ -22,10 +22,10 @@ namespace basalt {
 ///
 /// Failure: std::bad_alloc, with the grid unchanged.
 ///
-/// Threads: thread-safe as vex_util::Sparse2DArray, but for construction, destruction and moving, and the
-/// first insertion into a moved-from grid. Each call takes the lock once, and holds it while a function of
-/// the caller runs. That function may use the same grid, cells not yet visited are visited with what they
-/// hold then, and clear() ends a visit when the function returns. Its exceptions propagate.
+/// Threads: thread-safe as vex_util::Sparse2DArray, except construction, destruction, moving, and the first
+/// call on a moved-from grid. Each call takes the lock once, and holds it while a function of the caller
+/// runs. That function may use the same grid, cells not yet visited are visited with what they hold then, and
+/// clear() ends a visit when the function returns. Its exceptions propagate.
 template <class T>
 class SparseGrid {
     static_assert(std::is_trivially_copyable_v<T>, "values are copied as bytes");

@@ -12,7 +12,7 @@ void ElementPool::AddChunk() {
     if (m_elementsPerChunk > std::numeric_limits<std::size_t>::max() / m_elementSize) {
         throw std::bad_alloc();
     }
-    // Grow the lists first: the chunk itself must not have to be given back.
+    // Grow the lists first: if one cannot, there is no chunk to free again.
     const std::size_t slots = (m_chunks.size() + 1) * m_elementsPerChunk;
     if (slots > FreeCapacity()) {
         Slab larger(std::max(slots, 2 * FreeCapacity()) * sizeof(void*));

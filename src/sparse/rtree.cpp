@@ -18,7 +18,7 @@ unsigned valid_bits(const Node& node) {
     return (1U << node.count) - 1;
 }
 
-// The entry that grows least to take in the rectangle; of equals the one of smaller volume, then the earlier.
+// The entry whose volume grows least to include the rectangle; among equals the smallest, then the first.
 int choose_subtree(const Node& node, const Rect4& rect) {
     Float4 volume[2], increase[2];
     for (int half = 0; half < 2; ++half) {

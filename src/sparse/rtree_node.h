@@ -16,8 +16,6 @@ inline constexpr int MAX_LEVEL = 17;
 // Both corners are inclusive; a min above a max is kept as given.
 struct Rect {
     int minX, minY, maxX, maxY;
-
-    bool operator==(const Rect&) const = default;
 };
 
 inline Rect combine(const Rect& a, const Rect& b) {
@@ -62,10 +60,8 @@ struct alignas(64) Node {
         ++count;
     }
 
+    // Requires count > 0.
     Rect cover() const {
-        if (count == 0) {
-            return {0, 0, 0, 0};
-        }
         Rect r = rect(0);
         for (int i = 1; i < count; ++i) {
             r = combine(r, rect(i));

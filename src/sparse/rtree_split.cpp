@@ -129,7 +129,7 @@ unsigned distribute(const Candidates& c) {
         }
         tied &= unassigned;
 
-        // The first of the tied, unless a later one goes to the group that has fewer.
+        // The first of the tied that prefers the smaller group, or the first if none does.
         unsigned choice = tied;
         if (groups[0].count != groups[1].count) {
             const unsigned toSmaller =

@@ -6,9 +6,6 @@
 namespace vex_util {
 namespace {
 
-// How many cells ahead elements are prefetched: where a row ends, the hardware prefetcher fails.
-constexpr std::size_t CELLS_AHEAD = 32;
-
 // The callback may fill or empty later cells, so the bits are read again after each call. If it cleared or
 // assigned the array, which changes the generation, the block no longer exists.
 template <class Storage>

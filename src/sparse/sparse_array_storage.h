@@ -1,4 +1,4 @@
-// The parts of a sparse array.
+// The state of a sparse array: its lock, contents and selection.
 #ifndef BASALT_SRC_SPARSE_SPARSE_ARRAY_STORAGE_H
 #define BASALT_SRC_SPARSE_SPARSE_ARRAY_STORAGE_H
 
@@ -32,7 +32,7 @@ struct Sparse2DArray::Storage {
     CriticalSectionWrapper lock;
     SparseContents contents;
     std::vector<int> selection;    // identifiers of the selected blocks, in the tree's order
-    std::vector<int> found;        // the next selection while it is searched for
+    std::vector<int> found;        // result of a search, before it replaces the selection
     std::uint64_t generation = 0;  // counts clearing and assignment, which end visits
     std::atomic<bool> selectionDirty{false};
 };

@@ -9,9 +9,8 @@
 namespace basalt {
 namespace {
 
+using vex_util::CELLS_AHEAD;
 using vex_util::SparseContents;
-
-constexpr std::size_t CELLS_AHEAD = 32;
 
 // Which of the offsets 0 .. count - 1 from `first` are at least `low` and at most `high`.
 std::uint64_t bits_between(std::int64_t first, int low, int high, std::size_t count) {

@@ -16,8 +16,11 @@
 
 namespace vex_util {
 
+// How many cells ahead visits prefetch elements: where a row ends, the hardware prefetcher fails.
+inline constexpr std::size_t CELLS_AHEAD = 32;
+
 // An insertion that throws std::bad_alloc changes nothing: all memory is reserved before anything is entered.
-// After a copy that throws, the object is only good for destruction.
+// After a copy that throws, the object may only be destroyed.
 class SparseContents {
 public:
     struct ListedBlock {
@@ -135,9 +138,10 @@ private:
 
     void CopyElement(void* to, const void* from) const noexcept {
         const std::size_t size = m_elements.ElementSize();
-        // A call of memcpy costs more than copying a small element; sizes start at 8 bytes.
+        // A call costs more than copying a small element; sizes start at 8 bytes. The source may be the
+        // cell's own element.
         if (size > 64) {
-            std::memcpy(to, from, size);
+            std::memmove(to, from, size);
             return;
         }
         char* const target = static_cast<char*>(to);

@@ -47,7 +47,7 @@ void SparseContents::EachPiece(int x, int y, std::size_t count, Step step) {
     }
 }
 
-// Counts first: the insertion that follows cannot fail, and a row that does changes nothing.
+// Allocates all that a row needs before any of it is inserted. Throws std::bad_alloc.
 void SparseContents::ReserveRow(int x, int y, std::size_t count) {
     std::size_t blocks = 0;
     std::size_t slots = 0;
@@ -149,7 +149,7 @@ std::size_t SparseContents::FindCells(const basalt::GridCell* cells, void** elem
     constexpr std::size_t GROUP = 32;  // cache misses that overlap
     void** places[GROUP];
     std::size_t found = 0;
-    for (; count != 0;) {
+    while (count != 0) {
         const std::size_t size = std::min(count, GROUP);
         for (std::size_t i = 0; i < size; ++i) {
             m_index.Prefetch(m_grid.KeyOf(cells[i].x, cells[i].y));

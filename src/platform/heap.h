@@ -1,12 +1,13 @@
 // Private heaps by their Win32 names.
 //
-// Blocks are aligned to 16 bytes and come from regions that the heap maps as it grows. Allocation and freeing
-// take constant time; a block of 1 MiB or more has a mapping of its own, unmapped when it is freed. An unused
-// heap costs one page.
+// Blocks are aligned to 16 bytes and come from regions that the heap maps as it grows. Allocation takes
+// constant time until no more can be mapped, freeing that of a binary search among the regions. In heaps
+// without a limit or with one above 64 MiB, a block of 1 MiB or more has a mapping of its own, unmapped when
+// it is freed. An unused heap costs one page.
 //
 // All calls: flags and options are 0. A null handle, or one that is plainly no heap, is ERROR_INVALID_HANDLE;
 // a handle must not be used after HeapDestroy. The last error is set on failure only. Threads: thread-safe,
-// and threads that allocate from a heap without a limit do not wait for each other; HeapDestroy must be the
+// and threads that allocate from a heap without a limit seldom wait for each other; HeapDestroy must be the
 // last call on its heap.
 #ifndef BASALT_SRC_PLATFORM_HEAP_H
 #define BASALT_SRC_PLATFORM_HEAP_H

@@ -12,7 +12,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <cstring>
 
 #include "src/platform/heap/sanitizer.h"
 

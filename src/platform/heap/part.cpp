@@ -1,6 +1,5 @@
 #include "src/platform/heap/part.h"
 
-#include <algorithm>
 #include <mutex>
 
 #include "src/platform/pages.h"

@@ -34,7 +34,7 @@ void HeapPart::coalesce(Block* block) {
     const std::uint64_t head = head_of(block);
     std::size_t size = size_of(head);
     std::uint64_t last = head & LAST_OF_REGION;
-    forbid_access(block, size);  // the head too: the tail of a block that shrank had none
+    forbid_access(block, size);  // the head too: where a block shrank, it was part of the payload
     set_head(block, size);       // no longer live, even if it is joined to its predecessor
     if (last == 0) {
         Block* after = successor(block, size);

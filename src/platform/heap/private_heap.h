@@ -1,4 +1,4 @@
-// A private heap: parts with a lock each, so that threads do not wait for each other.
+// A private heap: parts with a lock each, so that threads seldom wait for each other.
 #ifndef BASALT_SRC_PLATFORM_HEAP_PRIVATE_HEAP_H
 #define BASALT_SRC_PLATFORM_HEAP_PRIVATE_HEAP_H
 
@@ -12,9 +12,9 @@
 namespace basalt::platform {
 
 // The record has pages of its own; a handle is its address. The first part is in the record and serves the
-// first thread, and every thread of a heap with a maximum; the others are made when further threads allocate.
-// A block is freed by any thread: its own part is searched first. Threads: thread-safe except create() and
-// destroy().
+// first thread, and every thread of a heap with a maximum; the others are made when further threads allocate,
+// and threads of equal hash share one. A block is freed by any thread: the thread's part is searched first.
+// Threads: thread-safe except create() and destroy().
 class PrivateHeap {
 public:
     // At most so many bytes are mapped for blocks (a multiple of the page size, 0 for no limit).

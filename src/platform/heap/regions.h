@@ -45,7 +45,7 @@ public:
     void erase(const std::byte* begin);
 
 private:
-    static constexpr std::size_t INLINE_REGIONS = 32;  // heaps up to about 750 MiB need no further pages
+    static constexpr std::size_t INLINE_REGIONS = 32;  // shared regions of 736 MiB in all
 
     std::array<Region, INLINE_REGIONS> m_inline{};
     Region* m_regions = m_inline.data();

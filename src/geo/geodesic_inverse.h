@@ -61,6 +61,31 @@ BASALT_INLINE Lane epsilon_of(const Lane& k2) {
     return k2 / (2.0 * (1.0 + elementary::root(1.0 + k2)) + k2);
 }
 
+/// The line on the sphere with the curvature at the mean latitude, eq. 48 to 51.
+template <typename Lane>
+struct SphereLine {
+    Direction<Lane> azimuth1, azimuth2;  ///< not of length 1
+    Direction<Lane> arc;
+    Lane scale;  ///< radius in semi-major axes
+
+    BASALT_INLINE explicit SphereLine(const Problem<Lane>& p) {
+        using namespace elementary;
+        const Direction<Lane>& b1 = p.beta1;
+        const Direction<Lane>& b2 = p.beta2;
+        const Lane mean = (b1.cosine + b2.cosine) / 2.0;
+        scale = root(1.0 - EXACT_ECCENTRICITY2 * mean * mean);
+        const auto omega = sin_cos(smaller<Lane>(p.longitude / scale, all_of<Lane>(PI)));
+        // 1 - cos(omega) without cancellation.
+        const Lane versine =
+            omega.cosine > 0.0 ? omega.sine * omega.sine / (1.0 + omega.cosine) : 1.0 - omega.cosine;
+        const Lane north = b1.cosine * b2.sine - b1.sine * b2.cosine;
+        azimuth1 = {b2.cosine * omega.sine, north + b1.sine * b2.cosine * versine};
+        azimuth2 = {b1.cosine * omega.sine, north - b1.cosine * b2.sine * versine};
+        arc = {root(azimuth1.sine * azimuth1.sine + azimuth1.cosine * azimuth1.cosine),
+               b1.sine * b2.sine + b1.cosine * b2.cosine * omega.cosine};
+    }
+};
+
 /// The geodesic that leaves the start with an azimuth, up to the end's latitude.
 template <typename Lane>
 struct Trial {
@@ -76,7 +101,7 @@ struct Trial {
         const Direction<Lane>& b2 = p.beta2;
         const Lane sin_alpha0 = azimuth1.sine * b1.cosine;
         const Lane cos2_alpha0 = azimuth1.cosine * azimuth1.cosine + square(azimuth1.sine * b1.sine);
-        // Both: near the equator cosines are equal that sines distinguish, and near a pole sines.
+        // Near the equator only the sines differ, near a pole only the cosines.
         const auto same_size =
             (b1.cosine == b2.cosine) & (elementary::size_of(b1.sine) == elementary::size_of(b2.sine));
         // Eq. 45, by whichever difference of squares loses less.
@@ -111,39 +136,28 @@ struct Trial {
 Direction<double> antipodal_azimuth(const Problem<double>& p);
 
 /// The line between places neither of which is a pole, nor both on a meridian or the equator.
-/// @param[in,out] is_wanted lanes that count; those of nearly opposite places are taken away
+/// @param[in,out] is_wanted lanes to solve; of four, those of nearly opposite places are cleared
 template <typename Lane, typename Mask>
 BASALT_INLINE Solution<Lane> solve(const Problem<Lane>& p, Mask& is_wanted) {
     using namespace elementary;
     constexpr bool IS_SINGLE = std::is_same_v<Lane, double>;
-    const Direction<Lane>& b1 = p.beta1;
-    const Direction<Lane>& b2 = p.beta2;
-    // The sphere with the curvature at the mean latitude, eq. 48 to 51; 1 - cos(omega) without cancellation.
-    const Lane mean = (b1.cosine + b2.cosine) / 2.0;
-    const Lane scale = root(1.0 - EXACT_ECCENTRICITY2 * mean * mean);
-    const auto omega = sin_cos(smaller<Lane>(p.longitude / scale, all_of<Lane>(PI)));
-    const Lane versine =
-        omega.cosine > 0.0 ? omega.sine * omega.sine / (1.0 + omega.cosine) : 1.0 - omega.cosine;
-    const Lane north = b1.cosine * b2.sine - b1.sine * b2.cosine;
-    const Direction<Lane> z1 = {b2.cosine * omega.sine, north + b1.sine * b2.cosine * versine};
-    const Direction<Lane> z2 = {b1.cosine * omega.sine, north - b1.cosine * b2.sine * versine};
-    const Direction<Lane> arc = {root(z1.sine * z1.sine + z1.cosine * z1.cosine),
-                                 b1.sine * b2.sine + b1.cosine * b2.cosine * omega.cosine};
+    const SphereLine<Lane> sphere(p);
+    const Direction<Lane>& arc = sphere.arc;
     const auto is_short = (arc.cosine > 0.0) & (arc.sine < SHORT_ARC);
     const auto is_opposite =
-        (arc.cosine < 0.0) & (arc.sine < 6.0 * THIRD_FLATTENING * PI * b1.cosine * b1.cosine);
+        (arc.cosine < 0.0) & (arc.sine < 6.0 * THIRD_FLATTENING * PI * p.beta1.cosine * p.beta1.cosine);
     if constexpr (!IS_SINGLE) {
         is_wanted &= ~is_opposite;
     }
     auto is_active = is_wanted & negated(is_short);
     Lane short_distance = {};
     if (is_any(is_short)) {
-        short_distance = SEMI_MAJOR_AXIS * scale * angle_of(arc);
+        short_distance = SEMI_MAJOR_AXIS * sphere.scale * angle_of(arc);
         if (!is_any(is_active)) {
-            return {short_distance, z1, z2};
+            return {short_distance, sphere.azimuth1, sphere.azimuth2};
         }
     }
-    Direction<Lane> azimuth = z1.normalised();
+    Direction<Lane> azimuth = sphere.azimuth1.normalised();
     if constexpr (IS_SINGLE) {
         azimuth = is_opposite ? antipodal_azimuth(p) : azimuth;
     }
@@ -168,12 +182,13 @@ BASALT_INLINE Solution<Lane> solve(const Problem<Lane>& p, Mask& is_wanted) {
             is_active &= (next.sine != azimuth.sine) | (next.cosine != azimuth.cosine);
         }
         if (!is_any(is_active) || pass == MOST_SEARCH_PASSES) {
-            // What is missed of the longitude lengthens the line by its part along it.
+            // The line ends beyond the end's longitude by `miss`; its part along the line is subtracted.
             const Lane length =
                 distance_series(trial.epsilon).between(trial.sigma1, trial.sigma2, trial.sigma);
-            const Lane beyond = SEMI_MAJOR_AXIS * b2.cosine * trial.azimuth2.sine * miss;
-            return {is_short ? short_distance : POLAR_RADIUS * length - beyond, choose(is_short, z1, azimuth),
-                    choose(is_short, z2, trial.azimuth2)};
+            const Lane beyond = SEMI_MAJOR_AXIS * p.beta2.cosine * trial.azimuth2.sine * miss;
+            return {is_short ? short_distance : POLAR_RADIUS * length - beyond,
+                    choose(is_short, sphere.azimuth1, azimuth),
+                    choose(is_short, sphere.azimuth2, trial.azimuth2)};
         }
         best = smaller(size, best);
         const auto is_beyond = miss > 0.0;

@@ -78,7 +78,7 @@ struct GeodesicInverse {
 /// places.
 /// @param from geodetic point; latitude in [-pi/2, pi/2], longitude in any range, height ignored
 /// @param to geodetic point
-/// @return distance and azimuths: 0 all for equal places. Of several shortest lines (between opposite places)
+/// @return distance and azimuths, all 0 for equal places. Of several shortest lines (between opposite places)
 /// one is returned. At a pole the azimuth is counted from the meridian of the longitude given.
 ///
 /// Bad input: three NaN for a latitude beyond a pole, NaN and an infinite longitude. At most 60 passes; 2 or

@@ -1,5 +1,5 @@
-// Bitmaps of any size, depth and contents: as a file, as a region, rotated, and drawn on by the family's
-// functions, held against the picture model.
+// Bitmaps of any size, depth and contents against the picture model: as a file, as a region, rotated, and
+// drawn on by the family's functions.
 #include <sys/mman.h>
 #include <unistd.h>
 

@@ -1,4 +1,4 @@
-// A fuzzer's input, taken piece by piece; behind its end there are zeros.
+// A fuzzer's input, read piece by piece; beyond its end are zeros.
 #ifndef BASALT_FUZZ_INPUT_H
 #define BASALT_FUZZ_INPUT_H
 
@@ -12,10 +12,10 @@
 
 namespace basalt::fuzz {
 
-// Ends the program where it does not hold; says whose call it was.
+// Aborts if a condition does not hold, and prints where the caller is.
 inline void require(bool holds, const char* file = __builtin_FILE(), int line = __builtin_LINE()) {
     if (!holds) {
-        std::fprintf(stderr, "%s:%d: not so\n", file, line);
+        std::fprintf(stderr, "%s:%d: failed\n", file, line);
         std::abort();
     }
 }

@@ -11,6 +11,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <fstream>
 #include <iterator>
 #include <random>
@@ -26,7 +27,7 @@ using Bytes = std::vector<std::uint8_t>;
 char g_running[64];  // what runs now, for the handler
 
 void print_running(int signal) {
-    (void)!write(STDERR_FILENO, g_running, sizeof g_running);
+    (void)!write(STDERR_FILENO, g_running, std::strlen(g_running));
     (void)std::signal(signal, SIG_DFL);
     (void)std::raise(signal);
 }
@@ -51,6 +52,11 @@ Bytes random_input(std::uint64_t seed, const std::vector<Bytes>& kept) {
     return input;
 }
 
+void run(const Bytes& input) {
+    alarm(60);  // an input that hangs is a failure
+    LLVMFuzzerTestOneInput(input.data(), input.size());
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -65,7 +71,7 @@ int main(int argc, char** argv) {
         std::ifstream file(argv[i], std::ios::binary);
         kept.emplace_back(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
         std::snprintf(g_running, sizeof g_running, "input: file %d of the arguments\n", i - 2);
-        LLVMFuzzerTestOneInput(kept.back().data(), kept.back().size());
+        run(kept.back());
     }
     const Clock::time_point end = Clock::now() + std::chrono::seconds(seconds);
     std::uint64_t count = 0;
@@ -73,8 +79,7 @@ int main(int argc, char** argv) {
         std::snprintf(g_running, sizeof g_running, "input: seed %llu\n",
                       static_cast<unsigned long long>(seed));
         const Bytes input = random_input(seed, kept);
-        alarm(60);  // an input that hangs is a failure
-        LLVMFuzzerTestOneInput(input.data(), input.size());
+        run(input);
         ++seed;
         ++count;
     } while (Clock::now() < end);

@@ -162,7 +162,8 @@ private:
         basalt::GridCell cells[80];
         void* elements[80];
         std::generate(cells, cells + 80, [&] { return basalt::GridCell{m_input.coordinate(), y}; });
-        SparseCells::find(pair.array, cells, elements, 80);
+        const std::size_t found = SparseCells::find(pair.array, cells, elements, 80);
+        require(80 - std::count(elements, elements + 80, nullptr) == static_cast<std::ptrdiff_t>(found));
         for (int i = 0; i < 80; ++i) {
             pair.check_cell(cells[i].x, y, elements[i]);
         }

@@ -2,7 +2,6 @@
 // array.
 #include <chrono>
 #include <cstring>
-#include <memory>
 #include <random>
 #include <tuple>
 #include <vector>

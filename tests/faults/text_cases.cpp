@@ -1,6 +1,5 @@
 // Environment, texts, timers, log, hexadecimal text, hardware addresses, version information, paths and
 // files.
-#include <cstdlib>
 #include <filesystem>
 #include <new>
 #include <string>

@@ -1,5 +1,5 @@
-// Makes every call that an operation makes to the heap or the system fail in turn, once and for good, and
-// prints a line for each: the documented answer, nothing left behind, everything usable afterwards.
+// Makes every call of an operation to the heap or the system fail in turn, once and for good, and prints a
+// line for each operation: the documented result, nothing leaked, everything usable afterwards.
 #include "tests/faults/trial.h"
 
 #include <unistd.h>

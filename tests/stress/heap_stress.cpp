@@ -1,5 +1,5 @@
-// The shared heap, a private heap with a limit and one without, and page sources. One thread allocates a
-// block, another finds it as it was left and frees it.
+// The shared heap, a private heap with a limit and one without, and page sources. One thread allocates and
+// fills a block, another checks and frees it.
 #include <cstring>
 
 #include "basalt/memory.h"

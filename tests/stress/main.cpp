@@ -1,6 +1,6 @@
-// Runs one subject, or all but first_use, and prints how often the threads went round and what the process
-// holds. The thread sanitizer finds data races; other faults end the program, and so does memory that grows
-// in a run of a minute or more. Usage: stress [SECONDS (for each subject) [SUBJECT]]
+// Runs one subject, or all but first_use, and prints its number of rounds and the resident memory. The thread
+// sanitizer finds data races; other faults end the program, and so does memory that grows in a run of a
+// minute or more. Usage: stress [SECONDS (for each subject) [SUBJECT]]
 #include <malloc.h>
 #include <unistd.h>
 
@@ -76,8 +76,7 @@ void (*const CALLS[])() = {
     [] { require(IsHexString(StringToHexString(std::string(100, 'x')))); },
 };
 
-// What is made at its first use, by all threads at once and each in another order: good for one try a
-// process.
+// What is made at its first use, by all threads at once in different orders: one try per process.
 long first_use(double) {
     std::latch start(THREADS);
     test::run_threads(THREADS, [&](int thread) {

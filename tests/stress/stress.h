@@ -12,14 +12,14 @@ namespace basalt::stress {
 
 using fuzz::require;
 
-// What a thread draws its choices from; no two threads the same, and every run the same.
+// Source of a thread's choices: seeded with its number, so that every run draws the same.
 using Random = std::mt19937;
 
 inline int draw(Random& random, int below) {
     return static_cast<int>(random() % static_cast<unsigned>(below));
 }
 
-// The thread's number and its choices. Called over and over, in every thread, until the time is up.
+// Called again and again, in every thread, until the time is up.
 using Round = std::function<void(int thread, Random& random)>;
 
 // The number of rounds of all threads together.

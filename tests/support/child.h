@@ -1,4 +1,4 @@
-// Processes of a test's own.
+// Forked children of a test.
 #ifndef BASALT_TESTS_SUPPORT_CHILD_H
 #define BASALT_TESTS_SUPPORT_CHILD_H
 

@@ -1,4 +1,4 @@
-// Writes what was run before a process ends by _Exit, which leaves it out (linked with --wrap).
+// Writes the coverage counts before _Exit, which does not (linked with --wrap).
 #include <sys/resource.h>
 
 extern "C" {

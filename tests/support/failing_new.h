@@ -39,7 +39,7 @@ struct FailAllocation {
 };
 
 // Blocks from operator new that this thread has taken and not given back (below zero when it gives back the
-// blocks of others). Two readings that agree say that nothing leaked in between.
+// blocks of others). Equal readings: nothing leaked in between.
 inline long live_allocations() {
     return basalt::test::live_blocks;
 }

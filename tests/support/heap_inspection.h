@@ -109,7 +109,7 @@ private:
 
     HeapPart& m_heap;
     HeapReport& m_report;
-    std::size_t m_free = 0, m_quick = 0;                                    // blocks not yet met in a list
+    std::size_t m_free = 0, m_quick = 0;                                    // blocks not yet found in a list
     std::size_t m_mapped = 0, m_shared = 0, m_live_shared = 0, m_idle = 0;  // bytes
 };
 

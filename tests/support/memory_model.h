@@ -32,11 +32,11 @@ auto in_library(Call call) {
     return result;
 }
 
-// A block with a pattern of its own at both ends, which no one else may overwrite.
+// A block with a pattern of its own at both ends.
 class Marked {
 public:
     Marked(void* block, std::size_t size) { move(block, size); }
-    // As far as it has been kept.
+    // The first `kept` bytes at most.
     void check(std::size_t kept = SIZE_MAX) const {
         for_ends([this, kept](std::size_t i) { require(i >= kept || m_block[i] == byte(i)); });
     }
@@ -70,7 +70,7 @@ inline std::size_t any_size(Input& input) {
     return size << (shift < 14 ? shift % 8 : shift);
 }
 
-// Steps while there is input, and a look at the whole state.
+// Steps while there is input, then a check of the whole state.
 template <class Model>
 void drive(
     Model&& model, Input& input, int steps, const MayFail& may_fail = [] { return false; }) {

@@ -7,7 +7,7 @@
 
 namespace basalt::test {
 
-// Readings that agree say that none has leaked in between.
+// Equal readings: none leaked in between.
 inline long open_descriptors() {
     const std::filesystem::directory_iterator all("/proc/self/fd");
     return std::distance(begin(all), end(all));

@@ -2,7 +2,6 @@
 #ifndef BASALT_TESTS_SUPPORT_VERSION_BLOCK_H
 #define BASALT_TESTS_SUPPORT_VERSION_BLOCK_H
 
-#include <algorithm>
 #include <fstream>
 #include <string>
 #include <vector>

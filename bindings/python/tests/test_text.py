@@ -26,6 +26,8 @@ def test_paths_are_taken_apart_and_put_together(tmp_path):
     (tmp_path / "b.txt").touch()
     listed = files.files_in_directory(f"{tmp_path}/", "*.csv")
     assert listed == [str(tmp_path / "a.csv")]
+    assert files.files_in_directory(tmp_path / "none", "*") == []
+    assert files.files_in_directory(os.path.relpath(tmp_path), "*.csv") == listed
 
 
 def test_names_that_are_no_text_lead_to_their_files(tmp_path):

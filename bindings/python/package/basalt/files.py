@@ -44,8 +44,9 @@ def set_extension(path: _Path, extension: str) -> str:
 
 
 def files_in_directory(directory: _Path, pattern: str) -> list[str]:
-    """Paths of the files whose names match a pattern with * and ? (vex_util::CFilePath::GetFilesInDirectory).
+    """Absolute paths of a directory's entries, folders too, whose names match a pattern with * and ?.
 
-    The directory ends with a separator, or exists.
+    Empty where there is no such directory (vex_util::CFilePath::GetFilesInDirectory).
     """
-    return [_slashes(path) for path in _basalt.files_in_directory(directory, pattern)]
+    folder = os.path.join(os.path.abspath(_slashes(os.fspath(directory))), "")  # the library needs both
+    return [_slashes(path) for path in _basalt.files_in_directory(folder, pattern)]

@@ -20,12 +20,11 @@ HERE = pathlib.Path(__file__).resolve().parent
 ROOT = HERE / "library" if (HERE / "library").exists() else HERE.parent.parent
 LIBRARY = pathlib.Path(os.environ.get("BASALT_LIBRARY", ROOT / "build" / "python" / "library"))
 
-
-# One compiler for both: the library's functions are inlined into the loops over arrays, as far as GCC makes them.
+# One compiler for both: with GCC the library's functions are inlined into the loops over arrays.
 CXX = (os.environ.get("CXX") or sysconfig.get_config_var("CXX") or "c++").split()[0]
 INLINED = [] if "clang" in CXX else ["-flto=auto"]
 
-WORK = LIBRARY / "python"  # what setuptools makes: beside the library that it is made of
+WORK = LIBRARY / "python"  # build folder of setuptools
 WORK.mkdir(parents=True, exist_ok=True)
 
 

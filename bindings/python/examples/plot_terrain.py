@@ -1,5 +1,5 @@
 #!/usr/bin/env python3
-"""A terrain from a grid file, a window of it, and its picture: read from top to bottom.
+"""A terrain from a grid file, a window of it, and its picture.
 
 Usage: plot_terrain.py [GRID.asc [PICTURE.png]]
 """
@@ -44,7 +44,7 @@ records["slope"] = np.hypot(fall_south, fall_east)[known]
 terrain.insert(east[known], north[known], records)
 print(f"{len(records)} cells of {side_east:.1f} m by {side_north:.1f} m")
 
-# %% A window: what is looked at, which may be a part of what there is.
+# %% A window: the middle half of the grid.
 least, greatest = (columns // 4, rows // 4), (3 * columns // 4, 3 * rows // 4)
 cells, found = terrain.window(least, greatest)
 window = np.where(found, cells["height"], np.nan)

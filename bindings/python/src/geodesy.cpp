@@ -1,7 +1,6 @@
 // The WGS84 ellipsoid, lines on it, and covariances of positions.
 #include <algorithm>
 #include <cstddef>
-#include <limits>
 
 #include "basalt/geo.h"
 #include "basalt/geo/arrays.h"
@@ -11,8 +10,6 @@
 namespace basalt_python {
 
 namespace {
-
-constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
 
 // Arguments: x, y, z, six numbers; six numbers out.
 template <int (*TRANSFORM)(const geo_vector*, const double*, double*)>
@@ -31,7 +28,7 @@ void each_covariance(char** arguments, const npy_intp* sizes, const npy_intp* st
             *reinterpret_cast<double*>(arguments[4] + i * steps[4] + k * steps[6]) = covariance[k];
         }
     }
-    forget_float_flags();
+    clear_float_flags();
 }
 
 template <int (*TRANSFORM)(const geo_vector*, const double*, double*)>

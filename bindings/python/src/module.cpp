@@ -1,4 +1,4 @@
-// The extension module: everything that the package's Python files are made of.
+// The extension module, which the package's Python files import from.
 #define BASALT_PYTHON_MODULE
 #include "universal.h"
 
@@ -13,8 +13,8 @@
 
 namespace {
 
-// NumPy's macros return from where they stand.
-bool numpy_is_there() {
+// NumPy's macros return from the function that they are in.
+bool import_numpy() {
     import_array1(false);
     import_umath1(false);
     return true;
@@ -65,7 +65,7 @@ const char* basalt_python::with_units(const char* text) {
 }
 
 PYBIND11_MODULE(_basalt, module) {
-    if (!numpy_is_there()) {
+    if (!import_numpy()) {
         throw pybind11::error_already_set();
     }
     module.attr("VERSION") = BASALT_VERSION;

@@ -1,5 +1,4 @@
 // Observations and their reduction to grid points.
-#include <limits>
 
 #include "basalt/geo.h"
 #include "universal.h"
@@ -8,7 +7,7 @@ namespace basalt_python {
 
 void add_observations(pybind11::module_& m) {
     add(m, "first_face",
-        "first_face(horizontal, vertical): (horizontal, vertical) of an observation brought to the first "
+        "first_face(horizontal, vertical): (horizontal, vertical) of an observation as on the first "
         "face, radians (geo_normalise_obs).",
         [](double horizontal, double vertical) {
             geo_hvd obs{horizontal, vertical, 0};
@@ -25,7 +24,6 @@ void add_observations(pybind11::module_& m) {
     add(m, "_calculate_observation", "See calculate_observation.",
         [](double n1, double e1, double h1, double height1, double n2, double e2, double h2, double height2,
            double scale) {
-            constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
             geo_hvd out{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER};  // stays where a field is GEO_NULL
             geo_calc_obs({n1, e1, h1}, height1, {n2, e2, h2}, height2, out, scale);
             return std::tuple{out.horizontal, out.vertical, out.distance};

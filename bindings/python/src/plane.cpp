@@ -1,6 +1,5 @@
 // Measures of the plane, curves and the intersection of bearings.
 #include <cstddef>
-#include <limits>
 
 #include "basalt/geo.h"
 #include "basalt/geo/arrays.h"
@@ -10,7 +9,6 @@ namespace basalt_python {
 
 namespace {
 
-constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
 using Point = std::tuple<double, double, double>;
 
 geo_nee flat(double north, double east) {

@@ -59,7 +59,7 @@ void each_point(char** arguments, const npy_intp* sizes, const npy_intp* steps, 
                                 : prepared->contains(point);
         }
     });
-    forget_float_flags();
+    clear_float_flags();
 }
 
 template <bool HAS_TOLERANCE, bool IS_AREA, class Test>
@@ -88,7 +88,7 @@ void each_outline(char** arguments, const npy_intp* sizes, const npy_intp* steps
             *reinterpret_cast<double*>(arguments[2] + i * steps[2]) = MEASURE(outline.data(), outline.size());
         }
     });
-    forget_float_flags();
+    clear_float_flags();
 }
 
 template <double (*MEASURE)(const geo_nee*, std::size_t) noexcept>
@@ -108,7 +108,8 @@ struct Prepared {
 
 void each_prepared(char** arguments, const npy_intp* sizes, const npy_intp* steps, void* data) {
     const auto& polygon = *static_cast<const basalt::PreparedPolygon*>(data);
-    const Column norths{arguments[0], steps[0]}, easts{arguments[1], steps[1]};
+    const Column norths{arguments[0], steps[0]}, easts{arguments[1], steps[1]},
+        results{arguments[2], steps[2]};
     geo_nee points[BLOCK];
     bool inside[BLOCK];
     const auto total = static_cast<std::size_t>(*sizes);
@@ -119,10 +120,10 @@ void each_prepared(char** arguments, const npy_intp* sizes, const npy_intp* step
         }
         polygon.contains(points, count, inside);
         for (std::size_t i = 0; i < count; ++i) {
-            *reinterpret_cast<bool*>(arguments[2] + static_cast<npy_intp>(first + i) * steps[2]) = inside[i];
+            results.at<bool>(first + i) = inside[i];
         }
     }
-    forget_float_flags();
+    clear_float_flags();
 }
 
 void each_prepared_or_near(char** arguments, const npy_intp* sizes, const npy_intp* steps, void* data) {
@@ -134,18 +135,16 @@ void each_prepared_or_near(char** arguments, const npy_intp* sizes, const npy_in
         *reinterpret_cast<bool*>(arguments[3] + i * steps[3]) =
             polygon.contains({number(0), number(1), 0}, number(2));
     }
-    forget_float_flags();
+    clear_float_flags();
 }
 
 pybind11::object made_with(Prepared& prepared, const pybind11::object& owner, PyUFuncGenericFunction* loop,
                            char* types, int inputs, const char* name) {
     PyObject* made = PyUFunc_FromFuncAndData(loop, &prepared.data, types, 1, inputs, 1, PyUFunc_None, name,
                                              "See PreparedPolygon.", 0);
-    if (made == nullptr) {
-        throw pybind11::error_already_set();
-    }
+    const pybind11::object function = owned(made);
     reinterpret_cast<PyUFuncObject*>(made)->obj = owner.inc_ref().ptr();  // released with the function
-    return pybind11::reinterpret_steal<pybind11::object>(made);
+    return function;
 }
 
 using Numbers = pybind11::array_t<double, pybind11::array::c_style>;
@@ -175,7 +174,7 @@ void add_polygons(pybind11::module_& m) {
     add_outline_test<false, true>(
         m, "in_polygon",
         "in_polygon(north, east, norths, easts): whether points lie inside polygons, "
-        "whose vertices lie along the last axis; on an edge what rounding leaves "
+        "whose vertices lie along the last axis; on an edge either, by rounding "
         "(geo_point_in_poly).",
         [](int n, const geo_nee* polygon, const geo_nee& point, double) {
             return geo_point_in_poly(n, polygon, &point);

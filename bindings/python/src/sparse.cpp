@@ -9,6 +9,7 @@
 #include <cstring>
 #include <memory>
 #include <mutex>
+#include <stdexcept>
 #include <tuple>
 #include <utility>
 #include <vector>
@@ -48,7 +49,7 @@ public:
         check(x, y, elements.size());
         const auto [xs, ys, bytes] = std::tuple{x.data(), y.data(), elements.data()};
         const py::ssize_t count = x.size();
-        alone([&] {
+        exclusively([&] {
             std::uint8_t padded[LEAST_SIZE] = {};
             for (py::ssize_t i = 0, run = 0; i < count; i += run) {
                 const std::uint8_t* element = bytes + static_cast<std::size_t>(i) * m_size;
@@ -78,7 +79,7 @@ public:
         Flags found(x.size());
         const auto [xs, ys] = std::pair{x.data(), y.data()};
         const auto [bytes, flags] = std::pair{elements.mutable_data(), found.mutable_data()};
-        alone([&] {
+        exclusively([&] {
             basalt::GridCell cells[BLOCK];
             void* at[BLOCK];
             for (std::size_t first = 0; first < count; first += BLOCK) {
@@ -119,19 +120,19 @@ public:
     void insert_rows(std::int32_t x, std::int32_t y, std::size_t columns, const Bytes& elements) {
         const std::uint8_t* row = elements.data();
         const std::uint8_t* const end = row + elements.size();
-        alone([&] {
+        exclusively([&] {
             for (; row != end; row += columns * m_size) {
                 SparseCells::insert_row(m_array, x, y++, row, m_size, columns);
             }
         });
     }
 
-    // Into arrays of the caller; elements of empty cells are left.
+    // Copies into arrays of the caller; elements of empty cells are left as they are.
     void copy_rows(std::int32_t x, std::int32_t y, std::size_t columns, Bytes& elements, Flags& found) {
         std::uint8_t* row = elements.mutable_data();
         bool* flags = found.mutable_data();
         const bool* const end = flags + found.size();
-        alone([&] {
+        exclusively([&] {
             for (; flags != end; flags += columns, row += columns * m_size) {
                 SparseCells::copy_row(m_array, x, y++, row, m_size, flags, columns);
             }
@@ -153,13 +154,13 @@ public:
                 SparseCells::remove_row(array, row.x + first, row.y, static_cast<std::size_t>(end - first));
             return true;
         };
-        alone([&] { SparseCells::visit(m_array, &window, remove, &context); });
+        exclusively([&] { SparseCells::visit(m_array, &window, remove, &context); });
         return context.removed;
     }
 
     std::size_t size() {
         std::size_t filled = 0;
-        alone([&] { filled = SparseCells::size(m_array); });
+        exclusively([&] { filled = SparseCells::size(m_array); });
         return filled;
     }
 
@@ -168,7 +169,7 @@ public:
         Flags removed(x.size());
         const auto [xs, ys, flags] = std::tuple{x.data(), y.data(), removed.mutable_data()};
         const py::ssize_t count = x.size();
-        alone([&] {
+        exclusively([&] {
             for (py::ssize_t i = 0; i < count; ++i) {
                 flags[i] = m_array.Remove(xs[i], ys[i]);
             }
@@ -177,7 +178,7 @@ public:
     }
 
     void clear() {
-        alone([&] { m_array.RemoveAll(); });
+        exclusively([&] { m_array.RemoveAll(); });
     }
 
     using Selected =
@@ -202,7 +203,7 @@ private:
 
     Selected visited(const basalt::GridWindow* window) {
         Visited cells{m_size, {}, {}, {}};
-        alone([&] { SparseCells::visit(m_array, window, &collect, &cells); });
+        exclusively([&] { SparseCells::visit(m_array, window, &collect, &cells); });
         return {array_of(std::move(cells.xs)), array_of(std::move(cells.ys)),
                 array_of(std::move(cells.bytes))};
     }
@@ -222,7 +223,7 @@ private:
     void check(const Cells& x, const Cells& y, py::ssize_t bytes) const {
         if (x.ndim() != 1 || y.ndim() != 1 || x.size() != y.size() ||
             bytes != x.size() * static_cast<py::ssize_t>(m_size)) {
-            throw std::invalid_argument("as many x, y and elements are wanted");
+            throw std::invalid_argument("x, y and elements differ in number");
         }
     }
 
@@ -232,9 +233,9 @@ private:
         return std::unique_lock(m_mutex);
     }
 
-    // A batch is one step for other threads of Python, whose interpreter goes on meanwhile.
+    // Runs a batch that other threads see as one step; the interpreter's lock is released.
     template <class Work>
-    void alone(Work work) {
+    void exclusively(Work work) {
         const py::gil_scoped_release others_run;
         const std::lock_guard guard(m_mutex);
         work();

@@ -21,16 +21,12 @@ namespace {
 namespace py = pybind11;
 using pybind11::literals::operator""_a;
 
-// A path of Python: a text or what has __fspath__. Bytes of a name that are no UTF-8 stand in it as the
-// values 0xDC80 to 0xDCFF, which is what the library makes of them too; pybind11's own conversions refuse
-// those.
+// A path of Python: a str or an object with __fspath__. Bytes that are not UTF-8 are the surrogates 0xDC80 to
+// 0xDCFF in it, as in the library; pybind11's own conversions refuse those.
 CString wide(const py::object& path) {
-    const auto text = py::reinterpret_steal<py::object>(PyOS_FSPath(path.ptr()));
-    if (!text) {
-        throw py::error_already_set();
-    }
+    const py::object text = owned(PyOS_FSPath(path.ptr()));
     if (!py::isinstance<py::str>(text)) {
-        throw py::type_error("a path is a str or leads to one");
+        throw py::type_error("expected a path as str, not bytes");
     }
     Py_ssize_t length = 0;
     const std::unique_ptr<wchar_t, decltype(&PyMem_Free)> characters(
@@ -39,22 +35,18 @@ CString wide(const py::object& path) {
         throw py::error_already_set();
     }
     if (std::wcslen(characters.get()) != static_cast<std::size_t>(length)) {
-        throw std::invalid_argument("a zero in a path");
+        throw std::invalid_argument("the path contains a null character");
     }
     return CString(characters.get());
 }
 
 py::str plain(const CString& text) {
-    PyObject* made = PyUnicode_FromWideChar(text.GetString(), text.GetLength());
-    if (made == nullptr) {
-        throw py::error_already_set();
-    }
-    return py::reinterpret_steal<py::str>(made);
+    return owned(PyUnicode_FromWideChar(text.GetString(), text.GetLength()));
 }
 
-// Accesses the disk with the interpreter's lock released.
+// Runs work that reads the disk with the interpreter's lock released.
 template <class Work>
-auto meanwhile(Work work) {
+auto without_lock(Work work) {
     const py::gil_scoped_release others_run;
     return work();
 }
@@ -63,26 +55,26 @@ auto meanwhile(Work work) {
 
 void add_text(pybind11::module_& module) {
     module.def("split_path", [](const py::object& path) {
-        const auto parts = meanwhile([whole = wide(path)] { return vex_util::CFilePath(whole); });
+        const auto parts = without_lock([whole = wide(path)] { return vex_util::CFilePath(whole); });
         return std::tuple{plain(parts.Drive()), plain(parts.DirectoryOnly()), plain(parts.FileNameOnly()),
                           plain(parts.Extension())};
     });
     module.def("combine_path", [](const py::object& first, const py::object& second) {
-        return plain(meanwhile([a = wide(first), b = wide(second)] {
+        return plain(without_lock([a = wide(first), b = wide(second)] {
             vex_util::CFilePath path;
             path.Combine(a, b);
             return path;
         }));
     });
     module.def("set_extension", [](const py::object& path, const py::object& extension) {
-        return plain(meanwhile([whole = wide(path), last = wide(extension)] {
+        return plain(without_lock([whole = wide(path), last = wide(extension)] {
             vex_util::CFilePath parts(whole);
             parts.SetExtension(last);
             return parts;
         }));
     });
     module.def("files_in_directory", [](const py::object& directory, const py::object& pattern) {
-        const auto found = meanwhile([whole = wide(directory), chosen = wide(pattern)] {
+        const auto found = without_lock([whole = wide(directory), chosen = wide(pattern)] {
             return vex_util::CFilePath(whole).GetFilesInDirectory(chosen);
         });
         py::list names;
@@ -100,7 +92,7 @@ void add_text(pybind11::module_& module) {
         "hex_to_bytes",
         [](const std::string& text) {
             if (text.size() % 2 != 0 || !basalt::IsHexString(text)) {
-                throw std::invalid_argument("pairs of hexadecimal digits are wanted");
+                throw std::invalid_argument("expected pairs of hexadecimal digits");
             }
             const std::vector<unsigned char> bytes = basalt::HexStringToVector(text);
             return py::bytes(reinterpret_cast<const char*>(bytes.data()), bytes.size());

@@ -21,11 +21,15 @@
 #include <cstddef>
 #include <cstdint>
 #include <exception>
+#include <limits>
+#include <new>
 #include <tuple>
 #include <type_traits>
 #include <utility>
 
 namespace basalt_python {
+
+inline constexpr double NOT_A_NUMBER = std::numeric_limits<double>::quiet_NaN();
 
 template <class T>
 constexpr char type_number() {
@@ -36,7 +40,7 @@ constexpr char type_number() {
     } else if constexpr (std::is_same_v<T, std::uint64_t>) {
         return NPY_UINT64;
     } else {
-        static_assert(std::is_same_v<T, std::int64_t>, "integers travel as 64 bits, whole numbers of Python");
+        static_assert(std::is_same_v<T, std::int64_t>, "integers are passed as 64 bits");
         return NPY_INT64;
     }
 }
@@ -50,10 +54,17 @@ struct Results<std::tuple<T...>> {
     using Tuple = std::tuple<T...>;
 };
 
-// Markers and NaN are documented results, so clear the floating-point flags: NumPy would
-// warn of them.
-inline void forget_float_flags() {
+// Markers and NaN are documented results: NumPy would warn of their floating-point flags.
+inline void clear_float_flags() {
     std::feclearexcept(FE_ALL_EXCEPT);
+}
+
+// Takes ownership of what a call of Python's API made; throws Python's error for null.
+inline pybind11::object owned(PyObject* made) {
+    if (made == nullptr) {
+        throw pybind11::error_already_set();
+    }
+    return pybind11::reinterpret_steal<pybind11::object>(made);
 }
 
 // An exception may not pass through NumPy, which runs without the interpreter's lock.
@@ -89,7 +100,7 @@ struct Universal<Kernel, Out (Kernel::*)(In...) const> {
             step_through(arguments, *sizes, steps, std::make_index_sequence<INPUTS>{},
                          std::make_index_sequence<OUTPUTS>{});
         });
-        forget_float_flags();
+        clear_float_flags();
     }
 
     template <std::size_t... I, std::size_t... O>
@@ -107,7 +118,7 @@ struct Universal<Kernel, Out (Kernel::*)(In...) const> {
         };
         const bool is_contiguous = ((steps[I] == sizeof(In)) && ...) &&
                                    ((steps[INPUTS + O] == sizeof(std::tuple_element_t<O, Tuple>)) && ...);
-        if (is_contiguous) {  // a loop of its own, with four numbers at a time where the compiler can
+        if (is_contiguous) {  // a loop of its own, which the compiler may vectorise
             loop([](std::size_t, std::size_t size) { return static_cast<npy_intp>(size); });
         } else {
             loop([&](std::size_t argument, std::size_t) { return steps[argument]; });
@@ -121,7 +132,7 @@ struct Universal<Kernel, Out (Kernel::*)(In...) const> {
     static constexpr auto TYPES = types_of(std::make_index_sequence<OUTPUTS>{});
 };
 
-// A function's help with the units of its arguments, which their names imply. The text stays to the end.
+// A function's help with the units of its arguments, which their names imply. The text is never freed.
 const char* with_units(const char* text);
 
 // Adds a universal function to a module; name and text have static storage. Of several kernels, for other
@@ -136,10 +147,7 @@ void add(pybind11::module_& module, const char* name, const char* text, Kernel, 
         std::array<std::array<char, First::TYPES.size()>, KERNELS>{First::TYPES, Universal<Others>::TYPES...};
     PyObject* made = PyUFunc_FromFuncAndData(loops, nothing, types[0].data(), KERNELS, First::INPUTS,
                                              First::OUTPUTS, PyUFunc_None, name, with_units(text), 0);
-    if (made == nullptr) {
-        throw pybind11::error_already_set();
-    }
-    module.attr(name) = pybind11::reinterpret_steal<pybind11::object>(made);
+    module.attr(name) = owned(made);
 }
 
 // The numbers of one argument.
@@ -190,7 +198,7 @@ void each_block(char** arguments, const npy_intp* sizes, const npy_intp* steps, 
             left -= count;
         }
     });
-    forget_float_flags();
+    clear_float_flags();
 }
 
 // Adds a universal function over the library's array calls. The kernel takes the columns, inputs first, and
@@ -204,10 +212,7 @@ void add_blocks(pybind11::module_& module, const char* name, const char* text, K
     std::fill_n(types.begin() + INPUTS, OUTPUTS, type_number<Out>());
     PyObject* made = PyUFunc_FromFuncAndData(&loop, &nothing, types.data(), 1, INPUTS, OUTPUTS, PyUFunc_None,
                                              name, with_units(text), 0);
-    if (made == nullptr) {
-        throw pybind11::error_already_set();
-    }
-    module.attr(name) = pybind11::reinterpret_steal<pybind11::object>(made);
+    module.attr(name) = owned(made);
 }
 
 // Adds one whose items are arrays themselves, by NumPy's signature; the loop is NumPy's generic one.
@@ -216,10 +221,7 @@ inline void add_general(pybind11::module_& module, const char* name, const char*
     static void* nothing = nullptr;
     PyObject* made = PyUFunc_FromFuncAndDataAndSignature(loop, &nothing, types, 1, inputs, outputs,
                                                          PyUFunc_None, name, with_units(text), 0, signature);
-    if (made == nullptr) {
-        throw pybind11::error_already_set();
-    }
-    module.attr(name) = pybind11::reinterpret_steal<pybind11::object>(made);
+    module.attr(name) = owned(made);
 }
 
 void add_plane(pybind11::module_& module);

@@ -2,8 +2,8 @@
 
 Angles are radians, bearings clockwise from north, lengths metres. Components are separate arrays in the order north,
 east, elevation; latitude, longitude, height; x, y, z. Most functions are NumPy universal functions: they broadcast,
-read arrays where they stand, take out= and where=, and let other threads run. A result that the library leaves
-unformed is NaN; GEO_NULL, a field never set, stays what it is, and so does GEO_INFINITY.
+read arrays where they stand, take out= and where=, and let other threads run. A result that the library does not set
+is NaN; GEO_NULL, a field never set, stays GEO_NULL, and GEO_INFINITY likewise.
 """
 import numpy as np
 
@@ -94,8 +94,8 @@ class PreparedPolygon:
 class LocalFrame:
     """North, east and elevation in the plane that touches the ellipsoid below an origin (basalt::LocalFrame).
 
-    The origin's latitude and longitude in radians, its height in metres. Points that cannot be converted give three
-    GEO_NULL, and all do where the frame is not valid.
+    The origin's latitude and longitude in radians, its height in metres. Points that cannot be converted, and
+    all points of a frame that is not valid, become three GEO_NULL.
     """
 
     def __init__(self, latitude, longitude, height):

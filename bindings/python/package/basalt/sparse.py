@@ -29,7 +29,7 @@ def _cells(x, y):
 
 
 def _elements(given, dtype):
-    """What is given as an array of the dtype. Nothing is cut and no field taken for another on the way."""
+    """What is given as an array of the dtype. No value is truncated, and no field is taken for another."""
     if getattr(given, "dtype", None) == dtype:
         return given if isinstance(given, np.ndarray) else np.asarray(given)
     if dtype.names is not None:  # tuples have no names; records that have go by theirs
@@ -41,7 +41,7 @@ def _elements(given, dtype):
     if natural.dtype.kind in "iu" and dtype.kind in "iu":
         made = natural.astype(dtype)
         if not np.array_equal(made, natural):
-            raise ValueError(f"{dtype} does not hold a number that is given")
+            raise ValueError(f"a number is out of the range of {dtype}")
         return made
     numbers = natural.dtype.kind in "biufc" and dtype.kind in "biufc"
     if natural.size and (numbers or hasattr(given, "dtype")) and not np.can_cast(natural.dtype, dtype, "same_kind"):
@@ -57,7 +57,7 @@ def _bytes(given, dtype, shape):
 def _corners(minimum, maximum):
     corners = [operator.index(c) for c in (*minimum, *maximum)]
     if len(corners) != 4 or min(corners) < _LEAST or max(corners) > _GREATEST:
-        raise ValueError("a rectangle is given by two cells of 32 bits")
+        raise ValueError("expected two cells of 32 bits as corners")
     return corners
 
 
@@ -109,7 +109,7 @@ class Sparse2DArray:
     def insert(self, x: npt.ArrayLike, y: npt.ArrayLike, elements: npt.ArrayLike) -> None:
         """Copies elements into their cells, over those already there; a later one of the same cell wins.
 
-        Numbers of another dtype are converted where nothing is cut by that; records have the dtype's field names.
+        Numbers of another dtype are converted where none is truncated; records have the dtype's field names.
         """
         x, y, shape = _cells(x, y)
         self._array.insert(x, y, _bytes(elements, self._dtype, shape))
@@ -167,13 +167,13 @@ class Sparse2DArray:
         return self._array.remove(x, y).reshape(shape)
 
     def clear(self) -> None:
-        """Back to the new state, with all memory given back."""
+        """Removes all elements and releases all memory."""
         self._array.clear()
 
     def select(self, minimum: tuple[int, int], maximum: tuple[int, int]) -> tuple[np.ndarray, np.ndarray, np.ndarray]:
         """(x, y, elements) of what lies in a rectangle, given by the least and the greatest cell, both inside it.
 
-        In the order of visits: by blocks, whose order means nothing, in a block by rows of ascending y and x.
+        In the order of visits: by blocks in no order, in a block by rows of ascending y and x.
         """
         x, y, elements = self._array.select(*_corners(minimum, maximum))
         return x, y, elements.view(self._dtype)

@@ -2,7 +2,7 @@
 """Computes the constants of the elementary functions and the error that each polynomial reaches.
 
 Usage: fit.py > src/geo/elementary/coefficients.h
-       fit.py --rows > tests/data/elementary.csv       results at hard arguments, to which the tests hold the functions
+       fit.py --rows > tests/data/elementary.csv       results at hard arguments, for the tests
 
 Each polynomial is a least-squares fit of the relative error at Chebyshev nodes. Coefficients are rounded to double one
 by one from the constant on, and the rest is fitted again to make up for the rounding.
@@ -130,12 +130,12 @@ def main():
 
     print("/// Angles of the centres, in two parts: of slope 0, 1/2 and 1; + 3 beyond the diagonal, + 6 for a negative x.")
     print("inline constexpr double CENTRE_ANGLES[24] = {")
-    rows = []
+    angles = []
     for base, sign in ((0, 1), (mpmath.pi / 2, -1), (mpmath.pi, -1), (mpmath.pi / 2, 1)):
         for slope in (mpf(0), mpf(1) / 2, mpf(1)):
             high, low = parts(base + sign * mpmath.atan(slope), (53, 53))
-            rows.append(f"    {float(high).hex()}, {float(low).hex()}")
-    print(",\n".join(rows) + "};")
+            angles.append(f"    {float(high).hex()}, {float(low).hex()}")
+    print(",\n".join(angles) + "};")
     print("\n}  // namespace basalt::geo::elementary\n\n#endif")
 
 

@@ -34,6 +34,13 @@ void BlockPool::AddSlab() {
     m_bytes += slab.Bytes();
 }
 
+void BlockPool::ReleaseReserved() noexcept {
+    for (; m_slabs.size() > m_opened; m_slabs.pop_back()) {
+        m_bytes -= m_slabs.back().Bytes();
+    }
+    m_spare = m_left;
+}
+
 CellBlock BlockPool::Take() noexcept {
     const std::size_t bytes = BlockBytes();
     if (m_left == 0) {

@@ -31,12 +31,15 @@ public:
     BlockPool(const BlockPool&) = delete;
     BlockPool& operator=(const BlockPool&) = delete;
 
-    // Makes the next `count` calls of Take() sure to succeed. Throws std::bad_alloc.
+    // Makes the next `count` calls of Take() sure to succeed. Throws std::bad_alloc; some slabs may then be
+    // reserved.
     void Reserve(std::size_t count) {
         while (m_spare < count) {
             AddSlab();
         }
     }
+    // Frees the slabs that no block was taken of.
+    void ReleaseReserved() noexcept;
     // A reserved block, with all cells empty.
     CellBlock Take() noexcept;
     void Clear() noexcept;

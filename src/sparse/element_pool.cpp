@@ -36,6 +36,12 @@ void ElementPool::OpenChunk() {
     m_unused = m_elementsPerChunk;
 }
 
+void ElementPool::ReleaseReserved() noexcept {
+    for (; m_chunks.size() > m_opened; m_chunks.pop_back()) {
+        vex_lib::vlSharedMemoryHeap::Free(m_chunks.back());
+    }
+}
+
 void ElementPool::TakeRow(void** slots, std::size_t count) noexcept {
     const std::size_t freed = std::min(count, m_freeCount);
     m_freeCount -= freed;

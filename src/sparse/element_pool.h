@@ -29,13 +29,16 @@ public:
     // Slots in use.
     std::size_t Size() const noexcept { return m_opened * m_elementsPerChunk - m_unused - m_freeCount; }
 
-    // Makes the next `slots` calls of Take() sure to succeed. Throws std::bad_alloc; slots in use are
-    // unchanged.
+    // Makes the next `slots` calls of Take() sure to succeed. Throws std::bad_alloc; some chunks may then be
+    // reserved.
     void Reserve(std::size_t slots) {
         while (m_freeCount + m_unused + (m_chunks.size() - m_opened) * m_elementsPerChunk < slots) {
             AddChunk();
         }
     }
+
+    // Returns the chunks that no slot was taken of to the shared heap.
+    void ReleaseReserved() noexcept;
 
     // A slot with undefined contents. Throws std::bad_alloc, with the pool unchanged.
     void* Take() {

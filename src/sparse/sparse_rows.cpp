@@ -3,6 +3,7 @@
 #include <bit>
 #include <climits>
 #include <cstring>
+#include <new>
 
 #include "src/sparse/sparse_contents.h"
 
@@ -61,11 +62,18 @@ void SparseContents::ReserveRow(int x, int y, std::size_t count) {
             ++blocks;
         }
     });
-    if (blocks != 0) {
-        ReserveBlocks(blocks);
-        m_tree.Reserve(blocks);
+    try {
+        if (blocks != 0) {
+            ReserveBlocks(blocks);
+            m_tree.Reserve(blocks);
+        }
+        m_elements.Reserve(slots);
+    } catch (const std::bad_alloc&) {
+        // The process is out of memory: keep none of it.
+        m_blocks.ReleaseReserved();
+        m_elements.ReleaseReserved();
+        throw;
     }
-    m_elements.Reserve(slots);
 }
 
 bool SparseContents::InsertRow(int x, int y, const char* elements, std::size_t size, std::size_t count) {

@@ -36,8 +36,8 @@ struct SparseInspector {
             require(found == std::vector<int>{static_cast<int>(i)});
         }
         const std::size_t each = pool.m_elementsPerChunk, all = pool.m_chunks.size() * each;
-        const std::size_t fresh = pool.m_unused + (pool.m_chunks.size() - pool.m_opened) * each;
-        require(slots.size() + fresh == all);  // every slot is free, in a cell or unused
+        require(pool.m_chunks.size() == pool.m_opened);  // none stays reserved
+        require(slots.size() + pool.m_unused == all);    // every slot is free, in a cell or unused
         require(pool.Size() == slots.size() - pool.m_freeCount && all <= pool.FreeCapacity());
         for (const int block : selection) {
             require(block >= 0 && static_cast<std::size_t>(block) < contents.m_list.size());

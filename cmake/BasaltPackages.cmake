@@ -55,7 +55,7 @@ if(BASALT_PACKAGE_DOCS)
   endforeach()
   install(DIRECTORY ${PROJECT_SOURCE_DIR}/examples ${PROJECT_SOURCE_DIR}/console
     DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/${CPACK_DEBIAN_DOCUMENTATION_PACKAGE_NAME} COMPONENT documentation
-    PATTERN "*test*" EXCLUDE)
+    PATTERN "*test*" EXCLUDE PATTERN "*.facts" EXCLUDE)
 endif()
 
 include(CPack)

@@ -30,10 +30,11 @@ public:
 /// visiting them.
 ///
 /// The heap grows in regions that double it (up to 32 MiB each); blocks of 1 MiB and more have a mapping of
-/// their own and are unmapped when freed. Regions without a block in use are kept up to 32 MiB, and 2 MiB
-/// more for each further part; beyond that they are unmapped, and Compact() unmaps the rest.
-/// Without a limit, further threads that allocate get parts of the heap (15 at most) with a lock and regions
-/// of their own, so that they do not wait for each other; any thread may free any block.
+/// their own, unless the heap has a limit of up to 64 MiB, and are unmapped when freed. Regions without a
+/// block in use are kept up to 32 MiB, and 2 MiB more for each further part; beyond that they are unmapped,
+/// and Compact() unmaps the rest. Without a limit, further threads that allocate get parts of the heap (15 at
+/// most) with a lock and regions of their own, so that they seldom wait for each other; any thread may free
+/// any block.
 ///
 /// Threads: thread-safe; destruction must be the last call.
 class BASALT_API vlWinHeapAllocator : public vlAllocator {

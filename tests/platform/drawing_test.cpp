@@ -4,8 +4,11 @@
 
 #include <climits>
 #include <cmath>
+#include <cstring>
+#include <random>
 
 #include "src/platform/pixels/keyed_copy.h"
+#include "src/platform/pixels/mapped_words.h"
 #include "tests/support/drawing.h"
 
 namespace {
@@ -101,6 +104,36 @@ TEST(Copy, kernels_leave_out_the_key_whatever_the_unused_byte) {
 
 constexpr XFORM QUARTER = {0, 1, -1, 0, 8, 0}, TWICE = {2, 0, 0, 2, 0, 0},
                 TINY = {1e-30F, 0, 0, 1e-30F, 0, 0};
+
+TEST(Transform, turns_large_pictures_by_either_kernel) {
+    using namespace basalt::platform;
+    constexpr int WIDTH = 300, HEIGHT = 170;
+    std::minstd_rand random(5);
+    const Picture before(WIDTH, HEIGHT, 32), from = random_picture(WIDTH, HEIGHT, 32, random);
+    Canvas source(from);
+    ::basalt::platform::Surface words;
+    ASSERT_TRUE(words.create(WIDTH, HEIGHT, 32));
+    std::memcpy(words.row(0), from.pixels.data(), from.pixels.size() * 4);
+    for (const double degrees : {2.0, 17.0, 45.0, 88.0, 90.0, 181.0, 271.0}) {
+        SCOPED_TRACE(degrees);
+        Canvas canvas(before);
+        const Settings turned = {0, 0, turn_about(degrees, 151, 84)};
+        SetGraphicsMode(canvas, GM_ADVANCED);
+        SetWorldTransform(canvas, &turned.world);
+        EXPECT_NE(BitBlt(canvas, 0, 0, WIDTH, HEIGHT, source, 0, 0, SRCCOPY), 0);
+        const Picture result = canvas.picture();
+        EXPECT_EQ(result,
+                  copied(before, {0, 0, WIDTH, HEIGHT, 0, 0}, from, SRCCOPY, turned, 0, &result, 1e-6));
+        const XFORM& t = turned.world;
+        const auto rows = AffineRows::create(*Affine{t.eM11, t.eM12, t.eM21, t.eM22, t.eDx, t.eDy}.inverse(),
+                                             0, 0, WIDTH, HEIGHT);
+        Picture portable = before;
+        for (int y = 0; y < HEIGHT; ++y) {
+            MappedWords(words, *rows).copy_portable(rows->row(y, WIDTH), &portable.at(0, y));
+        }
+        EXPECT_EQ(portable, result);
+    }
+}
 
 TEST(Transform, is_refused_where_it_cannot_be) {
     Canvas canvas(Picture(8, 8, 32)), other(Picture(8, 8, 32, 5));

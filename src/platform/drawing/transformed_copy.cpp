@@ -1,9 +1,11 @@
 // Copies through a transform: the middle of each destination pixel is mapped back into the source.
 #include <algorithm>
 #include <cstddef>
+#include <cstdlib>
 #include <optional>
 
 #include "src/platform/drawing/block_copy.h"
+#include "src/platform/pixels/mapped_words.h"
 #include "src/platform/pixels/pixel_rows.h"
 #include "src/platform/system/failure.h"
 
@@ -13,16 +15,35 @@ namespace {
 
 constexpr int PLACE_BITS = AffineRows::PLACE_BITS;
 
-void copy_words(const Surface& from, const AffineRows& rows, const AffineRows::Run& run, std::byte* row) {
-    auto* const to = reinterpret_cast<std::uint32_t*>(row);
-    const auto* const words = reinterpret_cast<const std::uint32_t*>(from.bits.get());
-    const std::size_t row_words = from.row_bytes / sizeof(std::uint32_t);
-    std::uint64_t x = run.x;
-    std::uint64_t y = run.y;
-    for (int i = run.begin; i < run.end; ++i) {
-        to[i] = words[(y >> PLACE_BITS) * row_words + (x >> PLACE_BITS)];
-        x += rows.step_x();
-        y += rows.step_y();
+// Rows of a tile, and the rows of the source that its columns cross: together they stay in the caches.
+constexpr int TILE_ROWS = 64;
+constexpr std::int64_t TILE_SOURCE_ROWS = 64;
+constexpr std::int64_t LEAST_COLUMNS = 16;
+
+std::int64_t tile_columns(const AffineRows& rows) {
+    const std::int64_t step = std::abs(static_cast<std::int64_t>(rows.step_y()));
+    return std::max((TILE_SOURCE_ROWS << PLACE_BITS) / std::max<std::int64_t>(step, 1), LEAST_COLUMNS);
+}
+
+// Calls copy(run, row) for parts that make up all rows, in tiles of a number of columns.
+template <typename Copy>
+void in_tiles(const AffineRows& rows, std::int64_t columns, Surface& to, const Copy& copy) {
+    for (int top = 0; top < to.height; top += TILE_ROWS) {
+        AffineRows::Run runs[TILE_ROWS];
+        const int count = std::min(TILE_ROWS, to.height - top);
+        for (int i = 0; i < count; ++i) {
+            runs[i] = rows.row(top + i, to.width);
+        }
+        for (std::int64_t left = 0; left < to.width; left += columns) {
+            for (int i = 0; i < count; ++i) {
+                AffineRows::Run part = runs[i];
+                part.end = static_cast<int>(std::min<std::int64_t>(part.end, left + columns));
+                if (part.begin < part.end) {
+                    copy(part, to.row(top + i));
+                    rows.advance(runs[i], part.end - part.begin);
+                }
+            }
+        }
     }
 }
 
@@ -82,17 +103,16 @@ bool copy_transformed(Context& destination, const Box& target, const Context& so
     if (!rows) {
         return fail_with(ERROR_ARITHMETIC_OVERFLOW, false);
     }
-    const bool words = writer.is_plain_copy() && surface.depth == 32;
-    for (int y = 0; y < surface.height; ++y) {
-        const AffineRows::Run run = rows->row(y, surface.width);
-        if (run.begin >= run.end) {
-            continue;
-        }
-        if (words) {
-            copy_words(*from, *rows, run, surface.row(y));
-        } else {
-            copy_run(*from, *rows, run, surface.row(y), writer);
-        }
+    if (writer.is_plain_copy() && surface.depth == 32) {
+        const MappedWords words(*from, *rows);
+        const std::int64_t columns = MappedWords::can_gather() ? tile_columns(*rows) : surface.width;
+        in_tiles(*rows, columns, surface, [&](const AffineRows::Run& run, std::byte* row) {
+            words.copy(run, reinterpret_cast<std::uint32_t*>(row));
+        });
+    } else {
+        in_tiles(*rows, surface.width, surface, [&](const AffineRows::Run& run, std::byte* row) {
+            copy_run(*from, *rows, run, row, writer);
+        });
     }
     return true;
 }

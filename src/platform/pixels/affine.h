@@ -54,6 +54,16 @@ public:
     // Steps of a place from one column to the next.
     std::uint64_t step_x() const { return static_cast<std::uint64_t>(m_x.per_column); }
     std::uint64_t step_y() const { return static_cast<std::uint64_t>(m_y.per_column); }
+    // Steps from one row to the next.
+    std::int64_t row_step_x() const { return m_x.per_row; }
+    std::int64_t row_step_y() const { return m_y.per_row; }
+
+    // Moves the begin of a run.
+    void advance(Run& run, int columns) const {
+        run.begin += columns;
+        run.x += step_x() * static_cast<std::uint64_t>(columns);
+        run.y += step_y() * static_cast<std::uint64_t>(columns);
+    }
 
 private:
     // One coordinate of the source as a function of column and row.

@@ -82,7 +82,7 @@ void arrays(Input& input) {
     basalt::direct(llh, azimuths, distances, ends, at_ends, COUNT);
     basalt::GeodesicInverse lines[COUNT] = {};
     basalt::inverse(llh, ends, lines, COUNT);
-    double sphere[2][COUNT], plane[COUNT];
+    double sphere[2][COUNT], plane[COUNT], bearings[COUNT];
     geo_nee points[COUNT];
     std::transform(llh, llh + COUNT, points, [](const geo_llh& at) {
         return geo_nee{at.latitude, at.longitude, at.height};
@@ -90,6 +90,21 @@ void arrays(Input& input) {
     basalt::distances(llh, ends, sphere[0], COUNT);
     basalt::bearings(llh, ends, sphere[1], COUNT);
     basalt::bearings(points, points + 1, plane, COUNT - 1);
+    geo_vector vectors[COUNT];
+    geo_hvd sights[COUNT];
+    geo_nee followed[COUNT], reduced[COUNT];
+    bool is_on[COUNT] = {};
+    std::transform(llh, llh + COUNT, vectors,
+                   [](const geo_llh& at) { return std::bit_cast<geo_vector>(at); });
+    std::transform(llh, llh + COUNT, sights, [](const geo_llh& at) { return std::bit_cast<geo_hvd>(at); });
+    basalt::bearings(vectors, bearings, COUNT);
+    decltype(basalt::follow)* const arrays_followed[] = {basalt::follow, basalt::follow_grade,
+                                                         basalt::follow_height_change};
+    decltype(geo_grid_follow)* const follow_one[] = {geo_grid_follow, geo_grid_follow2, geo_grid_follow3};
+    const unsigned form = input.byte() % 3;
+    arrays_followed[form](points, azimuths, distances, bearings, followed, COUNT);
+    basalt::reduce(sights, followed, azimuths, distances, reduced, COUNT);
+    basalt::on_segments(points, points + 1, followed, azimuths, is_on, COUNT - 1);
     for (std::size_t i = 0; i < COUNT; ++i) {
         double at_end = 0;
         geo_llh end = {};
@@ -100,6 +115,14 @@ void arrays(Input& input) {
         require(same(sphere[0][i], geo_vincenty_distance(llh[i], end)));
         require(same(sphere[1][i], geo_vincenty_bearing(llh[i], end)));
         require(i == 0 || same(plane[i - 1], geo_grid_bearing(points[i - 1], points[i])));
+        geo_nee point = {};
+        require(same(bearings[i], geo_vector_direction(vectors[i])));
+        follow_one[form](points[i], azimuths[i], distances[i], bearings[i], point);
+        require(same(followed[i], point));
+        geo_reduce_obs(sights[i], followed[i], azimuths[i], point, distances[i]);
+        require(same(reduced[i], point));
+        require(i == 0 || is_on[i - 1] == (geo_point_on_line(points[i - 1], points[i], followed[i - 1],
+                                                             azimuths[i - 1]) == 1));
     }
 }
 

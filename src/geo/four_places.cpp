@@ -25,6 +25,34 @@ BASALT_INLINE void scatter(const Four& from, double* first, std::size_t stride) 
     }
 }
 
+BASALT_INLINE FourIntegers is_missing(const Four& numbers) {
+    return bits_of(numbers) == bits_of(GEO_NULL);
+}
+
+BASALT_INLINE Point<Four> gather(const geo_nee* from) {
+    return {gather(&from->north, 3), gather(&from->east, 3), gather(&from->elevation, 3)};
+}
+
+BASALT_INLINE Offset<Four> gather_offset(const geo_nee* from, const geo_nee* to) {
+    return {gather(&to->north, 3) - gather(&from->north, 3), gather(&to->east, 3) - gather(&from->east, 3)};
+}
+
+/// Where one is NaN, the single calls say which.
+BASALT_INLINE unsigned written(const Four& results, double* out) {
+    store(results, out);
+    return is_any(results != results) ? ALL_FOUR : 0;
+}
+
+BASALT_INLINE unsigned written(const Point<Four>& results, geo_nee* out) {
+    if (is_any(results.north != results.north)) {
+        return ALL_FOUR;
+    }
+    scatter(results.north, &out->north, 3);
+    scatter(results.east, &out->east, 3);
+    scatter(results.elevation, &out->elevation, 3);
+    return 0;
+}
+
 BASALT_INLINE unsigned to_cartesian(const geo_llh* in, geo_vector* out) {
     const Four latitude = gather(&in->latitude, 3);
     const Four longitude = gather(&in->longitude, 3);
@@ -98,16 +126,8 @@ BASALT_INLINE unsigned inverse(const geo_llh* from, const geo_llh* to, GeodesicI
     return left;
 }
 
-/// Where one is NaN, the single calls say which.
-BASALT_INLINE unsigned written(const Four& results, double* out) {
-    store(results, out);
-    return is_any(results != results) ? ALL_FOUR : 0;
-}
-
 BASALT_INLINE unsigned bearings(const geo_nee* from, const geo_nee* to, double* out) {
-    return written(grid_bearing<Four>(gather(&to->north, 3) - gather(&from->north, 3),
-                                      gather(&to->east, 3) - gather(&from->east, 3)),
-                   out);
+    return written(gather_offset(from, to).bearing(), out);
 }
 
 BASALT_INLINE unsigned bearings(const geo_llh* from, const geo_llh* to, double* out) {
@@ -126,8 +146,53 @@ BASALT_INLINE unsigned distances(const geo_llh* from, const geo_llh* to, double*
                    out);
 }
 
+BASALT_INLINE unsigned bearings(const geo_vector* in, double* out) {
+    return written(bearing_of<Four>(gather(&in->y, 3), gather(&in->x, 3)), out);
+}
+
+BASALT_INLINE unsigned on_segments(const geo_nee* from, const geo_nee* to, const geo_nee* points,
+                                   const double* tolerances, bool* out) {
+    const FourIntegers is_on =
+        is_on_segment<Four>(gather_offset(from, to), gather_offset(from, points), gather(tolerances, 1));
+    for (int k = 0; k < 4; ++k) {
+        out[k] = is_on[k] != 0;
+    }
+    return 0;
+}
+
+BASALT_INLINE unsigned follow(Rise given, const geo_nee* starts, const double* bearings,
+                              const double* distances, const double* rises, geo_nee* out) {
+    const Point<Four> start = gather(starts);
+    const Four bearing = gather(bearings, 1);
+    const Four distance = gather(distances, 1);
+    const Four rise = gather(rises, 1);
+    switch (given) {
+        case Rise::ANGLE:
+            return written(followed<Rise::ANGLE>(start, bearing, distance, rise), out);
+        case Rise::GRADE:
+            return written(followed<Rise::GRADE>(start, bearing, distance, rise), out);
+        case Rise::METRES:
+            break;
+    }
+    return written(followed<Rise::METRES>(start, bearing, distance, rise), out);
+}
+
+BASALT_INLINE unsigned reduce(const geo_hvd* observations, const geo_nee* stations,
+                              const double* height_offsets, const double* scale_factors, geo_nee* out) {
+    const Four horizontal = gather(&observations->horizontal, 3);
+    const Four vertical = gather(&observations->vertical, 3);
+    const Four distance = gather(&observations->distance, 3);
+    if (is_any(is_missing(horizontal) | is_missing(vertical) | is_missing(distance))) {
+        return ALL_FOUR;
+    }
+    return written(reduced<Four>(horizontal, vertical, distance, gather(stations), gather(height_offsets, 1),
+                                 gather(scale_factors, 1)),
+                   out);
+}
+
 }  // namespace
 
+// Apart, since Clang refuses calls that return vectors in functions for AVX2, inlined ones too.
 [[gnu::target("avx2")]] unsigned to_cartesian_four(const geo_llh* in, geo_vector* out) {
     return to_cartesian(in, out);
 }
@@ -157,32 +222,25 @@ BASALT_INLINE unsigned distances(const geo_llh* from, const geo_llh* to, double*
     return distances(from, to, out);
 }
 
-}  // namespace basalt::geo
+[[gnu::target("avx2")]] unsigned bearings_four(const geo_vector* in, double* out) {
+    return bearings(in, out);
+}
 
-#else
+[[gnu::target("avx2")]] unsigned on_segments_four(const geo_nee* from, const geo_nee* to,
+                                                  const geo_nee* points, const double* tolerances,
+                                                  bool* out) {
+    return on_segments(from, to, points, tolerances, out);
+}
 
-namespace basalt::geo {
+[[gnu::target("avx2")]] unsigned follow_four(Rise given, const geo_nee* starts, const double* bearings,
+                                             const double* distances, const double* rises, geo_nee* out) {
+    return follow(given, starts, bearings, distances, rises, out);
+}
 
-unsigned to_cartesian_four(const geo_llh*, geo_vector*) {
-    return ALL_FOUR;
-}
-unsigned to_geodetic_four(const geo_vector*, geo_llh*, double) {
-    return ALL_FOUR;
-}
-unsigned direct_four(const geo_llh*, const double*, const double*, geo_llh*, double*) {
-    return ALL_FOUR;
-}
-unsigned inverse_four(const geo_llh*, const geo_llh*, GeodesicInverse*) {
-    return ALL_FOUR;
-}
-unsigned bearings_four(const geo_nee*, const geo_nee*, double*) {
-    return ALL_FOUR;
-}
-unsigned bearings_four(const geo_llh*, const geo_llh*, double*) {
-    return ALL_FOUR;
-}
-unsigned distances_four(const geo_llh*, const geo_llh*, double*) {
-    return ALL_FOUR;
+[[gnu::target("avx2")]] unsigned reduce_four(const geo_hvd* observations, const geo_nee* stations,
+                                             const double* height_offsets, const double* scale_factors,
+                                             geo_nee* out) {
+    return reduce(observations, stations, height_offsets, scale_factors, out);
 }
 
 }  // namespace basalt::geo

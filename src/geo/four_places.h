@@ -1,11 +1,13 @@
 /// @file
-/// Four records at a time with AVX2, with the bits of the single calls. Each function returns a bit for each
-/// record that is left to the single call: special numbers, and decisions within rounding.
+/// Four records at a time, with the bits of the single calls; only where a processor has AVX2. Each function
+/// returns a bit for each record that is left to the single call: special numbers, and decisions within
+/// rounding.
 #ifndef BASALT_SRC_GEO_FOUR_PLACES_H
 #define BASALT_SRC_GEO_FOUR_PLACES_H
 
 #include "basalt/geo/geodesic.h"
 #include "basalt/geo/records.h"
+#include "src/geo/directions.h"
 
 namespace basalt::geo {
 
@@ -18,16 +20,14 @@ unsigned direct_four(const geo_llh* starts, const double* azimuths, const double
 unsigned inverse_four(const geo_llh* from, const geo_llh* to, GeodesicInverse* out);
 unsigned bearings_four(const geo_nee* from, const geo_nee* to, double* out);
 unsigned bearings_four(const geo_llh* from, const geo_llh* to, double* out);
+unsigned bearings_four(const geo_vector* in, double* out);
 unsigned distances_four(const geo_llh* from, const geo_llh* to, double* out);
-
-/// Whether this processor runs them; they must not be called elsewhere.
-inline bool has_four_places() {
-#if defined(__x86_64__)
-    return __builtin_cpu_supports("avx2") != 0;
-#else
-    return false;
-#endif
-}
+unsigned on_segments_four(const geo_nee* from, const geo_nee* to, const geo_nee* points,
+                          const double* tolerances, bool* out);
+unsigned follow_four(Rise given, const geo_nee* starts, const double* bearings, const double* distances,
+                     const double* rises, geo_nee* out);
+unsigned reduce_four(const geo_hvd* observations, const geo_nee* stations, const double* height_offsets,
+                     const double* scale_factors, geo_nee* out);
 
 }  // namespace basalt::geo
 

@@ -1,23 +1,13 @@
 #include <cmath>
 
 #include "basalt/geo/plane.h"
-#include "src/geo/constants.h"
-#include "src/geo/elementary/elementary.h"
+#include "src/geo/directions.h"
 
 using namespace basalt::geo;
 
 int geo_point_on_line(const geo_nee& a, const geo_nee& b, const geo_nee& point, double tolerance) {
-    double angle = geo_normalised_bearing(geo_grid_bearing(a, b) - geo_grid_bearing(a, point));
-    if (angle > PI) {
-        angle = TWO_PI - angle;
-    }
-    const double distance = geo_horz_dist(a, point);
-    const auto [sine, cosine] = elementary::sin_cos(angle);
-    const double along = cosine * distance;
-    if (along < -tolerance || along > geo_horz_dist(a, b) + tolerance) {
-        return 0;
-    }
-    return std::abs(sine * distance) <= tolerance;
+    return is_on_segment<double>({b.north - a.north, b.east - a.east},
+                                 {point.north - a.north, point.east - a.east}, tolerance);
 }
 
 int geo_point_on_polyline(int n, const geo_nee* vertices, const geo_nee* point, double tolerance) {

@@ -3,8 +3,7 @@
 #include <cmath>
 
 #include "basalt/geo/plane.h"
-#include "src/geo/constants.h"
-#include "src/geo/elementary/elementary.h"
+#include "src/geo/directions.h"
 
 using namespace basalt::geo;
 
@@ -34,11 +33,10 @@ void geo_reduce_obs(const geo_hvd& obs, const geo_nee& station, double heightOff
         out = {GEO_NULL, GEO_NULL, GEO_NULL};
         return;
     }
-    const auto [vertical, horizontal] = elementary::sin_cos_two(obs.vertical, obs.horizontal);
-    const double run = vertical.sine * obs.distance * scaleFactor;
-    const double rise = vertical.cosine * obs.distance;
-    out = {horizontal.cosine * run + station.north, horizontal.sine * run + station.east,
-           heightOffset + station.elevation + rise};
+    const auto [north, east, elevation] =
+        reduced<double>(obs.horizontal, obs.vertical, obs.distance,
+                        {station.north, station.east, station.elevation}, heightOffset, scaleFactor);
+    out = {north, east, elevation};
 }
 
 void geo_calc_obs(const geo_nee& from, double fromHeight, const geo_nee& to, double toHeight, geo_hvd& out,
@@ -57,26 +55,24 @@ void geo_calc_obs(const geo_nee& from, double fromHeight, const geo_nee& to, dou
 
 namespace {
 
-geo_nee followed(const geo_nee& start, double bearing, double distance, double elevation) {
-    const auto [sine, cosine] = elementary::sin_cos(bearing);
-    return {start.north + cosine * distance, start.east + sine * distance, elevation};
+template <Rise GIVEN>
+void follow(const geo_nee& start, double bearing, double distance, double rise, geo_nee& out) {
+    const auto [north, east, elevation] =
+        followed<GIVEN, double>({start.north, start.east, start.elevation}, bearing, distance, rise);
+    out = {north, east, elevation};
 }
 
 }  // namespace
 
 void geo_grid_follow(const geo_nee& start, double bearing, double distance, double slopeAngle, geo_nee& out) {
-    const bool vertical = slopeAngle == HALF_PI || slopeAngle == -HALF_PI;
-    const double elevation =
-        vertical ? start.elevation : start.elevation + elementary::tan(slopeAngle) * distance;
-    out = followed(start, bearing, distance, elevation);
+    follow<Rise::ANGLE>(start, bearing, distance, slopeAngle, out);
 }
 
 void geo_grid_follow2(const geo_nee& start, double bearing, double distance, double grade, geo_nee& out) {
-    const double elevation = grade == 0.0 ? start.elevation : start.elevation + distance * grade;
-    out = followed(start, bearing, distance, elevation);
+    follow<Rise::GRADE>(start, bearing, distance, grade, out);
 }
 
 void geo_grid_follow3(const geo_nee& start, double bearing, double distance, double heightChange,
                       geo_nee& out) {
-    out = followed(start, bearing, distance, start.elevation + heightChange);
+    follow<Rise::METRES>(start, bearing, distance, heightChange, out);
 }

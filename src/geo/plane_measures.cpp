@@ -72,8 +72,7 @@ double geo_grid_divergence(double bearing1, double bearing2) {
     if (is_null(bearing1) || is_null(bearing2)) {
         return GEO_NULL;
     }
-    const double turn = geo_normalised_bearing(bearing1 - bearing2);
-    return turn > PI ? TWO_PI - turn : turn;
+    return shorter_turn(geo_normalised_bearing(bearing1 - bearing2));
 }
 
 double geo_grid_divergence(const geo_nee& a1, const geo_nee& a2, const geo_nee& b1, const geo_nee& b2) {

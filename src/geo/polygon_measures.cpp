@@ -4,16 +4,30 @@
 
 namespace basalt {
 
-double polygon_area(const geo_nee* vertices, std::size_t count) noexcept {
+namespace {
+
+/// Vertex i is at(i).
+template <class At>
+double area(std::size_t count, const At& at) {
     double twice = 0.0;
     for (std::size_t i = 2; i < count; ++i) {
-        const double north1 = vertices[i - 1].north - vertices[0].north;
-        const double east1 = vertices[i - 1].east - vertices[0].east;
-        const double north2 = vertices[i].north - vertices[0].north;
-        const double east2 = vertices[i].east - vertices[0].east;
+        const double north1 = at(i - 1).north - at(0).north;
+        const double east1 = at(i - 1).east - at(0).east;
+        const double north2 = at(i).north - at(0).north;
+        const double east2 = at(i).east - at(0).east;
         twice += north1 * east2 - east1 * north2;
     }
     return twice * 0.5;
+}
+
+}  // namespace
+
+double polygon_area(const geo_nee* vertices, std::size_t count) noexcept {
+    return area(count, [=](std::size_t i) -> const geo_nee& { return vertices[i]; });
+}
+
+double polygon_area(const double* norths, const double* easts, std::size_t count) noexcept {
+    return area(count, [=](std::size_t i) { return geo_nee{norths[i], easts[i], 0.0}; });
 }
 
 double polygon_perimeter(const geo_nee* vertices, std::size_t count) noexcept {

@@ -1,5 +1,5 @@
 /// @file
-/// Conversions, geodesics, bearings and distances of whole arrays, with the bits of the single calls.
+/// Conversions, geodesics, measures and observations of whole arrays, with the bits of the single calls.
 ///
 /// Buffers hold `count` records. An output may be the input's own buffer where the types agree, but must not
 /// overlap it otherwise. Each call returns how many were refused: records left untouched where the single
@@ -36,10 +36,33 @@ BASALT_API std::size_t bearings(const geo_nee* from, const geo_nee* to, double* 
 /// As geo_vincenty_bearing(), on a sphere.
 BASALT_API std::size_t bearings(const geo_llh* from, const geo_llh* to, double* out, std::size_t count);
 
+/// As geo_vector_direction().
+BASALT_API std::size_t bearings(const geo_vector* in, double* out, std::size_t count);
+
 /// As geo_horz_dist().
 BASALT_API std::size_t distances(const geo_nee* from, const geo_nee* to, double* out, std::size_t count);
 /// As geo_vincenty_distance(), on a sphere.
 BASALT_API std::size_t distances(const geo_llh* from, const geo_llh* to, double* out, std::size_t count);
+
+/// As geo_point_on_line(), for the segments between `from` and `to`.
+BASALT_API void on_segments(const geo_nee* from, const geo_nee* to, const geo_nee* points,
+                            const double* tolerances, bool* out, std::size_t count);
+
+/// As geo_grid_follow(): points reached on slopes given as angles. Refused are those whose north is NaN.
+BASALT_API std::size_t follow(const geo_nee* starts, const double* bearings, const double* distances,
+                              const double* slope_angles, geo_nee* out, std::size_t count);
+/// As geo_grid_follow2(), on slopes given as ratios.
+BASALT_API std::size_t follow_grade(const geo_nee* starts, const double* bearings, const double* distances,
+                                    const double* grades, geo_nee* out, std::size_t count);
+/// As geo_grid_follow3(), with changes of height in metres.
+BASALT_API std::size_t follow_height_change(const geo_nee* starts, const double* bearings,
+                                            const double* distances, const double* height_changes,
+                                            geo_nee* out, std::size_t count);
+
+/// As geo_reduce_obs(). Refused are also those with a field of #GEO_NULL, which become #GEO_NULL.
+BASALT_API std::size_t reduce(const geo_hvd* observations, const geo_nee* stations,
+                              const double* height_offsets, const double* scale_factors, geo_nee* out,
+                              std::size_t count);
 
 }  // namespace basalt
 

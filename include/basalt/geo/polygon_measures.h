@@ -24,6 +24,9 @@ namespace basalt {
 /// Threads: thread-safe. Never throws.
 BASALT_API double polygon_area(const geo_nee* vertices, std::size_t count) noexcept;
 
+/// The same of coordinates in arrays of their own.
+BASALT_API double polygon_area(const double* norths, const double* easts, std::size_t count) noexcept;
+
 /// Length of the outline in the plane of north and east, the closing edge included.
 /// @return metres, not negative; 0 for fewer than 2 vertices
 ///

@@ -2,7 +2,6 @@
 
 #include <cmath>
 
-#include "src/geo/elementary/exact_product.h"
 #include "src/geo/elementary/huge_angle.h"
 #include "src/geo/elementary/kernels.h"
 
@@ -89,18 +88,7 @@ double tan(double angle) {
     if (std::isinf(angle)) {
         return angle - angle;
     }
-    const Reduced<double> reduced = reduce_any(angle);
-    const SineCosinePairs<double> of = sine_cosine_pairs(reduced.high, reduced.low);
-    // sin / cos, or after an odd number of quarters -cos / sin.
-    const bool is_odd = (reduced.quarters & 1) != 0;
-    const double n = is_odd ? -of.cosine : of.sine;
-    const double n_low = is_odd ? -of.cosine_low : of.sine_low;
-    const double d = is_odd ? of.sine : of.cosine;
-    const double d_low = is_odd ? of.sine_low : of.cosine_low;
-    // The quotient of the first parts, corrected by what it leaves: 0.04 u from n and d, 1 u from the last
-    // rounding.
-    const double q = n / d;
-    return q + ((n_low - q * d_low) - product_less(q, d, n)) / d;
+    return tangent(reduce_any(angle));
 }
 
 double atan(double slope) {

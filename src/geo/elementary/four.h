@@ -101,6 +101,13 @@ BASALT_INLINE SineCosineFours sin_cos_two(const Four& first, const Four& second)
     return {sin_cos(first), sin_cos(second)};
 }
 
+BASALT_INLINE Four tan(const Four& angle) {
+    if (all_within(size_of(angle), TINY, REDUCED_LIMIT)) {
+        return tangent(reduce(angle));
+    }
+    return Four{tan(angle[0]), tan(angle[1]), tan(angle[2]), tan(angle[3])};
+}
+
 BASALT_INLINE Four atan2(const Four& y, const Four& x) {
     if (all_within(size_of(y), SMALLEST_COMPONENT, LARGEST_COMPONENT) &&
         all_within(size_of(x), SMALLEST_COMPONENT, LARGEST_COMPONENT)) {

@@ -5,6 +5,7 @@
 #define BASALT_SRC_GEO_ELEMENTARY_KERNELS_H
 
 #include "src/geo/elementary/coefficients.h"
+#include "src/geo/elementary/exact_product.h"
 #include "src/geo/elementary/lane.h"
 
 namespace basalt::geo::elementary {
@@ -86,6 +87,22 @@ BASALT_INLINE void sine_and_cosine(const Reduced<Lane>& angle, Lane& sine, Lane&
     const Integers<Lane> swap = (s ^ c) & -(angle.quarters & 1);  // odd quarters exchange the two
     sine = from_bits<Lane>((s ^ swap) ^ ((angle.quarters << 62) & SIGN));
     cosine = from_bits<Lane>((c ^ swap) ^ (((angle.quarters + 1) << 62) & SIGN));
+}
+
+/// Tangent of a reduced angle and its quarter turns.
+template <typename Lane>
+BASALT_INLINE Lane tangent(const Reduced<Lane>& angle) {
+    const SineCosinePairs<Lane> of = sine_cosine_pairs(angle.high, angle.low);
+    // sin / cos, or after an odd number of quarters -cos / sin.
+    const auto is_odd = (angle.quarters & 1) != 0;
+    const Lane n = is_odd ? -of.cosine : of.sine;
+    const Lane n_low = is_odd ? -of.cosine_low : of.sine_low;
+    const Lane d = is_odd ? of.sine : of.cosine;
+    const Lane d_low = is_odd ? of.sine_low : of.cosine_low;
+    // The quotient of the first parts, corrected by what it leaves: 0.04 u from n and d, 1 u from the last
+    // rounding.
+    const Lane q = n / d;
+    return q + ((n_low - q * d_low) - product_less<Lane>(q, d, n)) / d;
 }
 
 /// Components of a direction are between these for arctangent(): no product overflows or loses digits.

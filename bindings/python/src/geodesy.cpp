@@ -73,9 +73,7 @@ template <Measure MEASURE>
 void write_between_places(const Column* columns, std::size_t count) {
     double measured[BLOCK];
     between_places<MEASURE>(columns, measured, count);
-    for (std::size_t i = 0; i < count; ++i) {
-        columns[4][i] = measured[i];
-    }
+    write_numbers(columns[4], measured, count);
 }
 
 }  // namespace
@@ -98,9 +96,7 @@ void add_geodesy(pybind11::module_& m) {
         geo_llh llh[BLOCK];
         double tolerances[BLOCK];
         read_records(columns, xyz, count);
-        for (std::size_t i = 0; i < count; ++i) {
-            tolerances[i] = columns[3][i];
-        }
+        read_numbers(columns[3], tolerances, count);
         std::fill_n(llh, count, geo_llh{NOT_A_NUMBER, NOT_A_NUMBER, NOT_A_NUMBER});
         const std::size_t run = columns[3].step == 0 ? count : 1;
         for (std::size_t i = 0; i < count; i += run) {

@@ -1,6 +1,7 @@
 // Observations and their reduction to grid points.
 
 #include "basalt/geo.h"
+#include "basalt/geo/arrays.h"
 #include "universal.h"
 
 namespace basalt_python {
@@ -14,13 +15,18 @@ void add_observations(pybind11::module_& m) {
             geo_normalise_obs(obs);
             return std::tuple{obs.horizontal, obs.vertical};
         });
-    add(m, "_reduce_observation", "See reduce_observation.",
-        [](double horizontal, double vertical, double distance, double n, double e, double h, double offset,
-           double scale) {
-            geo_nee out{};
-            geo_reduce_obs({horizontal, vertical, distance}, {n, e, h}, offset, out, scale);
-            return std::tuple{out.north, out.east, out.elevation};
-        });
+    add_blocks<8, 3>(m, "_reduce_observation", "See reduce_observation.",
+                     [](const Column* columns, std::size_t count) {
+                         geo_hvd observations[BLOCK];
+                         geo_nee points[BLOCK];
+                         double offsets[BLOCK], scales[BLOCK];
+                         read_records(columns, observations, count);
+                         read_records(columns + 3, points, count);
+                         read_numbers(columns[6], offsets, count);
+                         read_numbers(columns[7], scales, count);
+                         basalt::reduce(observations, points, offsets, scales, points, count);
+                         write_records(columns + 8, points, count);
+                     });
     add(m, "_calculate_observation", "See calculate_observation.",
         [](double n1, double e1, double h1, double height1, double n2, double e2, double h2, double height2,
            double scale) {

@@ -18,11 +18,26 @@ geo_nee flat(double north, double east) {
 // Bearings from the points of the first two columns to those of the next.
 void read_bearings(const Column* columns, double* bearings, std::size_t count) {
     geo_nee from[BLOCK], to[BLOCK];
-    for (std::size_t i = 0; i < count; ++i) {
-        from[i] = flat(columns[0][i], columns[1][i]);
-        to[i] = flat(columns[2][i], columns[3][i]);
-    }
+    each_row<4>(columns, count, [&](std::size_t i, const auto& number) {
+        from[i] = flat(number(0), number(1));
+        to[i] = flat(number(2), number(3));
+    });
     basalt::bearings(from, to, bearings, count);
+}
+
+// Arguments: a point, a bearing, a distance and what gives the height; the point reached.
+template <auto FOLLOW>
+void add_follow(pybind11::module_& m, const char* name, const char* text) {
+    add_blocks<6, 3>(m, name, text, [](const Column* columns, std::size_t count) {
+        geo_nee points[BLOCK];
+        double bearings[BLOCK], distances[BLOCK], rises[BLOCK];
+        read_records(columns, points, count);
+        read_numbers(columns[3], bearings, count);
+        read_numbers(columns[4], distances, count);
+        read_numbers(columns[5], rises, count);
+        FOLLOW(points, bearings, distances, rises, points, count);
+        write_records(columns + 6, points, count);
+    });
 }
 
 }  // namespace
@@ -71,9 +86,7 @@ void add_plane(pybind11::module_& m) {
                      [](const Column* columns, std::size_t count) {
                          double all[BLOCK];
                          read_bearings(columns, all, count);
-                         for (std::size_t i = 0; i < count; ++i) {
-                             columns[4][i] = all[i];
-                         }
+                         write_numbers(columns[4], all, count);
                      });
     add(m, "slope_angle",
         "slope_angle(north1, east1, elevation1, north2, east2, elevation2): radians from the level, "
@@ -139,30 +152,18 @@ void add_plane(pybind11::module_& m) {
             return std::tuple{x, y};
         });
 
-    add(m, "follow",
+    add_follow<&basalt::follow>(
+        m, "follow",
         "follow(north, east, elevation, bearing, distance, slope_angle): the point reached over a "
-        "horizontal distance (geo_grid_follow).",
-        [](double n, double e, double h, double bearing, double distance, double angle) {
-            geo_nee out{};
-            geo_grid_follow({n, e, h}, bearing, distance, angle, out);
-            return Point{out.north, out.east, out.elevation};
-        });
-    add(m, "follow_grade",
+        "horizontal distance (geo_grid_follow).");
+    add_follow<&basalt::follow_grade>(
+        m, "follow_grade",
         "follow_grade(north, east, elevation, bearing, distance, grade): as follow, the slope a ratio "
-        "(geo_grid_follow2).",
-        [](double n, double e, double h, double bearing, double distance, double grade) {
-            geo_nee out{};
-            geo_grid_follow2({n, e, h}, bearing, distance, grade, out);
-            return Point{out.north, out.east, out.elevation};
-        });
-    add(m, "follow_height_change",
+        "(geo_grid_follow2).");
+    add_follow<&basalt::follow_height_change>(
+        m, "follow_height_change",
         "follow_height_change(north, east, elevation, bearing, distance, height_change): as follow, with "
-        "the change of height in metres (geo_grid_follow3).",
-        [](double n, double e, double h, double bearing, double distance, double change) {
-            geo_nee out{};
-            geo_grid_follow3({n, e, h}, bearing, distance, change, out);
-            return Point{out.north, out.east, out.elevation};
-        });
+        "the change of height in metres (geo_grid_follow3).");
 }
 
 }  // namespace basalt_python

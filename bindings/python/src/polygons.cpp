@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "basalt/geo.h"
+#include "basalt/geo/arrays.h"
 #include "basalt/geo/polygon_measures.h"
 #include "basalt/geo/prepared_polygon.h"
 #include "universal.h"
@@ -74,26 +75,41 @@ void add_outline_test(pybind11::module_& m, const char* name, const char* text, 
     }
 }
 
-// Arguments: the outline's norths and easts; a number out.
-template <double (*MEASURE)(const geo_nee*, std::size_t) noexcept>
+using Measure = double (*)(const geo_nee*, std::size_t) noexcept;
+using MeasureOfColumns = double (*)(const double*, const double*, std::size_t) noexcept;
+
+// Arguments: the outline's norths and easts; a number out. What measures columns needs no copy of them.
+template <Measure MEASURE, MeasureOfColumns OF_COLUMNS = nullptr>
 void each_outline(char** arguments, const npy_intp* sizes, const npy_intp* steps, void*) {
     as_python_error([&] {
-        std::vector<geo_nee> outline(static_cast<std::size_t>(sizes[1]));
+        const auto vertices = static_cast<std::size_t>(sizes[1]);
+        const bool is_in_place =
+            OF_COLUMNS != nullptr && steps[3] == sizeof(double) && steps[4] == sizeof(double);
+        std::vector<geo_nee> outline(is_in_place ? 0 : vertices);
         for (npy_intp i = 0; i < sizes[0]; ++i) {
+            double& measured = *reinterpret_cast<double*>(arguments[2] + i * steps[2]);
+            if constexpr (OF_COLUMNS != nullptr) {
+                if (is_in_place) {
+                    measured =
+                        OF_COLUMNS(reinterpret_cast<const double*>(arguments[0] + i * steps[0]),
+                                   reinterpret_cast<const double*>(arguments[1] + i * steps[1]), vertices);
+                    continue;
+                }
+            }
             for (npy_intp v = 0; v < sizes[1]; ++v) {
                 outline[static_cast<std::size_t>(v)] = {number_at(arguments[0] + i * steps[0] + v * steps[3]),
                                                         number_at(arguments[1] + i * steps[1] + v * steps[4]),
                                                         0};
             }
-            *reinterpret_cast<double*>(arguments[2] + i * steps[2]) = MEASURE(outline.data(), outline.size());
+            measured = MEASURE(outline.data(), vertices);
         }
     });
     clear_float_flags();
 }
 
-template <double (*MEASURE)(const geo_nee*, std::size_t) noexcept>
+template <Measure MEASURE, MeasureOfColumns OF_COLUMNS = nullptr>
 void add_measure(pybind11::module_& m, const char* name, const char* text) {
-    static PyUFuncGenericFunction loop = &each_outline<MEASURE>;
+    static PyUFuncGenericFunction loop = &each_outline<MEASURE, OF_COLUMNS>;
     static char types[] = {NPY_DOUBLE, NPY_DOUBLE, NPY_DOUBLE};
     add_general(m, name, text, "(n),(n)->()", &loop, types, 2, 1);
 }
@@ -193,7 +209,7 @@ void add_polygons(pybind11::module_& m) {
         [](int n, const geo_nee* vertices, const geo_nee& point, double tolerance) {
             return geo_point_on_polyline(n, vertices, &point, tolerance);
         });
-    add_measure<&basalt::polygon_area>(
+    add_measure<&basalt::polygon_area, &basalt::polygon_area>(
         m, "polygon_area",
         "polygon_area(norths, easts): square metres enclosed by polygons, whose vertices lie along the last "
         "axis; positive where they run clockwise (basalt::polygon_area).");
@@ -202,11 +218,24 @@ void add_polygons(pybind11::module_& m) {
         "polygon_perimeter(norths, easts): metres around polygons, whose vertices lie along the last axis; "
         "the closing edge counts (basalt::polygon_perimeter).");
     m.def("_prepared_polygon", &prepared_polygon);
-    add(m, "on_line",
+    add_blocks<7, 1, bool>(
+        m, "on_line",
         "on_line(north1, east1, north2, east2, north, east, tolerance): whether a point lies within so "
         "many metres of a segment (geo_point_on_line).",
-        [](double n1, double e1, double n2, double e2, double n, double e, double tolerance) {
-            return geo_point_on_line({n1, e1, 0}, {n2, e2, 0}, {n, e, 0}, tolerance) != 0;
+        [](const Column* columns, std::size_t count) {
+            geo_nee points[3][BLOCK];
+            double tolerances[BLOCK];
+            bool is_on[BLOCK];
+            for (std::size_t i = 0; i < count; ++i) {
+                for (std::size_t k = 0; k < 3; ++k) {
+                    points[k][i] = {columns[2 * k][i], columns[2 * k + 1][i], 0};
+                }
+            }
+            read_numbers(columns[6], tolerances, count);
+            basalt::on_segments(points[0], points[1], points[2], tolerances, is_on, count);
+            for (std::size_t i = 0; i < count; ++i) {
+                columns[7].at<bool>(i) = is_on[i];
+            }
         });
     add(m, "lines_cross",
         "lines_cross(p_north1, p_east1, p_north2, p_east2, q_north1, q_east1, q_north2, q_east2): whether "

@@ -162,21 +162,47 @@ struct Column {
     double& operator[](std::size_t i) const { return at<double>(i); }
 };
 
+// Runs loop(i, number) over rows of columns; number(k) is that of column k. Where the numbers of each column
+// lie side by side it is a loop of its own.
+template <std::size_t COLUMNS, class Loop>
+void each_row(const Column* columns, std::size_t count, Loop loop) {
+    const auto walk = [&](const auto& step) {
+        for (std::size_t i = 0; i < count; ++i) {
+            loop(i, [&](std::size_t k) -> double& {
+                return *reinterpret_cast<double*>(columns[k].first + static_cast<npy_intp>(i) * step(k));
+            });
+        }
+    };
+    if (std::all_of(columns, columns + COLUMNS, [](const Column& c) { return c.step == sizeof(double); })) {
+        walk([](std::size_t) { return static_cast<npy_intp>(sizeof(double)); });
+    } else {
+        walk([&](std::size_t k) { return columns[k].step; });
+    }
+}
+
+inline void read_numbers(const Column& column, double* numbers, std::size_t count) {
+    each_row<1>(&column, count, [=](std::size_t i, const auto& number) { numbers[i] = number(0); });
+}
+
+inline void write_numbers(const Column& column, const double* numbers, std::size_t count) {
+    each_row<1>(&column, count, [=](std::size_t i, const auto& number) { number(0) = numbers[i]; });
+}
+
 template <class Record>
 void read_records(const Column* columns, Record* records, std::size_t count) {
-    for (std::size_t i = 0; i < count; ++i) {
-        records[i] = {columns[0][i], columns[1][i], columns[2][i]};
-    }
+    each_row<3>(columns, count, [=](std::size_t i, const auto& number) {
+        records[i] = {number(0), number(1), number(2)};
+    });
 }
 
 template <class Record>
 void write_records(const Column* columns, const Record* records, std::size_t count) {
-    for (std::size_t i = 0; i < count; ++i) {
+    each_row<3>(columns, count, [=](std::size_t i, const auto& number) {
         const auto& [first, second, third] = records[i];
-        columns[0][i] = first;
-        columns[1][i] = second;
-        columns[2][i] = third;
-    }
+        number(0) = first;
+        number(1) = second;
+        number(2) = third;
+    });
 }
 
 // How many items a kernel for blocks takes at most: their records fit into the first-level cache.

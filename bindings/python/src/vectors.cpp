@@ -1,5 +1,6 @@
 // Local vectors: x towards east, y towards north, z upwards.
 #include "basalt/geo.h"
+#include "basalt/geo/arrays.h"
 #include "universal.h"
 
 namespace basalt_python {
@@ -18,13 +19,18 @@ void add_vectors(pybind11::module_& m) {
             geo_vector v{x, y, z};
             return geo_vector_len(v);
         });
-    add(m, "vector_bearing",
-        "vector_bearing(x, y): radians in [0, 2 pi), 0 for a vector without horizontal part "
-        "(geo_vector_direction).",
-        [](double x, double y) {
-            geo_vector v{x, y, 0};
-            return geo_vector_direction(v);
-        });
+    add_blocks<2, 1>(m, "vector_bearing",
+                     "vector_bearing(x, y): radians in [0, 2 pi), 0 for a vector without horizontal part "
+                     "(geo_vector_direction).",
+                     [](const Column* columns, std::size_t count) {
+                         geo_vector in[BLOCK];
+                         double all[BLOCK];
+                         each_row<2>(columns, count, [&](std::size_t i, const auto& number) {
+                             in[i] = {number(0), number(1), 0};
+                         });
+                         basalt::bearings(in, all, count);
+                         write_numbers(columns[2], all, count);
+                     });
     add(m, "vector_slope_angle",
         "vector_slope_angle(x, y, z): radians from the level, positive upwards (geo_vector_gradient).",
         [](double x, double y, double z) {

@@ -129,7 +129,7 @@ TEST(Transform, turns_large_pictures_by_either_kernel) {
                                              0, 0, WIDTH, HEIGHT);
         Picture portable = before;
         for (int y = 0; y < HEIGHT; ++y) {
-            MappedWords(words, *rows).copy_portable(rows->row(y, WIDTH), &portable.at(0, y));
+            copy_mapped_words_portable(words, *rows, rows->row(y, WIDTH), &portable.at(0, y));
         }
         EXPECT_EQ(portable, result);
     }

@@ -104,10 +104,9 @@ bool copy_transformed(Context& destination, const Box& target, const Context& so
         return fail_with(ERROR_ARITHMETIC_OVERFLOW, false);
     }
     if (writer.is_plain_copy() && surface.depth == 32) {
-        const MappedWords words(*from, *rows);
-        const std::int64_t columns = MappedWords::can_gather() ? tile_columns(*rows) : surface.width;
+        const std::int64_t columns = can_gather_words() ? tile_columns(*rows) : surface.width;
         in_tiles(*rows, columns, surface, [&](const AffineRows::Run& run, std::byte* row) {
-            words.copy(run, reinterpret_cast<std::uint32_t*>(row));
+            copy_mapped_words(*from, *rows, run, reinterpret_cast<std::uint32_t*>(row));
         });
     } else {
         in_tiles(*rows, surface.width, surface, [&](const AffineRows::Run& run, std::byte* row) {

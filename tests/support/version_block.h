@@ -2,6 +2,7 @@
 #ifndef BASALT_TESTS_SUPPORT_VERSION_BLOCK_H
 #define BASALT_TESTS_SUPPORT_VERSION_BLOCK_H
 
+#include <algorithm>
 #include <fstream>
 #include <string>
 #include <vector>
@@ -68,16 +69,16 @@ inline Bytes survey_resource() {
 // names) and 192 (the version information), the names from 256.
 inline constexpr char NAMES[26] = "\0.names\0.version_resource";
 inline Bytes program_file(const Bytes& contents) {
-    Bytes file(256);
     const std::size_t size = contents.size();
+    Bytes file(282 + size);
     const std::size_t words[][2] = {{0, 0x457F}, {2, 0x464C}, {4, 0x0102}, {40, 64},   {58, 64},
                                     {60, 3},     {62, 1},     {128, 1},    {132, 3},   {152, 256},
                                     {160, 26},   {192, 8},    {196, 1},    {216, 282}, {224, size}};
     for (const auto& [offset, word] : words) {
         put_word(file, offset, word);
     }
-    file.insert(file.end(), std::begin(NAMES), std::end(NAMES));
-    file.insert(file.end(), contents.begin(), contents.end());
+    std::copy_n(NAMES, sizeof(NAMES), file.begin() + 256);
+    std::copy(contents.begin(), contents.end(), file.begin() + 282);
     return file;
 }
 inline void write_file(const std::string& path, const Bytes& bytes) {

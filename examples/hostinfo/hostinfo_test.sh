@@ -14,7 +14,7 @@ addresses=$(for device in /sys/class/net/*; do
     [ "$(cat "$device/type")" = 1 ] && [ ! -e "$device/wireless" ] && [ ! -e "$device/phy80211" ] &&
         echo "$(cat "$device/ifindex") $(tr -d : <"$device/address")"
 done 2>/dev/null | sort -n | cut -d' ' -f2 | paste -sd, | sed 's/,/, /g')
-shows "hardware addresses${addresses:+ $addresses}"
+[ ! -d /sys/class/net ] || shows "hardware addresses${addresses:+ $addresses}"
 
 printf x >"été 日本.txt"
 TZ=UTC touch -a -d '2001-02-03 04:05:06' "été 日本.txt"

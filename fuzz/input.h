@@ -8,7 +8,6 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
-#include <iterator>
 
 namespace basalt::fuzz {
 
@@ -44,8 +43,11 @@ public:
 private:
     template <class Number>
     Number number() {
-        std::uint8_t bytes[sizeof(Number)];
-        std::generate(std::begin(bytes), std::end(bytes), [this] { return byte(); });
+        std::uint8_t bytes[sizeof(Number)] = {};
+        const std::size_t count = std::min(m_size, sizeof(Number));
+        std::copy_n(m_data, count, bytes);
+        m_data += count;
+        m_size -= count;
         return std::bit_cast<Number>(bytes);
     }
 

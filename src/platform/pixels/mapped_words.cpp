@@ -1,5 +1,7 @@
 #include "src/platform/pixels/mapped_words.h"
 
+#include <bit>
+
 #if defined(__x86_64__)
 #include <immintrin.h>
 #endif
@@ -37,7 +39,7 @@ constexpr int LANES = 8;
 
 // Places of columns 0, 1, 4 and 5. With those of 2, 3, 6 and 7, their high halves are eight in order.
 [[gnu::target("avx2")]] inline __m256i four_places(std::uint64_t place, std::uint64_t step) {
-    const auto at = [=](unsigned column) { return static_cast<long long>(place + column * step); };
+    const auto at = [=](unsigned column) { return std::bit_cast<long long>(place + column * step); };
     return _mm256_setr_epi64x(at(0), at(1), at(4), at(5));
 }
 
@@ -50,8 +52,8 @@ constexpr int LANES = 8;
                                        const AffineRows::Run& run, std::uint32_t* row) {
     const std::uint32_t* const words = words_of(from);
     const __m256i row_words = _mm256_set1_epi32(static_cast<int>(from.row_bytes / sizeof(std::uint32_t)));
-    const __m256i step_x = _mm256_set1_epi64x(static_cast<long long>(rows.step_x() * LANES));
-    const __m256i step_y = _mm256_set1_epi64x(static_cast<long long>(rows.step_y() * LANES));
+    const __m256i step_x = _mm256_set1_epi64x(std::bit_cast<long long>(rows.step_x() * LANES));
+    const __m256i step_y = _mm256_set1_epi64x(std::bit_cast<long long>(rows.step_y() * LANES));
     __m256i x_a = four_places(run.x, rows.step_x());
     __m256i x_b = four_places(run.x + 2 * rows.step_x(), rows.step_x());
     __m256i y_a = four_places(run.y, rows.step_y());
